@@ -1,0 +1,53 @@
+# The layers of the library and how their targets are made.
+
+# Options of every piece of code that is written here.
+add_library(project_build_options INTERFACE)
+target_compile_features(project_build_options INTERFACE cxx_std_20)
+target_compile_options(project_build_options INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
+
+find_package(Threads REQUIRED)
+
+# project_add_layer(<name> DEPENDS <targets>...)
+#
+# Makes a layer from the sources that its folders add to project_<name>_compiled:
+#   project_<name>_compiled  the objects, with hidden visibility
+#   project_<name>           the shared library of them, also as project::<name>
+#   project_<name>_objects   the same objects for tests, which may look inside src/
+function(project_add_layer name)
+  cmake_parse_arguments(layer "" "" "DEPENDS;TEST_INCLUDES" ${ARGN})
+  set(include_root "${CMAKE_CURRENT_SOURCE_DIR}/include")
+  if(NOT EXISTS "${include_root}")
+    set(include_root "${CMAKE_CURRENT_SOURCE_DIR}/../include") # src/ has its public headers beside it
+  endif()
+
+  add_library(project_${name}_compiled OBJECT)
+  set_target_properties(project_${name}_compiled PROPERTIES
+    POSITION_INDEPENDENT_CODE ON CXX_EXTENSIONS OFF
+    CXX_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON)
+  target_include_directories(project_${name}_compiled
+    PUBLIC "$<BUILD_INTERFACE:${include_root}>" PRIVATE ${layer_TEST_INCLUDES})
+  target_link_libraries(project_${name}_compiled PUBLIC ${layer_DEPENDS} PRIVATE project_build_options)
+
+  add_library(project_${name} SHARED "$<TARGET_OBJECTS:project_${name}_compiled>")
+  add_library(project::${name} ALIAS project_${name})
+  set_target_properties(project_${name} PROPERTIES
+    EXPORT_NAME ${name} LINKER_LANGUAGE CXX VERSION ${PROJECT_VERSION} SOVERSION ${PROJECT_VERSION_MAJOR})
+  target_include_directories(project_${name}
+    PUBLIC "$<BUILD_INTERFACE:${include_root}>" "$<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>")
+  target_link_libraries(project_${name} PUBLIC ${layer_DEPENDS})
+  target_compile_features(project_${name} PUBLIC cxx_std_20)
+endfunction()
+
+# project_add_objects(<name> LAYERS <layers>... DEPENDS <targets>... INCLUDES <folders>...)
+#
+# An interface target that carries the objects of some layers, for tests that look inside.
+function(project_add_objects name)
+  cmake_parse_arguments(objects "" "" "LAYERS;DEPENDS;INCLUDES" ${ARGN})
+  add_library(project_${name}_objects INTERFACE)
+  target_compile_features(project_${name}_objects INTERFACE cxx_std_20)
+  foreach(layer IN LISTS objects_LAYERS)
+    target_sources(project_${name}_objects INTERFACE "$<TARGET_OBJECTS:project_${layer}_compiled>")
+  endforeach()
+  target_include_directories(project_${name}_objects INTERFACE ${objects_INCLUDES})
+  target_link_libraries(project_${name}_objects INTERFACE ${objects_DEPENDS})
+endfunction()

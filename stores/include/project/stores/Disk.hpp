@@ -1,0 +1,113 @@
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "project/stores/Export.hpp"
+
+namespace project::stores {
+
+/// What tells one state of a file from another without reading it.
+struct FileIdentity {
+    std::uint64_t device = 0;
+    std::uint64_t inode = 0;
+    std::uint64_t size = 0;
+    std::int64_t modified = 0; ///< nanoseconds since 1970
+    std::int64_t changed = 0;  ///< nanoseconds since 1970
+
+    friend bool operator==(FileIdentity const&, FileIdentity const&) = default;
+
+    bool isSameFile(FileIdentity const& other) const noexcept {
+        return device == other.device && inode == other.inode;
+    }
+};
+
+struct FileContent {
+    std::string bytes;
+    FileIdentity identity; ///< of the file that was read, as it was after reading
+};
+
+/// The store's folder on disk, and all that a text backend does there.
+///
+/// Names are plain file names in that folder. Nothing follows a symbolic link, opens anything but a regular
+/// file, or reaches outside the folder. Every operation throws StoreError, naming the file, when the system
+/// fails it; results tell what is no failure. One thread at a time.
+class PROJECT_STORES_EXPORT Disk {
+public:
+    virtual ~Disk() = default;
+
+    /// The folder's path for messages, absolute, in UTF-8.
+    virtual std::string folder() const = 0;
+
+    /// Opens the folder that the path from the project's root leads to now, unless it is the one already
+    /// open. @return false when nothing is there. Throws when it is no folder or cannot be opened.
+    virtual bool openFolder() = 0;
+
+    /// Makes the folder and makes its entry in the root durable. Opens it. One that exists is opened only.
+    virtual void makeFolder() = 0;
+
+    /// Removes the folder if it is empty, and closes it. Never throws: what cannot be removed stays.
+    virtual void removeFolder() noexcept = 0;
+
+    /// True when the path from the project's root still leads to the open folder.
+    virtual bool isFolderInPlace() = 0;
+
+    /// Keeps other writers out, waiting for them. @return false when the time ran out.
+    virtual bool lock(std::chrono::milliseconds patience) = 0;
+    virtual void unlock() noexcept = 0;
+
+    /// Who holds the lock, for a message: a process number and its command as far as they can be had, or
+    /// an empty text.
+    virtual std::string lockHolder() = 0;
+
+    /// The state of a file now: one system call. Empty when it is not there.
+    virtual std::optional<FileIdentity> identify(std::string const& name) = 0;
+
+    /// Everything in a file from an offset on. Empty when it is not there.
+    virtual std::optional<FileContent> read(std::string const& name, std::uint64_t offset) = 0;
+
+    /// Appends to a file that must still be in the state given, in one write. Not durable before sync.
+    /// When it throws, a part of the bytes may stand in the file.
+    /// @return the state afterwards; empty, with nothing written, when the file is in another state.
+    virtual std::optional<FileIdentity> append(std::string const& name, FileIdentity const& expected,
+                                               std::string_view bytes) = 0;
+
+    /// Makes a new file with this content, with mode and owner of the file named like, if any. Not durable
+    /// before sync. Throws when the name is taken; what a failure leaves of it is removed again.
+    virtual FileIdentity create(std::string const& name, std::string_view bytes,
+                                std::optional<std::string> const& like) = 0;
+
+    /// Makes durable what append or create last wrote, through the same open file, whatever its name leads
+    /// to by now.
+    virtual void sync() = 0;
+
+    /// Puts the files of two names in each other's place, at once. @return false when the file system
+    /// cannot do that.
+    virtual bool exchange(std::string const& left, std::string const& right) = 0;
+
+    /// Gives a file another name, replacing what has it.
+    virtual void rename(std::string const& from, std::string const& to) = 0;
+
+    /// Removes a file. @return false when it is not there.
+    virtual bool remove(std::string const& name) = 0;
+
+    /// Makes the names in the folder durable.
+    virtual void syncFolder() = 0;
+
+    /// The names in the folder, in no order.
+    virtual std::vector<std::string> list() = 0;
+
+    /// The time by which the file system stamps files, in nanoseconds since 1970.
+    virtual std::int64_t now() = 0;
+
+    /// Waits a moment for others.
+    virtual void pause(std::chrono::milliseconds time) = 0;
+};
+
+} // namespace project::stores

@@ -1,0 +1,19 @@
+#pragma once
+
+#include "project/stores/Backend.hpp"
+
+namespace project::stores {
+
+/// Keeps nothing beyond the process: the tree of the TreeMetadataManager is all there is. For tests and for
+/// projects that are never saved.
+class PROJECT_STORES_EXPORT MemoryBackend : public Backend {
+public:
+    Changes enter(Access access) override;
+    void leave() noexcept override;
+    Children load(Address const& parent) override;
+    FileChanges write(Batch const& batch) override;
+    void keep() override;
+    void discard() noexcept override;
+};
+
+} // namespace project::stores

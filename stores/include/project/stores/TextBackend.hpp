@@ -1,0 +1,81 @@
+#pragma once
+
+#include <chrono>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "project/stores/Backend.hpp"
+#include "project/stores/Disk.hpp"
+
+namespace project::stores {
+
+/// Something in a project's text that is not as it should be.
+struct Fault {
+    enum class Kind {
+        Damage,    ///< a line or a batch that cannot be read; writes are refused until it is mended
+        Conflict,  ///< markers that a merge left; writes are refused until it is resolved
+        Irregular, ///< readable all the same, and put right by the next write: order, doubled addresses
+        TornTail,  ///< what a writer that died left behind; it does not count, and the next write drops it
+    };
+
+    Kind kind;
+    std::size_t line;    ///< counted from 1
+    std::string problem; ///< a clause in UTF-8
+};
+
+/// Keeps a project's definition in one text file, `.projectdata/project.jsonl` in the project's root.
+///
+/// docs/store.md tells the format, the order of steps of a write and what is promised. Nothing is read
+/// before the first guard, and nothing is written before the first batch.
+class PROJECT_STORES_EXPORT TextBackend : public Backend {
+public:
+    struct Options {
+        /// How long to wait for another writer, and for a text that is being written in pieces.
+        std::chrono::milliseconds patience = std::chrono::seconds(10);
+    };
+
+    /// The name of the store's folder in the project's root, ".projectdata".
+    static char16_t const* const folderName;
+
+    /// The name of the text in that folder, "project.jsonl".
+    static char16_t const* const textName;
+
+    /// @param disk the store's folder.
+    explicit TextBackend(std::unique_ptr<Disk> disk);
+    TextBackend(std::unique_ptr<Disk> disk, Options options);
+    /// Tidies, if this object has written and nobody else is writing.
+    ~TextBackend() override;
+
+    Changes enter(Access access) override;
+    void leave() noexcept override;
+    Children load(Address const& parent) override;
+    FileChanges write(Batch const& batch) override;
+    void keep() override;
+    void discard() noexcept override;
+
+    /// Writes the body anew without a tail, in canonical form. Without effect when the text is so already.
+    /// To be called with no guard open; waits for other writers.
+    /// @return true if the text was written.
+    bool tidy();
+
+    /// Sets damaged lines and batches aside into a file of their own in the store's folder, and writes the
+    /// text anew from all that can be read. To be called with no guard open.
+    /// @return the name of that file; empty when nothing is damaged.
+    /// @throws StoreError when a merge left its markers: those are for a person to settle.
+    std::string repair();
+
+    /// All faults of the text as it is on disk now, by line. To be called with no guard open.
+    std::vector<Fault> check();
+
+private:
+    class State;
+
+    std::unique_ptr<State> state_;
+};
+
+/// The Disk of a project on the file system.
+/// @param projectRoot the project's root folder, canonical; it must exist when the store is first used.
+PROJECT_STORES_EXPORT std::unique_ptr<Disk> makeSystemDisk(Path projectRoot);
+
+} // namespace project::stores
