@@ -24,12 +24,12 @@ struct MetadataPath::Step {
         delete list.load(std::memory_order_relaxed);
         auto above = std::move(parent);
         while (above && above.use_count() == 1) {
-            auto next = std::move(above->parent);
+            auto next = above->parent;
             above = std::move(next);
         }
     }
 
-    mutable std::shared_ptr<Step const> parent;
+    std::shared_ptr<Step const> parent;
     PathElement element;
     std::size_t depth;
     mutable std::atomic<Elements const*> list = nullptr;
@@ -105,6 +105,10 @@ PathElement MetadataPath::getLeaf() const {
 
 PathElement const& MetadataPath::leaf() const noexcept {
     return step_->element;
+}
+
+PathElement const& MetadataPath::operator[](std::size_t index) const noexcept {
+    return ascend(step_.get(), index + 1)->element;
 }
 
 std::size_t MetadataPath::depth() const noexcept {

@@ -39,6 +39,10 @@ public:
     /// The last step, without a copy. The address must not be the root's.
     PathElement const& leaf() const noexcept;
 
+    /// The step at an index counted from the root, without a copy. The index must be below depth(); costs a
+    /// pointer for each step behind it.
+    PathElement const& operator[](std::size_t index) const noexcept;
+
     /// How many steps there are; 0 for the root.
     std::size_t depth() const noexcept;
 

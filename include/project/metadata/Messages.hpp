@@ -1,0 +1,199 @@
+#pragma once
+
+#include <concepts>
+#include <string>
+
+#include "project/metadata/Export.hpp"
+#include "resource_core/BaseMsgID.hpp"
+
+/// The messages of the library, one class for each, in the catalog "ZEPHRA:project:management".
+///
+/// A class is named as its text is in src/metadata/messages, spelling included: the name is what finds the
+/// text. Its constructor takes the text's arguments in order, as UTF-16 text. ::project is written in full
+/// throughout, because project alone would be this namespace's own.
+namespace ZEPHRA::project::management {
+
+/// What a message takes for an argument: std::u16string, or a literal that makes one.
+template <class T>
+concept MessageText = std::convertible_to<T const&, std::u16string>;
+
+/// The catalog's name. The first call makes the texts known to fl::i18n::MessageCatalog, so that whoever can
+/// name a message also gets its text.
+PROJECT_METADATA_EXPORT std::string const& projectCatalog();
+
+/// The message whose text is the name of the default entry point group. It is no error.
+PROJECT_METADATA_EXPORT ::resource_core::BaseMsgID entryPointGroupDefaultName();
+
+/// The file or folder is not in the project.
+class PROJECT_METADATA_EXPORT FileNotInProject : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit FileNotInProject(Text const& path) : BaseMsgID(projectCatalog(), "FileNotInProject", 1) {
+        setArgument(0, std::u16string(path));
+    }
+};
+
+/// The path lies in the folder in which the store keeps its own files.
+class PROJECT_METADATA_EXPORT FileIsMetadataError : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit FileIsMetadataError(Text const& path) : BaseMsgID(projectCatalog(), "FileIsMetadataError", 1) {
+        setArgument(0, std::u16string(path));
+    }
+};
+
+/// The path lies outside the project's root.
+class PROJECT_METADATA_EXPORT FileNotInProjectRoot : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Path, MessageText ProjectRoot>
+    FileNotInProjectRoot(Path const& path, ProjectRoot const& projectRoot)
+        : BaseMsgID(projectCatalog(), "FileNotInProjectRoot", 2) {
+        setArgument(0, std::u16string(path));
+        setArgument(1, std::u16string(projectRoot));
+    }
+};
+
+/// The path lies below the root, but nothing is there on disk.
+class PROJECT_METADATA_EXPORT FileDoesNotExistError : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit FileDoesNotExistError(Text const& path)
+        : BaseMsgID(projectCatalog(), "FileDoesNotExistError", 1) {
+        setArgument(0, std::u16string(path));
+    }
+};
+
+/// The project's root cannot be taken out of its own project.
+class PROJECT_METADATA_EXPORT RootFolderNotRemoveable : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit RootFolderNotRemoveable(Text const& path)
+        : BaseMsgID(projectCatalog(), "RootFolderNotRemoveable", 1) {
+        setArgument(0, std::u16string(path));
+    }
+};
+
+/// There is an entry point group of this UUID already.
+class PROJECT_METADATA_EXPORT EntryPointGroupUUIDDefined : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit EntryPointGroupUUIDDefined(Text const& uuid)
+        : BaseMsgID(projectCatalog(), "EntryPointGroupUUIDDefined", 1) {
+        setArgument(0, std::u16string(uuid));
+    }
+};
+
+/// There is an entry point group of this name already.
+class PROJECT_METADATA_EXPORT EntryPointGroupNameDefined : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit EntryPointGroupNameDefined(Text const& name)
+        : BaseMsgID(projectCatalog(), "EntryPointGroupNameDefined", 1) {
+        setArgument(0, std::u16string(name));
+    }
+};
+
+/// No entry point type has this name. Always raised nested.
+class PROJECT_METADATA_EXPORT EntryPointTypeUndefined : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit EntryPointTypeUndefined(Text const& typeName)
+        : BaseMsgID(projectCatalog(), "EntryPointTypeUndefined", 1) {
+        setArgument(0, std::u16string(typeName));
+    }
+};
+
+/// The category is read-only.
+class PROJECT_METADATA_EXPORT CanNotModifyReadOnlyCategory : public ::resource_core::BaseMsgID {
+public:
+    CanNotModifyReadOnlyCategory() : BaseMsgID(projectCatalog(), "CanNotModifyReadOnlyCategory", 0) {}
+};
+
+/// The label is read-only.
+class PROJECT_METADATA_EXPORT CanNotModifyReadOnlyLabel : public ::resource_core::BaseMsgID {
+public:
+    CanNotModifyReadOnlyLabel() : BaseMsgID(projectCatalog(), "CanNotModifyReadOnlyLabel", 0) {}
+};
+
+/// There is no such category.
+class PROJECT_METADATA_EXPORT CategoryDoesNotExist : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit CategoryDoesNotExist(Text const& categoryName)
+        : BaseMsgID(projectCatalog(), "CategoryDoesNotExist", 1) {
+        setArgument(0, std::u16string(categoryName));
+    }
+};
+
+/// There is no category of this UUID.
+class PROJECT_METADATA_EXPORT CategoryDoesNotExistsByUUID : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit CategoryDoesNotExistsByUUID(Text const& uuid)
+        : BaseMsgID(projectCatalog(), "CategoryDoesNotExistsByUUID", 1) {
+        setArgument(0, std::u16string(uuid));
+    }
+};
+
+/// There is a category of this name already.
+class PROJECT_METADATA_EXPORT CategoryExistsByName : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit CategoryExistsByName(Text const& categoryName)
+        : BaseMsgID(projectCatalog(), "CategoryExistsByName", 1) {
+        setArgument(0, std::u16string(categoryName));
+    }
+};
+
+/// There is a label of this name in the category already.
+class PROJECT_METADATA_EXPORT LabelExistsByName : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText CategoryName, MessageText LabelName>
+    LabelExistsByName(CategoryName const& categoryName, LabelName const& labelName)
+        : BaseMsgID(projectCatalog(), "LabelExistsByName", 2) {
+        setArgument(0, std::u16string(categoryName));
+        setArgument(1, std::u16string(labelName));
+    }
+};
+
+/// There is no label of this UUID.
+class PROJECT_METADATA_EXPORT LabelDoesNotExistsByUUID : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit LabelDoesNotExistsByUUID(Text const& uuid)
+        : BaseMsgID(projectCatalog(), "LabelDoesNotExistsByUUID", 1) {
+        setArgument(0, std::u16string(uuid));
+    }
+};
+
+/// No label state has this name. Always raised nested.
+class PROJECT_METADATA_EXPORT LabelReadOnlyStateUndefined : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit LabelReadOnlyStateUndefined(Text const& stateName)
+        : BaseMsgID(projectCatalog(), "LabelReadOnlyStateUndefined", 1) {
+        setArgument(0, std::u16string(stateName));
+    }
+};
+
+/// The folder is on the project path already.
+class PROJECT_METADATA_EXPORT DuplicatePathEntryException : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit DuplicatePathEntryException(Text const& path)
+        : BaseMsgID(projectCatalog(), "DuplicatePathEntryException", 1) {
+        setArgument(0, std::u16string(path));
+    }
+};
+
+/// The folder is referenced as a project already.
+class PROJECT_METADATA_EXPORT DuplicateReferenceException : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit DuplicateReferenceException(Text const& path)
+        : BaseMsgID(projectCatalog(), "DuplicateReferenceException", 1) {
+        setArgument(0, std::u16string(path));
+    }
+};
+
+} // namespace ZEPHRA::project::management
