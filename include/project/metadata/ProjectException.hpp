@@ -1,6 +1,7 @@
 #pragma once
 
 #include <exception>
+#include <utility>
 
 #include "computils/exception/StackTraceRecordingException.hpp"
 #include "foundation/core/except/Exception.hpp"
@@ -32,9 +33,9 @@ template <class M>
 [[noreturn]] void raise(M const& message) {
     ProjectException base;
     base.getStackTrace().capture(0);
-    Raised<M> const error(base, message);
+    Raised<M> error(base, message);
     if (std::current_exception()) {
-        std::throw_with_nested(error);
+        std::throw_with_nested(std::move(error));
     }
     throw error;
 }

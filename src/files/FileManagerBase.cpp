@@ -1,0 +1,144 @@
+#include "files/FileManagerBase.hpp"
+
+#include <set>
+#include <utility>
+
+#include "files/PathSets.hpp"
+#include "files/Schema.hpp"
+#include "project/entrypoints/EntryPoint.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/metadata/ProjectException.hpp"
+
+namespace project::management {
+
+using metadata::MetadataNodeSpecification;
+using metadata::MetadataPath;
+using ZEPHRA::project::management::FileDoesNotExistError;
+using ZEPHRA::project::management::FileIsMetadataError;
+using ZEPHRA::project::management::FileNotInProject;
+using ZEPHRA::project::management::FileNotInProjectRoot;
+using ZEPHRA::project::management::RootFolderNotRemoveable;
+
+FileManagerBase::FileManagerBase(Path projectRoot, std::shared_ptr<metadata::MetadataManager> metadataManager)
+    : projectRoot_(std::move(projectRoot)), metadataManager_(std::move(metadataManager)),
+      fileStore_(std::make_unique<PathLocalizedFileMetadataManager>(projectRoot_, metadataManager_,
+                                                                    files::FILE_LIST_SCOPE)) {}
+
+FileManagerBase::~FileManagerBase() = default;
+
+void FileManagerBase::setEntryPointManager(EntryPointManager* entryPointManager) {
+    entryPointManager_ = entryPointManager;
+}
+
+void FileManagerBase::setLabelManager(LabelManager* labelManager) {
+    labelManager_ = labelManager;
+}
+
+Path FileManagerBase::getProjectRoot() {
+    return projectRoot_;
+}
+
+std::unique_ptr<FileMetadataManager>
+FileManagerBase::getFileMetadataManagerFor(std::u16string const& scope) {
+    return std::make_unique<PathLocalizedFileMetadataManager>(projectRoot_, metadataManager_, scope);
+}
+
+void FileManagerBase::add(std::vector<Path> const& files) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    FileNodes batch;
+    for (auto& path : withParentFolders(files, projectRoot_)) {
+        requireAddable(path);
+        // A new empty node also for what is in the project already: adding a file again drops its labels,
+        // and those of the folders above it. Callers count on a file that was just added being bare.
+        batch.emplace_hint(batch.end(), std::move(path),
+                           std::make_shared<MetadataNodeSpecification>(files::NODE));
+    }
+    fileStore_->setFileNodes(std::move(batch));
+}
+
+void FileManagerBase::requireAddable(Path const& path) const {
+    if (isFileInProject(path)) {
+        return; // also when it has gone from the disk
+    }
+    if (isMetadataFile(path)) {
+        exception::raise(FileIsMetadataError(path.native()));
+    }
+    if (!isWithinFolder(projectRoot_, path)) {
+        exception::raise(FileNotInProjectRoot(path.native(), projectRoot_.native()));
+    }
+    if (!metadata::exists(path)) {
+        exception::raise(FileDoesNotExistError(path.native()));
+    }
+}
+
+bool FileManagerBase::isMetadataFile(Path const& path) const {
+    return isWithinFolder(metadataManager_->getMetadataRoot(), path);
+}
+
+bool FileManagerBase::isFileInProject(Path const& path) const {
+    auto const guard = metadataManager_->acquireReadLock();
+    return path == projectRoot_ || fileStore_->hasFileNode(path);
+}
+
+std::vector<Path> FileManagerBase::remove(std::vector<Path> const& files) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    auto result = withAllDescendants(files);
+    requireRemovable(result);
+    removeEntryPointsOf(result);
+    removeFromEveryScope(files);
+    return result;
+}
+
+void FileManagerBase::requireRemovable(std::vector<Path> const& files) const {
+    for (auto const& path : files) {
+        if (!isFileInProject(path)) {
+            exception::raise(FileNotInProject(path.native()));
+        }
+        if (path == projectRoot_) {
+            exception::raise(RootFolderNotRemoveable(path.native()));
+        }
+    }
+}
+
+void FileManagerBase::removeEntryPointsOf(std::vector<Path> const& files) {
+    std::set<Path> entryPointFiles;
+    for (auto const& entryPoint : entryPointManager_->getEntryPoints()) {
+        entryPointFiles.insert(entryPoint->getFile());
+    }
+    for (auto const& path : files) {
+        if (entryPointFiles.contains(path)) {
+            entryPointManager_->removeEntryPoint(path);
+        }
+    }
+}
+
+void FileManagerBase::removeFromEveryScope(std::vector<Path> const& files) {
+    for (auto const& head : metadataManager_->getChildNodes(MetadataPath::root())) {
+        auto const leaf = head.getLeaf();
+        if (leaf.getType() == files::FILES) {
+            getFileMetadataManagerFor(leaf.getLocation())->removeFileNodes(files);
+        }
+    }
+}
+
+std::vector<Path> FileManagerBase::getChildProjectFiles(Path const& path) const {
+    auto const guard = metadataManager_->acquireReadLock();
+    return fileStore_->getChildFiles(path);
+}
+
+std::vector<Path> FileManagerBase::withAllDescendants(std::vector<Path> const& files) const {
+    return withDescendants(files, [this](Path const& path) { return getChildProjectFiles(path); });
+}
+
+std::vector<Path> FileManagerBase::getProjectFiles() const {
+    if (!isFileInProject(projectRoot_)) {
+        return {};
+    }
+    auto result = withAllDescendants({projectRoot_});
+    std::erase(result, projectRoot_);
+    return result;
+}
+
+} // namespace project::management

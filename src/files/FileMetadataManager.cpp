@@ -1,0 +1,7 @@
+#include "project/files/FileMetadataManager.hpp"
+
+namespace project::management {
+
+FileMetadataManager::~FileMetadataManager() = default;
+
+} // namespace project::management

@@ -1,0 +1,138 @@
+#include "files/PathLocalizedFileMetadataManager.hpp"
+
+#include <utility>
+
+#include "files/Schema.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/metadata/ProjectException.hpp"
+
+namespace project::management {
+
+using metadata::MetadataNode;
+using metadata::MetadataNodeSpecification;
+using metadata::MetadataPath;
+using metadata::PathElement;
+using ZEPHRA::project::management::FileNotInProject;
+
+PathLocalizedFileMetadataManager::PathLocalizedFileMetadataManager(
+    Path root, std::shared_ptr<metadata::MetadataManager> metadataManager, std::u16string scope)
+    : root_(std::move(root)), metadataManager_(std::move(metadataManager)), scope_(std::move(scope)) {}
+
+void PathLocalizedFileMetadataManager::setFileNodes(std::map<Path, std::shared_ptr<MetadataNode>> files) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    std::map<MetadataPath, std::shared_ptr<MetadataNode>> batch;
+    for (auto& [file, node] : files) {
+        addFileNode(file, std::move(node), batch);
+    }
+    metadataManager_->setNodes(batch);
+}
+
+std::map<Path, std::unique_ptr<MetadataNode>> PathLocalizedFileMetadataManager::getAllFileNodes() {
+    auto const guard = metadataManager_->acquireReadLock();
+    std::map<Path, std::unique_ptr<MetadataNode>> result;
+    auto const head = toMetadataPath(root_);
+    if (!metadataManager_->pathExists(head)) {
+        return result;
+    }
+    std::vector<MetadataPath> waiting{head};
+    while (!waiting.empty()) {
+        auto const path = std::move(waiting.back());
+        waiting.pop_back();
+        for (auto& child : metadataManager_->getChildNodes(path)) {
+            waiting.push_back(std::move(child));
+        }
+        if (isFileMetadataPath(path)) {
+            result.insert_or_assign(toFilePath(path), metadataManager_->getNode(path));
+        }
+    }
+    return result;
+}
+
+std::unique_ptr<MetadataNode> PathLocalizedFileMetadataManager::getFileNode(Path file) {
+    auto const guard = metadataManager_->acquireReadLock();
+    auto const path = toMetadataPath(file);
+    if (!metadataManager_->hasNode(path)) {
+        exception::raise(FileNotInProject(file.native()));
+    }
+    return metadataManager_->getNode(path);
+}
+
+bool PathLocalizedFileMetadataManager::hasFileNode(Path file) {
+    auto const guard = metadataManager_->acquireReadLock();
+    return isFileMetadataPath(toMetadataPath(file));
+}
+
+void PathLocalizedFileMetadataManager::removeFileNodes(std::vector<Path> files) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    std::vector<MetadataPath> paths;
+    paths.reserve(files.size());
+    for (auto const& file : files) {
+        paths.push_back(toMetadataPath(file));
+    }
+    metadataManager_->removeNodes(paths);
+}
+
+std::vector<Path> PathLocalizedFileMetadataManager::getExtraEntries() {
+    return {};
+}
+
+std::vector<Path> PathLocalizedFileMetadataManager::getChildFiles(Path file) {
+    auto const guard = metadataManager_->acquireReadLock();
+    std::vector<Path> result;
+    for (auto const& child : metadataManager_->getChildNodes(toMetadataPath(file))) {
+        if (isFileMetadataPath(child)) {
+            result.push_back(toFilePath(child));
+        }
+    }
+    return result;
+}
+
+MetadataPath PathLocalizedFileMetadataManager::toMetadataPath(Path const& file) const {
+    auto result = MetadataPath::root().child(PathElement(files::FILES, scope_));
+    if (file == root_) {
+        return result;
+    }
+    auto const relative = metadata::getRelativePath(root_, file);
+    for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
+        auto const element = fl::filesystem::detail::extract_first_element(rest);
+        result = result.child(PathElement(files::FILE, std::u16string(element)));
+    }
+    return result;
+}
+
+Path PathLocalizedFileMetadataManager::toFilePath(MetadataPath const& path) const {
+    auto result = root_;
+    for (std::size_t index = toMetadataPath(root_).depth(); index < path.depth(); ++index) {
+        auto const& location = path[index].getLocation();
+        if (!location.empty()) {
+            result /= location;
+        }
+    }
+    return result;
+}
+
+bool PathLocalizedFileMetadataManager::isFileMetadataPath(MetadataPath const& path) {
+    auto const guard = metadataManager_->acquireReadLock();
+    if (!metadataManager_->hasNode(path)) {
+        return false;
+    }
+    auto const leaf = path.getLeaf();
+    return leaf.getType() == files::FILES || leaf.getType() == files::FILE;
+}
+
+void PathLocalizedFileMetadataManager::addFileNode(Path const& file, std::shared_ptr<MetadataNode> node,
+                                                   std::map<MetadataPath, std::shared_ptr<MetadataNode>>& batch) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    auto const path = toMetadataPath(file);
+    // Files come in Path order, which is the order of their addresses, so the end is the place to try first.
+    batch.insert_or_assign(batch.end(), path, std::move(node));
+    if (metadata::is_directory(file)) {
+        auto marker = path.child(PathElement(files::DIR_SIGNIFIER, files::DIR_SIGNIFIER_LOCATION));
+        batch.insert_or_assign(batch.end(), std::move(marker),
+                               std::make_shared<MetadataNodeSpecification>(files::NODE));
+    }
+}
+
+} // namespace project::management
