@@ -1,0 +1,66 @@
+#pragma once
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <stdexcept>
+#include <string>
+
+#include "fl/filesystem/Path.hpp"
+
+namespace project::test {
+
+/// A fresh empty folder on disk, gone with all in it when the object goes.
+class TemporaryFolder {
+public:
+    TemporaryFolder() {
+        auto pattern = (std::filesystem::temp_directory_path() / "project-test-XXXXXX").string();
+        if (mkdtemp(pattern.data()) == nullptr) {
+            throw std::runtime_error("no temporary folder could be made at " + pattern);
+        }
+        folder_ = std::filesystem::canonical(pattern);
+    }
+
+    ~TemporaryFolder() {
+        std::error_code ignored;
+        std::filesystem::remove_all(folder_, ignored);
+    }
+
+    TemporaryFolder(TemporaryFolder const&) = delete;
+    TemporaryFolder& operator=(TemporaryFolder const&) = delete;
+
+    /// The folder as the system names it, canonical.
+    std::filesystem::path const& onDisk() const { return folder_; }
+
+    /// The folder as the library names it.
+    fl::filesystem::Path root() const { return fl::filesystem::fromSystem(folder_); }
+
+    /// The path of something below the folder, whether or not it is there.
+    fl::filesystem::Path path(std::u16string const& relative) const { return root() / relative; }
+
+    /// Makes a file, and the folders above it that are missing.
+    fl::filesystem::Path file(std::u16string const& relative, std::string const& content = "content") const {
+        auto const made = path(relative);
+        auto const onDisk = fl::filesystem::toSystem(made);
+        std::filesystem::create_directories(onDisk.parent_path());
+        std::ofstream(onDisk) << content;
+        return made;
+    }
+
+    /// Makes a folder, and those above it that are missing.
+    fl::filesystem::Path folder(std::u16string const& relative) const {
+        auto const made = path(relative);
+        std::filesystem::create_directories(fl::filesystem::toSystem(made));
+        return made;
+    }
+
+    /// Removes a file or a folder with all in it.
+    void remove(std::u16string const& relative) const {
+        std::filesystem::remove_all(fl::filesystem::toSystem(path(relative)));
+    }
+
+private:
+    std::filesystem::path folder_;
+};
+
+} // namespace project::test
