@@ -1,0 +1,24 @@
+#pragma once
+
+#include <string>
+
+#include "foundation/core/except/IException.hpp"
+
+namespace foundation::core::except {
+
+/// An exception whose text is meant for the user, in the user's language.
+class PROJECT_PLATFORM_EXPORT IUserException : public IException {
+public:
+    ~IUserException() override;
+
+    /// Puts the text, in the language that is set now, in place of what the string holds.
+    virtual void convert_str(std::u16string& text) const = 0;
+
+    /// The same in UTF-8; a lone surrogate becomes U+FFFD.
+    virtual void convert_str(std::string& text) const = 0;
+
+    /// The text in the language that is set now.
+    virtual std::u16string ToUstringImpl() const = 0;
+};
+
+} // namespace foundation::core::except

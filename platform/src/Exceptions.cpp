@@ -1,0 +1,26 @@
+#include <utility>
+
+#include "computils/exception/StackTraceRecordingException.hpp"
+#include "foundation/core/except/IMsgIDException.hpp"
+
+namespace foundation::core::except {
+
+// The destructors stand here so that each interface has its class information in one library only.
+IException::~IException() = default;
+IUserException::~IUserException() = default;
+IMsgIDException::~IMsgIDException() = default;
+
+std::string IMsgIDException::get_error_id(resource_core::BaseMsgID const& message) {
+    return message.getCatalogName() + ":" + message.getMessageName();
+}
+
+} // namespace foundation::core::except
+
+namespace computils::exception {
+
+StackTraceRecordingException::StackTraceRecordingException(std::u16string text) : text_(std::move(text)) {
+}
+
+StackTraceRecordingException::~StackTraceRecordingException() = default;
+
+} // namespace computils::exception
