@@ -1,0 +1,80 @@
+#include <gmock/gmock.h>
+
+#include "project/metadata/MetadataNodeSpecification.hpp"
+
+namespace project::metadata {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+TEST(MetadataNode, aKeyNeverPutReadsAsAnEmptyString) {
+    MetadataNodeSpecification const node;
+    EXPECT_EQ(node.get(u"absent"), u"");
+    EXPECT_THAT(node.getKeys(), IsEmpty());
+    EXPECT_THAT(node.getChildren(), IsEmpty());
+    EXPECT_EQ(node.getType(), u"");
+}
+
+TEST(MetadataNode, puttingAKeyAgainReplacesItsValue) {
+    MetadataNodeSpecification node(u"Info");
+    node.put(u"b", u"1");
+    node.put(u"a", u"2");
+    node.put(u"b", u"3");
+    EXPECT_EQ(node.get(u"b"), u"3");
+    EXPECT_THAT(node.getKeys(), ElementsAre(u"a", u"b"));
+}
+
+TEST(MetadataNode, childrenKeepTheOrderInWhichTheyWereAdded) {
+    MetadataNodeSpecification node;
+    auto* z = node.addChild(u"z");
+    z->put(u"key", u"value");
+    node.addChild(u"a");
+    ASSERT_EQ(node.getChildren().size(), 2U);
+    EXPECT_EQ(node.getChildren()[0].get(), z);
+    EXPECT_EQ(node.getChildren()[0]->get(u"key"), u"value");
+    EXPECT_EQ(node.getChildren()[1]->getType(), u"a");
+}
+
+TEST(MetadataNode, removingTheOnlyChildLeavesAnEmptyListAtOnce) {
+    MetadataNodeSpecification node;
+    node.removeChild(node.addChild(u"only"));
+    EXPECT_THAT(node.getChildren(), IsEmpty());
+}
+
+TEST(MetadataNode, removingWhatIsNoChildChangesNothing) {
+    MetadataNodeSpecification node;
+    node.addChild(u"child");
+    node.removeChild(&node);
+    node.removeChild(nullptr);
+    EXPECT_EQ(node.getChildren().size(), 1U);
+}
+
+TEST(MetadataNode, aCopyIsDeep) {
+    MetadataNodeSpecification node(u"Info");
+    node.put(u"key", u"value");
+    node.addChild(u"child")->addChild(u"grandchild");
+    MetadataNodeSpecification copy(static_cast<MetadataNode const&>(node));
+    EXPECT_TRUE(isEqual(node, copy));
+    copy.getChildren()[0]->put(u"key", u"changed");
+    EXPECT_FALSE(isEqual(node, copy));
+    EXPECT_EQ(node.getChildren()[0]->get(u"key"), u"");
+}
+
+TEST(MetadataNode, nodesDifferInTypeKeysValuesOrTheOrderOfChildren) {
+    MetadataNodeSpecification const plain(u"Info");
+    EXPECT_FALSE(isEqual(plain, MetadataNodeSpecification(u"Other")));
+    MetadataNodeSpecification emptyValue(u"Info");
+    emptyValue.put(u"key", u"");
+    EXPECT_FALSE(isEqual(plain, emptyValue));
+    MetadataNodeSpecification ab(u"Info");
+    ab.addChild(u"a");
+    ab.addChild(u"b");
+    MetadataNodeSpecification ba(u"Info");
+    ba.addChild(u"b");
+    ba.addChild(u"a");
+    EXPECT_FALSE(isEqual(ab, ba));
+}
+
+} // namespace
+} // namespace project::metadata
