@@ -6,15 +6,15 @@
 #include <string>
 #include <vector>
 
+#include "fl/filesystem/Path.hpp"
 #include "project/core/Export.hpp"
 #include "project/core/Unique.hpp"
 #include "project/entrypoints/EntryPointGroup.hpp"
 #include "project/entrypoints/EntryPointType.hpp"
-#include "project/metadata/MetadataFunctions.hpp"
 
 namespace project::management {
 
-using metadata::Path;
+using fl::filesystem::Path;
 
 /// The role of one project file in the project's life: what starts with it, ends with it or runs on demand.
 class PROJECT_MANAGEMENT_EXPORT EntryPoint : public Unique {

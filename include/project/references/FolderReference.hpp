@@ -2,13 +2,13 @@
 
 #include <string>
 
+#include "fl/filesystem/Path.hpp"
 #include "project/core/Export.hpp"
 #include "project/core/Unique.hpp"
-#include "project/metadata/MetadataFunctions.hpp"
 
 namespace project::management {
 
-using metadata::Path;
+using fl::filesystem::Path;
 
 /// A pointer from a project to a folder, in or outside of it: where the folder is on this machine, and the
 /// text that is stored for it. An immutable value.

@@ -1,0 +1,40 @@
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <vector>
+
+#include "project/core/FolderReferenceManager.hpp"
+#include "project/metadata/MetadataManager.hpp"
+#include "project/references/FolderReference.hpp"
+#include "references/FolderReferenceCustomization.hpp"
+
+namespace project::management {
+
+/// A list of folder references over a metadata store. Nothing is kept in memory: each query reads all
+/// references and works out anew where they lead.
+///
+/// A reference is stored under its UUID. One of a type that no reader of this list knows stays stored and is
+/// left out of every result.
+class FolderReferenceManagerBase : public FolderReferenceManager {
+public:
+    FolderReferenceManagerBase(std::unique_ptr<FolderReferenceCustomization> customization,
+                               std::shared_ptr<metadata::MetadataManager> metadataManager, Path projectRoot);
+
+    std::vector<FolderReference> getReferences() const override;
+    void addReferences(std::vector<FolderReference> const& references) override;
+    void removeReferences(std::vector<FolderReference> const& references) override;
+    bool isReference(Path const& path) const override;
+    std::optional<FolderReference> getRootReferenceFor(Path const& path) const override;
+
+private:
+    metadata::MetadataPath getReferencePath(FolderReference const& reference) const;
+    std::optional<FolderReference> readReference(metadata::MetadataPath const& path) const;
+    void checkDuplicates(std::vector<FolderReference> const& newReferences) const;
+
+    std::unique_ptr<FolderReferenceCustomization> customization_;
+    std::shared_ptr<metadata::MetadataManager> metadataManager_;
+    Path projectRoot_;
+};
+
+} // namespace project::management
