@@ -54,6 +54,29 @@ public:
         return made;
     }
 
+    /// The folder as the library names it.
+    fl::filesystem::Path path() const { return root(); }
+
+    /// The same for names as the system has them, which need not be UTF-8. @return the path on disk.
+    std::filesystem::path addFile(std::filesystem::path const& relative,
+                                  std::string const& content = {}) const {
+        auto const made = folder_ / relative;
+        std::filesystem::create_directories(made.parent_path());
+        std::ofstream(made, std::ios::binary) << content;
+        return made;
+    }
+
+    std::filesystem::path addFolder(std::filesystem::path const& relative) const {
+        std::filesystem::create_directories(folder_ / relative);
+        return folder_ / relative;
+    }
+
+    std::filesystem::path addLink(std::filesystem::path const& relative,
+                                  std::filesystem::path const& target) const {
+        std::filesystem::create_symlink(target, folder_ / relative);
+        return folder_ / relative;
+    }
+
     /// Removes a file or a folder with all in it.
     void remove(std::u16string const& relative) const {
         std::filesystem::remove_all(fl::filesystem::toSystem(path(relative)));
