@@ -1,0 +1,29 @@
+#pragma once
+
+#include <string>
+
+#include "project/core/Export.hpp"
+#include "project/core/Unique.hpp"
+#include "project/labels/CategoryIdentifier.hpp"
+#include "project/labels/LabelIdentifier.hpp"
+
+namespace project::management {
+
+/// A label together with its category, as it is put on files and as events tell of it.
+class PROJECT_MANAGEMENT_EXPORT Label : public Unique {
+public:
+    Label(CategoryIdentifier category, LabelIdentifier labelIdentifier);
+
+    /// The label's UUID, not that of its category.
+    std::u16string getUUID() const override;
+
+    CategoryIdentifier const& getCategory() const { return category_; }
+
+    LabelIdentifier const& getLabelIdentifier() const { return labelIdentifier_; }
+
+private:
+    LabelIdentifier labelIdentifier_;
+    CategoryIdentifier category_;
+};
+
+} // namespace project::management
