@@ -1,0 +1,242 @@
+// The label operations of FileManagerBase: which labels stand on which files.
+
+#include <algorithm>
+#include <iterator>
+#include <utility>
+
+#include "files/FileManagerBase.hpp"
+#include "files/Schema.hpp"
+#include "project/files/FileLabel.hpp"
+#include "project/files/LabelIDSet.hpp"
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/metadata/ProjectException.hpp"
+
+namespace project::management {
+
+using metadata::MetadataNode;
+using metadata::MetadataNodeSpecification;
+using metadata::MetadataPath;
+using metadata::PathElement;
+
+namespace {
+
+/// The children of a node as they are now, so that a loop over them may remove them.
+std::vector<MetadataNode*> childrenOf(MetadataNode const& node) {
+    std::vector<MetadataNode*> result;
+    result.reserve(node.getChildren().size());
+    for (auto const& child : node.getChildren()) {
+        result.push_back(child.get());
+    }
+    return result;
+}
+
+/// The first child of a type whose key has a value; null when there is none.
+MetadataNode* findChild(MetadataNode const& node, std::u16string_view type, std::u16string const& key,
+                        std::u16string const& value) {
+    for (auto const& child : node.getChildren()) {
+        if (child->getType() == type && child->get(key) == value) {
+            return child.get();
+        }
+    }
+    return nullptr;
+}
+
+MetadataNode* findCategory(MetadataNode const& fileNode, std::u16string const& uuid) {
+    return findChild(fileNode, files::CATEGORY, files::CATEGORY_UUID, uuid);
+}
+
+/// @return whether the label had data.
+bool removeLabelData(MetadataNode& dataNode, Label const& label) {
+    bool removed = false;
+    for (auto* const record : childrenOf(dataNode)) {
+        if (record->get(files::RECORD_UUID) == label.getUUID()) {
+            dataNode.removeChild(record);
+            removed = true;
+        }
+    }
+    return removed;
+}
+
+/// Takes one label off a file's node, and its data; one that is not there is passed over, data and all.
+/// @return whether the label had data.
+bool removeLabel(MetadataNode& fileNode, MetadataNode& dataNode, Label const& label) {
+    auto* const categoryNode = findCategory(fileNode, label.getCategory().getUUID());
+    if (categoryNode == nullptr) {
+        return false;
+    }
+    auto* const labelNode = findChild(*categoryNode, files::LABEL, files::LABEL_UUID, label.getUUID());
+    if (labelNode == nullptr) {
+        return false;
+    }
+    categoryNode->removeChild(labelNode);
+    if (categoryNode->getChildren().empty()) {
+        fileNode.removeChild(categoryNode);
+    }
+    return removeLabelData(dataNode, label);
+}
+
+void appendLabelIDSets(MetadataNode const& categoryNode, std::vector<LabelIDSet>& result) {
+    auto const& categoryUUID = categoryNode.get(files::CATEGORY_UUID);
+    if (categoryUUID.empty()) {
+        return;
+    }
+    for (auto const& child : categoryNode.getChildren()) {
+        auto const& labelUUID = child->get(files::LABEL_UUID);
+        if (child->getType() == files::LABEL && !labelUUID.empty()) {
+            result.emplace_back(categoryUUID, labelUUID);
+        }
+    }
+}
+
+} // namespace
+
+std::vector<FileLabel> FileManagerBase::addLabels(std::vector<Path> const& files,
+                                                  std::vector<Label> const& labels) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    std::vector<FileLabel> displaced;
+    FileNodes batch;
+    for (auto const& file : files) {
+        if (!isFileInProject(file) || isMetadataFile(file)) {
+            continue;
+        }
+        std::shared_ptr<MetadataNode> node = fileStore_->getFileNode(file);
+        for (auto const& label : labels) {
+            if (!hasLabel(file, label)) {
+                std::ranges::move(addLabelToNode(*node, label, file), std::back_inserter(displaced));
+            }
+        }
+        batch.insert_or_assign(file, std::move(node));
+    }
+    if (!batch.empty()) {
+        fileStore_->setFileNodes(std::move(batch));
+    }
+    return displaced;
+}
+
+bool FileManagerBase::hasLabel(Path const& path, Label const& label) {
+    // The label stands first here and the category first in what it is compared with, so this is true only
+    // for a label and a category of one UUID. addLabels depends on the false answer: putting on a label that
+    // is there displaces it and tells its data, or in a multi-valued category counts it once more.
+    LabelIDSet const pair(label.getUUID(), label.getCategory().getUUID());
+    auto const pairs = getLabelIDSets(path);
+    return std::ranges::find(pairs, pair) != pairs.end();
+}
+
+std::vector<FileLabel> FileManagerBase::addLabelToNode(MetadataNode& node, Label const& label,
+                                                       Path const& path) {
+    std::vector<FileLabel> displaced;
+    auto const& category = label.getCategory();
+    auto* categoryNode = findCategory(node, category.getUUID());
+    if (categoryNode == nullptr) {
+        categoryNode = node.addChild(files::CATEGORY);
+        categoryNode->put(files::CATEGORY_UUID, category.getUUID());
+    } else if (category.isSingleValued()) {
+        displaced = takeCategoryLabels(category, path, *categoryNode);
+    }
+    categoryNode->addChild(files::LABEL)->put(files::LABEL_UUID, label.getUUID());
+    return displaced;
+}
+
+std::vector<FileLabel> FileManagerBase::takeCategoryLabels(CategoryIdentifier const& category,
+                                                           Path const& path, MetadataNode& categoryNode) {
+    std::vector<FileLabel> taken;
+    for (auto* const child : childrenOf(categoryNode)) {
+        auto const uuid = child->get(files::LABEL_UUID);
+        try {
+            taken.emplace_back(category, labelManager_->getLabelByUUID(category, uuid), path,
+                               child->get(files::LABEL_VALUE));
+        } catch (exception::ProjectException const&) {
+            // A label that was deleted meanwhile can't be told of, and must not keep others from the file.
+        }
+        categoryNode.removeChild(child);
+    }
+    return taken;
+}
+
+void FileManagerBase::removeLabels(std::vector<Path> const& files, std::vector<Label> const& labels) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    FileNodes batch;
+    FileNodes dataBatch;
+    bool dataRemoved = false;
+    for (auto const& file : files) {
+        std::shared_ptr<MetadataNode> node = fileStore_->getFileNode(file);
+        std::shared_ptr<MetadataNode> dataNode = getLabelDataNode(file);
+        for (auto const& label : labels) {
+            dataRemoved |= removeLabel(*node, *dataNode, label);
+        }
+        batch.insert_or_assign(file, std::move(node));
+        dataBatch.insert_or_assign(file, std::move(dataNode));
+    }
+    fileStore_->setFileNodes(std::move(batch));
+    if (dataRemoved) {
+        writeLabelDataNodes(dataBatch);
+    }
+}
+
+std::vector<LabelIDSet> FileManagerBase::getLabelIDSets(Path const& path) {
+    auto const guard = metadataManager_->acquireReadLock();
+    std::vector<LabelIDSet> result;
+    auto const node = fileStore_->getFileNode(path);
+    for (auto const& child : node->getChildren()) {
+        if (child->getType() == files::CATEGORY) {
+            appendLabelIDSets(*child, result);
+        }
+    }
+    return result;
+}
+
+std::vector<FileLabel> FileManagerBase::getLabels(Path const& path) {
+    auto const guard = metadataManager_->acquireReadLock();
+    std::vector<FileLabel> result;
+    auto const dataNode = getLabelDataNode(path);
+    auto const& records = dataNode->getChildren();
+    for (auto const& pair : getLabelIDSets(path)) {
+        auto const category = labelManager_->getCategoryByUUID(pair.getCategoryUUID());
+        auto const label = labelManager_->getLabelByUUID(category, pair.getLabelUUID());
+        auto const record = std::ranges::find_if(records, [&](auto const& candidate) {
+            return candidate->get(files::RECORD_UUID) == pair.getLabelUUID();
+        });
+        if (record != records.end()) {
+            result.emplace_back(category, label, path, (*record)->get(files::RECORD_VALUE));
+        }
+        // Once more without data, whether or not there was a record: so every label on the file has an entry
+        // without data, by which callers count; who needs the data takes the first entry.
+        result.emplace_back(category, label, path);
+    }
+    return result;
+}
+
+void FileManagerBase::removeCategory(std::vector<Path> const& files, CategoryIdentifier const& category) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    auto const uuid = category.getUUID();
+    FileNodes batch;
+    for (auto const& file : files) {
+        std::shared_ptr<MetadataNode> node = fileStore_->getFileNode(file);
+        if (auto* const categoryNode = findCategory(*node, uuid)) {
+            node->removeChild(categoryNode);
+        }
+        batch.insert_or_assign(file, std::move(node));
+    }
+    fileStore_->setFileNodes(std::move(batch));
+}
+
+MetadataPath FileManagerBase::getLabelDataPath(Path const& path) const {
+    return fileStore_->toMetadataPath(path).child(PathElement(files::LABEL_DATA, files::LABEL_DATA_LOCATION));
+}
+
+std::unique_ptr<MetadataNode> FileManagerBase::getLabelDataNode(Path const& path) const {
+    auto const address = getLabelDataPath(path);
+    auto node = metadataManager_->pathExists(address) ? metadataManager_->getNode(address) : nullptr;
+    return node ? std::move(node) : std::make_unique<MetadataNodeSpecification>(files::NODE);
+}
+
+void FileManagerBase::writeLabelDataNodes(FileNodes const& nodes) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    std::map<MetadataPath, std::shared_ptr<MetadataNode>> batch;
+    for (auto const& [file, node] : nodes) {
+        batch.insert_or_assign(getLabelDataPath(file), node);
+    }
+    metadataManager_->setNodes(batch);
+}
+
+} // namespace project::management
