@@ -28,29 +28,46 @@ bool isPlainAscii(unsigned unit) noexcept {
 /// The letter of the two-byte escape of a character, or 0 when it has none.
 char shortEscape(unsigned unit) noexcept {
     switch (unit) {
-    case '"': return '"';
-    case '\\': return '\\';
-    case '\b': return 'b';
-    case '\f': return 'f';
-    case '\n': return 'n';
-    case '\r': return 'r';
-    case '\t': return 't';
-    default: return 0;
+    case '"':
+        return '"';
+    case '\\':
+        return '\\';
+    case '\b':
+        return 'b';
+    case '\f':
+        return 'f';
+    case '\n':
+        return 'n';
+    case '\r':
+        return 'r';
+    case '\t':
+        return 't';
+    default:
+        return 0;
     }
 }
 
 /// The character of a two-byte escape by its letter, or -1 when there is no such escape.
 int unescaped(char letter) noexcept {
     switch (letter) {
-    case '"': return '"';
-    case '\\': return '\\';
-    case '/': return '/';
-    case 'b': return '\b';
-    case 'f': return '\f';
-    case 'n': return '\n';
-    case 'r': return '\r';
-    case 't': return '\t';
-    default: return -1;
+    case '"':
+        return '"';
+    case '\\':
+        return '\\';
+    case '/':
+        return '/';
+    case 'b':
+        return '\b';
+    case 'f':
+        return '\f';
+    case 'n':
+        return '\n';
+    case 'r':
+        return '\r';
+    case 't':
+        return '\t';
+    default:
+        return -1;
     }
 }
 
@@ -134,9 +151,12 @@ char32_t decodeUtf8(std::string_view bytes) noexcept {
     auto const tail = [&](std::size_t i) { return static_cast<char32_t>(bytes[i]) & 0x3F; };
     auto const lead = static_cast<char32_t>(static_cast<unsigned char>(bytes[0]));
     switch (bytes.size()) {
-    case 2: return ((lead & 0x1F) << 6) | tail(1);
-    case 3: return ((lead & 0x0F) << 12) | (tail(1) << 6) | tail(2);
-    default: return ((lead & 0x07) << 18) | (tail(1) << 12) | (tail(2) << 6) | tail(3);
+    case 2:
+        return ((lead & 0x1F) << 6) | tail(1);
+    case 3:
+        return ((lead & 0x0F) << 12) | (tail(1) << 6) | tail(2);
+    default:
+        return ((lead & 0x07) << 18) | (tail(1) << 12) | (tail(2) << 6) | tail(3);
     }
 }
 
@@ -218,12 +238,13 @@ private:
     void noteUnit(unsigned unit, std::string_view digits, bool afterHigh) noexcept {
         bool const control = unit < 0x20 && shortEscape(unit) == 0;
         bool const lone = isHighSurrogate(unit) || (isLowSurrogate(unit) && !afterHigh);
-        bool const upper = std::any_of(digits.begin(), digits.end(), [](char c) { return c >= 'A' && c <= 'F'; });
+        bool const upper =
+            std::any_of(digits.begin(), digits.end(), [](char c) { return c >= 'A' && c <= 'F'; });
         canonical_ = canonical_ && (control || lone) && !upper;
     }
 
     bool canonical_ = true;
-    std::size_t endOfHigh_ = 0;
+    std::size_t endOfHigh_ = std::string_view::npos;
 };
 
 } // namespace
@@ -245,7 +266,7 @@ void appendJsonContent(std::string& out, std::u16string_view text) {
         char16_t const unit = text[i++];
         if (isHighSurrogate(unit) && i < text.size() && isLowSurrogate(text[i])) {
             appendUtf8(out, 0x10000 + ((char32_t{unit} - 0xD800) << 10) + (char32_t{text[i++]} - 0xDC00));
-        } else if (unit < 0x80 ? unit != 0x7F : isHighSurrogate(unit) || isLowSurrogate(unit)) {
+        } else if (unit < 0x80 || isHighSurrogate(unit) || isLowSurrogate(unit)) {
             appendEscaped(out, unit);
         } else {
             appendUtf8(out, unit);
