@@ -1,0 +1,81 @@
+#include <benchmark/benchmark.h>
+
+#include "GeneratedTree.hpp"
+#include "Process.hpp"
+#include "Ratios.hpp"
+#include "SqlitePeer.hpp"
+#include "project/core/FileManager.hpp"
+
+// Asking for one file of a project of 100,000.
+
+namespace project::benchmarks {
+namespace {
+
+constexpr std::size_t stride = 7919; // a prime, so that questions jump over the whole tree
+
+void lookUpInProject(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillProject();
+    auto const project = tree.openProject();
+    auto const& files = project->getFileManager();
+    benchmark::DoNotOptimize(files.getProjectFiles().size());
+    std::size_t next = 0;
+    for (auto _ : state) {
+        benchmark::DoNotOptimize(files.isFileInProject(tree.files()[next]));
+        next = (next + stride) % tree.files().size();
+    }
+}
+
+void lookUpInSqlite(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    std::vector<std::string> paths;
+    for (auto const& file : tree.files()) {
+        paths.push_back(fl::filesystem::toSystem(file).lexically_relative(tree.onDisk()).string());
+    }
+    auto const file = tree.onDisk() / ".lookup.db";
+    SqlitePeer peer(file);
+    peer.insert(paths);
+    std::size_t next = 0;
+    for (auto _ : state) {
+        benchmark::DoNotOptimize(peer.contains(paths[next]));
+        next = (next + stride) % paths.size();
+    }
+}
+
+std::string oneFile(GeneratedTree const& tree) {
+    return fl::filesystem::toSystem(tree.files()[stride]).string();
+}
+
+void lookUpByProcess(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillProject();
+    for (auto _ : state) {
+        runSilently(tree.onDisk(), {PROJECTCTL, "list", oneFile(tree)});
+    }
+}
+
+void lookUpByGit(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillRepository();
+    for (auto _ : state) {
+        runSilently(
+            {"git", "-C", tree.onDisk().string(), "ls-files", "--error-unmatch", "--", oneFile(tree)});
+    }
+}
+
+[[maybe_unused]] bool const registered = [] {
+    benchmark::RegisterBenchmark("lookup/project", lookUpInProject)->UseRealTime();
+    benchmark::RegisterBenchmark("lookup/sqlite", lookUpInSqlite)->UseRealTime();
+    auto const repeat = [](benchmark::internal::Benchmark* made) {
+        made->Iterations(5)->Repetitions(5)->UseRealTime()->Unit(benchmark::kMillisecond);
+    };
+    repeat(benchmark::RegisterBenchmark("lookup/projectctl", lookUpByProcess));
+    repeat(benchmark::RegisterBenchmark("lookup/git-ls-files", lookUpByGit));
+    Ratios::compare("isFileInProject to one SELECT by key", "lookup/project", {"lookup/sqlite"});
+    Ratios::compare("one file by a new projectctl to git ls-files of it", "lookup/projectctl",
+                    {"lookup/git-ls-files"});
+    return true;
+}();
+
+} // namespace
+} // namespace project::benchmarks
