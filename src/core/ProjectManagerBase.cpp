@@ -24,8 +24,10 @@ std::u16string const ProjectManagerBase::ROOT_EXTENSTION = u"Extensions";
 std::u16string const ProjectManagerBase::TYPE_EXTENSTION = u"Extension";
 std::u16string const ProjectManagerBase::INFORMATION = u"Information";
 
-ProjectManagerBase::ProjectManagerBase(Path projectRoot, std::shared_ptr<metadata::MetadataManager> metadataManager)
-    : metadataManager_(std::move(metadataManager)), projectRoot_(std::move(projectRoot)),
+ProjectManagerBase::ProjectManagerBase(Path projectRoot,
+                                       std::shared_ptr<metadata::MetadataManager> metadataManager)
+    : metadataManager_(std::move(metadataManager)),
+      projectRoot_(std::move(projectRoot)),
       fileManager_(std::make_unique<FileManagerBase>(projectRoot_, metadataManager_)),
       labelManager_(std::make_unique<LabelManagerBase>(metadataManager_, fileManager_.get())),
       entryPointManager_(
@@ -103,7 +105,8 @@ std::u16string ProjectManagerBase::read(MetadataPath const& path, std::u16string
     return node ? node->get(key) : std::u16string();
 }
 
-void ProjectManagerBase::write(MetadataPath const& path, std::u16string const& key, std::u16string const& value) {
+void ProjectManagerBase::write(MetadataPath const& path, std::u16string const& key,
+                               std::u16string const& value) {
     auto const guard = metadataManager_->acquireWriteLock();
     auto const node = std::make_shared<MetadataNodeSpecification>();
     node->put(key, value);

@@ -22,9 +22,11 @@ using ZEPHRA::project::management::FileNotInProjectRoot;
 using ZEPHRA::project::management::RootFolderNotRemoveable;
 
 FileManagerBase::FileManagerBase(Path projectRoot, std::shared_ptr<metadata::MetadataManager> metadataManager)
-    : projectRoot_(std::move(projectRoot)), metadataManager_(std::move(metadataManager)),
+    : projectRoot_(std::move(projectRoot)),
+      metadataManager_(std::move(metadataManager)),
       fileStore_(std::make_unique<PathLocalizedFileMetadataManager>(projectRoot_, metadataManager_,
-                                                                    files::FILE_LIST_SCOPE)) {}
+                                                                    files::FILE_LIST_SCOPE)) {
+}
 
 FileManagerBase::~FileManagerBase() = default;
 
@@ -40,8 +42,7 @@ Path FileManagerBase::getProjectRoot() {
     return projectRoot_;
 }
 
-std::unique_ptr<FileMetadataManager>
-FileManagerBase::getFileMetadataManagerFor(std::u16string const& scope) {
+std::unique_ptr<FileMetadataManager> FileManagerBase::getFileMetadataManagerFor(std::u16string const& scope) {
     return std::make_unique<PathLocalizedFileMetadataManager>(projectRoot_, metadataManager_, scope);
 }
 

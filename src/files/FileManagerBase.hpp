@@ -35,7 +35,8 @@ public:
     std::vector<Path> getProjectFiles() const override;
 
     // The label operations stand in FileManagerLabels.cpp.
-    std::vector<FileLabel> addLabels(std::vector<Path> const& files, std::vector<Label> const& labels) override;
+    std::vector<FileLabel> addLabels(std::vector<Path> const& files,
+                                     std::vector<Label> const& labels) override;
     void removeLabels(std::vector<Path> const& files, std::vector<Label> const& labels) override;
     std::vector<LabelIDSet> getLabelIDSets(Path const& path) override;
     std::vector<FileLabel> getLabels(Path const& path) override;

@@ -18,7 +18,8 @@ using ZEPHRA::project::management::FileNotInProject;
 
 PathLocalizedFileMetadataManager::PathLocalizedFileMetadataManager(
     Path root, std::shared_ptr<metadata::MetadataManager> metadataManager, std::u16string scope)
-    : root_(std::move(root)), metadataManager_(std::move(metadataManager)), scope_(std::move(scope)) {}
+    : root_(std::move(root)), metadataManager_(std::move(metadataManager)), scope_(std::move(scope)) {
+}
 
 void PathLocalizedFileMetadataManager::setFileNodes(std::map<Path, std::shared_ptr<MetadataNode>> files) {
     auto const guard = metadataManager_->acquireWriteLock();
@@ -122,8 +123,9 @@ bool PathLocalizedFileMetadataManager::isFileMetadataPath(MetadataPath const& pa
     return leaf.getType() == files::FILES || leaf.getType() == files::FILE;
 }
 
-void PathLocalizedFileMetadataManager::addFileNode(Path const& file, std::shared_ptr<MetadataNode> node,
-                                                   std::map<MetadataPath, std::shared_ptr<MetadataNode>>& batch) {
+void PathLocalizedFileMetadataManager::addFileNode(
+    Path const& file, std::shared_ptr<MetadataNode> node,
+    std::map<MetadataPath, std::shared_ptr<MetadataNode>>& batch) {
     auto const guard = metadataManager_->acquireWriteLock();
     auto const path = toMetadataPath(file);
     // Files come in Path order, which is the order of their addresses, so the end is the place to try first.

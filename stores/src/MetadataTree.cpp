@@ -61,7 +61,8 @@ struct MetadataTree::UndoSteps {
     std::vector<Step> steps;
 };
 
-MetadataTree::MetadataTree(Loader loader) : loader_(std::move(loader)), root_(std::make_unique<Place>()) {}
+MetadataTree::MetadataTree(Loader loader) : loader_(std::move(loader)), root_(std::make_unique<Place>()) {
+}
 
 MetadataTree::~MetadataTree() = default;
 

@@ -21,7 +21,8 @@ namespace {
 
 /// The caller's node is copied, so that nothing the caller does with it later changes the store.
 Node copyOf(MetadataNode const& node) {
-    return isEqual(node, *plainNode()) ? plainNode() : std::make_shared<MetadataNodeSpecification const>(node);
+    return isEqual(node, *plainNode()) ? plainNode()
+                                       : std::make_shared<MetadataNodeSpecification const>(node);
 }
 
 /// True while a batch is written and not yet kept.
@@ -43,7 +44,8 @@ private:
 class TreeMetadataManager::State {
 public:
     State(std::unique_ptr<Backend> storage, Path root)
-        : backend(std::move(storage)), metadataRoot(std::move(root)),
+        : backend(std::move(storage)),
+          metadataRoot(std::move(root)),
           tree([this](Address const& address) { return backend->load(address); }),
           lock({[this](Access access) { enter(access); }, [this] { backend->leave(); }}) {}
 
@@ -106,7 +108,8 @@ void TreeMetadataManager::State::write(MetadataManager& store, Batch const& batc
 }
 
 TreeMetadataManager::TreeMetadataManager(std::unique_ptr<Backend> backend, Path metadataRoot)
-    : state_(std::make_unique<State>(std::move(backend), std::move(metadataRoot))) {}
+    : state_(std::make_unique<State>(std::move(backend), std::move(metadataRoot))) {
+}
 
 TreeMetadataManager::~TreeMetadataManager() = default;
 
@@ -185,9 +188,8 @@ void TreeMetadataManager::createPaths(std::vector<Address>& paths) {
     state_->requireNotWriting();
     Batch batch;
     for (auto const& path : paths) {
-        bool const comesAnyway = std::any_of(batch.begin(), batch.end(), [&](Change const& change) {
-            return change.address.isWithin(path);
-        });
+        bool const comesAnyway = std::any_of(
+            batch.begin(), batch.end(), [&](Change const& change) { return change.address.isWithin(path); });
         if (path.depth() > 0 && !comesAnyway && !state_->tree.exists(path)) {
             batch.push_back({Change::Kind::Make, path, nullptr});
         }

@@ -33,7 +33,8 @@ protected:
     }
 
     MetadataPath at(std::u16string const& relative) const {
-        return PathLocalizedFileMetadataManager(folder.root(), store, u"Root").toMetadataPath(folder.path(relative));
+        return PathLocalizedFileMetadataManager(folder.root(), store, u"Root")
+            .toMetadataPath(folder.path(relative));
     }
 
     /// Puts something on a file's node that only a new node drops.
@@ -191,8 +192,9 @@ TEST_F(FileManagerBaseTest, aFileIsFoundUnderTheReadLock) {
 TEST_F(FileManagerBaseTest, projectFilesAreInPathOrderAFolderBeforeItsContents) {
     files.add({folder.file(u"b.txt"), folder.file(u"B"), folder.file(u"b/z"), folder.file(u"b/Z")});
 
-    EXPECT_THAT(files.getProjectFiles(), ElementsAre(folder.path(u"B"), folder.path(u"b"), folder.path(u"b/Z"),
-                                                     folder.path(u"b/z"), folder.path(u"b.txt")));
+    EXPECT_THAT(files.getProjectFiles(),
+                ElementsAre(folder.path(u"B"), folder.path(u"b"), folder.path(u"b/Z"), folder.path(u"b/z"),
+                            folder.path(u"b.txt")));
 }
 
 TEST_F(FileManagerBaseTest, projectFilesAreReadWithoutAGuardAcrossTheWalk) {
@@ -202,8 +204,8 @@ TEST_F(FileManagerBaseTest, projectFilesAreReadWithoutAGuardAcrossTheWalk) {
     files.getProjectFiles();
 
     auto const asked = store->calls("acquireReadLock");
-    auto const outermost = std::count_if(asked.begin(), asked.end(),
-                                         [](auto const& call) { return call.guard == Guard::None; });
+    auto const outermost =
+        std::count_if(asked.begin(), asked.end(), [](auto const& call) { return call.guard == Guard::None; });
     EXPECT_EQ(outermost, 4); // of the root's test, and of the children of the root, a, and a/b
 }
 
@@ -218,7 +220,9 @@ class AnsweringOtherwise : public FileManagerBase {
 public:
     using FileManagerBase::FileManagerBase;
 
-    bool isFileInProject(Path const& path) const override { return answer && FileManagerBase::isFileInProject(path); }
+    bool isFileInProject(Path const& path) const override {
+        return answer && FileManagerBase::isFileInProject(path);
+    }
 
     std::vector<Path> getChildProjectFiles(Path const& path) const override {
         return path.native().ends_with(u"/added") ? std::vector<Path>{}
@@ -303,7 +307,8 @@ TEST_F(FileManagerBaseTest, anEntryPointGoesBeforeAnyNodeOfItsFile) {
 TEST_F(FileManagerBaseTest, aFileIsRemovedFromEveryScope) {
     files.add({folder.file(u"a/b")});
     auto const other = files.getFileMetadataManagerFor(u"Other");
-    other->setFileNodes({{folder.path(u"a/b"), std::make_shared<metadata::MetadataNodeSpecification>(u"Info")}});
+    other->setFileNodes(
+        {{folder.path(u"a/b"), std::make_shared<metadata::MetadataNodeSpecification>(u"Info")}});
     store->clear();
 
     files.remove({folder.path(u"a")});

@@ -31,7 +31,8 @@ protected:
     }
 
     test::TemporaryFolder folder;
-    std::shared_ptr<test::RecordingMetadataManager> store = std::make_shared<test::RecordingMetadataManager>();
+    std::shared_ptr<test::RecordingMetadataManager> store =
+        std::make_shared<test::RecordingMetadataManager>();
     PathLocalizedFileMetadataManager files{folder.root(), store, u"Root"};
     MetadataPath const head = address({{u"Files", u"Root"}});
 };
@@ -167,9 +168,8 @@ TEST_F(PathLocalizedFileMetadataManagerTest, anythingUnknownHasNoChildren) {
 }
 
 TEST_F(PathLocalizedFileMetadataManagerTest, allFileNodesAreListedAtAnyDepthAndNothingElse) {
-    files.setFileNodes(Nodes{{folder.root(), node()},
-                             {folder.folder(u"src"), node()},
-                             {folder.file(u"src/a"), node()}});
+    files.setFileNodes(
+        Nodes{{folder.root(), node()}, {folder.folder(u"src"), node()}, {folder.file(u"src/a"), node()}});
     store->put(files.toMetadataPath(folder.path(u"src/a")).child({u"LabelData", u"Data"}), {});
     store->put(head.child({u"Other", u"x"}).child({u"File", u"y"}), {});
 
@@ -179,8 +179,8 @@ TEST_F(PathLocalizedFileMetadataManagerTest, allFileNodesAreListedAtAnyDepthAndN
         listed.push_back(path);
     }
 
-    EXPECT_THAT(listed, ElementsAre(folder.root(), folder.path(u"src"), folder.path(u"src/a"),
-                                    folder.path(u"x/y")));
+    EXPECT_THAT(listed,
+                ElementsAre(folder.root(), folder.path(u"src"), folder.path(u"src/a"), folder.path(u"x/y")));
 }
 
 TEST_F(PathLocalizedFileMetadataManagerTest, allFileNodesAreReadUnderOneReadLockWithOneCallForEachAddress) {

@@ -238,7 +238,8 @@ TEST_P(MetadataManagerContract, aWriterTakesTheReadLockAgainAndOthersWaitForTheO
 
 class Listener : public metadata::FileChangeRequestListener {
 public:
-    void fileRemovalRequested(metadata::MetadataManager&, Path const&, std::vector<Path> const& files) override {
+    void fileRemovalRequested(metadata::MetadataManager&, Path const&,
+                              std::vector<Path> const& files) override {
         told.push_back("removal");
         removed.insert(removed.end(), files.begin(), files.end());
         act();
@@ -317,7 +318,8 @@ TEST_P(MetadataManagerContract, whatAListenerThrowsUndoesTheWriteAndReachesTheCa
     listener->act = [] { throw std::runtime_error("source control is locked"); };
     store.subscribe(listener);
 
-    EXPECT_THROW(set({{a, node(u"new")}, {at({{u"New", u"x"}, {u"New", u"y"}}), node()}}), std::runtime_error);
+    EXPECT_THROW(set({{a, node(u"new")}, {at({{u"New", u"x"}, {u"New", u"y"}}), node()}}),
+                 std::runtime_error);
     EXPECT_THROW(remove({ab, at({{u"Top", u"z"}})}), std::runtime_error);
 
     listener->act = [] {};
@@ -344,8 +346,11 @@ TEST_P(MetadataManagerContract, readersShareTheStoreWhileItIsLoaded) {
     Nodes nodes;
     for (int folderNumber = 0; folderNumber < 20; ++folderNumber) {
         for (int file = 0; file < 20; ++file) {
-            auto const name = [](int number) { return std::u16string(1, static_cast<char16_t>(u'a' + number)); };
-            nodes.emplace(at({{u"Files", u"Root"}, {u"File", name(folderNumber)}, {u"File", name(file)}}), node());
+            auto const name = [](int number) {
+                return std::u16string(1, static_cast<char16_t>(u'a' + number));
+            };
+            nodes.emplace(at({{u"Files", u"Root"}, {u"File", name(folderNumber)}, {u"File", name(file)}}),
+                          node());
         }
     }
     store.setNodes(nodes);
@@ -373,7 +378,7 @@ INSTANTIATE_TEST_SUITE_P(
                               [](Path const& root) {
                                   return std::make_unique<TextBackend>(makeSystemDisk(root));
                               }}),
-    [](auto const& info) { return info.param.name; });
+    [](auto const& kind) { return kind.param.name; });
 
 } // namespace
 } // namespace project::stores
