@@ -22,7 +22,7 @@ public:
     virtual metadata::MetadataPath getRootPath() const = 0;
 
     /// Throws the error that tells that a folder is in the list already; never returns.
-    virtual void throwDuplicate(Path const& location) const = 0;
+    [[noreturn]] virtual void throwDuplicate(Path const& location) const = 0;
 
     /// The readers to ask, in this order. They live as long as this object.
     virtual std::vector<std::unique_ptr<FolderReferenceReader>> const& getReaders() const = 0;

@@ -1,0 +1,314 @@
+#include "entrypoints/EntryPointManagerBase.hpp"
+
+#include <algorithm>
+#include <utility>
+
+#include "entrypoints/EntryPointBase.hpp"
+#include "entrypoints/EntryPointGroupBase.hpp"
+#include "entrypoints/Schema.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/metadata/MetadataPathBuilder.hpp"
+#include "project/metadata/ProjectException.hpp"
+
+namespace project::management {
+
+using metadata::MetadataNode;
+using metadata::MetadataNodeSpecification;
+using metadata::MetadataPath;
+using metadata::MetadataPathBuilder;
+using ZEPHRA::project::management::EntryPointGroupNameDefined;
+using ZEPHRA::project::management::EntryPointGroupUUIDDefined;
+using ZEPHRA::project::management::FileNotInProject;
+
+namespace {
+
+MetadataPath entryPointsHead() {
+    return MetadataPathBuilder().add(entrypoints::ENTRY_POINTS, entrypoints::HEAD_LOCATION).build();
+}
+
+MetadataPath entryPointPath(std::u16string const& uuid) {
+    return MetadataPathBuilder().add(entryPointsHead()).add(entrypoints::ENTRY_POINT, uuid).build();
+}
+
+MetadataPath groupsHead() {
+    return MetadataPathBuilder().add(entrypoints::GROUPS, entrypoints::HEAD_LOCATION).build();
+}
+
+MetadataPath groupPath(std::u16string const& uuid) {
+    return MetadataPathBuilder().add(groupsHead()).add(entrypoints::GROUP, uuid).build();
+}
+
+std::unique_ptr<EntryPointGroup>
+findGroup(std::map<std::u16string, std::unique_ptr<EntryPointGroup>> const& groups,
+          std::u16string const& storedUUID) {
+    auto const found = groups.find(storedUUID.empty() ? entrypoints::DEFAULT_GROUP_UUID : storedUUID);
+    if (found == groups.end()) {
+        // The group was deleted, or comes with another branch that is yet to be merged. The entry point goes
+        // without until then; its stored UUID stays.
+        return nullptr;
+    }
+    return std::make_unique<EntryPointGroupBase>(found->second->getName(), found->second->getUUID());
+}
+
+std::map<std::u16string, std::u16string> readExtensionData(MetadataNode const& node) {
+    std::map<std::u16string, std::u16string> result;
+    for (auto const& child : node.getChildren()) {
+        if (child->getType() == entrypoints::EXTENSION) {
+            result[child->get(entrypoints::EXTENSION_NAME_KEY)] =
+                child->get(entrypoints::EXTENSION_VALUE_KEY);
+        }
+    }
+    return result;
+}
+
+void addExtensionData(MetadataNode& node, EntryPoint const& entryPoint) {
+    for (auto const& key : entryPoint.getExtensionKeys()) {
+        auto* const child = node.addChild(entrypoints::EXTENSION);
+        child->put(entrypoints::EXTENSION_NAME_KEY, key);
+        if (auto const value = entryPoint.getExtensionData(key)) {
+            child->put(entrypoints::EXTENSION_VALUE_KEY, *value);
+        }
+    }
+}
+
+} // namespace
+
+EntryPointManagerBase::EntryPointManagerBase(std::shared_ptr<metadata::MetadataManager> metadataManager,
+                                             FileManager* fileManager, Path projectRoot)
+    : metadataManager_(std::move(metadataManager)),
+      fileManager_(fileManager),
+      projectRoot_(std::move(projectRoot)) {
+}
+
+void EntryPointManagerBase::setEntryPoint(EntryPoint& entryPoint) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    requireInProject(entryPoint.getFile());
+    writeEntryPoint(entryPoint);
+}
+
+std::vector<std::unique_ptr<EntryPoint>> EntryPointManagerBase::getEntryPoints() {
+    auto const guard = metadataManager_->acquireReadLock();
+    auto const groups = getGroupMap();
+    std::vector<std::unique_ptr<EntryPoint>> result;
+    for (auto const& path : getEntryPointNodes()) {
+        if (auto entryPoint = readEntryPoint(path, groups)) {
+            result.push_back(std::move(entryPoint));
+        }
+    }
+    return result;
+}
+
+std::unique_ptr<EntryPoint> EntryPointManagerBase::getEntryPoint(Path file) {
+    auto const guard = metadataManager_->acquireReadLock();
+    auto const uuid = findUUIDForFile(file);
+    if (uuid.empty()) {
+        // For any file, also for one outside the project: the caller edits what it gets and sets it, and only
+        // setting it requires the file to be in the project.
+        return std::make_unique<EntryPointDefinition>(file);
+    }
+    return readEntryPoint(entryPointPath(uuid), getGroupMap());
+}
+
+void EntryPointManagerBase::removeEntryPoint(Path file) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    requireInProject(file);
+    auto const storedFile = getStoredFile(file);
+    std::vector<MetadataPath> found;
+    for (auto const& path : getEntryPointNodes()) {
+        auto const node = metadataManager_->getNode(path);
+        if (node && node->get(entrypoints::FILE_KEY) == storedFile) {
+            found.push_back(path);
+        }
+    }
+    if (!found.empty()) {
+        metadataManager_->removeNodes(found);
+    }
+}
+
+std::vector<std::unique_ptr<EntryPointGroup>> EntryPointManagerBase::getEntryPointGroups() {
+    auto const guard = metadataManager_->acquireReadLock();
+    std::vector<std::unique_ptr<EntryPointGroup>> result;
+    result.push_back(getDefaultGroup());
+    auto const head = groupsHead();
+    if (!metadataManager_->pathExists(head)) {
+        return result;
+    }
+    for (auto const& path : metadataManager_->getChildNodes(head)) {
+        auto const leaf = path.getLeaf();
+        if (leaf.getType() != entrypoints::GROUP) {
+            continue;
+        }
+        if (auto const node = metadataManager_->getNode(path)) {
+            auto const& name = node->get(entrypoints::GROUP_NAME_KEY);
+            result.push_back(std::make_unique<EntryPointGroupBase>(name, leaf.getLocation()));
+        }
+    }
+    return result;
+}
+
+void EntryPointManagerBase::deleteEntryPointGroup(EntryPointGroup const& group) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    auto const uuid = group.getUUID();
+    std::vector<MetadataPath> found;
+    for (auto const& path : metadataManager_->getChildNodes(groupsHead())) {
+        auto const leaf = path.getLeaf();
+        if (leaf.getType() == entrypoints::GROUP && leaf.getLocation() == uuid) {
+            found.push_back(path);
+        }
+    }
+    metadataManager_->removeNodes(found);
+}
+
+void EntryPointManagerBase::createEntryPointGroup(EntryPointGroup const& group) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    checkNewGroup(group);
+    EntryPointGroupDefinition stored(group);
+    stored.generateUUIDIfNotSet();
+    writeGroup(stored);
+}
+
+void EntryPointManagerBase::renameEntryPointGroup(EntryPointGroup const& group,
+                                                  std::u16string const& newName) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    auto const uuid = group.getUUID();
+    if (uuid.empty() || hasGroup(uuid, newName)) {
+        return;
+    }
+    for (auto const& listed : getEntryPointGroups()) {
+        if (listed->getName() == newName) {
+            exception::raise(EntryPointGroupNameDefined(newName));
+        }
+    }
+    // Whether the group is stored is not asked: this is how the default group, which has no node, gets a name
+    // of its own.
+    writeGroup(EntryPointGroupBase(newName, uuid));
+}
+
+void EntryPointManagerBase::requireInProject(Path const& file) const {
+    if (!fileManager_->isFileInProject(file)) {
+        exception::raise(FileNotInProject(file.native()));
+    }
+}
+
+std::u16string EntryPointManagerBase::getStoredFile(Path const& file) const {
+    auto result = metadata::getRelativePath(projectRoot_, file);
+    // One spelling on every system that opens the project, since entry points are found by this text. A name
+    // that holds a backslash itself pays for it: its entry point leads elsewhere when it is read.
+    std::replace(result.begin(), result.end(), u'\\', u'/');
+    return result;
+}
+
+std::vector<MetadataPath> EntryPointManagerBase::getEntryPointNodes() const {
+    auto const head = entryPointsHead();
+    if (!metadataManager_->pathExists(head)) {
+        return {};
+    }
+    return metadataManager_->getChildNodes(head);
+}
+
+std::u16string EntryPointManagerBase::findUUIDForFile(Path const& file) const {
+    auto const storedFile = getStoredFile(file);
+    for (auto const& path : getEntryPointNodes()) {
+        auto const node = metadataManager_->getNode(path);
+        if (node && node->get(entrypoints::FILE_KEY) == storedFile) {
+            return path.getLeaf().getLocation();
+        }
+    }
+    return {};
+}
+
+std::u16string EntryPointManagerBase::getUUIDToWrite(EntryPoint const& entryPoint) const {
+    // A UUID that is given is taken without a look at other nodes: an entry point that was read and edited
+    // goes back to its own node, also when it stands on another file by now.
+    if (auto uuid = entryPoint.getUUID(); !uuid.empty()) {
+        return uuid;
+    }
+    if (auto uuid = findUUIDForFile(entryPoint.getFile()); !uuid.empty()) {
+        return uuid;
+    }
+    return EntryPointDefinition(entryPoint).generateUUIDIfNotSpecified().getUUID();
+}
+
+std::unique_ptr<EntryPoint> EntryPointManagerBase::readEntryPoint(MetadataPath const& path,
+                                                                  GroupMap const& groups) const {
+    auto const node = metadataManager_->getNode(path);
+    if (!node) {
+        return nullptr;
+    }
+    auto file = projectRoot_ / node->get(entrypoints::FILE_KEY);
+    // Asked before anything else is read, so that a damaged entry of a file that has left the project does
+    // not spoil the whole list.
+    if (!fileManager_->isFileInProject(file)) {
+        return nullptr;
+    }
+    return std::make_unique<EntryPointBase>(
+        std::move(file), getFromName(node->get(entrypoints::TYPE_KEY)), node->get(entrypoints::NAME_KEY),
+        path.getLeaf().getLocation(), node->get(entrypoints::VISIBLE_KEY) != entrypoints::HIDDEN,
+        findGroup(groups, node->get(entrypoints::GROUP_UUID_KEY)), readExtensionData(*node));
+}
+
+void EntryPointManagerBase::writeEntryPoint(EntryPoint const& entryPoint) {
+    auto const uuid = getUUIDToWrite(entryPoint);
+    auto const node = std::make_shared<MetadataNodeSpecification>(entrypoints::NODE);
+    node->put(entrypoints::FILE_KEY, getStoredFile(entryPoint.getFile()));
+    node->put(entrypoints::NAME_KEY, entryPoint.getName());
+    node->put(entrypoints::TYPE_KEY, toString(entryPoint.getType()));
+    node->put(entrypoints::VISIBLE_KEY, entryPoint.isVisible() ? entrypoints::VISIBLE : entrypoints::HIDDEN);
+    // Without a group nothing is stored, which reads as the default group: writing back an entry point whose
+    // group was deleted brings it there.
+    if (auto const group = entryPoint.getGroup()) {
+        node->put(entrypoints::GROUP_UUID_KEY, group->getUUID());
+    }
+    addExtensionData(*node, entryPoint);
+    write(entryPointPath(uuid), node);
+}
+
+EntryPointManagerBase::GroupMap EntryPointManagerBase::getGroupMap() {
+    GroupMap result;
+    for (auto& group : getEntryPointGroups()) {
+        // The later one of a UUID counts: once the default group was renamed it is listed twice, and entry
+        // points show the name that it was given.
+        auto uuid = group->getUUID();
+        result.insert_or_assign(std::move(uuid), std::move(group));
+    }
+    return result;
+}
+
+bool EntryPointManagerBase::hasGroup(std::u16string const& uuid, std::u16string const& name) {
+    auto const groups = getEntryPointGroups();
+    return std::any_of(groups.begin(), groups.end(), [&](auto const& group) {
+        return group->getUUID() == uuid && group->getName() == name;
+    });
+}
+
+void EntryPointManagerBase::checkNewGroup(EntryPointGroup const& group) {
+    auto const name = group.getName();
+    auto const uuid = group.getUUID();
+    // Also when a subclass lists groups without it, the default group's name is taken.
+    if (auto const defaultName = getDefaultGroup()->getName(); name == defaultName) {
+        exception::raise(EntryPointGroupNameDefined(defaultName));
+    }
+    for (auto const& listed : getEntryPointGroups()) {
+        if (listed->getName() == name) {
+            exception::raise(EntryPointGroupNameDefined(name));
+        }
+        if (listed->getUUID() == uuid) {
+            exception::raise(EntryPointGroupUUIDDefined(uuid));
+        }
+    }
+}
+
+void EntryPointManagerBase::writeGroup(EntryPointGroup const& group) {
+    auto const node = std::make_shared<MetadataNodeSpecification>(entrypoints::NODE);
+    node->put(entrypoints::GROUP_NAME_KEY, group.getName());
+    write(groupPath(group.getUUID()), node);
+}
+
+void EntryPointManagerBase::write(MetadataPath const& path, std::shared_ptr<MetadataNode> node) {
+    std::map<MetadataPath, std::shared_ptr<MetadataNode>> batch{{path, std::move(node)}};
+    metadataManager_->setNodes(batch);
+}
+
+} // namespace project::management

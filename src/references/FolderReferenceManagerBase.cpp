@@ -1,0 +1,145 @@
+#include "references/FolderReferenceManagerBase.hpp"
+
+#include <algorithm>
+#include <iterator>
+#include <map>
+#include <utility>
+
+#include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/metadata/MetadataPathBuilder.hpp"
+#include "references/Schema.hpp"
+
+namespace project::management {
+
+using metadata::MetadataNode;
+using metadata::MetadataNodeSpecification;
+using metadata::MetadataPath;
+using metadata::MetadataPathBuilder;
+
+namespace {
+
+std::vector<Path> sortedLocations(std::vector<FolderReference> const& folders) {
+    std::vector<Path> result;
+    result.reserve(folders.size());
+    for (auto const& reference : folders) {
+        result.push_back(reference.getLocation());
+    }
+    std::sort(result.begin(), result.end());
+    return result;
+}
+
+std::shared_ptr<MetadataNode> makeNode(FolderReference const& reference) {
+    auto const node = std::make_shared<MetadataNodeSpecification>(references::NODE);
+    node->put(references::STORED_PATH_KEY, reference.getStoredPath());
+    node->put(references::TYPE_KEY, reference.getType());
+    return node;
+}
+
+} // namespace
+
+FolderReferenceManagerBase::FolderReferenceManagerBase(
+    std::unique_ptr<FolderReferenceCustomization> customization,
+    std::shared_ptr<metadata::MetadataManager> metadataManager, Path projectRoot)
+    : customization_(std::move(customization)),
+      metadataManager_(std::move(metadataManager)),
+      projectRoot_(std::move(projectRoot)) {
+}
+
+std::vector<FolderReference> FolderReferenceManagerBase::getReferences() const {
+    auto const guard = metadataManager_->acquireReadLock();
+    auto const head = customization_->getRootPath();
+    if (!metadataManager_->pathExists(head)) {
+        return {};
+    }
+    std::vector<FolderReference> result;
+    for (auto const& path : metadataManager_->getChildNodes(head)) {
+        if (path.getLeaf().getType() != references::REFERENCE) {
+            continue;
+        }
+        if (auto reference = readReference(path)) {
+            result.push_back(std::move(*reference));
+        }
+    }
+    return result;
+}
+
+void FolderReferenceManagerBase::addReferences(std::vector<FolderReference> const& newReferences) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    checkDuplicates(newReferences);
+    std::vector<MetadataPath> head{customization_->getRootPath()};
+    metadataManager_->createPaths(head);
+    std::map<MetadataPath, std::shared_ptr<MetadataNode>> batch;
+    for (auto const& reference : newReferences) {
+        customization_->validateReference(reference);
+        batch.insert_or_assign(getReferencePath(reference), makeNode(reference));
+    }
+    metadataManager_->setNodes(batch);
+}
+
+void FolderReferenceManagerBase::removeReferences(std::vector<FolderReference> const& oldReferences) {
+    auto const guard = metadataManager_->acquireWriteLock();
+    std::vector<MetadataPath> stored;
+    for (auto const& reference : oldReferences) {
+        auto path = getReferencePath(reference);
+        if (metadataManager_->pathExists(path)) {
+            stored.push_back(std::move(path));
+        }
+    }
+    metadataManager_->removeNodes(stored);
+}
+
+bool FolderReferenceManagerBase::isReference(Path const& path) const {
+    auto const guard = metadataManager_->acquireReadLock();
+    auto const all = getReferences();
+    return std::any_of(all.begin(), all.end(),
+                       [&](FolderReference const& reference) { return reference.getLocation() == path; });
+}
+
+std::optional<FolderReference> FolderReferenceManagerBase::getRootReferenceFor(Path const& path) const {
+    auto const guard = metadataManager_->acquireReadLock();
+    // The first one in the store's order, not the nearest: of nested references the answer is the same one
+    // for every folder below both.
+    for (auto const& reference : getReferences()) {
+        auto const& location = reference.getLocation();
+        if (metadata::isParent(path, location) || location == path) {
+            return reference;
+        }
+    }
+    return std::nullopt;
+}
+
+MetadataPath FolderReferenceManagerBase::getReferencePath(FolderReference const& reference) const {
+    return MetadataPathBuilder()
+        .add(customization_->getRootPath())
+        .add(references::REFERENCE, reference.getUUID())
+        .build();
+}
+
+std::optional<FolderReference> FolderReferenceManagerBase::readReference(MetadataPath const& path) const {
+    auto const node = metadataManager_->getNode(path);
+    if (!node) {
+        return std::nullopt;
+    }
+    auto const& type = node->get(references::TYPE_KEY);
+    for (auto const& reader : customization_->getReaders()) {
+        if (reader->canRead(type)) {
+            return reader->read(node->get(references::STORED_PATH_KEY), path.getLeaf().getLocation());
+        }
+    }
+    return std::nullopt;
+}
+
+void FolderReferenceManagerBase::checkDuplicates(std::vector<FolderReference> const& newReferences) const {
+    auto const existing = sortedLocations(getReferences());
+    auto const added = sortedLocations(newReferences);
+    // Only what is stored counts: two new references to one folder are both stored, each under its own UUID.
+    std::vector<Path> duplicates;
+    std::set_intersection(existing.begin(), existing.end(), added.begin(), added.end(),
+                          std::back_inserter(duplicates));
+    if (!duplicates.empty()) {
+        customization_->throwDuplicate(duplicates.front());
+    }
+}
+
+} // namespace project::management

@@ -1,0 +1,56 @@
+#include "references/FolderReferenceReader.hpp"
+
+#include <utility>
+
+namespace project::management {
+
+namespace {
+
+Path canonicalIfPossible(Path path) {
+    try {
+        return fl::filesystem::canonical(path, Path());
+    } catch (...) {
+        // One folder that the disk can't tell about must not keep all the other references from being read.
+        return path;
+    }
+}
+
+} // namespace
+
+std::u16string const& absoluteReferenceType() {
+    static std::u16string const type = u"Absolute";
+    return type;
+}
+
+std::u16string const& relativeReferenceType() {
+    static std::u16string const type = u"Relative";
+    return type;
+}
+
+FolderReferenceReader::~FolderReferenceReader() = default;
+
+bool AbsoluteFolderReferenceReader::canRead(std::u16string const& type) const {
+    return type == absoluteReferenceType();
+}
+
+FolderReference AbsoluteFolderReferenceReader::read(std::u16string const& storedPath,
+                                                    std::u16string const& uuid) const {
+    // Not canonical, as the relative reader's location is: callers find an absolute reference again, in
+    // isReference and when it is shown, by the text that somebody chose for it.
+    return FolderReference(Path(storedPath), absoluteReferenceType(), storedPath, uuid);
+}
+
+RelativeFolderReferenceReader::RelativeFolderReferenceReader(Path root) : root_(std::move(root)) {
+}
+
+bool RelativeFolderReferenceReader::canRead(std::u16string const& type) const {
+    return type == relativeReferenceType();
+}
+
+FolderReference RelativeFolderReferenceReader::read(std::u16string const& storedPath,
+                                                    std::u16string const& uuid) const {
+    return FolderReference(canonicalIfPossible(root_ / storedPath), relativeReferenceType(), storedPath,
+                           uuid);
+}
+
+} // namespace project::management
