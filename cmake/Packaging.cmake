@@ -1,0 +1,22 @@
+# Installs the libraries and headers, the CMake package project_management and the pkg-config file
+# project-management.
+include(CMakePackageConfigHelpers)
+
+set(package_folder "${CMAKE_INSTALL_LIBDIR}/cmake/project_management")
+install(TARGETS project_platform project_metadata project_management project_stores
+  EXPORT project_management LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}")
+install(EXPORT project_management NAMESPACE project:: DESTINATION "${package_folder}"
+  FILE project_managementTargets.cmake)
+install(DIRECTORY platform/include/ include/ stores/include/ DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+
+configure_package_config_file(packaging/project_managementConfig.cmake.in
+  "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfig.cmake" INSTALL_DESTINATION "${package_folder}")
+write_basic_package_version_file("${CMAKE_CURRENT_BINARY_DIR}/project_managementConfigVersion.cmake"
+  COMPATIBILITY SameMinorVersion)
+install(FILES
+  "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfig.cmake"
+  "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfigVersion.cmake"
+  DESTINATION "${package_folder}")
+
+configure_file(packaging/project-management.pc.in "${CMAKE_CURRENT_BINARY_DIR}/project-management.pc" @ONLY)
+install(FILES "${CMAKE_CURRENT_BINARY_DIR}/project-management.pc" DESTINATION "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
