@@ -1,0 +1,33 @@
+#pragma once
+
+#include <cstddef>
+#include <string>
+#include <utility>
+
+#include "fl/i18n/MessageCatalog.hpp"
+#include "resource_core/BaseMsgID.hpp"
+
+/// The compiled texts of tests/platform/messages, as the build puts them into the test program.
+extern "C" __attribute__((visibility("hidden"))) unsigned char const platform_test_messages[];
+
+namespace project::test {
+
+/// A message of the catalog that the tests of the platform bring along, with any arguments.
+class TestMessage : public resource_core::BaseMsgID {
+public:
+    template <class... Arguments>
+    explicit TestMessage(std::string name, Arguments const&... arguments)
+        : BaseMsgID(catalog(), std::move(name), sizeof...(arguments)) {
+        std::size_t slot = 0;
+        (setArgument(slot++, arguments), ...);
+    }
+
+private:
+    static std::string catalog() {
+        fl::i18n::MessageCatalog::registerCatalog("test:platform", "platform_test_messages",
+                                                  platform_test_messages);
+        return "test:platform";
+    }
+};
+
+} // namespace project::test

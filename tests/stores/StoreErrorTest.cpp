@@ -1,0 +1,53 @@
+#include "project/stores/StoreError.hpp"
+
+#include <type_traits>
+
+#include "project/metadata/ProjectException.hpp"
+
+namespace project::stores {
+namespace {
+
+// Managers drop some of the library's own errors as stale data; a failing disk must never be taken for that.
+static_assert(!std::is_base_of_v<exception::ProjectException, StoreError>);
+
+TEST(StoreError, namesTheFileTheLineTheProblemAndTheRemedy) {
+    StoreError const error("/p/project.jsonl", 12, "the line is damaged", "Restore it from source control.");
+
+    EXPECT_STREQ(error.what(), "/p/project.jsonl:12: the line is damaged. Restore it from source control.");
+    EXPECT_EQ(error.getFile(), "/p/project.jsonl");
+    EXPECT_EQ(error.getLine(), 12u);
+    EXPECT_EQ(error.getProblem(), "the line is damaged");
+    EXPECT_EQ(error.getRemedy(), "Restore it from source control.");
+}
+
+TEST(StoreError, leavesOutWhatIsNotThere) {
+    EXPECT_STREQ(StoreError("/p", 0, "no permission", "Ask the owner.").what(),
+                 "/p: no permission. Ask the owner.");
+    EXPECT_STREQ(StoreError("", 0, "the disk is full", "").what(), "the disk is full.");
+    EXPECT_STREQ(StoreError("", 5, "the disk is full", "").what(), "the disk is full.");
+}
+
+TEST(StoreError, recordsWhereItWasMadeAndACopyKeepsThat) {
+    StoreError const error("/p", 0, "no permission", "");
+    StoreError const copy(error);
+
+    EXPECT_FALSE(error.getStackTrace().getFrames().empty());
+    EXPECT_EQ(copy.getStackTrace().getFrames(), error.getStackTrace().getFrames());
+    EXPECT_STREQ(copy.what(), error.what());
+}
+
+TEST(StoreError, isCaughtAsAStandardExceptionButNotAsAnErrorOfTheProject) {
+    EXPECT_THROW(throw StoreError("", 0, "x", ""), std::exception);
+    EXPECT_THROW(
+        {
+            try {
+                throw StoreError("", 0, "x", "");
+            } catch (exception::ProjectException const&) {
+                FAIL() << "it was taken for stale data";
+            }
+        },
+        StoreError);
+}
+
+} // namespace
+} // namespace project::stores
