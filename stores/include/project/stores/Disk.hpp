@@ -2,8 +2,6 @@
 
 #include <chrono>
 #include <cstdint>
-#include <functional>
-#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -26,33 +24,49 @@ struct FileIdentity {
     bool isSameFile(FileIdentity const& other) const noexcept {
         return device == other.device && inode == other.inode;
     }
+
+    /// True for the same state under perhaps another name: giving a file a name changes the time `changed`.
+    bool isSameState(FileIdentity const& other) const noexcept {
+        return isSameFile(other) && size == other.size && modified == other.modified;
+    }
 };
 
+/// What was read of a file.
 struct FileContent {
     std::string bytes;
-    FileIdentity identity; ///< of the file that was read, as it was after reading
+    FileIdentity identity; ///< from before the reading, so that what changed meanwhile shows at the next look
+};
+
+/// A file as the disk left it after writing.
+struct WrittenFile {
+    FileIdentity identity;
+    bool isStamped; ///< its time is one that no other write gives it, so that any other write shows
 };
 
 /// The store's folder on disk, and all that a text backend does there.
 ///
 /// Names are plain file names in that folder. Nothing follows a symbolic link, opens anything but a regular
-/// file, or reaches outside the folder. Every operation throws StoreError, naming the file, when the system
-/// fails it; results tell what is no failure. One thread at a time.
+/// file, or reaches outside the folder. Every operation but those on the path and the clock needs the folder
+/// open. All throw StoreError, naming the file, when the system fails them; results tell what is no failure.
+/// One thread at a time.
 class PROJECT_STORES_EXPORT Disk {
 public:
     virtual ~Disk() = default;
 
-    /// The folder's path for messages, absolute, in UTF-8.
+    /// The folder's path, absolute, as the system has it.
     virtual std::string folder() const = 0;
 
     /// Opens the folder that the path from the project's root leads to now, unless it is the one already
-    /// open. @return false when nothing is there. Throws when it is no folder or cannot be opened.
+    /// open. Opening another one lets the lock go. @return false when nothing is there. Throws when it is no
+    /// folder or cannot be opened.
     virtual bool openFolder() = 0;
 
-    /// Makes the folder and makes its entry in the root durable. Opens it. One that exists is opened only.
-    virtual void makeFolder() = 0;
+    /// Makes the folder and makes its entry in the root durable. Opens it. @return false when it was there
+    /// already, and was opened only.
+    virtual bool makeFolder() = 0;
 
-    /// Removes the folder if it is empty, and closes it. Never throws: what cannot be removed stays.
+    /// Removes the folder if it is empty, and closes it, which lets the lock go. Never throws: what cannot
+    /// be removed stays.
     virtual void removeFolder() noexcept = 0;
 
     /// True when the path from the project's root still leads to the open folder.
@@ -66,22 +80,26 @@ public:
     /// an empty text.
     virtual std::string lockHolder() = 0;
 
-    /// The state of a file now: one system call. Empty when it is not there.
+    /// The state of the file that the path from the project's root leads to now, whatever folder is open:
+    /// one system call. Empty when nothing is there.
+    virtual std::optional<FileIdentity> identifyByPath(std::string const& name) = 0;
+
+    /// The state of a file in the open folder. Empty when it is not there.
     virtual std::optional<FileIdentity> identify(std::string const& name) = 0;
 
     /// Everything in a file from an offset on. Empty when it is not there.
     virtual std::optional<FileContent> read(std::string const& name, std::uint64_t offset) = 0;
 
-    /// Appends to a file that must still be in the state given, in one write. Not durable before sync.
-    /// When it throws, a part of the bytes may stand in the file.
+    /// Appends to a file that must still be in the state given, in one write, and stamps it. Not durable
+    /// before sync. When it throws, a part of the bytes may stand in the file, but never all of them.
     /// @return the state afterwards; empty, with nothing written, when the file is in another state.
-    virtual std::optional<FileIdentity> append(std::string const& name, FileIdentity const& expected,
-                                               std::string_view bytes) = 0;
+    virtual std::optional<WrittenFile> append(std::string const& name, FileIdentity const& expected,
+                                              std::string_view bytes) = 0;
 
-    /// Makes a new file with this content, with mode and owner of the file named like, if any. Not durable
-    /// before sync. Throws when the name is taken; what a failure leaves of it is removed again.
-    virtual FileIdentity create(std::string const& name, std::string_view bytes,
-                                std::optional<std::string> const& like) = 0;
+    /// Makes a new file with this content, stamped, with mode and owner of the file named like, if any. Not
+    /// durable before sync. Throws when the name is taken; what a failure leaves of it is removed again.
+    virtual WrittenFile create(std::string const& name, std::string_view bytes,
+                               std::optional<std::string> const& like) = 0;
 
     /// Makes durable what append or create last wrote, through the same open file, whatever its name leads
     /// to by now.
@@ -93,6 +111,9 @@ public:
 
     /// Gives a file another name, replacing what has it.
     virtual void rename(std::string const& from, std::string const& to) = 0;
+
+    /// Gives whatever has a name another one. @return false, with nothing changed, when that one is taken.
+    virtual bool renameToFree(std::string const& from, std::string const& to) = 0;
 
     /// Removes a file. @return false when it is not there.
     virtual bool remove(std::string const& name) = 0;

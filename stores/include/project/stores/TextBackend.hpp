@@ -17,10 +17,11 @@ struct Fault {
         Conflict,  ///< markers that a merge left; writes are refused until it is resolved
         Irregular, ///< readable all the same, and put right by the next write: order, doubled addresses
         TornTail,  ///< what a writer that died left behind; it does not count, and the next write drops it
+        Displaced, ///< a file beside the text that somebody else put where the store needed room
     };
 
     Kind kind;
-    std::size_t line;    ///< counted from 1
+    std::size_t line;    ///< counted from 1; 0 where no line is meant
     std::string problem; ///< a clause in UTF-8
 };
 
@@ -33,6 +34,13 @@ public:
     struct Options {
         /// How long to wait for another writer, and for a text that is being written in pieces.
         std::chrono::milliseconds patience = std::chrono::seconds(10);
+
+        /// A text whose body is not longer than this many bytes is written anew by every batch. Rewriting
+        /// that much costs little more than appending to it.
+        std::size_t alwaysRewritten = 256 * 1024;
+
+        /// Batches are appended as long as all of them together are not longer than the body divided by this.
+        std::size_t bodyToTail = 16;
     };
 
     /// The name of the store's folder in the project's root, ".projectdata".
@@ -57,6 +65,7 @@ public:
     /// Writes the body anew without a tail, in canonical form. Without effect when the text is so already.
     /// To be called with no guard open; waits for other writers.
     /// @return true if the text was written.
+    /// @throws StoreError when the text is damaged, or a merge left its markers.
     bool tidy();
 
     /// Sets damaged lines and batches aside into a file of their own in the store's folder, and writes the
@@ -65,7 +74,7 @@ public:
     /// @throws StoreError when a merge left its markers: those are for a person to settle.
     std::string repair();
 
-    /// All faults of the text as it is on disk now, by line. To be called with no guard open.
+    /// All faults of the text as it is on disk now, by line. To be called with no guard open. Takes no lock.
     std::vector<Fault> check();
 
 private:

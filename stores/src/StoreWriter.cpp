@@ -1,0 +1,220 @@
+#include "StoreWriter.hpp"
+
+#include <utility>
+
+#include "Leftovers.hpp"
+#include "StoreFiles.hpp"
+
+namespace project::stores {
+
+void StoreWriter::append(std::string_view lines) {
+    auto const before = seen_.identity();
+    if (!isInPlace(before)) {
+        throwReplaced();
+    }
+    auto const written = disk_.append(StoreFiles::text, before, lines);
+    if (!written) {
+        throwReplaced();
+    }
+    try {
+        disk_.sync();
+    } catch (StoreError const& failure) {
+        takeBack(written->identity, failure);
+        throw;
+    }
+    if (!isInPlace(before)) {
+        if (!disk_.isFolderInPlace()) {
+            // It was moved away with the batch in it, which must not come back with it.
+            takeBack(written->identity, StoreError(pathOfText(), 0, "was moved away", ""));
+        }
+        throwReplaced();
+    }
+    seen_.appended(lines, *written);
+}
+
+void StoreWriter::rewrite(ProjectText next) {
+    if (!isInPlace(seen_.identity())) {
+        throwReplaced();
+    }
+    auto const replacement = put(next.body(), seen_.identity());
+    if (!replacement) {
+        throwReplaced();
+    }
+    if (!isInPlace(replacement->file.identity)) {
+        withdraw(*replacement);
+        throwReplaced();
+    }
+    try {
+        disk_.syncFolder();
+    } catch (StoreError const& failure) {
+        takeBack(replacement->file.identity, failure);
+        if (replacement->old) {
+            removeOwn(*replacement->old, seen_.identity());
+        }
+        throw;
+    }
+    if (replacement->old) {
+        removeOwn(*replacement->old, seen_.identity());
+    }
+    seen_.replaced(std::move(next), replacement->file);
+}
+
+void StoreWriter::requireKnownOutcome() const {
+    if (isOutcomeUnknown_) {
+        throw StoreError(pathOfText(), 0,
+                         "is not written any more, since an earlier write failed so that nobody can tell "
+                         "whether its batch is in the project",
+                         "Open the project anew, and look whether the last change is there.");
+    }
+}
+
+/// Writes a whole text and puts it in the place of the file that is expected there.
+/// @return nothing when another file is there, which stays there.
+std::optional<StoreWriter::Put> StoreWriter::put(std::string_view bytes, FileIdentity const& expected) {
+    auto name = StoreFiles::newTemporary();
+    auto const file = disk_.create(name, bytes, StoreFiles::text);
+    try {
+        disk_.sync();
+        auto const swapping = StoreFiles::swapping(expected, file.identity);
+        if (!disk_.renameToFree(name, swapping)) {
+            throw StoreError(disk_.folder() + "/" + swapping, 0, "stands in the way of a new text",
+                             "Move it away and try again.");
+        }
+        name = swapping;
+        return swapIn(name, file, expected);
+    } catch (StoreError const&) {
+        removeOwn(name, file.identity);
+        throw;
+    }
+}
+
+std::optional<StoreWriter::Put> StoreWriter::swapIn(std::string const& name, WrittenFile const& file,
+                                                    FileIdentity const& expected) {
+    if (identifyRegular(StoreFiles::text) != expected) {
+        removeOwn(name, file.identity);
+        return std::nullopt;
+    }
+    bool const exchanged = disk_.exchange(name, StoreFiles::text);
+    if (!exchanged) {
+        disk_.rename(name, StoreFiles::text);
+    } else if (auto const old = identifyRegular(name); !old || !old->isSameState(expected)) {
+        putBack(name, file.identity);
+        return std::nullopt;
+    }
+    // A new name changes one of the file's times.
+    auto const now = identifyRegular(StoreFiles::text);
+    bool const isKnown = now && now->isSameState(file.identity);
+    return Put{{isKnown ? *now : file.identity, isKnown && file.isStamped},
+               exchanged ? std::optional(name) : std::nullopt};
+}
+
+/// What came out was not what was read: somebody put it there at the last moment, and it goes there again.
+void StoreWriter::putBack(std::string const& name, FileIdentity const& ours) {
+    bool isBack = false;
+    try {
+        isBack = disk_.exchange(name, StoreFiles::text);
+    } catch (StoreError const&) {
+        // told below
+    }
+    if (!isBack) {
+        isOutcomeUnknown_ = true;
+        auto const aside = setAside(disk_, name);
+        throw StoreError(pathOfText(), 0,
+                         "was replaced by another program while a batch was written, and its text could not "
+                         "be put back: it is " +
+                             aside + " now, and the text in the project has the batch",
+                         "Compare the two files and keep what is right.");
+    }
+    if (!removeOwn(name, ours)) {
+        setAside(disk_, name); // yet another one came in between
+    }
+}
+
+/// The path leads elsewhere now. Where the folder was moved away, the batch must not come back with it.
+void StoreWriter::withdraw(Put const& put) {
+    if (!put.old) {
+        return;
+    }
+    if (!disk_.isFolderInPlace()) {
+        putBack(*put.old, put.file.identity);
+    } else {
+        removeOwn(*put.old, seen_.identity());
+    }
+}
+
+/// The batch stands in the text and may not be durable; what the system still holds of the file can't be
+/// trusted after that. So the text without it is written to a new file.
+void StoreWriter::takeBack(FileIdentity const& current, StoreError const& failure) {
+    std::string reason = "another program wrote into it at the same time";
+    try {
+        auto before = seen_.text().rewrittenWith({});
+        if (auto const replacement = put(before.body(), current)) {
+            disk_.syncFolder();
+            if (replacement->old) {
+                removeOwn(*replacement->old, current);
+            }
+            seen_.replaced(std::move(before), replacement->file);
+            return;
+        }
+        auto const there = identifyRegular(StoreFiles::text);
+        if (!there || !there->isSameFile(current)) {
+            return; // somebody else's text, without the batch, has taken its place
+        }
+    } catch (StoreError const& second) {
+        reason = second.getProblem();
+    }
+    isOutcomeUnknown_ = true;
+    seen_.distrust();
+    throw StoreError(pathOfText(), 0,
+                     failure.getProblem() + "; writing the text without the last batch failed too (" +
+                         reason + "): nobody can tell whether the batch is in the project",
+                     failure.getRemedy() + " Then open the project anew, and look whether the last change is "
+                                           "there.");
+}
+
+/// True when the path from the project's root leads to this file in the open folder, whatever its state.
+bool StoreWriter::isInPlace(FileIdentity const& file) {
+    if (!disk_.isFolderInPlace()) {
+        return false;
+    }
+    auto const there = disk_.identifyByPath(StoreFiles::text);
+    return there && there->isSameFile(file);
+}
+
+/// Empty also for what is no regular file.
+std::optional<FileIdentity> StoreWriter::identifyRegular(std::string const& name) {
+    try {
+        return disk_.identify(name);
+    } catch (StoreError const&) {
+        return std::nullopt;
+    }
+}
+
+/// Removes a file if it is the one that is meant. What can't be removed is left to the next writer.
+/// @return false when it is another one.
+bool StoreWriter::removeOwn(std::string const& name, FileIdentity const& ours) {
+    try {
+        auto const there = disk_.identify(name);
+        if (!there || !there->isSameState(ours)) {
+            return !there;
+        }
+        disk_.remove(name);
+        return true;
+    } catch (StoreError const&) {
+        return false;
+    }
+}
+
+std::string StoreWriter::pathOfText() const {
+    return disk_.folder() + "/" + StoreFiles::text;
+}
+
+void StoreWriter::throwReplaced() const {
+    throw StoreError(
+        pathOfText(), 0,
+        "was replaced, changed or moved by another program at this moment, and the batch is not in "
+        "the project",
+        "Try again.");
+}
+
+} // namespace project::stores

@@ -1,0 +1,56 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <string_view>
+
+#include "ProjectText.hpp"
+#include "SeenText.hpp"
+#include "project/stores/Disk.hpp"
+#include "project/stores/StoreError.hpp"
+
+namespace project::stores {
+
+/// Puts batches on disk behind or in the place of the text that was seen. The folder must be locked.
+///
+/// Git and editors don't take the lock. So it is looked before and after each step whether the path still
+/// leads to what was seen; what came in between is put back, and never deleted. When a call throws, the batch
+/// is not in the project, with one exception: once the disk has failed so that nobody can tell, the error
+/// says so, and requireKnownOutcome fails from then on.
+class StoreWriter {
+public:
+    StoreWriter(Disk& disk, SeenText& seen) : disk_(disk), seen_(seen) {}
+
+    /// Appends a batch: one write, one sync.
+    void append(std::string_view lines);
+
+    /// Puts another text in the place of what was seen: one sync of the file, one of the folder.
+    void rewrite(ProjectText next);
+
+    /// @throws StoreError when it is unknown whether an earlier batch is in the text.
+    void requireKnownOutcome() const;
+
+private:
+    /// A new text that has taken the old one's place.
+    struct Put {
+        WrittenFile file;
+        std::optional<std::string> old; ///< the name of the one that it replaced, unless that is gone
+    };
+
+    std::optional<Put> put(std::string_view bytes, FileIdentity const& expected);
+    std::optional<Put> swapIn(std::string const& name, WrittenFile const& file, FileIdentity const& expected);
+    void putBack(std::string const& name, FileIdentity const& ours);
+    void withdraw(Put const& put);
+    void takeBack(FileIdentity const& current, StoreError const& failure);
+    bool isInPlace(FileIdentity const& file);
+    std::optional<FileIdentity> identifyRegular(std::string const& name);
+    bool removeOwn(std::string const& name, FileIdentity const& ours);
+    std::string pathOfText() const;
+    [[noreturn]] void throwReplaced() const;
+
+    Disk& disk_;
+    SeenText& seen_;
+    bool isOutcomeUnknown_ = false;
+};
+
+} // namespace project::stores
