@@ -16,6 +16,13 @@ using metadata::MetadataPath;
 using metadata::PathElement;
 using ZEPHRA::project::management::FileNotInProject;
 
+namespace {
+
+/// How many elements the address of the root has.
+constexpr std::size_t headDepth = 1;
+
+} // namespace
+
 PathLocalizedFileMetadataManager::PathLocalizedFileMetadataManager(
     Path root, std::shared_ptr<metadata::MetadataManager> metadataManager, std::u16string scope)
     : root_(std::move(root)), metadataManager_(std::move(metadataManager)), scope_(std::move(scope)) {
@@ -82,7 +89,9 @@ std::vector<Path> PathLocalizedFileMetadataManager::getExtraEntries() {
 std::vector<Path> PathLocalizedFileMetadataManager::getChildFiles(Path file) {
     auto const guard = metadataManager_->acquireReadLock();
     std::vector<Path> result;
-    for (auto const& child : metadataManager_->getChildNodes(toMetadataPath(file))) {
+    auto const children = metadataManager_->getChildNodes(toMetadataPath(file));
+    result.reserve(children.size());
+    for (auto const& child : children) {
         if (isFileMetadataPath(child)) {
             result.push_back(toFilePath(child));
         }
@@ -104,14 +113,17 @@ MetadataPath PathLocalizedFileMetadataManager::toMetadataPath(Path const& file) 
 }
 
 Path PathLocalizedFileMetadataManager::toFilePath(MetadataPath const& path) const {
-    auto result = root_;
-    for (std::size_t index = toMetadataPath(root_).depth(); index < path.depth(); ++index) {
-        auto const& location = path[index].getLocation();
-        if (!location.empty()) {
-            result /= location;
-        }
+    auto length = root_.native().size();
+    for (auto index = headDepth; index < path.depth(); ++index) {
+        length += path[index].getLocation().size() + 1;
     }
-    return result;
+    std::u16string text;
+    text.reserve(length);
+    text = root_.native();
+    for (auto index = headDepth; index < path.depth(); ++index) {
+        text = fl::filesystem::detail::concatenate_pathname(std::move(text), path[index].getLocation());
+    }
+    return text;
 }
 
 bool PathLocalizedFileMetadataManager::isFileMetadataPath(MetadataPath const& path) {
@@ -119,8 +131,8 @@ bool PathLocalizedFileMetadataManager::isFileMetadataPath(MetadataPath const& pa
     if (!metadataManager_->hasNode(path)) {
         return false;
     }
-    auto const leaf = path.getLeaf();
-    return leaf.getType() == files::FILES || leaf.getType() == files::FILE;
+    auto const& type = path.leaf().getType();
+    return type == files::FILES || type == files::FILE;
 }
 
 void PathLocalizedFileMetadataManager::addFileNode(

@@ -1,5 +1,6 @@
 #include "files/PathSets.hpp"
 
+#include <iterator>
 #include <set>
 #include <utility>
 
@@ -9,10 +10,24 @@ namespace project::management {
 
 namespace {
 
-void insertUpToRoot(Path path, Path const& root, std::set<Path>& result) {
-    while (path != root && result.insert(path).second) {
-        path = metadata::getParentFolder(path);
+using PathSet = std::set<Path>;
+
+/// Empties the set into a list.
+std::vector<Path> toList(PathSet set) {
+    std::vector<Path> result;
+    result.reserve(set.size());
+    while (!set.empty()) {
+        result.push_back(std::move(set.extract(set.begin()).value()));
     }
+    return result;
+}
+
+/// Lists mostly come sorted, so the end is the place to try first.
+/// @return false when the path was there.
+bool insertNearEnd(Path const& path, PathSet& result) {
+    auto const before = result.size();
+    result.emplace_hint(result.end(), path);
+    return result.size() > before;
 }
 
 } // namespace
@@ -22,30 +37,50 @@ bool isWithinFolder(Path const& folder, Path const& path) {
 }
 
 std::vector<Path> withParentFolders(std::vector<Path> const& files, Path const& root) {
-    std::set<Path> result;
+    PathSet result;
+    Path known = root; // a folder that is in the set with all above it, or the root
     for (auto const& file : files) {
-        if (isWithinFolder(root, file)) {
-            insertUpToRoot(file, root, result);
-        } else {
+        if (!isWithinFolder(root, file)) {
             result.insert(file);
+            continue;
         }
+        if (file == root || !insertNearEnd(file, result)) {
+            continue;
+        }
+        auto const folder = metadata::getParentFolder(file);
+        auto path = folder;
+        while (path != known && path != root && result.insert(path).second) {
+            path = metadata::getParentFolder(path);
+        }
+        known = folder;
     }
-    return {result.begin(), result.end()};
+    return toList(std::move(result));
 }
 
 std::vector<Path> withDescendants(std::vector<Path> const& files,
                                   std::function<std::vector<Path>(Path const&)> const& getChildFiles) {
-    std::set<Path> result;
-    std::vector<Path> waiting = files;
+    struct Waiting {
+        Path path;
+        PathSet::const_iterator folder; // the end for the given paths
+    };
+
+    PathSet result;
+    std::vector<Waiting> waiting;
+    for (auto const& file : files) {
+        waiting.push_back({file, result.end()});
+    }
     while (!waiting.empty()) {
-        auto const path = std::move(waiting.back());
+        auto next = std::move(waiting.back());
         waiting.pop_back();
-        result.insert(path);
-        for (auto& child : getChildFiles(path)) {
-            waiting.push_back(std::move(child));
+        auto children = getChildFiles(next.path);
+        // Children are popped from the last to the first, so each belongs right behind its folder.
+        auto const hint = next.folder == result.end() ? result.end() : std::next(next.folder);
+        auto const inserted = result.emplace_hint(hint, std::move(next.path));
+        for (auto& child : children) {
+            waiting.push_back({std::move(child), inserted});
         }
     }
-    return {result.begin(), result.end()};
+    return toList(std::move(result));
 }
 
 } // namespace project::management
