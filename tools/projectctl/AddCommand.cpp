@@ -1,0 +1,138 @@
+#include <algorithm>
+#include <iostream>
+#include <iterator>
+#include <string>
+#include <vector>
+
+#include "ArgumentPaths.hpp"
+#include "CommandLine.hpp"
+#include "Commands.hpp"
+#include "DiskFolder.hpp"
+#include "DiskWalk.hpp"
+#include "Failure.hpp"
+#include "GitIgnore.hpp"
+#include "OpenProject.hpp"
+#include "Output.hpp"
+#include "Progress.hpp"
+#include "ProjectFolder.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// Adds files and folders, all in one step: either all of them are in the project afterwards, or none is.
+class AddCommand : public Command {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand("add", "Add files and folders to the project");
+        takeTexts(*app, "PATH", arguments_, "What to add; - for the lines of standard input");
+        app->add_flag("-r,--recursive", recursive_,
+                      "Add what folders contain, at any depth: not what source control or a project's store "
+                      "keeps, no sockets, pipes and devices; symbolic links are added and not entered");
+        app->add_flag("--gitignore", gitignore_, "Of what folders contain, leave out what git ignores")
+            ->needs("--recursive");
+        app->add_flag("-0,--null", null_, "Read paths from standard input too, with a zero byte behind each");
+        app->final_callback([this] {
+            if (arguments_.empty() && !null_) {
+                throw CLI::RequiredError("PATH");
+            }
+        });
+        return app;
+    }
+
+    int run() override {
+        Progress progress("Reading folders");
+        auto project = OpenProject::ofWorkingFolder();
+        ArgumentPaths absolute(workingFolder());
+        std::vector<Path> paths;
+        for (auto const& argument : allArguments()) {
+            paths.push_back(absolute.absolute(argument));
+        }
+        auto contents = recursive_ ? contentsOf(paths, project, progress) : std::vector<Path>();
+        paths.insert(paths.end(), std::make_move_iterator(contents.begin()),
+                     std::make_move_iterator(contents.end()));
+        progress.begin("Adding " + std::to_string(paths.size()) + " files and folders");
+        project.files().add(paths);
+        output().say(std::to_string(paths.size()) + " files and folders added");
+        return 0;
+    }
+
+private:
+    std::vector<std::string> allArguments() const {
+        std::vector<std::string> result;
+        bool readsInput = null_;
+        for (auto const& argument : arguments_) {
+            if (argument == "-") {
+                readsInput = true;
+            } else {
+                result.push_back(argument);
+            }
+        }
+        std::cin.sync_with_stdio(false);
+        for (std::string line; readsInput && std::getline(std::cin, line, null_ ? '\0' : '\n');) {
+            result.push_back(line);
+        }
+        return result;
+    }
+
+    /// What the folders among the paths contain and the project does not have yet: what it has is not
+    /// touched.
+    std::vector<Path> contentsOf(std::vector<Path> const& paths, OpenProject& project,
+                                 Progress& progress) const {
+        DiskWalk walk(project.root(), progress);
+        auto const storeFolder = project.store().getMetadataRoot();
+        for (auto const& path : paths) {
+            // What cannot be added is not walked through: the file manager says why it cannot.
+            if (isWithin(path, project.root()) && !isWithin(path, storeFolder) && isFolderItself(path)) {
+                walk.enter(path);
+            }
+        }
+        tellUnaddable(walk.unaddable());
+        auto result = walk.found();
+        if (gitignore_) {
+            progress.begin("Asking git what it ignores");
+            result = withoutIgnoredByGit(project.root(), std::move(result));
+        }
+        requireReadable(walk.unreadable(), paths, result);
+        auto const guard = project.store().acquireReadLock();
+        std::erase_if(result, [&](Path const& path) { return project.files().isFileInProject(path); });
+        return result;
+    }
+
+    static bool isWithin(Path const& path, Path const& folder) {
+        return path == folder || project::metadata::isParent(path, folder);
+    }
+
+    static void tellUnaddable(std::vector<Path> const& paths) {
+        if (!paths.empty()) {
+            auto const others = paths.size() - 1;
+            printError("left out \"" + shown(paths.front()) + '"' +
+                       (others > 0 ? " and " + std::to_string(others) + " more" : "") +
+                       ": a name that begins with two dots cannot be added from the project's root");
+        }
+    }
+
+    /// A folder that is not added need not be readable.
+    static void requireReadable(std::vector<DiskWalk::Unreadable> const& unreadable,
+                                std::vector<Path> const& given, std::vector<Path> const& found) {
+        for (auto const& [folder, problem] : unreadable) {
+            if (std::ranges::count(given, folder) + std::ranges::count(found, folder) > 0) {
+                throw Failure(problem + "; nothing was added");
+            }
+        }
+    }
+
+    std::vector<std::string> arguments_;
+    bool recursive_ = false;
+    bool gitignore_ = false;
+    bool null_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeAddCommand() {
+    return std::make_unique<AddCommand>();
+}
+
+} // namespace projectctl

@@ -1,0 +1,22 @@
+#pragma once
+
+#include <memory>
+#include <vector>
+
+#include "Command.hpp"
+
+namespace projectctl {
+
+std::unique_ptr<Command> makeInitCommand();
+std::unique_ptr<Command> makeNameCommand();
+std::unique_ptr<Command> makeDescriptionCommand();
+std::unique_ptr<Command> makeAddCommand();
+std::unique_ptr<Command> makeListCommand();
+std::unique_ptr<Command> makeStatusCommand();
+std::unique_ptr<Command> makeCheckCommand();
+std::unique_ptr<Command> makeTidyCommand();
+
+/// All commands, in the order in which help shows them.
+std::vector<std::unique_ptr<Command>> makeCommands();
+
+} // namespace projectctl

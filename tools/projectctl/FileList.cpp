@@ -1,0 +1,93 @@
+#include "FileList.hpp"
+
+#include <utility>
+
+#include "Schema.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+
+namespace projectctl {
+
+using project::metadata::MetadataPath;
+using project::metadata::PathElement;
+
+/// A folder whose contents are being visited.
+struct FileList::Open {
+    MetadataPath address;
+    std::vector<File> files;
+    std::size_t next;
+    std::size_t pathLength; ///< of the folder, with the separator behind it
+};
+
+FileList::FileList(OpenProject& project) : project_(project), guard_(project.store().acquireReadLock()) {
+}
+
+MetadataPath FileList::addressOf(Path const& path) const {
+    auto result = MetadataPath::root().child(PathElement(schema::files, schema::root));
+    auto const relative = project::metadata::getRelativePath(project_.root(), path);
+    for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
+        result = below(result, std::u16string(fl::filesystem::detail::extract_first_element(rest)));
+    }
+    return result;
+}
+
+MetadataPath FileList::below(MetadataPath const& folder, std::u16string name) {
+    return folder.child(PathElement(schema::file, std::move(name)));
+}
+
+FileList::Level FileList::level(MetadataPath const& address) const {
+    Level result;
+    auto const children = project_.text().load(address);
+    result.files.reserve(children.size());
+    for (auto const& child : children) {
+        auto const& type = child.element.getType();
+        if (type == schema::file) {
+            result.files.push_back({child.element.getLocation(), child.node != nullptr, child.hasChildren});
+        } else if (type == schema::folderMarker) {
+            result.kind = Kind::Folder;
+        }
+    }
+    return result;
+}
+
+void FileList::visit(Path const& path, Visitor const& visitor) const {
+    auto const address = addressOf(path);
+    auto here = level(address);
+    if (path == project_.root()) {
+        visitBelow(address, std::move(here), {}, 0, visitor);
+        return;
+    }
+    auto const relative = project::metadata::getRelativePath(project_.root(), path);
+    visitor(relative, 0, here.kind);
+    visitBelow(address, std::move(here), relative + u'/', 1, visitor);
+}
+
+void FileList::visitBelow(MetadataPath start, Level level, std::u16string path, std::size_t depth,
+                          Visitor const& visitor) const {
+    // Not by recursion: how deep the tree is, is up to whoever wrote the text.
+    std::vector<Open> open;
+    open.push_back({std::move(start), std::move(level.files), 0, path.size()});
+    while (!open.empty()) {
+        auto& folder = open.back();
+        path.resize(folder.pathLength);
+        if (folder.next == folder.files.size()) {
+            open.pop_back();
+            continue;
+        }
+        auto& file = folder.files[folder.next++];
+        if (!file.isInProject) {
+            continue; // nor is what lies below it, for the file manager
+        }
+        path += file.name;
+        if (!file.hasBelow) {
+            visitor(path, depth + open.size() - 1, Kind::File);
+            continue;
+        }
+        auto address = below(folder.address, std::move(file.name));
+        auto content = this->level(address);
+        visitor(path, depth + open.size() - 1, content.kind);
+        path += u'/';
+        open.push_back({std::move(address), std::move(content.files), 0, path.size()});
+    }
+}
+
+} // namespace projectctl

@@ -1,0 +1,63 @@
+#pragma once
+
+#include <functional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "Kind.hpp"
+#include "OpenProject.hpp"
+#include "project/stores/Backend.hpp"
+
+namespace projectctl {
+
+/// The project's file list, read straight from the store: the same files as the file manager lists, and of
+/// each whether it is a folder, for a tenth of the time. A folder is what was one when it was added.
+///
+/// Holds the store's read guard, so that all of it is one state of the project.
+class FileList {
+public:
+    explicit FileList(OpenProject& project);
+
+    /// One step of the list and what lies below it.
+    struct File {
+        std::u16string name;
+        bool isInProject; ///< false for a step that only leads to others
+        bool hasBelow;
+    };
+
+    struct Level {
+        Kind kind = Kind::File;  ///< of what the address leads to
+        std::vector<File> files; ///< directly below it, by name in code units
+    };
+
+    /// The address of a file. @param path absolute, the project's root or below it.
+    project::metadata::MetadataPath addressOf(Path const& path) const;
+
+    /// The address of a file in a folder.
+    static project::metadata::MetadataPath below(project::metadata::MetadataPath const& folder,
+                                                 std::u16string name);
+
+    /// What the store has at an address of the list; nothing for one that does not exist.
+    Level level(project::metadata::MetadataPath const& address) const;
+
+    /// Called with the path relative to the root, with how many folders lie between it and where the walk
+    /// began, and with its kind.
+    using Visitor = std::function<void(std::u16string const& path, std::size_t depth, Kind kind)>;
+
+    /// Visits everything in the project below a path, a folder before its contents, in the order of their
+    /// names; the path itself too, unless it is the root.
+    /// @param path absolute, in the project.
+    void visit(Path const& path, Visitor const& visitor) const;
+
+private:
+    struct Open;
+
+    void visitBelow(project::metadata::MetadataPath start, Level level, std::u16string path,
+                    std::size_t depth, Visitor const& visitor) const;
+
+    OpenProject& project_;
+    cmlink::ReentrantReadWriteLock::LockGuard guard_;
+};
+
+} // namespace projectctl

@@ -1,0 +1,122 @@
+#include <optional>
+#include <string>
+
+#include "ArgumentPaths.hpp"
+#include "CommandLine.hpp"
+#include "Commands.hpp"
+#include "FileList.hpp"
+#include "NameForms.hpp"
+#include "Output.hpp"
+#include "ProjectFolder.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/ProjectException.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using ZEPHRA::project::management::FileNotInProject;
+
+/// Lists the project's files and folders, all or those below one of them.
+class ListCommand : public Command {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand(
+            "list", "List the project's files and folders by their paths from the project's root");
+        takeText(*app, "PATH", path_, "List this and what is in the project below it; everything by default");
+        auto* const tree =
+            app->add_flag("--tree", tree_, "As a tree, folders with a slash behind their names");
+        auto* const json =
+            app->add_flag("--json", json_, "As a JSON array of objects with \"path\" and \"kind\"");
+        auto* const null = app->add_flag("-0,--null", null_, "With a zero byte behind each path");
+        tree->excludes(json)->excludes(null);
+        json->excludes(null);
+        return app;
+    }
+
+    int run() override {
+        auto project = OpenProject::ofWorkingFolder();
+        auto const path = path_ ? ArgumentPaths(workingFolder()).absolute(*path_) : project.root();
+        writeList(project, path);
+        project.warnOfDamage();
+        return 0;
+    }
+
+private:
+    void writeList(OpenProject& project, Path const& path) const {
+        FileList const list(project);
+        if (!project.files().isFileInProject(path)) {
+            project::exception::raise(FileNotInProject(path.native()));
+        }
+        if (json_) {
+            writeJson(list, path);
+        } else if (tree_) {
+            writeTree(list, path);
+        } else if (null_ || !output().isTerminal()) {
+            writePaths(list, path, null_ ? '\0' : '\n');
+        } else {
+            writeQuoted(list, path);
+        }
+    }
+
+    static void writePaths(FileList const& list, Path const& from, char end) {
+        list.visit(from, [end](std::u16string const& path, std::size_t, Kind) {
+            appendBytes(output().text(), path);
+            output().text() += end;
+            output().settle();
+        });
+    }
+
+    static void appendShown(std::u16string_view name) {
+        if (output().isTerminal()) {
+            std::string bytes;
+            appendBytes(bytes, name);
+            appendQuoted(output().text(), bytes);
+        } else {
+            appendBytes(output().text(), name);
+        }
+    }
+
+    static void writeQuoted(FileList const& list, Path const& from) {
+        list.visit(from, [](std::u16string const& path, std::size_t, Kind) {
+            appendShown(path);
+            output().text() += '\n';
+            output().settle();
+        });
+    }
+
+    static void writeTree(FileList const& list, Path const& from) {
+        list.visit(from, [](std::u16string const& path, std::size_t depth, Kind kind) {
+            auto const name = depth == 0 ? std::u16string_view(path)
+                                         : std::u16string_view(path).substr(path.rfind(u'/') + 1);
+            output().text().append(2 * depth, ' ');
+            appendShown(name);
+            output().text() += kind == Kind::Folder ? "/\n" : "\n";
+            output().settle();
+        });
+    }
+
+    static void writeJson(FileList const& list, Path const& from) {
+        char const* separator = "[\n";
+        list.visit(from, [&separator](std::u16string const& path, std::size_t, Kind kind) {
+            output().text() += separator;
+            appendJsonEntry(output().text(), path, kind);
+            output().settle();
+            separator = ",\n";
+        });
+        output().text() += *separator == '[' ? "[]\n" : "\n]\n";
+    }
+
+    std::optional<std::string> path_;
+    bool tree_ = false;
+    bool json_ = false;
+    bool null_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeListCommand() {
+    return std::make_unique<ListCommand>();
+}
+
+} // namespace projectctl

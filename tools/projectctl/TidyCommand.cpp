@@ -1,0 +1,32 @@
+#include "Commands.hpp"
+#include "OpenProject.hpp"
+#include "Output.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// Writes the project's text in its one canonical form, so that a commit holds nothing but what changed.
+class TidyCommand : public Command {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        return tool.add_subcommand(
+            "tidy", "Bring the project's text into its canonical form, to be done before it is committed");
+    }
+
+    int run() override {
+        auto project = OpenProject::ofWorkingFolder();
+        project.shield().raise();
+        output().say(project.text().tidy() ? "The project's text is tidy now."
+                                           : "The project's text is tidy.");
+        return 0;
+    }
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeTidyCommand() {
+    return std::make_unique<TidyCommand>();
+}
+
+} // namespace projectctl

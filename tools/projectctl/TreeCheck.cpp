@@ -1,0 +1,227 @@
+#include "TreeCheck.hpp"
+
+#include <algorithm>
+#include <string_view>
+#include <utility>
+
+#include "Schema.hpp"
+#include "fl/filesystem/SystemName.hpp"
+#include "fl/i18n/Utf8.hpp"
+#include "project/core/ProjectManagerBase.hpp"
+
+namespace projectctl {
+
+using fl::filesystem::Path;
+using project::management::ProjectManagerBase;
+using project::metadata::MetadataPath;
+using project::metadata::PathElement;
+
+namespace {
+
+std::string quoted(std::u16string const& text) {
+    return '"' + fl::i18n::toUtf8(text) + '"';
+}
+
+/// The address step by step, for what has no better name.
+std::string described(MetadataPath const& address) {
+    std::string result;
+    for (auto const& element : address.getPath()) {
+        result += (result.empty() ? "(" : ", (") + quoted(element.getType()) + ", " +
+                  quoted(element.getLocation()) + ')';
+    }
+    return result;
+}
+
+/// A file's path in its scope. @param address of the file or of something that belongs to it.
+std::u16string pathOf(MetadataPath const& address) {
+    std::u16string result;
+    for (std::size_t index = 1; index < address.depth(); ++index) {
+        if (address[index].getType() == schema::file) {
+            result += (result.empty() ? u"" : u"/") + address[index].getLocation();
+        }
+    }
+    return result;
+}
+
+bool isPossibleName(std::u16string const& name) {
+    return !name.empty() && name != u"." && name != u".." && name.find(u'/') == std::u16string::npos &&
+           fl::filesystem::SystemName(Path(name)).get() != nullptr;
+}
+
+bool isOneOf(std::u16string const& text, std::initializer_list<std::u16string_view> known) {
+    return std::ranges::find(known, std::u16string_view(text)) != known.end();
+}
+
+MetadataPath categoryAddress(std::u16string const& uuid) {
+    return MetadataPath::root()
+        .child(PathElement(schema::categories, schema::root))
+        .child(PathElement(schema::category, uuid));
+}
+
+} // namespace
+
+TreeCheck::TreeCheck(project::metadata::MetadataManager& store, project::management::FileManager& files)
+    : store_(store), files_(files) {
+}
+
+std::vector<TreeCheck::Finding> TreeCheck::run() {
+    auto const guard = store_.acquireReadLock();
+    findings_.clear();
+    for (auto const& head : store_.getChildNodes(MetadataPath::root())) {
+        checkHead(head);
+    }
+    return std::move(findings_);
+}
+
+void TreeCheck::checkHead(Address const& head) {
+    auto const leaf = head.getLeaf();
+    bool const isRoot = leaf.getLocation() == schema::root;
+    if (leaf.getType() == schema::files) {
+        checkFiles(head);
+    } else if (isRoot && leaf.getType() == schema::categories) {
+        checkCategories(head);
+    } else if (isRoot && leaf.getType() == schema::entryPoints) {
+        checkEntryPoints(head);
+    } else if (isRoot && leaf.getType() == schema::entryPointGroups) {
+        checkGroups(head);
+    } else if (isRoot && isOneOf(leaf.getType(), {schema::projectPath, schema::references})) {
+        checkReferences(head);
+    } else if (head != ProjectManagerBase::getRootNodePath() &&
+               head != ProjectManagerBase::getDescriptionNodePath().parent()) {
+        note("nothing in this version knows what is kept at " + described(head));
+    }
+}
+
+void TreeCheck::checkFiles(Address const& scope) {
+    auto waiting = store_.getChildNodes(scope);
+    while (!waiting.empty()) {
+        auto const address = std::move(waiting.back());
+        waiting.pop_back();
+        if (address.leaf().getType() != schema::file) {
+            continue; // a folder's marker, label data
+        }
+        checkFile(address);
+        auto below = store_.getChildNodes(address);
+        waiting.insert(waiting.end(), std::make_move_iterator(below.rbegin()),
+                       std::make_move_iterator(below.rend()));
+    }
+}
+
+void TreeCheck::checkFile(Address const& file) {
+    if (!isPossibleName(file.leaf().getLocation())) {
+        fault("no file can have the name " + quoted(file.leaf().getLocation()) + ", at " + described(file));
+    }
+    auto const node = store_.getNode(file);
+    if (!node) {
+        return; // what lies below it says so
+    }
+    auto const above = file.parent();
+    if (above.depth() > 1 && !store_.hasNode(above)) {
+        fault("the file " + quoted(pathOf(file)) +
+              " is listed and its folder is not, so that no list of the project shows it");
+    }
+    if (file[0].getLocation() == schema::root) {
+        checkLabelsOn(file, *node);
+    }
+}
+
+void TreeCheck::checkLabelsOn(Address const& file, Node const& node) {
+    for (auto const& category : node.getChildren()) {
+        if (category->getType() != schema::category || category->get(schema::uuidKey).empty()) {
+            continue; // passed over by every reader
+        }
+        for (auto const& label : category->getChildren()) {
+            if (label->getType() == schema::label && !label->get(schema::uuidKey).empty()) {
+                checkLabelOn(file, *category, label->get(schema::uuidKey));
+            }
+        }
+    }
+}
+
+void TreeCheck::checkLabelOn(Address const& file, Node const& category, std::u16string const& labelUuid) {
+    auto const& uuid = category.get(schema::uuidKey);
+    auto const address = categoryAddress(uuid);
+    if (!store_.hasNode(address)) {
+        fault("the file " + quoted(pathOf(file)) + " bears a label of the category " + quoted(uuid) +
+              ", which does not exist");
+    } else if (!store_.pathExists(address.child(PathElement(schema::label, labelUuid)))) {
+        fault("the file " + quoted(pathOf(file)) + " bears the label " + quoted(labelUuid) +
+              ", which does not exist");
+    }
+}
+
+void TreeCheck::checkCategories(Address const& head) {
+    for (auto const& category : store_.getChildNodes(head)) {
+        requireNode(category, "the category");
+        checkLabels(category);
+    }
+}
+
+void TreeCheck::checkLabels(Address const& category) {
+    for (auto const& label : store_.getChildNodes(category)) {
+        if (!requireNode(label, "the label")) {
+            continue;
+        }
+        auto const state = store_.getNode(label)->get(schema::readOnlyKey);
+        if (!isOneOf(state, {u"", u"READ_ONLY", u"WRITABLE", u"INHERITED"})) {
+            fault("the label " + quoted(label.leaf().getLocation()) + " has the unknown read-only state " +
+                  quoted(state));
+        }
+    }
+}
+
+void TreeCheck::checkEntryPoints(Address const& head) {
+    for (auto const& entryPoint : store_.getChildNodes(head)) {
+        if (!requireNode(entryPoint, "the entry point")) {
+            continue;
+        }
+        auto const node = store_.getNode(entryPoint);
+        auto const uuid = quoted(entryPoint.leaf().getLocation());
+        auto const& type = node->get(schema::typeKey);
+        if (!isOneOf(type, {u"Basic", u"Startup", u"StartUp", u"Shutdown", u"Batch_Job", u"Batch Job"})) {
+            fault("the entry point " + uuid + " has the unknown type " + quoted(type));
+        }
+        auto const& file = node->get(schema::fileKey);
+        if (!files_.isFileInProject(files_.getProjectRoot() / Path(file))) {
+            note("the entry point " + uuid + " is not shown, because its file " + quoted(file) +
+                 " is not in the project");
+        }
+    }
+}
+
+void TreeCheck::checkGroups(Address const& head) {
+    for (auto const& group : store_.getChildNodes(head)) {
+        requireNode(group, "the entry point group");
+    }
+}
+
+void TreeCheck::checkReferences(Address const& head) {
+    for (auto const& reference : store_.getChildNodes(head)) {
+        if (!requireNode(reference, "the reference")) {
+            continue;
+        }
+        auto const type = store_.getNode(reference)->get(schema::typeKey);
+        if (!isOneOf(type, {u"Relative", u"Absolute"})) {
+            note("the reference " + quoted(reference.leaf().getLocation()) +
+                 " is not shown, because its type " + quoted(type) + " is unknown");
+        }
+    }
+}
+
+bool TreeCheck::requireNode(Address const& address, std::string const& what) {
+    if (store_.hasNode(address)) {
+        return true;
+    }
+    fault(what + ' ' + quoted(address.leaf().getLocation()) + " has an address and nothing is stored there");
+    return false;
+}
+
+void TreeCheck::fault(std::string text) {
+    findings_.push_back({true, std::move(text)});
+}
+
+void TreeCheck::note(std::string text) {
+    findings_.push_back({false, std::move(text)});
+}
+
+} // namespace projectctl
