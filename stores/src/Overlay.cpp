@@ -37,8 +37,13 @@ bool Overlay::isHidden(Address const& address) const {
     if (hiding_ == 0) {
         return false;
     }
-    Entry const* const entry = find(address);
-    return (entry != nullptr && entry->hides) || (address.depth() > 0 && isHidden(address.parent()));
+    for (Address above = address; above.depth() > 0; above = above.parent()) {
+        Entry const* const entry = find(above);
+        if (entry != nullptr && entry->hides) {
+            return true;
+        }
+    }
+    return false;
 }
 
 Overlay::Range Overlay::below(Address const& address) const {

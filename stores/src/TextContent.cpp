@@ -85,6 +85,7 @@ void TextContent::join(Change const& change) {
 TextBody TextContent::write(Batch const& batch) const {
     Overlay overlay = overlay_;
     for (Change const& change : batch) {
+        requireWritable(change);
         overlay.apply(change);
     }
     constexpr std::size_t expectedLine = 64;
