@@ -1,6 +1,8 @@
 #include "CommandLine.hpp"
 
 #include <algorithm>
+#include <iterator>
+#include <span>
 #include <string_view>
 
 #include "Commands.hpp"
@@ -10,20 +12,40 @@ namespace projectctl {
 
 namespace {
 
-// The parser takes an argument in square brackets apart, as a list. A mark before the bracket keeps it whole.
+// Arguments are bytes of names, and the parser has views on some: it takes "[a,b]" apart as a list, "++" ends
+// a command, and what follows "--" is an argument only if none came before. A mark in front keeps it off
+// them.
 constexpr char mark = '\x01';
 
-bool startsWithMarksAndBracket(std::string_view text) {
-    auto const first = text.find_first_not_of(mark);
-    return first != std::string_view::npos && text[first] == '[';
+bool isSpecial(std::string_view text) {
+    return text.starts_with('[') || text == "++";
 }
 
-std::string marked(std::string_view argument) {
-    return startsWithMarksAndBracket(argument) ? mark + std::string(argument) : std::string(argument);
+/// What is left without the marks that the argument had to begin with.
+std::string_view behindMarks(std::string_view text) {
+    return text.substr(std::min(text.find_first_not_of(mark), text.size()));
 }
 
 std::string unmarked(std::string const& argument) {
-    return argument.front() == mark && startsWithMarksAndBracket(argument) ? argument.substr(1) : argument;
+    auto const rest = behindMarks(argument);
+    bool const isMarked = rest.size() < argument.size() && (isSpecial(rest) || rest.starts_with('-'));
+    return isMarked ? argument.substr(1) : argument;
+}
+
+std::vector<std::string> markedArguments(int argc, char const* const* argv) {
+    std::vector<std::string> result;
+    bool optionsEnded = false;
+    for (std::string_view const argument : std::span(argv, static_cast<std::size_t>(argc)).subspan(1)) {
+        if (argument == "--" && !optionsEnded) {
+            optionsEnded = true;
+            continue;
+        }
+        auto const rest = behindMarks(argument);
+        bool const isDashed = rest.starts_with('-') && (optionsEnded || rest.size() < argument.size());
+        result.push_back((isSpecial(rest) || isDashed ? std::string(1, mark) : std::string()) +
+                         std::string(argument));
+    }
+    return result;
 }
 
 std::string withoutMarks(std::string text) {
@@ -35,7 +57,10 @@ std::string withoutMarks(std::string text) {
 int refuse(CLI::ParseError const& error, CLI::App const& tool) {
     auto const called = tool.get_subcommands();
     auto const help = called.empty() ? "projectctl" : "projectctl " + called.front()->get_name();
-    printError(withoutMarks(error.what()) + " ('" + help + " --help' tells more)");
+    auto const unknown = called.empty() ? tool.remaining() : std::vector<std::string>();
+    auto const problem =
+        unknown.empty() ? error.what() : "there is no command or option \"" + unknown.front() + '"';
+    printError(withoutMarks(problem) + " ('" + help + " --help' tells more)");
     return 2;
 }
 
@@ -51,7 +76,7 @@ int showHelp(CLI::App const& tool) {
 CLI::Option* takeText(CLI::App& app, std::string const& name, std::optional<std::string>& value,
                       std::string const& description) {
     auto const take = [&value](CLI::results_t const& given) {
-        value = given.front().empty() ? std::string() : unmarked(given.front());
+        value = unmarked(given.front());
         return true;
     };
     return app.add_option(name, take, description);
@@ -60,12 +85,10 @@ CLI::Option* takeText(CLI::App& app, std::string const& name, std::optional<std:
 CLI::Option* takeTexts(CLI::App& app, std::string const& name, std::vector<std::string>& values,
                        std::string const& description) {
     auto const take = [&values](CLI::results_t const& given) {
-        for (auto const& text : given) {
-            values.push_back(text.empty() ? text : unmarked(text));
-        }
+        std::ranges::transform(given, std::back_inserter(values), unmarked);
         return true;
     };
-    return app.add_option(name, take, description)->expected(-1);
+    return app.add_option(name, take, description)->expected(CLI::detail::expected_max_vector_size);
 }
 
 int runCommandLine(int argc, char const* const* argv, std::string const& version) {
@@ -77,9 +100,8 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     for (auto const& command : commands) {
         declared.push_back(command->declare(tool));
     }
-    std::vector<std::string> arguments; // the parser wants them from the last to the first
-    std::transform(argv + 1, argv + argc, std::back_inserter(arguments), marked);
-    std::reverse(arguments.begin(), arguments.end());
+    auto arguments = markedArguments(argc, argv);
+    std::ranges::reverse(arguments); // so the parser wants them
     try {
         tool.parse(std::move(arguments));
     } catch (CLI::CallForHelp const&) {
