@@ -27,10 +27,6 @@ bool isAbsolute(Text path) {
     return path.starts_with(separator);
 }
 
-bool endsElementAt(Text path, std::size_t at) {
-    return at == path.size() || path[at] == separator;
-}
-
 void dropSeparators(Text& names) {
     names.remove_prefix(std::min(names.find_first_not_of(separator), names.size()));
 }
@@ -52,6 +48,12 @@ Text takeName(Text& names) {
     return name;
 }
 
+/// True for names with one separator between them and none before or behind; there is at least one name.
+bool isPlain(Text names) {
+    return !names.empty() && names.front() != separator && names.back() != separator &&
+           names.find(u"//") == Text::npos;
+}
+
 /// The target's text below the base as it stands there. Nothing when it is not below, or when runs of
 /// separators or trailing ones, in either text, want a closer look.
 std::optional<Text> plainTextBelow(Text base, Text target) {
@@ -65,23 +67,18 @@ std::optional<Text> plainTextBelow(Text base, Text target) {
         }
         rest.remove_prefix(1);
     }
-    bool const isPlain = !rest.empty() && rest.front() != separator && rest.back() != separator &&
-                         rest.find(u"//") == Text::npos;
-    return isPlain ? std::optional(rest) : std::nullopt;
+    return isPlain(rest) ? std::optional(rest) : std::nullopt;
 }
 
-/// Drops what both texts begin with, up to the end of a name. That is most of the work, done at once; names
-/// after different runs of separators stay.
+/// Drops what both texts begin with, up to their last common separator. That is most of the work, done at
+/// once; the next name may still be the same.
 void dropCommonText(Text& left, Text& right) {
     auto const ends = std::mismatch(left.begin(), left.end(), right.begin(), right.end());
-    auto same = static_cast<std::size_t>(ends.first - left.begin());
-    if (!endsElementAt(left, same) || !endsElementAt(right, same)) {
-        while (same > 0 && left[same - 1] != separator) {
-            --same;
-        }
-    }
-    left.remove_prefix(same);
-    right.remove_prefix(same);
+    auto const same = left.substr(0, static_cast<std::size_t>(ends.first - left.begin()));
+    auto const slash = same.rfind(separator);
+    auto const length = slash == Text::npos ? 0 : slash + 1;
+    left.remove_prefix(length);
+    right.remove_prefix(length);
 }
 
 /// Two paths without the names that both begin with and without their roots. Where only one has a root they
@@ -113,11 +110,11 @@ std::size_t countNames(Text names) {
     return count;
 }
 
-void appendElement(std::u16string& path, Text name) {
+void append(std::u16string& path, Text names) {
     if (!path.empty()) {
         path += separator;
     }
-    path += name;
+    path += names;
 }
 
 /// What the system tells of a path, by one of its calls; false when it tells nothing.
@@ -159,10 +156,14 @@ std::u16string getRelativePath(Path const& base, Path const& target) {
     std::u16string relative;
     relative.reserve(3 * steps + parting.target.size());
     for (; steps > 0; --steps) {
-        appendElement(relative, upward);
+        append(relative, upward);
+    }
+    if (isPlain(parting.target)) {
+        append(relative, parting.target);
+        return relative;
     }
     for (auto names = parting.target; !names.empty();) {
-        appendElement(relative, takeName(names));
+        append(relative, takeName(names));
     }
     return relative;
 }
