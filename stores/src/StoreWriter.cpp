@@ -16,13 +16,15 @@ void StoreWriter::append(std::string_view lines) {
     if (!written) {
         throwReplaced();
     }
+    bool isStillInPlace = false;
     try {
         disk_.sync();
+        isStillInPlace = isInPlace(before);
     } catch (StoreError const& failure) {
         takeBack(written->identity, failure);
         throw;
     }
-    if (!isInPlace(before)) {
+    if (!isStillInPlace) {
         if (!disk_.isFolderInPlace()) {
             // It was moved away with the batch in it, which must not come back with it.
             takeBack(written->identity, StoreError(pathOfText(), 0, "was moved away", ""));
@@ -33,29 +35,30 @@ void StoreWriter::append(std::string_view lines) {
 }
 
 void StoreWriter::rewrite(ProjectText next) {
-    if (!isInPlace(seen_.identity())) {
+    auto const before = seen_.identity();
+    if (!isInPlace(before)) {
         throwReplaced();
     }
-    auto const replacement = put(next.body(), seen_.identity());
+    auto const replacement = put(next.body(), before);
     if (!replacement) {
         throwReplaced();
     }
-    if (!isInPlace(replacement->file.identity)) {
-        withdraw(*replacement);
-        throwReplaced();
-    }
+    bool isStillInPlace = false;
     try {
-        disk_.syncFolder();
+        isStillInPlace = isInPlace(replacement->file.identity);
+        if (isStillInPlace) {
+            disk_.syncFolder();
+        }
     } catch (StoreError const& failure) {
         takeBack(replacement->file.identity, failure);
-        if (replacement->old) {
-            removeOwn(*replacement->old, seen_.identity());
-        }
+        removeOld(*replacement, before);
         throw;
     }
-    if (replacement->old) {
-        removeOwn(*replacement->old, seen_.identity());
+    if (!isStillInPlace) {
+        withdraw(*replacement, before);
+        throwReplaced();
     }
+    removeOld(*replacement, before);
     seen_.replaced(std::move(next), replacement->file);
 }
 
@@ -131,14 +134,17 @@ void StoreWriter::putBack(std::string const& name, FileIdentity const& ours) {
 }
 
 /// The path leads elsewhere now. Where the folder was moved away, the batch must not come back with it.
-void StoreWriter::withdraw(Put const& put) {
-    if (!put.old) {
-        return;
-    }
-    if (!disk_.isFolderInPlace()) {
+void StoreWriter::withdraw(Put const& put, FileIdentity const& old) {
+    if (put.old && !disk_.isFolderInPlace()) {
         putBack(*put.old, put.file.identity);
     } else {
-        removeOwn(*put.old, seen_.identity());
+        removeOld(put, old);
+    }
+}
+
+void StoreWriter::removeOld(Put const& put, FileIdentity const& old) {
+    if (put.old) {
+        removeOwn(*put.old, old);
     }
 }
 
@@ -150,9 +156,7 @@ void StoreWriter::takeBack(FileIdentity const& current, StoreError const& failur
         auto before = seen_.text().rewrittenWith({});
         if (auto const replacement = put(before.body(), current)) {
             disk_.syncFolder();
-            if (replacement->old) {
-                removeOwn(*replacement->old, current);
-            }
+            removeOld(*replacement, current);
             seen_.replaced(std::move(before), replacement->file);
             return;
         }

@@ -40,7 +40,8 @@ private:
     std::optional<Put> put(std::string_view bytes, FileIdentity const& expected);
     std::optional<Put> swapIn(std::string const& name, WrittenFile const& file, FileIdentity const& expected);
     void putBack(std::string const& name, FileIdentity const& ours);
-    void withdraw(Put const& put);
+    void withdraw(Put const& put, FileIdentity const& old);
+    void removeOld(Put const& put, FileIdentity const& old);
     void takeBack(FileIdentity const& current, StoreError const& failure);
     bool isInPlace(FileIdentity const& file);
     std::optional<FileIdentity> identifyRegular(std::string const& name);

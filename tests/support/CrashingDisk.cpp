@@ -1,0 +1,315 @@
+#include "support/CrashingDisk.hpp"
+
+#include <utility>
+
+#include "project/stores/StoreError.hpp"
+
+namespace project::test {
+
+using stores::FileContent;
+using stores::FileIdentity;
+using stores::StoreError;
+using stores::WrittenFile;
+using Trouble = CrashingVolume::Trouble;
+
+namespace {
+
+std::string kindOf(std::string const& name) {
+    if (name.ends_with(".swap.tmp")) {
+        return "swapping";
+    }
+    if (name.ends_with(".tmp")) {
+        return "temporary";
+    }
+    return name.starts_with("displaced-") ? "displaced" : name.starts_with("damaged-") ? "damaged" : name;
+}
+
+} // namespace
+
+CrashingDisk::~CrashingDisk() {
+    unlock();
+}
+
+/// @param part what a call that fails, or in which the process dies, may have done. Told whether the process
+///             goes on.
+template <typename Effect, typename Part>
+auto CrashingDisk::call(std::string const& name, Effect effect, Part part) {
+    if (isDead_) {
+        throw ProcessDied();
+    }
+    volume_->calls.push_back(name);
+    if (volume_->beforeCall) {
+        volume_->beforeCall(name);
+    }
+    auto const trouble = volume_->nextTrouble();
+    bool const before = volume_->pick(1) == 0;
+    if (trouble == Trouble::Fails || trouble == Trouble::FailsForGood) {
+        part(true);
+        throw StoreError(folder(), 0, "the disk fails at \"" + name + "\"", "");
+    }
+    if (trouble == Trouble::Dies && before) {
+        part(false);
+        die();
+    }
+    auto const result = effect();
+    if (trouble == Trouble::Dies) {
+        die();
+    }
+    if (volume_->afterCall) {
+        volume_->afterCall(name);
+    }
+    return result;
+}
+
+template <typename Effect>
+auto CrashingDisk::call(std::string const& name, Effect effect) {
+    return call(name, effect, [](bool) {});
+}
+
+void CrashingDisk::die() {
+    unlock();
+    isDead_ = true;
+    throw ProcessDied();
+}
+
+CrashingVolume::Names& CrashingDisk::names() {
+    if (!folder_) {
+        throw StoreError(folder(), 0, "is not open", "");
+    }
+    return folder_->names;
+}
+
+CrashingDisk::File& CrashingDisk::find(std::string const& name) {
+    auto const found = names().find(name);
+    if (found == names().end()) {
+        throw StoreError(name, 0, "is not there", "");
+    }
+    return *found->second;
+}
+
+bool CrashingDisk::openFolder() {
+    return call("openFolder", [this] {
+        if (volume_->folder_ && volume_->folder_ != folder_) {
+            unlock();
+            folder_ = volume_->folder_;
+        }
+        return volume_->folder_ != nullptr;
+    });
+}
+
+bool CrashingDisk::makeFolder() {
+    return call("makeFolder", [this] {
+        bool const isMade = !volume_->folder_;
+        if (isMade) {
+            volume_->makeFolder();
+        }
+        folder_ = volume_->folder_;
+        return isMade;
+    });
+}
+
+void CrashingDisk::removeFolder() noexcept {
+    if (isDead_) {
+        return;
+    }
+    volume_->calls.emplace_back("removeFolder");
+    unlock();
+    if (folder_ && folder_ == volume_->folder_ && folder_->names.empty()) {
+        volume_->folder_.reset();
+    }
+    folder_.reset();
+}
+
+bool CrashingDisk::isFolderInPlace() {
+    return call("isFolderInPlace", [this] { return folder_ && folder_ == volume_->folder_; });
+}
+
+bool CrashingDisk::lock(std::chrono::milliseconds patience) {
+    return call("lock", [this, patience] {
+        names();
+        if (folder_->lockedBy != nullptr && folder_->lockedBy != this) {
+            volume_->advance(std::chrono::nanoseconds(patience).count());
+            return false;
+        }
+        folder_->lockedBy = this;
+        return true;
+    });
+}
+
+void CrashingDisk::unlock() noexcept {
+    if (folder_ && folder_->lockedBy == this) {
+        folder_->lockedBy = nullptr;
+    }
+}
+
+std::string CrashingDisk::lockHolder() {
+    return call("lockHolder", [] { return std::string("process 4711 (another)"); });
+}
+
+std::optional<FileIdentity> CrashingDisk::identifyIn(CrashingVolume::Folder* where, std::string const& name) {
+    auto const found = where != nullptr ? where->names.find(name) : CrashingVolume::Names::iterator();
+    if (where == nullptr || found == where->names.end()) {
+        return std::nullopt;
+    }
+    if (found->second->isPipe) {
+        throw StoreError(name, 0, "is no regular file", "");
+    }
+    return CrashingVolume::identify(*found->second);
+}
+
+std::optional<FileIdentity> CrashingDisk::identifyByPath(std::string const& name) {
+    return call("identifyByPath " + kindOf(name), [&] { return identifyIn(volume_->folder_.get(), name); });
+}
+
+std::optional<FileIdentity> CrashingDisk::identify(std::string const& name) {
+    return call("identify " + kindOf(name), [&] {
+        names();
+        return identifyIn(folder_.get(), name);
+    });
+}
+
+std::optional<FileContent> CrashingDisk::read(std::string const& name, std::uint64_t offset) {
+    return call("read " + kindOf(name), [&]() -> std::optional<FileContent> {
+        names();
+        auto const identity = identifyIn(folder_.get(), name);
+        if (!identity) {
+            return std::nullopt;
+        }
+        auto const& bytes = find(name).bytes;
+        return FileContent{offset < bytes.size() ? bytes.substr(offset) : std::string(), *identity};
+    });
+}
+
+/// Writes what there is room for, and fails when that is not all.
+void CrashingDisk::writeWithinRoom(File& file, std::string_view bytes) {
+    auto const& room = volume_->room;
+    if (room && *room < bytes.size()) {
+        volume_->write(file, bytes.substr(0, *room));
+        volume_->room = 0;
+        throw StoreError(folder(), 0, "No space left on device", "Make room on the disk and try again.");
+    }
+    if (room) {
+        volume_->room = *room - bytes.size();
+    }
+    volume_->write(file, bytes);
+}
+
+std::optional<WrittenFile> CrashingDisk::append(std::string const& name, FileIdentity const& expected,
+                                                std::string_view bytes) {
+    auto const write = [&]() -> std::optional<WrittenFile> {
+        if (identifyIn(folder_.get(), name) != expected) {
+            return std::nullopt;
+        }
+        written_ = names().find(name)->second;
+        writeWithinRoom(*written_, bytes);
+        bool const isStamped = volume_->stamp(*written_);
+        return WrittenFile{CrashingVolume::identify(*written_), isStamped};
+    };
+    return call("append " + kindOf(name), write, [&](bool) {
+        if (identifyIn(folder_.get(), name) == expected) {
+            volume_->write(find(name), bytes.substr(0, volume_->pick(bytes.size() - 1)));
+        }
+    });
+}
+
+WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes,
+                                 std::optional<std::string> const& like) {
+    auto const make = [&] {
+        written_ = volume_->makeFile("");
+        if (!names().try_emplace(name, written_).second) {
+            throw StoreError(name, 0, "is there already", "");
+        }
+        try {
+            writeWithinRoom(*written_, bytes);
+        } catch (StoreError const&) {
+            names().erase(name);
+            throw;
+        }
+        bool const isStamped = volume_->stamp(*written_);
+        return WrittenFile{CrashingVolume::identify(*written_), isStamped};
+    };
+    return call("create " + kindOf(name) + (like ? " like " + *like : ""), make, [&](bool goesOn) {
+        if (!goesOn) {
+            auto const half = volume_->makeFile("");
+            volume_->write(*half, bytes.substr(0, volume_->pick(bytes.size())));
+            names().try_emplace(name, half);
+        }
+    });
+}
+
+void CrashingDisk::sync() {
+    call(
+        "sync",
+        [this] {
+            volume_->sync(*written_);
+            return true;
+        },
+        [this](bool goesOn) { written_->losesWrites = goesOn; });
+}
+
+bool CrashingDisk::exchange(std::string const& left, std::string const& right) {
+    return call("exchange " + kindOf(left) + " " + kindOf(right), [&] {
+        if (!volume_->canExchange) {
+            return false;
+        }
+        find(left).changed = find(right).changed = volume_->clock_;
+        std::swap(names().at(left), names().at(right));
+        return true;
+    });
+}
+
+void CrashingDisk::rename(std::string const& from, std::string const& to) {
+    call("rename " + kindOf(from) + " " + kindOf(to), [&] {
+        find(from).changed = volume_->clock_;
+        auto const moved = names().at(from);
+        names().erase(from);
+        names()[to] = moved;
+        return true;
+    });
+}
+
+bool CrashingDisk::renameToFree(std::string const& from, std::string const& to) {
+    return call("renameToFree " + kindOf(from) + " " + kindOf(to), [&] {
+        find(from).changed = volume_->clock_;
+        bool const isFree = names().try_emplace(to, names().at(from)).second;
+        if (isFree) {
+            names().erase(from);
+        }
+        return isFree;
+    });
+}
+
+bool CrashingDisk::remove(std::string const& name) {
+    return call("remove " + kindOf(name), [&] { return names().erase(name) > 0; });
+}
+
+void CrashingDisk::syncFolder() {
+    call("syncFolder", [this] {
+        folder_->durable = names();
+        return true;
+    });
+}
+
+std::vector<std::string> CrashingDisk::list() {
+    return call("list", [this] {
+        std::vector<std::string> result;
+        for (auto const& [name, file] : names()) {
+            result.push_back(name);
+        }
+        return result;
+    });
+}
+
+std::int64_t CrashingDisk::now() {
+    return volume_->clock_;
+}
+
+void CrashingDisk::pause(std::chrono::milliseconds time) {
+    volume_->calls.emplace_back("pause");
+    if (volume_->beforeCall) {
+        volume_->beforeCall("pause");
+    }
+    volume_->advance(std::chrono::nanoseconds(time).count());
+}
+
+} // namespace project::test
