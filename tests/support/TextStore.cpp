@@ -95,6 +95,7 @@ std::string textOf(Batch const& body, std::vector<Batch> const& tail) {
 }
 
 void TextStore::prepare(std::vector<std::u16string> const& files) const {
+    volume->removeFolder();
     commit(*open(), addFiles(files));
     volume->advanceBeyondTick();
     volume->calls.clear();

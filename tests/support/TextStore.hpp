@@ -103,10 +103,10 @@ protected:
         return std::make_unique<TextBackend>(std::make_unique<CrashingDisk>(volume), options);
     }
 
-    /// A store with these files, closed and settled.
+    /// Makes a store with just these files, closed and settled.
     void prepare(std::vector<std::u16string> const& files) const;
 
-    /// A store with this text, as git brings it.
+    /// Makes a store with this text, as git brings it.
     void prepareText(std::string text) const;
 
     /// What another process reads in the project now.

@@ -1,0 +1,331 @@
+#include "support/TextStore.hpp"
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::SizeIs;
+
+namespace project::test {
+
+namespace {
+
+/// Git, editors and other writers at every moment of a batch of ours.
+class TextBackendStrangers : public TextStore {
+protected:
+    /// Acts once, before or after the first call of a name.
+    void once(std::function<void(std::string const&)>& moment, std::string call,
+              std::function<void()> action) const {
+        moment = [call = std::move(call), action = std::move(action),
+                  done = false](std::string const& now) mutable {
+            if (now == call && !std::exchange(done, true)) {
+                action();
+            }
+        };
+    }
+
+    std::string const theirs = textOf(addFiles({u"their file"}));
+    std::vector<std::string> const usual{".gitattributes", ".gitignore", "project.jsonl"};
+};
+
+TEST_F(TextBackendStrangers, aTextThatWasReplacedBeforeTheBatchStaysAndTheBatchIsNotInIt) {
+    for (auto const& options : {rewriting(), appending()}) {
+        prepare(manyFiles(20));
+        auto const backend = open(options);
+        Entered const entered(*backend, Access::Write);
+        backend->write(addFiles({u"b"}));
+        volume->replaceFile("project.jsonl", theirs);
+
+        EXPECT_THAT(errorOf([&] { backend->keep(); }).getProblem(), HasSubstr("by another program"));
+
+        backend->discard();
+        EXPECT_EQ(theirs, text());
+        EXPECT_EQ(usual, volume->names());
+        EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), loadAll(*backend)) << "the guard shows one state";
+    }
+}
+
+TEST_F(TextBackendStrangers, aTextThatWasChangedInPlaceBeforeTheBatchStays) {
+    for (auto const& options : {rewriting(), appending()}) {
+        prepare(manyFiles(20));
+        auto const backend = open(options);
+        Entered const entered(*backend, Access::Write);
+        backend->write(addFiles({u"b"}));
+        volume->advance(4'000'000);
+        volume->overwrite("project.jsonl", theirs);
+
+        EXPECT_THROW(backend->keep(), StoreError);
+
+        backend->discard();
+        EXPECT_EQ(theirs, text());
+    }
+}
+
+TEST_F(TextBackendStrangers, aTextThatComesBetweenTheLookAndTheExchangeIsPutBack) {
+    prepare({u"a"});
+    auto const backend = open();
+    once(volume->beforeCall, "exchange swapping project.jsonl",
+         [&] { volume->replaceFile("project.jsonl", theirs); });
+
+    EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
+
+    EXPECT_EQ(theirs, text());
+    EXPECT_EQ(usual, volume->names());
+    EXPECT_EQ(contentAfter({addFiles({u"their file"})}), contentOf(*backend));
+    commit(*backend, addFiles({u"b"}));
+    EXPECT_EQ(contentAfter({addFiles({u"their file", u"b"})}), stored());
+}
+
+TEST_F(TextBackendStrangers, aPipeThatComesBetweenIsPutBackToo) {
+    prepare({u"a"});
+    auto const backend = open();
+    once(volume->beforeCall, "exchange swapping project.jsonl", [&] { volume->putPipe("project.jsonl"); });
+
+    EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
+
+    EXPECT_EQ(usual, volume->names());
+    EXPECT_THROW(contentOf(*backend), StoreError);
+}
+
+TEST_F(TextBackendStrangers, ofTwoTextsThatComeBetweenNoneIsLost) {
+    prepare({u"a"});
+    auto const backend = open();
+    auto const second = textOf(addFiles({u"their second file"}));
+    int exchanges = 0;
+    volume->beforeCall = [&](std::string const& call) {
+        if (call == "exchange swapping project.jsonl") {
+            volume->replaceFile("project.jsonl", ++exchanges == 1 ? theirs : second);
+        }
+    };
+
+    EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
+
+    auto const aside = volume->namesLike("displaced-");
+    ASSERT_THAT(aside, SizeIs(1));
+    EXPECT_EQ(theirs, text());
+    EXPECT_EQ(second, volume->content(aside.front()));
+}
+
+TEST_F(TextBackendStrangers, aTextThatCannotBePutBackIsSetAsideAndNamed) {
+    prepare({u"a"});
+    auto const backend = open();
+    int exchanges = 0;
+    volume->beforeCall = [&](std::string const& call) {
+        if (call == "exchange swapping project.jsonl") {
+            if (++exchanges == 2) {
+                throw StoreError("", 0, "Input/output error", "");
+            }
+            volume->replaceFile("project.jsonl", theirs);
+        }
+    };
+
+    auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
+
+    auto const aside = volume->namesLike("displaced-");
+    ASSERT_THAT(aside, SizeIs(1));
+    EXPECT_THAT(error.getProblem(), HasSubstr(aside.front()));
+    EXPECT_EQ(theirs, volume->content(aside.front()));
+    auto const faults = backend->check();
+    ASSERT_THAT(faults, SizeIs(1));
+    EXPECT_EQ(stores::Fault::Kind::Displaced, faults.front().kind);
+    EXPECT_THAT(faults.front().problem, HasSubstr(aside.front()));
+}
+
+TEST_F(TextBackendStrangers, aTextThatReplacesOursRightAfterTheWriteWinsAndTheBatchThrows) {
+    for (auto const& [options, call] :
+         {std::pair{rewriting(), "exchange swapping project.jsonl"},
+          std::pair{appending(), "append project.jsonl"}, std::pair{appending(), "sync"}}) {
+        prepare(manyFiles(20));
+        auto const backend = open(options);
+        once(volume->afterCall, call, [&] { volume->replaceFile("project.jsonl", theirs); });
+
+        EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError) << call;
+
+        volume->afterCall = nullptr;
+        EXPECT_EQ(theirs, text());
+        EXPECT_EQ(usual, volume->names());
+    }
+}
+
+TEST_F(TextBackendStrangers, aFolderThatWasMovedAwayDoesNotComeBackWithTheBatch) {
+    for (auto const& [options, call] :
+         {std::pair{rewriting(), "create temporary like project.jsonl"},
+          std::pair{rewriting(), "exchange swapping project.jsonl"},
+          std::pair{appending(), "append project.jsonl"}, std::pair{appending(), "sync"}}) {
+        prepare(manyFiles(20));
+        auto const backend = open(options);
+        std::function<void()> bringBack;
+        once(volume->afterCall, call, [&] { bringBack = volume->moveFolderAway(); });
+
+        EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError) << call;
+
+        volume->afterCall = nullptr;
+        EXPECT_THAT(volume->names(), IsEmpty());
+        bringBack();
+        EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), stored()) << call;
+        EXPECT_EQ(usual, volume->names());
+    }
+}
+
+TEST_F(TextBackendStrangers, whatSomebodyAppendsAfterOurBatchIsSeenAtTheNextGuard) {
+    prepare(manyFiles(20));
+    auto const backend = open(appending());
+    once(volume->afterCall, "append project.jsonl", [&] { volume->append("project.jsonl", "\"torn"); });
+    commit(*backend, addFiles({u"b"}));
+    volume->afterCall = nullptr;
+    writes();
+
+    commit(*backend, addFiles({u"c"}));
+
+    EXPECT_EQ("create temporary like project.jsonl", writes().front());
+    EXPECT_EQ(contentAfter({addFiles(manyFiles(20)), addFiles({u"b", u"c"})}), stored());
+}
+
+TEST_F(TextBackendStrangers, aProcessThatDiesWithAStrangersTextInItsHandsNeverLosesIt) {
+    for (unsigned seed = 0; seed < 10; ++seed) {
+        bool wasReached = true;
+        for (std::size_t call = 0; wasReached; ++call) {
+            *volume = CrashingVolume(seed);
+            prepare({u"a"});
+            once(volume->beforeCall, "exchange swapping project.jsonl",
+                 [&] { volume->replaceFile("project.jsonl", theirs); });
+            auto backend = open();
+            volume->plan(CrashingVolume::Trouble::Dies, call);
+            bool died = false;
+            try {
+                commit(*backend, addFiles({u"b"}));
+            } catch (ProcessDied const&) {
+                died = true;
+            } catch (StoreError const&) {
+            }
+            wasReached = !volume->cancelPlan();
+            bool const hadCome = volume->count("exchange swapping project.jsonl") > 0;
+            volume->beforeCall = nullptr;
+
+            commit(*open(), addFiles({u"c"}));
+
+            if (hadCome) {
+                EXPECT_EQ(contentAfter({addFiles({u"their file", u"c"})}), stored())
+                    << call << " of " << seed;
+            } else {
+                EXPECT_TRUE(died);
+            }
+            EXPECT_EQ(usual, volume->names()) << call << " of " << seed;
+        }
+    }
+}
+
+TEST_F(TextBackendStrangers, aStrangersTextIsSetAsideWhereItsPlaceIsTakenByThen) {
+    prepare({u"a"});
+    once(volume->beforeCall, "exchange swapping project.jsonl", [&] {
+        volume->replaceFile("project.jsonl", theirs);
+        volume->plan(CrashingVolume::Trouble::Dies, 1); // before it can be put back
+    });
+    EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
+    volume->beforeCall = nullptr;
+    volume->replaceFile("project.jsonl", textOf(addFiles({u"d"})));
+
+    commit(*open(), addFiles({u"c"}));
+
+    EXPECT_EQ(contentAfter({addFiles({u"c", u"d"})}), stored());
+    auto const aside = volume->namesLike("displaced-");
+    ASSERT_THAT(aside, SizeIs(1));
+    EXPECT_EQ(theirs, volume->content(aside.front()));
+}
+
+TEST_F(TextBackendStrangers, temporaryFilesOfDeadWritersGoWhenAWriterOpensAndOthersStay) {
+    prepare({u"a"});
+    volume->replaceFile("project.jsonl.123-0123456789abcdef.tmp", "half");
+    volume->replaceFile("project.jsonl.orig", "an editor's");
+    volume->replaceFile("notes.txt", "somebody's");
+    volume->putPipe("project.jsonl.123-pipe.tmp");
+    auto const backend = open();
+    contentOf(*backend);
+    EXPECT_TRUE(volume->has("project.jsonl.123-0123456789abcdef.tmp")) << "readers change nothing";
+
+    Entered const entered(*backend, Access::Write);
+
+    EXPECT_THAT(volume->namesLike("project.jsonl"), ElementsAre("project.jsonl", "project.jsonl.orig"));
+    EXPECT_TRUE(volume->has("notes.txt"));
+    EXPECT_THAT(volume->namesLike("displaced-"), SizeIs(1));
+}
+
+TEST_F(TextBackendStrangers, leftoversThatCannotBeRemovedStopNobody) {
+    prepare({u"a"});
+    volume->replaceFile("project.jsonl.123-0123456789abcdef.tmp", "half");
+    volume->beforeCall = [](std::string const& call) {
+        if (call == "remove temporary") {
+            throw StoreError("", 0, "Read-only file system", "");
+        }
+    };
+    auto const backend = open();
+
+    Entered const entered(*backend, Access::Write);
+
+    EXPECT_EQ(contentAfter({addFiles({u"a"})}), loadAll(*backend));
+}
+
+TEST_F(TextBackendStrangers, anotherWriterIsWaitedForAndThenNamed) {
+    prepare({u"a"});
+    auto const other = open();
+    Entered const theirGuard(*other, Access::Write);
+    auto const backend = open();
+
+    auto const error = errorOf([&] { backend->enter(Access::Write); });
+
+    EXPECT_EQ("/project/.projectdata", error.getFile());
+    EXPECT_EQ("is being written by process 4711 (another)", error.getProblem());
+    EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers wait for nobody";
+}
+
+TEST_F(TextBackendStrangers, aGuardThatFailsLetsTheLockGo) {
+    prepare({u"a"});
+    auto const backend = open();
+    contentOf(*backend);
+    volume->overwrite("project.jsonl", "");
+    EXPECT_THROW(backend->enter(Access::Write), StoreError);
+    volume->overwrite("project.jsonl", theirs);
+
+    EXPECT_NO_THROW(commit(*open(), addFiles({u"b"})));
+}
+
+TEST_F(TextBackendStrangers, aFolderThatIsReplacedWhileWeWaitForItsLockIsOpenedAnew) {
+    prepare({u"a"});
+    auto const backend = open();
+    once(volume->beforeCall, "lock", [&] {
+        volume->moveFolderAway();
+        volume->replaceFile("project.jsonl", theirs);
+    });
+
+    commit(*backend, addFiles({u"b"}));
+
+    EXPECT_EQ(contentAfter({addFiles({u"their file", u"b"})}), stored());
+}
+
+TEST_F(TextBackendStrangers, aStoreThatSomebodyElseMakesMeanwhileIsNotOverwritten) {
+    auto const backend = open();
+    Entered const entered(*backend, Access::Write);
+    commit(*open(), addFiles({u"their file"}));
+
+    auto const error = errorOf([&] { backend->write(addFiles({u"b"})); });
+
+    EXPECT_THAT(error.getProblem(), HasSubstr("was made by another process"));
+    backend->discard();
+    EXPECT_EQ(contentAfter({addFiles({u"their file"})}), stored());
+    EXPECT_EQ(usual, volume->names());
+}
+
+TEST_F(TextBackendStrangers, aTextThatGitBringsWhileTheStoreIsMadeIsNotOverwritten) {
+    auto const backend = open();
+    once(volume->beforeCall, "renameToFree temporary project.jsonl",
+         [&] { volume->replaceFile("project.jsonl", theirs); });
+
+    EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
+
+    EXPECT_EQ(theirs, text());
+    commit(*backend, addFiles({u"b"}));
+    EXPECT_EQ(contentAfter({addFiles({u"their file", u"b"})}), stored());
+}
+
+} // namespace
+
+} // namespace project::test
