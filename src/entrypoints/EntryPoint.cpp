@@ -1,7 +1,5 @@
 #include "project/entrypoints/EntryPoint.hpp"
 
-#include <ranges>
-
 #include "entrypoints/EntryPointGroupBase.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
@@ -61,8 +59,12 @@ std::optional<std::u16string> EntryPointDefinition::getExtensionData(std::u16str
 }
 
 std::vector<std::u16string> EntryPointDefinition::getExtensionKeys() const {
-    auto const keys = std::views::keys(extensionData_);
-    return {keys.begin(), keys.end()};
+    std::vector<std::u16string> result;
+    result.reserve(extensionData_.size());
+    for (auto const& [key, value] : extensionData_) {
+        result.push_back(key);
+    }
+    return result;
 }
 
 EntryPointDefinition& EntryPointDefinition::setName(std::u16string const& name) {

@@ -1,6 +1,5 @@
 #include "entrypoints/EntryPointBase.hpp"
 
-#include <ranges>
 #include <utility>
 
 namespace project::management {
@@ -47,8 +46,12 @@ std::optional<std::u16string> EntryPointBase::getExtensionData(std::u16string co
 }
 
 std::vector<std::u16string> EntryPointBase::getExtensionKeys() const {
-    auto const keys = std::views::keys(extensionData_);
-    return {keys.begin(), keys.end()};
+    std::vector<std::u16string> result;
+    result.reserve(extensionData_.size());
+    for (auto const& [key, value] : extensionData_) {
+        result.push_back(key);
+    }
+    return result;
 }
 
 } // namespace project::management
