@@ -38,12 +38,11 @@ JsonContentScan scanJsonContent(std::string_view text, std::size_t from) noexcep
 /// Where two texts first differ, or the length of the shorter one.
 std::size_t firstDifference(std::string_view left, std::string_view right) noexcept;
 
-/// True when the bytes before a position, and the one there, belong to no escape, so that what stands for
-/// one code unit or a raw character begins or goes on there.
+/// True when no escape begins at a position of a canonical content or right before it. Where two contents
+/// first differ so, their bytes compare as their texts do: raw characters by codeUnitRank, and so do the
+/// digits within an escape.
 inline bool isUnescapedAt(std::string_view content, std::size_t position) noexcept {
-    constexpr std::size_t longestEscape = 6;
-    std::size_t const from = position < longestEscape ? 0 : position - (longestEscape - 1);
-    return content.substr(from, position + 1 - from).find('\\') == std::string_view::npos;
+    return content[position] != '\\' && (position == 0 || content[position - 1] != '\\');
 }
 
 /// A place for each byte such that comparing raw UTF-8 by it gives the order of UTF-16 code units: characters

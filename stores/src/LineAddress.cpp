@@ -156,7 +156,7 @@ bool isWithin(LineAddress const& address, LineAddress const& other) noexcept {
         std::size_t const length = other.text.size();
         bool const begins = address.text.substr(0, length) == other.text;
         bool const same = address.text.size() == length;
-        return begins && (same || (address.text[length] == '/' && other.text.back() != '/'));
+        return begins && (same || address.text[length] == '/');
     }
     LineSteps steps(address);
     LineSteps otherSteps(other);
