@@ -13,7 +13,8 @@ namespace project::management {
 /// The categories and labels over a metadata store. Nothing is kept in memory: each call goes to the store.
 ///
 /// Only definitions are kept here. What stands on files is cleaned through the file manager before a
-/// definition goes, so that no file keeps a label that nobody can resolve.
+/// definition goes, so that files don't keep labels that nobody can resolve; a label that stands twice on a
+/// file is taken off once by deleteLabel, as by FileManager::removeLabels.
 class LabelManagerBase : public LabelManager {
 public:
     /// Neither store nor file manager is touched.
