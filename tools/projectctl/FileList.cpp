@@ -1,6 +1,8 @@
 #include "FileList.hpp"
 
+#include <string_view>
 #include <utility>
+#include <vector>
 
 #include "Schema.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
@@ -9,11 +11,12 @@ namespace projectctl {
 
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
+using project::stores::Child;
 
 /// A folder whose contents are being visited.
 struct FileList::Open {
     MetadataPath address;
-    std::vector<File> files;
+    project::stores::Children files;
     std::size_t next;
     std::size_t pathLength; ///< of the folder, with the separator behind it
 };
@@ -22,30 +25,25 @@ FileList::FileList(OpenProject& project) : project_(project), guard_(project.sto
 }
 
 MetadataPath FileList::addressOf(Path const& path) const {
-    auto result = MetadataPath::root().child(PathElement(schema::files, schema::root));
+    auto result =
+        MetadataPath::root().child(PathElement(std::u16string(schema::files), std::u16string(schema::root)));
     auto const relative = project::metadata::getRelativePath(project_.root(), path);
     for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
-        result = below(result, std::u16string(fl::filesystem::detail::extract_first_element(rest)));
+        auto const name = fl::filesystem::detail::extract_first_element(rest);
+        result = result.child(PathElement(std::u16string(schema::file), std::u16string(name)));
     }
     return result;
 }
 
-MetadataPath FileList::below(MetadataPath const& folder, std::u16string name) {
-    return folder.child(PathElement(schema::file, std::move(name)));
-}
-
 FileList::Level FileList::level(MetadataPath const& address) const {
     Level result;
-    auto const children = project_.text().load(address);
-    result.files.reserve(children.size());
-    for (auto const& child : children) {
-        auto const& type = child.element.getType();
-        if (type == schema::file) {
-            result.files.push_back({child.element.getLocation(), child.node != nullptr, child.hasChildren});
-        } else if (type == schema::folderMarker) {
+    result.files = project_.text().load(address);
+    std::erase_if(result.files, [&result](Child const& child) {
+        if (child.element.getType() == schema::folderMarker) {
             result.kind = Kind::Folder;
         }
-    }
+        return child.element.getType() != schema::file;
+    });
     return result;
 }
 
@@ -73,16 +71,16 @@ void FileList::visitBelow(MetadataPath start, Level level, std::u16string path, 
             open.pop_back();
             continue;
         }
-        auto& file = folder.files[folder.next++];
-        if (!file.isInProject) {
-            continue; // nor is what lies below it, for the file manager
+        auto const& file = folder.files[folder.next++];
+        if (!file.node) {
+            continue;
         }
-        path += file.name;
-        if (!file.hasBelow) {
+        path += file.element.getLocation();
+        if (!file.hasChildren) {
             visitor(path, depth + open.size() - 1, Kind::File);
             continue;
         }
-        auto address = below(folder.address, std::move(file.name));
+        auto address = folder.address.child(file.element);
         auto content = this->level(address);
         visitor(path, depth + open.size() - 1, content.kind);
         path += u'/';

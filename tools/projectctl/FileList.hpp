@@ -2,8 +2,6 @@
 
 #include <functional>
 #include <string>
-#include <string_view>
-#include <vector>
 
 #include "Kind.hpp"
 #include "OpenProject.hpp"
@@ -19,26 +17,17 @@ class FileList {
 public:
     explicit FileList(OpenProject& project);
 
-    /// One step of the list and what lies below it.
-    struct File {
-        std::u16string name;
-        bool isInProject; ///< false for a step that only leads to others
-        bool hasBelow;
-    };
-
+    /// What the store has at one address of the list.
     struct Level {
-        Kind kind = Kind::File;  ///< of what the address leads to
-        std::vector<File> files; ///< directly below it, by name in code units
+        Kind kind = Kind::File;          ///< of what the address leads to
+        project::stores::Children files; ///< directly below it, by name in code units
     };
 
     /// The address of a file. @param path absolute, the project's root or below it.
     project::metadata::MetadataPath addressOf(Path const& path) const;
 
-    /// The address of a file in a folder.
-    static project::metadata::MetadataPath below(project::metadata::MetadataPath const& folder,
-                                                 std::u16string name);
-
-    /// What the store has at an address of the list; nothing for one that does not exist.
+    /// Empty for an address that does not exist. A file below it without a node is not in the project, nor is
+    /// what lies below that.
     Level level(project::metadata::MetadataPath const& address) const;
 
     /// Called with the path relative to the root, with how many folders lie between it and where the walk

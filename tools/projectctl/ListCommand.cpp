@@ -37,8 +37,8 @@ public:
     int run() override {
         auto project = OpenProject::ofWorkingFolder();
         auto const path = path_ ? ArgumentPaths(workingFolder()).absolute(*path_) : project.root();
+        project.warnOfDamage(); // first: it reads the text, and the list needs no second look at the disk
         writeList(project, path);
-        project.warnOfDamage();
         return 0;
     }
 

@@ -122,13 +122,18 @@ void appendJsonAscii(std::string& out, char unit) {
 } // namespace
 
 void appendBytes(std::string& out, std::u16string_view name) {
-    if (std::all_of(name.begin(), name.end(), [](char16_t unit) { return unit != 0 && unit < 0x80; })) {
-        auto const before = out.size();
-        out.resize(before + name.size());
-        std::transform(name.begin(), name.end(), out.begin() + static_cast<std::ptrdiff_t>(before),
-                       [](char16_t unit) { return static_cast<char>(unit); });
+    auto const before = out.size();
+    out.resize(before + name.size());
+    auto* to = out.data() + before;
+    bool isAscii = true;
+    for (auto const unit : name) { // one pass without a way out of it, which is what a million names are for
+        isAscii = isAscii && unit != 0 && unit < 0x80;
+        *to++ = static_cast<char>(unit);
+    }
+    if (isAscii) {
         return;
     }
+    out.resize(before);
     fl::filesystem::SystemName const onDisk{fl::filesystem::Path(std::u16string(name))};
     out += onDisk.get() != nullptr ? std::string(onDisk.get()) : fl::i18n::toUtf8(name);
 }

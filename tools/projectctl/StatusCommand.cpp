@@ -30,16 +30,14 @@ public:
         Progress progress("Comparing the project with the disk");
         auto project = OpenProject::ofWorkingFolder();
         root_ = project.root();
-        {
-            StatusScan scan(project, progress);
-            scan.run();
-            for (auto const& line : scan.unreadable()) {
-                printError("warning: " + line);
-            }
-            auto const added = gitignore_ ? withoutIgnored(scan.added()) : scan.added();
-            json_ ? writeJson(added, scan.gone()) : writeLines(added, scan.gone());
-        }
         project.warnOfDamage();
+        StatusScan scan(project, progress);
+        scan.run();
+        for (auto const& line : scan.unreadable()) {
+            printError("warning: " + line);
+        }
+        auto const added = gitignore_ ? withoutIgnored(scan.added()) : scan.added();
+        json_ ? writeJson(added, scan.gone()) : writeLines(added, scan.gone());
         return 0;
     }
 

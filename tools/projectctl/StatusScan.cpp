@@ -1,11 +1,25 @@
 #include "StatusScan.hpp"
 
 #include <system_error>
-#include <utility>
-
-#include "DiskFolder.hpp"
 
 namespace projectctl {
+
+using project::stores::Child;
+
+namespace {
+
+using Listed = project::stores::Children::const_iterator;
+using Found = std::vector<DiskEntry>::const_iterator;
+
+/// Which of two sorted lists has the next name: below 0 the first, above 0 the second, 0 both.
+int orderOf(Listed file, Listed lastFile, Found entry, Found lastEntry) {
+    if (file == lastFile || entry == lastEntry) {
+        return file == lastFile ? 1 : -1;
+    }
+    return file->element.getLocation().compare(entry->name);
+}
+
+} // namespace
 
 StatusScan::StatusScan(OpenProject& project, Progress& progress)
     : root_(project.root()), list_(project), progress_(progress) {
@@ -17,53 +31,54 @@ void StatusScan::run() {
 }
 
 void StatusScan::compare(Path const& folder, Address const& address,
-                         std::vector<FileList::File> const& listed) {
+                         project::stores::Children const& listed) {
     std::vector<DiskEntry> onDisk;
     try {
         onDisk = readDiskFolder(folder);
     } catch (std::system_error const& error) {
         unreadable_.emplace_back(error.what());
     }
-    auto file = listed.begin();
-    auto entry = onDisk.begin();
+    auto file = listed.cbegin();
+    auto entry = onDisk.cbegin();
     while (file != listed.end() || entry != onDisk.end()) { // both are sorted by name
         progress_.reach(++seen_);
-        if (entry == onDisk.end() || (file != listed.end() && file->name < entry->name)) {
-            if (file->isInProject) {
-                lookFor(folder / Path(file->name), FileList::below(address, file->name));
-            }
-            ++file;
-            continue;
+        auto const order = orderOf(file, listed.end(), entry, onDisk.end());
+        if (order < 0) {
+            lookFor(folder, address, *file);
+        } else if (order > 0 || !file->node) {
+            takeAdded(folder, *entry);
+        } else if (entry->kind == Kind::Folder) {
+            auto const below = address.child(file->element);
+            compare(folder / Path(entry->name), below, list_.level(below).files);
+        } else {
+            compareListed(folder / Path(entry->name), address.child(file->element));
         }
-        bool const sameName = file != listed.end() && file->name == entry->name;
-        if (sameName && file->isInProject) {
-            if (entry->kind == Kind::Folder) {
-                auto const below = FileList::below(address, file->name);
-                compare(folder / Path(entry->name), below, list_.level(below).files);
-            } else if (file->hasBelow) {
-                compareListed(folder / Path(entry->name), FileList::below(address, file->name));
-            }
-        } else if (folder != root_ || !entry->name.starts_with(u"..")) { // those cannot be added
-            added_.push_back({folder / Path(entry->name), entry->kind});
-        }
-        file += sameName ? 1 : 0;
-        ++entry;
+        file += order <= 0 ? 1 : 0;
+        entry += order >= 0 ? 1 : 0;
     }
 }
 
 void StatusScan::compareListed(Path const& path, Address const& address) {
     for (auto const& file : list_.level(address).files) {
-        if (file.isInProject) {
-            lookFor(path / Path(file.name), FileList::below(address, file.name));
-        }
+        lookFor(path, address, file);
     }
 }
 
-void StatusScan::lookFor(Path const& path, Address const& address) {
+void StatusScan::lookFor(Path const& folder, Address const& address, Child const& file) {
+    auto const path = folder / Path(file.element.getLocation());
+    if (!file.node) {
+        return; // it is not in the project
+    }
     if (isOnDisk(path)) {
-        compareListed(path, address); // it is of a kind that is left out on disk, but somebody added it
+        compareListed(path, address.child(file.element)); // of a kind that is left out, but somebody added it
     } else {
         takeGone(path);
+    }
+}
+
+void StatusScan::takeAdded(Path const& folder, DiskEntry const& entry) {
+    if (folder != root_ || !entry.name.starts_with(u"..")) { // those cannot be added
+        added_.push_back({folder / Path(entry.name), entry.kind});
     }
 }
 

@@ -3,6 +3,7 @@
 #include <string>
 #include <vector>
 
+#include "DiskFolder.hpp"
 #include "FileList.hpp"
 #include "OpenProject.hpp"
 #include "Progress.hpp"
@@ -35,9 +36,10 @@ public:
 private:
     using Address = project::metadata::MetadataPath;
 
-    void compare(Path const& folder, Address const& address, std::vector<FileList::File> const& listed);
+    void compare(Path const& folder, Address const& address, project::stores::Children const& listed);
     void compareListed(Path const& path, Address const& address);
-    void lookFor(Path const& path, Address const& address);
+    void lookFor(Path const& folder, Address const& address, project::stores::Child const& file);
+    void takeAdded(Path const& folder, DiskEntry const& entry);
     void takeGone(Path const& path);
 
     Path root_;

@@ -54,8 +54,8 @@ bool isOneOf(std::u16string const& text, std::initializer_list<std::u16string_vi
 
 MetadataPath categoryAddress(std::u16string const& uuid) {
     return MetadataPath::root()
-        .child(PathElement(schema::categories, schema::root))
-        .child(PathElement(schema::category, uuid));
+        .child(PathElement(std::u16string(schema::categories), std::u16string(schema::root)))
+        .child(PathElement(std::u16string(schema::category), uuid));
 }
 
 } // namespace
@@ -144,7 +144,7 @@ void TreeCheck::checkLabelOn(Address const& file, Node const& category, std::u16
     if (!store_.hasNode(address)) {
         fault("the file " + quoted(pathOf(file)) + " bears a label of the category " + quoted(uuid) +
               ", which does not exist");
-    } else if (!store_.pathExists(address.child(PathElement(schema::label, labelUuid)))) {
+    } else if (!store_.pathExists(address.child(PathElement(std::u16string(schema::label), labelUuid)))) {
         fault("the file " + quoted(pathOf(file)) + " bears the label " + quoted(labelUuid) +
               ", which does not exist");
     }
