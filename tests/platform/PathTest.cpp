@@ -64,7 +64,8 @@ TEST(Path, keepsItsTextAsGiven) {
 
 TEST(Path, theFlagTravelsWithCopies) {
     Path const path(u"a");
-    Path const copy = path;
+    Path copy;
+    copy = path;
 
     EXPECT_TRUE(copy.isNativeForm());
     EXPECT_EQ(copy, path);

@@ -81,7 +81,7 @@ public:
     }
 
     friend bool operator<(basic_path const& left, basic_path const& right) noexcept {
-        return detail::compare_elements(left.native_, right.native_) < 0;
+        return std::is_lt(detail::compare_elements(left.native_, right.native_));
     }
 
 private:
