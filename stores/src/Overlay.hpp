@@ -2,7 +2,6 @@
 
 #include <cstddef>
 #include <map>
-#include <ranges>
 
 #include "project/stores/Backend.hpp"
 
@@ -42,7 +41,18 @@ public:
     };
 
     using Entries = std::map<Address, Entry, Order>;
-    using Range = std::ranges::subrange<Entries::const_iterator>;
+
+    /// Entries one behind the other.
+    struct Range {
+        Entries::const_iterator first;
+        Entries::const_iterator last;
+
+        Entries::const_iterator begin() const noexcept { return first; }
+
+        Entries::const_iterator end() const noexcept { return last; }
+
+        bool empty() const noexcept { return first == last; }
+    };
 
     /// Takes one step of a batch.
     void apply(Change const& change);

@@ -39,9 +39,11 @@ public:
     std::optional<std::vector<Address>> extend(std::string_view added);
 
     /// The lines of a batch with its closing line, to be appended behind this text.
+    /// @throws StoreError when an address or a node is deeper than what the text can hold.
     std::string tailFor(Batch const& batch) const;
 
     /// This text with a batch in it (perhaps an empty one), as a body without a tail. Damage is left out.
+    /// @throws StoreError as tailFor does.
     ProjectText rewrittenWith(Batch const& batch) const;
 
     /// The addresses at which a node differs, came or went, from this text to the other; the root's address
