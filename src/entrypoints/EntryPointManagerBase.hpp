@@ -28,6 +28,8 @@ public:
     std::vector<std::unique_ptr<EntryPoint>> getEntryPoints() override;
     std::unique_ptr<EntryPoint> getEntryPoint(Path file) override;
     void removeEntryPoint(Path file) override;
+
+    // The group operations stand in EntryPointManagerGroups.cpp.
     std::vector<std::unique_ptr<EntryPointGroup>> getEntryPointGroups() override;
     void deleteEntryPointGroup(EntryPointGroup const& group) override;
     void createEntryPointGroup(EntryPointGroup const& group) override;
