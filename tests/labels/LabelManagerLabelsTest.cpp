@@ -206,18 +206,18 @@ TEST_F(DeleteLabelTest, isDecidedByTheStateOfTheLabelGivenAndForAnInheritedOneBy
         bool allowed;
     };
 
-    for (auto const& [category, state, allowed] :
+    for (auto const& each :
          {Case{color, State::WRITABLE, true}, Case{color, State::INHERITED, true},
           Case{color, State::READ_ONLY, false}, Case{readOnlyColor, State::WRITABLE, true},
           Case{readOnlyColor, State::INHERITED, false}, Case{readOnlyColor, State::READ_ONLY, false}}) {
-        auto const given = label(u"Red", u"l-red", state);
-        define(category, {given});
+        auto const given = label(u"Red", u"l-red", each.state);
+        define(each.category, {given});
         store->clear();
-        if (allowed) {
-            labels.deleteLabel(category, given);
+        if (each.allowed) {
+            labels.deleteLabel(each.category, given);
             EXPECT_FALSE(store->content().pathExists(labelAt(color, given)));
         } else {
-            EXPECT_RAISES(CanNotModifyReadOnlyLabel, (), labels.deleteLabel(category, given));
+            EXPECT_RAISES(CanNotModifyReadOnlyLabel, (), labels.deleteLabel(each.category, given));
             EXPECT_THAT(store->operations(), IsEmpty());
         }
     }

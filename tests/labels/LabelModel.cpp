@@ -50,7 +50,7 @@ void LabelModel::add(Paths const& paths) {
 
 LabelModel::Paths LabelModel::remove(Paths const& paths) {
     std::set<Path> all(paths.begin(), paths.end());
-    for (auto const& [file, content] : files_) {
+    for (auto const& file : getProjectFiles()) {
         if (std::any_of(paths.begin(), paths.end(), [&](Path const& path) { return isBelow(file, path); })) {
             all.insert(file);
         }

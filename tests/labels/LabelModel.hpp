@@ -80,7 +80,7 @@ public:
     using LabelIDSet = management::LabelIDSet;
     using Paths = std::vector<Path>;
 
-    /// @param onDisk all that is on disk below the root.
+    /// @param onDisk all that is on disk below the root, the store's files left out.
     LabelModel(Path root, Path metadataRoot, Paths onDisk)
         : root_(std::move(root)), metadataRoot_(std::move(metadataRoot)), onDisk_(std::move(onDisk)) {}
 
