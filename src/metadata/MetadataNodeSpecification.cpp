@@ -5,7 +5,8 @@
 
 namespace project::metadata {
 
-MetadataNodeSpecification::MetadataNodeSpecification(std::u16string type) : type_(std::move(type)) {}
+MetadataNodeSpecification::MetadataNodeSpecification(std::u16string type) : type_(std::move(type)) {
+}
 
 MetadataNodeSpecification::MetadataNodeSpecification(MetadataNode const& other) : type_(other.getType()) {
     for (auto& key : other.getKeys()) {
@@ -19,7 +20,8 @@ MetadataNodeSpecification::MetadataNodeSpecification(MetadataNode const& other) 
 }
 
 MetadataNodeSpecification::MetadataNodeSpecification(MetadataNodeSpecification const& other)
-    : MetadataNodeSpecification(static_cast<MetadataNode const&>(other)) {}
+    : MetadataNodeSpecification(static_cast<MetadataNode const&>(other)) {
+}
 
 std::u16string const& MetadataNodeSpecification::get(std::u16string const& key) const {
     static std::u16string const absent;

@@ -74,7 +74,8 @@ MetadataPath::MetadataPath(std::vector<PathElement> elements) {
     }
 }
 
-MetadataPath::MetadataPath(std::shared_ptr<Step const> step) noexcept : step_(std::move(step)) {}
+MetadataPath::MetadataPath(std::shared_ptr<Step const> step) noexcept : step_(std::move(step)) {
+}
 
 MetadataPath::~MetadataPath() = default;
 

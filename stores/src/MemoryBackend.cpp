@@ -6,7 +6,8 @@ Changes MemoryBackend::enter(Access /*access*/) {
     return {};
 }
 
-void MemoryBackend::leave() noexcept {}
+void MemoryBackend::leave() noexcept {
+}
 
 Children MemoryBackend::load(Address const& /*parent*/) {
     return {};
@@ -16,8 +17,10 @@ FileChanges MemoryBackend::write(Batch const& /*batch*/) {
     return {};
 }
 
-void MemoryBackend::keep() {}
+void MemoryBackend::keep() {
+}
 
-void MemoryBackend::discard() noexcept {}
+void MemoryBackend::discard() noexcept {
+}
 
 } // namespace project::stores
