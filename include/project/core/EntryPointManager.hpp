@@ -21,7 +21,8 @@ class PROJECT_MANAGEMENT_EXPORT EntryPointManager {
 public:
     virtual ~EntryPointManager();
 
-    /// Writes an entry point whole: under its UUID, else under that of its file's entry, else under a new one.
+    /// Writes an entry point whole: under its UUID, else under that of its file's entry, else under a new
+    /// one.
     /// @throws FileNotInProject
     virtual void setEntryPoint(EntryPoint& entryPoint) = 0;
 
