@@ -5,7 +5,7 @@
 #include <span>
 #include <utility>
 
-#include "NodeLine.hpp"
+#include "LineParser.hpp"
 #include "TextFrame.hpp"
 #include "TextLines.hpp"
 #include "TextSum.hpp"
@@ -70,7 +70,7 @@ public:
             return false;
         }
         sum.add(lines_[i].text);
-        tail(lines_.subspan(i + 1), sum.hex());
+        readTailOf(lines_.subspan(i + 1), sum.hex());
         return true;
     }
 
@@ -89,13 +89,9 @@ private:
         }
     }
 
-    void tail(std::span<TextLine const> lines, std::string anchor) {
+    void readTailOf(std::span<TextLine const> lines, std::string anchor) {
         TailReading tail = readTail({lines.begin(), lines.end()}, std::move(anchor));
-        for (TailBatch const& batch : tail.batches) {
-            for (Change const& change : batch.changes) {
-                batch.chains ? content.apply(change) : content.join(change);
-            }
-        }
+        takeIn(content, tail);
         std::move(tail.faults.begin(), tail.faults.end(), std::back_inserter(faults));
         damage.merge(tail.damage);
     }

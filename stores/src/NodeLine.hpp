@@ -1,7 +1,6 @@
 #pragma once
 
 #include <cstddef>
-#include <optional>
 #include <string>
 #include <string_view>
 
@@ -9,6 +8,9 @@
 #include "project/stores/Backend.hpp"
 
 namespace project::stores {
+
+/// The type of most nodes, which their lines leave out.
+inline constexpr std::u16string_view plainNodeType = u"Info";
 
 /// More levels of nested nodes than this a node may not have: reading one stays bounded.
 inline constexpr std::size_t deepestNesting = 100;
@@ -28,20 +30,5 @@ void appendNestedNode(std::string& out, metadata::MetadataNode const& node);
 
 /// @throws StoreError when the address or the node of a change is deeper than what the text can hold.
 void requireWritable(Change const& change);
-
-/// A line that was read, or why it could not be.
-struct ParsedLine {
-    std::optional<Change> change;
-    char const* problem; ///< a clause; null when there is a change
-};
-
-/// Reads any line of a body or a batch, however its JSON is laid out.
-ParsedLine parseLine(std::string_view line);
-
-/// Reads a line of a body, where nothing is removed.
-ParsedLine parseBodyLine(std::string_view line);
-
-/// The node of a line that parses, null for one of an address that was made without.
-Node nodeOfLine(std::string_view line);
 
 } // namespace project::stores

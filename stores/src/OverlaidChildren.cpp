@@ -4,7 +4,7 @@
 #include <optional>
 #include <utility>
 
-#include "NodeLine.hpp"
+#include "LineParser.hpp"
 
 namespace project::stores {
 
@@ -101,13 +101,8 @@ private:
         if (std::any_of(begin, end, stands)) {
             return true;
         }
-        for (Iterator hiding = begin; hiding != end; ++hiding) {
-            AddressText const address(hiding->first);
-            std::size_t const hidden = body_.lowerBound(lines, address.view());
-            if (hidden > lines.begin) {
-                return true;
-            }
-            lines.begin = body_.endOf(lines, address.view());
+        for (Iterator hiding = begin; hiding != end; ++hiding) { // sorted, so a line that is left stays first
+            lines.begin = body_.endOf(lines, AddressText(hiding->first).view());
         }
         return !lines.empty();
     }

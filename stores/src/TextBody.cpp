@@ -5,7 +5,7 @@
 #include <utility>
 
 #include "CanonicalLine.hpp"
-#include "NodeLine.hpp"
+#include "LineParser.hpp"
 #include "TextFrame.hpp"
 
 namespace project::stores {

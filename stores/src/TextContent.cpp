@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <utility>
 
+#include "LineParser.hpp"
 #include "NodeJoin.hpp"
 #include "NodeLine.hpp"
 #include "OverlaidChildren.hpp"

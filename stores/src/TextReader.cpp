@@ -6,7 +6,7 @@
 
 #include "CanonicalLine.hpp"
 #include "ConflictReader.hpp"
-#include "NodeLine.hpp"
+#include "LineParser.hpp"
 #include "TextFrame.hpp"
 #include "TextLines.hpp"
 #include "TextSum.hpp"
@@ -154,11 +154,7 @@ private:
         TextSum sum;
         sum.addLines(body_.bytes());
         TailReading tail = readTail(lines, sum.hex());
-        for (TailBatch const& batch : tail.batches) {
-            for (Change const& change : batch.changes) {
-                batch.chains ? reading_.content.apply(change) : reading_.content.join(change);
-            }
-        }
+        takeIn(reading_.content, tail);
         std::move(tail.faults.begin(), tail.faults.end(), std::back_inserter(reading_.faults));
         reading_.damage.merge(tail.damage);
         reading_.anchor = std::move(tail.anchor);

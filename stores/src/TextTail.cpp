@@ -6,6 +6,7 @@
 #include <span>
 #include <utility>
 
+#include "LineParser.hpp"
 #include "NodeLine.hpp"
 #include "TextSum.hpp"
 
@@ -202,6 +203,14 @@ private:
 
 TailReading readTail(std::vector<TextLine> const& lines, std::string anchor) {
     return TailReader(std::move(anchor)).read(lines);
+}
+
+void takeIn(TextContent& content, TailReading const& tail) {
+    for (TailBatch const& batch : tail.batches) {
+        for (Change const& change : batch.changes) {
+            batch.chains ? content.apply(change) : content.join(change);
+        }
+    }
 }
 
 std::string writeBatch(Batch const& batch, std::string_view anchor) {

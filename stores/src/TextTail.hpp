@@ -6,6 +6,7 @@
 #include <string_view>
 #include <vector>
 
+#include "TextContent.hpp"
 #include "TextLines.hpp"
 #include "project/stores/Backend.hpp"
 #include "project/stores/TextBackend.hpp"
@@ -32,6 +33,9 @@ struct TailReading {
 /// the last one before them, and the sum over all of that.
 /// @param anchor the sum of the body.
 TailReading readTail(std::vector<TextLine> const& lines, std::string anchor);
+
+/// Applies the batches of a tail to what stands before it; those that do not chain are joined with it.
+void takeIn(TextContent& content, TailReading const& tail);
 
 /// The lines of a batch with its closing line.
 /// @throws StoreError when a change is deeper than what the text can hold.

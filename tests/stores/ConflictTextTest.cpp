@@ -75,6 +75,15 @@ TEST(ConflictText, tailsOfBothSidesCount) {
     EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"("a")", R"("b")", R"("c")", R"("d")", R"("x")"}));
 }
 
+TEST(ConflictText, inTheTailOfASideLaterLinesWin) {
+    std::string const body = bodyOf({R"({"file":"a","keys":{"k":"1"}})"});
+    std::string const tail =
+        readWhole(body).tailFor({set(fileAddress(u"a"), makeNode(u"Info", {{u"l", u"2"}}))});
+    ProjectText const text = readWhole(body + tail + "<<<<<<< ours\n=======\n>>>>>>> theirs\n");
+    EXPECT_EQ(told(text.faults()), "Conflict 6");
+    EXPECT_EQ(contentOf(text).at(fileAddress(u"a")), "Info(l=2;)");
+}
+
 TEST(ConflictText, aBatchWhoseLinesBothSidesShareIsStillRight) {
     std::string const body = bodyOf({R"("a")"});
     std::string const ours = readWhole(body).tailFor({set(fileAddress(u"b")), set(fileAddress(u"c"))});

@@ -3,6 +3,7 @@
 #include <rapidcheck/gtest.h>
 
 #include "CanonicalLine.hpp"
+#include "LineParser.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/StoreError.hpp"
 #include "support/TextGenerators.hpp"

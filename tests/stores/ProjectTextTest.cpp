@@ -181,6 +181,18 @@ TEST(ProjectText, linesForOneAddressAreJoinedInTheirOrder) {
               (Content{{fileAddress(u"a"), "Info(k=3;l=1;m=3;)"}, {fileAddress(u"b"), "Info()"}}));
 }
 
+TEST(ProjectText, aLineOfOtherHandsHasItsPlaceAmongTheOthers) {
+    ProjectText const text = readWhole(bodyOf({
+        R"("a")",
+        R"({ "file":"c", "keys":{"k":"1"} })",
+        R"({"file":"c","keys":{"l":"2"}})",
+        R"("b")",
+    }));
+    EXPECT_EQ(told(text.faults()), "Irregular 4, Irregular 5");
+    EXPECT_EQ(text.rewrittenWith({}).body(),
+              bodyOf({R"("a")", R"("b")", R"({"file":"c","keys":{"k":"1","l":"2"}})"}));
+}
+
 TEST(ProjectText, rewritingPutsLinesInTheirPlaces) {
     ProjectText const text = readWhole(bodyOf({R"("a")", R"("c")", R"("d/e")"}));
     ProjectText const written =

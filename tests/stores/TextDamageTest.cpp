@@ -4,7 +4,7 @@
 #include <algorithm>
 #include <optional>
 
-#include "NodeLine.hpp"
+#include "LineParser.hpp"
 #include "TextFrame.hpp"
 #include "project/stores/StoreError.hpp"
 #include "support/ProjectTextSamples.hpp"
