@@ -50,11 +50,12 @@ public:
             paths.push_back(absolute.absolute(argument));
         }
         auto contents = recursive_ ? contentsOf(paths, project, progress) : std::vector<Path>();
+        std::erase(paths, project.root()); // in every project, and nothing to add
         paths.insert(paths.end(), std::make_move_iterator(contents.begin()),
                      std::make_move_iterator(contents.end()));
         progress.begin("Adding " + std::to_string(paths.size()) + " files and folders");
         project.files().add(paths);
-        output().say(std::to_string(paths.size()) + " files and folders added");
+        output().say(std::to_string(paths.size()) + " added to the project");
         return 0;
     }
 

@@ -46,7 +46,7 @@ private:
         project.shield().raise();
         auto const aside = project.text().repair();
         if (!aside.empty()) {
-            tell("what was damaged stands in " + aside + " now");
+            tell("what was damaged stands in " + project.storeFile(aside) + " now");
         }
     }
 

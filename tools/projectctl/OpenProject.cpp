@@ -30,6 +30,10 @@ std::string OpenProject::textFile() const {
     return shown(root_ / TextBackend::folderName / TextBackend::textName);
 }
 
+std::string OpenProject::storeFile(std::string const& name) const {
+    return shown(root_ / TextBackend::folderName) + '/' + name;
+}
+
 void OpenProject::warnOfDamage() {
     std::size_t count = 0;
     std::string first;

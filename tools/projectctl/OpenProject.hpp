@@ -49,6 +49,9 @@ public:
     /// The text's path on disk, for messages.
     std::string textFile() const;
 
+    /// The path of another file in the store's folder, for messages. @param name in UTF-8.
+    std::string storeFile(std::string const& name) const;
+
     /// Tells on standard error, in one line, if the text is damaged or has conflicts in it: what was listed
     /// may lack something then. To be called with no guard open.
     void warnOfDamage();

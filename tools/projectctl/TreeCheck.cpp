@@ -93,15 +93,17 @@ void TreeCheck::checkHead(Address const& head) {
 }
 
 void TreeCheck::checkFiles(Address const& scope) {
-    auto waiting = store_.getChildNodes(scope);
+    std::vector<Address> waiting{scope};
     while (!waiting.empty()) {
         auto const address = std::move(waiting.back());
         waiting.pop_back();
-        if (address.leaf().getType() != schema::file) {
-            continue; // a folder's marker, label data
+        if (address != scope) {
+            checkFile(address);
         }
-        checkFile(address);
         auto below = store_.getChildNodes(address);
+        std::erase_if(below, [](Address const& child) { // folders' markers, label data
+            return child.leaf().getType() != schema::file;
+        });
         waiting.insert(waiting.end(), std::make_move_iterator(below.rbegin()),
                        std::make_move_iterator(below.rend()));
     }

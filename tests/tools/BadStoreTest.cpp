@@ -1,0 +1,174 @@
+#include "ToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+
+/// A project whose text something happened to.
+class BadStore : public ToolTest {
+protected:
+    void SetUp() override {
+        initProject();
+        folder_.file(u"a");
+        folder_.file(u"b");
+        folder_.file(u"c");
+        ASSERT_THAT(tool({"add", "a", "b"}), SucceedsSilently());
+    }
+
+    /// The committed files are still listed, and a line on standard error names the text and its line.
+    void expectListedWithWarning(std::string const& line) const {
+        auto const result = tool({"list"});
+        EXPECT_EQ(result.exitCode, 0);
+        EXPECT_EQ(result.output, "a\nb\n");
+        EXPECT_THAT(linesOf(result.errors), ElementsAre(HasSubstr(text().string() + ':' + line)));
+    }
+};
+
+TEST_F(BadStore, ofALaterFormatIsNotRead) {
+    auto content = readText();
+    writeText(content.replace(content.find("\"version\":1"), 11, "\"version\":9"));
+
+    for (auto const* command : {"list", "status", "check", "name", "tidy"}) {
+        EXPECT_THAT(tool({command}), FailsWith(1, text().string()));
+    }
+}
+
+TEST_F(BadStore, thatIsNoProjectsTextIsNotRead) {
+    writeText("hello\n");
+
+    EXPECT_THAT(tool({"list"}), FailsWith(1, text().string()));
+}
+
+TEST_F(BadStore, withADamagedLineIsListedAndNotWritten) {
+    insertLineBefore("\"b\"", "{\"file\":");
+
+    expectListedWithWarning("3: ");
+    auto const before = readText();
+    EXPECT_THAT(tool({"add", "c"}), FailsWith(1, text().string() + ":3: "));
+    EXPECT_EQ(readText(), before);
+    EXPECT_THAT(tool({"status"}).output, HasSubstr("new  c\n"));
+}
+
+TEST_F(BadStore, withSeveralDamagedLinesHasOneLineOfWarning) {
+    insertLineBefore("\"b\"", "{\"file\":");
+    insertLineBefore("\"b\"", "nonsense");
+
+    auto const result = tool({"list"});
+
+    EXPECT_EQ(result.output, "a\nb\n");
+    EXPECT_THAT(linesOf(result.errors), ElementsAre(HasSubstr(", and 1 more")));
+}
+
+TEST_F(BadStore, withConflictMarkersIsListedAndNotWritten) {
+    auto content = readText();
+    content.replace(content.find("\"b\"\n"), 4, "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
+    writeText(content);
+
+    auto const listed = tool({"list"});
+    EXPECT_EQ(listed.output, "a\nb\nc\n"); // both sides count
+    EXPECT_THAT(linesOf(listed.errors), ElementsAre(HasSubstr(text().string() + ":3: ")));
+    folder_.file(u"d");
+    EXPECT_THAT(tool({"add", "d"}), FailsWith(1, text().string() + ":3: "));
+    EXPECT_EQ(readText(), content);
+}
+
+TEST_F(BadStore, withATornTailHasLostNothing) {
+    writeText(readText() + "\"half a ba");
+
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\n"));
+    EXPECT_THAT(tool({"add", "c"}), SucceedsSilently());
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
+    EXPECT_THAT(readText(), ::testing::Not(HasSubstr("half")));
+}
+
+TEST_F(BadStore, thatEndsTooEarlyIsNeverTakenForAnEmptyProject) {
+    auto const whole = readText();
+    RunningProgram listing(commandFor({"list"}), settings_);
+    writeText(whole.substr(0, whole.size() / 2));
+    RunningProgram other(commandFor({"add", "c"}), settings_);
+    ASSERT_TRUE(other.waitUntilItSleeps()); // it looks again and again for the rest
+
+    writeText(whole);
+
+    EXPECT_THAT(other.finish(), SucceedsSilently());
+    EXPECT_THAT(listing.finish(), Prints("a\nb\n"));
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
+}
+
+TEST_F(BadStore, thatIsGoneIsAnError) {
+    std::filesystem::remove(text());
+
+    EXPECT_THAT(tool({"list"}), FailsWith(1, text().string() + ": the project's text is missing"));
+}
+
+TEST_F(BadStore, inAFolderThatCannotBeWrittenIsReadAllTheSame) {
+    std::filesystem::permissions(inFolder(".projectdata"), std::filesystem::perms(0555));
+    if (!giveUpRights()) {
+        GTEST_SKIP() << "other users than root cannot reach " PROJECTCTL;
+    }
+
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\n"));
+    EXPECT_THAT(tool({"add", "c"}), FailsWith(1, inFolder(".projectdata")));
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\n"));
+}
+
+TEST_F(BadStore, thatCannotBeReadIsAnError) {
+    std::filesystem::permissions(inFolder(".projectdata"), std::filesystem::perms::none);
+    if (!giveUpRights()) {
+        GTEST_SKIP() << "other users than root cannot reach " PROJECTCTL;
+    }
+
+    EXPECT_THAT(tool({"list"}), FailsWith(1, inFolder(".projectdata")));
+}
+
+TEST_F(BadStore, onAFullDiskIsAsItWasBefore) {
+    auto const before = readText();
+    settings_.fileSize = before.size(); // the text cannot grow
+
+    EXPECT_THAT(tool({"add", "c"}), FailsWith(1, ".projectdata"));
+
+    EXPECT_EQ(readText(), before);
+    settings_.fileSize = RLIM_INFINITY;
+    EXPECT_THAT(tool({"check"}), SucceedsSilently());
+    EXPECT_THAT(tool({"add", "c"}), SucceedsSilently());
+}
+
+TEST_F(BadStore, thatIsAppendedToOnAFullDiskHasLostNothing) {
+    std::string const longName(240, 'x');
+    for (int number = 0; number < 1200; ++number) {
+        folder_.addFile("folder/" + longName + std::to_string(number));
+    }
+    ASSERT_THAT(tool({"add", "-r", "folder"}), SucceedsSilently());
+    auto const before = readText();
+    ASSERT_GT(before.size(), 256U * 1024); // from there on batches are appended
+    settings_.fileSize = before.size() + 10;
+
+    EXPECT_THAT(tool({"add", "c"}), FailsWith(1, ".projectdata"));
+
+    settings_.fileSize = RLIM_INFINITY;
+    EXPECT_EQ(list().size(), 1203U);
+    EXPECT_THAT(tool({"add", "c"}), SucceedsSilently());
+    EXPECT_EQ(list().size(), 1204U);
+}
+
+TEST_F(BadStore, thatSomebodyElseHoldsIsWaitedFor) {
+    RunningProgram holder({"flock", ".projectdata", "sh", "-c", "echo held; read line"}, [this] {
+        auto settings = settings_;
+        settings.inputStaysOpen = true;
+        return settings;
+    }());
+    ASSERT_TRUE(holder.waitUntilItSleeps());
+    RunningProgram adding(commandFor({"add", "c"}), settings_);
+    ASSERT_TRUE(adding.waitUntilItSleeps());
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\n")); // a reader waits for nobody
+
+    EXPECT_EQ(holder.finish("\n").output, "held\n");
+
+    EXPECT_THAT(adding.finish(), SucceedsSilently());
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
+}
+
+} // namespace
+} // namespace project::test

@@ -1,0 +1,201 @@
+#include "ToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+using ::testing::AllOf;
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+using ::testing::StartsWith;
+using ::testing::UnorderedElementsAre;
+
+class CheckCommand : public ToolTest {
+protected:
+    void SetUp() override {
+        initProject();
+        folder_.file(u"a");
+        folder_.file(u"b");
+        ASSERT_THAT(tool({"add", "a", "b"}), SucceedsSilently());
+    }
+
+    /// A line about something in the project that has no line of the text to point to.
+    auto tells(std::string const& what) const {
+        return AllOf(StartsWith(text().string() + ": "), HasSubstr(what));
+    }
+
+    static constexpr auto beforeTheName = R"({"at":["Info","ProjectData"])";
+    static constexpr auto beforeTheEnd = R"({"end":)";
+};
+
+TEST_F(CheckCommand, findsNothingInASoundProject) {
+    EXPECT_THAT(tool({"check"}), SucceedsSilently());
+}
+
+TEST_F(CheckCommand, saysSoOnATerminal) {
+    settings_.onTerminal = true;
+
+    EXPECT_EQ(tool({"check"}).output, "The project has no faults.\r\n");
+}
+
+TEST_F(CheckCommand, namesEveryFaultOfTheTextWithItsLine) {
+    insertLineBefore("\"b\"", "{\"file\":");
+    insertLineBefore("\"b\"", "\"a\"");
+    writeText(readText() + "\"torn");
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.errors, "");
+    auto const file = text().string();
+    EXPECT_THAT(linesOf(result.output),
+                ElementsAre(StartsWith(file + ":3: "), StartsWith(file + ":4: "), StartsWith(file + ":8: ")));
+}
+
+TEST_F(CheckCommand, namesConflictMarkers) {
+    auto content = readText();
+    content.replace(content.find("\"b\"\n"), 4, "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
+    writeText(content);
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_THAT(result.output, StartsWith(text().string() + ":3: "));
+}
+
+TEST_F(CheckCommand, findsEveryAddressWithoutANode) {
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c1"],"node":false})");
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c2"]})");
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c2","Label","l1"],"node":false})");
+    insertLineBefore("\"a\"", R"({"at":["EntryPointGroups","Root","EntryPointGroup","g1"],"node":false})");
+    insertLineBefore("\"a\"", R"({"at":["EntryPoints","Root","EntryPoint","e1"],"node":false})");
+    insertLineBefore(beforeTheEnd, R"({"at":["ProjectPath","Root","Reference","p1"],"node":false})");
+    insertLineBefore(beforeTheEnd, R"({"at":["References","Root","Reference","r1"],"node":false})");
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_THAT(linesOf(result.output),
+                UnorderedElementsAre(tells("category \"c1\""), tells("label \"l1\""), tells("group \"g1\""),
+                                     tells("entry point \"e1\""), tells("reference \"p1\""),
+                                     tells("reference \"r1\"")));
+}
+
+TEST_F(CheckCommand, findsTextsThatNoManagerUnderstands) {
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c"]})");
+    for (auto const* state : {"", "READ_ONLY", "WRITABLE", "INHERITED", "Writable", "1"}) {
+        insertLineBefore("\"a\"", std::string(R"({"at":["Categories","Root","Category","c","Label","l)") +
+                                      state + R"("],"keys":{"ReadOnly":")" + state + R"("}})");
+    }
+    for (auto const* type :
+         {"Basic", "Startup", "StartUp", "Shutdown", "Batch_Job", "Batch Job", "batch", ""}) {
+        insertLineBefore("\"a\"", std::string(R"({"at":["EntryPoints","Root","EntryPoint","e)") + type +
+                                      R"("],"keys":{"File":"a","Type":")" + type + R"("}})");
+    }
+    tool({"tidy"});
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_THAT(linesOf(result.output),
+                UnorderedElementsAre(tells("label \"lWritable\""), tells("label \"l1\""),
+                                     tells("entry point \"ebatch\""), tells("entry point \"e\"")));
+}
+
+TEST_F(CheckCommand, findsFilesWhoseFolderIsNotInTheProject) {
+    insertLineBefore(beforeTheName, "\"lost/deep/file\"");
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_THAT(linesOf(result.output), ElementsAre(tells("\"lost/deep/file\"")));
+}
+
+TEST_F(CheckCommand, findsThemInOtherScopesToo) {
+    insertLineBefore("\"a\"", R"({"at":["Files","Notes","File","lost","File","file"]})");
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_THAT(linesOf(result.output), ElementsAre(tells("\"lost/file\"")));
+}
+
+TEST_F(CheckCommand, findsNamesThatNoFileCanHave) {
+    insertLineBefore("\"a\"", R"({"at":["Files","Root","File","\u0000"]})");
+    insertLineBefore("\"a\"", R"("..")");
+    insertLineBefore("\"a\"", R"({"at":["Files","Root","File","a/b"]})");
+    tool({"tidy"});
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_THAT(linesOf(result.output),
+                UnorderedElementsAre(tells("\"\\000\""), tells("\"..\""), tells("\"a/b\"")));
+}
+
+TEST_F(CheckCommand, findsLabelsOnFilesThatDoNotExist) {
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c"]})");
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c","Label","known"]})");
+    auto const labelled = [](std::string const& file, std::string const& category, std::string const& label) {
+        return R"({"file":")" + file + R"(","children":[{"type":"Category","keys":{"UUID":")" + category +
+               R"("},"children":[{"type":"Label","keys":{"UUID":")" + label + R"("}}]}]})";
+    };
+    insertLineBefore(beforeTheName, labelled("c1", "c", "known"));
+    insertLineBefore(beforeTheName, labelled("c2", "c", "unknown"));
+    insertLineBefore(beforeTheName, labelled("c3", "gone", "known"));
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_THAT(linesOf(result.output), ElementsAre(AllOf(tells("\"c2\""), HasSubstr("\"unknown\"")),
+                                                    AllOf(tells("\"c3\""), HasSubstr("\"gone\""))));
+}
+
+TEST_F(CheckCommand, onlyNotesWhatItDoesNotKnow) {
+    insertLineBefore("\"a\"",
+                     R"({"at":["EntryPoints","Root","EntryPoint","e"],"keys":{"File":"no","Type":"Basic"}})");
+    insertLineBefore(beforeTheEnd, R"({"at":["References","Root","Reference","r"],"keys":{"Type":"Cloud"}})");
+    insertLineBefore(beforeTheEnd, R"({"at":["Simulation","Root"],"keys":{"Solver":"x"}})");
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 0);
+    EXPECT_THAT(
+        linesOf(result.output),
+        UnorderedElementsAre(tells("note: nothing in this version knows what is kept at (\"Simulation\""),
+                             tells("note: the entry point \"e\""), tells("note: the reference \"r\"")));
+}
+
+TEST_F(CheckCommand, repairsByPuttingDamageAside) {
+    insertLineBefore("\"b\"", "{\"file\":");
+
+    auto const result = tool({"check", "--repair"});
+
+    EXPECT_EQ(result.exitCode, 0);
+    EXPECT_EQ(result.errors, "");
+    auto const lines = linesOf(result.output);
+    ASSERT_THAT(lines, ElementsAre(AllOf(StartsWith("what was damaged stands in "), HasSubstr("damaged-"))));
+    auto const begin = lines[0].find('/');
+    std::ifstream aside(lines[0].substr(begin, lines[0].rfind(' ') - begin));
+    std::string damaged;
+    std::getline(aside, damaged);
+    EXPECT_EQ(damaged, "{\"file\":");
+    EXPECT_THAT(tool({"check"}), SucceedsSilently());
+    EXPECT_THAT(list(), ElementsAre("a", "b"));
+}
+
+TEST_F(CheckCommand, repairsNothingInASoundProject) {
+    auto const before = readText();
+
+    EXPECT_THAT(tool({"check", "--repair"}), SucceedsSilently());
+
+    EXPECT_EQ(readText(), before);
+}
+
+TEST_F(CheckCommand, leavesConflictsToAPerson) {
+    insertLineBefore("\"b\"", "<<<<<<< ours");
+
+    EXPECT_THAT(tool({"check", "--repair"}), FailsWith(1, text().string() + ":3: "));
+}
+
+} // namespace
+} // namespace project::test

@@ -1,0 +1,87 @@
+#include "ToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+class InitCommand : public ToolTest {};
+
+TEST_F(InitCommand, makesAProjectNamedAfterItsFolder) {
+    folder_.folder(u"pump station");
+
+    EXPECT_THAT(toolFrom("pump station", {"init"}), SucceedsSilently());
+
+    EXPECT_THAT(toolFrom("pump station", {"name"}), Prints("pump station\n"));
+    EXPECT_TRUE(
+        std::filesystem::is_regular_file(folder_.onDisk() / "pump station/.projectdata/project.jsonl"));
+}
+
+TEST_F(InitCommand, takesTheFolderAndTheName) {
+    folder_.folder(u"a");
+
+    EXPECT_THAT(tool({"init", "a", "--name", "Pump station"}), SucceedsSilently());
+
+    EXPECT_THAT(toolFrom("a", {"name"}), Prints("Pump station\n"));
+}
+
+TEST_F(InitCommand, refusesAFolderThatHoldsAProject) {
+    initProject();
+    auto const before = readText();
+
+    EXPECT_THAT(tool({"init", "--name", "other"}),
+                FailsWith(1, "there is a project in \"" + folder_.onDisk().string()));
+
+    EXPECT_EQ(readText(), before);
+}
+
+TEST_F(InitCommand, refusesAFolderThatIsNotThere) {
+    EXPECT_THAT(tool({"init", "missing"}), FailsWith(1, "there is no folder \"missing\""));
+}
+
+TEST_F(InitCommand, refusesAFile) {
+    folder_.file(u"file");
+
+    EXPECT_THAT(tool({"init", "file"}), FailsWith(1, "there is no folder \"file\""));
+}
+
+TEST_F(InitCommand, makesAProjectInsideAnother) {
+    initProject();
+    folder_.folder(u"inner");
+
+    EXPECT_THAT(toolFrom("inner", {"init"}), SucceedsSilently());
+
+    EXPECT_THAT(toolFrom("inner", {"name"}), Prints("inner\n"));
+}
+
+TEST_F(InitCommand, startsOverInAStoreFolderThatIsStillEmpty) {
+    folder_.folder(u".projectdata"); // a start that was broken off at once
+
+    EXPECT_THAT(tool({"init"}), SucceedsSilently());
+}
+
+TEST_F(InitCommand, refusesAStoreWhoseTextIsGone) {
+    initProject();
+    std::filesystem::remove(text());
+
+    EXPECT_THAT(tool({"init"}), FailsWith(1, "the project's text is missing"));
+}
+
+TEST_F(InitCommand, takesALinkForTheFolderItLeadsTo) {
+    folder_.folder(u"real");
+    folder_.addLink("link", "real");
+
+    EXPECT_THAT(tool({"init", "link"}), SucceedsSilently());
+
+    EXPECT_THAT(toolFrom("real", {"name"}), Prints("real\n"));
+}
+
+TEST_F(InitCommand, leavesNothingBehindWhereNothingCanBeWritten) {
+    settings_.fileSize = 0; // every file is too large
+
+    auto const result = tool({"init"});
+
+    EXPECT_THAT(result, FailsWith(1, ".projectdata"));
+    EXPECT_TRUE(std::filesystem::is_empty(folder_.onDisk()));
+}
+
+} // namespace
+} // namespace project::test

@@ -1,0 +1,91 @@
+#include "ToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+using ::testing::ElementsAre;
+
+class ListCommand : public ToolTest {
+protected:
+    void SetUp() override {
+        initProject();
+        folder_.file(u"src/io/pump.cpp");
+        folder_.file(u"src/main.cpp");
+        folder_.file(u"src.txt");
+        ASSERT_EQ(tool({"add", "-r", "."}).exitCode, 0);
+    }
+};
+
+TEST_F(ListCommand, givesAPathALineAFolderBeforeItsContents) {
+    EXPECT_THAT(tool({"list"}), Prints("src\nsrc/io\nsrc/io/pump.cpp\nsrc/main.cpp\nsrc.txt\n"));
+}
+
+TEST_F(ListCommand, givesPathsFromTheRootWhereverItIsCalled) {
+    EXPECT_THAT(toolFrom("src/io", {"list"}),
+                Prints("src\nsrc/io\nsrc/io/pump.cpp\nsrc/main.cpp\nsrc.txt\n"));
+}
+
+TEST_F(ListCommand, givesAPartOfTheProject) {
+    EXPECT_THAT(tool({"list", "src/io"}), Prints("src/io\nsrc/io/pump.cpp\n"));
+    EXPECT_THAT(toolFrom("src", {"list", "main.cpp"}), Prints("src/main.cpp\n"));
+    EXPECT_THAT(toolFrom("src", {"list", ".."}),
+                Prints("src\nsrc/io\nsrc/io/pump.cpp\nsrc/main.cpp\nsrc.txt\n"));
+}
+
+TEST_F(ListCommand, complainsOfAPathThatIsNotInTheProject) {
+    folder_.file(u"new");
+
+    EXPECT_THAT(tool({"list", "new"}), FailsWith(1, '"' + inFolder("new") + "\" is not in the project"));
+}
+
+TEST_F(ListCommand, showsATree) {
+    EXPECT_THAT(tool({"list", "--tree"}), Prints("src/\n  io/\n    pump.cpp\n  main.cpp\nsrc.txt\n"));
+    EXPECT_THAT(tool({"list", "--tree", "src/io"}), Prints("src/io/\n  pump.cpp\n"));
+}
+
+TEST_F(ListCommand, givesJsonWithKinds) {
+    EXPECT_THAT(tool({"list", "--json"}), Prints("[\n"
+                                                 "{\"path\": \"src\", \"kind\": \"folder\"},\n"
+                                                 "{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
+                                                 "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"},\n"
+                                                 "{\"path\": \"src/main.cpp\", \"kind\": \"file\"},\n"
+                                                 "{\"path\": \"src.txt\", \"kind\": \"file\"}\n"
+                                                 "]\n"));
+}
+
+TEST_F(ListCommand, stillCallsAFolderOneWhenItHasGoneFromTheDisk) {
+    folder_.remove(u"src");
+
+    EXPECT_THAT(tool({"list", "--json", "src/io"}),
+                Prints("[\n{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
+                       "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}\n]\n"));
+}
+
+TEST_F(ListCommand, endsPathsWithZeroBytes) {
+    EXPECT_THAT(tool({"list", "-0", "src/io"}), Prints(withZeros({"src/io", "src/io/pump.cpp"})));
+}
+
+TEST_F(ListCommand, refusesTwoFormsAtOnce) {
+    EXPECT_THAT(tool({"list", "--tree", "--json"}), FailsWith(2, "--tree excludes --json"));
+    EXPECT_THAT(tool({"list", "--json", "-0"}), FailsWith(2, "excludes"));
+    EXPECT_THAT(tool({"list", "--tree", "-0"}), FailsWith(2, "excludes"));
+}
+
+TEST_F(ListCommand, listsFilesOnlyThatTheFileManagerLists) {
+    insertLineBefore("\"src/\"", "\"lost/file\""); // the folder above it is not in the project
+
+    EXPECT_THAT(list(), ElementsAre("src", "src/io", "src/io/pump.cpp", "src/main.cpp", "src.txt"));
+}
+
+TEST(ListCommandOfNothing, givesNothing) {
+    TemporaryFolder const folder;
+    ProgramSettings settings;
+    settings.folder = folder.onDisk();
+    ASSERT_EQ(runProgram({PROJECTCTL, "init"}, settings).exitCode, 0);
+
+    EXPECT_THAT(runProgram({PROJECTCTL, "list"}, settings), SucceedsSilently());
+    EXPECT_THAT(runProgram({PROJECTCTL, "list", "--json"}, settings), Prints("[]\n"));
+}
+
+} // namespace
+} // namespace project::test

@@ -1,0 +1,118 @@
+#pragma once
+
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "support/RunningProgram.hpp"
+#include "support/TemporaryFolder.hpp"
+
+namespace project::test {
+
+/// Runs projectctl as a process of its own, in a fresh folder.
+class ToolTest : public ::testing::Test {
+protected:
+    ToolTest() { settings_.folder = folder_.onDisk(); }
+
+    /// Calls projectctl with the settings as they stand.
+    ProgramResult tool(std::vector<std::string> arguments, std::string_view input = {}) const {
+        return runProgram(commandFor(std::move(arguments)), settings_, input);
+    }
+
+    /// Calls projectctl from a folder below the fresh one.
+    ProgramResult toolFrom(std::filesystem::path const& relative, std::vector<std::string> arguments) const {
+        auto settings = settings_;
+        settings.folder /= relative;
+        return runProgram(commandFor(std::move(arguments)), settings);
+    }
+
+    static std::vector<std::string> commandFor(std::vector<std::string> arguments) {
+        arguments.insert(arguments.begin(), PROJECTCTL);
+        return arguments;
+    }
+
+    /// What `list` gives, line by line.
+    std::vector<std::string> list() const { return linesOf(tool({"list"}).output); }
+
+    static std::vector<std::string> linesOf(std::string const& text) {
+        std::vector<std::string> result;
+        for (std::size_t from = 0; from < text.size();) {
+            auto const end = std::min(text.find('\n', from), text.size());
+            result.push_back(text.substr(from, end - from));
+            from = end + 1;
+        }
+        return result;
+    }
+
+    /// The names with a zero byte behind each.
+    static std::string withZeros(std::vector<std::string> const& names) {
+        std::string result;
+        for (auto const& name : names) {
+            result += name + '\0';
+        }
+        return result;
+    }
+
+    void initProject() const { ASSERT_EQ(tool({"init"}).exitCode, 0); }
+
+    std::filesystem::path text() const { return folder_.onDisk() / ".projectdata" / "project.jsonl"; }
+
+    std::string readText() const {
+        std::ifstream file(text(), std::ios::binary);
+        return {std::istreambuf_iterator<char>(file), {}};
+    }
+
+    void writeText(std::string const& content) const {
+        std::ofstream(text(), std::ios::binary | std::ios::trunc) << content;
+    }
+
+    /// Puts a line, given without its end, before the first line that begins with the mark.
+    void insertLineBefore(std::string const& mark, std::string const& line) const {
+        auto content = readText();
+        auto const place = content.find('\n' + mark);
+        ASSERT_NE(place, std::string::npos) << mark;
+        writeText(content.insert(place + 1, line + '\n'));
+    }
+
+    /// From now on projectctl runs without the rights of root. @return false when it cannot be run so here.
+    bool giveUpRights() {
+        std::filesystem::permissions(folder_.onDisk(), std::filesystem::perms::all);
+        settings_.asNobody = true;
+        return tool({"--version"}).exitCode == 0;
+    }
+
+    std::string inFolder(std::string const& relative) const { return (folder_.onDisk() / relative).string(); }
+
+    TemporaryFolder folder_;
+    ProgramSettings settings_;
+};
+
+/// A run that went well and said nothing.
+MATCHER(SucceedsSilently, "") {
+    *result_listener << "exit code " << arg.exitCode << ", errors: " << arg.errors
+                     << ", output: " << arg.output;
+    return arg.exitCode == 0 && arg.output.empty() && arg.errors.empty();
+}
+
+/// A run that failed with this exit code, one line of error that holds this text, and nothing else.
+MATCHER_P2(FailsWith, exitCode, text, "") {
+    *result_listener << "exit code " << arg.exitCode << ", errors: " << arg.errors
+                     << ", output: " << arg.output;
+    return arg.exitCode == exitCode && arg.output.empty() && arg.errors.starts_with("projectctl: ") &&
+           arg.errors.find('\n') == arg.errors.size() - 1 && arg.errors.find(text) != std::string::npos;
+}
+
+/// A run that went well, said this, and complained of nothing.
+MATCHER_P(Prints, output, "") {
+    *result_listener << "exit code " << arg.exitCode << ", errors: " << arg.errors
+                     << ", output: " << arg.output;
+    return arg.exitCode == 0 && arg.errors.empty() && arg.output == output;
+}
+
+} // namespace project::test
