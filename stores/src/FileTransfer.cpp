@@ -61,8 +61,12 @@ timespec timeBetweenTicks() noexcept {
 } // namespace
 
 FileIdentity toIdentity(struct stat const& status) noexcept {
-    return {status.st_dev, status.st_ino, static_cast<std::uint64_t>(status.st_size),
-            nanoseconds(status.st_mtim), nanoseconds(status.st_ctim)};
+    return {status.st_dev,
+            status.st_ino,
+            static_cast<std::uint64_t>(status.st_size),
+            nanoseconds(status.st_mtim),
+            nanoseconds(status.st_ctim),
+            S_ISREG(status.st_mode)};
 }
 
 FileIdentity identifyOpenFile(int file, std::string const& name) {

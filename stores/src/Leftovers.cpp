@@ -1,6 +1,6 @@
 #include "Leftovers.hpp"
 
-#include <optional>
+#include <vector>
 
 #include "StoreFiles.hpp"
 #include "project/stores/StoreError.hpp"
@@ -9,33 +9,25 @@ namespace project::stores {
 
 namespace {
 
-/// What has a temporary file's name, if it is a regular file. @return nothing when it was set aside.
-std::optional<FileIdentity> identifyOrSetAside(Disk& disk, std::string const& name) {
-    try {
-        return disk.identify(name);
-    } catch (StoreError const&) {
-        setAside(disk, name);
-        return std::nullopt;
-    }
-}
-
 void settleStranger(Disk& disk, std::string const& name, StoreFiles::Swap const& swap) {
     auto const text = disk.identify(StoreFiles::text);
     if (text && swap.isNew(*text) && disk.exchange(name, StoreFiles::text)) {
-        disk.remove(name); // the dead writer's own text, of a batch that it never called kept
         disk.syncFolder();
+        disk.remove(name); // the dead writer's own text, of a batch that it never called kept
     } else {
         setAside(disk, name);
     }
 }
 
 void removeLeftover(Disk& disk, std::string const& name) {
-    auto const file = identifyOrSetAside(disk, name);
+    auto const file = disk.identify(name);
     if (!file) {
         return;
     }
     auto const swap = StoreFiles::parseSwapping(name);
-    if (!swap || swap->isOld(*file) || swap->isNew(*file)) {
+    if (!file->isRegular && !swap) {
+        setAside(disk, name); // nothing that a writer of ours has made
+    } else if (!swap || swap->isOld(*file) || swap->isNew(*file)) {
         disk.remove(name);
     } else {
         settleStranger(disk, name, *swap);
@@ -45,14 +37,19 @@ void removeLeftover(Disk& disk, std::string const& name) {
 } // namespace
 
 void removeLeftovers(Disk& disk) {
-    try {
-        for (auto const& name : disk.list()) {
-            if (StoreFiles::isTemporary(name)) {
-                removeLeftover(disk, name);
-            }
+    auto names = disk.list();
+    std::erase_if(names, [](auto const& name) { return !StoreFiles::isTemporary(name); });
+    if (names.empty()) {
+        return;
+    }
+    // First, as long as they tell of it: batches are going to be appended to what has the text's name now.
+    disk.syncFolder();
+    for (auto const& name : names) {
+        try {
+            removeLeftover(disk, name);
+        } catch (StoreError const&) {
+            // The next writer tries again; nothing that is left stands in the way of this one.
         }
-    } catch (StoreError const&) {
-        // The next writer tries again; nothing that is left stands in the way of this one.
     }
 }
 

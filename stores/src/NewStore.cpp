@@ -10,7 +10,7 @@
 namespace project::stores {
 
 void NewStore::makeFolder() {
-    madeFolder_ = disk_.makeFolder();
+    madeFolder_ = disk_.makeFolder() || madeFolder_;
 }
 
 FileChanges NewStore::makeFiles() {
@@ -45,10 +45,11 @@ void NewStore::place(char const* name, std::string_view content, FileChanges& ch
         disk_.remove(temporary);
         return;
     }
+    made_.push_back({name, file});
     // A new name changes one of the file's times.
     auto const now = disk_.identify(name);
     bool const isKnown = now && now->isSameState(file.identity);
-    made_.push_back({name, {isKnown ? *now : file.identity, isKnown && file.isStamped}});
+    made_.back().file = {isKnown ? *now : file.identity, isKnown && file.isStamped};
     changes.added.push_back(fl::filesystem::fromSystem(disk_.folder()) /
                             fl::filesystem::fromSystem(std::string(name)));
 }

@@ -12,7 +12,7 @@ void StoreWriter::append(std::string_view lines) {
     if (!isInPlace(before)) {
         throwReplaced();
     }
-    auto const written = disk_.append(StoreFiles::text, before, lines);
+    auto const written = appendOrTakeBack(lines, before);
     if (!written) {
         throwReplaced();
     }
@@ -34,6 +34,19 @@ void StoreWriter::append(std::string_view lines) {
     seen_.appended(lines, *written);
 }
 
+std::optional<WrittenFile> StoreWriter::appendOrTakeBack(std::string_view lines, FileIdentity const& before) {
+    try {
+        return disk_.append(StoreFiles::text, before, lines);
+    } catch (StoreError const& failure) {
+        // A torn batch is counted by nobody and may stay. One that lacks just the last line's end is whole.
+        auto const now = identifyQuietly(StoreFiles::text);
+        if (now && now->isSameFile(before) && now->size + 1 >= before.size + lines.size()) {
+            takeBack(*now, failure);
+        }
+        throw;
+    }
+}
+
 void StoreWriter::rewrite(ProjectText next) {
     auto const before = seen_.identity();
     if (!isInPlace(before)) {
@@ -51,14 +64,14 @@ void StoreWriter::rewrite(ProjectText next) {
         }
     } catch (StoreError const& failure) {
         takeBack(replacement->file.identity, failure);
-        removeOld(*replacement, before);
+        removeOwn(replacement->beside, replacement->besideIdentity);
         throw;
     }
     if (!isStillInPlace) {
-        withdraw(*replacement, before);
+        withdraw(*replacement);
         throwReplaced();
     }
-    removeOld(*replacement, before);
+    removeOwn(replacement->beside, replacement->besideIdentity);
     seen_.replaced(std::move(next), replacement->file);
 }
 
@@ -93,22 +106,24 @@ std::optional<StoreWriter::Put> StoreWriter::put(std::string_view bytes, FileIde
 
 std::optional<StoreWriter::Put> StoreWriter::swapIn(std::string const& name, WrittenFile const& file,
                                                     FileIdentity const& expected) {
-    if (identifyRegular(StoreFiles::text) != expected) {
+    if (identifyQuietly(StoreFiles::text) != expected) {
         removeOwn(name, file.identity);
         return std::nullopt;
     }
-    bool const exchanged = disk_.exchange(name, StoreFiles::text);
-    if (!exchanged) {
+    Put result{file, name, expected, disk_.exchange(name, StoreFiles::text)};
+    if (!result.isExchanged) {
+        result.beside = StoreFiles::newTemporary();
+        result.besideIdentity = disk_.create(result.beside, {}, std::nullopt).identity;
         disk_.rename(name, StoreFiles::text);
-    } else if (auto const old = identifyRegular(name); !old || !old->isSameState(expected)) {
+    } else if (auto const old = identifyQuietly(name); !old || !old->isSameState(expected)) {
         putBack(name, file.identity);
         return std::nullopt;
     }
     // A new name changes one of the file's times.
-    auto const now = identifyRegular(StoreFiles::text);
+    auto const now = identifyQuietly(StoreFiles::text);
     bool const isKnown = now && now->isSameState(file.identity);
-    return Put{{isKnown ? *now : file.identity, isKnown && file.isStamped},
-               exchanged ? std::optional(name) : std::nullopt};
+    result.file = {isKnown ? *now : file.identity, isKnown && file.isStamped};
+    return result;
 }
 
 /// What came out was not what was read: somebody put it there at the last moment, and it goes there again.
@@ -120,31 +135,36 @@ void StoreWriter::putBack(std::string const& name, FileIdentity const& ours) {
         // told below
     }
     if (!isBack) {
-        isOutcomeUnknown_ = true;
-        auto const aside = setAside(disk_, name);
-        throw StoreError(pathOfText(), 0,
-                         "was replaced by another program while a batch was written, and its text could not "
-                         "be put back: it is " +
-                             aside + " now, and the text in the project has the batch",
-                         "Compare the two files and keep what is right.");
+        throwNotPutBack(name, ours);
     }
+    disk_.syncFolder(); // or the batch could come back with a power cut
     if (!removeOwn(name, ours)) {
         setAside(disk_, name); // yet another one came in between
     }
 }
 
-/// The path leads elsewhere now. Where the folder was moved away, the batch must not come back with it.
-void StoreWriter::withdraw(Put const& put, FileIdentity const& old) {
-    if (put.old && !disk_.isFolderInPlace()) {
-        putBack(*put.old, put.file.identity);
-    } else {
-        removeOld(put, old);
+void StoreWriter::throwNotPutBack(std::string const& name, FileIdentity const& ours) {
+    loseTrack(ours);
+    std::string aside = name;
+    try {
+        aside = setAside(disk_, name);
+    } catch (StoreError const&) {
+        // It keeps the name that it has, and the next writer puts it back or sets it aside.
     }
+    throw StoreError(
+        pathOfText(), 0,
+        "was replaced by another program while a batch was written, and could not be put back: it "
+        "is " +
+            aside + " now, and the text in its place has the batch",
+        "Compare the two files and keep what is right.");
 }
 
-void StoreWriter::removeOld(Put const& put, FileIdentity const& old) {
-    if (put.old) {
-        removeOwn(*put.old, old);
+/// The path leads elsewhere now. Where the folder was moved away, the batch must not come back with it.
+void StoreWriter::withdraw(Put const& put) {
+    if (put.isExchanged && !disk_.isFolderInPlace()) {
+        putBack(put.beside, put.file.identity);
+    } else {
+        removeOwn(put.beside, put.besideIdentity);
     }
 }
 
@@ -156,24 +176,38 @@ void StoreWriter::takeBack(FileIdentity const& current, StoreError const& failur
         auto before = seen_.text().rewrittenWith({});
         if (auto const replacement = put(before.body(), current)) {
             disk_.syncFolder();
-            removeOld(*replacement, current);
+            removeOwn(replacement->beside, replacement->besideIdentity);
             seen_.replaced(std::move(before), replacement->file);
             return;
         }
-        auto const there = identifyRegular(StoreFiles::text);
+        auto const there = identifyQuietly(StoreFiles::text);
         if (!there || !there->isSameFile(current)) {
             return; // somebody else's text, without the batch, has taken its place
         }
     } catch (StoreError const& second) {
         reason = second.getProblem();
     }
-    isOutcomeUnknown_ = true;
-    seen_.distrust();
+    loseTrack(current);
     throw StoreError(pathOfText(), 0,
                      failure.getProblem() + "; writing the text without the last batch failed too (" +
                          reason + "): nobody can tell whether the batch is in the project",
                      failure.getRemedy() + " Then open the project anew, and look whether the last change is "
                                            "there.");
+}
+
+/// Nothing is written any more by this object. What the system holds of the text may differ from what is on
+/// disk, and nothing may be appended to that: a torn tail makes whoever writes next write a new file.
+void StoreWriter::loseTrack(FileIdentity const& file) {
+    isOutcomeUnknown_ = true;
+    seen_.distrust();
+    try {
+        auto const there = disk_.identify(StoreFiles::text);
+        if (there && there->isSameFile(file)) {
+            disk_.append(StoreFiles::text, *there, "{");
+        }
+    } catch (StoreError const&) {
+        // a disk that takes nothing takes no later batch either
+    }
 }
 
 /// True when the path from the project's root leads to this file in the open folder, whatever its state.
@@ -185,8 +219,8 @@ bool StoreWriter::isInPlace(FileIdentity const& file) {
     return there && there->isSameFile(file);
 }
 
-/// Empty also for what is no regular file.
-std::optional<FileIdentity> StoreWriter::identifyRegular(std::string const& name) {
+/// Empty also when the disk can't tell.
+std::optional<FileIdentity> StoreWriter::identifyQuietly(std::string const& name) {
     try {
         return disk_.identify(name);
     } catch (StoreError const&) {

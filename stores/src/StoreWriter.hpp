@@ -31,20 +31,25 @@ public:
     void requireKnownOutcome() const;
 
 private:
-    /// A new text that has taken the old one's place.
+    /// A new text that has taken the old one's place. Beside it lies another file until that is durable: so a
+    /// writer that comes after a crash knows that the names may not be.
     struct Put {
         WrittenFile file;
-        std::optional<std::string> old; ///< the name of the one that it replaced, unless that is gone
+        std::string beside;
+        FileIdentity besideIdentity;
+        bool isExchanged; ///< the file beside it is the old text
     };
 
+    std::optional<WrittenFile> appendOrTakeBack(std::string_view lines, FileIdentity const& before);
     std::optional<Put> put(std::string_view bytes, FileIdentity const& expected);
     std::optional<Put> swapIn(std::string const& name, WrittenFile const& file, FileIdentity const& expected);
     void putBack(std::string const& name, FileIdentity const& ours);
-    void withdraw(Put const& put, FileIdentity const& old);
-    void removeOld(Put const& put, FileIdentity const& old);
+    [[noreturn]] void throwNotPutBack(std::string const& name, FileIdentity const& ours);
+    void withdraw(Put const& put);
     void takeBack(FileIdentity const& current, StoreError const& failure);
+    void loseTrack(FileIdentity const& file);
     bool isInPlace(FileIdentity const& file);
-    std::optional<FileIdentity> identifyRegular(std::string const& name);
+    std::optional<FileIdentity> identifyQuietly(std::string const& name);
     bool removeOwn(std::string const& name, FileIdentity const& ours);
     std::string pathOfText() const;
     [[noreturn]] void throwReplaced() const;

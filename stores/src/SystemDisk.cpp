@@ -22,11 +22,6 @@ namespace {
 /// A file is opened without following a link, and without waiting for the other end of a pipe.
 constexpr int safely = O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC;
 
-[[noreturn]] void throwNoRegularFile(std::string const& name, bool isLink) {
-    throw StoreError(name, 0, isLink ? "is a symbolic link" : "is no regular file",
-                     "Move it away, and restore the project's own file.");
-}
-
 /// The state of what a name leads to from an open folder.
 /// @param name how to name it in errors.
 std::optional<FileIdentity> identifyIn(int folder, std::string const& path, std::string const& name) {
@@ -37,9 +32,6 @@ std::optional<FileIdentity> identifyIn(int folder, std::string const& path, std:
             return std::nullopt;
         }
         throwSystemError(name, "can't be looked at", errno);
-    }
-    if (!S_ISREG(status.st_mode)) {
-        throwNoRegularFile(name, S_ISLNK(status.st_mode));
     }
     return toIdentity(status);
 }
@@ -154,7 +146,9 @@ bool SystemDisk::openFile(ForkSafeDescriptor& file, std::string const& name, int
         return false;
     }
     if (errno == ELOOP || errno == ENXIO) { // a link, or a pipe that nobody reads
-        throwNoRegularFile(folder_.pathOf(name), errno == ELOOP);
+        throw StoreError(folder_.pathOf(name), 0,
+                         errno == ELOOP ? "is a symbolic link" : "is no regular file",
+                         "Move it away, and restore the project's own file.");
     }
     throwSystemError(folder_.pathOf(name), "can't be opened", errno);
 }

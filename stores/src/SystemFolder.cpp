@@ -79,9 +79,11 @@ bool SystemFolder::make() {
     if (!openIn(root.get())) {
         throwSystemError(path_, "can't be opened", ENOENT);
     }
-    if (made && ::fsync(root.get()) != 0) {
+    if (::fsync(root.get()) != 0) {
         auto const error = errno;
-        remove();
+        if (made) {
+            remove();
+        }
         throwSystemError(root_, "can't be made durable", error);
     }
     return made;

@@ -73,6 +73,7 @@ private:
     };
 
     bool lock(milliseconds patience);
+    void clearFolder();
     void look(milliseconds patience);
     /// Locks the folder and looks. @return false when there is no text.
     bool lockAndLook(milliseconds patience);
@@ -91,9 +92,9 @@ private:
     StoreWriter writer_;
     NewStore newStore_;
     std::optional<Pending> pending_;
-    Changes unreported_; ///< what was seen to have changed and not yet told by enter
+    Changes unreported_;                    ///< what was seen to have changed and not yet told by enter
+    std::optional<FileIdentity> clearedAt_; ///< the text when the folder held nothing of dead writers
     bool isLocked_ = false;
-    bool hasCleared_ = false;
     bool hasWritten_ = false;
 };
 
@@ -137,10 +138,17 @@ bool TextBackend::State::lock(milliseconds patience) {
         leave(); // the folder was replaced while we waited
     }
     seen_.stayInFolder(true);
-    if (!std::exchange(hasCleared_, true)) {
-        removeLeftovers(*disk_);
-    }
+    clearFolder();
     return true;
+}
+
+/// Looks for what dead writers left, unless nobody else has written since this object did so.
+void TextBackend::State::clearFolder() {
+    auto const text = disk_->identify(StoreFiles::text);
+    if (!text || text != clearedAt_) {
+        removeLeftovers(*disk_);
+        clearedAt_ = disk_->identify(StoreFiles::text);
+    }
 }
 
 void TextBackend::State::look(milliseconds patience) {
@@ -200,8 +208,11 @@ void TextBackend::State::requireNoFault(Fault::Kind kind, char const* remedy) co
 }
 
 FileChanges TextBackend::State::makeStore() {
+    if (isLocked_ && !disk_->isFolderInPlace()) {
+        leave();
+    }
+    newStore_.makeFolder(); // also where it is there: whoever made it may have died before it was durable
     if (!isLocked_) {
-        newStore_.makeFolder();
         lock(options_.patience);
         look(options_.patience);
         if (seen_.exists()) {
@@ -247,6 +258,7 @@ void TextBackend::State::keep() {
     }
     pending_.reset();
     newStore_.stand();
+    clearedAt_ = seen_.identity();
     hasWritten_ = true;
 }
 

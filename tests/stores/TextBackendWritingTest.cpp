@@ -158,9 +158,10 @@ TEST_F(TextBackendWriting, whereFilesCannotBeExchangedTheNewOneIsRenamedOverTheO
 
     commit(*backend, addFiles({u"b"}));
 
-    EXPECT_THAT(writes(), ElementsAre("create temporary like project.jsonl", "sync",
-                                      "renameToFree temporary swapping", "exchange swapping project.jsonl",
-                                      "rename swapping project.jsonl", "syncFolder"));
+    EXPECT_THAT(writes(),
+                ElementsAre("create temporary like project.jsonl", "sync", "renameToFree temporary swapping",
+                            "exchange swapping project.jsonl", "create temporary",
+                            "rename swapping project.jsonl", "syncFolder", "remove temporary"));
     EXPECT_EQ(textOf(addFiles({u"a", u"b"})), text());
 }
 
@@ -318,6 +319,23 @@ TEST_F(TextBackendWriting, aFullDiskLeavesTheProjectAsItWasAndTheNextBatchRepair
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20)), addFiles({u"b"})}), stored());
 }
 
+TEST_F(TextBackendWriting, aBatchThatLacksJustItsLastByteWhenTheDiskIsFullIsTakenBack) {
+    prepare(manyFiles(20));
+    auto const lines = textOf(addFiles(manyFiles(20)), {addFiles({u"b"})}).substr(text().size());
+    auto const backend = open(appending());
+    volume->room = lines.size() - 1;
+    volume->beforeCall = [&](std::string const& call) {
+        if (call.starts_with("create")) {
+            volume->room.reset();
+        }
+    };
+
+    EXPECT_EQ("No space left on device", errorOf([&] { commit(*backend, addFiles({u"b"})); }).getProblem());
+
+    EXPECT_EQ(textOf(addFiles(manyFiles(20))), text());
+    EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), contentOf(*backend));
+}
+
 TEST_F(TextBackendWriting, aFullDiskAtARewriteLeavesTheTextAndNoTemporaryFile) {
     prepare({u"a"});
     auto const before = text();
@@ -382,7 +400,10 @@ TEST_F(TextBackendWriting, whenThatFailsTooTheOutcomeIsCalledUnknownAndNothingIs
                 HasSubstr("Open the project anew"));
     EXPECT_THAT(errorOf([&] { backend->tidy(); }).getRemedy(), HasSubstr("Open the project anew"));
     backend = open(appending());
+    writes();
     commit(*backend, addFiles({u"c"}));
+    EXPECT_THAT(writes(), ElementsAreArray(rewrite))
+        << "what the system holds of the old file is not trusted";
     EXPECT_EQ(1U, stored().count(fileAddress(u"c")));
 }
 

@@ -79,12 +79,16 @@ CrashingVolume::Names& CrashingDisk::names() {
     return folder_->names;
 }
 
-CrashingDisk::File& CrashingDisk::find(std::string const& name) {
+void CrashingDisk::bind(std::string const& name, std::shared_ptr<File> file) {
+    CrashingVolume::bind(*folder_, name, std::move(file));
+}
+
+std::shared_ptr<CrashingDisk::File> CrashingDisk::find(std::string const& name) {
     auto const found = names().find(name);
     if (found == names().end()) {
         throw StoreError(name, 0, "is not there", "");
     }
-    return *found->second;
+    return found->second;
 }
 
 bool CrashingDisk::openFolder() {
@@ -151,9 +155,6 @@ std::optional<FileIdentity> CrashingDisk::identifyIn(CrashingVolume::Folder* whe
     if (where == nullptr || found == where->names.end()) {
         return std::nullopt;
     }
-    if (found->second->isPipe) {
-        throw StoreError(name, 0, "is no regular file", "");
-    }
     return CrashingVolume::identify(*found->second);
 }
 
@@ -175,7 +176,10 @@ std::optional<FileContent> CrashingDisk::read(std::string const& name, std::uint
         if (!identity) {
             return std::nullopt;
         }
-        auto const& bytes = find(name).bytes;
+        if (!identity->isRegular) {
+            throw StoreError(name, 0, "is no regular file", "");
+        }
+        auto const& bytes = find(name)->bytes;
         return FileContent{offset < bytes.size() ? bytes.substr(offset) : std::string(), *identity};
     });
 }
@@ -207,7 +211,7 @@ std::optional<WrittenFile> CrashingDisk::append(std::string const& name, FileIde
     };
     return call("append " + kindOf(name), write, [&](bool) {
         if (identifyIn(folder_.get(), name) == expected) {
-            volume_->write(find(name), bytes.substr(0, volume_->pick(bytes.size() - 1)));
+            volume_->write(*find(name), bytes.substr(0, volume_->pick(bytes.size() - 1)));
         }
     });
 }
@@ -216,13 +220,14 @@ WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes
                                  std::optional<std::string> const& like) {
     auto const make = [&] {
         written_ = volume_->makeFile("");
-        if (!names().try_emplace(name, written_).second) {
+        if (names().contains(name)) {
             throw StoreError(name, 0, "is there already", "");
         }
+        bind(name, written_);
         try {
             writeWithinRoom(*written_, bytes);
         } catch (StoreError const&) {
-            names().erase(name);
+            bind(name, nullptr);
             throw;
         }
         bool const isStamped = volume_->stamp(*written_);
@@ -232,7 +237,7 @@ WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes
         if (!goesOn) {
             auto const half = volume_->makeFile("");
             volume_->write(*half, bytes.substr(0, volume_->pick(bytes.size())));
-            names().try_emplace(name, half);
+            bind(name, half);
         }
     });
 }
@@ -244,7 +249,11 @@ void CrashingDisk::sync() {
             volume_->sync(*written_);
             return true;
         },
-        [this](bool goesOn) { written_->losesWrites = goesOn; });
+        [this](bool goesOn) {
+            for (auto& write : written_->unsynced) {
+                write.isGivenUp = goesOn;
+            }
+        });
 }
 
 bool CrashingDisk::exchange(std::string const& left, std::string const& right) {
@@ -252,40 +261,52 @@ bool CrashingDisk::exchange(std::string const& left, std::string const& right) {
         if (!volume_->canExchange) {
             return false;
         }
-        find(left).changed = find(right).changed = volume_->clock_;
-        std::swap(names().at(left), names().at(right));
+        auto const first = find(left);
+        auto const second = find(right);
+        first->changed = second->changed = volume_->clock_;
+        bind(left, second);
+        bind(right, first);
         return true;
     });
 }
 
 void CrashingDisk::rename(std::string const& from, std::string const& to) {
     call("rename " + kindOf(from) + " " + kindOf(to), [&] {
-        find(from).changed = volume_->clock_;
-        auto const moved = names().at(from);
-        names().erase(from);
-        names()[to] = moved;
+        auto const moved = find(from);
+        moved->changed = volume_->clock_;
+        bind(from, nullptr);
+        bind(to, moved);
         return true;
     });
 }
 
 bool CrashingDisk::renameToFree(std::string const& from, std::string const& to) {
     return call("renameToFree " + kindOf(from) + " " + kindOf(to), [&] {
-        find(from).changed = volume_->clock_;
-        bool const isFree = names().try_emplace(to, names().at(from)).second;
-        if (isFree) {
-            names().erase(from);
+        auto const moved = find(from);
+        if (names().contains(to)) {
+            return false;
         }
-        return isFree;
+        moved->changed = volume_->clock_;
+        bind(from, nullptr);
+        bind(to, moved);
+        return true;
     });
 }
 
 bool CrashingDisk::remove(std::string const& name) {
-    return call("remove " + kindOf(name), [&] { return names().erase(name) > 0; });
+    return call("remove " + kindOf(name), [&] {
+        bool const isThere = names().contains(name);
+        if (isThere) {
+            bind(name, nullptr);
+        }
+        return isThere;
+    });
 }
 
 void CrashingDisk::syncFolder() {
     call("syncFolder", [this] {
         folder_->durable = names();
+        folder_->unsynced.clear();
         return true;
     });
 }

@@ -94,6 +94,7 @@ private:
     struct Write {
         std::uint64_t offset;
         std::string bytes;
+        bool isGivenUp = false; ///< a sync failed, after which the system doesn't try again
     };
 
     struct File {
@@ -104,7 +105,6 @@ private:
         std::string bytes;
         std::string durable;
         std::vector<Write> unsynced;
-        bool losesWrites = false; ///< a sync failed, and the system has given up on what it could not write
     };
 
     using Names = std::map<std::string, std::shared_ptr<File>>;
@@ -112,13 +112,18 @@ private:
     struct Folder {
         Names names;
         Names durable;
+        std::map<std::string, std::vector<std::shared_ptr<File>>> unsynced; ///< what names have led to since
         void const* lockedBy = nullptr;
     };
+
+    /// Lets a name lead to a file, or to nothing.
+    static void bind(Folder& folder, std::string const& name, std::shared_ptr<File> file);
 
     std::shared_ptr<File> makeFile(std::string bytes);
     std::shared_ptr<File> file(std::string const& name) const;
     void write(File& file, std::string_view bytes);
-    void sync(File& file);
+    static void apply(Write const& write, std::string& bytes);
+    static void sync(File& file);
     bool stamp(File& file);
     void setTimes(File& file) const;
     Trouble nextTrouble();
@@ -179,7 +184,8 @@ private:
 
     [[noreturn]] void die();
     CrashingVolume::Names& names();
-    File& find(std::string const& name);
+    std::shared_ptr<File> find(std::string const& name);
+    void bind(std::string const& name, std::shared_ptr<File> file);
     std::optional<stores::FileIdentity> identifyIn(CrashingVolume::Folder* folder, std::string const& name);
     void writeWithinRoom(File& file, std::string_view bytes);
 

@@ -36,15 +36,15 @@ void CrashingVolume::powerCut() {
     if (!folder_) {
         return;
     }
-    Names all = folder_->durable;
-    for (auto const& [name, file] : folder_->names) {
-        all.try_emplace(name, file);
-    }
-    Names left;
-    for (auto const& [name, any] : all) {
-        auto const& from = pick(1) == 0 ? folder_->names : folder_->durable;
-        if (auto const found = from.find(name); found != from.end()) {
-            left.insert(*found);
+    Names left = folder_->durable;
+    for (auto const& [name, files] : folder_->unsynced) {
+        auto const picked = pick(files.size());
+        if (picked == files.size()) {
+            continue; // as it was at the last sync
+        }
+        left.erase(name);
+        if (files[picked]) {
+            left.emplace(name, files[picked]);
         }
     }
     for (auto const& [name, file] : left) {
@@ -60,24 +60,34 @@ void CrashingVolume::powerCut() {
 /// beginning, or the whole length with zeros where the data did not come.
 void CrashingVolume::tear(File& file) {
     auto bytes = file.durable;
-    for (auto const& write : file.unsynced) {
+    for (auto write : file.unsynced) {
         if (pick(1) == 0) {
             continue;
         }
-        auto part = write.bytes;
-        auto const kept = pick(part.size());
+        auto const kept = pick(write.bytes.size());
         if (pick(1) == 0) {
-            part.resize(kept);
+            write.bytes.resize(kept);
         } else {
-            std::fill(part.begin() + static_cast<std::ptrdiff_t>(kept), part.end(), '\0');
+            std::fill(write.bytes.begin() + static_cast<std::ptrdiff_t>(kept), write.bytes.end(), '\0');
         }
-        bytes.resize(std::max<std::size_t>(bytes.size(), write.offset + part.size()), '\0');
-        bytes.replace(write.offset, part.size(), part);
+        apply(write, bytes);
     }
     file.bytes = bytes;
     file.durable = std::move(bytes);
     file.unsynced.clear();
-    file.losesWrites = false;
+}
+
+void CrashingVolume::apply(Write const& write, std::string& bytes) {
+    bytes.resize(std::max<std::size_t>(bytes.size(), write.offset + write.bytes.size()), '\0');
+    bytes.replace(write.offset, write.bytes.size(), write.bytes);
+}
+
+void CrashingVolume::bind(Folder& folder, std::string const& name, std::shared_ptr<File> file) {
+    folder.unsynced[name].push_back(file);
+    folder.names.erase(name);
+    if (file) {
+        folder.names.emplace(name, std::move(file));
+    }
 }
 
 std::vector<std::string> CrashingVolume::names() const {
@@ -116,6 +126,7 @@ void CrashingVolume::replaceFile(std::string const& name, std::string bytes) {
     fresh->durable = fresh->bytes;
     folder_->names[name] = fresh;
     folder_->durable[name] = fresh;
+    folder_->unsynced.erase(name);
 }
 
 void CrashingVolume::overwrite(std::string const& name, std::string bytes) {
@@ -137,6 +148,7 @@ void CrashingVolume::touch(std::string const& name) {
 void CrashingVolume::remove(std::string const& name) {
     folder_->names.erase(name);
     folder_->durable.erase(name);
+    folder_->unsynced.erase(name);
 }
 
 void CrashingVolume::putPipe(std::string const& name) {
@@ -161,16 +173,18 @@ std::shared_ptr<CrashingVolume::File> CrashingVolume::file(std::string const& na
 }
 
 void CrashingVolume::write(File& file, std::string_view bytes) {
-    file.unsynced.push_back({file.bytes.size(), std::string(bytes)});
+    file.unsynced.push_back({file.bytes.size(), std::string(bytes), false});
     file.bytes += bytes;
     setTimes(file);
 }
 
 void CrashingVolume::sync(File& file) {
-    if (!file.losesWrites) {
-        file.durable = file.bytes;
-        file.unsynced.clear();
-    }
+    std::erase_if(file.unsynced, [&file](Write const& write) {
+        if (!write.isGivenUp) {
+            apply(write, file.durable);
+        }
+        return !write.isGivenUp;
+    });
 }
 
 /// Gives a file a time between two ticks of the clock.
@@ -187,7 +201,7 @@ void CrashingVolume::setTimes(File& file) const {
 }
 
 FileIdentity CrashingVolume::identify(File const& file) {
-    return {1, file.inode, file.bytes.size(), file.modified, file.changed};
+    return {1, file.inode, file.bytes.size(), file.modified, file.changed, !file.isPipe};
 }
 
 } // namespace project::test

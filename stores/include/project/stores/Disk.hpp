@@ -18,6 +18,7 @@ struct FileIdentity {
     std::uint64_t size = 0;
     std::int64_t modified = 0; ///< nanoseconds since 1970
     std::int64_t changed = 0;  ///< nanoseconds since 1970
+    bool isRegular = true;     ///< false for what is never opened: links, pipes, folders
 
     friend bool operator==(FileIdentity const&, FileIdentity const&) = default;
 
@@ -61,8 +62,8 @@ public:
     /// folder or cannot be opened.
     virtual bool openFolder() = 0;
 
-    /// Makes the folder and makes its entry in the root durable. Opens it. @return false when it was there
-    /// already, and was opened only.
+    /// Makes the folder unless it is there, makes its entry in the root durable, and opens it unless it is
+    /// the one already open. @return false when it was there.
     virtual bool makeFolder() = 0;
 
     /// Removes the folder if it is empty, and closes it, which lets the lock go. Never throws: what cannot
