@@ -267,6 +267,17 @@ void LabelModel::putRecord(Path const& path, std::u16string const& labelUUID, st
     files_.at(path).records.push_back({labelUUID, value});
 }
 
+Lines LabelModel::getRecords(Path const& path) const {
+    Lines result;
+    auto const file = files_.find(path);
+    if (file != files_.end()) {
+        for (auto const& record : file->second.records) {
+            result.push_back(quoted(record.labelUUID) + " " + quoted(record.value));
+        }
+    }
+    return result;
+}
+
 void LabelModel::putValue(Path const& path, std::u16string const& value) {
     files_.at(path).categories.at(0).labels.at(0).value = value;
 }

@@ -107,6 +107,9 @@ public:
     /// What somebody else stored: a data record on a file.
     void putRecord(Path const& path, std::u16string const& labelUUID, std::u16string const& value);
 
+    /// The records that somebody else finds on a file, the UUID of the label and the data of each.
+    Lines getRecords(Path const& path) const;
+
     /// What somebody else stored: a value on the first label of a file.
     void putValue(Path const& path, std::u16string const& value);
 

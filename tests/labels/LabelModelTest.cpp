@@ -162,6 +162,17 @@ public:
         write(address, node);
     }
 
+    Lines getRecords(Path const& path) {
+        Lines result;
+        if (auto const node = store->getNode(at(path).child({u"LabelData", u"Data"}))) {
+            for (auto const& record : node->getChildren()) {
+                result.push_back(test::quoted(record->get(u"UUID")) + " " +
+                                 test::quoted(record->get(u"Value")));
+            }
+        }
+        return result;
+    }
+
     void putValue(Path const& path, std::u16string const& value) {
         std::shared_ptr<metadata::MetadataNode> const node = store->getNode(at(path));
         node->getChildren().at(0)->getChildren().at(0)->put(u"Value", value);
@@ -263,12 +274,13 @@ void append(Lines& all, std::function<Lines()> const& call) {
 }
 
 /// The answers to all questions that can be asked.
-template <class Files, class Labels>
-Lines answers(Path const& root, Files& files, Labels& labels) {
+template <class Files, class Labels, class Others>
+Lines answers(Path const& root, Files& files, Labels& labels, Others& others) {
     Lines all = lines(files.getProjectFiles());
     for (auto const& relative : allPaths) {
         append(all, [&] { return lines(files.getLabelIDSets(root / relative)); });
         append(all, [&] { return lines(files.getLabels(root / relative)); });
+        append(all, [&] { return others.getRecords(root / relative); });
     }
     append(all, [&] { return lines(labels.getAllCategories()); });
     for (auto const& uuid : categoryUUIDs) {
@@ -310,7 +322,7 @@ public:
         auto const expected = outcomeOf([&] { return make(step, paths, model_, model_, model_); });
         auto const actual = outcomeOf([&] { return make(step, paths, real_.files, real_.labels, real_); });
         RC_ASSERT(actual == expected);
-        RC_ASSERT(answers(root_, real_.files, real_.labels) == answers(root_, model_, model_));
+        RC_ASSERT(answers(root_, real_.files, real_.labels, real_) == answers(root_, model_, model_, model_));
     }
 
 private:
