@@ -1,3 +1,5 @@
+#include <memory>
+
 #include "ToolTest.hpp"
 
 namespace project::test {
@@ -126,6 +128,20 @@ TEST_F(AddCommand, takesManyPathsFromStandardInput) {
     EXPECT_THAT(tool({"add", "--null"}, names), SucceedsSilently());
 
     EXPECT_EQ(list().size(), 501U);
+}
+
+TEST_F(AddCommand, worksInManyProcessesAtOnce) {
+    std::vector<std::unique_ptr<RunningProgram>> running;
+    for (auto const* name : {"a", "b", "c", "d", "e", "f"}) {
+        folder_.addFile(name);
+        running.push_back(std::make_unique<RunningProgram>(commandFor({"add", name}), settings_));
+    }
+
+    for (auto const& adding : running) {
+        EXPECT_THAT(adding->finish(), SucceedsSilently());
+    }
+
+    EXPECT_THAT(list(), ElementsAre("a", "b", "c", "d", "e", "f"));
 }
 
 TEST_F(AddCommand, refusesAnEmptyPath) {

@@ -74,6 +74,20 @@ TEST_F(InitCommand, takesALinkForTheFolderItLeadsTo) {
     EXPECT_THAT(toolFrom("real", {"name"}), Prints("real\n"));
 }
 
+TEST_F(InitCommand, makesOneProjectWhenTwoProcessesTryAtOnce) {
+    for (int round = 0; round < 10; ++round) {
+        settings_.folder = folder_.addFolder(std::to_string(round));
+        RunningProgram first(commandFor({"init", "--name", "first"}), settings_);
+        RunningProgram second(commandFor({"init", "--name", "second"}), settings_);
+
+        auto const results = std::pair(first.finish(), second.finish());
+
+        EXPECT_EQ(results.first.exitCode + results.second.exitCode, 1)
+            << results.first.errors << results.second.errors;
+        EXPECT_THAT(tool({"name"}), Prints(results.first.exitCode == 0 ? "first\n" : "second\n"));
+    }
+}
+
 TEST_F(InitCommand, leavesNothingBehindWhereNothingCanBeWritten) {
     settings_.fileSize = 0; // every file is too large
 

@@ -42,24 +42,30 @@ public:
     }
 
     int run() override {
-        Progress progress("Reading folders");
         auto project = OpenProject::ofWorkingFolder();
         ArgumentPaths absolute(workingFolder());
         std::vector<Path> paths;
         for (auto const& argument : allArguments()) {
             paths.push_back(absolute.absolute(argument));
         }
+        add(project, paths);
+        tellUnaddable();
+        output().say(std::to_string(paths.size()) + " added to the project");
+        return 0;
+    }
+
+private:
+    /// @param paths becomes all that was added.
+    void add(OpenProject& project, std::vector<Path>& paths) {
+        Progress progress("Reading folders");
         auto contents = recursive_ ? contentsOf(paths, project, progress) : std::vector<Path>();
         std::erase(paths, project.root()); // in every project, and nothing to add
         paths.insert(paths.end(), std::make_move_iterator(contents.begin()),
                      std::make_move_iterator(contents.end()));
         progress.begin("Adding " + std::to_string(paths.size()) + " files and folders");
         project.files().add(paths);
-        output().say(std::to_string(paths.size()) + " added to the project");
-        return 0;
     }
 
-private:
     std::vector<std::string> allArguments() const {
         std::vector<std::string> result;
         bool readsInput = null_;
@@ -79,8 +85,7 @@ private:
 
     /// What the folders among the paths contain and the project does not have yet: what it has is not
     /// touched.
-    std::vector<Path> contentsOf(std::vector<Path> const& paths, OpenProject& project,
-                                 Progress& progress) const {
+    std::vector<Path> contentsOf(std::vector<Path> const& paths, OpenProject& project, Progress& progress) {
         DiskWalk walk(project.root(), progress);
         auto const storeFolder = project.store().getMetadataRoot();
         for (auto const& path : paths) {
@@ -89,7 +94,7 @@ private:
                 walk.enter(path);
             }
         }
-        tellUnaddable(walk.unaddable());
+        unaddable_ = walk.unaddable();
         auto result = walk.found();
         if (gitignore_) {
             progress.begin("Asking git what it ignores");
@@ -105,10 +110,10 @@ private:
         return path == folder || project::metadata::isParent(path, folder);
     }
 
-    static void tellUnaddable(std::vector<Path> const& paths) {
-        if (!paths.empty()) {
-            auto const others = paths.size() - 1;
-            printError("left out \"" + shown(paths.front()) + '"' +
+    void tellUnaddable() const {
+        if (!unaddable_.empty()) {
+            auto const others = unaddable_.size() - 1;
+            printError("left out \"" + shown(unaddable_.front()) + '"' +
                        (others > 0 ? " and " + std::to_string(others) + " more" : "") +
                        ": a name that begins with two dots cannot be added from the project's root");
         }
@@ -128,6 +133,7 @@ private:
     bool recursive_ = false;
     bool gitignore_ = false;
     bool null_ = false;
+    std::vector<Path> unaddable_; ///< what was left out of the folders' contents
 };
 
 } // namespace

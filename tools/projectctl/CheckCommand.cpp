@@ -4,6 +4,7 @@
 #include "NameForms.hpp"
 #include "OpenProject.hpp"
 #include "Output.hpp"
+#include "Progress.hpp"
 #include "TreeCheck.hpp"
 
 namespace projectctl {
@@ -25,6 +26,7 @@ public:
         if (repair_) {
             repair(project);
         }
+        Progress progress("Looking through the project");
         std::size_t faults = 0;
         auto const file = project.textFile();
         for (auto const& fault : project.text().check()) {

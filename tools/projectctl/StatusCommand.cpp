@@ -27,12 +27,10 @@ public:
     }
 
     int run() override {
-        Progress progress("Comparing the project with the disk");
         auto project = OpenProject::ofWorkingFolder();
         root_ = project.root();
         project.warnOfDamage();
-        StatusScan scan(project, progress);
-        scan.run();
+        auto const scan = compare(project);
         for (auto const& line : scan.unreadable()) {
             printError("warning: " + line);
         }
@@ -42,6 +40,13 @@ public:
     }
 
 private:
+    static StatusScan compare(OpenProject& project) {
+        Progress progress("Comparing the project with the disk");
+        StatusScan scan(project);
+        scan.run(progress);
+        return scan;
+    }
+
     using Files = std::vector<StatusScan::File>;
 
     Files withoutIgnored(Files const& files) const {

@@ -21,17 +21,16 @@ int orderOf(Listed file, Listed lastFile, Found entry, Found lastEntry) {
 
 } // namespace
 
-StatusScan::StatusScan(OpenProject& project, Progress& progress)
-    : root_(project.root()), list_(project), progress_(progress) {
+StatusScan::StatusScan(OpenProject& project) : root_(project.root()), list_(project) {
 }
 
-void StatusScan::run() {
+void StatusScan::run(Progress& progress) {
     auto const address = list_.addressOf(root_);
-    compare(root_, address, list_.level(address).files);
+    compare(root_, address, list_.level(address).files, progress);
 }
 
-void StatusScan::compare(Path const& folder, Address const& address,
-                         project::stores::Children const& listed) {
+void StatusScan::compare(Path const& folder, Address const& address, project::stores::Children const& listed,
+                         Progress& progress) {
     std::vector<DiskEntry> onDisk;
     try {
         onDisk = readDiskFolder(folder);
@@ -41,7 +40,7 @@ void StatusScan::compare(Path const& folder, Address const& address,
     auto file = listed.cbegin();
     auto entry = onDisk.cbegin();
     while (file != listed.end() || entry != onDisk.end()) { // both are sorted by name
-        progress_.reach(++seen_);
+        progress.reach(++seen_);
         auto const order = orderOf(file, listed.end(), entry, onDisk.end());
         if (order < 0) {
             lookFor(folder, address, *file);
@@ -49,7 +48,7 @@ void StatusScan::compare(Path const& folder, Address const& address,
             takeAdded(folder, *entry);
         } else if (entry->kind == Kind::Folder) {
             auto const below = address.child(file->element);
-            compare(folder / Path(entry->name), below, list_.level(below).files);
+            compare(folder / Path(entry->name), below, list_.level(below).files, progress);
         } else {
             compareListed(folder / Path(entry->name), address.child(file->element));
         }

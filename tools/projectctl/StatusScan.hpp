@@ -18,10 +18,10 @@ public:
         Kind kind;
     };
 
-    StatusScan(OpenProject& project, Progress& progress);
+    explicit StatusScan(OpenProject& project);
 
     /// To be called once.
-    void run();
+    void run(Progress& progress);
 
     /// On disk and not in the project. A folder stands for everything below it, none of which is in the
     /// project either.
@@ -36,7 +36,8 @@ public:
 private:
     using Address = project::metadata::MetadataPath;
 
-    void compare(Path const& folder, Address const& address, project::stores::Children const& listed);
+    void compare(Path const& folder, Address const& address, project::stores::Children const& listed,
+                 Progress& progress);
     void compareListed(Path const& path, Address const& address);
     void lookFor(Path const& folder, Address const& address, project::stores::Child const& file);
     void takeAdded(Path const& folder, DiskEntry const& entry);
@@ -44,7 +45,6 @@ private:
 
     Path root_;
     FileList list_;
-    Progress& progress_;
     std::size_t seen_ = 0;
     std::vector<File> added_;
     std::vector<File> gone_;
