@@ -283,7 +283,7 @@ private:
     /// After the death of a process its batch is in the project or not, for all to see. It is certain only
     /// with the next batch that is kept: until then a power cut may bring back the other.
     void settle(Model const& after) {
-        auto const found = visibleNow();
+        auto const found = visibleTo(0);
         bool const isBefore = found == visible(model_.content());
         require(isBefore || found == visible(after.content()),
                 "the project is neither as before the step nor as after it");
@@ -301,7 +301,7 @@ private:
         auto possible = std::exchange(notDurable_, {});
         possible.push_back(after);
         possible.push_back(model_);
-        auto const found = visibleNow();
+        auto const found = visibleTo(0);
         auto const match = std::find_if(possible.begin(), possible.end(), [&](Model const& model) {
             return found == visible(model.content());
         });
@@ -309,15 +309,16 @@ private:
         model_ = *match;
     }
 
-    Content visibleNow() {
+    Content visibleTo(std::size_t process) {
+        auto& tree = *trees_.at(process);
+        auto const guard = tree.acquireReadLock(); // one look for all the questions
         Content content;
-        ask(*trees_[0], Address::root(), content);
+        ask(tree, Address::root(), content);
         return content;
     }
 
     void check(std::size_t process) {
-        Content content;
-        ask(*trees_.at(process), Address::root(), content);
+        auto const content = visibleTo(process);
         auto const wanted = visible(model_.content());
         if (content != wanted) {
             throw std::logic_error("the project is not as the model: " + firstDifference(wanted, content));

@@ -88,9 +88,9 @@ TEST_F(TextBackendStrangers, aPipeThatComesBetweenIsPutBackToo) {
 
 TEST_F(TextBackendStrangers, ofTwoTextsThatComeBetweenNoneIsLost) {
     prepare({u"a"});
-    auto const backend = open();
-    auto const second = textOf(addFiles({u"their second file"}));
     int exchanges = 0;
+    auto const second = textOf(addFiles({u"their second file"}));
+    auto const backend = open();
     volume->beforeCall = [&](std::string const& call) {
         if (call == "exchange swapping project.jsonl") {
             volume->replaceFile("project.jsonl", ++exchanges == 1 ? theirs : second);
@@ -107,8 +107,8 @@ TEST_F(TextBackendStrangers, ofTwoTextsThatComeBetweenNoneIsLost) {
 
 TEST_F(TextBackendStrangers, aTextThatCannotBePutBackIsSetAsideAndNamed) {
     prepare({u"a"});
-    auto const backend = open();
     int exchanges = 0;
+    auto const backend = open();
     volume->beforeCall = [&](std::string const& call) {
         if (call == "exchange swapping project.jsonl") {
             if (++exchanges == 2) {

@@ -351,12 +351,7 @@ TEST_F(TextBackendWriting, aFullDiskAtARewriteLeavesTheTextAndNoTemporaryFile) {
 TEST_F(TextBackendWriting, whenAnAppendCannotBeSyncedTheTextWithoutItGoesToANewFile) {
     prepare(manyFiles(20));
     auto const backend = open(appending());
-    bool hasFailed = false;
-    volume->beforeCall = [&](std::string const& call) {
-        if (call == "sync" && !std::exchange(hasFailed, true)) {
-            throw StoreError("", 0, "Input/output error", "");
-        }
-    };
+    failOnce("sync");
 
     auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
 
@@ -370,12 +365,7 @@ TEST_F(TextBackendWriting, whenAnAppendCannotBeSyncedTheTextWithoutItGoesToANewF
 TEST_F(TextBackendWriting, afterAFailedSyncTheNextBatchIsWrittenAsUsual) {
     prepare(manyFiles(20));
     auto const backend = open(appending());
-    bool hasFailed = false;
-    volume->beforeCall = [&](std::string const& call) {
-        if (call == "sync" && !std::exchange(hasFailed, true)) {
-            throw StoreError("", 0, "Input/output error", "");
-        }
-    };
+    failOnce("sync");
     EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
 
     commit(*backend, addFiles({u"c"}));
@@ -411,12 +401,7 @@ TEST_F(TextBackendWriting, whenTheFolderCannotBeSyncedAfterARewriteTheTextWithou
     prepare({u"a"});
     auto const before = text();
     auto const backend = open();
-    bool hasFailed = false;
-    volume->beforeCall = [&](std::string const& call) {
-        if (call == "syncFolder" && !std::exchange(hasFailed, true)) {
-            throw StoreError("", 0, "Input/output error", "");
-        }
-    };
+    failOnce("syncFolder");
 
     EXPECT_EQ("Input/output error", errorOf([&] { commit(*backend, addFiles({u"b"})); }).getProblem());
 

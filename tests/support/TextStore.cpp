@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <ostream>
+#include <utility>
 
 namespace project::metadata {
 
@@ -105,6 +106,14 @@ void TextStore::prepareText(std::string text) const {
     volume->makeFolder();
     volume->replaceFile("project.jsonl", std::move(text));
     volume->advanceBeyondTick();
+}
+
+void TextStore::failOnce(std::string call) const {
+    volume->beforeCall = [call = std::move(call), hasFailed = false](std::string const& now) mutable {
+        if (now == call && !std::exchange(hasFailed, true)) {
+            throw StoreError("", 0, "Input/output error", "");
+        }
+    };
 }
 
 std::vector<std::string> TextStore::writes() const {

@@ -109,6 +109,9 @@ protected:
     /// Makes a store with this text, as git brings it.
     void prepareText(std::string text) const;
 
+    /// Lets the first call of this name fail.
+    void failOnce(std::string call) const;
+
     /// What another process reads in the project now.
     Content stored(Options options = rewriting()) const { return contentOf(*open(options)); }
 
