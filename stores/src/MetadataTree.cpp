@@ -119,6 +119,21 @@ MetadataTree::Place* MetadataTree::find(Address const& address) const {
     return place;
 }
 
+MetadataTree::Place* MetadataTree::findLoaded(Address const& address) const {
+    auto* place = root_.get();
+    for (std::size_t index = 0; index < address.depth(); ++index) {
+        if (!place->loaded.load(std::memory_order_relaxed) || !place->below) {
+            return nullptr;
+        }
+        auto const found = place->below->find(address[index]);
+        if (found == place->below->end()) {
+            return nullptr;
+        }
+        place = &found->second;
+    }
+    return place->loaded.load(std::memory_order_relaxed) ? place : nullptr;
+}
+
 void MetadataTree::load(Place& place, Address const& address) const {
     if (place.loaded.load(std::memory_order_acquire)) {
         return;
@@ -240,8 +255,7 @@ void MetadataTree::takeIn(Changes const& changes) {
         }
     }
     for (auto const& level : levels) {
-        auto* place = find(level);
-        if (place != nullptr && place->loaded.load(std::memory_order_relaxed)) {
+        if (auto* place = findLoaded(level)) {
             reload(*place, level);
         }
     }

@@ -50,7 +50,10 @@ private:
     struct ByElement;
     using Places = std::map<Address, Place, ByElement>;
 
+    /// Loads the levels above as it goes. Null when the address does not exist.
     Place* find(Address const& address) const;
+    /// Loads nothing. Null when the address does not exist, or what lies below it was never asked for.
+    Place* findLoaded(Address const& address) const;
     void load(Place& place, Address const& address) const;
     void reload(Place& place, Address const& address);
     void forget();

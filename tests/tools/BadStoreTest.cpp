@@ -85,16 +85,21 @@ TEST_F(BadStore, withATornTailHasLostNothing) {
 
 TEST_F(BadStore, thatEndsTooEarlyIsNeverTakenForAnEmptyProject) {
     auto const whole = readText();
+    auto const half = whole.substr(0, whole.size() / 2);
+
+    writeText(half);
     RunningProgram listing(commandFor({"list"}), settings_);
-    writeText(whole.substr(0, whole.size() / 2));
-    RunningProgram other(commandFor({"add", "c"}), settings_);
-    ASSERT_TRUE(other.waitUntilItSleeps()); // it looks again and again for the rest
-
+    ASSERT_TRUE(listing.waitUntilItSleeps()); // it looks again and again for the rest
     writeText(whole);
-
-    EXPECT_THAT(other.finish(), SucceedsSilently());
     EXPECT_THAT(listing.finish(), Prints("a\nb\n"));
+
+    writeText(half);
+    RunningProgram adding(commandFor({"add", "c"}), settings_);
+    ASSERT_TRUE(adding.waitUntilItSleeps());
+    writeText(whole);
+    EXPECT_THAT(adding.finish(), SucceedsSilently());
     EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
+}), Prints("a\nb\nc\n"));
 }
 
 TEST_F(BadStore, thatIsGoneIsAnError) {
