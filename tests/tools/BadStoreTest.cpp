@@ -98,9 +98,7 @@ TEST_F(BadStore, thatEndsTooEarlyIsNeverTakenForAnEmptyProject) {
     ASSERT_TRUE(adding.waitUntilItSleeps());
     writeText(whole);
     EXPECT_THAT(adding.finish(), SucceedsSilently());
-    EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
-}), Prints("a\nb\nc\n"));
-}
+    EXPECT_THAT(tool({"list"}
 
 TEST_F(BadStore, thatIsGoneIsAnError) {
     std::filesystem::remove(text());
@@ -172,8 +170,7 @@ TEST_F(BadStore, thatSomebodyElseHoldsIsWaitedFor) {
     EXPECT_EQ(holder.finish("\n").output, "held\n");
 
     EXPECT_THAT(adding.finish(), SucceedsSilently());
-    EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
-}
+    EXPECT_THAT(tool({"list"}
 
 } // namespace
 } // namespace project::test
