@@ -37,6 +37,34 @@ TEST_F(CheckCommand, saysSoOnATerminal) {
     EXPECT_EQ(tool({"check"}).output, "The project has no faults.\r\n");
 }
 
+TEST_F(CheckCommand, tellsOnATerminalWhatToDo) {
+    auto const lastLine = [this] { return linesOf(tool({"check"}).output).back(); };
+    auto const sound = readText();
+    settings_.onTerminal = true;
+
+    writeText(sound + "\"torn");
+    EXPECT_EQ(lastLine(), "'projectctl tidy' puts right what is only irregular or torn.\r");
+
+    insertLineBefore("\"b\"", "nonsense");
+    EXPECT_EQ(lastLine(), "'projectctl check --repair' sets damaged lines aside.\r");
+
+    insertLineBefore("\"b\"", "<<<<<<< ours");
+    EXPECT_EQ(lastLine(), "What a merge left is to be settled first, in an editor or with git mergetool.\r");
+
+    writeText(sound);
+    insertLineBefore(beforeTheName, "\"lost/file\"");
+    EXPECT_EQ(lastLine(), "What the lines say is to be put right in an editor.\r");
+}
+
+TEST_F(CheckCommand, namesAFileThatIsNotTheStores) {
+    folder_.file(u".projectdata/displaced-0123456789abcdef.jsonl");
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_THAT(linesOf(result.output), ElementsAre(tells("displaced-0123456789abcdef.jsonl")));
+}
+
 TEST_F(CheckCommand, namesEveryFaultOfTheTextWithItsLine) {
     insertLineBefore("\"b\"", "{\"file\":");
     insertLineBefore("\"b\"", "\"a\"");

@@ -1,4 +1,6 @@
+#include <algorithm>
 #include <string>
+#include <vector>
 
 #include "Commands.hpp"
 #include "NameForms.hpp"
@@ -10,6 +12,8 @@
 namespace projectctl {
 
 namespace {
+
+using project::stores::Fault;
 
 /// Looks for faults in the project's text and in what it says, and tells all of them.
 class CheckCommand : public Command {
@@ -29,17 +33,17 @@ public:
         Progress progress("Looking through the project");
         std::size_t faults = 0;
         auto const file = project.textFile();
-        for (auto const& fault : project.text().check()) {
+        auto const faultsOfText = project.text().check();
+        for (auto const& fault : faultsOfText) {
             ++faults;
-            tell(file + ':' + std::to_string(fault.line) + ": " + fault.problem);
+            auto const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
+            tell(file + line + ": " + fault.problem);
         }
         for (auto const& finding : TreeCheck(project.store(), project.files()).run()) {
             faults += finding.isFault ? 1 : 0;
             tell(file + (finding.isFault ? ": " : ": note: ") + finding.text);
         }
-        if (faults == 0) {
-            output().say("The project has no faults.");
-        }
+        output().say(faults == 0 ? "The project has no faults." : adviceFor(faultsOfText));
         return faults == 0 ? 0 : 1;
     }
 
@@ -50,6 +54,22 @@ private:
         if (!aside.empty()) {
             tell("what was damaged stands in " + project.storeFile(aside) + " now");
         }
+    }
+
+    static char const* adviceFor(std::vector<Fault> const& faults) {
+        auto const has = [&faults](Fault::Kind kind) {
+            return std::ranges::find(faults, kind, &Fault::kind) != faults.end();
+        };
+        if (has(Fault::Kind::Conflict)) {
+            return "What a merge left is to be settled first, in an editor or with git mergetool.";
+        }
+        if (has(Fault::Kind::Damage)) {
+            return "'projectctl check --repair' sets damaged lines aside.";
+        }
+        if (has(Fault::Kind::Irregular) || has(Fault::Kind::TornTail)) {
+            return "'projectctl tidy' puts right what is only irregular or torn.";
+        }
+        return "What the lines say is to be put right in an editor.";
     }
 
     /// One line, whatever is in it.

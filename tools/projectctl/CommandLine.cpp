@@ -97,6 +97,7 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     tool.set_version_flag("--version", version, "Show the version and exit");
     auto const commands = makeCommands();
     std::vector<CLI::App*> declared;
+    declared.reserve(commands.size());
     for (auto const& command : commands) {
         declared.push_back(command->declare(tool));
     }

@@ -44,7 +44,7 @@ public:
 
 private:
     static Path chosenFolder(std::string const& argument) {
-        auto const folder = fl::filesystem::canonical(fl::filesystem::fromSystem(argument), workingFolder());
+        auto folder = fl::filesystem::canonical(fl::filesystem::fromSystem(argument), workingFolder());
         if (argument.empty() || !project::metadata::is_directory(folder)) {
             throw Failure("there is no folder \"" + shown(fl::filesystem::fromSystem(argument)) +
                           "\". Make it first.");

@@ -87,6 +87,7 @@ public:
 
     pid_t spawn(std::vector<std::string> const& command) const {
         std::vector<char*> arguments;
+        arguments.reserve(command.size() + 1);
         for (auto const& argument : command) {
             arguments.push_back(const_cast<char*>(argument.c_str()));
         }
