@@ -98,7 +98,8 @@ TEST_F(BadStore, thatEndsTooEarlyIsNeverTakenForAnEmptyProject) {
     ASSERT_TRUE(adding.waitUntilItSleeps());
     writeText(whole);
     EXPECT_THAT(adding.finish(), SucceedsSilently());
-    EXPECT_THAT(tool({"list"}
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
+}
 
 TEST_F(BadStore, thatIsGoneIsAnError) {
     std::filesystem::remove(text());
@@ -170,7 +171,8 @@ TEST_F(BadStore, thatSomebodyElseHoldsIsWaitedFor) {
     EXPECT_EQ(holder.finish("\n").output, "held\n");
 
     EXPECT_THAT(adding.finish(), SucceedsSilently());
-    EXPECT_THAT(tool({"list"}
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
+}
 
 } // namespace
 } // namespace project::test
