@@ -58,8 +58,7 @@ void lookUpByGit(benchmark::State& state) {
     auto const& tree = GeneratedTree::large();
     tree.fillRepository();
     for (auto _ : state) {
-        runSilently(
-            {"git", "-C", tree.onDisk().string(), "ls-files", "--error-unmatch", "--", oneFile(tree)});
+        runSilently(tree.onDisk(), {"git", "ls-files", "--error-unmatch", "--", oneFile(tree)});
     }
 }
 
