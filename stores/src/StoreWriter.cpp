@@ -114,6 +114,11 @@ std::optional<StoreWriter::Put> StoreWriter::swapIn(std::string const& name, Wri
     if (!result.isExchanged) {
         result.beside = StoreFiles::newTemporary();
         result.besideIdentity = disk_.create(result.beside, {}, std::nullopt).identity;
+        if (identifyQuietly(StoreFiles::text) != expected) {
+            removeOwn(result.beside, result.besideIdentity);
+            removeOwn(name, file.identity);
+            return std::nullopt;
+        }
         disk_.rename(name, StoreFiles::text);
     } else if (auto const old = identifyQuietly(name); !old || !old->isSameState(expected)) {
         putBack(name, file.identity);

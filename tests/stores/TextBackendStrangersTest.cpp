@@ -75,6 +75,35 @@ TEST_F(TextBackendStrangers, aTextThatComesBetweenTheLookAndTheExchangeIsPutBack
     EXPECT_EQ(contentAfter({addFiles({u"their file", u"b"})}), stored());
 }
 
+TEST_F(TextBackendStrangers, aTextThatWasPutBackStaysAfterAPowerCut) {
+    for (unsigned seed = 0; seed < 20; ++seed) {
+        *volume = CrashingVolume(seed);
+        prepare({u"a"});
+        once(volume->beforeCall, "exchange swapping project.jsonl",
+             [&] { volume->replaceFile("project.jsonl", theirs); });
+        EXPECT_THROW(commit(*open(), addFiles({u"b"})), StoreError);
+        volume->beforeCall = nullptr;
+
+        volume->powerCut();
+
+        EXPECT_EQ(theirs, text());
+    }
+}
+
+TEST_F(TextBackendStrangers, whereFilesCannotBeExchangedOneLooksAgainRightBeforeTheRename) {
+    for (auto const* moment : {"sync", "exchange swapping project.jsonl", "create temporary"}) {
+        prepare({u"a"});
+        volume->canExchange = false;
+        once(volume->afterCall, moment, [&] { volume->replaceFile("project.jsonl", theirs); });
+
+        EXPECT_THROW(commit(*open(), addFiles({u"b"})), StoreError) << moment;
+
+        volume->afterCall = nullptr;
+        EXPECT_EQ(theirs, text()) << moment;
+        EXPECT_EQ(usual, volume->names()) << moment;
+    }
+}
+
 TEST_F(TextBackendStrangers, aPipeThatComesBetweenIsPutBackToo) {
     prepare({u"a"});
     auto const backend = open();
@@ -212,6 +241,64 @@ TEST_F(TextBackendStrangers, aProcessThatDiesWithAStrangersTextInItsHandsNeverLo
             EXPECT_EQ(usual, volume->names()) << call << " of " << seed;
         }
     }
+}
+
+TEST_F(TextBackendStrangers, aTextThatIsPutBackForADeadWriterStaysAfterAPowerCut) {
+    for (unsigned seed = 0; seed < 20; ++seed) {
+        *volume = CrashingVolume(seed);
+        prepare({u"a"});
+        once(volume->beforeCall, "exchange swapping project.jsonl", [&] {
+            volume->replaceFile("project.jsonl", theirs);
+            volume->plan(CrashingVolume::Trouble::Dies, 1); // before it can be put back
+        });
+        EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
+        volume->beforeCall = nullptr;
+        auto const backend = open(appending());
+        backend->enter(Access::Write);
+
+        volume->powerCut();
+
+        EXPECT_EQ(theirs, text());
+    }
+}
+
+TEST_F(TextBackendStrangers, aBatchBehindATextWhoseWriterDiedOutlivesAPowerCut) {
+    for (unsigned seed = 0; seed < 20; ++seed) {
+        for (bool const isExchanged : {true, false}) {
+            *volume = CrashingVolume(seed);
+            prepare(manyFiles(40));
+            volume->canExchange = isExchanged;
+            volume->afterCall = [&](std::string const& call) {
+                if (call ==
+                    (isExchanged ? "exchange swapping project.jsonl" : "rename swapping project.jsonl")) {
+                    throw ProcessDied(); // the new text has its name, which is not durable
+                }
+            };
+            EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
+            volume->afterCall = nullptr;
+            auto const backend = open(appending());
+            contentOf(*backend);
+            commit(*backend, addFiles({u"c"}));
+            EXPECT_EQ(1U, volume->count("append project.jsonl"));
+
+            volume->powerCut();
+
+            EXPECT_EQ(contentAfter({addFiles(manyFiles(40)), addFiles({u"b", u"c"})}), stored());
+        }
+    }
+}
+
+TEST_F(TextBackendStrangers, whatSomebodyAppendsAtTheVeryMomentOfOurBatchIsSeenAtTheNextGuard) {
+    prepare(manyFiles(40));
+    auto const backend = open(appending());
+    auto const lines = textOf(addFiles(manyFiles(40)), {addFiles({u"b"})}).substr(text().size());
+    volume->amidAppend = [&] { volume->append("project.jsonl", lines); };
+    commit(*backend, addFiles({u"c"}));
+    volume->amidAppend = nullptr;
+
+    EXPECT_EQ(stored(), contentOf(*backend));
+    EXPECT_EQ(1U, stored().count(fileAddress(u"b")));
+    EXPECT_EQ(1U, stored().count(fileAddress(u"c")));
 }
 
 TEST_F(TextBackendStrangers, aStrangersTextIsSetAsideWhereItsPlaceIsTakenByThen) {

@@ -205,6 +205,9 @@ std::optional<WrittenFile> CrashingDisk::append(std::string const& name, FileIde
             return std::nullopt;
         }
         written_ = names().find(name)->second;
+        if (volume_->amidAppend) {
+            volume_->amidAppend();
+        }
         writeWithinRoom(*written_, bytes);
         bool const isStamped = volume_->stamp(*written_);
         return WrittenFile{CrashingVolume::identify(*written_), isStamped};

@@ -42,6 +42,9 @@ public:
     std::function<void(std::string const& call)> beforeCall;
     std::function<void(std::string const& call)> afterCall;
 
+    /// Called within append, after it has found the file in the state expected.
+    std::function<void()> amidAppend;
+
     /// Whether files can be exchanged, and whether they keep the times they are given.
     bool canExchange = true;
     bool keepsStamps = true;
