@@ -34,7 +34,7 @@ void Ratios::compare(std::string what, std::string benchmark, std::vector<std::s
 void Ratios::ReportRuns(std::vector<Run> const& runs) {
     ConsoleReporter::ReportRuns(runs);
     for (auto const& run : runs) {
-        if (!run.error_occurred && run.iterations > 0) {
+        if (!run.error_occurred && run.run_type == Run::RT_Iteration) {
             // Of several repetitions the fastest counts: noise only ever adds.
             auto const seconds = run.real_accumulated_time / static_cast<double>(run.iterations);
             auto const [time, isNew] = times_.try_emplace(plainName(run.run_name.str()), seconds);

@@ -49,7 +49,7 @@ std::strong_ordering compareSteps(Step const* left, Step const* right) noexcept 
     std::strong_ordering order = std::strong_ordering::equal;
     while (left != right) {
         auto const here = compareElements(left->element, right->element);
-        if (here != 0) {
+        if (std::is_neq(here)) {
             order = here; // a difference nearer to the root decides, so later ones of this loop win
         }
         left = left->parent.get();
@@ -126,13 +126,13 @@ MetadataPath MetadataPath::child(PathElement element) const {
 
 bool MetadataPath::isWithin(MetadataPath const& other) const noexcept {
     auto const* step = ascend(step_.get(), other.depth());
-    return depth() >= other.depth() && compareSteps(step, other.step_.get()) == 0;
+    return depth() >= other.depth() && std::is_eq(compareSteps(step, other.step_.get()));
 }
 
 std::strong_ordering compare(MetadataPath const& left, MetadataPath const& right) noexcept {
     auto const depth = std::min(left.depth(), right.depth());
     auto const order = compareSteps(ascend(left.step_.get(), depth), ascend(right.step_.get(), depth));
-    return order != 0 ? order : left.depth() <=> right.depth();
+    return std::is_neq(order) ? order : left.depth() <=> right.depth();
 }
 
 MetadataPathBuilder& MetadataPathBuilder::add(std::u16string const& type, std::u16string const& location) {

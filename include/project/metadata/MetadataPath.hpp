@@ -71,11 +71,11 @@ PROJECT_METADATA_EXPORT std::strong_ordering compare(MetadataPath const& left,
                                                      MetadataPath const& right) noexcept;
 
 inline bool operator<(MetadataPath const& left, MetadataPath const& right) noexcept {
-    return compare(left, right) < 0;
+    return std::is_lt(compare(left, right));
 }
 
 inline bool operator==(MetadataPath const& left, MetadataPath const& right) noexcept {
-    return compare(left, right) == 0;
+    return std::is_eq(compare(left, right));
 }
 
 } // namespace project::metadata

@@ -37,7 +37,7 @@ public:
 
         /// A text whose body is not longer than this many bytes is written anew by every batch. Rewriting
         /// that much costs little more than appending to it.
-        std::size_t alwaysRewritten = 256 * 1024;
+        std::size_t alwaysRewritten = std::size_t{256} * 1024;
 
         /// Batches are appended as long as all of them together are not longer than the body divided by this.
         std::size_t bodyToTail = 16;
