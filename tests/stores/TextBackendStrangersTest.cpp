@@ -60,6 +60,52 @@ TEST_F(TextBackendStrangers, aTextThatWasChangedInPlaceBeforeTheBatchStays) {
     }
 }
 
+TEST_F(TextBackendStrangers, aFolderThatWasMovedAwayBeforeTheBatchIsNotTouched) {
+    for (auto const& options : {rewriting(), appending()}) {
+        prepare(manyFiles(20));
+        auto const backend = open(options);
+        Entered const entered(*backend, Access::Write);
+        backend->write(addFiles({u"b"}));
+        auto const bringBack = volume->moveFolderAway();
+        writes();
+
+        EXPECT_THROW(backend->keep(), StoreError);
+
+        EXPECT_THAT(writes(), IsEmpty());
+        backend->discard();
+        bringBack();
+        EXPECT_EQ(textOf(addFiles(manyFiles(20))), text());
+    }
+}
+
+TEST_F(TextBackendStrangers, aTextThatComesBeforeTheLastLookIsNotEvenExchanged) {
+    prepare({u"a"});
+    auto const backend = open();
+    once(volume->afterCall, "renameToFree temporary swapping",
+         [&] { volume->replaceFile("project.jsonl", theirs); });
+
+    EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
+
+    EXPECT_EQ(0U, volume->count("exchange swapping project.jsonl"));
+    EXPECT_EQ(theirs, text());
+    EXPECT_EQ(usual, volume->names());
+}
+
+TEST_F(TextBackendStrangers, aTextThatIsChangedInPlaceWhileASyncFailsMayHaveTheBatchAndTheErrorSaysSo) {
+    prepare(manyFiles(20));
+    auto const backend = open(appending());
+    once(volume->beforeCall, "sync", [&] {
+        volume->append("project.jsonl", "\"theirs");
+        throw StoreError("", 0, "Input/output error", "");
+    });
+
+    auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
+
+    volume->beforeCall = nullptr;
+    EXPECT_THAT(error.getProblem(), HasSubstr("Input/output error"));
+    EXPECT_THAT(error.getProblem(), HasSubstr("nobody can tell whether the batch is in the project"));
+}
+
 TEST_F(TextBackendStrangers, aTextThatComesBetweenTheLookAndTheExchangeIsPutBack) {
     prepare({u"a"});
     auto const backend = open();
@@ -263,28 +309,33 @@ TEST_F(TextBackendStrangers, aTextThatIsPutBackForADeadWriterStaysAfterAPowerCut
 }
 
 TEST_F(TextBackendStrangers, aBatchBehindATextWhoseWriterDiedOutlivesAPowerCut) {
-    for (unsigned seed = 0; seed < 20; ++seed) {
-        for (bool const isExchanged : {true, false}) {
-            *volume = CrashingVolume(seed);
-            prepare(manyFiles(40));
-            volume->canExchange = isExchanged;
-            volume->afterCall = [&](std::string const& call) {
-                if (call ==
-                    (isExchanged ? "exchange swapping project.jsonl" : "rename swapping project.jsonl")) {
-                    throw ProcessDied(); // the new text has its name, which is not durable
-                }
-            };
-            EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
-            volume->afterCall = nullptr;
-            auto const backend = open(appending());
-            contentOf(*backend);
-            commit(*backend, addFiles({u"c"}));
-            EXPECT_EQ(1U, volume->count("append project.jsonl"));
-
-            volume->powerCut();
-
-            EXPECT_EQ(contentAfter({addFiles(manyFiles(40)), addFiles({u"b", u"c"})}), stored());
+    for (unsigned seed = 0; seed < 40; ++seed) {
+        bool const hasWrittenBefore = seed % 2 == 0;
+        *volume = CrashingVolume(seed);
+        prepare(manyFiles(40));
+        volume->canExchange = seed % 4 < 2;
+        auto const* const last =
+            volume->canExchange ? "exchange swapping project.jsonl" : "rename swapping project.jsonl";
+        auto const backend = open(appending());
+        if (hasWrittenBefore) {
+            commit(*backend, addFiles({u"d"}));
         }
+        volume->afterCall = [&](std::string const& call) {
+            if (call == last) {
+                throw ProcessDied(); // the new text has its name, which is not durable
+            }
+        };
+        EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
+        volume->afterCall = nullptr;
+        contentOf(*backend);
+        volume->calls.clear();
+        commit(*backend, addFiles({u"c"}));
+        ASSERT_EQ(1U, volume->count("append project.jsonl"));
+        auto const kept = stored();
+
+        volume->powerCut();
+
+        EXPECT_EQ(kept, stored()) << seed;
     }
 }
 
