@@ -130,7 +130,7 @@ Content contentOf(ProjectText const& text) {
 }
 
 std::string told(std::vector<Fault> const& faults) {
-    constexpr char const* kinds[] = {"Damage", "Conflict", "Irregular", "TornTail"};
+    constexpr char const* kinds[] = {"Damage", "Conflict", "Irregular", "TornTail", "Displaced"};
     std::string result;
     for (Fault const& fault : faults) {
         result += result.empty() ? "" : ", ";
