@@ -30,7 +30,8 @@ _Unwind_Reason_Code recordFrame(_Unwind_Context* context, void* argument) {
     if (address == 0 || recording.firstFree == recording.end) {
         return _URC_END_OF_STACK;
     }
-    *recording.firstFree++ = reinterpret_cast<Frame>(address);
+    // The unwinder tells addresses as numbers.
+    *recording.firstFree++ = reinterpret_cast<Frame>(address); // NOLINT(performance-no-int-to-ptr)
     return _URC_NO_REASON;
 }
 

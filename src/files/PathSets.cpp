@@ -66,6 +66,7 @@ std::vector<Path> withDescendants(std::vector<Path> const& files,
 
     PathSet result;
     std::vector<Waiting> waiting;
+    waiting.reserve(files.size());
     for (auto const& file : files) {
         waiting.push_back({file, result.end()});
     }

@@ -118,7 +118,7 @@ private:
                 return false;
             }
             if (!string(key) || !pass(":") || !string(value) ||
-                (!first && compareJsonContents(previous, key) >= 0)) {
+                (!first && std::is_gteq(compareJsonContents(previous, key)))) {
                 return false;
             }
             previous = key;

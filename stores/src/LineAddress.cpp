@@ -142,10 +142,10 @@ std::strong_ordering compare(LineAddress const& left, LineAddress const& right) 
             return leftHas <=> rightHas;
         }
         std::strong_ordering order = compareJsonContents(leftSteps.type(), rightSteps.type());
-        if (order == 0) {
+        if (std::is_eq(order)) {
             order = compareJsonContents(leftSteps.location(), rightSteps.location());
         }
-        if (order != 0) {
+        if (std::is_neq(order)) {
             return order;
         }
     }
