@@ -1,7 +1,6 @@
 #include "TextBody.hpp"
 
 #include <algorithm>
-#include <cstring>
 #include <utility>
 
 #include "CanonicalLine.hpp"
@@ -37,10 +36,8 @@ std::size_t gallop(TextBody::Range range, Condition const& holds) noexcept(noexc
 } // namespace
 
 std::string_view TextBody::line(std::size_t index) const noexcept {
-    char const* const begin = bytes_.data() + starts_[index];
-    auto const* const end =
-        static_cast<char const*>(std::memchr(begin, '\n', bytes_.size() - starts_[index]));
-    return {begin, static_cast<std::size_t>(end - begin)};
+    std::size_t const begin = starts_[index];
+    return {bytes_.data() + begin, bytes_.find('\n', begin) - begin};
 }
 
 LineAddress TextBody::address(std::size_t index) const noexcept {
@@ -48,7 +45,7 @@ LineAddress TextBody::address(std::size_t index) const noexcept {
 }
 
 std::size_t TextBody::lowerBound(Range range, LineAddress const& wanted) const noexcept {
-    return gallop(range, [&](std::size_t i) noexcept { return compare(address(i), wanted) < 0; });
+    return gallop(range, [&](std::size_t i) noexcept { return std::is_lt(compare(address(i), wanted)); });
 }
 
 std::size_t TextBody::endOf(Range range, LineAddress const& wanted) const noexcept {
@@ -62,7 +59,7 @@ TextBody::Range TextBody::within(LineAddress const& wanted) const noexcept {
 
 std::optional<std::size_t> TextBody::find(LineAddress const& wanted) const noexcept {
     std::size_t const found = lowerBound(all(), wanted);
-    bool const exact = found < size() && compare(address(found), wanted) == 0;
+    bool const exact = found < size() && std::is_eq(compare(address(found), wanted));
     return exact ? std::optional(found) : std::nullopt;
 }
 

@@ -25,7 +25,7 @@ Children TextContent::children(Address const& parent) const {
     TextBody::Range lines{0, 0};
     if (!overlay_.isHidden(parent)) {
         lines = body_.within(text.view());
-        bool const own = !lines.empty() && compare(body_.address(lines.begin), text.view()) == 0;
+        bool const own = !lines.empty() && std::is_eq(compare(body_.address(lines.begin), text.view()));
         lines.begin += own ? 1 : 0;
     }
     Overlay::Range const entries = overlay_.below(parent);
@@ -100,7 +100,7 @@ TextBody TextContent::write(Batch const& batch) const {
         rest.begin = found;
         if (entry.hides) {
             rest.begin = body_.endOf(rest, text.view());
-        } else if (!rest.empty() && compare(body_.address(found), text.view()) == 0) {
+        } else if (!rest.empty() && std::is_eq(compare(body_.address(found), text.view()))) {
             ++rest.begin;
         }
         if (entry.standing) {

@@ -56,9 +56,9 @@ private:
             auto const order = leftEnds            ? std::strong_ordering::greater
                                : r == right.size() ? std::strong_ordering::less
                                                    : compare(left.address(l), right.address(r));
-            look(toAddress(order > 0 ? right.address(r) : left.address(l)));
-            l += order <= 0 ? 1 : 0;
-            r += order >= 0 ? 1 : 0;
+            look(toAddress(std::is_gt(order) ? right.address(r) : left.address(l)));
+            l += std::is_lteq(order) ? 1 : 0;
+            r += std::is_gteq(order) ? 1 : 0;
         }
     }
 

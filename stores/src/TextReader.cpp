@@ -59,7 +59,7 @@ private:
             std::size_t const length = plainPathLength(bytes.data() + offset_);
             LineAddress const path{LineAddress::Form::Names, {bytes.data() + offset_ + 1, length}};
             constexpr std::size_t quotes = 2;
-            if (length > 0 && bytes[offset_ + length + quotes] == '\n' && compare(last_, path) < 0) {
+            if (length > 0 && bytes[offset_ + length + quotes] == '\n' && std::is_lt(compare(last_, path))) {
                 body_.addLine(offset_);
                 last_ = path;
                 offset_ += length + quotes + 1;
@@ -90,7 +90,7 @@ private:
         }
         std::optional<LineAddress> const address =
             line.endsPlainly() ? canonicalAddress(line.text) : std::nullopt;
-        if (address && compare(last_, *address) < 0) {
+        if (address && std::is_lt(compare(last_, *address))) {
             body_.addLine(offset_);
             last_ = *address;
         } else {
@@ -119,9 +119,9 @@ private:
     void place(Change const& change) {
         AddressText address(change.address);
         auto const order = compare(last_, address.view());
-        if (order > 0) {
+        if (std::is_gt(order)) {
             fault(Fault::Kind::Irregular, "the line is not in its place");
-        } else if (order == 0) {
+        } else if (std::is_eq(order)) {
             fault(Fault::Kind::Irregular, "the line stands for the same address as the one before it");
         } else {
             lastText_ = std::move(address);

@@ -13,7 +13,6 @@
 namespace project::stores {
 
 using cmlink::ReentrantReadWriteLock;
-using metadata::MetadataManager;
 using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
 

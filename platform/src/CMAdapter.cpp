@@ -1,0 +1,7 @@
+#include "cmlink/CMAdapter.hpp"
+
+namespace cmlink {
+
+CMAdapter::~CMAdapter() = default;
+
+} // namespace cmlink
