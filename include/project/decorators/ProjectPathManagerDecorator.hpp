@@ -1,0 +1,20 @@
+#pragma once
+
+#include "project/core/ProjectPathManager.hpp"
+
+namespace project::management {
+
+/// A project path manager that gives the list of another one.
+class PROJECT_MANAGEMENT_EXPORT ProjectPathManagerDecorator : public ProjectPathManager {
+public:
+    /// @param inner borrowed; must outlive this object.
+    explicit ProjectPathManagerDecorator(ProjectPathManager& inner);
+    ~ProjectPathManagerDecorator() override;
+
+    FolderReferenceManager& getFolderReferenceManager() override;
+
+private:
+    ProjectPathManager& inner_;
+};
+
+} // namespace project::management
