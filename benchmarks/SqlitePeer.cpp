@@ -14,8 +14,8 @@ void require(bool condition, sqlite3* database) {
     }
 }
 
-void bind(sqlite3_stmt* statement, std::string const& text) {
-    sqlite3_bind_text(statement, 1, text.data(), static_cast<int>(text.size()), SQLITE_STATIC);
+void bind(sqlite3_stmt* statement, std::string const& text, int place = 1) {
+    sqlite3_bind_text(statement, place, text.data(), static_cast<int>(text.size()), SQLITE_STATIC);
 }
 
 } // namespace
@@ -25,22 +25,22 @@ SqlitePeer::SqlitePeer(std::filesystem::path const& file) {
     execute("PRAGMA journal_mode=WAL");
     execute("PRAGMA synchronous=FULL");
     execute("CREATE TABLE IF NOT EXISTS nodes(path TEXT PRIMARY KEY, type TEXT) WITHOUT ROWID");
-    require(sqlite3_prepare_v2(database_, "SELECT type FROM nodes WHERE path=?", -1, &select_, nullptr) ==
-                SQLITE_OK,
-            database_);
+    execute("CREATE TABLE IF NOT EXISTS labels(path TEXT, category TEXT, label TEXT,"
+            " PRIMARY KEY(path, category, label)) WITHOUT ROWID");
+    execute("CREATE INDEX IF NOT EXISTS byCategory ON labels(category)");
+    select_ = prepare("SELECT type FROM nodes WHERE path=?");
+    selectLabels_ = prepare("SELECT category, label FROM labels WHERE path=?");
 }
 
 SqlitePeer::~SqlitePeer() {
     sqlite3_finalize(select_);
+    sqlite3_finalize(selectLabels_);
     sqlite3_close(database_);
 }
 
 void SqlitePeer::insert(std::vector<std::string> const& paths) {
-    sqlite3_stmt* statement = nullptr;
     execute("BEGIN IMMEDIATE");
-    require(sqlite3_prepare_v2(database_, "INSERT OR REPLACE INTO nodes VALUES(?, 'Info')", -1, &statement,
-                               nullptr) == SQLITE_OK,
-            database_);
+    auto* const statement = prepare("INSERT OR REPLACE INTO nodes VALUES(?, 'Info')");
     for (auto const& path : paths) {
         bind(statement, path);
         require(sqlite3_step(statement) == SQLITE_DONE, database_);
@@ -57,11 +57,40 @@ bool SqlitePeer::contains(std::string const& path) {
     return found;
 }
 
+void SqlitePeer::putLabel(std::vector<std::string> const& paths, std::string const& category,
+                          std::string const& label) {
+    execute("BEGIN IMMEDIATE");
+    auto* const statement = prepare("INSERT OR REPLACE INTO labels VALUES(?, ?, ?)");
+    for (auto const& path : paths) {
+        bind(statement, path);
+        bind(statement, category, 2);
+        bind(statement, label, 3);
+        require(sqlite3_step(statement) == SQLITE_DONE, database_);
+        sqlite3_reset(statement);
+    }
+    sqlite3_finalize(statement);
+    execute("COMMIT");
+}
+
+std::size_t SqlitePeer::labelsOn(std::string const& path) {
+    bind(selectLabels_, path);
+    std::size_t count = 0;
+    while (sqlite3_step(selectLabels_) == SQLITE_ROW) {
+        ++count;
+    }
+    sqlite3_reset(selectLabels_);
+    return count;
+}
+
+void SqlitePeer::deleteCategory(std::string const& category) {
+    auto* const statement = prepare("DELETE FROM labels WHERE category=?");
+    bind(statement, category);
+    require(sqlite3_step(statement) == SQLITE_DONE, database_);
+    sqlite3_finalize(statement);
+}
+
 std::size_t SqlitePeer::list() {
-    sqlite3_stmt* statement = nullptr;
-    require(sqlite3_prepare_v2(database_, "SELECT path FROM nodes ORDER BY path", -1, &statement, nullptr) ==
-                SQLITE_OK,
-            database_);
+    auto* const statement = prepare("SELECT path FROM nodes ORDER BY path");
     std::vector<std::string> paths;
     while (sqlite3_step(statement) == SQLITE_ROW) {
         paths.emplace_back(reinterpret_cast<char const*>(sqlite3_column_text(statement, 0)));
@@ -72,6 +101,12 @@ std::size_t SqlitePeer::list() {
 
 void SqlitePeer::execute(char const* statement) {
     require(sqlite3_exec(database_, statement, nullptr, nullptr, nullptr) == SQLITE_OK, database_);
+}
+
+sqlite3_stmt* SqlitePeer::prepare(char const* statement) {
+    sqlite3_stmt* result = nullptr;
+    require(sqlite3_prepare_v2(database_, statement, -1, &result, nullptr) == SQLITE_OK, database_);
+    return result;
 }
 
 } // namespace project::benchmarks

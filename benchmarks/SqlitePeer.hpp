@@ -9,7 +9,8 @@ struct sqlite3_stmt;
 
 namespace project::benchmarks {
 
-/// One table of paths in an SQLite database set up as one that must not lose a commit: WAL, synchronous FULL.
+/// A table of paths and one of the labels on them in an SQLite database set up as one that must not lose a
+/// commit: WAL, synchronous FULL.
 class SqlitePeer {
 public:
     explicit SqlitePeer(std::filesystem::path const& file);
@@ -22,14 +23,26 @@ public:
 
     bool contains(std::string const& path);
 
+    /// Puts the label on all paths in one transaction.
+    void putLabel(std::vector<std::string> const& paths, std::string const& category,
+                  std::string const& label);
+
+    /// The labels on a path with their categories. @return how many there are.
+    std::size_t labelsOn(std::string const& path);
+
+    /// Takes all labels of a category off all paths.
+    void deleteCategory(std::string const& category);
+
     /// Reads all rows. @return how many there were.
     std::size_t list();
 
 private:
     void execute(char const* statement);
+    sqlite3_stmt* prepare(char const* statement);
 
     sqlite3* database_ = nullptr;
     sqlite3_stmt* select_ = nullptr;
+    sqlite3_stmt* selectLabels_ = nullptr;
 };
 
 } // namespace project::benchmarks

@@ -15,7 +15,7 @@ protected:
 
 TEST_F(StatusCommand, saysNothingWhenProjectAndDiskAgree) {
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
-    EXPECT_THAT(tool({"status", "--json"}), Prints("{\"new\": [],\n\"gone\": []}\n"));
+    EXPECT_THAT(tool({"status", "--json"}), Prints("{\"new\": [],\n\"gone\": [],\n\"problems\": []}\n"));
 }
 
 TEST_F(StatusCommand, saysSoOnATerminal) {
@@ -110,7 +110,8 @@ TEST_F(StatusCommand, givesJson) {
                                                    "\"gone\": [\n"
                                                    "{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
                                                    "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}\n"
-                                                   "]}\n"));
+                                                   "],\n"
+                                                   "\"problems\": []}\n"));
 }
 
 TEST_F(StatusCommand, goesOnWhereAFolderCannotBeRead) {

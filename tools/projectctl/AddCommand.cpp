@@ -1,11 +1,8 @@
 #include <algorithm>
-#include <iostream>
 #include <iterator>
 #include <string>
 #include <vector>
 
-#include "ArgumentPaths.hpp"
-#include "CommandLine.hpp"
 #include "Commands.hpp"
 #include "DiskFolder.hpp"
 #include "DiskWalk.hpp"
@@ -13,6 +10,7 @@
 #include "GitIgnore.hpp"
 #include "OpenProject.hpp"
 #include "Output.hpp"
+#include "PathArguments.hpp"
 #include "Progress.hpp"
 #include "ProjectFolder.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
@@ -26,28 +24,18 @@ class AddCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand("add", "Add files and folders to the project");
-        takeTexts(*app, "PATH", arguments_, "What to add; - for the lines of standard input");
+        given_.declare(*app, "What to add");
         app->add_flag("-r,--recursive", recursive_,
                       "Add what folders contain, at any depth: not what source control or a project's store "
                       "keeps, no sockets, pipes and devices; symbolic links are added and not entered");
         app->add_flag("--gitignore", gitignore_, "Of what folders contain, leave out what git ignores")
             ->needs("--recursive");
-        app->add_flag("-0,--null", null_, "Read paths from standard input too, with a zero byte behind each");
-        app->final_callback([this] {
-            if (arguments_.empty() && !null_) {
-                throw CLI::RequiredError("PATH");
-            }
-        });
         return app;
     }
 
     int run() override {
         auto project = OpenProject::ofWorkingFolder();
-        ArgumentPaths absolute(workingFolder());
-        std::vector<Path> paths;
-        for (auto const& argument : allArguments()) {
-            paths.push_back(absolute.absolute(argument));
-        }
+        auto paths = given_.read();
         add(project, paths);
         tellUnaddable();
         output().say(std::to_string(paths.size()) + " added to the project");
@@ -64,23 +52,6 @@ private:
                      std::make_move_iterator(contents.end()));
         progress.begin("Adding " + std::to_string(paths.size()) + " files and folders");
         project.files().add(paths);
-    }
-
-    std::vector<std::string> allArguments() const {
-        std::vector<std::string> result;
-        bool readsInput = null_;
-        for (auto const& argument : arguments_) {
-            if (argument == "-") {
-                readsInput = true;
-            } else {
-                result.push_back(argument);
-            }
-        }
-        std::cin.sync_with_stdio(false);
-        for (std::string line; readsInput && std::getline(std::cin, line, null_ ? '\0' : '\n');) {
-            result.push_back(line);
-        }
-        return result;
     }
 
     /// What the folders among the paths contain and the project does not have yet: what it has is not
@@ -129,10 +100,9 @@ private:
         }
     }
 
-    std::vector<std::string> arguments_;
+    PathArguments given_;
     bool recursive_ = false;
     bool gitignore_ = false;
-    bool null_ = false;
     std::vector<Path> unaddable_; ///< what was left out of the folders' contents
 };
 

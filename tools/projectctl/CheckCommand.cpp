@@ -7,7 +7,7 @@
 #include "OpenProject.hpp"
 #include "Output.hpp"
 #include "Progress.hpp"
-#include "TreeCheck.hpp"
+#include "checks/TreeCheck.hpp"
 
 namespace projectctl {
 
@@ -40,8 +40,9 @@ public:
             tell(file + line + ": " + fault.problem);
         }
         for (auto const& finding : TreeCheck(project.store(), project.files()).run()) {
-            faults += finding.isFault ? 1 : 0;
-            tell(file + (finding.isFault ? ": " : ": note: ") + finding.text);
+            bool const isFault = finding.weight == Finding::Weight::Fault;
+            faults += isFault ? 1 : 0;
+            tell(file + (isFault ? ": " : ": note: ") + finding.text);
         }
         output().say(faults == 0 ? "The project has no faults." : adviceFor(faultsOfText));
         return faults == 0 ? 0 : 1;

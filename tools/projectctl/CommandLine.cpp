@@ -53,20 +53,37 @@ std::string withoutMarks(std::string text) {
     return text;
 }
 
+/// The command that was called for, as far as it was named, and how it is called.
+struct Called {
+    CLI::App const* app;
+    std::string name;
+};
+
+Called calledOf(CLI::App const& tool) {
+    Called result{&tool, "projectctl"};
+    for (auto below = tool.get_subcommands(); !below.empty(); below = result.app->get_subcommands()) {
+        result.app = below.front();
+        result.name += ' ' + result.app->get_name();
+    }
+    return result;
+}
+
 /// What is told of a wrong use: the parser's text, and where to read on.
 int refuse(CLI::ParseError const& error, CLI::App const& tool) {
-    auto const called = tool.get_subcommands();
-    auto const help = called.empty() ? "projectctl" : "projectctl " + called.front()->get_name();
-    auto const unknown = called.empty() ? tool.remaining() : std::vector<std::string>();
+    auto const called = calledOf(tool);
+    auto const isGroup = !called.app->get_subcommands([](auto const*) { return true; }).empty();
+    auto const unknown = isGroup ? called.app->remaining() : std::vector<std::string>();
     auto const problem =
         unknown.empty() ? error.what() : "there is no command or option \"" + unknown.front() + '"';
-    printError(withoutMarks(problem) + " ('" + help + " --help' tells more)");
+    printError(withoutMarks(problem) + " ('" + called.name + " --help' tells more)");
     return 2;
 }
 
 int showHelp(CLI::App const& tool) {
-    auto const called = tool.get_subcommands();
-    output().text() += called.empty() ? tool.help() : called.front()->help("projectctl");
+    auto const called = calledOf(tool);
+    auto const end = called.name.rfind(' '); // of what stands before the command's own name
+    output().text() +=
+        called.app->help(end == std::string::npos ? std::string() : called.name.substr(0, end));
     output().flush();
     return 0;
 }

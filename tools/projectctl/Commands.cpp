@@ -4,8 +4,9 @@ namespace projectctl {
 
 std::vector<std::unique_ptr<Command>> makeCommands() {
     std::vector<std::unique_ptr<Command>> result;
-    for (auto* const make : {makeInitCommand, makeNameCommand, makeDescriptionCommand, makeAddCommand,
-                             makeListCommand, makeStatusCommand, makeCheckCommand, makeTidyCommand}) {
+    for (auto* const make :
+         {makeInitCommand, makeNameCommand, makeDescriptionCommand, makeAddCommand, makeListCommand,
+          makeStatusCommand, makeCategoryCommand, makeLabelCommand, makeCheckCommand, makeTidyCommand}) {
         result.push_back(make());
     }
     return result;

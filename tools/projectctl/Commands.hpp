@@ -13,6 +13,8 @@ std::unique_ptr<Command> makeDescriptionCommand();
 std::unique_ptr<Command> makeAddCommand();
 std::unique_ptr<Command> makeListCommand();
 std::unique_ptr<Command> makeStatusCommand();
+std::unique_ptr<Command> makeCategoryCommand();
+std::unique_ptr<Command> makeLabelCommand();
 std::unique_ptr<Command> makeCheckCommand();
 std::unique_ptr<Command> makeTidyCommand();
 

@@ -54,8 +54,12 @@ void FileList::visit(Path const& path, Visitor const& visitor) const {
         visitBelow(address, std::move(here), {}, 0, visitor);
         return;
     }
+    auto const node = project_.store().getNode(address);
+    if (!node) {
+        return; // it is not in the project
+    }
     auto const relative = project::metadata::getRelativePath(project_.root(), path);
-    visitor(relative, 0, here.kind);
+    visitor({relative, 0, here.kind, *node});
     visitBelow(address, std::move(here), relative + u'/', 1, visitor);
 }
 
@@ -77,12 +81,12 @@ void FileList::visitBelow(MetadataPath start, Level level, std::u16string path, 
         }
         path += file.element.getLocation();
         if (!file.hasChildren) {
-            visitor(path, depth + open.size() - 1, Kind::File);
+            visitor({path, depth + open.size() - 1, Kind::File, *file.node});
             continue;
         }
         auto address = folder.address.child(file.element);
         auto content = this->level(address);
-        visitor(path, depth + open.size() - 1, content.kind);
+        visitor({path, depth + open.size() - 1, content.kind, *file.node});
         path += u'/';
         open.push_back({std::move(address), std::move(content.files), 0, path.size()});
     }

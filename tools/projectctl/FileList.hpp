@@ -30,9 +30,15 @@ public:
     /// what lies below that.
     Level level(project::metadata::MetadataPath const& address) const;
 
-    /// Called with the path relative to the root, with how many folders lie between it and where the walk
-    /// began, and with its kind.
-    using Visitor = std::function<void(std::u16string const& path, std::size_t depth, Kind kind)>;
+    /// A file or folder of the project.
+    struct File {
+        std::u16string const& path; ///< relative to the root
+        std::size_t depth;          ///< how many folders lie between it and where the walk began
+        Kind kind;
+        project::metadata::MetadataNode const& node; ///< what stands on it
+    };
+
+    using Visitor = std::function<void(File const& file)>;
 
     /// Visits everything in the project below a path, a folder before its contents, in the order of their
     /// names; the path itself too, unless it is the root.

@@ -5,6 +5,7 @@
 #include "CommandLine.hpp"
 #include "Commands.hpp"
 #include "FileList.hpp"
+#include "JsonRows.hpp"
 #include "NameForms.hpp"
 #include "Output.hpp"
 #include "ProjectFolder.hpp"
@@ -60,51 +61,40 @@ private:
     }
 
     static void writePaths(FileList const& list, Path const& from, char end) {
-        list.visit(from, [end](std::u16string const& path, std::size_t, Kind) {
-            appendBytes(output().text(), path);
+        list.visit(from, [end](FileList::File const& file) {
+            appendBytes(output().text(), file.path);
             output().text() += end;
             output().settle();
         });
     }
 
-    static void appendShown(std::u16string_view name) {
-        if (output().isTerminal()) {
-            std::string bytes;
-            appendBytes(bytes, name);
-            appendQuoted(output().text(), bytes);
-        } else {
-            appendBytes(output().text(), name);
-        }
-    }
-
     static void writeQuoted(FileList const& list, Path const& from) {
-        list.visit(from, [](std::u16string const& path, std::size_t, Kind) {
-            appendShown(path);
+        list.visit(from, [](FileList::File const& file) {
+            output().name(file.path);
             output().text() += '\n';
             output().settle();
         });
     }
 
     static void writeTree(FileList const& list, Path const& from) {
-        list.visit(from, [](std::u16string const& path, std::size_t depth, Kind kind) {
-            auto const name = depth == 0 ? std::u16string_view(path)
-                                         : std::u16string_view(path).substr(path.rfind(u'/') + 1);
-            output().text().append(2 * depth, ' ');
-            appendShown(name);
-            output().text() += kind == Kind::Folder ? "/\n" : "\n";
+        list.visit(from, [](FileList::File const& file) {
+            std::u16string_view name = file.path;
+            name.remove_prefix(file.depth == 0 ? 0 : name.rfind(u'/') + 1);
+            output().text().append(2 * file.depth, ' ');
+            output().name(name);
+            output().text() += file.kind == Kind::Folder ? "/\n" : "\n";
             output().settle();
         });
     }
 
     static void writeJson(FileList const& list, Path const& from) {
-        char const* separator = "[\n";
-        list.visit(from, [&separator](std::u16string const& path, std::size_t, Kind kind) {
-            output().text() += separator;
-            appendJsonEntry(output().text(), path, kind);
-            output().settle();
-            separator = ",\n";
+        JsonRows rows;
+        list.visit(from, [&rows](FileList::File const& file) {
+            rows.begin();
+            rows.addFile(file.path, file.kind);
         });
-        output().text() += *separator == '[' ? "[]\n" : "\n]\n";
+        rows.finish();
+        output().text() += '\n';
     }
 
     std::optional<std::string> path_;

@@ -138,6 +138,10 @@ void appendBytes(std::string& out, std::u16string_view name) {
     out += onDisk.get() != nullptr ? std::string(onDisk.get()) : fl::i18n::toUtf8(name);
 }
 
+std::u16string textOf(std::string const& argument) {
+    return fl::filesystem::fromSystem(argument).native();
+}
+
 void appendQuoted(std::string& out, std::string_view bytes) {
     if (!needsQuotes(bytes)) {
         out += bytes;
@@ -177,10 +181,8 @@ void appendJsonString(std::string& out, std::u16string_view text) {
     out += '"';
 }
 
-void appendJsonEntry(std::string& out, std::u16string_view path, Kind kind) {
-    out += "{\"path\": ";
-    appendJsonString(out, path);
-    out += kind == Kind::Folder ? ", \"kind\": \"folder\"}" : ", \"kind\": \"file\"}";
+std::string inQuotes(std::u16string const& text) {
+    return '"' + fl::i18n::toUtf8(text) + '"';
 }
 
 std::string withoutControls(std::string_view text, bool lineBreaks) {

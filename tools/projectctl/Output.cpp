@@ -20,6 +20,16 @@ constexpr std::size_t pieceSize = std::size_t(256) * 1024;
 Output::Output(int descriptor) : descriptor_(descriptor), isTerminal_(isatty(descriptor) == 1) {
 }
 
+void Output::name(std::u16string_view name) {
+    if (isTerminal_) {
+        std::string bytes;
+        appendBytes(bytes, name);
+        appendQuoted(text_, bytes);
+    } else {
+        appendBytes(text_, name);
+    }
+}
+
 void Output::settle() {
     if (text_.size() >= pieceSize) {
         flush();

@@ -22,6 +22,10 @@ public:
     /// What is still held; append to it, then call settle.
     std::string& text() noexcept { return text_; }
 
+    /// Appends a name or path: its bytes in a pipe, and on a terminal with what could be taken for another
+    /// name quoted.
+    void name(std::u16string_view name);
+
     /// Writes when enough has come together to be worth a system call.
     void settle();
 

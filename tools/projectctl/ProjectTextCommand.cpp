@@ -32,7 +32,7 @@ public:
     int run() override {
         auto project = OpenProject::ofWorkingFolder();
         if (text_) {
-            (project.manager().*set_)(fl::filesystem::fromSystem(*text_).native());
+            (project.manager().*set_)(textOf(*text_));
         } else {
             show((project.manager().*get_)());
         }

@@ -22,6 +22,8 @@ inline constexpr std::u16string_view projectPath = u"ProjectPath";
 inline constexpr std::u16string_view references = u"References";
 
 inline std::u16string const fileKey = u"File";
+inline std::u16string const nameKey = u"Name";
+inline std::u16string const singleValuedKey = u"SingleValued";
 inline std::u16string const uuidKey = u"UUID";
 inline std::u16string const readOnlyKey = u"ReadOnly";
 inline std::u16string const typeKey = u"Type";

@@ -4,11 +4,13 @@
 
 #include "Commands.hpp"
 #include "GitIgnore.hpp"
+#include "JsonRows.hpp"
 #include "NameForms.hpp"
 #include "OpenProject.hpp"
 #include "Output.hpp"
 #include "Progress.hpp"
 #include "StatusScan.hpp"
+#include "checks/Problems.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
@@ -20,8 +22,10 @@ class StatusCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
-            "status", "Tell what is new on disk and not in the project, and what is in the project and gone");
-        app->add_flag("--json", json_, "As a JSON object with the arrays \"new\" and \"gone\"");
+            "status",
+            "Tell what is new on disk and not in the project, what is in the project and gone, and what "
+            "in the project refers to something that is gone");
+        app->add_flag("--json", json_, "As a JSON object with the arrays \"new\", \"gone\" and \"problems\"");
         app->add_flag("--gitignore", gitignore_, "Leave out what git ignores");
         return app;
     }
@@ -34,20 +38,27 @@ public:
         for (auto const& line : scan.unreadable()) {
             printError("warning: " + line);
         }
-        auto const added = gitignore_ ? withoutIgnored(scan.added()) : scan.added();
-        json_ ? writeJson(added, scan.gone()) : writeLines(added, scan.gone());
+        Differences const found{gitignore_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
+                                findProblems(project)};
+        json_ ? writeJson(found) : writeLines(found);
         return 0;
     }
 
 private:
+    using Files = std::vector<StatusScan::File>;
+
+    struct Differences {
+        Files added;
+        Files gone;
+        Findings problems;
+    };
+
     static StatusScan compare(OpenProject& project) {
         Progress progress("Comparing the project with the disk");
         StatusScan scan(project);
         scan.run(progress);
         return scan;
     }
-
-    using Files = std::vector<StatusScan::File>;
 
     Files withoutIgnored(Files const& files) const {
         std::vector<Path> paths;
@@ -64,10 +75,14 @@ private:
         return result;
     }
 
-    void writeLines(Files const& added, Files const& gone) const {
-        writeLines("new  ", added, true);
-        writeLines("gone ", gone, false);
-        if (added.empty() && gone.empty()) {
+    void writeLines(Differences const& found) const {
+        writeLines("new  ", found.added, true);
+        writeLines("gone ", found.gone, false);
+        for (auto const& problem : found.problems) {
+            bool const isFault = problem.weight == Finding::Weight::Fault;
+            output().text() += (isFault ? "bad  " : "note ") + withoutControls(problem.text, false) + '\n';
+        }
+        if (found.added.empty() && found.gone.empty() && found.problems.empty()) {
             output().say("The project and the disk hold the same files.");
         }
     }
@@ -75,37 +90,38 @@ private:
     /// @param standsForContents whether a folder is shown alone instead of what is in it.
     void writeLines(char const* word, Files const& files, bool standsForContents) const {
         for (auto const& file : files) {
-            std::string path;
-            appendBytes(path, project::metadata::getRelativePath(root_, file.path));
-            path += standsForContents && file.kind == Kind::Folder ? "/" : "";
+            std::u16string path = project::metadata::getRelativePath(root_, file.path);
+            path += standsForContents && file.kind == Kind::Folder ? u"/" : u"";
             output().text() += word;
-            if (output().isTerminal()) {
-                appendQuoted(output().text(), path);
-            } else {
-                output().text() += path;
-            }
+            output().name(path);
             output().text() += '\n';
             output().settle();
         }
     }
 
-    void writeJson(Files const& added, Files const& gone) const {
+    void writeJson(Differences const& found) const {
         output().text() += "{\"new\": ";
-        writeJson(added);
+        writeJson(found.added);
         output().text() += ",\n\"gone\": ";
-        writeJson(gone);
+        writeJson(found.gone);
+        output().text() += ",\n\"problems\": ";
+        JsonRows rows;
+        for (auto const& problem : found.problems) {
+            rows.begin();
+            rows.addFlag("fault", problem.weight == Finding::Weight::Fault);
+            rows.addText("text", textOf(problem.text));
+        }
+        rows.finish();
         output().text() += "}\n";
     }
 
     void writeJson(Files const& files) const {
-        char const* separator = "[\n";
+        JsonRows rows;
         for (auto const& file : files) {
-            output().text() += separator;
-            appendJsonEntry(output().text(), project::metadata::getRelativePath(root_, file.path), file.kind);
-            output().settle();
-            separator = ",\n";
+            rows.begin();
+            rows.addFile(project::metadata::getRelativePath(root_, file.path), file.kind);
         }
-        output().text() += files.empty() ? "[]" : "\n]";
+        rows.finish();
     }
 
     Path root_;

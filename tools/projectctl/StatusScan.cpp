@@ -82,8 +82,8 @@ void StatusScan::takeAdded(Path const& folder, DiskEntry const& entry) {
 }
 
 void StatusScan::takeGone(Path const& path) {
-    list_.visit(path, [this](std::u16string const& relative, std::size_t, Kind kind) {
-        gone_.push_back({root_ / Path(relative), kind});
+    list_.visit(path, [this](FileList::File const& file) {
+        gone_.push_back({root_ / Path(file.path), file.kind});
     });
 }
 

@@ -1,12 +1,12 @@
-#include "TreeCheck.hpp"
+#include "checks/TreeCheck.hpp"
 
 #include <algorithm>
 #include <string_view>
 #include <utility>
 
+#include "NameForms.hpp"
 #include "Schema.hpp"
 #include "fl/filesystem/SystemName.hpp"
-#include "fl/i18n/Utf8.hpp"
 #include "project/core/ProjectManagerBase.hpp"
 
 namespace projectctl {
@@ -18,16 +18,12 @@ using project::metadata::PathElement;
 
 namespace {
 
-std::string quoted(std::u16string const& text) {
-    return '"' + fl::i18n::toUtf8(text) + '"';
-}
-
 /// The address step by step, for what has no better name.
 std::string described(MetadataPath const& address) {
     std::string result;
     for (auto const& element : address.getPath()) {
-        result += (result.empty() ? "(" : ", (") + quoted(element.getType()) + ", " +
-                  quoted(element.getLocation()) + ')';
+        result += (result.empty() ? "(" : ", (") + inQuotes(element.getType()) + ", " +
+                  inQuotes(element.getLocation()) + ')';
     }
     return result;
 }
@@ -52,21 +48,13 @@ bool isOneOf(std::u16string const& text, std::initializer_list<std::u16string_vi
     return std::ranges::find(known, std::u16string_view(text)) != known.end();
 }
 
-MetadataPath categoryAddress(std::u16string const& uuid) {
-    return MetadataPath::root()
-        .child(PathElement(std::u16string(schema::categories), std::u16string(schema::root)))
-        .child(PathElement(std::u16string(schema::category), uuid));
-}
-
 } // namespace
 
 TreeCheck::TreeCheck(project::metadata::MetadataManager& store, project::management::FileManager& files)
-    : store_(store), files_(files) {
+    : store_(store), files_(files), guard_(store.acquireReadLock()), labels_(store) {
 }
 
-std::vector<TreeCheck::Finding> TreeCheck::run() {
-    auto const guard = store_.acquireReadLock();
-    findings_.clear();
+Findings TreeCheck::run() {
     for (auto const& head : store_.getChildNodes(MetadataPath::root())) {
         checkHead(head);
     }
@@ -111,7 +99,7 @@ void TreeCheck::checkFiles(Address const& scope) {
 
 void TreeCheck::checkFile(Address const& file) {
     if (!isPossibleName(file.leaf().getLocation())) {
-        fault("no file can have the name " + quoted(file.leaf().getLocation()) + ", at " + described(file));
+        fault("no file can have the name " + inQuotes(file.leaf().getLocation()) + ", at " + described(file));
     }
     auto const node = store_.getNode(file);
     if (!node) {
@@ -119,36 +107,11 @@ void TreeCheck::checkFile(Address const& file) {
     }
     auto const above = file.parent();
     if (above.depth() > 1 && !store_.hasNode(above)) {
-        fault("the file " + quoted(pathOf(file)) +
+        fault("the file " + inQuotes(pathOf(file)) +
               " is listed and its folder is not, so that no list of the project shows it");
     }
     if (file[0].getLocation() == schema::root) {
-        checkLabelsOn(file, *node);
-    }
-}
-
-void TreeCheck::checkLabelsOn(Address const& file, Node const& node) {
-    for (auto const& category : node.getChildren()) {
-        if (category->getType() != schema::category || category->get(schema::uuidKey).empty()) {
-            continue; // passed over by every reader
-        }
-        for (auto const& label : category->getChildren()) {
-            if (label->getType() == schema::label && !label->get(schema::uuidKey).empty()) {
-                checkLabelOn(file, *category, label->get(schema::uuidKey));
-            }
-        }
-    }
-}
-
-void TreeCheck::checkLabelOn(Address const& file, Node const& category, std::u16string const& labelUuid) {
-    auto const& uuid = category.get(schema::uuidKey);
-    auto const address = categoryAddress(uuid);
-    if (!store_.hasNode(address)) {
-        fault("the file " + quoted(pathOf(file)) + " bears a label of the category " + quoted(uuid) +
-              ", which does not exist");
-    } else if (!store_.pathExists(address.child(PathElement(std::u16string(schema::label), labelUuid)))) {
-        fault("the file " + quoted(pathOf(file)) + " bears the label " + quoted(labelUuid) +
-              ", which does not exist");
+        labels_.check(pathOf(file), *node, findings_);
     }
 }
 
@@ -166,8 +129,8 @@ void TreeCheck::checkLabels(Address const& category) {
         }
         auto const state = store_.getNode(label)->get(schema::readOnlyKey);
         if (!isOneOf(state, {u"", u"READ_ONLY", u"WRITABLE", u"INHERITED"})) {
-            fault("the label " + quoted(label.leaf().getLocation()) + " has the unknown read-only state " +
-                  quoted(state));
+            fault("the label " + inQuotes(label.leaf().getLocation()) + " has the unknown read-only state " +
+                  inQuotes(state));
         }
     }
 }
@@ -178,14 +141,14 @@ void TreeCheck::checkEntryPoints(Address const& head) {
             continue;
         }
         auto const node = store_.getNode(entryPoint);
-        auto const uuid = quoted(entryPoint.leaf().getLocation());
+        auto const uuid = inQuotes(entryPoint.leaf().getLocation());
         auto const& type = node->get(schema::typeKey);
         if (!isOneOf(type, {u"Basic", u"Startup", u"StartUp", u"Shutdown", u"Batch_Job", u"Batch Job"})) {
-            fault("the entry point " + uuid + " has the unknown type " + quoted(type));
+            fault("the entry point " + uuid + " has the unknown type " + inQuotes(type));
         }
         auto const& file = node->get(schema::fileKey);
         if (!files_.isFileInProject(files_.getProjectRoot() / Path(file))) {
-            note("the entry point " + uuid + " is not shown, because its file " + quoted(file) +
+            note("the entry point " + uuid + " is not shown, because its file " + inQuotes(file) +
                  " is not in the project");
         }
     }
@@ -204,8 +167,8 @@ void TreeCheck::checkReferences(Address const& head) {
         }
         auto const type = store_.getNode(reference)->get(schema::typeKey);
         if (!isOneOf(type, {u"Relative", u"Absolute"})) {
-            note("the reference " + quoted(reference.leaf().getLocation()) +
-                 " is not shown, because its type " + quoted(type) + " is unknown");
+            note("the reference " + inQuotes(reference.leaf().getLocation()) +
+                 " is not shown, because its type " + inQuotes(type) + " is unknown");
         }
     }
 }
@@ -214,16 +177,17 @@ bool TreeCheck::requireNode(Address const& address, std::string const& what) {
     if (store_.hasNode(address)) {
         return true;
     }
-    fault(what + ' ' + quoted(address.leaf().getLocation()) + " has an address and nothing is stored there");
+    fault(what + ' ' + inQuotes(address.leaf().getLocation()) +
+          " has an address and nothing is stored there");
     return false;
 }
 
 void TreeCheck::fault(std::string text) {
-    findings_.push_back({true, std::move(text)});
+    findings_.push_back(Finding::fault(std::move(text)));
 }
 
 void TreeCheck::note(std::string text) {
-    findings_.push_back({false, std::move(text)});
+    findings_.push_back(Finding::note(std::move(text)));
 }
 
 } // namespace projectctl

@@ -1,9 +1,9 @@
 #pragma once
 
-#include <cstddef>
 #include <string>
-#include <vector>
 
+#include "checks/Finding.hpp"
+#include "checks/LabelCheck.hpp"
 #include "project/core/FileManager.hpp"
 #include "project/metadata/MetadataManager.hpp"
 
@@ -14,25 +14,18 @@ namespace projectctl {
 /// It reads the store and not the managers' lists, since those end at the first fault.
 class TreeCheck {
 public:
-    struct Finding {
-        bool isFault; ///< else it is only worth knowing
-        std::string text;
-    };
-
+    /// Takes the store's read guard and keeps it, so that all of it is one state of the project.
     TreeCheck(project::metadata::MetadataManager& store, project::management::FileManager& files);
 
-    /// All that is found, under one read guard.
-    std::vector<Finding> run();
+    /// All that is found. To be called once.
+    Findings run();
 
 private:
     using Address = project::metadata::MetadataPath;
-    using Node = project::metadata::MetadataNode;
 
     void checkHead(Address const& head);
     void checkFiles(Address const& scope);
     void checkFile(Address const& file);
-    void checkLabelsOn(Address const& file, Node const& node);
-    void checkLabelOn(Address const& file, Node const& category, std::u16string const& labelUuid);
     void checkCategories(Address const& head);
     void checkLabels(Address const& category);
     void checkEntryPoints(Address const& head);
@@ -44,7 +37,9 @@ private:
 
     project::metadata::MetadataManager& store_;
     project::management::FileManager& files_;
-    std::vector<Finding> findings_;
+    cmlink::ReentrantReadWriteLock::LockGuard guard_;
+    LabelCheck labels_;
+    Findings findings_;
 };
 
 } // namespace projectctl

@@ -1,0 +1,179 @@
+#include <benchmark/benchmark.h>
+
+#include "GeneratedTree.hpp"
+#include "Ratios.hpp"
+#include "SqlitePeer.hpp"
+#include "project/core/FileManager.hpp"
+#include "project/core/LabelManager.hpp"
+#include "project/files/FileLabel.hpp"
+
+// Labels on 10,000 files of a project of 100,000: putting one on all of them in one step, asking one file for
+// its labels, and deleting the category.
+
+namespace project::benchmarks {
+namespace {
+
+using management::CategoryDefinition;
+using management::Label;
+using management::LabelDefinition;
+using management::ProjectManager;
+
+constexpr std::size_t labelled = 10'000;
+constexpr std::size_t stride = 7919; // a prime, so that questions jump over the labelled files
+
+std::vector<fl::filesystem::Path> labelledFiles(GeneratedTree const& tree) {
+    std::vector<fl::filesystem::Path> result;
+    auto const step = tree.files().size() / labelled;
+    for (std::size_t index = 0; result.size() < labelled; index += step) {
+        result.push_back(tree.files()[index]);
+    }
+    return result;
+}
+
+std::vector<std::string> labelledRows(GeneratedTree const& tree) {
+    std::vector<std::string> result;
+    for (auto const& file : labelledFiles(tree)) {
+        result.push_back(fl::filesystem::toSystem(file).lexically_relative(tree.onDisk()).string());
+    }
+    return result;
+}
+
+Label makeLabel(ProjectManager& project) {
+    Label const label(CategoryDefinition(u"Status"), LabelDefinition(u"Done"));
+    project.getLabelManager().createCategory(label.getCategory());
+    project.getLabelManager().createLabel(label.getCategory(), label.getLabelIdentifier());
+    return label;
+}
+
+/// A project on the tree that has been read already, and no categories.
+std::unique_ptr<ProjectManager> openRead(GeneratedTree const& tree) {
+    tree.fillProject();
+    auto project = tree.openProject();
+    for (auto const& category : project->getLabelManager().getAllCategories()) {
+        project->getLabelManager().deleteCategory(category);
+    }
+    benchmark::DoNotOptimize(project->getFileManager().getProjectFiles().size());
+    return project;
+}
+
+void putInProject(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    auto const project = openRead(tree);
+    auto const files = labelledFiles(tree);
+    for (auto _ : state) {
+        state.PauseTiming();
+        auto const label = makeLabel(*project);
+        state.ResumeTiming();
+        project->getFileManager().addLabels(files, {label});
+        state.PauseTiming();
+        project->getLabelManager().deleteCategory(label.getCategory());
+        state.ResumeTiming();
+    }
+}
+
+void deleteInProject(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    auto const project = openRead(tree);
+    auto const files = labelledFiles(tree);
+    for (auto _ : state) {
+        state.PauseTiming();
+        auto const label = makeLabel(*project);
+        project->getFileManager().addLabels(files, {label});
+        state.ResumeTiming();
+        project->getLabelManager().deleteCategory(label.getCategory());
+    }
+}
+
+void askProject(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    auto const project = openRead(tree);
+    auto const files = labelledFiles(tree);
+    auto const label = makeLabel(*project);
+    project->getFileManager().addLabels(files, {label});
+    std::size_t next = 0;
+    for (auto _ : state) {
+        if (project->getFileManager().getLabels(files[next]).size() != 1) {
+            state.SkipWithError("the label has gone");
+        }
+        next = (next + stride) % files.size();
+    }
+    project->getLabelManager().deleteCategory(label.getCategory());
+}
+
+/// A fresh database beside the tree, gone with the object.
+class Peer {
+public:
+    Peer() : file_(GeneratedTree::large().onDisk() / ".labels.db"), peer_(file_) {}
+
+    ~Peer() {
+        for (auto const* suffix : {"", "-wal", "-shm"}) {
+            std::filesystem::remove(file_.string() + suffix);
+        }
+    }
+
+    Peer(Peer const&) = delete;
+    Peer& operator=(Peer const&) = delete;
+
+    SqlitePeer* operator->() { return &peer_; }
+
+private:
+    std::filesystem::path file_;
+    SqlitePeer peer_;
+};
+
+void putInSqlite(benchmark::State& state) {
+    auto const rows = labelledRows(GeneratedTree::large());
+    Peer peer;
+    for (auto _ : state) {
+        peer->putLabel(rows, "Status", "Done");
+        state.PauseTiming();
+        peer->deleteCategory("Status");
+        state.ResumeTiming();
+    }
+}
+
+void deleteInSqlite(benchmark::State& state) {
+    auto const rows = labelledRows(GeneratedTree::large());
+    Peer peer;
+    for (auto _ : state) {
+        state.PauseTiming();
+        peer->putLabel(rows, "Status", "Done");
+        state.ResumeTiming();
+        peer->deleteCategory("Status");
+    }
+}
+
+void askSqlite(benchmark::State& state) {
+    auto const rows = labelledRows(GeneratedTree::large());
+    Peer peer;
+    peer->putLabel(rows, "Status", "Done");
+    std::size_t next = 0;
+    for (auto _ : state) {
+        if (peer->labelsOn(rows[next]) != 1) {
+            state.SkipWithError("the label has gone");
+        }
+        next = (next + stride) % rows.size();
+    }
+}
+
+[[maybe_unused]] bool const registered = [] {
+    auto const repeat = [](benchmark::internal::Benchmark* made) {
+        made->Iterations(1)->Repetitions(5)->UseRealTime()->Unit(benchmark::kMillisecond);
+    };
+    repeat(benchmark::RegisterBenchmark("labels/put-on-10000/project", putInProject));
+    repeat(benchmark::RegisterBenchmark("labels/put-on-10000/sqlite", putInSqlite));
+    repeat(benchmark::RegisterBenchmark("labels/delete-category/project", deleteInProject));
+    repeat(benchmark::RegisterBenchmark("labels/delete-category/sqlite", deleteInSqlite));
+    benchmark::RegisterBenchmark("labels/of-one-file/project", askProject)->UseRealTime();
+    benchmark::RegisterBenchmark("labels/of-one-file/sqlite", askSqlite)->UseRealTime();
+    Ratios::compare("one label put on 10,000 of 100,000 files to one SQLite transaction of 10,000 rows",
+                    "labels/put-on-10000/project", {"labels/put-on-10000/sqlite"});
+    Ratios::compare("a category deleted that stands on 10,000 of 100,000 files to one indexed DELETE",
+                    "labels/delete-category/project", {"labels/delete-category/sqlite"});
+    Ratios::compare("getLabels of one file to one SELECT by key", "labels/of-one-file/project",
+                    {"labels/of-one-file/sqlite"});
+    return true;
+}();
+
+} // namespace
+} // namespace project::benchmarks

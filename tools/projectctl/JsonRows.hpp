@@ -1,0 +1,31 @@
+#pragma once
+
+#include <string_view>
+
+#include "Kind.hpp"
+
+namespace projectctl {
+
+/// A JSON array of flat objects on standard output, one a line.
+///
+/// The order of use: for each object begin, then its members; finish at the end.
+class JsonRows {
+public:
+    void begin();
+    void addText(std::string_view key, std::u16string_view text);
+    void addFlag(std::string_view key, bool value);
+
+    /// The members "path" and "kind" of a file.
+    void addFile(std::u16string_view path, Kind kind);
+
+    /// Ends the array; without a line feed.
+    void finish();
+
+private:
+    void addKey(std::string_view key);
+
+    bool isEmpty_ = true;       ///< no object has begun
+    bool isFirstMember_ = true; ///< of the object
+};
+
+} // namespace projectctl

@@ -1,0 +1,30 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include <CLI/CLI.hpp>
+
+#include "fl/filesystem/Path.hpp"
+
+namespace projectctl {
+
+using fl::filesystem::Path;
+
+/// The files and folders that a command is called for: arguments, and what standard input names.
+class PathArguments {
+public:
+    /// Declares the arguments, at least one, and the option -0.
+    /// @param description what is done with the paths.
+    void declare(CLI::App& app, std::string const& description);
+
+    /// The paths, absolute, in the order in which they were given. Reads standard input if that is asked for.
+    /// @throws Failure for an empty path.
+    std::vector<Path> read() const;
+
+private:
+    std::vector<std::string> arguments_;
+    bool null_ = false;
+};
+
+} // namespace projectctl

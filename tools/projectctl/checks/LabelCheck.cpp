@@ -1,0 +1,87 @@
+#include "checks/LabelCheck.hpp"
+
+#include <cstddef>
+
+#include "NameForms.hpp"
+#include "Schema.hpp"
+
+namespace projectctl {
+
+using project::metadata::MetadataPath;
+using project::metadata::PathElement;
+
+LabelCheck::LabelCheck(project::metadata::MetadataManager& store) {
+    auto const head = MetadataPath::root().child(
+        PathElement(std::u16string(schema::categories), std::u16string(schema::root)));
+    for (auto const& address : store.getChildNodes(head)) {
+        auto const node = store.getNode(address);
+        if (!node || address.leaf().getType() != schema::category) {
+            continue;
+        }
+        auto& category = categories_[address.leaf().getLocation()];
+        category.name = node->get(schema::nameKey);
+        category.isSingleValued = node->get(schema::singleValuedKey) == u"1";
+        for (auto const& below : store.getChildNodes(address)) {
+            auto const label = store.getNode(below);
+            if (below.leaf().getType() == schema::label && label) {
+                category.labels.emplace(below.leaf().getLocation(), label->get(schema::nameKey));
+            }
+        }
+    }
+}
+
+void LabelCheck::check(std::u16string const& path, Node const& node, Findings& findings) const {
+    if (node.getChildren().empty()) {
+        return;
+    }
+    auto const file = "the file " + inQuotes(path);
+    for (auto const& [category, labels] : labelsOn(node)) {
+        checkCategory(file, category, labels, findings);
+    }
+}
+
+std::map<std::u16string, LabelCheck::Counts> LabelCheck::labelsOn(Node const& node) {
+    std::map<std::u16string, Counts> result;
+    for (auto const& category : node.getChildren()) {
+        auto const uuid = category->get(schema::uuidKey);
+        if (category->getType() != schema::category || uuid.empty()) {
+            continue; // every reader passes over it
+        }
+        for (auto const& label : category->getChildren()) {
+            if (label->getType() == schema::label && !label->get(schema::uuidKey).empty()) {
+                ++result[uuid][label->get(schema::uuidKey)];
+            }
+        }
+    }
+    return result;
+}
+
+void LabelCheck::checkCategory(std::string const& file, std::u16string const& uuid, Counts const& labels,
+                               Findings& findings) const {
+    auto const category = categories_.find(uuid);
+    if (category == categories_.end()) {
+        findings.push_back(Finding::fault(file + " bears a label of the category " + inQuotes(uuid) +
+                                          ", which does not exist"));
+        return;
+    }
+    auto const name = inQuotes(category->second.name);
+    std::size_t total = 0;
+    for (auto const& [label, count] : labels) {
+        auto const known = category->second.labels.find(label);
+        total += count;
+        if (known == category->second.labels.end()) {
+            findings.push_back(Finding::fault(file + " bears the label " + inQuotes(label) +
+                                              " of the category " + name + ", which does not exist"));
+        } else if (count > 1 && !category->second.isSingleValued) {
+            findings.push_back(Finding::note(file + " bears the label " + inQuotes(known->second) +
+                                             " of the category " + name + ' ' + std::to_string(count) +
+                                             " times"));
+        }
+    }
+    if (category->second.isSingleValued && total > 1) {
+        findings.push_back(Finding::fault(file + " bears " + std::to_string(total) +
+                                          " labels of the category " + name + ", which allows one"));
+    }
+}
+
+} // namespace projectctl

@@ -1,0 +1,12 @@
+#pragma once
+
+#include "OpenProject.hpp"
+#include "checks/Finding.hpp"
+
+namespace projectctl {
+
+/// What the definition of a project says and nobody can follow, because what it refers to is gone or what it
+/// says twice is allowed once. Looks at what the project lists, not at the whole store.
+Findings findProblems(OpenProject& project);
+
+} // namespace projectctl

@@ -1,0 +1,82 @@
+#include "labels/LabelNames.hpp"
+
+#include <vector>
+
+#include "Choice.hpp"
+#include "Failure.hpp"
+#include "NameForms.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/ProjectException.hpp"
+
+namespace projectctl {
+
+using project::management::CategoryDefinition;
+using project::management::CategoryIdentifier;
+using project::management::Label;
+using project::management::LabelDefinition;
+using project::management::LabelIdentifier;
+using ZEPHRA::project::management::CategoryDoesNotExist;
+
+namespace {
+
+template <typename Thing>
+std::vector<Named> namesOf(std::vector<Thing> const& things) {
+    std::vector<Named> result;
+    result.reserve(things.size());
+    for (auto const& thing : things) {
+        result.push_back({thing.getName(), thing.getUUID()});
+    }
+    return result;
+}
+
+} // namespace
+
+CategoryIdentifier LabelNames::category(std::string const& name) {
+    auto const wanted = textOf(name);
+    if (auto const found = find(wanted)) {
+        return *found;
+    }
+    if (isUUID(wanted)) {
+        return labels_.getCategoryByUUID(wanted);
+    }
+    project::exception::raise(CategoryDoesNotExist(wanted));
+}
+
+Label LabelNames::label(std::string const& category, std::string const& name) {
+    auto const found = this->category(category);
+    auto const wanted = textOf(name);
+    if (auto const label = find(found, wanted)) {
+        return {found, *label};
+    }
+    if (isUUID(wanted)) {
+        return {found, labels_.getLabelByUUID(found, wanted)};
+    }
+    throw Failure("the category " + inQuotes(found.getName()) + " has no label " + inQuotes(wanted) +
+                  ". 'projectctl label list' shows those that it has");
+}
+
+Label LabelNames::labelOrWhatIsLeft(std::string const& category, std::string const& name) {
+    auto const categoryUUID = textOf(category);
+    auto const labelUUID = textOf(name);
+    auto const known = find(categoryUUID);
+    bool const isKnown = known && find(*known, labelUUID);
+    if (isKnown || !isUUID(labelUUID) || (!known && !isUUID(categoryUUID))) {
+        return label(category, name);
+    }
+    return {known.value_or(CategoryDefinition({}, categoryUUID)), LabelDefinition({}, labelUUID)};
+}
+
+std::optional<CategoryIdentifier> LabelNames::find(std::u16string const& category) {
+    auto const categories = labels_.getAllCategories();
+    auto const chosen = choose(namesOf(categories), category, "categories");
+    return chosen ? std::optional(categories[*chosen]) : std::nullopt;
+}
+
+std::optional<LabelIdentifier> LabelNames::find(CategoryIdentifier const& category,
+                                                std::u16string const& label) {
+    auto const labels = labels_.getLabels(category);
+    auto const chosen = choose(namesOf(labels), label, "labels of the category");
+    return chosen ? std::optional(labels[*chosen]) : std::nullopt;
+}
+
+} // namespace projectctl
