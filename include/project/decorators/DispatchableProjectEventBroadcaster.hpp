@@ -1,0 +1,71 @@
+#pragma once
+
+#include <vector>
+
+#include <boost/signals2/signal.hpp>
+
+#include "project/decorators/ProjectEventBroadcaster.hpp"
+
+namespace project::management {
+
+/// The broadcaster that an application makes and shares with its project; observers need to know only the
+/// base.
+///
+/// Each dispatching operation raises one event: it calls the connected slots on this thread and returns when
+/// the last has returned. What a slot throws leaves it, and the slots behind are not called. All operations
+/// may be called from any thread, also from within a slot. The store's lock is never touched.
+///
+/// It knows no project: one that outlives its project is no longer called. Its end disconnects all slots.
+class PROJECT_MANAGEMENT_EXPORT DispatchableProjectEventBroadcaster : public ProjectEventBroadcaster {
+public:
+    ~DispatchableProjectEventBroadcaster() override;
+
+    Connection onFileListUpdate(FilesSlot const& slot) override;
+    Connection onMetadataChange(Slot const& slot) override;
+    Connection onLabelModified(LabelSlot const& slot) override;
+    Connection onCategoryDeleted(CategorySlot const& slot) override;
+    Connection onCategoryAdded(CategorySlot const& slot) override;
+    Connection onCategoryRenamed(CategorySlot const& slot) override;
+    Connection onFileLabelsChanged(FilesSlot const& slot) override;
+    Connection onEntryPointsChanged(Slot const& slot) override;
+    Connection onNameChanged(Slot const& slot) override;
+    Connection onPathChanged(Slot const& slot) override;
+    Connection onReferencesChanged(Slot const& slot) override;
+
+    void dispatchOnFileListUpdate(std::vector<Path> const& files);
+    void dispatchFileLabelsChanged(std::vector<Path> const& files);
+
+    /// For the application, to tell of changes that it makes to data of its own.
+    void dispatchMetadataChange();
+
+    void dispatchEntryPointsChanged();
+    void dispatchNameChanged();
+    void dispatchPathChanged();
+    void dispatchReferencesChanged();
+    void dispatchLabelModified(Label const& label);
+    void dispatchCategoryDeleted(CategoryIdentifier const& category);
+    void dispatchCategoryAdded(CategoryIdentifier const& category);
+    void dispatchCategoryRenamed(CategoryIdentifier const& category);
+
+private:
+    using Signal = boost::signals2::signal<void()>;
+    using FilesSignal = boost::signals2::signal<void(std::vector<Path> const&)>;
+    using LabelSignal = boost::signals2::signal<void(Label const&)>;
+    using CategorySignal = boost::signals2::signal<void(CategoryIdentifier const&)>;
+
+    FilesSignal fileListUpdate_;
+    Signal metadataChange_;
+    LabelSignal labelModified_;
+    CategorySignal categoryDeleted_;
+    CategorySignal categoryAdded_;
+    CategorySignal categoryRenamed_;
+    FilesSignal fileLabelsChanged_;
+    Signal
+        reservedChange_; // spare: connected to nothing, so that a new kind of event leaves the layout alone
+    Signal entryPointsChanged_;
+    Signal nameChanged_;
+    Signal pathChanged_;
+    Signal referencesChanged_;
+};
+
+} // namespace project::management

@@ -1,0 +1,40 @@
+#pragma once
+
+#include <memory>
+
+#include "decorators/EventBroadcastingEntryPointManager.hpp"
+#include "decorators/EventBroadcastingFileManager.hpp"
+#include "decorators/EventBroadcastingLabelManager.hpp"
+#include "decorators/EventBroadcastingProjectPathManager.hpp"
+#include "decorators/EventBroadcastingProjectReferenceManager.hpp"
+#include "project/decorators/DispatchableProjectEventBroadcaster.hpp"
+#include "project/decorators/ProjectManagerDecorator.hpp"
+
+namespace project::management {
+
+/// What EventBroadcastingProjectManager wraps: the project together with the decorators of its managers.
+///
+/// Apart from the public class, so that what that one is made of can change without its users noticing. The
+/// base must own the project before the decorators are made on its managers.
+class InternalEventBroadcastingProjectManager : public ProjectManagerDecorator {
+public:
+    InternalEventBroadcastingProjectManager(std::unique_ptr<ProjectManager> inner,
+                                            std::shared_ptr<DispatchableProjectEventBroadcaster> broadcaster);
+
+    EntryPointManager& getEntryPointManager() override;
+    FileManager& getFileManager() override;
+    LabelManager& getLabelManager() override;
+    ProjectReferenceManager& getProjectReferenceManager() override;
+    ProjectPathManager& getProjectPathManager() override;
+    void setName(std::u16string const& name) override;
+
+private:
+    std::shared_ptr<DispatchableProjectEventBroadcaster> broadcaster_; // first: the others refer to it
+    EventBroadcastingFileManager fileManager_;
+    EventBroadcastingLabelManager labelManager_;
+    EventBroadcastingEntryPointManager entryPointManager_;
+    EventBroadcastingProjectPathManager projectPathManager_;
+    EventBroadcastingProjectReferenceManager projectReferenceManager_;
+};
+
+} // namespace project::management
