@@ -1,0 +1,30 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+#include <sys/stat.h>
+
+namespace project::git {
+
+/// What tells whether a file is still the one that was read. All zero for one that is not there.
+struct FileStamp {
+    dev_t device = 0;
+    ino_t number = 0;
+    off_t size = 0;
+    std::int64_t seconds = 0;
+    std::int64_t nanoseconds = 0;
+
+    static FileStamp of(std::string const& file) {
+        struct stat found {};
+
+        if (::stat(file.c_str(), &found) != 0) {
+            return {};
+        }
+        return {found.st_dev, found.st_ino, found.st_size, found.st_mtim.tv_sec, found.st_mtim.tv_nsec};
+    }
+
+    bool operator==(FileStamp const&) const = default;
+};
+
+} // namespace project::git

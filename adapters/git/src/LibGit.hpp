@@ -1,0 +1,44 @@
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include <git2.h>
+
+namespace project::git {
+
+/// Keeps libgit2 ready for use as long as it lives; libgit2 counts, so there may be several.
+class LibGit {
+public:
+    LibGit();
+    ~LibGit();
+    LibGit(LibGit const&) = delete;
+    LibGit& operator=(LibGit const&) = delete;
+};
+
+template <auto Free>
+struct FreedBy {
+    template <typename T>
+    void operator()(T* object) const noexcept {
+        Free(object);
+    }
+};
+
+using RepositoryHandle = std::unique_ptr<git_repository, FreedBy<git_repository_free>>;
+using IndexHandle = std::unique_ptr<git_index, FreedBy<git_index_free>>;
+using ConfigHandle = std::unique_ptr<git_config, FreedBy<git_config_free>>;
+using ReferenceHandle = std::unique_ptr<git_reference, FreedBy<git_reference_free>>;
+using ObjectHandle = std::unique_ptr<git_object, FreedBy<git_object_free>>;
+using OdbHandle = std::unique_ptr<git_odb, FreedBy<git_odb_free>>;
+using TreeHandle = std::unique_ptr<git_tree, FreedBy<git_tree_free>>;
+
+/// Throws the GitError for what libgit2 has just refused, in its own words.
+/// @param file what it is about.
+/// @param action what could not be done, as in "the index can't be read".
+[[noreturn]] void throwLibGitError(std::string const& file, std::string const& action,
+                                   std::string const& remedy = "");
+
+/// The same when a call of libgit2 gave an error, and nothing otherwise.
+void require(int code, std::string const& file, char const* action);
+
+} // namespace project::git

@@ -1,0 +1,89 @@
+#include "Repository.hpp"
+
+#include <utility>
+
+namespace project::git {
+
+namespace {
+
+ConfigHandle configOf(git_repository* repository) {
+    git_config* config = nullptr;
+    require(git_repository_config(&config, repository), git_repository_path(repository),
+            "the configuration can't be read");
+    return ConfigHandle(config);
+}
+
+} // namespace
+
+Repository::Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot)
+    : handle_(std::move(handle)),
+      config_(configOf(handle_.get())),
+      head_(handle_.get()),
+      workTree_(git_repository_workdir(handle_.get()), projectRoot),
+      configuration_(stampConfiguration()) {
+    addWorkTreeConfiguration();
+    settings_ = {isSet("core.fileMode", true), isSet("core.symlinks", true),
+                 isSet("core.sparseCheckout", false)};
+}
+
+std::array<FileStamp, 2> Repository::stampConfiguration() const {
+    return {FileStamp::of(git_repository_commondir(get()) + std::string("config")),
+            FileStamp::of(git_repository_path(get()) + std::string("config.worktree"))};
+}
+
+// git keeps the settings of a sparse checkout in a file that libgit2 reads from version 1.8 on only.
+void Repository::addWorkTreeConfiguration() {
+    auto const file = git_repository_path(get()) + std::string("config.worktree");
+    if (isSet("extensions.worktreeConfig", false) && FileStamp::of(file) != FileStamp()) {
+        require(git_config_add_file_ondisk(config_.get(), file.c_str(), GIT_CONFIG_LEVEL_APP, get(), 1), file,
+                "the configuration can't be read");
+    }
+}
+
+void Repository::refresh() {
+    auto const stamp = index_ == nullptr ? FileStamp() : FileStamp::of(indexFile());
+    if (index_ == nullptr) {
+        openIndex();
+    } else if (stamp != indexStamp_) {
+        // Looked at before it is read: if it changes in between, it is read once more with the next call.
+        indexStamp_ = stamp;
+        requireReadable(git_index_read(index_.get(), 1));
+    }
+    head_.refresh();
+}
+
+void Repository::openIndex() {
+    git_index* index = nullptr;
+    requireReadable(git_repository_index(&index, get()));
+    index_.reset(index);
+    indexStamp_ = FileStamp::of(indexFile());
+    // By default it would be sorted and searched as core.ignoreCase says.
+    require(git_index_set_caps(index, 0), indexFile(), "the index can't be used");
+    requireReadable(git_index_read(index, 1));
+}
+
+void Repository::requireReadable(int code) const {
+    if (code < 0) {
+        throwLibGitError(git_repository_path(get()) + std::string("index"), "the index can't be read",
+                         "If `git status` reads it, it is written in a way that is not known here: "
+                         "`git update-index --no-split-index --index-version 2` and "
+                         "`git sparse-checkout reapply --no-sparse-index` write it plainly.");
+    }
+}
+
+bool Repository::isSet(std::string const& name, bool whenAbsent) const {
+    int value = 0;
+    return git_config_get_bool(&value, config_.get(), name.c_str()) == 0 ? value != 0 : whenAbsent;
+}
+
+std::string Repository::configured(std::string const& name) const {
+    git_buf value = GIT_BUF_INIT;
+    std::string result;
+    if (git_config_get_string_buf(&value, config_.get(), name.c_str()) == 0) {
+        result.assign(value.ptr, value.size);
+    }
+    git_buf_dispose(&value);
+    return result;
+}
+
+} // namespace project::git

@@ -1,0 +1,101 @@
+#include "RepositoryFinder.hpp"
+
+#include <cstdlib>
+#include <filesystem>
+#include <utility>
+
+#include <git2/sys/repository.h>
+
+#include "fl/filesystem/SystemName.hpp"
+
+namespace project::git {
+
+namespace {
+
+/// @return null when there is none.
+RepositoryHandle openAt(char const* place, unsigned flags) {
+    git_repository* found = nullptr;
+    auto const code = git_repository_open_ext(&found, place, flags, nullptr);
+    if (code == GIT_EOWNER) {
+        throwLibGitError(place, "the repository can't be used",
+                         "If you trust its owner, enter `git config --global --add safe.directory` with the "
+                         "top folder of its work tree.");
+    }
+    if (code != GIT_ENOTFOUND) {
+        require(code, place, "the repository can't be opened");
+    }
+    return RepositoryHandle(found);
+}
+
+/// git's own rule (git(1), "The Git Repository"): with GIT_DIR alone, the working folder is the work tree.
+void setWorkTree(git_repository* repository) {
+    auto const* const folder = std::getenv("GIT_WORK_TREE");
+    if (folder != nullptr) {
+        require(git_repository_set_workdir(repository, folder, 0), folder, "the work tree can't be used");
+        return;
+    }
+    git_config* config = nullptr;
+    require(git_repository_config(&config, repository), git_repository_path(repository),
+            "the configuration can't be read");
+    ConfigHandle const owned(config);
+    git_config_entry* entry = nullptr;
+    int isBare = 0;
+    bool const isConfigured = git_config_get_entry(&entry, config, "core.worktree") == 0;
+    git_config_entry_free(entry);
+    if (!isConfigured && (git_config_get_bool(&isBare, config, "core.bare") != 0 || isBare == 0)) {
+        auto const here = std::filesystem::current_path();
+        require(git_repository_set_workdir(repository, here.c_str(), 0), here, "the work tree can't be used");
+    }
+}
+
+void setIndex(git_repository* repository, char const* file) {
+    git_index* index = nullptr;
+    require(git_index_open(&index, file), file, "the index can't be read");
+    IndexHandle const owned(index);
+    require(git_repository_set_index(repository, index), file, "the index can't be used");
+}
+
+/// libgit2 1.5 reads these variables when asked to, but gives up when it finds GIT_WORK_TREE.
+RepositoryHandle openFromEnvironment(char const* root) {
+    auto const* const repository = std::getenv("GIT_DIR");
+    auto result = repository == nullptr
+                      ? openAt(root, 0)
+                      : openAt(repository, GIT_REPOSITORY_OPEN_NO_SEARCH | GIT_REPOSITORY_OPEN_NO_DOTGIT);
+    if (result != nullptr && (repository != nullptr || std::getenv("GIT_WORK_TREE") != nullptr)) {
+        setWorkTree(result.get());
+    }
+    auto const* const index = std::getenv("GIT_INDEX_FILE");
+    if (result != nullptr && index != nullptr) {
+        setIndex(result.get(), index);
+    }
+    return result;
+}
+
+} // namespace
+
+RepositoryFinder::RepositoryFinder(fl::filesystem::Path root, GitEnvironment environment)
+    : root_(std::move(root)), environment_(environment) {
+}
+
+Repository* RepositoryFinder::find() {
+    if (repository_ == nullptr || !repository_->isAsOpened()) {
+        repository_ = nullptr;
+        auto handle = open();
+        if (handle == nullptr || git_repository_workdir(handle.get()) == nullptr) {
+            return nullptr;
+        }
+        repository_ = std::make_unique<Repository>(std::move(handle), root_);
+    }
+    repository_->refresh();
+    return repository_.get();
+}
+
+RepositoryHandle RepositoryFinder::open() const {
+    fl::filesystem::SystemName const root(root_);
+    if (root.get() == nullptr) {
+        return nullptr;
+    }
+    return environment_ == GitEnvironment::Ignored ? openAt(root.get(), 0) : openFromEnvironment(root.get());
+}
+
+} // namespace project::git

@@ -1,0 +1,61 @@
+#include "WorkTreeFolders.hpp"
+
+#include "DiskEntry.hpp"
+#include "TrackedFiles.hpp"
+
+namespace project::git {
+
+bool WorkTreeFolders::isFileIgnored(TreePath const& path) {
+    return at(parentOf(path)).isIgnored || matchesRule(path);
+}
+
+bool WorkTreeFolders::isOtherRepository(TreePath const& folder) const {
+    auto const name = repository_.workTree().onDisk(folder);
+    return lookAt(name + "/.git").has_value() &&
+           git_repository_open_ext(nullptr, name.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr) !=
+               GIT_ENOTFOUND;
+}
+
+WorkTreeFolders::Folder const& WorkTreeFolders::at(TreePath const& folder) {
+    auto const known = folders_.find(folder);
+    if (known != folders_.end()) {
+        return known->second;
+    }
+    Folder result{FolderKind::Ours, false};
+    if (!folder.empty()) {
+        auto const above = at(parentOf(folder));
+        result.kind = look(folder, above.kind);
+        result.isIgnored = above.isIgnored || (result.kind == FolderKind::Ours && matchesRule(folder + '/'));
+    }
+    return folders_.try_emplace(folder, result).first->second;
+}
+
+FolderKind WorkTreeFolders::look(TreePath const& folder, FolderKind above) const {
+    if (above != FolderKind::Ours) {
+        return above;
+    }
+    auto const* const tracked = trackedAt(repository_.index(), folder);
+    if (nameOf(folder) == ".git" || (tracked != nullptr && isSubmodule(*tracked))) {
+        return FolderKind::OtherRepository;
+    }
+    auto const onDisk = lookAt(repository_.workTree().onDisk(folder));
+    if (!onDisk) {
+        return FolderKind::Missing;
+    }
+    if (S_ISLNK(onDisk->st_mode)) {
+        return FolderKind::BeyondLink;
+    }
+    if (!S_ISDIR(onDisk->st_mode)) {
+        return FolderKind::Missing;
+    }
+    return isOtherRepository(folder) ? FolderKind::OtherRepository : FolderKind::Ours;
+}
+
+bool WorkTreeFolders::matchesRule(TreePath const& path) const {
+    int isIgnored = 0;
+    require(git_ignore_path_is_ignored(&isIgnored, repository_.get(), path.c_str()),
+            repository_.workTree().onDisk(path), "the rules for ignored files can't be read");
+    return isIgnored != 0;
+}
+
+} // namespace project::git
