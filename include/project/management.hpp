@@ -2,6 +2,7 @@
 
 /// Every public header of project::metadata and project::management.
 
+#include "project/cm/CMAwareProjectManager.hpp"
 #include "project/core/EntryPointManager.hpp"
 #include "project/core/FileManager.hpp"
 #include "project/core/FolderReferenceManager.hpp"

@@ -17,6 +17,7 @@
 namespace project::management {
 namespace {
 
+using test::line;
 using testing::ElementsAre;
 using testing::InSequence;
 using testing::IsEmpty;
@@ -32,14 +33,6 @@ protected:
         project.getFileManager().add({file});
         log.take();
         return file;
-    }
-
-    /// The line of an event that carries files.
-    static std::u16string line(std::u16string name, Paths const& paths) {
-        for (auto const& path : paths) {
-            name += u" " + path.native();
-        }
-        return name;
     }
 
     test::TemporaryFolder folder;

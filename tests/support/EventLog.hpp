@@ -6,6 +6,7 @@
 
 #include "project/decorators/ProjectEventBroadcaster.hpp"
 #include "project/labels/Label.hpp"
+#include "support/PathLines.hpp"
 
 namespace project::test {
 
@@ -25,11 +26,11 @@ public:
             note(u"labelModified " + label.getCategory().getUUID() + u" " + label.getUUID());
         });
         broadcaster.onCategoryDeleted(
-            [this](Category const& category) { note(line(u"categoryDeleted", category)); });
+            [this](Category const& category) { note(categoryLine(u"categoryDeleted", category)); });
         broadcaster.onCategoryAdded(
-            [this](Category const& category) { note(line(u"categoryAdded", category)); });
+            [this](Category const& category) { note(categoryLine(u"categoryAdded", category)); });
         broadcaster.onCategoryRenamed(
-            [this](Category const& category) { note(line(u"categoryRenamed", category)); });
+            [this](Category const& category) { note(categoryLine(u"categoryRenamed", category)); });
         broadcaster.onFileLabelsChanged(
             [this](Paths const& files) { note(line(u"fileLabelsChanged", files)); });
         broadcaster.onEntryPointsChanged([this] { note(u"entryPointsChanged"); });
@@ -53,14 +54,8 @@ public:
     std::vector<std::u16string> take() { return std::exchange(lines_, {}); }
 
 private:
-    static std::u16string line(std::u16string name, std::vector<management::Path> const& files) {
-        for (auto const& file : files) {
-            name += u" " + file.native();
-        }
-        return name;
-    }
-
-    static std::u16string line(std::u16string const& name, management::CategoryIdentifier const& category) {
+    static std::u16string categoryLine(std::u16string const& name,
+                                       management::CategoryIdentifier const& category) {
         return name + u" " + category.getUUID() + u" " + category.getName();
     }
 

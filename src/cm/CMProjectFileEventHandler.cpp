@@ -1,0 +1,48 @@
+#include "cm/CMProjectFileEventHandler.hpp"
+
+namespace project::management {
+
+namespace {
+
+/// Empties the set into a list in Path order.
+std::vector<Path> takeAll(std::set<Path>& pending) {
+    std::vector<Path> result(pending.begin(), pending.end());
+    pending.clear();
+    return result;
+}
+
+} // namespace
+
+CMProjectFileEventHandler::CMProjectFileEventHandler(cmlink::CMAdapter& adapter, Path const& root)
+    : adapter_(adapter), actionManager_(adapter_), root_(root) {
+}
+
+// In both reports the set is empty before the adapter is called: a batch that it throws at must not come back
+// with the next report, which may belong to a change that has nothing to do with it.
+
+void CMProjectFileEventHandler::fileRemovalRequested(metadata::MetadataManager& /*store*/,
+                                                     Path const& /*metadataRoot*/,
+                                                     std::vector<Path> const& files) {
+    noteRemoval(files);
+    actionManager_.remove(takeAll(pendingRemovals_));
+}
+
+void CMProjectFileEventHandler::fileAdditionRequested(metadata::MetadataManager& /*store*/,
+                                                      std::vector<Path> const& files) {
+    noteAddition(files);
+    actionManager_.add(takeAll(pendingAdditions_), root_);
+}
+
+bool CMProjectFileEventHandler::acceptsFileChangeRequests() {
+    return true;
+}
+
+void CMProjectFileEventHandler::noteAddition(std::vector<Path> const& files) {
+    pendingAdditions_.insert(files.begin(), files.end());
+}
+
+void CMProjectFileEventHandler::noteRemoval(std::vector<Path> const& files) {
+    pendingRemovals_.insert(files.begin(), files.end());
+}
+
+} // namespace project::management
