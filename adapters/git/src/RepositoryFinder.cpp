@@ -7,23 +7,46 @@
 #include <git2/sys/repository.h>
 
 #include "fl/filesystem/SystemName.hpp"
+#include "project/git/GitError.hpp"
 
 namespace project::git {
 
 namespace {
 
+[[noreturn]] void throwOwnerError(std::string const& place) {
+    throw GitError(
+        place, "the repository can't be used: it belongs to somebody else",
+        "If you trust its owner, enter `git config --global --add safe.directory` with the top folder "
+        "of its work tree.");
+}
+
+/// libgit2 1.5.1 tells a repository of somebody else like one that isn't there, unless the configuration has
+/// a `safe.directory` for another one. Looking for it alone doesn't ask for its owner.
+bool isRepositoryFound(char const* place) {
+    git_buf found = GIT_BUF_INIT;
+    bool const result = git_repository_discover(&found, place, 0, nullptr) == 0;
+    git_buf_dispose(&found);
+    return result;
+}
+
 /// @return null when there is none.
-RepositoryHandle openAt(char const* place, unsigned flags) {
+RepositoryHandle openAround(char const* root) {
     git_repository* found = nullptr;
-    auto const code = git_repository_open_ext(&found, place, flags, nullptr);
-    if (code == GIT_EOWNER) {
-        throwLibGitError(place, "the repository can't be used",
-                         "If you trust its owner, enter `git config --global --add safe.directory` with the "
-                         "top folder of its work tree.");
+    auto const code = git_repository_open_ext(&found, root, 0, nullptr);
+    if (code == GIT_EOWNER || (code == GIT_ENOTFOUND && isRepositoryFound(root))) {
+        throwOwnerError(root);
     }
     if (code != GIT_ENOTFOUND) {
-        require(code, place, "the repository can't be opened");
+        require(code, root, "the repository can't be opened");
     }
+    return RepositoryHandle(found);
+}
+
+RepositoryHandle openNamed(char const* repository) {
+    git_repository* found = nullptr;
+    auto const flags = GIT_REPOSITORY_OPEN_NO_SEARCH | GIT_REPOSITORY_OPEN_NO_DOTGIT;
+    require(git_repository_open_ext(&found, repository, flags, nullptr), repository,
+            "the repository that GIT_DIR names can't be opened");
     return RepositoryHandle(found);
 }
 
@@ -58,9 +81,7 @@ void setIndex(git_repository* repository, char const* file) {
 /// libgit2 1.5 reads these variables when asked to, but gives up when it finds GIT_WORK_TREE.
 RepositoryHandle openFromEnvironment(char const* root) {
     auto const* const repository = std::getenv("GIT_DIR");
-    auto result = repository == nullptr
-                      ? openAt(root, 0)
-                      : openAt(repository, GIT_REPOSITORY_OPEN_NO_SEARCH | GIT_REPOSITORY_OPEN_NO_DOTGIT);
+    auto result = repository == nullptr ? openAround(root) : openNamed(repository);
     if (result != nullptr && (repository != nullptr || std::getenv("GIT_WORK_TREE") != nullptr)) {
         setWorkTree(result.get());
     }
@@ -95,7 +116,7 @@ RepositoryHandle RepositoryFinder::open() const {
     if (root.get() == nullptr) {
         return nullptr;
     }
-    return environment_ == GitEnvironment::Ignored ? openAt(root.get(), 0) : openFromEnvironment(root.get());
+    return environment_ == GitEnvironment::Ignored ? openAround(root.get()) : openFromEnvironment(root.get());
 }
 
 } // namespace project::git

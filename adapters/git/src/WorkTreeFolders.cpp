@@ -11,9 +11,12 @@ bool WorkTreeFolders::isFileIgnored(TreePath const& path) {
 
 bool WorkTreeFolders::isOtherRepository(TreePath const& folder) const {
     auto const name = repository_.workTree().onDisk(folder);
-    return lookAt(name + "/.git").has_value() &&
-           git_repository_open_ext(nullptr, name.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr) !=
-               GIT_ENOTFOUND;
+    auto const own = lookAt(name + "/.git");
+    if (!own || S_ISDIR(own->st_mode)) {
+        return own && lookAt(name + "/.git/HEAD").has_value();
+    }
+    auto const code = git_repository_open_ext(nullptr, name.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
+    return code == 0 || code == GIT_EOWNER;
 }
 
 WorkTreeFolders::Folder const& WorkTreeFolders::at(TreePath const& folder) {
