@@ -35,8 +35,10 @@ bool AbsoluteFolderReferenceReader::canRead(std::u16string const& type) const {
 
 FolderReference AbsoluteFolderReferenceReader::read(std::u16string const& storedPath,
                                                     std::u16string const& uuid) const {
-    // Not canonical, as the relative reader's location is: callers find an absolute reference again, in
-    // isReference and when it is shown, by the text that somebody chose for it.
+    // Only looked up, which has a folder that is mounted on demand come into being. The location stays the
+    // text that somebody chose, by which callers find an absolute reference again in isReference and on
+    // screen.
+    [[maybe_unused]] auto const found = canonicalIfPossible(Path(storedPath));
     return FolderReference(Path(storedPath), absoluteReferenceType(), storedPath, uuid);
 }
 

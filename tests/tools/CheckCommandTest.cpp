@@ -126,7 +126,8 @@ TEST_F(CheckCommand, findsTextsThatNoManagerUnderstands) {
     EXPECT_EQ(result.exitCode, 1);
     EXPECT_THAT(linesOf(result.output),
                 UnorderedElementsAre(tells("label \"lWritable\""), tells("label \"l1\""),
-                                     tells("entry point \"ebatch\""), tells("entry point \"e\"")));
+                                     tells("entry point \"ebatch\""), tells("entry point \"e\""),
+                                     tells("the file \"a\" has 8 entry points")));
 }
 
 TEST_F(CheckCommand, findsFilesWhoseFolderIsNotInTheProject) {

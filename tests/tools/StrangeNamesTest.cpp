@@ -3,6 +3,9 @@
 namespace project::test {
 namespace {
 
+using ::testing::ElementsAre;
+using ::testing::HasSubstr;
+
 /// Names that come through every command as they are on disk.
 class StrangeNames : public ToolTest {
 protected:
@@ -29,8 +32,9 @@ TEST_F(StrangeNames, comeThroughAddAndListUnharmed) {
     EXPECT_THAT(tool({"add", "--recursive", "."}), SucceedsSilently());
 
     EXPECT_THAT(tool({"list", "-0"}), Prints(withZeros(names_)));
-    EXPECT_THAT(tool({"status"}), SucceedsSilently());
-    EXPECT_THAT(tool({"check"}), SucceedsSilently());
+    EXPECT_THAT(linesOf(tool({"status"}).output), ElementsAre(HasSubstr("\"back\\slash\" has a backslash")));
+    EXPECT_THAT(linesOf(tool({"check"}).output), ElementsAre(HasSubstr("\"back\\slash\" has a backslash")));
+    EXPECT_EQ(tool({"check"}).exitCode, 0);
 }
 
 TEST_F(StrangeNames, comeThroughAsArguments) {

@@ -39,7 +39,7 @@ public:
             auto const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
             tell(file + line + ": " + fault.problem);
         }
-        for (auto const& finding : TreeCheck(project.store(), project.files()).run()) {
+        for (auto const& finding : TreeCheck(project).run()) {
             bool const isFault = finding.weight == Finding::Weight::Fault;
             faults += isFault ? 1 : 0;
             tell(file + (isFault ? ": " : ": note: ") + finding.text);

@@ -5,8 +5,10 @@ namespace projectctl {
 std::vector<std::unique_ptr<Command>> makeCommands() {
     std::vector<std::unique_ptr<Command>> result;
     for (auto* const make :
-         {makeInitCommand, makeNameCommand, makeDescriptionCommand, makeAddCommand, makeListCommand,
-          makeStatusCommand, makeCategoryCommand, makeLabelCommand, makeCheckCommand, makeTidyCommand}) {
+         {makeInitCommand, makeNameCommand, makeDescriptionCommand, makeAddCommand, makeRemoveCommand,
+          makeListCommand, makeStatusCommand, makeCategoryCommand, makeLabelCommand, makeEntryCommand,
+          makeGroupCommand, makePathCommand, makeReferenceCommand, makeReferencesCommand, makeCheckCommand,
+          makeTidyCommand}) {
         result.push_back(make());
     }
     return result;

@@ -17,6 +17,19 @@ void JsonRows::addText(std::string_view key, std::u16string_view text) {
     appendJsonString(output().text(), text);
 }
 
+void JsonRows::addTexts(std::string_view key, Texts const& texts) {
+    addKey(key);
+    auto& out = output().text();
+    out += '{';
+    for (auto const& [name, text] : texts) {
+        out += out.back() == '{' ? "" : ", ";
+        appendJsonString(out, name);
+        out += ": ";
+        appendJsonString(out, text);
+    }
+    out += '}';
+}
+
 void JsonRows::addFlag(std::string_view key, bool value) {
     addKey(key);
     output().text() += value ? "true" : "false";

@@ -19,6 +19,7 @@ inline constexpr std::u16string_view label = u"Label";
 inline constexpr std::u16string_view entryPoints = u"EntryPoints";
 inline constexpr std::u16string_view entryPointGroups = u"EntryPointGroups";
 inline constexpr std::u16string_view projectPath = u"ProjectPath";
+inline constexpr std::u16string_view reference = u"Reference";
 inline constexpr std::u16string_view references = u"References";
 
 inline std::u16string const fileKey = u"File";
@@ -26,6 +27,7 @@ inline std::u16string const nameKey = u"Name";
 inline std::u16string const singleValuedKey = u"SingleValued";
 inline std::u16string const uuidKey = u"UUID";
 inline std::u16string const readOnlyKey = u"ReadOnly";
+inline std::u16string const groupKey = u"GroupUUID";
 inline std::u16string const typeKey = u"Type";
 
 } // namespace projectctl::schema

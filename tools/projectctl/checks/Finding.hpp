@@ -1,6 +1,8 @@
 #pragma once
 
+#include <iterator>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace projectctl {
@@ -21,5 +23,10 @@ struct Finding {
 };
 
 using Findings = std::vector<Finding>;
+
+inline void append(Findings& findings, Findings more) {
+    findings.insert(findings.end(), std::make_move_iterator(more.begin()),
+                    std::make_move_iterator(more.end()));
+}
 
 } // namespace projectctl

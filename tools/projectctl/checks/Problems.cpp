@@ -1,7 +1,10 @@
 #include "checks/Problems.hpp"
 
 #include "FileList.hpp"
+#include "checks/EntryPointCheck.hpp"
 #include "checks/LabelCheck.hpp"
+#include "checks/NameCheck.hpp"
+#include "checks/ReferenceCheck.hpp"
 
 namespace projectctl {
 
@@ -9,8 +12,12 @@ Findings findProblems(OpenProject& project) {
     Findings result;
     FileList const list(project);
     LabelCheck const labels(project.store());
-    list.visit(project.root(),
-               [&](FileList::File const& file) { labels.check(file.path, file.node, result); });
+    list.visit(project.root(), [&](FileList::File const& file) {
+        checkName(file.path, result);
+        labels.check(file.path, file.node, result);
+    });
+    append(result, EntryPointCheck(project).run());
+    append(result, ReferenceCheck(project).run());
     return result;
 }
 

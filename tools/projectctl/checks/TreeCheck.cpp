@@ -6,6 +6,9 @@
 
 #include "NameForms.hpp"
 #include "Schema.hpp"
+#include "checks/EntryPointCheck.hpp"
+#include "checks/NameCheck.hpp"
+#include "checks/ReferenceCheck.hpp"
 #include "fl/filesystem/SystemName.hpp"
 #include "project/core/ProjectManagerBase.hpp"
 
@@ -50,14 +53,16 @@ bool isOneOf(std::u16string const& text, std::initializer_list<std::u16string_vi
 
 } // namespace
 
-TreeCheck::TreeCheck(project::metadata::MetadataManager& store, project::management::FileManager& files)
-    : store_(store), files_(files), guard_(store.acquireReadLock()), labels_(store) {
+TreeCheck::TreeCheck(OpenProject& project)
+    : project_(project), store_(project.store()), guard_(store_.acquireReadLock()), labels_(store_) {
 }
 
 Findings TreeCheck::run() {
     for (auto const& head : store_.getChildNodes(MetadataPath::root())) {
         checkHead(head);
     }
+    append(findings_, EntryPointCheck(project_).run());
+    append(findings_, ReferenceCheck(project_).run());
     return std::move(findings_);
 }
 
@@ -111,6 +116,7 @@ void TreeCheck::checkFile(Address const& file) {
               " is listed and its folder is not, so that no list of the project shows it");
     }
     if (file[0].getLocation() == schema::root) {
+        checkName(pathOf(file), findings_);
         labels_.check(pathOf(file), *node, findings_);
     }
 }
@@ -146,11 +152,6 @@ void TreeCheck::checkEntryPoints(Address const& head) {
         if (!isOneOf(type, {u"Basic", u"Startup", u"StartUp", u"Shutdown", u"Batch_Job", u"Batch Job"})) {
             fault("the entry point " + uuid + " has the unknown type " + inQuotes(type));
         }
-        auto const& file = node->get(schema::fileKey);
-        if (!files_.isFileInProject(files_.getProjectRoot() / Path(file))) {
-            note("the entry point " + uuid + " is not shown, because its file " + inQuotes(file) +
-                 " is not in the project");
-        }
     }
 }
 
@@ -162,14 +163,7 @@ void TreeCheck::checkGroups(Address const& head) {
 
 void TreeCheck::checkReferences(Address const& head) {
     for (auto const& reference : store_.getChildNodes(head)) {
-        if (!requireNode(reference, "the reference")) {
-            continue;
-        }
-        auto const type = store_.getNode(reference)->get(schema::typeKey);
-        if (!isOneOf(type, {u"Relative", u"Absolute"})) {
-            note("the reference " + inQuotes(reference.leaf().getLocation()) +
-                 " is not shown, because its type " + inQuotes(type) + " is unknown");
-        }
+        requireNode(reference, "the reference");
     }
 }
 

@@ -2,10 +2,9 @@
 
 #include <string>
 
+#include "OpenProject.hpp"
 #include "checks/Finding.hpp"
 #include "checks/LabelCheck.hpp"
-#include "project/core/FileManager.hpp"
-#include "project/metadata/MetadataManager.hpp"
 
 namespace projectctl {
 
@@ -15,7 +14,7 @@ namespace projectctl {
 class TreeCheck {
 public:
     /// Takes the store's read guard and keeps it, so that all of it is one state of the project.
-    TreeCheck(project::metadata::MetadataManager& store, project::management::FileManager& files);
+    explicit TreeCheck(OpenProject& project);
 
     /// All that is found. To be called once.
     Findings run();
@@ -35,8 +34,8 @@ private:
     void fault(std::string text);
     void note(std::string text);
 
-    project::metadata::MetadataManager& store_;
-    project::management::FileManager& files_;
+    OpenProject& project_;
+    project::metadata::MetadataManager& store_; ///< the project's
     cmlink::ReentrantReadWriteLock::LockGuard guard_;
     LabelCheck labels_;
     Findings findings_;

@@ -1,0 +1,58 @@
+#include "checks/EntryPointCheck.hpp"
+
+#include <utility>
+
+#include "NameForms.hpp"
+#include "Schema.hpp"
+#include "project/core/EntryPointManager.hpp"
+#include "project/entrypoints/EntryPointGroup.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+
+namespace projectctl {
+
+using project::metadata::MetadataPath;
+using project::metadata::PathElement;
+
+Findings EntryPointCheck::run() {
+    for (auto const& group : project_.manager().getEntryPointManager().getEntryPointGroups()) {
+        groups_.insert(group->getUUID());
+    }
+    auto const head = MetadataPath::root().child(
+        PathElement(std::u16string(schema::entryPoints), std::u16string(schema::root)));
+    for (auto const& address : project_.store().getChildNodes(head)) {
+        if (auto const node = project_.store().getNode(address)) {
+            check(address.leaf().getLocation(), *node);
+        }
+    }
+    for (auto const& [file, count] : files_) {
+        if (count > 1) {
+            findings_.push_back(
+                Finding::fault("the file " + inQuotes(file) + " has " + std::to_string(count) +
+                               " entry points, and only the first is ever found by its file"));
+        }
+    }
+    return std::move(findings_);
+}
+
+void EntryPointCheck::check(std::u16string const& uuid, Node const& node) {
+    auto const& file = node.get(schema::fileKey);
+    auto const entry = "the entry point " + inQuotes(uuid) + " of the file " + inQuotes(file);
+    ++files_[file];
+    checkFile(entry, file);
+    auto const& group = node.get(schema::groupKey);
+    if (!group.empty() && !groups_.contains(group)) {
+        findings_.push_back(
+            Finding::fault(entry + " is in the group " + inQuotes(group) + ", which does not exist"));
+    }
+}
+
+void EntryPointCheck::checkFile(std::string const& entry, std::u16string const& file) {
+    auto const path = project_.root() / Path(file);
+    if (!project_.files().isFileInProject(path)) {
+        findings_.push_back(Finding::note(entry + " is not shown, because the file is not in the project"));
+    } else if (!project::metadata::exists(path)) {
+        findings_.push_back(Finding::note(entry + " cannot be used, because the file is gone from the disk"));
+    }
+}
+
+} // namespace projectctl

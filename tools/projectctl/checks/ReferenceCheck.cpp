@@ -1,0 +1,58 @@
+#include "checks/ReferenceCheck.hpp"
+
+#include <set>
+#include <utility>
+
+#include "NameForms.hpp"
+#include "ProjectFolder.hpp"
+#include "Schema.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+#include "project/references/FolderReference.hpp"
+
+namespace projectctl {
+
+using project::metadata::MetadataPath;
+using project::metadata::PathElement;
+
+Findings ReferenceCheck::run() {
+    for (auto const* list : {&projectPath(), &projectReferences()}) {
+        checkForms(*list);
+        checkTargets(*list);
+    }
+    return std::move(findings_);
+}
+
+void ReferenceCheck::checkForms(ReferenceList const& list) {
+    std::set<std::u16string> read;
+    for (auto const& reference : list.manager(project_).getReferences()) {
+        read.insert(reference.getUUID());
+    }
+    auto const head =
+        MetadataPath::root().child(PathElement(std::u16string(list.head), std::u16string(schema::root)));
+    for (auto const& address : project_.store().getChildNodes(head)) {
+        auto const& uuid = address.leaf().getLocation();
+        auto const node = project_.store().getNode(address);
+        bool const isReference = node && address.leaf().getType() == schema::reference;
+        if (isReference && !read.contains(uuid)) {
+            findings_.push_back(Finding::note("the reference " + inQuotes(uuid) + " in " + list.name +
+                                              " is not shown, because nothing there reads its type " +
+                                              inQuotes(node->get(schema::typeKey))));
+        }
+    }
+}
+
+void ReferenceCheck::checkTargets(ReferenceList const& list) {
+    for (auto const& reference : list.manager(project_).getReferences()) {
+        auto const& folder = reference.getLocation();
+        auto const what = "the reference " + inQuotes(reference.getStoredPath()) + " in " + list.name;
+        if (!project::metadata::is_directory(folder)) {
+            findings_.push_back(
+                Finding::note(what + " leads nowhere: there is no folder " + inQuotes(folder.native())));
+        } else if (list.isOfProjects && lookForProject(folder) == ProjectTrace::None) {
+            findings_.push_back(
+                Finding::note(what + " leads to no project: there is none in " + inQuotes(folder.native())));
+        }
+    }
+}
+
+} // namespace projectctl

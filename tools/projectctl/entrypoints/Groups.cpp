@@ -1,0 +1,30 @@
+#include "entrypoints/Groups.hpp"
+
+#include "Choice.hpp"
+#include "Failure.hpp"
+#include "NameForms.hpp"
+
+namespace projectctl {
+
+using project::management::EntryPointGroup;
+
+Groups::Groups(project::management::EntryPointManager& entryPoints)
+    : groups_(entryPoints.getEntryPointGroups()) {
+}
+
+EntryPointGroup& Groups::named(std::string const& name) const {
+    std::vector<Named> names;
+    names.reserve(groups_.size());
+    for (auto const& group : groups_) {
+        names.push_back({group->getName(), group->getUUID()});
+    }
+    auto const wanted = textOf(name);
+    auto const chosen = choose(names, wanted, "entry point groups");
+    if (!chosen) {
+        throw Failure("there is no entry point group " + inQuotes(wanted) +
+                      ". 'projectctl group list' shows those that there are");
+    }
+    return *groups_[*chosen];
+}
+
+} // namespace projectctl
