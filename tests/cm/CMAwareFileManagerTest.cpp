@@ -55,7 +55,7 @@ TEST_F(CMAwareFileManagerTest, addedFilesAreNotedWhenTheInnerManagerIsCalledAndG
 
 TEST_F(CMAwareFileManagerTest, removedFilesAreNotedWhenTheInnerManagerIsCalledAndGoWithTheStoresReport) {
     std::u16string action;
-    Paths const removed{u"/p/a", u"/p/a/x", u"/p/b"};
+    Paths removed{u"/p/a", u"/p/a/x", u"/p/b"};
     EXPECT_CALL(inner, remove(Ref(given))).WillOnce([&](Paths const&) {
         EXPECT_THAT(adapter.take(), IsEmpty());
         action = reportRemoval();

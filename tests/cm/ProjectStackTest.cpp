@@ -65,7 +65,7 @@ protected:
 
     /// Puts a file on disk and into the project, and forgets what came of it.
     Path projectFile(std::u16string const& relative) {
-        auto const file = folder.file(relative);
+        auto file = folder.file(relative);
         files().add({file});
         adapter.take();
         log.take();

@@ -39,7 +39,7 @@ TEST_F(EventBroadcastingFileManagerTest, addingTellsOfTheFilesGivenWhenTheyAreAd
 }
 
 TEST_F(EventBroadcastingFileManagerTest, removingTellsOfTheFilesGivenAndReturnsTheFilesThatWent) {
-    Paths const removed{u"/p/a", u"/p/a/x", u"/p/b"};
+    Paths removed{u"/p/a", u"/p/a/x", u"/p/b"};
     EXPECT_CALL(inner, remove(Ref(given))).WillOnce([&](Paths const&) {
         log.note(u"removed");
         return removed;

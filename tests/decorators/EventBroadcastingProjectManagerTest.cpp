@@ -29,7 +29,7 @@ class EventBroadcastingProjectManagerTest : public testing::Test {
 protected:
     /// Puts a file on disk and into the project, and forgets the events.
     Path projectFile(std::u16string const& relative) {
-        auto const file = folder.file(relative);
+        auto file = folder.file(relative);
         project.getFileManager().add({file});
         log.take();
         return file;
