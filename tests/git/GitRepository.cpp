@@ -27,11 +27,11 @@ auto const* const environment = ::testing::AddGlobalTestEnvironment(new NoOutsid
 /// From the two letters of `git status --porcelain=v2`: the index against the last commit, the disk against
 /// the index.
 int stateFromLetters(char staged, char onDisk) {
-    if (staged == 'D') {
+    if (staged == 'D' && onDisk == '.') {
         return 6;
     }
-    if (onDisk == 'D') {
-        return 3;
+    if (staged == 'D' || onDisk == 'D') {
+        return 3; // removed and intended to be added again, or gone from the disk
     }
     if (staged == 'A' || onDisk == 'A') {
         return 5;

@@ -1,14 +1,11 @@
 #include "BlobWriter.hpp"
 
 #include <cerrno>
-#include <climits>
-#include <optional>
 #include <system_error>
 
-#include <fcntl.h>
 #include <git2/sys/odb_backend.h>
-#include <unistd.h>
 
+#include "FileContent.hpp"
 #include "project/git/GitError.hpp"
 
 namespace project::git {
@@ -19,39 +16,6 @@ constexpr auto action = "the file can't be staged";
 constexpr off_t tooLargeForMemory = off_t{64} << 20;
 
 using FilterHandle = std::unique_ptr<git_filter_list, FreedBy<git_filter_list_free>>;
-
-/// Nothing, with errno, when it can't be read.
-std::optional<std::string> readFile(std::string const& name, std::size_t expectedSize) {
-    auto const file = ::open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK);
-    if (file < 0) {
-        return std::nullopt;
-    }
-    std::string result(expectedSize + 1, '\0'); // one more, to see the end
-    std::size_t length = 0;
-    ssize_t got = 0;
-    do {
-        if (length == result.size()) {
-            result.resize(2 * length);
-        }
-        got = ::read(file, result.data() + length, result.size() - length);
-        length += got > 0 ? static_cast<std::size_t>(got) : 0;
-    } while (got > 0 || (got < 0 && errno == EINTR));
-    auto const error = errno;
-    ::close(file);
-    errno = error;
-    result.resize(length);
-    return got < 0 ? std::nullopt : std::optional(std::move(result));
-}
-
-std::optional<std::string> readLink(std::string const& name) {
-    std::string result(PATH_MAX, '\0');
-    auto const length = ::readlink(name.c_str(), result.data(), result.size());
-    if (length < 0) {
-        return std::nullopt;
-    }
-    result.resize(static_cast<std::size_t>(length));
-    return result;
-}
 
 } // namespace
 

@@ -1,11 +1,9 @@
 #include "EntryComparison.hpp"
 
-#include <climits>
 #include <string>
 #include <tuple>
 
-#include <unistd.h>
-
+#include "FileContent.hpp"
 #include "TrackedFiles.hpp"
 
 namespace project::git {
@@ -35,10 +33,8 @@ bool isAsYoungAs(git_index_entry const& entry, FileStamp const& index) {
 
 /// @return false when it can't be read.
 bool hashLink(git_oid& result, std::string const& name) {
-    std::string target(PATH_MAX, '\0');
-    auto const length = ::readlink(name.c_str(), target.data(), target.size());
-    return length >= 0 &&
-           git_odb_hash(&result, target.data(), static_cast<std::size_t>(length), GIT_OBJECT_BLOB) == 0;
+    auto const target = readLink(name);
+    return target && git_odb_hash(&result, target->data(), target->size(), GIT_OBJECT_BLOB) == 0;
 }
 
 } // namespace

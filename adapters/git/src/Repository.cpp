@@ -77,9 +77,17 @@ bool Repository::isSet(std::string const& name, bool whenAbsent) const {
 }
 
 std::string Repository::configured(std::string const& name) const {
+    return textOf(name, git_config_get_string_buf);
+}
+
+std::string Repository::configuredPath(std::string const& name) const {
+    return textOf(name, git_config_get_path);
+}
+
+std::string Repository::textOf(std::string const& name, TextGetter read) const {
     git_buf value = GIT_BUF_INIT;
     std::string result;
-    if (git_config_get_string_buf(&value, config_.get(), name.c_str()) == 0) {
+    if (read(&value, config_.get(), name.c_str()) == 0) {
         result.assign(value.ptr, value.size);
     }
     git_buf_dispose(&value);

@@ -53,7 +53,13 @@ public:
     /// A text of the configuration, empty when it is absent.
     std::string configured(std::string const& name) const;
 
+    /// The same for the name of a file, which may begin with "~/".
+    std::string configuredPath(std::string const& name) const;
+
 private:
+    using TextGetter = int (*)(git_buf*, git_config const*, char const*);
+
+    std::string textOf(std::string const& name, TextGetter read) const;
     std::array<FileStamp, 2> stampConfiguration() const;
     void addWorkTreeConfiguration();
     void openIndex();

@@ -6,7 +6,7 @@
 namespace project::git {
 
 bool WorkTreeFolders::isFileIgnored(TreePath const& path) {
-    return at(parentOf(path)).isIgnored || matchesRule(path);
+    return at(parentOf(path)).isIgnored || rules_.ignore(path, false);
 }
 
 bool WorkTreeFolders::isOtherRepository(TreePath const& folder) const {
@@ -28,7 +28,8 @@ WorkTreeFolders::Folder const& WorkTreeFolders::at(TreePath const& folder) {
     if (!folder.empty()) {
         auto const above = at(parentOf(folder));
         result.kind = look(folder, above.kind);
-        result.isIgnored = above.isIgnored || (result.kind == FolderKind::Ours && matchesRule(folder + '/'));
+        result.isIgnored =
+            above.isIgnored || (result.kind == FolderKind::Ours && rules_.ignore(folder, true));
     }
     return folders_.try_emplace(folder, result).first->second;
 }
@@ -52,13 +53,6 @@ FolderKind WorkTreeFolders::look(TreePath const& folder, FolderKind above) const
         return FolderKind::Missing;
     }
     return isOtherRepository(folder) ? FolderKind::OtherRepository : FolderKind::Ours;
-}
-
-bool WorkTreeFolders::matchesRule(TreePath const& path) const {
-    int isIgnored = 0;
-    require(git_ignore_path_is_ignored(&isIgnored, repository_.get(), path.c_str()),
-            repository_.workTree().onDisk(path), "the rules for ignored files can't be read");
-    return isIgnored != 0;
 }
 
 } // namespace project::git

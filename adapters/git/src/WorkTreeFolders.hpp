@@ -3,6 +3,7 @@
 #include <string>
 #include <unordered_map>
 
+#include "IgnoreRules.hpp"
 #include "Repository.hpp"
 
 namespace project::git {
@@ -18,7 +19,7 @@ enum class FolderKind {
 /// The folders that one call comes by, each looked at once.
 class WorkTreeFolders {
 public:
-    explicit WorkTreeFolders(Repository const& repository) : repository_(repository) {}
+    explicit WorkTreeFolders(Repository const& repository) : repository_(repository), rules_(repository) {}
 
     FolderKind kindOf(TreePath const& folder) { return at(folder).kind; }
 
@@ -40,9 +41,9 @@ private:
 
     Folder const& at(TreePath const& folder);
     FolderKind look(TreePath const& folder, FolderKind above) const;
-    bool matchesRule(TreePath const& path) const;
 
     Repository const& repository_;
+    IgnoreRules rules_;
     std::unordered_map<TreePath, Folder> folders_;
 };
 
