@@ -2,7 +2,7 @@
 
 #include "GeneratedTree.hpp"
 #include "Ratios.hpp"
-#include "SqlitePeer.hpp"
+#include "TemporaryPeer.hpp"
 #include "project/core/FileManager.hpp"
 #include "project/core/LabelManager.hpp"
 #include "project/files/FileLabel.hpp"
@@ -100,30 +100,9 @@ void askProject(benchmark::State& state) {
     project->getLabelManager().deleteCategory(label.getCategory());
 }
 
-/// A fresh database beside the tree, gone with the object.
-class Peer {
-public:
-    Peer() : file_(GeneratedTree::large().onDisk() / ".labels.db"), peer_(file_) {}
-
-    ~Peer() {
-        for (auto const* suffix : {"", "-wal", "-shm"}) {
-            std::filesystem::remove(file_.string() + suffix);
-        }
-    }
-
-    Peer(Peer const&) = delete;
-    Peer& operator=(Peer const&) = delete;
-
-    SqlitePeer* operator->() { return &peer_; }
-
-private:
-    std::filesystem::path file_;
-    SqlitePeer peer_;
-};
-
 void putInSqlite(benchmark::State& state) {
     auto const rows = labelledRows(GeneratedTree::large());
-    Peer peer;
+    TemporaryPeer peer;
     for (auto _ : state) {
         peer->putLabel(rows, "Status", "Done");
         state.PauseTiming();
@@ -134,7 +113,7 @@ void putInSqlite(benchmark::State& state) {
 
 void deleteInSqlite(benchmark::State& state) {
     auto const rows = labelledRows(GeneratedTree::large());
-    Peer peer;
+    TemporaryPeer peer;
     for (auto _ : state) {
         state.PauseTiming();
         peer->putLabel(rows, "Status", "Done");
@@ -145,7 +124,7 @@ void deleteInSqlite(benchmark::State& state) {
 
 void askSqlite(benchmark::State& state) {
     auto const rows = labelledRows(GeneratedTree::large());
-    Peer peer;
+    TemporaryPeer peer;
     peer->putLabel(rows, "Status", "Done");
     std::size_t next = 0;
     for (auto _ : state) {

@@ -28,6 +28,8 @@ SqlitePeer::SqlitePeer(std::filesystem::path const& file) {
     execute("CREATE TABLE IF NOT EXISTS labels(path TEXT, category TEXT, label TEXT,"
             " PRIMARY KEY(path, category, label)) WITHOUT ROWID");
     execute("CREATE INDEX IF NOT EXISTS byCategory ON labels(category)");
+    execute("CREATE TABLE IF NOT EXISTS entries(path TEXT PRIMARY KEY, name TEXT, type TEXT, grp TEXT)"
+            " WITHOUT ROWID");
     select_ = prepare("SELECT type FROM nodes WHERE path=?");
     selectLabels_ = prepare("SELECT category, label FROM labels WHERE path=?");
 }
@@ -40,14 +42,34 @@ SqlitePeer::~SqlitePeer() {
 
 void SqlitePeer::insert(std::vector<std::string> const& paths) {
     execute("BEGIN IMMEDIATE");
-    auto* const statement = prepare("INSERT OR REPLACE INTO nodes VALUES(?, 'Info')");
-    for (auto const& path : paths) {
-        bind(statement, path);
-        require(sqlite3_step(statement) == SQLITE_DONE, database_);
-        sqlite3_reset(statement);
+    forEach("INSERT OR REPLACE INTO nodes VALUES(?, 'Info')", paths);
+    execute("COMMIT");
+}
+
+void SqlitePeer::insertEntries(std::vector<std::string> const& paths) {
+    execute("BEGIN IMMEDIATE");
+    forEach("INSERT OR REPLACE INTO entries VALUES(?, 'name', 'Basic', 'default')", paths);
+    execute("COMMIT");
+}
+
+void SqlitePeer::remove(std::vector<std::string> const& paths) {
+    execute("BEGIN IMMEDIATE");
+    forEach("DELETE FROM nodes WHERE path=?", paths);
+    forEach("DELETE FROM entries WHERE path=?", paths);
+    execute("COMMIT");
+}
+
+std::size_t SqlitePeer::entries() {
+    auto* const statement =
+        prepare("SELECT entries.path, name, entries.type, grp FROM entries CROSS JOIN nodes USING(path)");
+    std::vector<std::string> texts;
+    while (sqlite3_step(statement) == SQLITE_ROW) {
+        for (int column = 0; column < 4; ++column) {
+            texts.emplace_back(reinterpret_cast<char const*>(sqlite3_column_text(statement, column)));
+        }
     }
     sqlite3_finalize(statement);
-    execute("COMMIT");
+    return texts.size() / 4;
 }
 
 bool SqlitePeer::contains(std::string const& path) {
@@ -101,6 +123,16 @@ std::size_t SqlitePeer::list() {
 
 void SqlitePeer::execute(char const* statement) {
     require(sqlite3_exec(database_, statement, nullptr, nullptr, nullptr) == SQLITE_OK, database_);
+}
+
+void SqlitePeer::forEach(char const* text, std::vector<std::string> const& paths) {
+    auto* const statement = prepare(text);
+    for (auto const& path : paths) {
+        bind(statement, path);
+        require(sqlite3_step(statement) == SQLITE_DONE, database_);
+        sqlite3_reset(statement);
+    }
+    sqlite3_finalize(statement);
 }
 
 sqlite3_stmt* SqlitePeer::prepare(char const* statement) {

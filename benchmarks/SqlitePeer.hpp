@@ -9,8 +9,8 @@ struct sqlite3_stmt;
 
 namespace project::benchmarks {
 
-/// A table of paths and one of the labels on them in an SQLite database set up as one that must not lose a
-/// commit: WAL, synchronous FULL.
+/// Tables of paths, of the labels on them and of entry points in an SQLite database set up as one that must
+/// not lose a commit: WAL, synchronous FULL.
 class SqlitePeer {
 public:
     explicit SqlitePeer(std::filesystem::path const& file);
@@ -33,11 +33,21 @@ public:
     /// Takes all labels of a category off all paths.
     void deleteCategory(std::string const& category);
 
+    /// Makes each path an entry point, in one transaction.
+    void insertEntries(std::vector<std::string> const& paths);
+
+    /// Reads all entry points whose path is there. @return how many there were.
+    std::size_t entries();
+
+    /// Removes paths with their entry points in one transaction.
+    void remove(std::vector<std::string> const& paths);
+
     /// Reads all rows. @return how many there were.
     std::size_t list();
 
 private:
     void execute(char const* statement);
+    void forEach(char const* statement, std::vector<std::string> const& paths);
     sqlite3_stmt* prepare(char const* statement);
 
     sqlite3* database_ = nullptr;
