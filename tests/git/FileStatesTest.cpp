@@ -425,6 +425,33 @@ TEST_F(FileStates, anIndexOfEveryVersionIsRead) {
     }
 }
 
+TEST_F(FileStates, anIndexWithWhatOnlySpeedsGitUpIsRead) {
+    commitFile("a");
+    repository.run({"update-index", "--force-untracked-cache"});
+    repository.run({"status"});
+    EXPECT_EQ(agreedStateOf("a"), 1);
+}
+
+TEST_F(FileStates, aDamagedIndexIsAnErrorEachTimeUntilItIsMended) {
+    commitFile("a");
+    EXPECT_EQ(stateOf("a"), 1);
+    auto const whole = folder.onDisk() / "whole";
+    std::filesystem::copy_file(repository.indexFile(), whole);
+    repository.write(".git/index", "damaged");
+    EXPECT_THROW(stateOf("a"), GitError);
+    EXPECT_THROW(stateOf("a"), GitError);
+    EXPECT_THROW(adapter.removeFromSourceControl({repository.path("a")}), GitError);
+    std::filesystem::rename(whole, repository.indexFile());
+    EXPECT_EQ(agreedStateOf("a"), 1);
+}
+
+TEST_F(FileStates, withoutAnIndexEverythingCommittedIsRemoved) {
+    commitFile("a");
+    EXPECT_EQ(stateOf("a"), 1);
+    std::filesystem::remove(repository.indexFile());
+    EXPECT_EQ(agreedStateOf("a"), 6);
+}
+
 TEST_F(FileStates, anIndexThatIsSplitGivesAnErrorThatTellsWhatToDo) {
     commitFile("a");
     repository.run({"update-index", "--split-index"});

@@ -20,6 +20,8 @@ public:
             git_libgit2_opts(GIT_OPT_SET_SEARCH_PATH, level, "/nowhere");
         }
     }
+
+    void TearDown() override { git_libgit2_shutdown(); }
 };
 
 auto const* const environment = ::testing::AddGlobalTestEnvironment(new NoOutsideConfiguration);

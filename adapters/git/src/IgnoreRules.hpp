@@ -33,9 +33,8 @@ private:
 /// The rules of a repository that tell which files are ignored (gitignore(5)): those of the folders, of
 /// `info/exclude` and of `core.excludesFile`. Each file of rules is read once.
 ///
-/// libgit2 has these rules too, but drops a line that takes back what another file ignores (its ignore.c
-/// keeps a negative line only where it negates an earlier one of the same file), and looks at every file of
-/// rules again for each question.
+/// libgit2 has these rules too, but drops a line that takes back what another file ignores (its issue 7284),
+/// and looks at every file of rules again for each question.
 class IgnoreRules {
 public:
     explicit IgnoreRules(Repository const& repository);

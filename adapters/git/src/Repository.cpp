@@ -41,13 +41,17 @@ void Repository::addWorkTreeConfiguration() {
 }
 
 void Repository::refresh() {
-    auto const stamp = index_ == nullptr ? FileStamp() : FileStamp::of(indexFile());
     if (index_ == nullptr) {
         openIndex();
-    } else if (stamp != indexStamp_) {
-        // Looked at before it is read: if it changes in between, it is read once more with the next call.
-        indexStamp_ = stamp;
+    }
+    // Looked at before it is read: if it changes in between, it is read once more with the next call. One
+    // that can't be read is tried again with the next call, too.
+    auto const stamp = FileStamp::of(indexFile());
+    if (!isIndexRead_ || stamp != indexStamp_) {
+        isIndexRead_ = false;
         requireReadable(git_index_read(index_.get(), 1));
+        indexStamp_ = stamp;
+        isIndexRead_ = true;
     }
     head_.refresh();
 }
@@ -56,10 +60,8 @@ void Repository::openIndex() {
     git_index* index = nullptr;
     requireReadable(git_repository_index(&index, get()));
     index_.reset(index);
-    indexStamp_ = FileStamp::of(indexFile());
     // By default it would be sorted and searched as core.ignoreCase says.
     require(git_index_set_caps(index, 0), indexFile(), "the index can't be used");
-    requireReadable(git_index_read(index, 1));
 }
 
 void Repository::requireReadable(int code) const {

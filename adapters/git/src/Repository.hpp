@@ -69,6 +69,7 @@ private:
     ConfigHandle config_;
     IndexHandle index_;
     FileStamp indexStamp_;
+    bool isIndexRead_ = false;
     HeadTree head_;
     WorkTreeRoot workTree_;
     DiskSettings settings_{};
