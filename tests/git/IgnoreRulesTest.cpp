@@ -154,6 +154,14 @@ TEST_F(IgnoreRules, ofAConfiguredFileCountLast) {
     EXPECT_EQ(stateOf("b"), 2);
 }
 
+TEST_F(IgnoreRules, ofAConfiguredFileMayBeReadThroughALink) {
+    folder.addFile(u"excludes", "b\n");
+    folder.addLink("link", "excludes");
+    repository.run({"config", "core.excludesFile", (folder.onDisk() / "link").string()});
+    expectAgreementOn("");
+    EXPECT_EQ(stateOf("b"), 2);
+}
+
 TEST_F(IgnoreRules, areNotReadThroughALink) {
     folder.addFile(u"rules", "*\n");
     folder.addLink("work/d/.gitignore", folder.onDisk() / "rules");

@@ -257,6 +257,21 @@ TEST_F(Staging, aFileOfAFilterDriverIsRefusedBeforeAnythingIsStaged) {
     EXPECT_EQ(tracked(), std::vector<std::string>{"a"});
 }
 
+TEST_F(Staging, aFileWhoseAttributesLibGit2DoesNotUnderstandIsRefused) {
+    repository.write(".gitattributes", "\"a b\" text\n");
+    repository.write("a b", "1\r\n");
+    EXPECT_NE(errorOfAdding({"a b"}).getRemedy().find("git add"), std::string::npos);
+}
+
+TEST_F(Staging, theAttributesOfAFileThatIsStagedComeFromTheIndexWhereTheDiskHasNone) {
+    repository.run({"config", "filter.upper.clean", "tr a-z A-Z"});
+    repository.write(".gitattributes", "*.up filter=upper\n");
+    repository.run({"add", "-A"});
+    repository.remove(".gitattributes");
+    repository.write("a.up");
+    EXPECT_NE(errorOfAdding({"a.up"}).getProblem().find("\"upper\""), std::string::npos);
+}
+
 TEST_F(Staging, aLinkHasNoFilterDriver) {
     repository.run({"config", "filter.upper.clean", "tr a-z A-Z"});
     repository.write(".gitattributes", "*.up filter=upper\n");

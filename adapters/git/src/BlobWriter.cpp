@@ -39,8 +39,9 @@ bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isC
         require(code == GIT_ENOTFOUND ? 0 : code, name, action);
         return code == 0;
     }
-    auto const content =
-        S_ISLNK(onDisk.st_mode) ? readLink(name) : readFile(name, static_cast<std::size_t>(onDisk.st_size));
+    auto const content = S_ISLNK(onDisk.st_mode)
+                             ? readLink(name)
+                             : readFile(name, Links::NotFollowed, static_cast<std::size_t>(onDisk.st_size));
     if (!content && (errno == ENOENT || errno == ENOTDIR)) {
         return false;
     }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <array>
+#include <string_view>
 
 #include <strings.h>
 
@@ -9,12 +10,26 @@ namespace project::git {
 
 namespace {
 
-bool isSpecified(char const* attribute) {
-    return git_attr_value(attribute) != GIT_ATTR_VALUE_UNSPECIFIED;
+/// What libgit2 converts by.
+constexpr std::array<char const*, 4> converting{"text", "eol", "crlf", "ident"};
+
+AttributeValue valueOf(AttributeRules::Values const& values, std::string_view name) {
+    auto const found = values.find(name);
+    return found == values.end() ? AttributeValue() : found->second;
 }
 
-std::string textOf(char const* attribute) {
-    return git_attr_value(attribute) == GIT_ATTR_VALUE_STRING ? attribute : "";
+/// As libgit2 tells it.
+AttributeValue valueFrom(char const* attribute) {
+    switch (git_attr_value(attribute)) {
+    case GIT_ATTR_VALUE_TRUE:
+        return {AttributeValue::Kind::Set};
+    case GIT_ATTR_VALUE_FALSE:
+        return {AttributeValue::Kind::Unset};
+    case GIT_ATTR_VALUE_STRING:
+        return {AttributeValue::Kind::Text, attribute};
+    default:
+        return {};
+    }
 }
 
 bool isPlainUtf8(std::string const& encoding) {
@@ -23,27 +38,41 @@ bool isPlainUtf8(std::string const& encoding) {
 
 } // namespace
 
-ContentRules::ContentRules(Repository const& repository) : repository_(repository) {
+ContentRules::ContentRules(Repository const& repository) : repository_(repository), attributes_(repository) {
     auto const lineEnds = repository.configured("core.autocrlf");
     areLineEndsConverted_ = lineEnds == "input" || repository.isSet("core.autocrlf", false);
 }
 
 Conversion ContentRules::conversionOf(TreePath const& path) {
-    std::array<char const*, 6> names{"filter", "working-tree-encoding", "text", "eol", "crlf", "ident"};
-    std::array<char const*, names.size()> values{};
-    require(git_attr_get_many(values.data(), repository_.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX, path.c_str(),
-                              names.size(), names.data()),
-            repository_.workTree().onDisk(path), "the attributes of the file can't be read");
-    Conversion result{areLineEndsConverted_ || std::any_of(values.begin() + 2, values.end(), isSpecified),
+    auto const values = attributes_.of(path);
+    auto const isGiven = [&](std::string_view name) { return valueOf(values, name) != AttributeValue(); };
+    Conversion result{areLineEndsConverted_ || std::any_of(converting.begin(), converting.end(), isGiven),
                       ""};
-    auto const driver = textOf(values[0]);
-    auto const encoding = textOf(values[1]);
+    auto const driver = valueOf(values, "filter").text;
+    auto const encoding = valueOf(values, "working-tree-encoding").text;
     if (!driver.empty() && isConfigured(driver)) {
         result.foreign = "the filter driver \"" + driver + '"';
     } else if (!encoding.empty() && !isPlainUtf8(encoding)) {
         result.foreign = "the encoding \"" + encoding + '"';
+    } else if (result.isNeeded && !isKnownToLibGit(path, values)) {
+        result.foreign = "an attribute of a form that is not known here";
     }
     return result;
+}
+
+bool ContentRules::isKnownToLibGit(TreePath const& path, AttributeRules::Values const& values) const {
+    auto names = converting;
+    std::array<char const*, converting.size()> found{};
+    require(git_attr_get_many(found.data(), repository_.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX, path.c_str(),
+                              names.size(), names.data()),
+            repository_.workTree().onDisk(path), "the attributes of the file can't be read");
+    bool const isTextGiven = valueOf(values, "text") != AttributeValue();
+    return std::equal(
+        names.begin(), names.end(), found.begin(), [&](std::string_view name, char const* attribute) {
+            bool const isOutdone =
+                isTextGiven && name == "crlf"; // and libgit2's "binary" has it, but git's doesn't
+            return isOutdone || valueOf(values, name) == valueFrom(attribute);
+        });
 }
 
 bool ContentRules::isConfigured(std::string const& driver) {

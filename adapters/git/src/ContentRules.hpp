@@ -3,6 +3,7 @@
 #include <string>
 #include <unordered_map>
 
+#include "AttributeRules.hpp"
 #include "Repository.hpp"
 
 namespace project::git {
@@ -15,20 +16,20 @@ struct Conversion {
     std::string foreign;
 };
 
-/// Tells from the attributes of files (gitattributes(5)) how their content is converted.
-///
-/// All of a file's attributes are asked for at once: a question makes libgit2 look at every file of
-/// attributes that could tell, and its own way of converting has three for each file.
+/// Tells from the attributes of files how their content is converted.
 class ContentRules {
 public:
     explicit ContentRules(Repository const& repository);
 
+    /// @throws GitError when libgit2 can't tell the attributes that it goes by.
     Conversion conversionOf(TreePath const& path);
 
 private:
     bool isConfigured(std::string const& driver);
+    bool isKnownToLibGit(TreePath const& path, AttributeRules::Values const& values) const;
 
     Repository const& repository_;
+    AttributeRules attributes_;
     bool areLineEndsConverted_;
     std::unordered_map<std::string, bool> drivers_;
 };

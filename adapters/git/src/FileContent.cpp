@@ -8,8 +8,9 @@
 
 namespace project::git {
 
-std::optional<std::string> readFile(std::string const& name, std::size_t expectedSize) {
-    auto const file = ::open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK);
+std::optional<std::string> readFile(std::string const& name, Links links, std::size_t expectedSize) {
+    auto const file =
+        ::open(name.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | (links == Links::Followed ? 0 : O_NOFOLLOW));
     if (file < 0) {
         return std::nullopt;
     }

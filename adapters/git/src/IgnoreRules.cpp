@@ -1,9 +1,6 @@
 #include "IgnoreRules.hpp"
 
-#include <strings.h>
-
 #include "FileContent.hpp"
-#include "Wildcards.hpp"
 
 namespace project::git {
 
@@ -25,28 +22,17 @@ std::string_view withoutEnd(std::string_view line) {
     return line.substr(0, end < line.size() && backslashes % 2 == 1 ? end + 1 : end);
 }
 
-/// The file that git reads when none is configured: "ignore" beside the user's configuration.
-std::string usualExcludesFile() {
-    git_buf folder = GIT_BUF_INIT;
-    std::string result;
-    if (git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, GIT_CONFIG_LEVEL_XDG, &folder) == 0 && folder.size > 0) {
-        result = std::string(folder.ptr, folder.size) + "/ignore";
-    }
-    git_buf_dispose(&folder);
-    return result;
-}
-
-std::vector<IgnorePattern> readPatterns(std::string const& file) {
-    auto const content = readFile(file);
+std::vector<IgnoreLine> readLines(std::string const& file, Links links) {
+    auto const content = readFile(file, links);
     std::string_view text = content ? std::string_view(*content) : std::string_view();
     if (text.starts_with("\xEF\xBB\xBF")) {
         text.remove_prefix(3);
     }
-    std::vector<IgnorePattern> result;
+    std::vector<IgnoreLine> result;
     while (!text.empty()) {
         auto const end = std::min(text.find('\n'), text.size());
-        if (auto pattern = IgnorePattern::read(text.substr(0, end))) {
-            result.push_back(*std::move(pattern)); // NOLINT: their number shows only now
+        if (auto read = IgnoreLine::read(text.substr(0, end))) {
+            result.push_back(*std::move(read)); // NOLINT: their number shows only now
         }
         text.remove_prefix(std::min(end + 1, text.size()));
     }
@@ -55,48 +41,21 @@ std::vector<IgnorePattern> readPatterns(std::string const& file) {
 
 } // namespace
 
-std::optional<IgnorePattern> IgnorePattern::read(std::string_view line) {
-    IgnorePattern result;
+std::optional<IgnoreLine> IgnoreLine::read(std::string_view line) {
     auto text = line.starts_with('#') ? std::string_view() : withoutEnd(line);
-    if (text.starts_with('!')) {
-        result.isNegative_ = true;
-        text.remove_prefix(1);
-    }
-    if (text.ends_with('/')) {
-        result.isForFolders_ = true;
-        text.remove_suffix(1);
-    }
-    result.isPath_ = text.find('/') != std::string_view::npos;
-    if (text.starts_with('/')) {
-        text.remove_prefix(1);
-    }
-    if (text.empty()) {
-        return std::nullopt;
-    }
-    result.hasWildcards_ = text.find_first_of("*?[\\") != std::string_view::npos;
-    result.text_ = text;
-    return result;
-}
-
-bool IgnorePattern::matches(std::string_view path, bool isFolder, bool ignoresCase) const {
-    if (isForFolders_ && !isFolder) {
-        return false;
-    }
-    auto const compared = isPath_ ? path : path.substr(path.rfind('/') + 1);
-    if (hasWildcards_) {
-        return matchesWildcards(text_, compared, {isPath_, ignoresCase});
-    }
-    return compared.size() == text_.size() &&
-           (ignoresCase ? ::strncasecmp(compared.data(), text_.data(), text_.size()) == 0
-                        : compared == text_);
+    bool const isNegative = text.starts_with('!');
+    text.remove_prefix(isNegative ? 1 : 0);
+    auto pattern = NamePattern::of(text);
+    return pattern ? std::optional(IgnoreLine{*std::move(pattern), isNegative}) : std::nullopt;
 }
 
 IgnoreRules::IgnoreRules(Repository const& repository)
     : repository_(repository), ignoresCase_(repository.isSet("core.ignoreCase", false)) {
     auto const configured = repository.configuredPath("core.excludesFile");
     general_.push_back(
-        readPatterns(git_repository_commondir(repository.get()) + std::string("info/exclude")));
-    general_.push_back(readPatterns(configured.empty() ? usualExcludesFile() : configured));
+        readLines(git_repository_commondir(repository.get()) + std::string("info/exclude"), Links::Followed));
+    general_.push_back(
+        readLines(configured.empty() ? repository.usersFile("ignore") : configured, Links::Followed));
 }
 
 bool IgnoreRules::ignore(TreePath const& path, bool isFolder) {
@@ -108,29 +67,29 @@ bool IgnoreRules::ignore(TreePath const& path, bool isFolder) {
             return *decision;
         }
     }
-    for (auto const& patterns : general_) {
-        if (auto const decision = decide(patterns, whole, isFolder)) {
+    for (auto const& lines : general_) {
+        if (auto const decision = decide(lines, whole, isFolder)) {
             return *decision;
         }
     }
     return false;
 }
 
-IgnoreRules::Patterns const& IgnoreRules::ofFolder(TreePath const& folder) {
+IgnoreRules::Lines const& IgnoreRules::ofFolder(TreePath const& folder) {
     auto const known = folders_.find(folder);
     if (known != folders_.end()) {
         return known->second;
     }
     auto const file = folder.empty() ? ".gitignore" : folder + "/.gitignore";
-    return folders_.try_emplace(folder, readPatterns(repository_.workTree().onDisk(file))).first->second;
+    return folders_.try_emplace(folder, readLines(repository_.workTree().onDisk(file), Links::NotFollowed))
+        .first->second;
 }
 
 /// The last line that matches counts.
-std::optional<bool> IgnoreRules::decide(Patterns const& patterns, std::string_view path,
-                                        bool isFolder) const {
-    for (auto pattern = patterns.rbegin(); pattern != patterns.rend(); ++pattern) {
-        if (pattern->matches(path, isFolder, ignoresCase_)) {
-            return !pattern->isNegative();
+std::optional<bool> IgnoreRules::decide(Lines const& lines, std::string_view path, bool isFolder) const {
+    for (auto line = lines.rbegin(); line != lines.rend(); ++line) {
+        if (line->pattern.matches(path, isFolder, ignoresCase_)) {
+            return !line->isNegative;
         }
     }
     return std::nullopt;

@@ -6,28 +6,18 @@
 #include <unordered_map>
 #include <vector>
 
+#include "NamePattern.hpp"
 #include "Repository.hpp"
 
 namespace project::git {
 
 /// One line of a `.gitignore`.
-class IgnorePattern {
-public:
+struct IgnoreLine {
     /// Nothing for a line without a pattern.
-    static std::optional<IgnorePattern> read(std::string_view line);
+    static std::optional<IgnoreLine> read(std::string_view line);
 
-    /// @param path as seen from the folder of the file that the line stands in.
-    bool matches(std::string_view path, bool isFolder, bool ignoresCase) const;
-
-    /// Whether what matches is taken in again.
-    bool isNegative() const { return isNegative_; }
-
-private:
-    std::string text_;
-    bool isNegative_ = false;
-    bool isForFolders_ = false;
-    bool isPath_ = false; // else the last element is compared, in whatever folder
-    bool hasWildcards_ = false;
+    NamePattern pattern;
+    bool isNegative; ///< whether what matches is taken in again
 };
 
 /// The rules of a repository that tell which files are ignored (gitignore(5)): those of the folders, of
@@ -43,15 +33,15 @@ public:
     bool ignore(TreePath const& path, bool isFolder);
 
 private:
-    using Patterns = std::vector<IgnorePattern>;
+    using Lines = std::vector<IgnoreLine>;
 
-    Patterns const& ofFolder(TreePath const& folder);
-    std::optional<bool> decide(Patterns const& patterns, std::string_view path, bool isFolder) const;
+    Lines const& ofFolder(TreePath const& folder);
+    std::optional<bool> decide(Lines const& lines, std::string_view path, bool isFolder) const;
 
     Repository const& repository_;
     bool ignoresCase_;
-    std::vector<Patterns> general_; // the first counts before the others
-    std::unordered_map<TreePath, Patterns> folders_;
+    std::vector<Lines> general_; // the first counts before the others
+    std::unordered_map<TreePath, Lines> folders_;
 };
 
 } // namespace project::git

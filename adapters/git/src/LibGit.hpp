@@ -30,6 +30,7 @@ using ConfigHandle = std::unique_ptr<git_config, FreedBy<git_config_free>>;
 using ReferenceHandle = std::unique_ptr<git_reference, FreedBy<git_reference_free>>;
 using ObjectHandle = std::unique_ptr<git_object, FreedBy<git_object_free>>;
 using OdbHandle = std::unique_ptr<git_odb, FreedBy<git_odb_free>>;
+using BlobHandle = std::unique_ptr<git_blob, FreedBy<git_blob_free>>;
 using TreeHandle = std::unique_ptr<git_tree, FreedBy<git_tree_free>>;
 
 /// Throws the GitError for what libgit2 has just refused, in its own words.

@@ -2,6 +2,8 @@
 
 #include <utility>
 
+#include "FileContent.hpp"
+
 namespace project::git {
 
 namespace {
@@ -84,6 +86,30 @@ std::string Repository::configured(std::string const& name) const {
 
 std::string Repository::configuredPath(std::string const& name) const {
     return textOf(name, git_config_get_path);
+}
+
+std::string Repository::usersFile(char const* name) const {
+    git_buf folder = GIT_BUF_INIT;
+    std::string result;
+    if (git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, GIT_CONFIG_LEVEL_XDG, &folder) == 0 && folder.size > 0) {
+        result = std::string(folder.ptr, folder.size) + '/' + name;
+    }
+    git_buf_dispose(&folder);
+    return result;
+}
+
+std::string Repository::contentOf(TreePath const& path) const {
+    if (auto content = readFile(workTree_.onDisk(path), Links::NotFollowed)) {
+        return *std::move(content);
+    }
+    auto const* const entry = git_index_get_bypath(index(), path.c_str(), 0);
+    git_blob* blob = nullptr;
+    if (entry == nullptr || git_blob_lookup(&blob, get(), &entry->id) != 0) {
+        return {};
+    }
+    BlobHandle const owned(blob);
+    return {static_cast<char const*>(git_blob_rawcontent(blob)),
+            static_cast<std::size_t>(git_blob_rawsize(blob))};
 }
 
 std::string Repository::textOf(std::string const& name, TextGetter read) const {

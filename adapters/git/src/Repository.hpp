@@ -56,6 +56,12 @@ public:
     /// The same for the name of a file, which may begin with "~/".
     std::string configuredPath(std::string const& name) const;
 
+    /// Where git looks for a file of the user's, as in "ignore", when none is configured.
+    std::string usersFile(char const* name) const;
+
+    /// The content of a file of the work tree, or of its entry in the index where the disk has none.
+    std::string contentOf(TreePath const& path) const;
+
 private:
     using TextGetter = int (*)(git_buf*, git_config const*, char const*);
 
