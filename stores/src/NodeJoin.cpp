@@ -6,8 +6,8 @@
 #include <set>
 #include <string>
 
-#include "JsonText.hpp"
-#include "NodeLine.hpp"
+#include "NestedIdentity.hpp"
+#include "NodeCopy.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 
 namespace project::stores {
@@ -16,35 +16,6 @@ using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
 
 namespace {
-
-/// What tells a nested node from its siblings: its type and one of two keys, or else all of it.
-std::string identityOf(MetadataNode const& node) {
-    std::string identity;
-    for (std::u16string const key : {u"UUID", u"Name"}) {
-        std::u16string const& value = node.get(key);
-        if (!value.empty()) {
-            appendJsonString(identity, node.getType());
-            appendJsonString(identity, key);
-            appendJsonString(identity, value);
-            return identity;
-        }
-    }
-    appendNestedNode(identity, node);
-    return identity;
-}
-
-void putKeys(MetadataNode& target, MetadataNode const& from) {
-    for (std::u16string const& key : from.getKeys()) {
-        target.put(key, from.get(key));
-    }
-}
-
-void copyInto(MetadataNode& target, MetadataNode const& from) {
-    putKeys(target, from);
-    for (auto const& child : from.getChildren()) {
-        copyInto(*target.addChild(child->getType()), *child);
-    }
-}
 
 /// The nested nodes of a node, to be found by those of another one; each is found once.
 class Partners {
