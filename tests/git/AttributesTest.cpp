@@ -82,10 +82,10 @@ TEST_F(Attributes, ofSeveralFilesCountAsTheyDoToGit) {
              {".gitattributes", "d/.gitattributes", "d/e/.gitattributes", ".git/info/attributes"}) {
             std::string rules = file == ".gitattributes" ? "[attr]up filter=upper\n" : "";
             for (auto count = random() % 3; count > 0; --count) {
-                rules += pick(patterns) + " " + pick(values) + "\n";
+                rules.append(pick(patterns)).append(" ").append(pick(values)).append("\n");
             }
             repository.write(file, rules);
-            done += "\n" + file + ":\n" + rules;
+            done.append("\n").append(file).append(":\n").append(rules);
         }
         expectAgreement(done);
     }

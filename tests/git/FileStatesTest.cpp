@@ -1,28 +1,11 @@
-#include <sys/stat.h>
-
 #include "GitRepository.hpp"
-#include "project/git/GitError.hpp"
 
 namespace project::git {
 namespace {
 
 using std::filesystem::perms;
 
-class FileStates : public GitTest {
-protected:
-    /// The adapter's answer for a name, which has to be that of `git status`, too.
-    int agreedStateOf(std::string const& name) {
-        auto const expected = repository.statusStates();
-        EXPECT_TRUE(expected.contains(name)) << name << " is not in git's answer";
-        EXPECT_EQ(stateOf(name), expected.at(name)) << name;
-        return stateOf(name);
-    }
-
-    void commitFile(std::string const& name, std::string const& content = "content\n") const {
-        repository.write(name, content);
-        repository.commitAll();
-    }
-};
+class FileStates : public GitTest {};
 
 TEST_F(FileStates, aFileThatGitDoesNotTrackIs0) {
     repository.write("a");
@@ -223,135 +206,6 @@ TEST_F(FileStates, aTouchedFileOfAFilterDriverIs3AndAnUntouchedOneUnmodified) {
     EXPECT_EQ(stateOf("a.up"), 3); // git would run the program to find out
 }
 
-TEST_F(FileStates, aFolderIs1WhenAnythingBelowItIsTracked) {
-    commitFile("d/e/a");
-    repository.write("d/ignored");
-    repository.write(".gitignore", "d\nignored\n");
-    EXPECT_EQ(stateOf("d"), 1);
-    EXPECT_EQ(stateOf("d/e"), 1);
-    EXPECT_EQ(stateOf(""), 1);
-    repository.remove("d");
-    EXPECT_EQ(stateOf("d/e"), 1);
-}
-
-TEST_F(FileStates, aFolderIs2WhenItIsIgnoredAndElse0) {
-    EXPECT_EQ(stateOf(""), 0);
-    repository.write(".gitignore", "out/\n");
-    repository.write("out/deep/a");
-    repository.write("d/a");
-    folder.addFolder("work/empty");
-    EXPECT_EQ(stateOf("out"), 2);
-    EXPECT_EQ(stateOf("out/deep"), 2);
-    EXPECT_EQ(stateOf("d"), 0);
-    EXPECT_EQ(stateOf("empty"), 0);
-}
-
-TEST_F(FileStates, aFolderWhoseOnlyFileHasASimilarNameBesideItIsNotTracked) {
-    commitFile("da");
-    commitFile("d.a");
-    commitFile("d-a");
-    folder.addFolder("work/d");
-    EXPECT_EQ(stateOf("d"), 0);
-}
-
-TEST_F(FileStates, aFileInPlaceOfATrackedFolderIs0AndWhatWasBelowIs3) {
-    commitFile("d/a");
-    repository.remove("d");
-    repository.write("d");
-    EXPECT_EQ(agreedStateOf("d"), 0);
-    EXPECT_EQ(agreedStateOf("d/a"), 3);
-}
-
-TEST_F(FileStates, aFolderInPlaceOfATrackedFileLeavesThatAt3) {
-    commitFile("a");
-    repository.remove("a");
-    repository.write("a/b");
-    EXPECT_EQ(agreedStateOf("a"), 3);
-    EXPECT_EQ(agreedStateOf("a/b"), 0);
-}
-
-TEST_F(FileStates, whatIsNotThereIs9) {
-    commitFile("a");
-    EXPECT_EQ(stateOf("b"), 9);
-    EXPECT_EQ(stateOf("c/d/e"), 9);
-    EXPECT_EQ(stateOf("a/below"), 9);
-    EXPECT_EQ(stateOf(std::string(300, 'x')), 9);
-}
-
-TEST_F(FileStates, whatIsNeitherFileNorLinkNorFolderIs9) {
-    ASSERT_EQ(::mkfifo((repository.onDisk() / "pipe").c_str(), 0600), 0);
-    EXPECT_EQ(stateOf("pipe"), 9);
-}
-
-TEST_F(FileStates, whatLiesOutsideTheWorkTreeIs8) {
-    commitFile("a");
-    folder.addFile(u"beside", "");
-    std::vector<Path> const outside{folder.path(u"beside"),
-                                    folder.path(u"work-not"),
-                                    folder.path(u"work/../beside"),
-                                    repository.path(".git"),
-                                    repository.path(".git/index"),
-                                    Path(u"/"),
-                                    Path(u""),
-                                    Path(u"relative"),
-                                    Path(std::u16string(u"/lone") + char16_t{0xD800}),
-                                    Path(std::u16string(5000, u'/') + u"x"),
-                                    Path(u"/" + std::u16string(5000, u'x'))};
-    auto const states = adapter.getFileStates(outside);
-    for (auto const& path : outside) {
-        ASSERT_TRUE(states.contains(path));
-        EXPECT_EQ(states.at(path).getState(), cmlink::LocalStatus::NotInRepository);
-    }
-}
-
-TEST_F(FileStates, whatLiesBeyondALinkIs8) {
-    repository.write("real/a");
-    repository.run({"add", "-A"});
-    folder.addLink("work/link", "real");
-    EXPECT_EQ(stateOf("link/a"), 8);
-    EXPECT_EQ(agreedStateOf("link"), 0);
-}
-
-TEST_F(FileStates, aTrackedFileWhoseFolderBecameALinkIs3) {
-    commitFile("d/a");
-    std::filesystem::rename(repository.onDisk() / "d", repository.onDisk() / "moved");
-    folder.addLink("work/d", "moved");
-    EXPECT_EQ(agreedStateOf("d/a"), 3);
-    EXPECT_EQ(agreedStateOf("d"), 0);
-}
-
-TEST_F(FileStates, whatLiesInAnotherRepositoryInsideIs8) {
-    GitRepository::init(folder.addFolder("work/inner")).write("deep/a");
-    EXPECT_EQ(stateOf("inner"), 0);
-    EXPECT_EQ(stateOf("inner/deep/a"), 8);
-    EXPECT_EQ(stateOf("inner/deep"), 8);
-}
-
-TEST_F(FileStates, aFolderWithAnythingElseCalledDotGitIsNoRepository) {
-    repository.write("d/.git", "not a repository\n");
-    repository.write("d/a");
-    EXPECT_EQ(agreedStateOf("d/a"), 0);
-}
-
-TEST_F(FileStates, pathsMayBeWrittenInManyWays) {
-    commitFile("d/a");
-    std::vector<Path> const spellings{repository.root() / u"d/a/", repository.root() / u"d//a",
-                                      repository.root() / u"./d/./a", repository.root() / u"x/../d/a",
-                                      Path(u"//" + repository.root().native() + u"/d/a")};
-    auto const states = adapter.getFileStates(spellings);
-    for (auto const& path : spellings) {
-        EXPECT_EQ(states.at(path).getState(), cmlink::LocalStatus::Unmodified);
-    }
-}
-
-TEST_F(FileStates, aProjectThatWasOpenedByWayOfALinkFindsItsFiles) {
-    commitFile("sub/a");
-    folder.addLink("way", "work/sub");
-    GitAdapter throughLink(folder.path(u"way"));
-    auto const path = folder.path(u"way/a");
-    EXPECT_EQ(throughLink.getFileStates({path}).at(path).getState(), cmlink::LocalStatus::Unmodified);
-}
-
 TEST_F(FileStates, namesOfAllKindsAreFound) {
     std::vector<std::string> const names{"sp ace",
                                          "new\nline",
@@ -399,69 +253,6 @@ TEST_F(FileStates, whatOthersDoToTheRepositoryIsSeen) {
     repository.run({"commit", "-q", "-m", "removed"});
     EXPECT_EQ(agreedStateOf("a"), 0);
     repository.run({"checkout", "-q", "-f", "HEAD~1"});
-    EXPECT_EQ(agreedStateOf("a"), 1);
-}
-
-TEST_F(FileStates, anEmptyListNeedsNoRepository) {
-    repository.write(".git/index", "damaged");
-    EXPECT_TRUE(adapter.getFileStates({}).empty());
-    adapter.addToSourceControl({});
-    adapter.removeFromSourceControl({});
-    repository.write("a");
-    EXPECT_THROW(stateOf("a"), GitError); // the damage would have shown
-}
-
-TEST_F(FileStates, aPathThatIsAskedForTwiceIsAnsweredOnce) {
-    repository.write("a");
-    EXPECT_EQ(adapter.getFileStates({repository.path("a"), repository.path("a")}).size(), 1u);
-}
-
-TEST_F(FileStates, anIndexOfEveryVersionIsRead) {
-    for (auto const* const version : {"2", "3", "4"}) {
-        commitFile("dir/file" + std::string(version));
-        repository.run({"update-index", "--index-version", version});
-        EXPECT_EQ(agreedStateOf("dir/file" + std::string(version)), 1);
-        EXPECT_EQ(agreedStateOf("dir/file2"), 1);
-    }
-}
-
-TEST_F(FileStates, anIndexWithWhatOnlySpeedsGitUpIsRead) {
-    commitFile("a");
-    repository.run({"update-index", "--force-untracked-cache"});
-    repository.run({"status"});
-    EXPECT_EQ(agreedStateOf("a"), 1);
-}
-
-TEST_F(FileStates, aDamagedIndexIsAnErrorEachTimeUntilItIsMended) {
-    commitFile("a");
-    EXPECT_EQ(stateOf("a"), 1);
-    auto const whole = folder.onDisk() / "whole";
-    std::filesystem::copy_file(repository.indexFile(), whole);
-    repository.write(".git/index", "damaged");
-    EXPECT_THROW(stateOf("a"), GitError);
-    EXPECT_THROW(stateOf("a"), GitError);
-    EXPECT_THROW(adapter.removeFromSourceControl({repository.path("a")}), GitError);
-    std::filesystem::rename(whole, repository.indexFile());
-    EXPECT_EQ(agreedStateOf("a"), 1);
-}
-
-TEST_F(FileStates, withoutAnIndexEverythingCommittedIsRemoved) {
-    commitFile("a");
-    EXPECT_EQ(stateOf("a"), 1);
-    std::filesystem::remove(repository.indexFile());
-    EXPECT_EQ(agreedStateOf("a"), 6);
-}
-
-TEST_F(FileStates, anIndexThatIsSplitGivesAnErrorThatTellsWhatToDo) {
-    commitFile("a");
-    repository.run({"update-index", "--split-index"});
-    try {
-        stateOf("a");
-        FAIL() << "it was read";
-    } catch (GitError const& error) {
-        EXPECT_NE(error.getRemedy().find("--no-split-index"), std::string::npos);
-    }
-    repository.run({"update-index", "--no-split-index"});
     EXPECT_EQ(agreedStateOf("a"), 1);
 }
 

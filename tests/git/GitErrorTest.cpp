@@ -18,7 +18,7 @@ TEST(GitError, leavesOutWhatIsNotThere) {
 
 TEST(GitError, recordsWhereItWasMadeAndACopyKeepsThat) {
     GitError const error("/p", "no permission", "");
-    GitError const copy(error);
+    GitError copy(error);
 
     EXPECT_FALSE(error.getStackTrace().getFrames().empty());
     EXPECT_EQ(copy.getStackTrace().getFrames(), error.getStackTrace().getFrames());

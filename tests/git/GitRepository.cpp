@@ -112,6 +112,7 @@ GitRepository GitRepository::init(std::filesystem::path const& workTree) {
 
 std::vector<Path> GitRepository::paths(std::vector<std::string> const& names) const {
     std::vector<Path> result;
+    result.reserve(names.size());
     for (auto const& name : names) {
         result.push_back(path(name));
     }

@@ -78,6 +78,19 @@ protected:
     GitAdapter adapter{repository.root()};
 
     int stateOf(std::string const& name) { return repository.adapterStates(adapter, {name}).at(name); }
+
+    /// The adapter's answer for a name, which has to be that of `git status`, too.
+    int agreedStateOf(std::string const& name) {
+        auto const expected = repository.statusStates();
+        EXPECT_TRUE(expected.contains(name)) << name << " is not in git's answer";
+        EXPECT_EQ(stateOf(name), expected.at(name)) << name;
+        return stateOf(name);
+    }
+
+    void commitFile(std::string const& name, std::string const& content = "content\n") const {
+        repository.write(name, content);
+        repository.commitAll();
+    }
 };
 
 } // namespace project::git

@@ -2,7 +2,7 @@
 
 #include <unistd.h>
 
-#include "GitRepository.hpp"
+#include "RepositoriesFixture.hpp"
 #include "project/git/GitError.hpp"
 #include "support/ChildProcess.hpp"
 
@@ -36,50 +36,7 @@ private:
     std::filesystem::path before_ = std::filesystem::current_path();
 };
 
-class RepositoryKinds : public ::testing::Test {
-protected:
-    /// A repository with a committed file "kept" and its folder "d" with "d/kept".
-    GitRepository committed(std::string const& name) const {
-        auto repository = GitRepository::init(folder.addFolder(name));
-        repository.write("kept");
-        repository.write("d/kept");
-        repository.commitAll();
-        return repository;
-    }
-
-    /// The states of everything that git knows of, then the same after a file was added and one was removed.
-    static void expectAgreement(GitRepository const& repository, GitAdapter& adapter) {
-        repository.write(".gitignore", "*.o\n");
-        repository.write("d/new");
-        repository.write("x.o");
-        expectStates(repository, adapter);
-        adapter.addToSourceControl({repository.path("d/new")});
-        adapter.removeFromSourceControl({repository.path("kept")});
-        expectStates(repository, adapter);
-        EXPECT_EQ(repository.statusStates().at("d/new"), 5);
-        EXPECT_EQ(repository.statusStates().at("kept"), 6);
-        EXPECT_TRUE(std::filesystem::exists(repository.onDisk() / "kept"));
-    }
-
-    static void expectStates(GitRepository const& repository, GitAdapter& adapter) {
-        auto const expected = repository.statusStates();
-        std::vector<std::string> names;
-        for (auto const& [name, state] : expected) {
-            names.push_back(name);
-        }
-        EXPECT_EQ(repository.adapterStates(adapter, names), expected);
-    }
-
-    static void expectNoRepository(GitRepository const& files, GitAdapter& adapter) {
-        files.write("a");
-        EXPECT_EQ(files.adapterStates(adapter, {"a", "", "not there"}),
-                  (States{{"a", 8}, {"", 8}, {"not there", 8}}));
-        adapter.addToSourceControl(files.paths({"a"}));
-        adapter.removeFromSourceControl(files.paths({"a"}));
-    }
-
-    test::TemporaryFolder folder;
-};
+class RepositoryKinds : public RepositoriesTest {};
 
 TEST_F(RepositoryKinds, aPlainRepository) {
     auto const repository = committed("work");
@@ -231,68 +188,6 @@ TEST_F(RepositoryKinds, theEnvironmentCountsOnlyForWhoeverAsksForIt) {
     GitAdapter honouring(repository.root(), GitEnvironment::Honoured);
     EXPECT_EQ(repository.adapterStates(honouring, {"kept"}).at("kept"), 8);
     EXPECT_EQ(meta.adapterStates(honouring, {"kept"}).at("kept"), 1);
-}
-
-class SparseCheckout : public RepositoryKinds {
-protected:
-    GitRepository sparse() const {
-        auto repository = committed("work");
-        repository.write("out/a");
-        repository.write("out/b");
-        repository.commitAll();
-        repository.run({"sparse-checkout", "set", "d"});
-        return repository;
-    }
-};
-
-TEST_F(SparseCheckout, whatIsLeftOutIsUnmodified) {
-    auto const repository = sparse();
-    ASSERT_FALSE(std::filesystem::exists(repository.onDisk() / "out"));
-    GitAdapter adapter(repository.root());
-    expectAgreement(repository, adapter);
-    EXPECT_EQ(repository.adapterStates(adapter, {"out/a", "out"}), (States{{"out/a", 1}, {"out", 1}}));
-}
-
-TEST_F(SparseCheckout, whatIsThereAllTheSameIsCompared) {
-    auto const repository = sparse();
-    GitAdapter adapter(repository.root());
-    repository.write("out/a", "other\n");
-    EXPECT_EQ(repository.adapterStates(adapter, {"out/a", "out/b"}), (States{{"out/a", 3}, {"out/b", 1}}));
-    expectStates(repository, adapter);
-}
-
-TEST_F(SparseCheckout, aFileOutsideTheConeIsStagedAndCountsAsCheckedOut) {
-    auto const repository = sparse();
-    GitAdapter adapter(repository.root());
-    repository.write("out/a", "other\n");
-    repository.write("out/new");
-    adapter.addToSourceControl(repository.paths({"out/a", "out/new"}));
-    auto const tags = recordsOf(repository.run({"ls-files", "-t", "-z"}));
-    EXPECT_EQ(tags, (std::vector<std::string>{"H d/kept", "H kept", "H out/a", "S out/b", "H out/new"}));
-    expectStates(repository, adapter);
-}
-
-TEST_F(SparseCheckout, whatIsLeftOutCanBeRemovedAndTheRestStaysLeftOut) {
-    auto const repository = sparse();
-    GitAdapter adapter(repository.root());
-    adapter.removeFromSourceControl(repository.paths({"out/a"}));
-    auto const tags = recordsOf(repository.run({"ls-files", "-t", "-z"}));
-    EXPECT_EQ(tags, (std::vector<std::string>{"H d/kept", "H kept", "S out/b"}));
-    expectStates(repository, adapter);
-}
-
-TEST_F(SparseCheckout, anIndexThatIsSparseItselfGivesAnErrorThatTellsWhatToDo) {
-    auto const repository = sparse();
-    repository.run({"sparse-checkout", "reapply", "--sparse-index"});
-    GitAdapter adapter(repository.root());
-    try {
-        repository.adapterStates(adapter, {"kept"});
-        FAIL() << "it was read";
-    } catch (GitError const& error) {
-        EXPECT_NE(error.getRemedy().find("git sparse-checkout reapply --no-sparse-index"), std::string::npos);
-    }
-    repository.run({"sparse-checkout", "reapply", "--no-sparse-index"});
-    expectStates(repository, adapter);
 }
 
 TEST_F(RepositoryKinds, inABareRepositoryNothingIsDone) {
