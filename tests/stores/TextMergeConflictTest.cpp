@@ -1,0 +1,187 @@
+// What can be done about conflicts: choosing sides, or a text with markers.
+#include "project/stores/TextMerge.hpp"
+
+#include <ostream>
+#include <stdexcept>
+
+#include "TextFrame.hpp"
+#include "stores/MergeSamples.hpp"
+#include "support/TextStore.hpp"
+
+namespace project::stores {
+
+namespace {
+
+using namespace samples;
+
+constexpr MergeSide ours = MergeSide::Ours;
+constexpr MergeSide theirs = MergeSide::Theirs;
+
+TEST(TextMergeChoice, eachConflictIsChosenByItself) {
+    TextMerge const merge =
+        mergeTexts(bodyOf({R"({"file":"a","keys":{"k":"1","l":"1"}})", R"("b")", R"("b/x")"}),
+                   bodyOf({R"({"file":"a","keys":{"k":"2","l":"2","o":"2"}})"}),
+                   bodyOf({R"({"file":"a","keys":{"k":"3","l":"3"}})", R"("b")", R"("b/x")", R"("b/y")"}));
+    ASSERT_EQ(told(merge.conflicts()), "Key k at a\nKey l at a\nSubtree at b, removed by ours, changed b/y");
+    EXPECT_EQ(merge.text({ours, ours, ours}), bodyOf({R"({"file":"a","keys":{"k":"2","l":"2","o":"2"}})"}));
+    EXPECT_EQ(merge.text({ours, theirs, theirs}),
+              bodyOf({R"({"file":"a","keys":{"k":"2","l":"3","o":"2"}})", R"("b")", R"("b/x")", R"("b/y")"}));
+    EXPECT_EQ(merge.text({theirs, ours, ours}), bodyOf({R"({"file":"a","keys":{"k":"3","l":"2","o":"2"}})"}));
+}
+
+TEST(TextMergeChoice, aRemovedKeyOrNestedNodeOrNodeGoesOrStays) {
+    std::string const base = bodyOf({R"({"file":"a","keys":{"k":"1"}})"});
+    TextMerge const key = mergeTexts(base, bodyOf({R"("a")"}), bodyOf({R"({"file":"a","keys":{"k":"2"}})"}));
+    EXPECT_EQ(key.text({ours}), bodyOf({R"("a")"}));
+    EXPECT_EQ(key.text({theirs}), bodyOf({R"({"file":"a","keys":{"k":"2"}})"}));
+
+    auto const extension = [](std::string const& value) {
+        return bodyOf(
+            {R"({"file":"a","children":[{"type":"E","keys":{"Name":"n","V":")" + value + R"("}}]})"});
+    };
+    TextMerge const nested = mergeTexts(extension("1"), extension("2"), bodyOf({R"("a")"}));
+    EXPECT_EQ(nested.text({ours}), extension("2"));
+    EXPECT_EQ(nested.text({theirs}), bodyOf({R"("a")"}));
+
+    TextMerge const node = mergeTexts(base, bodyOf({}), bodyOf({R"({"file":"a","keys":{"k":"2"}})"}));
+    EXPECT_EQ(node.text({ours}), bodyOf({}));
+    EXPECT_EQ(node.text({theirs}), bodyOf({R"({"file":"a","keys":{"k":"2"}})"}));
+}
+
+TEST(TextMergeChoice, asManyChoicesAsConflictsAreNeeded) {
+    TextMerge const clean = mergeTexts(bodyOf({}), bodyOf({}), bodyOf({}));
+    EXPECT_THROW(clean.text({ours}), std::invalid_argument);
+    TextMerge const merge =
+        mergeTexts("", bodyOf({R"({"file":"a","keys":{"k":"1"}})"}), bodyOf({R"({"file":"a","type":"T"})"}));
+    ASSERT_EQ(told(merge.conflicts()), "Type at a");
+    EXPECT_THROW(merge.text(), std::invalid_argument);
+    EXPECT_EQ(merge.text({theirs}), bodyOf({R"({"file":"a","type":"T","keys":{"k":"1"}})"}));
+}
+
+class TextMergeMarkers : public test::TextStore {
+protected:
+    std::string const base = bodyOf({R"({"file":"a","keys":{"k":"1"}})", R"("b")", R"("b/x")", R"("c")"});
+    std::string const one = bodyOf({R"({"file":"a","keys":{"k":"2","o":"2"}})", R"("c")", R"("d")"});
+    std::string const two = bodyOf({R"({"file":"a","keys":{"k":"3"}})", R"("b")", R"("b/x")", R"("b/y")"});
+    std::string const marked = bodyOf({
+        "<<<<<<< ours",
+        R"({"file":"a","keys":{"k":"2","o":"2"}})",
+        "||||||| base",
+        R"({"file":"a","keys":{"k":"1"}})",
+        "=======",
+        R"({"file":"a","keys":{"k":"3","o":"2"}})",
+        ">>>>>>> theirs",
+        "<<<<<<< ours",
+        "||||||| base",
+        R"("b")",
+        R"("b/x")",
+        "=======",
+        R"("b")",
+        R"("b/x")",
+        R"("b/y")",
+        ">>>>>>> theirs",
+        R"("d")",
+    });
+};
+
+TEST_F(TextMergeMarkers, standAroundWhatIsInConflictAndTheRestIsMerged) {
+    EXPECT_EQ(mergeTexts(base, one, two).textWithMarkers(), marked);
+}
+
+TEST_F(TextMergeMarkers, areReadWithBothSidesCounting) {
+    ProjectText const text = readWhole(mergeTexts(base, one, two).textWithMarkers());
+    EXPECT_EQ(told(text.faults()), "Conflict 2, Conflict 9");
+    EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"({"file":"a","keys":{"k":"3","o":"2"}})", R"("b")",
+                                                     R"("b/x")", R"("b/y")", R"("d")"}));
+}
+
+TEST_F(TextMergeMarkers, letAStoreOpenAndRefuseWrites) {
+    prepareText(mergeTexts(base, one, two).textWithMarkers());
+    auto const store = open();
+    EXPECT_TRUE(test::contentOf(*store).contains(fileAddress(u"b/y")));
+    EXPECT_EQ(told(store->check()), "Conflict 2, Conflict 9");
+    StoreError const error = test::errorOf([&] { test::commit(*store, test::addFiles({u"e"})); });
+    EXPECT_EQ(error.getLine(), 2U);
+    EXPECT_EQ(text(), marked);
+}
+
+TEST_F(TextMergeMarkers, areNotThereWhenNothingIsInConflict) {
+    EXPECT_EQ(mergeTexts(base, one, base).textWithMarkers(), one);
+}
+
+TEST(TextMergeInput, versionsWithTailsAreMergedByWhatTheySay) {
+    ProjectText const common = readWhole(bodyOf({R"("a")", R"("b")", R"("c")"}));
+    std::string const base = common.body() + common.tailFor({set(fileAddress(u"d"))});
+    std::string const removed =
+        common.body() + common.tailFor({set(fileAddress(u"d")), remove(fileAddress(u"b"))});
+    std::string const added =
+        common.body() + common.tailFor({set(fileAddress(u"d")), set(fileAddress(u"e"))});
+    std::string const expected = bodyOf({R"("a")", R"("c")", R"("d")", R"("e")"});
+    EXPECT_EQ(merged(base, removed, added), expected);
+    EXPECT_EQ(merged(base, removed, bodyOf({R"("a")", R"("b")", R"("c")", R"("d")", R"("e")"})), expected);
+    EXPECT_EQ(merged(base, base, base), bodyOf({R"("a")", R"("b")", R"("c")", R"("d")"}));
+}
+
+TEST(TextMergeInput, textsInAnotherFormAreMergedByWhatTheySay) {
+    std::string const base = bodyOf({R"("b")", R"("a")", "", R"( {"keys": {"k":"1"}, "file":"c"})"});
+    EXPECT_EQ(
+        merged(base, bodyOf({R"("a")", R"("b")", R"({"file":"c","keys":{"k":"1"}})"}), bodyOf({R"("b")"})),
+        bodyOf({R"("b")"}));
+    EXPECT_EQ(merged(base, bodyOf({R"("a")"}), base), bodyOf({R"("a")"}));
+}
+
+TEST(TextMergeInput, whatAWriterThatDiedLeftCountsForNobody) {
+    std::string const text = bodyOf({R"("a")"});
+    EXPECT_EQ(merged(text, text + R"("b")", bodyOf({R"("a")", R"("c")"})), bodyOf({R"("a")", R"("c")"}));
+}
+
+struct BadText {
+    std::string text;
+    std::size_t line;
+    std::string problem;
+
+    friend void PrintTo(BadText const& bad, std::ostream* out) { *out << bad.text; }
+};
+
+class TextMergeRefusal : public ::testing::TestWithParam<BadText> {};
+
+TEST_P(TextMergeRefusal, namesTheVersionAndTheLine) {
+    std::string const good = bodyOf({R"("a")"});
+    std::string const& bad = GetParam().text;
+    auto const expect = [](StoreError const& error, std::string const& version) {
+        EXPECT_EQ(error.getFile(), version);
+        EXPECT_EQ(error.getLine(), GetParam().line);
+        EXPECT_NE(error.getProblem().find(GetParam().problem), std::string::npos) << error.what();
+    };
+    expect(test::errorOf([&] { mergeTexts(bad, good, good); }), "base");
+    expect(test::errorOf([&] { mergeTexts(good, bad, good); }), "ours");
+    expect(test::errorOf([&] { mergeTexts(good, good, bad); }), "theirs");
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Texts, TextMergeRefusal,
+    ::testing::Values(BadText{bodyOf({R"("a")", "nonsense"}), 3, "damaged"},
+                      BadText{bodyOf({R"({"file":"a","color":"red"})"}), 2, "damaged"},
+                      BadText{bodyOf({R"("a")", "<<<<<<< ours", "=======", ">>>>>>> theirs"}), 3, "markers"},
+                      BadText{std::string(firstLine) + "\n\"a", 2, "ends before"},
+                      BadText{std::string(firstLine) + "\n\"a\"\n", 2, "ends before"},
+                      BadText{"{\"format\":\"project-definition\",\"version\":2}\n", 1, "version 2"},
+                      BadText{"\n\n", 1, "no project definition"}));
+
+TEST(TextMergeInput, anEmptyTextIsNoVersionOfAProject) {
+    std::string const good = bodyOf({R"("a")"});
+    EXPECT_EQ(test::errorOf([&] { mergeTexts(good, "", good); }).getFile(), "ours");
+    EXPECT_EQ(test::errorOf([&] { mergeTexts(good, good, ""); }).getFile(), "theirs");
+}
+
+TEST(TextMergeInput, aDamagedTailIsRefused) {
+    ProjectText const text = readWhole(bodyOf({R"("a")"}));
+    std::string tail = text.tailFor({set(fileAddress(u"b"))}) + text.tailFor({set(fileAddress(u"c"))});
+    tail[1] = 'x';
+    StoreError const error = test::errorOf([&] { mergeTexts("", text.body() + tail, text.body()); });
+    EXPECT_EQ(error.getLine(), 5U);
+}
+
+} // namespace
+
+} // namespace project::stores
