@@ -50,11 +50,20 @@ RepositoryHandle openNamed(char const* repository) {
     return RepositoryHandle(found);
 }
 
+void setWorkTreeTo(git_repository* repository, std::filesystem::path const& folder) {
+    auto const* const current = git_repository_workdir(repository);
+    std::error_code notThere;
+    if (current != nullptr && std::filesystem::equivalent(current, folder, notThere)) {
+        return; // libgit2 1.5.1 leaks memory when it is told what it knows
+    }
+    require(git_repository_set_workdir(repository, folder.c_str(), 0), folder, "the work tree can't be used");
+}
+
 /// git's own rule (git(1), "The Git Repository"): with GIT_DIR alone, the working folder is the work tree.
 void setWorkTree(git_repository* repository) {
     auto const* const folder = std::getenv("GIT_WORK_TREE");
     if (folder != nullptr) {
-        require(git_repository_set_workdir(repository, folder, 0), folder, "the work tree can't be used");
+        setWorkTreeTo(repository, folder);
         return;
     }
     git_config* config = nullptr;
@@ -66,8 +75,7 @@ void setWorkTree(git_repository* repository) {
     bool const isConfigured = git_config_get_entry(&entry, config, "core.worktree") == 0;
     git_config_entry_free(entry);
     if (!isConfigured && (git_config_get_bool(&isBare, config, "core.bare") != 0 || isBare == 0)) {
-        auto const here = std::filesystem::current_path();
-        require(git_repository_set_workdir(repository, here.c_str(), 0), here, "the work tree can't be used");
+        setWorkTreeTo(repository, std::filesystem::current_path());
     }
 }
 
