@@ -58,7 +58,7 @@ public:
     /// The state of every path, as `git status` sees it without looking for renames.
     ///
     /// The first of these that holds counts:
-    ///  - 8 outside the work tree, in a `.git` folder, beyond a symbolic link, or in another repository
+    ///  - 8 outside the work tree
     ///  - 4 with conflicting entries in the index
     ///  - in the index: 3 gone from the disk, unless a sparse checkout left it out; 5 not in the last commit;
     ///    7 of another type (file, link, submodule) than in the last commit or the index; 3 other than there;
@@ -66,6 +66,7 @@ public:
     ///    its own repository's. A file that a filter driver would have to read, and that was touched, is 3.
     ///  - a folder, on the disk or gone: 1 when anything below it is tracked
     ///  - 6 in the last commit and no longer in the index, whether or not it is on the disk
+    ///  - 8 in a `.git` folder, beyond a symbolic link, or in another repository
     ///  - 9 not there, or neither file, link nor folder
     ///  - 2 ignored, else 0
     ///
