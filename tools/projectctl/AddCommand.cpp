@@ -8,10 +8,10 @@
 #include "DiskWalk.hpp"
 #include "Failure.hpp"
 #include "GitIgnore.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
 #include "PathArguments.hpp"
 #include "Progress.hpp"
+#include "ProjectCommand.hpp"
 #include "ProjectFolder.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
@@ -20,7 +20,7 @@ namespace projectctl {
 namespace {
 
 /// Adds files and folders, all in one step: either all of them are in the project afterwards, or none is.
-class AddCommand : public Command {
+class AddCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand("add", "Add files and folders to the project");
@@ -33,8 +33,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto paths = given_.read();
         add(project, paths);
         tellUnaddable();

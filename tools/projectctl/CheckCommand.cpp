@@ -4,9 +4,9 @@
 
 #include "Commands.hpp"
 #include "NameForms.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
 #include "Progress.hpp"
+#include "ProjectCommand.hpp"
 #include "checks/TreeCheck.hpp"
 
 namespace projectctl {
@@ -16,7 +16,7 @@ namespace {
 using project::stores::Fault;
 
 /// Looks for faults in the project's text and in what it says, and tells all of them.
-class CheckCommand : public Command {
+class CheckCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand("check", "Look through the whole project for faults");
@@ -25,8 +25,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         if (repair_) {
             repair(project);
         }
@@ -53,6 +52,7 @@ private:
         project.shield().raise();
         auto const aside = project.text().repair();
         if (!aside.empty()) {
+            project.stageLater();
             tell("what was damaged stands in " + project.storeFile(aside) + " now");
         }
     }

@@ -7,6 +7,7 @@
 
 #include "Commands.hpp"
 #include "Output.hpp"
+#include "Settings.hpp"
 
 namespace projectctl {
 
@@ -47,6 +48,9 @@ std::vector<std::string> markedArguments(int argc, char const* const* argv) {
     }
     return result;
 }
+
+/// Stands wherever among the arguments, for the parser would want it before the command.
+constexpr char const* sourceControlOff = "--no-source-control";
 
 std::string withoutMarks(std::string text) {
     std::erase(text, mark);
@@ -112,6 +116,9 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     CLI::App tool("Keeps the definition of an engineering project beside its files.", "projectctl");
     tool.require_subcommand(1);
     tool.set_version_flag("--version", version, "Show the version and exit");
+    bool shownInHelpAlone = false;
+    tool.add_flag(sourceControlOff, shownInHelpAlone,
+                  "With any command: leave git alone, stage nothing, take nothing out of its index");
     auto const commands = makeCommands();
     std::vector<CLI::App*> declared;
     declared.reserve(commands.size());
@@ -119,6 +126,7 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
         declared.push_back(command->declare(tool));
     }
     auto arguments = markedArguments(argc, argv);
+    settings().sourceControl = std::erase(arguments, sourceControlOff) == 0;
     std::ranges::reverse(arguments); // so the parser wants them
     try {
         tool.parse(std::move(arguments));

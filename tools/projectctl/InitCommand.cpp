@@ -4,6 +4,7 @@
 #include "CommandLine.hpp"
 #include "Commands.hpp"
 #include "Failure.hpp"
+#include "NameForms.hpp"
 #include "OpenProject.hpp"
 #include "Output.hpp"
 #include "ProjectFolder.hpp"
@@ -12,8 +13,6 @@
 namespace projectctl {
 
 namespace {
-
-using project::metadata::MetadataPath;
 
 /// Makes a project in a folder.
 class InitCommand : public Command {
@@ -28,15 +27,8 @@ public:
     int run() override {
         auto const root = folder_ ? chosenFolder(*folder_) : workingFolder();
         requireNoProject(root);
-        OpenProject project(root);
-        auto const name = name_ ? fl::filesystem::fromSystem(*name_).native() : nameOf(root);
-        {
-            auto const guard = project.store().acquireWriteLock();
-            if (!project.store().getChildNodes(MetadataPath::root()).empty()) {
-                failForExisting(root); // somebody else made it since we looked
-            }
-            project.manager().create(name);
-        }
+        auto const name = name_ ? textOf(*name_) : nameOf(root);
+        OpenProject::make(root, name).stage();
         output().say("There is a project in \"" + shown(root) +
                      "\" now. 'projectctl add' puts files into it.");
         return 0;
@@ -55,12 +47,8 @@ private:
     static void requireNoProject(Path const& root) {
         if (lookForProject(root) != ProjectTrace::None) {
             findProjectRoot(root); // tells of a text that is missing
-            failForExisting(root);
+            throw Failure("there is a project in \"" + shown(root) + "\" already");
         }
-    }
-
-    [[noreturn]] static void failForExisting(Path const& root) {
-        throw Failure("there is a project in \"" + shown(root) + "\" already");
     }
 
     static std::u16string nameOf(Path const& root) {

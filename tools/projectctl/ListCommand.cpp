@@ -8,6 +8,7 @@
 #include "JsonRows.hpp"
 #include "NameForms.hpp"
 #include "Output.hpp"
+#include "ProjectCommand.hpp"
 #include "ProjectFolder.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/ProjectException.hpp"
@@ -19,7 +20,7 @@ namespace {
 using ZEPHRA::project::management::FileNotInProject;
 
 /// Lists the project's files and folders, all or those below one of them.
-class ListCommand : public Command {
+class ListCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
@@ -35,8 +36,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const path = path_ ? ArgumentPaths(workingFolder()).absolute(*path_) : project.root();
         project.warnOfDamage(); // first: it reads the text, and the list needs no second look at the disk
         writeList(project, path);

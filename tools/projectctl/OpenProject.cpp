@@ -4,20 +4,34 @@
 
 #include "Output.hpp"
 #include "ProjectFolder.hpp"
+#include "Settings.hpp"
 
 namespace projectctl {
 
-using project::management::ProjectManagerBase;
+using project::session::SourceControl;
 using project::stores::Fault;
 using project::stores::TextBackend;
-using project::stores::TreeMetadataManager;
 
-OpenProject::OpenProject(Path root) : root_(std::move(root)), shield_(std::make_shared<WriteShield>()) {
-    auto text = std::make_unique<TextBackend>(project::stores::makeSystemDisk(root_));
-    text_ = text.get();
-    store_ = std::make_shared<TreeMetadataManager>(std::move(text), root_ / TextBackend::folderName);
-    store_->subscribe(shield_);
-    manager_ = std::make_unique<ProjectManagerBase>(root_, store_);
+namespace {
+
+/// A command stages what it has written once, when it is done.
+project::session::Options sessionOptions() {
+    auto const sourceControl = settings().sourceControl ? SourceControl::WhenAsked : SourceControl::Off;
+    return {sourceControl, true};
+}
+
+} // namespace
+
+OpenProject::OpenProject(Path const& root) : OpenProject(Session::open(root, sessionOptions())) {
+}
+
+OpenProject OpenProject::make(Path const& root, std::u16string const& name) {
+    return OpenProject(Session::make(root, name, sessionOptions()));
+}
+
+OpenProject::OpenProject(Session session)
+    : shield_(std::make_shared<WriteShield>()), session_(std::move(session)) {
+    session_.project().subscribe(shield_);
 }
 
 OpenProject::~OpenProject() = default;
@@ -27,17 +41,17 @@ OpenProject OpenProject::ofWorkingFolder() {
 }
 
 std::string OpenProject::textFile() const {
-    return shown(root_ / TextBackend::folderName / TextBackend::textName);
+    return shown(root() / TextBackend::folderName / TextBackend::textName);
 }
 
 std::string OpenProject::storeFile(std::string const& name) const {
-    return shown(root_ / TextBackend::folderName) + '/' + name;
+    return shown(root() / TextBackend::folderName) + '/' + name;
 }
 
 void OpenProject::warnOfDamage() {
     std::size_t count = 0;
     std::string first;
-    for (auto const& fault : text_->check()) {
+    for (auto const& fault : text().check()) {
         if (fault.kind == Fault::Kind::Damage || fault.kind == Fault::Kind::Conflict) {
             if (count++ == 0) {
                 first = textFile() + ':' + std::to_string(fault.line) + ": " + fault.problem;

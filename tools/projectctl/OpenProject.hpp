@@ -5,11 +5,8 @@
 #include <vector>
 
 #include "WriteShield.hpp"
-#include "fl/filesystem/Path.hpp"
-#include "project/core/FileManager.hpp"
-#include "project/core/ProjectManagerBase.hpp"
+#include "project/session.hpp"
 #include "project/stores/TextBackend.hpp"
-#include "project/stores/TreeMetadataManager.hpp"
 
 namespace projectctl {
 
@@ -22,9 +19,12 @@ using fl::filesystem::Path;
 class OpenProject {
 public:
     /// Opens the project in a folder. Nothing is read yet, and nothing is written.
-    /// @param root canonical.
-    explicit OpenProject(Path root);
+    explicit OpenProject(Path const& root);
     ~OpenProject();
+
+    /// Makes a project in a folder.
+    /// @throws StoreError when there is one already.
+    static OpenProject make(Path const& root, std::u16string const& name);
 
     /// Opens the project that the working folder lies in.
     /// @throws Failure when there is none.
@@ -33,16 +33,16 @@ public:
     OpenProject(OpenProject const&) = delete;
     OpenProject& operator=(OpenProject const&) = delete;
 
-    Path const& root() const noexcept { return root_; }
+    Path const& root() const noexcept { return session_.root(); }
 
-    project::management::ProjectManager& manager() noexcept { return *manager_; }
+    project::management::ProjectManager& manager() noexcept { return session_.project(); }
 
-    project::management::FileManager& files() { return manager_->getFileManager(); }
+    project::management::FileManager& files() { return manager().getFileManager(); }
 
-    project::metadata::MetadataManager& store() noexcept { return *store_; }
+    project::metadata::MetadataManager& store() noexcept { return session_.store(); }
 
     /// What the store keeps its tree in. While a guard of the store is open, this may be loaded from.
-    project::stores::TextBackend& text() noexcept { return *text_; }
+    project::stores::TextBackend& text() noexcept { return session_.text(); }
 
     WriteShield& shield() noexcept { return *shield_; }
 
@@ -56,12 +56,25 @@ public:
     /// may lack something then. To be called with no guard open.
     void warnOfDamage();
 
+    /// Stages the project's text in git, if it was written and git tracks it. To be called with no guard
+    /// open.
+    void stage() { session_.stage(); }
+
+    /// Has stage count what was changed through text().
+    void stageLater() noexcept { session_.stageLater(); }
+
+    /// What git tracks below some folders and the project does not have. @param folders absolute.
+    std::vector<Path> trackedOutsideProject(std::vector<Path> const& folders) {
+        return session_.trackedOutsideProject(folders);
+    }
+
 private:
-    Path root_;
-    std::shared_ptr<WriteShield> shield_; ///< before the store: it goes last, when all is written
-    project::stores::TextBackend* text_;  ///< the store's
-    std::shared_ptr<project::stores::TreeMetadataManager> store_;
-    std::unique_ptr<project::management::ProjectManagerBase> manager_;
+    using Session = project::session::Session;
+
+    explicit OpenProject(Session session);
+
+    std::shared_ptr<WriteShield> shield_; ///< before the session: it goes last, when all is written
+    Session session_;
 };
 
 } // namespace projectctl

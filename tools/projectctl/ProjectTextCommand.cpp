@@ -4,8 +4,8 @@
 #include "CommandLine.hpp"
 #include "Commands.hpp"
 #include "NameForms.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
+#include "ProjectCommand.hpp"
 
 namespace projectctl {
 
@@ -15,7 +15,7 @@ using project::management::ProjectManager;
 
 /// Shows or sets one of the two texts that a project has of its own. Texts are bytes to the tool, as names of
 /// files are, and come out as they went in.
-class ProjectTextCommand : public Command {
+class ProjectTextCommand : public ProjectCommand {
 public:
     using Getter = std::u16string (ProjectManager::*)() const;
     using Setter = void (ProjectManager::*)(std::u16string const&);
@@ -29,8 +29,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         if (text_) {
             (project.manager().*set_)(textOf(*text_));
         } else {

@@ -1,15 +1,16 @@
 #include "Commands.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
 #include "PathArguments.hpp"
 #include "Progress.hpp"
+#include "ProjectCommand.hpp"
+#include "ProjectFolder.hpp"
 
 namespace projectctl {
 
 namespace {
 
 /// Takes files and folders out of the project, all in one step, and leaves the disk alone.
-class RemoveCommand : public Command {
+class RemoveCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
@@ -20,9 +21,12 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const paths = paths_.read();
+        for (auto const& path : project.trackedOutsideProject(paths)) {
+            printError("warning: git no longer tracks \"" + shown(path) +
+                       "\", which is below a removed folder and was never in the project");
+        }
         Progress const progress("Removing " + std::to_string(paths.size()) + " files and folders");
         auto const removed = project.files().remove(paths);
         output().say(std::to_string(removed.size()) + " removed from the project");

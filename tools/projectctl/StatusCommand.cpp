@@ -6,9 +6,9 @@
 #include "GitIgnore.hpp"
 #include "JsonRows.hpp"
 #include "NameForms.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
 #include "Progress.hpp"
+#include "ProjectCommand.hpp"
 #include "StatusScan.hpp"
 #include "checks/Problems.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
@@ -18,7 +18,7 @@ namespace projectctl {
 namespace {
 
 /// Tells in what the project and the disk differ.
-class StatusCommand : public Command {
+class StatusCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
@@ -30,8 +30,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         root_ = project.root();
         project.warnOfDamage();
         auto const scan = compare(project);

@@ -1,24 +1,27 @@
 #include "Commands.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
+#include "ProjectCommand.hpp"
 
 namespace projectctl {
 
 namespace {
 
 /// Writes the project's text in its one canonical form, so that a commit holds nothing but what changed.
-class TidyCommand : public Command {
+class TidyCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         return tool.add_subcommand(
             "tidy", "Bring the project's text into its canonical form, to be done before it is committed");
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         project.shield().raise();
-        output().say(project.text().tidy() ? "The project's text is tidy now."
-                                           : "The project's text is tidy.");
+        if (project.text().tidy()) {
+            project.stageLater();
+            output().say("The project's text is tidy now.");
+        } else {
+            output().say("The project's text is tidy.");
+        }
         return 0;
     }
 };

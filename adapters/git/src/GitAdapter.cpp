@@ -3,6 +3,7 @@
 #include "RepositoryFinder.hpp"
 #include "Staging.hpp"
 #include "StateQuery.hpp"
+#include "TrackedFiles.hpp"
 
 namespace project::git {
 
@@ -41,6 +42,28 @@ std::map<fl::filesystem::Path, cmlink::FileState> GitAdapter::getFileStates(std:
     StateQuery query(*repository);
     for (auto const& file : files) {
         result.try_emplace(file, query.stateOf(file));
+    }
+    return result;
+}
+
+std::set<fl::filesystem::Path> GitAdapter::trackedBelow(std::vector<Path> const& folders) {
+    std::set<Path> result;
+    auto* const repository = folders.empty() ? nullptr : finder_->find();
+    if (repository == nullptr) {
+        return result;
+    }
+    auto* const index = repository->index();
+    for (auto const& folder : folders) {
+        auto const path = repository->workTree().relative(folder);
+        auto position = path ? firstBelow(index, *path) : git_index_entrycount(index);
+        for (; position < git_index_entrycount(index); ++position) {
+            std::string const entry = git_index_get_byindex(index, position)->path;
+            if (!isBelow(entry.c_str(), *path)) {
+                break;
+            }
+            result.insert(folder /
+                          fl::filesystem::fromSystem(entry.substr(path->empty() ? 0 : path->size() + 1)));
+        }
     }
     return result;
 }

@@ -10,9 +10,9 @@
 #include "Failure.hpp"
 #include "JsonRows.hpp"
 #include "NameForms.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
 #include "PathArguments.hpp"
+#include "ProjectCommand.hpp"
 #include "ProjectFolder.hpp"
 #include "entrypoints/Groups.hpp"
 #include "project/entrypoints/EntryPoint.hpp"
@@ -45,7 +45,7 @@ void requireNoBackslash(Path const& root, Path const& file) {
 }
 
 /// Makes a file an entry point, or changes the entry point that it is.
-class SetEntryCommand : public Command {
+class SetEntryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand(
@@ -64,8 +64,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const file = absolutePath(*file_);
         requireNoBackslash(project.root(), file);
         auto const guard = project.store().acquireWriteLock();
@@ -149,7 +148,7 @@ private:
     JsonRows rows_;
 };
 
-class ListEntriesCommand : public Command {
+class ListEntriesCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app =
@@ -158,8 +157,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         project.warnOfDamage();
         auto entries = project.manager().getEntryPointManager().getEntryPoints();
         std::stable_sort(entries.begin(), entries.end(), [](auto const& left, auto const& right) {
@@ -190,7 +188,7 @@ private:
     bool json_ = false;
 };
 
-class ShowEntryCommand : public Command {
+class ShowEntryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("show", "Show all that is kept of the entry point of a file");
@@ -199,8 +197,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const file = absolutePath(*file_);
         project.warnOfDamage();
         auto const guard = project.store().acquireReadLock();
@@ -247,7 +244,7 @@ private:
     bool json_ = false;
 };
 
-class RemoveEntryCommand : public Command {
+class RemoveEntryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app =
@@ -256,8 +253,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const files = paths_.read();
         auto const guard = project.store().acquireWriteLock();
         for (auto const& file : files) { // all of them, before the first is changed

@@ -7,8 +7,8 @@
 #include "Failure.hpp"
 #include "JsonRows.hpp"
 #include "NameForms.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
+#include "ProjectCommand.hpp"
 #include "entrypoints/Groups.hpp"
 
 namespace projectctl {
@@ -17,7 +17,7 @@ namespace {
 
 using project::management::EntryPointGroupDefinition;
 
-class CreateGroupCommand : public Command {
+class CreateGroupCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("create", "Make a group of entry points");
@@ -25,8 +25,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         EntryPointGroupDefinition const group(textOf(*name_));
         project.manager().getEntryPointManager().createEntryPointGroup(group);
         return 0;
@@ -36,7 +35,7 @@ private:
     std::optional<std::string> name_;
 };
 
-class ListGroupsCommand : public Command {
+class ListGroupsCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("list", "List the groups, the default group first");
@@ -44,8 +43,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         project.warnOfDamage();
         Groups const groups(project.manager().getEntryPointManager());
         JsonRows rows;
@@ -70,7 +68,7 @@ private:
     bool json_ = false;
 };
 
-class RenameGroupCommand : public Command {
+class RenameGroupCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("rename", "Give a group another name");
@@ -79,8 +77,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const guard = project.store().acquireWriteLock();
         auto& entryPoints = project.manager().getEntryPointManager();
         entryPoints.renameEntryPointGroup(Groups(entryPoints).named(*group_), textOf(*name_));
@@ -92,7 +89,7 @@ private:
     std::optional<std::string> name_;
 };
 
-class DeleteGroupCommand : public Command {
+class DeleteGroupCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand(
@@ -102,8 +99,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const guard = project.store().acquireWriteLock();
         auto& entryPoints = project.manager().getEntryPointManager();
         Groups const groups(entryPoints);

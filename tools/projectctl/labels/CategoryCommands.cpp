@@ -7,9 +7,9 @@
 #include "Commands.hpp"
 #include "JsonRows.hpp"
 #include "NameForms.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
 #include "Progress.hpp"
+#include "ProjectCommand.hpp"
 #include "labels/LabelNames.hpp"
 
 namespace projectctl {
@@ -19,7 +19,7 @@ namespace {
 using project::management::CategoryDefinition;
 using project::management::CategoryIdentifier;
 
-class CreateCategoryCommand : public Command {
+class CreateCategoryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("create", "Make a category of labels");
@@ -30,8 +30,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         CategoryDefinition category(textOf(*name_));
         category.setIsReadOnly(readOnly_).setIsSingleValued(singleValued_);
         if (type_) {
@@ -48,7 +47,7 @@ private:
     bool singleValued_ = false;
 };
 
-class ListCategoriesCommand : public Command {
+class ListCategoriesCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("list", "List the project's categories");
@@ -56,8 +55,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         project.warnOfDamage();
         auto categories = project.manager().getLabelManager().getAllCategories();
         std::ranges::stable_sort(categories, {}, &CategoryIdentifier::getName);
@@ -111,7 +109,7 @@ private:
     bool json_ = false;
 };
 
-class RenameCategoryCommand : public Command {
+class RenameCategoryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("rename", "Give a category another name");
@@ -120,8 +118,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const guard = project.store().acquireWriteLock();
         auto& labels = project.manager().getLabelManager();
         labels.renameCategory(LabelNames(labels).category(*category_), textOf(*name_));
@@ -144,7 +141,7 @@ private:
     std::optional<std::string> name_;
 };
 
-class DeleteCategoryCommand : public Command {
+class DeleteCategoryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app =
@@ -153,8 +150,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const guard = project.store().acquireWriteLock();
         auto& labels = project.manager().getLabelManager();
         Progress const progress("Taking its labels off all files");

@@ -6,10 +6,10 @@
 #include "FileList.hpp"
 #include "JsonRows.hpp"
 #include "NameForms.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
 #include "PathArguments.hpp"
 #include "Progress.hpp"
+#include "ProjectCommand.hpp"
 #include "Schema.hpp"
 #include "labels/LabelCommands.hpp"
 #include "labels/LabelNames.hpp"
@@ -39,10 +39,9 @@ std::size_t countOn(FileManager& files, Path const& path, Label const& label) {
 }
 
 /// What putting a label on files and taking it off have in common: the label and the files.
-class FileLabelCommand : public Command {
+class FileLabelCommand : public ProjectCommand {
 public:
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const paths = paths_.read();
         Progress const progress("Labelling " + std::to_string(paths.size()) + " files and folders");
         auto const guard = project.store().acquireWriteLock();
@@ -130,7 +129,7 @@ private:
 };
 
 /// Shows the labels on files, each label once, with its data if it has any.
-class ShowLabelsCommand : public Command {
+class ShowLabelsCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("show", "Show the labels on files and folders of the project");
@@ -139,8 +138,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const paths = paths_.read();
         project.warnOfDamage();
         auto const guard = project.store().acquireReadLock();
@@ -209,7 +207,7 @@ private:
 };
 
 /// Lists the files that bear a label, or any label of a category.
-class FindLabelCommand : public Command {
+class FindLabelCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand(
@@ -222,8 +220,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         project.warnOfDamage();
         FileList const list(project);
         LabelNames names(project.manager().getLabelManager());

@@ -9,9 +9,9 @@
 #include "Commands.hpp"
 #include "JsonRows.hpp"
 #include "NameForms.hpp"
-#include "OpenProject.hpp"
 #include "Output.hpp"
 #include "Progress.hpp"
+#include "ProjectCommand.hpp"
 #include "labels/LabelNames.hpp"
 
 namespace projectctl {
@@ -23,7 +23,7 @@ using project::management::LabelDefinition;
 using project::management::LabelIdentifier;
 using project::management::LabelReadOnlyState;
 
-class CreateLabelCommand : public Command {
+class CreateLabelCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("create", "Make a label in a category");
@@ -35,8 +35,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const guard = project.store().acquireWriteLock();
         auto& labels = project.manager().getLabelManager();
         LabelDefinition label(textOf(*name_));
@@ -54,7 +53,7 @@ private:
     bool writable_ = false;
 };
 
-class ListLabelsCommand : public Command {
+class ListLabelsCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("list", "List the labels of all categories, or of one");
@@ -63,8 +62,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         project.warnOfDamage();
         auto const guard = project.store().acquireReadLock();
         auto& labels = project.manager().getLabelManager();
@@ -113,7 +111,7 @@ private:
     bool json_ = false;
 };
 
-class DeleteLabelCommand : public Command {
+class DeleteLabelCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("delete", "Delete a label, also from all files");
@@ -122,8 +120,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const guard = project.store().acquireWriteLock();
         auto& labels = project.manager().getLabelManager();
         Progress const progress("Taking the label off all files");

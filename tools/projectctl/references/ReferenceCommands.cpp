@@ -12,6 +12,7 @@
 #include "JsonRows.hpp"
 #include "NameForms.hpp"
 #include "Output.hpp"
+#include "ProjectCommand.hpp"
 #include "ProjectFolder.hpp"
 #include "Schema.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
@@ -34,7 +35,7 @@ std::vector<Path> absolutePaths(std::vector<std::string> const& arguments) {
     return result;
 }
 
-class AddReferencesCommand : public Command {
+class AddReferencesCommand : public ProjectCommand {
 public:
     explicit AddReferencesCommand(ReferenceList const& list) : list_(list) {}
 
@@ -48,8 +49,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         std::vector<FolderReference> references;
         for (auto const& folder : absolutePaths(arguments_)) {
             if (!project::metadata::is_directory(folder)) {
@@ -80,7 +80,7 @@ private:
     bool absolute_ = false;
 };
 
-class ListReferencesCommand : public Command {
+class ListReferencesCommand : public ProjectCommand {
 public:
     explicit ListReferencesCommand(ReferenceList const& list) : list_(list) {}
 
@@ -93,8 +93,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         project.warnOfDamage();
         auto references = list_.manager(project).getReferences();
         std::ranges::stable_sort(references, std::less<>(), &FolderReference::getLocation);
@@ -123,7 +122,7 @@ private:
     bool json_ = false;
 };
 
-class RemoveReferencesCommand : public Command {
+class RemoveReferencesCommand : public ProjectCommand {
 public:
     explicit RemoveReferencesCommand(ReferenceList const& list) : list_(list) {}
 
@@ -134,8 +133,7 @@ public:
         return app;
     }
 
-    int run() override {
-        auto project = OpenProject::ofWorkingFolder();
+    int run(OpenProject& project) override {
         auto const guard = project.store().acquireWriteLock();
         auto const present = list_.manager(project).getReferences();
         std::vector<FolderReference> removed;

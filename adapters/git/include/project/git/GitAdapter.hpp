@@ -2,6 +2,7 @@
 
 #include <map>
 #include <memory>
+#include <set>
 #include <vector>
 
 #include "cmlink/CMAdapter.hpp"
@@ -74,6 +75,10 @@ public:
     /// once, without a look at the repository.
     /// @param files absolute paths; "." and ".." are taken as text.
     std::map<Path, cmlink::FileState> getFileStates(std::vector<Path> const& files) override;
+
+    /// The files in the index below some folders, which removeFromSourceControl would take out of it.
+    /// @param folders absolute. @return each folder's path with the file's behind it, sorted.
+    std::set<Path> trackedBelow(std::vector<Path> const& folders);
 
 private:
     std::unique_ptr<RepositoryFinder> finder_;

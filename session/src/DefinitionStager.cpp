@@ -1,0 +1,65 @@
+#include "DefinitionStager.hpp"
+
+#include <atomic>
+#include <utility>
+
+#include "project/metadata/FileChangeRequestListener.hpp"
+
+namespace project::session {
+
+using cmlink::LocalStatus;
+
+/// Notices every write of the store; which files came or went with it is of no interest here.
+class DefinitionStager::WriteWatch : public metadata::FileChangeRequestListener {
+public:
+    void fileRemovalRequested(metadata::MetadataManager& /*store*/, Path const& /*metadataRoot*/,
+                              std::vector<Path> const& /*files*/) override {
+        hasWritten = true;
+    }
+
+    void fileAdditionRequested(metadata::MetadataManager& /*store*/,
+                               std::vector<Path> const& /*files*/) override {
+        hasWritten = true;
+    }
+
+    bool acceptsFileChangeRequests() override { return true; }
+
+    std::atomic<bool> hasWritten = false;
+};
+
+namespace {
+
+bool isTracked(LocalStatus status) {
+    return status == LocalStatus::Unmodified || status == LocalStatus::Modified ||
+           status == LocalStatus::Added || status == LocalStatus::Renamed;
+}
+
+} // namespace
+
+DefinitionStager::DefinitionStager(metadata::MetadataManager& store, cmlink::CMAdapter& adapter, Path text)
+    : store_(store), adapter_(adapter), text_(std::move(text)), watch_(std::make_shared<WriteWatch>()) {
+    store_.subscribe(watch_);
+}
+
+void DefinitionStager::stageIfWritten() {
+    if (!isDue()) {
+        return;
+    }
+    auto const guard = store_.acquireWriteLock();
+    auto const states = adapter_.getFileStates({text_});
+    auto const found = states.find(text_);
+    if (found != states.end() && isTracked(found->second.getState())) {
+        adapter_.addToSourceControl({text_});
+    }
+    watch_->hasWritten = false; // not before: what failed is to be tried again
+}
+
+void DefinitionStager::noteWritten() noexcept {
+    watch_->hasWritten = true;
+}
+
+bool DefinitionStager::isDue() const noexcept {
+    return watch_->hasWritten;
+}
+
+} // namespace project::session

@@ -1,0 +1,172 @@
+#include "ToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+using ::testing::AllOf;
+using ::testing::HasSubstr;
+
+/// A folder in a git repository.
+class InRepository : public ToolTest {
+protected:
+    void SetUp() override {
+        git({"init", "-q", "."});
+        folder_.file(u"src/io/pump.cpp");
+        folder_.file(u"src/main.cpp");
+    }
+
+    std::string git(std::vector<std::string> arguments) const {
+        arguments.insert(arguments.begin(),
+                         {"git", "-c", "user.name=Ada", "-c", "user.email=ada@example.org"});
+        ProgramSettings settings;
+        settings.folder = folder_.onDisk();
+        auto const result = runProgram(arguments, settings);
+        EXPECT_EQ(result.exitCode, 0) << result.errors;
+        return result.output;
+    }
+
+    void commitAll() const {
+        git({"add", "--all"});
+        git({"commit", "-q", "-m", "all"});
+    }
+
+    std::string status() const { return git({"status", "--porcelain", "--untracked-files=all"}); }
+
+    std::string staged() const { return git({"show", ":.projectdata/project.jsonl"}); }
+
+    static constexpr char const* storeAdded =
+        "A  .projectdata/.gitattributes\nA  .projectdata/.gitignore\nA  .projectdata/project.jsonl\n";
+};
+
+TEST_F(InRepository, initStagesTheProjectsFiles) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+
+    EXPECT_EQ(status(), std::string(storeAdded) + "?? src/io/pump.cpp\n?? src/main.cpp\n");
+    EXPECT_EQ(staged(), readText());
+}
+
+TEST_F(InRepository, addStagesTheFilesAndTheirEntries) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
+
+    EXPECT_EQ(status(), std::string(storeAdded) + "A  src/io/pump.cpp\nA  src/main.cpp\n");
+    EXPECT_EQ(staged(), readText());
+}
+
+TEST_F(InRepository, removeTakesTheFilesOutOfTheIndexAndLeavesThemOnDisk) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
+    commitAll();
+
+    ASSERT_THAT(tool({"remove", "src/io"}), SucceedsSilently());
+
+    EXPECT_EQ(status(), "M  .projectdata/project.jsonl\nD  src/io/pump.cpp\n?? src/io/pump.cpp\n");
+    EXPECT_EQ(staged(), readText());
+}
+
+TEST_F(InRepository, removeNamesWhatGitTrackedAndTheProjectNeverHad) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
+    commitAll();
+
+    auto const removed = tool({"remove", "src"});
+
+    EXPECT_EQ(removed.exitCode, 0);
+    EXPECT_EQ(removed.errors, "projectctl: warning: git no longer tracks \"" + inFolder("src/io/pump.cpp") +
+                                  "\", which is below a removed folder and was never in the project\n");
+    EXPECT_THAT(status(), HasSubstr("D  src/io/pump.cpp\n"));
+}
+
+TEST_F(InRepository, everyOtherChangeStagesTheTextAlone) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
+    commitAll();
+
+    for (auto const& command :
+         std::vector<std::vector<std::string>>{{"name", "Engine"},
+                                               {"category", "create", "Status"},
+                                               {"label", "create", "Status", "Done"},
+                                               {"label", "put", "Status", "Done", "src/main.cpp"},
+                                               {"entry", "set", "src/main.cpp"},
+                                               {"group", "create", "Nightly"},
+                                               {"path", "add", "src"},
+                                               {"reference", "add", "."}}) {
+        ASSERT_THAT(tool(command), SucceedsSilently());
+        EXPECT_EQ(status(), "M  .projectdata/project.jsonl\n") << ::testing::PrintToString(command);
+        EXPECT_EQ(staged(), readText());
+    }
+}
+
+TEST_F(InRepository, tidyStagesTheTidyText) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
+    commitAll();
+    auto const tidied = readText();
+    insertLineBefore("\"src/main.cpp\"", "\"zebra\"");
+
+    ASSERT_THAT(tool({"tidy"}), SucceedsSilently());
+
+    EXPECT_NE(readText(), tidied);
+    EXPECT_EQ(staged(), readText());
+}
+
+TEST_F(InRepository, queriesStageNothing) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    commitAll();
+    insertLineBefore("{\"at\":[\"Info\"", "\"src\"");
+    auto const before = status();
+
+    for (auto const& command : std::vector<std::vector<std::string>>{
+             {"list"}, {"status"}, {"check"}, {"name"}, {"label", "list"}}) {
+        tool(command);
+    }
+
+    EXPECT_EQ(before, " M .projectdata/project.jsonl\n");
+    EXPECT_EQ(status(), before);
+}
+
+TEST_F(InRepository, leavesGitAloneWhenToldSo) {
+    ASSERT_THAT(tool({"init", "--no-source-control"}), SucceedsSilently());
+    ASSERT_THAT(tool({"--no-source-control", "add", "-r", "."}), SucceedsSilently());
+    EXPECT_THAT(status(), ::testing::Not(HasSubstr("A ")));
+    commitAll();
+
+    EXPECT_THAT(tool({"remove", "src", "--no-source-control"}), SucceedsSilently());
+
+    EXPECT_EQ(status(), " M .projectdata/project.jsonl\n");
+}
+
+TEST_F(InRepository, changesNothingWhenTheIndexIsLocked) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    auto const before = readText();
+    folder_.addFile(".git/index.lock");
+
+    EXPECT_THAT(tool({"add", "src/main.cpp"}), FailsWith(1, inFolder(".git/index.lock")));
+
+    EXPECT_EQ(readText(), before);
+    std::filesystem::remove(inFolder(".git/index.lock"));
+    EXPECT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
+}
+
+TEST_F(InRepository, doesNotAddWhatGitIgnoresToItsIndex) {
+    folder_.file(u".gitignore", "*.cpp\n");
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+
+    ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
+
+    EXPECT_THAT(list(), ::testing::ElementsAre("src", "src/main.cpp"));
+    EXPECT_EQ(status(), std::string(storeAdded) + "?? .gitignore\n");
+}
+
+TEST_F(InRepository, takesTheRepositoryThatTheEnvironmentNames) {
+    std::filesystem::rename(inFolder(".git"), inFolder("elsewhere.git"));
+    settings_.environment["GIT_DIR"] = inFolder("elsewhere.git");
+    settings_.environment["GIT_WORK_TREE"] = folder_.onDisk().string();
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+
+    EXPECT_THAT(git({"--git-dir=elsewhere.git", "--work-tree=.", "status", "--porcelain", "-uno"}),
+                ::testing::Eq(storeAdded));
+}
+
+} // namespace
+} // namespace project::test

@@ -1,0 +1,10 @@
+#include "Settings.hpp"
+
+namespace projectctl {
+
+Settings& settings() {
+    static Settings chosen;
+    return chosen;
+}
+
+} // namespace projectctl
