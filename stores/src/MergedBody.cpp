@@ -8,6 +8,7 @@
 #include "LineParser.hpp"
 #include "NodeLine.hpp"
 #include "NodeMerge.hpp"
+#include "NodeReduction.hpp"
 
 namespace project::stores {
 
@@ -98,14 +99,16 @@ private:
     LineAddress address_{LineAddress::Form::Steps, {}};
 };
 
-/// The addresses in some lines of one body that other lines of the base don't have, or have otherwise.
+/// The addresses in some lines of a body at which something was added to what stands in the base, or changed.
 std::vector<Address> changedLines(TextBody const& base, TextBody::Range before, TextBody const& body,
                                   TextBody::Range lines) {
     std::vector<Address> changed;
     for (std::size_t i = lines.begin; i < lines.end; ++i) {
         LineAddress const address = body.address(i);
         before.begin = base.lowerBound(before, address);
-        if (before.empty() || base.line(before.begin) != body.line(i)) {
+        bool const stood = !before.empty() && std::is_eq(compare(base.address(before.begin), address));
+        Line const old = stood ? Line(base.line(before.begin)) : std::nullopt;
+        if (old != body.line(i) && !isReductionOf(standingOf(body.line(i)), standingOf(old))) {
             changed.push_back(toAddress(address));
         }
     }

@@ -9,6 +9,7 @@
 
 #include "NestedIdentity.hpp"
 #include "NodeCopy.hpp"
+#include "NodeReduction.hpp"
 #include "Siblings.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 
@@ -169,7 +170,7 @@ private:
             putKeys(draft, present);
             return draft.children.empty() ? std::nullopt : std::optional(std::move(draft));
         }
-        if (isEqual(*nodes.base, present)) {
+        if (isReductionOf(present, *nodes.base)) {
             return std::nullopt;
         }
         MergeConflict conflict = conflictOf(MergeConflict::Kind::Nested);
@@ -205,9 +206,13 @@ Standing mergeStandings(Address const& address, ThreeWay<Standing> const& standi
     if (!base.node && ours && theirs) { // one side made the address, the other put a node there
         return ours.node ? ours : theirs;
     }
-    MergeConflict conflict{MergeConflict::Kind::Subtree,        address,  {}, {}, std::nullopt, {},
-                           {base.node, ours.node, theirs.node}, {address}};
-    conflict.removedBy = ours.node ? MergeSide::Theirs : MergeSide::Ours;
+    bool const byOurs = !ours || (theirs && !ours.node);
+    if (isReductionOf(byOurs ? theirs : ours, base)) {
+        return byOurs ? ours : theirs;
+    }
+    MergeConflict conflict{MergeConflict::Kind::Subtree, address, {}, {}, std::nullopt, {}, {}, {address}};
+    conflict.removedBy = byOurs ? MergeSide::Ours : MergeSide::Theirs;
+    conflict.nodes = {base.node, ours.node, theirs.node};
     return standings.of(decide(std::move(conflict)));
 }
 

@@ -58,8 +58,18 @@ private:
 
     bool hasChangedWithin(Tree const& tree, Address const& address) const {
         return std::any_of(tree.begin(), tree.end(), [&](auto const& entry) {
-            return entry.first.isWithin(address) && at(base_, entry.first) != Place(entry.second);
+            return entry.first.isWithin(address) && !isReduction(entry.second, at(base_, entry.first));
         });
+    }
+
+    static bool isReduction(Place const& place, Place const& from) {
+        if (!place || !from) {
+            return !place;
+        }
+        if (!*place || !*from) {
+            return !*place;
+        }
+        return std::includes((*from)->begin(), (*from)->end(), (*place)->begin(), (*place)->end());
     }
 
     void mergeAt(Address const& address) {
@@ -90,7 +100,12 @@ private:
         } else if (ours && theirs && (!base || !*base)) {
             put(address, *ours ? ours : theirs);
         } else {
-            conflicts_.insert(address);
+            bool const oursLess = !ours || (theirs && !*ours);
+            if (isReduction(oursLess ? theirs : ours, base)) {
+                put(address, oursLess ? ours : theirs);
+            } else {
+                conflicts_.insert(address);
+            }
         }
     }
 

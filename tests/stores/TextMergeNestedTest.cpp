@@ -90,6 +90,21 @@ TEST(TextMergeNested, aNestedNodeThatSaysMoreThanWhatItIsGoesAsAWhole) {
     EXPECT_EQ(merged(base, file({}), base), file({}));
 }
 
+TEST(TextMergeNested, aFileThatOneSideRemovedAndTheOtherTookALabelOffIsGone) {
+    std::string const base =
+        file({category(u"c", {label(u"1"), label(u"2")}), category(u"d", {label(u"3")})});
+    std::string const less = file({category(u"c", {label(u"2")})});
+    std::string const more = file({category(u"c", {label(u"2"), label(u"4")})});
+    EXPECT_EQ(merged(base, textWith({}), less), textWith({}));
+    EXPECT_EQ(merged(base, less, textWith({})), textWith({}));
+    EXPECT_EQ(merged(base, more, textWith({})), "Subtree at a, removed by theirs, changed a");
+}
+
+TEST(TextMergeNested, aNestedNodeThatOneSideRemovedAndTheOtherTookSomethingFromIsGone) {
+    std::string const base = file({label(u"1", {{u"k", u"1"}, {u"l", u"1"}})});
+    EXPECT_EQ(merged(base, file({}), file({label(u"1", {{u"k", u"1"}})})), file({}));
+}
+
 TEST(TextMergeNested, nestedKeysAreMergedOneByOne) {
     std::string const base = file({category(u"c", {label(u"1", {{u"k", u"1"}, {u"l", u"1"}})})});
     std::string const ours = file({category(u"c", {label(u"1", {{u"k", u"2"}, {u"l", u"1"}})})});

@@ -158,6 +158,18 @@ TEST(TextMerge, aFolderThatOneSideRemovedAndTheOtherRemovedFromIsGone) {
     EXPECT_EQ(merged(base, less, bodyOf({R"("b")"})), bodyOf({R"("b")"}));
 }
 
+TEST(TextMerge, aNodeThatOneSideRemovedAndTheOtherTookSomethingFromIsGone) {
+    std::string const base = bodyOf({R"("a")", R"({"file":"a/x","keys":{"k":"1","l":"1"}})"});
+    std::string const less = bodyOf({R"("a")", R"({"file":"a/x","keys":{"k":"1"}})"});
+    std::string const bare = bodyOf({R"("a")", R"({"file":"a/x","node":false})"});
+    for (std::string const& other : {less, bare}) {
+        EXPECT_EQ(merged(base, bodyOf({R"("a")"}), other), bodyOf({R"("a")"}));
+        EXPECT_EQ(merged(base, other, bodyOf({})), bodyOf({}));
+    }
+    std::string const swapped = bodyOf({R"("a")", R"({"file":"a/x","keys":{"l":"2"}})"});
+    EXPECT_EQ(merged(base, bodyOf({R"("a")"}), swapped), "Subtree at a/x, removed by ours, changed a/x");
+}
+
 TEST(TextMerge, aPlaceThatNothingStoodAtIsNeverRemoved) {
     std::string const base = bodyOf({R"({"at":["Categories","Root","Category","c"]})"});
     std::string const other = bodyOf(
