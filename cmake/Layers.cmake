@@ -31,7 +31,8 @@ function(project_add_layer name)
   add_library(project_${name} SHARED "$<TARGET_OBJECTS:project_${name}_compiled>")
   add_library(project::${name} ALIAS project_${name})
   set_target_properties(project_${name} PROPERTIES
-    EXPORT_NAME ${name} LINKER_LANGUAGE CXX VERSION ${PROJECT_VERSION} SOVERSION ${PROJECT_VERSION_MAJOR})
+    EXPORT_NAME ${name} LINKER_LANGUAGE CXX VERSION ${PROJECT_VERSION} SOVERSION ${PROJECT_VERSION_MAJOR}
+    INSTALL_RPATH "$ORIGIN") # installed libraries find each other wherever that is
   target_include_directories(project_${name}
     PUBLIC "$<BUILD_INTERFACE:${include_root}>" "$<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>")
   target_link_libraries(project_${name} PUBLIC ${layer_DEPENDS})

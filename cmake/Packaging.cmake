@@ -3,11 +3,11 @@
 include(CMakePackageConfigHelpers)
 
 set(package_folder "${CMAKE_INSTALL_LIBDIR}/cmake/project_management")
-install(TARGETS project_platform project_metadata project_management project_stores project_git
+install(TARGETS project_platform project_metadata project_management project_stores project_git project_session
   EXPORT project_management LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}")
 install(EXPORT project_management NAMESPACE project:: DESTINATION "${package_folder}"
   FILE project_managementTargets.cmake)
-install(DIRECTORY platform/include/ include/ stores/include/ adapters/git/include/
+install(DIRECTORY platform/include/ include/ stores/include/ adapters/git/include/ session/include/
   DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
 
 configure_package_config_file(packaging/project_managementConfig.cmake.in

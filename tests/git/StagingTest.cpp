@@ -40,6 +40,24 @@ TEST_F(Staging, aFolderAloneLeavesTheIndexUnwritten) {
     EXPECT_FALSE(std::filesystem::exists(repository.indexFile()));
 }
 
+TEST_F(Staging, whatIsTrackedBelowFoldersIsListedByTheirPaths) {
+    for (auto const* name : {"d/a", "d/e/b", "d2/c", "f", "g/\xFF"}) {
+        repository.write(name);
+    }
+    repository.commitAll();
+    repository.write("d/untracked");
+    repository.remove("d/e/b");
+    auto const below = [this](std::vector<std::string> const& names) {
+        auto const found = adapter.trackedBelow(repository.paths(names));
+        return std::vector<Path>(found.begin(), found.end());
+    };
+
+    EXPECT_EQ(below({"d", "f", "nowhere"}), repository.paths({"d/a", "d/e/b"}));
+    EXPECT_EQ(below({"g", "d2", "d2"}), repository.paths({"d2/c", "g/\xFF"}));
+    EXPECT_EQ(adapter.trackedBelow({repository.root()}).size(), 5u);
+    EXPECT_TRUE(adapter.trackedBelow({folder.root(), folder.path(u"elsewhere")}).empty());
+}
+
 TEST_F(Staging, whatCannotBeStagedIsPassedOver) {
     repository.write("a");
     repository.write("real/x");
