@@ -1,5 +1,9 @@
 #include "Siblings.hpp"
 
+#include <map>
+#include <string>
+#include <utility>
+
 #include "NestedIdentity.hpp"
 
 namespace project::stores {
@@ -11,35 +15,35 @@ namespace {
 /// The identity, and how many of the same come before.
 using Place = std::pair<std::string, std::size_t>;
 
-std::vector<Place> placesOf(MetadataNode const* parent) {
-    std::vector<Place> places;
+struct Placed {
+    Place place;
+    MetadataNode const* node;
+};
+
+std::vector<Placed> placed(MetadataNode const* parent) {
+    std::vector<Placed> nodes;
     if (parent == nullptr) {
-        return places;
+        return nodes;
     }
     std::map<std::string, std::size_t> counts;
-    places.reserve(parent->getChildren().size());
+    nodes.reserve(parent->getChildren().size());
     for (auto const& child : parent->getChildren()) {
         std::string identity = identityOf(*child);
         std::size_t const earlier = counts[identity]++;
-        places.emplace_back(std::move(identity), earlier);
+        nodes.push_back({{std::move(identity), earlier}, child.get()});
     }
-    return places;
+    return nodes;
 }
 
 } // namespace
 
 Siblings::Siblings(Versions const& parents) {
-    constexpr MetadataNode const* Versions::*members[] = {&Versions::base, &Versions::ours,
-                                                          &Versions::theirs};
-    constexpr Ranks ThreeWay<Ranks>::*orders[] = {&ThreeWay<Ranks>::base, &ThreeWay<Ranks>::ours,
-                                                  &ThreeWay<Ranks>::theirs};
-    std::vector<std::vector<Place>> places;
-    places.reserve(std::size(members));
+    ThreeWay<std::vector<Placed>> const nodes{placed(parents.base), placed(parents.ours),
+                                              placed(parents.theirs)};
     std::map<Place, std::size_t> ranks;
-    for (auto const member : members) {
-        places.push_back(placesOf(parents.*member));
-        for (Place const& place : places.back()) {
-            ranks.emplace(place, 0);
+    for (auto const* const version : {&nodes.base, &nodes.ours, &nodes.theirs}) {
+        for (Placed const& one : *version) {
+            ranks.emplace(one.place, 0);
         }
     }
     earlier_.reserve(ranks.size());
@@ -48,13 +52,17 @@ Siblings::Siblings(Versions const& parents) {
         earlier_.push_back(place.second);
     }
     byRank_.resize(ranks.size());
-    for (std::size_t version = 0; version < places.size(); ++version) {
-        for (std::size_t i = 0; i < places[version].size(); ++i) {
-            std::size_t const rank = ranks.at(places[version][i]);
-            byRank_[rank].*members[version] = (parents.*members[version])->getChildren()[i].get();
-            (order_.*orders[version]).push_back(rank);
+    auto const enter = [&](std::vector<Placed> const& version, MetadataNode const* Versions::*which,
+                           Ranks& order) {
+        order.reserve(version.size());
+        for (Placed const& one : version) {
+            order.push_back(ranks.at(one.place));
+            byRank_[order.back()].*which = one.node;
         }
-    }
+    };
+    enter(nodes.base, &Versions::base, order_.base);
+    enter(nodes.ours, &Versions::ours, order_.ours);
+    enter(nodes.theirs, &Versions::theirs, order_.theirs);
 }
 
 } // namespace project::stores

@@ -1,9 +1,6 @@
 #pragma once
 
 #include <cstddef>
-#include <map>
-#include <string>
-#include <utility>
 #include <vector>
 
 #include "NestedOrder.hpp"
