@@ -36,12 +36,14 @@ std::string fileWith(Labels const& labels) {
     std::map<std::u16string, std::vector<Nested>> byCategory;
     for (auto const& [label, count] : labels) {
         Nested const nested{u"Label", {{u"UUID", label.second}}, {}};
-        for (int i = 0; i < count; ++i) {
-            byCategory[label.first].push_back(nested);
-        }
+        auto& children = byCategory[label.first];
+        children.insert(children.end(), static_cast<std::size_t>(count), nested);
     }
     std::vector<Nested> nested;
     for (auto const& [category, children] : byCategory) {
+        if (children.empty()) {
+            continue;
+        }
         nested.push_back({u"Category", {{u"UUID", category}}, children});
     }
     return textWith({set(fileAddress(u"a"), makeNode(u"Info", {}, nested))});

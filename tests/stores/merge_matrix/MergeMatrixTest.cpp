@@ -161,7 +161,7 @@ protected:
         }
     }
 
-    ProjectOnDisk project;
+    SampleProject project;
     std::string common = project.after({}, makeCommonProject);
 };
 
@@ -226,7 +226,7 @@ protected:
         });
     }
 
-    ProjectOnDisk project;
+    SampleProject project;
 };
 
 TEST_F(MergeOfNewProjects, hasTheFilesOfBoth) {
@@ -259,7 +259,7 @@ TEST_F(MergeOfNewProjects, takesAllChangesOfBothIntoOne) {
 }
 
 TEST(MergeOfLabels, leavesTwoLabelsOfASingleValuedCategoryOnTheFile) {
-    ProjectOnDisk const project;
+    SampleProject const project;
     auto const common = project.after({}, makeCommonProject);
     auto const labelled = [&](std::u16string const& uuid) {
         return project.after(common, [&](ProjectManager& it, TemporaryFolder const& folder) {

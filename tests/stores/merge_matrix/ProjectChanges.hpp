@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "stores/merge_matrix/ProjectOnDisk.hpp"
+#include "stores/merge_matrix/SampleProject.hpp"
 
 namespace project::test {
 

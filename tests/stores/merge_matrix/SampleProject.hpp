@@ -20,11 +20,12 @@ enum class Writing {
     Appending, ///< each batch goes into the tail
 };
 
-/// A project with the managers and the text store that applications use, in a folder of its own. The files
-/// that actions speak of are there, whether or not they are in the project.
-class ProjectOnDisk {
+/// A project with the managers and the text store that applications use. Its files are in a folder of their
+/// own, whether or not they are in the project; its text is on a disk in memory, since a merge asks nothing
+/// of disks and real ones make hundreds of pairs wait.
+class SampleProject {
 public:
-    ProjectOnDisk();
+    SampleProject();
 
     /// The text of the project once somebody has done something in a version of it.
     /// @param text the version; an empty one for a project that is yet to be made.

@@ -1,19 +1,20 @@
-#include "stores/merge_matrix/ProjectOnDisk.hpp"
+#include "stores/merge_matrix/SampleProject.hpp"
 
-#include <fstream>
-#include <iterator>
 #include <memory>
 
 #include "project/core/ProjectManagerBase.hpp"
 #include "project/metadata/ProjectException.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
+#include "support/CrashingDisk.hpp"
 
 namespace project::test {
 
 using stores::TextBackend;
 
 namespace {
+
+constexpr char const* textFile = "project.jsonl";
 
 TextBackend::Options optionsOf(Writing writing) {
     TextBackend::Options options;
@@ -24,14 +25,9 @@ TextBackend::Options optionsOf(Writing writing) {
     return options;
 }
 
-std::string contentOf(std::filesystem::path const& file) {
-    std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
-
 } // namespace
 
-ProjectOnDisk::ProjectOnDisk() {
+SampleProject::SampleProject() {
     for (auto const* const name : {u"main.cpp", u"new.txt", u"src/one.cpp", u"src/two.cpp", u"src/new.cpp",
                                    u"src/sub/deep.cpp", u"doc/guide.md", u"extra/x.txt", u"other.cpp"}) {
         folder_.file(name);
@@ -41,21 +37,21 @@ ProjectOnDisk::ProjectOnDisk() {
     }
 }
 
-std::string ProjectOnDisk::after(std::string const& text, Action const& action, Writing writing) const {
-    folder_.remove(u".projectdata");
-    auto const file = folder_.onDisk() / ".projectdata" / "project.jsonl";
+std::string SampleProject::after(std::string const& text, Action const& action, Writing writing) const {
+    auto const volume = std::make_shared<CrashingVolume>();
     if (!text.empty()) {
-        folder_.addFile(".projectdata/project.jsonl", text);
+        volume->makeFolder();
+        volume->replaceFile(textFile, text);
     }
-    auto backend = std::make_unique<TextBackend>(stores::makeSystemDisk(folder_.root()), optionsOf(writing));
+    auto backend = std::make_unique<TextBackend>(std::make_unique<CrashingDisk>(volume), optionsOf(writing));
     auto const store = std::make_shared<stores::TreeMetadataManager>(std::move(backend),
                                                                      folder_.path(TextBackend::folderName));
     management::ProjectManagerBase project(folder_.root(), store);
     action(project, folder_);
-    return contentOf(file); // before the store is closed, which takes in the tail
+    return volume->content(textFile); // before the store is closed, which takes in the tail
 }
 
-std::optional<std::string> ProjectOnDisk::afterIfAllowed(std::string const& text,
+std::optional<std::string> SampleProject::afterIfAllowed(std::string const& text,
                                                          Action const& action) const {
     try {
         return after(text, action);
