@@ -17,10 +17,11 @@ using fl::filesystem::Path;
 /// How a session treats the git repository that the project lies in. Outside any repository all are alike.
 enum class SourceControl {
     /// What is added is staged and what is removed is taken out of the index, and after each change the
-    /// project's text is staged as it is then. The text is written anew by every change, without a tail,
-    /// which
-    /// takes the longer the larger it is: some 10 ms for each 100,000 files, and the staging several times
-    /// that.
+    /// project's text is staged as it is then. The text is written anew by every change, without a tail.
+    ///
+    /// What that takes grows with the project and with git's index, which is written for the files and again
+    /// for the text: with 100,000 files in both 0.4 s for each change, twice what the git command takes. Who
+    /// makes many changes chooses WhenAsked.
     EachChange,
 
     /// The same, but the text is staged by Session::stage alone.

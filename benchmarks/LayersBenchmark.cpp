@@ -1,0 +1,167 @@
+#include <fstream>
+
+#include <benchmark/benchmark.h>
+
+#include "GeneratedTree.hpp"
+#include "Process.hpp"
+#include "Ratios.hpp"
+#include "project/session.hpp"
+
+// What source control and events cost over the bare managers, in a git repository: adding one file to a
+// project of 100,000, and adding all 100,000.
+
+namespace project::benchmarks {
+namespace {
+
+using fl::filesystem::Path;
+using session::Options;
+using session::Session;
+using session::SourceControl;
+
+/// A repository over the tree with nothing in its index.
+void makeEmptyRepository(GeneratedTree const& tree) {
+    std::filesystem::remove_all(tree.onDisk() / ".git");
+    runSilently(tree.onDisk(), {"git", "init", "-q"});
+}
+
+void removeRepository(GeneratedTree const& tree) {
+    std::filesystem::remove_all(tree.onDisk() / ".git");
+}
+
+void addAllInSession(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    for (auto _ : state) {
+        state.PauseTiming();
+        tree.removeProject();
+        makeEmptyRepository(tree);
+        auto session = Session::make(tree.root(), u"benchmark");
+        state.ResumeTiming();
+        session.project().getFileManager().add(tree.files());
+    }
+    removeRepository(tree);
+}
+
+void addAllBare(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    for (auto _ : state) {
+        state.PauseTiming();
+        tree.removeProject();
+        auto const project = tree.openProject();
+        project->create(u"benchmark");
+        state.ResumeTiming();
+        project->getFileManager().add(tree.files());
+    }
+}
+
+void addAllByGit(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.removeProject();
+    for (auto _ : state) {
+        state.PauseTiming();
+        makeEmptyRepository(tree);
+        state.ResumeTiming();
+        runSilently(tree.onDisk(), {"git", "add", "."});
+    }
+    removeRepository(tree);
+}
+
+std::vector<Path> freshFiles(benchmark::State const& state, std::string const& name) {
+    std::vector<Path> result;
+    for (benchmark::IterationCount number = 0; number < state.max_iterations; ++number) {
+        result.push_back(GeneratedTree::large().makeFile(name + std::to_string(number)));
+    }
+    return result;
+}
+
+void removeFiles(management::ProjectManager& project, std::vector<Path> const& files) {
+    project.getFileManager().remove(files);
+    for (auto const& file : files) {
+        std::filesystem::remove(fl::filesystem::toSystem(file));
+    }
+}
+
+/// In a repository that tracks all files and the project's text.
+void addOneInSession(benchmark::State& state, SourceControl sourceControl) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillProject();
+    makeEmptyRepository(tree);
+    runSilently(tree.onDisk(), {"git", "add", "."});
+    Options options;
+    options.sourceControl = sourceControl;
+    auto session = Session::open(tree.root(), options);
+    auto const files = freshFiles(state, "layers");
+    session.project().setName(u"benchmark");
+    std::size_t next = 0;
+    for (auto _ : state) {
+        session.project().getFileManager().add({files[next++]});
+    }
+    removeFiles(session.project(), files);
+    removeRepository(tree);
+}
+
+/// The same by the command: the file, and a text of the size of the project's that has changed.
+void addOneByGit(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillProject();
+    makeEmptyRepository(tree);
+    runSilently(tree.onDisk(), {"git", "add", "."});
+    auto const files = freshFiles(state, "git");
+    auto const text = tree.onDisk() / ".projectdata" / "project.jsonl";
+    std::size_t next = 0;
+    for (auto _ : state) {
+        state.PauseTiming();
+        std::ofstream(text, std::ios::app) << next;
+        state.ResumeTiming();
+        runSilently(tree.onDisk(), {"git", "add", fl::filesystem::toSystem(files[next++]).string()});
+        runSilently(tree.onDisk(), {"git", "add", text.string()});
+    }
+    for (auto const& file : files) {
+        std::filesystem::remove(fl::filesystem::toSystem(file));
+    }
+    removeRepository(tree);
+    tree.removeProject();
+}
+
+void addOneBare(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillProject();
+    auto const project = tree.openProject();
+    auto const files = freshFiles(state, "bare");
+    project->setName(u"benchmark");
+    std::size_t next = 0;
+    for (auto _ : state) {
+        project->getFileManager().add({files[next++]});
+    }
+    removeFiles(*project, files);
+}
+
+[[maybe_unused]] bool const registered = [] {
+    auto const once = [](benchmark::internal::Benchmark* made) {
+        made->Iterations(1)->Repetitions(3)->UseRealTime()->Unit(benchmark::kMillisecond);
+    };
+    auto const often = [](benchmark::internal::Benchmark* made) {
+        made->Iterations(20)->Repetitions(3)->UseRealTime()->Unit(benchmark::kMillisecond);
+    };
+    once(benchmark::RegisterBenchmark("layers/add-all/session", addAllInSession));
+    once(benchmark::RegisterBenchmark("layers/add-all/bare", addAllBare));
+    once(benchmark::RegisterBenchmark("layers/add-all/git-add", addAllByGit));
+    often(benchmark::RegisterBenchmark("layers/add-one/session", addOneInSession, SourceControl::EachChange));
+    often(benchmark::RegisterBenchmark("layers/add-one/text-when-asked", addOneInSession,
+                                       SourceControl::WhenAsked));
+    often(benchmark::RegisterBenchmark("layers/add-one/off", addOneInSession, SourceControl::Off));
+    often(benchmark::RegisterBenchmark("layers/add-one/bare", addOneBare));
+    often(benchmark::RegisterBenchmark("layers/add-one/git-add", addOneByGit));
+    Ratios::compare("100,000 files added in a session to the bare manager and git add",
+                    "layers/add-all/session", {"layers/add-all/bare", "layers/add-all/git-add"});
+    Ratios::compare("  the same to the bare manager", "layers/add-all/session", {"layers/add-all/bare"});
+    Ratios::compare("one file added in a session to the bare manager and git add of file and text",
+                    "layers/add-one/session", {"layers/add-one/bare", "layers/add-one/git-add"});
+    Ratios::compare("  the same to the bare manager", "layers/add-one/session", {"layers/add-one/bare"});
+    Ratios::compare("  the same with the text staged when asked", "layers/add-one/text-when-asked",
+                    {"layers/add-one/bare"});
+    Ratios::compare("  the same without source control", "layers/add-one/off", {"layers/add-one/bare"});
+    return true;
+}();
+
+} // namespace
+} // namespace project::benchmarks
