@@ -130,6 +130,32 @@ TEST(TextMergeInput, textsInAnotherFormAreMergedByWhatTheySay) {
     EXPECT_EQ(merged(base, bodyOf({R"("a")"}), base), bodyOf({R"("a")"}));
 }
 
+TEST(TextMergeInput, manyLinesAreMerged) {
+    constexpr int files = 100'000;
+    auto const without = [](int gone) {
+        std::string text = std::string(firstLine) + '\n';
+        for (int i = 0; i < files; ++i) {
+            std::string const number = std::to_string(files + i);
+            text += i % 1000 == gone ? "" : "\"folder" + number.substr(0, 4) + "/file" + number + "\"\n";
+        }
+        return text + std::string(endLine) + '\n';
+    };
+    std::string const text = merged(without(-1), without(1), without(2));
+    EXPECT_EQ(text.size(), 2 * without(1).size() - without(-1).size());
+    EXPECT_EQ(merged(without(1), without(-1), without(1)), without(-1));
+}
+
+TEST(TextMergeInput, addressesAsDeepAsTheyMayBeAreMerged) {
+    std::string path = "p";
+    for (int depth = 2; depth < 4094; ++depth) {
+        path += "/p";
+    }
+    auto const line = [&](std::string const& name) { return "\"" + path + "/" + name + "\""; };
+    EXPECT_EQ(merged(bodyOf({line("a")}), bodyOf({line("a"), line("b")}), bodyOf({})), bodyOf({line("b")}));
+    EXPECT_EQ(merged(bodyOf({R"("p")", line("a")}), bodyOf({R"("p")", line("a"), line("b")}), bodyOf({})),
+              "Subtree at p, removed by theirs, changed " + path + "/b");
+}
+
 TEST(TextMergeInput, whatAWriterThatDiedLeftCountsForNobody) {
     std::string const text = bodyOf({R"("a")"});
     EXPECT_EQ(merged(text, text + R"("b")", bodyOf({R"("a")", R"("c")"})), bodyOf({R"("a")", R"("c")"}));
