@@ -162,11 +162,12 @@ TEST(TextMergeInput, whatAWriterThatDiedLeftCountsForNobody) {
 }
 
 struct BadText {
+    char const* name;
     std::string text;
     std::size_t line;
     std::string problem;
 
-    friend void PrintTo(BadText const& bad, std::ostream* out) { *out << bad.text; }
+    friend void PrintTo(BadText const& bad, std::ostream* out) { *out << bad.name; }
 };
 
 class TextMergeRefusal : public ::testing::TestWithParam<BadText> {};
@@ -186,13 +187,14 @@ TEST_P(TextMergeRefusal, namesTheVersionAndTheLine) {
 
 INSTANTIATE_TEST_SUITE_P(
     Texts, TextMergeRefusal,
-    ::testing::Values(BadText{bodyOf({R"("a")", "nonsense"}), 3, "damaged"},
-                      BadText{bodyOf({R"({"file":"a","color":"red"})"}), 2, "damaged"},
-                      BadText{bodyOf({R"("a")", "<<<<<<< ours", "=======", ">>>>>>> theirs"}), 3, "markers"},
-                      BadText{std::string(firstLine) + "\n\"a", 2, "ends before"},
-                      BadText{std::string(firstLine) + "\n\"a\"\n", 2, "ends before"},
-                      BadText{"{\"format\":\"project-definition\",\"version\":2}\n", 1, "version 2"},
-                      BadText{"\n\n", 1, "no project definition"}));
+    ::testing::Values(
+        BadText{"noJson", bodyOf({R"("a")", "nonsense"}), 3, "damaged"},
+        BadText{"unknownMember", bodyOf({R"({"file":"a","color":"red"})"}), 2, "damaged"},
+        BadText{"markers", bodyOf({R"("a")", "<<<<<<< ours", "=======", ">>>>>>> theirs"}), 3, "markers"},
+        BadText{"brokenLine", std::string(firstLine) + "\n\"a", 2, "ends before"},
+        BadText{"noLastLine", std::string(firstLine) + "\n\"a\"\n", 2, "ends before"},
+        BadText{"laterVersion", "{\"format\":\"project-definition\",\"version\":2}\n", 1, "version 2"},
+        BadText{"somethingElse", "\n\n", 1, "no project definition"}));
 
 TEST(TextMergeInput, anEmptyTextIsNoVersionOfAProject) {
     std::string const good = bodyOf({R"("a")"});
