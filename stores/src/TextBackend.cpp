@@ -25,7 +25,11 @@ namespace {
 constexpr std::size_t shortestLine = 4;
 
 char const* const settleTheConflict =
-    "Settle the conflict in an editor or with git mergetool, and try again.";
+    "Settle the conflict with \"projectctl resolve\" or in an editor, and try again.";
+
+bool hasFault(ProjectText const& text, Fault::Kind kind) {
+    return std::ranges::find(text.faults(), kind, &Fault::kind) != text.faults().end();
+}
 
 /// A batch that is written and not yet kept: either the lines to append, or the text to put in place.
 struct Pending {
@@ -54,6 +58,7 @@ public:
     void discard() noexcept;
     bool tidy();
     std::string repair();
+    void settle(std::string settled);
     std::vector<Fault> check();
     void tidyAtLast() noexcept;
 
@@ -305,6 +310,22 @@ std::string TextBackend::State::repair() {
     return name;
 }
 
+void TextBackend::State::settle(std::string settled) {
+    auto const next = ProjectText::read(std::move(settled), pathOfText());
+    if (!next || hasFault(*next, Fault::Kind::Damage) || hasFault(*next, Fault::Kind::Conflict)) {
+        throw StoreError(pathOfText(), 0, "what should take the place of the text is no whole and sound text",
+                         "");
+    }
+    Unlocking const unlocking(*this);
+    seen_.distrust();
+    bool const isThere = lockAndLook(options_.patience);
+    if (!isThere || !hasFault(seen_.text(), Fault::Kind::Conflict)) {
+        throw StoreError(pathOfText(), 0, "the text has no markers of a merge that could be settled", "");
+    }
+    writer_.requireKnownOutcome();
+    writer_.rewrite(next->rewrittenWith({}));
+}
+
 std::vector<Fault> TextBackend::State::check() {
     seen_.distrust();
     look(options_.patience);
@@ -377,6 +398,10 @@ void TextBackend::discard() noexcept {
 
 bool TextBackend::tidy() {
     return state_->tidy();
+}
+
+void TextBackend::settle(std::string settled) {
+    state_->settle(std::move(settled));
 }
 
 std::string TextBackend::repair() {

@@ -191,6 +191,45 @@ TEST_F(TextBackendMending, theDamagedLinesAreDurableBeforeTheTextGoesOnWithoutTh
     }
 }
 
+TEST_F(TextBackendMending, settlingPutsAWholeTextInThePlaceOfOneWithMarkers) {
+    auto const settled = textOf(addFiles({u"a", u"b"}));
+    auto conflict = textOf(addFiles({u"a", u"d"}));
+    conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
+    prepareText(conflict);
+    auto const backend = open();
+
+    backend->settle(settled);
+
+    EXPECT_EQ(text(), settled);
+    EXPECT_EQ(contentOf(*backend), contentAfter({addFiles({u"a", u"b"})}));
+    commit(*backend, addFiles({u"e"}));
+}
+
+TEST_F(TextBackendMending, settlingChangesNothingWhereThereIsNothingToSettle) {
+    auto const sound = textOf(addFiles({u"a"}));
+    prepareText(sound);
+    auto const backend = open();
+
+    EXPECT_THAT(errorOf([&] { backend->settle(textOf(addFiles({u"b"}))); }).getProblem(),
+                HasSubstr("no markers"));
+    EXPECT_EQ(text(), sound);
+}
+
+TEST_F(TextBackendMending, settlingTakesNoTextThatIsNotSound) {
+    auto conflict = textOf(addFiles({u"a", u"d"}));
+    conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
+    prepareText(conflict);
+    auto const backend = open();
+    auto const sound = textOf(addFiles({u"a"}));
+
+    for (auto const& bad : {conflict, sound.substr(0, sound.size() / 2), std::string(),
+                            std::string(sound).insert(sound.find("\"a\""), "damage\n")}) {
+        EXPECT_THAT(errorOf([&] { backend->settle(bad); }).getProblem(),
+                    HasSubstr("no whole and sound text"));
+        EXPECT_EQ(text(), conflict);
+    }
+}
+
 TEST_F(TextBackendMending, repairLeavesTheMarkersOfAMergeToAPerson) {
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");

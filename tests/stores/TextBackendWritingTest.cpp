@@ -287,7 +287,7 @@ TEST_F(TextBackendWriting, aTextWithConflictMarkersReadsWithBothSidesAndTakesNoW
     auto const error = errorOf([&] { commit(*backend, addFiles({u"e"})); });
 
     EXPECT_EQ(3U, error.getLine());
-    EXPECT_THAT(error.getRemedy(), HasSubstr("git mergetool"));
+    EXPECT_THAT(error.getRemedy(), HasSubstr("projectctl resolve"));
     EXPECT_EQ(conflict, text());
 }
 

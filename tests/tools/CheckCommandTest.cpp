@@ -49,7 +49,7 @@ TEST_F(CheckCommand, tellsOnATerminalWhatToDo) {
     EXPECT_EQ(lastLine(), "'projectctl check --repair' sets damaged lines aside.\r");
 
     insertLineBefore("\"b\"", "<<<<<<< ours");
-    EXPECT_EQ(lastLine(), "What a merge left is to be settled first, in an editor or with git mergetool.\r");
+    EXPECT_EQ(lastLine(), "'projectctl resolve' settles what a merge left.\r");
 
     writeText(sound);
     insertLineBefore(beforeTheName, "\"lost/file\"");

@@ -123,7 +123,8 @@ TEST_F(GitIgnore, leavesIgnoredFilesOutOfTheStatus) {
     folder_.file(u"a.o");
     folder_.file(u"b.cpp");
 
-    EXPECT_THAT(tool({"status", "--gitignore"}), Prints("new  .gitignore\nnew  a.cpp\nnew  b.cpp\n"));
+    EXPECT_THAT(tool({"status", "--gitignore", "--no-source-control"}),
+                Prints("new  .gitignore\nnew  a.cpp\nnew  b.cpp\n"));
 }
 
 TEST_F(GitIgnore, isRefusedWithoutRecursive) {

@@ -62,7 +62,7 @@ private:
             return std::ranges::find(faults, kind, &Fault::kind) != faults.end();
         };
         if (has(Fault::Kind::Conflict)) {
-            return "What a merge left is to be settled first, in an editor or with git mergetool.";
+            return "'projectctl resolve' settles what a merge left.";
         }
         if (has(Fault::Kind::Damage)) {
             return "'projectctl check --repair' sets damaged lines aside.";

@@ -8,7 +8,7 @@ std::vector<std::unique_ptr<Command>> makeCommands() {
          {makeInitCommand, makeNameCommand, makeDescriptionCommand, makeAddCommand, makeRemoveCommand,
           makeListCommand, makeStatusCommand, makeCategoryCommand, makeLabelCommand, makeEntryCommand,
           makeGroupCommand, makePathCommand, makeReferenceCommand, makeReferencesCommand, makeCheckCommand,
-          makeTidyCommand}) {
+          makeTidyCommand, makeSetupCommand, makeMergeCommand, makeResolveCommand}) {
         result.push_back(make());
     }
     return result;

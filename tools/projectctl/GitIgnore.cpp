@@ -8,8 +8,8 @@
 #include <utility>
 
 #include "Failure.hpp"
+#include "GitCommand.hpp"
 #include "NameForms.hpp"
-#include "PipedProcess.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
@@ -36,14 +36,10 @@ std::string_view takeName(std::string_view& names) {
 }
 
 /// @param accepted the highest exit code that is no failure.
-std::string runGit(Path const& root, std::vector<std::string> const& arguments, std::string_view input,
+std::string askGit(Path const& root, std::vector<std::string> const& arguments, std::string_view input,
                    int accepted) {
-    std::string folder;
-    appendBytes(folder, root.native());
-    std::vector<std::string> command{"git", "-C", std::move(folder)};
-    command.insert(command.end(), arguments.begin(), arguments.end());
     try {
-        auto result = runWithInput(command, input);
+        auto result = runGit(root, arguments, input);
         if (result.exitCode < 0 || result.exitCode > accepted) {
             auto const line = result.errors.substr(0, result.errors.find('\n'));
             throw Failure("git cannot tell what it ignores: " + (line.empty() ? "it failed" : line));
@@ -60,7 +56,7 @@ std::string runGit(Path const& root, std::vector<std::string> const& arguments, 
 /// The files that match a pattern of things to ignore and are tracked all the same.
 std::unordered_set<std::string> trackedAllTheSame(Path const& root) {
     auto const output =
-        runGit(root, {"ls-files", "-z", "--cached", "--ignored", "--exclude-standard"}, {}, 0);
+        askGit(root, {"ls-files", "-z", "--cached", "--ignored", "--exclude-standard"}, {}, 0);
     std::unordered_set<std::string> result;
     for (std::string_view names = output; !names.empty();) {
         result.emplace(takeName(names));
@@ -73,7 +69,7 @@ std::unordered_set<std::string> trackedAllTheSame(Path const& root) {
 std::vector<Path> withoutIgnoredByGit(Path const& root, std::vector<Path> paths) {
     auto const names = namesFor(root, paths);
     // Without the index: with it, git goes through the whole index for each name that it is asked about.
-    auto const matching = runGit(root, {"check-ignore", "-z", "--stdin", "--no-index"}, names, 1);
+    auto const matching = askGit(root, {"check-ignore", "-z", "--stdin", "--no-index"}, names, 1);
     if (matching.empty()) {
         return paths;
     }

@@ -8,6 +8,8 @@
 #include "OpenProject.hpp"
 #include "Output.hpp"
 #include "ProjectFolder.hpp"
+#include "Settings.hpp"
+#include "merge/MergeSetup.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
@@ -29,6 +31,9 @@ public:
         requireNoProject(root);
         auto const name = name_ ? textOf(*name_) : nameOf(root);
         OpenProject::make(root, name).stage();
+        if (settings().sourceControl && lookForMergeSetup(root) == MergeSetup::Missing) {
+            setUpMerge(root);
+        }
         output().say("There is a project in \"" + shown(root) +
                      "\" now. 'projectctl add' puts files into it.");
         return 0;

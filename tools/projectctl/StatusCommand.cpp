@@ -9,8 +9,10 @@
 #include "Output.hpp"
 #include "Progress.hpp"
 #include "ProjectCommand.hpp"
+#include "Settings.hpp"
 #include "StatusScan.hpp"
 #include "checks/Problems.hpp"
+#include "merge/MergeSetup.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
@@ -37,8 +39,12 @@ public:
         for (auto const& line : scan.unreadable()) {
             printError("warning: " + line);
         }
-        Differences const found{gitignore_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
-                                findProblems(project)};
+        Differences found{gitignore_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
+                          findProblems(project)};
+        if (settings().sourceControl && lookForMergeSetup(root_) == MergeSetup::Missing) {
+            found.problems.push_back(Finding::note("git merges the project's text line by line: 'projectctl "
+                                                   "setup' has it done by what the text says"));
+        }
         json_ ? writeJson(found) : writeLines(found);
         return 0;
     }

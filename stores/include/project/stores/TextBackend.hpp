@@ -74,6 +74,14 @@ public:
     /// @throws StoreError when a merge left its markers: those are for a person to settle.
     std::string repair();
 
+    /// Puts a text in the place of one in which a merge left its markers, where all is settled that they
+    /// stand for. To be called with no guard open; waits for other writers.
+    /// @param settled a whole text; it is written in canonical form.
+    /// @throws StoreError when it is not whole, is damaged or has markers itself; or when the text on disk
+    /// has
+    ///         none, since somebody else has settled them.
+    void settle(std::string settled);
+
     /// All faults of the text as it is on disk now, by line. To be called with no guard open. Takes no lock.
     std::vector<Fault> check();
 

@@ -1,0 +1,84 @@
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <optional>
+#include <string>
+
+#include "CommandLine.hpp"
+#include "Commands.hpp"
+#include "Failure.hpp"
+#include "NameForms.hpp"
+#include "Output.hpp"
+#include "merge/ConflictWords.hpp"
+#include "project/stores/TextMerge.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// Merges two versions of a project's text, as a merge driver of git does.
+class MergeCommand : public Command {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand(
+            "merge",
+            "Merge two versions of a project's text, for git ('projectctl setup' tells it); fails when "
+            "both changed one thing, and marks it in the result");
+        takeText(*app, "BASE", base_, "The version that both come from; empty when there is none")
+            ->required();
+        takeText(*app, "OURS", ours_, "One version; the result takes its place")->required();
+        takeText(*app, "THEIRS", theirs_, "The other version")->required();
+        takeText(*app, "PATH", path_, "What the text is called in messages");
+        return app;
+    }
+
+    int run() override {
+        auto const merge =
+            project::stores::mergeTexts(contentOf(*base_), contentOf(*ours_), contentOf(*theirs_));
+        replace(*ours_, merge.textWithMarkers());
+        for (auto const& conflict : merge.conflicts()) {
+            printError("conflict in " + path_.value_or(*ours_) + ": " + inWords(conflict));
+        }
+        return merge.conflicts().empty() ? 0 : 1;
+    }
+
+private:
+    static std::string contentOf(std::string const& name) {
+        std::ifstream file(name, std::ios::binary);
+        std::string result{std::istreambuf_iterator<char>(file), {}};
+        if (!file) {
+            throw Failure('"' + name + "\" cannot be read");
+        }
+        return result;
+    }
+
+    /// Either the old content stays or all of the new is there, also when the disk is full.
+    static void replace(std::string const& name, std::string const& content) {
+        auto const next = name + ".merged";
+        std::ofstream file(next, std::ios::binary | std::ios::trunc);
+        file << content << std::flush;
+        bool const isWritten = file.good();
+        file.close();
+        std::error_code error;
+        if (isWritten) {
+            std::filesystem::rename(next, name, error);
+        }
+        if (!isWritten || error) {
+            std::filesystem::remove(next, error);
+            throw Failure('"' + name + "\" cannot be written");
+        }
+    }
+
+    std::optional<std::string> base_;
+    std::optional<std::string> ours_;
+    std::optional<std::string> theirs_;
+    std::optional<std::string> path_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeMergeCommand() {
+    return std::make_unique<MergeCommand>();
+}
+
+} // namespace projectctl

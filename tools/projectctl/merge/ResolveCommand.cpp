@@ -1,0 +1,138 @@
+#include <iostream>
+#include <optional>
+#include <string>
+#include <system_error>
+#include <vector>
+
+#include <unistd.h>
+
+#include "Commands.hpp"
+#include "Failure.hpp"
+#include "GitCommand.hpp"
+#include "NameForms.hpp"
+#include "Output.hpp"
+#include "ProjectCommand.hpp"
+#include "merge/ConflictWords.hpp"
+#include "project/stores/TextMerge.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::stores::MergeConflict;
+using project::stores::MergeSide;
+using project::stores::TextMerge;
+
+constexpr char const* textInRoot = "./.projectdata/project.jsonl";
+
+/// Settles what a merge left to a person, from the versions that git keeps until then.
+class ResolveCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand(
+            "resolve",
+            "Settle a conflict of the project's text that a merge has left, and tell git; asks for each "
+            "thing that both sides changed, if it is called on a terminal");
+        auto* const ours =
+            app->add_flag("--ours", ours_, "Of all that both changed, keep what this branch has");
+        app->add_flag("--theirs", theirs_, "Of all that both changed, take what the other branch has")
+            ->excludes(ours);
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto const merge = mergeAgain(project.root());
+        auto const choices = choose(merge.conflicts());
+        project.shield().raise();
+        project.text().settle(merge.text(choices));
+        tellGit(project.root());
+        output().say("The project's text is whole again.");
+        return 0;
+    }
+
+private:
+    static TextMerge mergeAgain(Path const& root) {
+        constexpr int base = 1;
+        constexpr int ours = 2;
+        constexpr int theirs = 3;
+        auto const our = version(root, ours);
+        auto const their = version(root, theirs);
+        if (!our || !their) {
+            throw Failure("git has no conflict of the project's text that could be settled");
+        }
+        return project::stores::mergeTexts(version(root, base).value_or(std::string()), *our, *their);
+    }
+
+    /// The text as git keeps it in one stage of a merge; nothing when it has none there.
+    static std::optional<std::string> version(Path const& root, int stage) {
+        auto result = git(root, {"cat-file", "blob", ":" + std::to_string(stage) + ':' + textInRoot});
+        return result.exitCode == 0 ? std::optional(std::move(result.output)) : std::nullopt;
+    }
+
+    static void tellGit(Path const& root) {
+        auto const result = git(root, {"add", "--", textInRoot});
+        if (result.exitCode != 0) {
+            throw Failure("the conflict is settled, but git cannot be told: " +
+                          result.errors.substr(0, result.errors.find('\n')));
+        }
+    }
+
+    static ProcessResult git(Path const& root, std::vector<std::string> const& arguments) {
+        try {
+            return runGit(root, arguments);
+        } catch (std::system_error const& error) {
+            throw Failure("git cannot be asked for the versions of the text: " + std::string(error.what()));
+        }
+    }
+
+    std::vector<MergeSide> choose(std::vector<MergeConflict> const& conflicts) const {
+        if (ours_ || theirs_) {
+            return {conflicts.size(), ours_ ? MergeSide::Ours : MergeSide::Theirs};
+        }
+        bool const isAsked = output().isTerminal() && isatty(STDIN_FILENO) == 1;
+        std::vector<MergeSide> result;
+        result.reserve(conflicts.size());
+        for (auto const& conflict : conflicts) {
+            if (isAsked) {
+                result.push_back(ask(conflict, result.size() + 1, conflicts.size()));
+            } else {
+                printError("conflict: " + inWords(conflict));
+            }
+        }
+        if (result.size() < conflicts.size()) {
+            throw Failure("both sides changed " + std::to_string(conflicts.size()) +
+                          (conflicts.size() == 1 ? " thing" : " things") +
+                          ". Give --ours or --theirs, or call this on a terminal to choose for each");
+        }
+        return result;
+    }
+
+    static MergeSide ask(MergeConflict const& conflict, std::size_t number, std::size_t total) {
+        output().text() += std::to_string(number) + " of " + std::to_string(total) + ": " +
+                           withoutControls(inWords(conflict), false) + ".\n";
+        for (std::string answer;;) {
+            output().text() += "Keep ours or theirs (o, t, or q to leave it all as it is)? ";
+            output().flush();
+            if (!std::getline(std::cin, answer) || answer == "q") {
+                throw Failure("nothing was changed");
+            }
+            if (answer == "o" || answer == "ours") {
+                return MergeSide::Ours;
+            }
+            if (answer == "t" || answer == "theirs") {
+                return MergeSide::Theirs;
+            }
+        }
+    }
+
+    bool ours_ = false;
+    bool theirs_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeResolveCommand() {
+    return std::make_unique<ResolveCommand>();
+}
+
+} // namespace projectctl
