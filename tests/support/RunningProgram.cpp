@@ -126,6 +126,12 @@ RunningProgram::RunningProgram(std::vector<std::string> const& command, ProgramS
     auto const environment = pointersTo(environmentTexts);
     auto input = makePipe();
     auto streams = makeStreams(settings.onTerminal);
+    if (settings.inputOnTerminal) { // what is written to the terminal's other side is what is typed
+        close(input.readEnd);
+        close(input.writeEnd);
+        input = {fcntl(streams.output.writeEnd, F_DUPFD_CLOEXEC, 0),
+                 fcntl(streams.output.readEnd, F_DUPFD_CLOEXEC, 0)};
+    }
     child_ = fork();
     require(child_ >= 0, "fork");
     if (child_ == 0) {

@@ -211,6 +211,35 @@ TEST_F(ResolveCommand, listsWhatIsToBeChosenWhereNobodyCanBeAsked) {
     EXPECT_EQ(readText(), before);
 }
 
+TEST_F(ResolveCommand, asksForEachThingThatBothChangedOnATerminal) {
+    makeConflicts();
+    settings_.onTerminal = true;
+    settings_.inputOnTerminal = true;
+
+    auto const result = tool({"resolve"}, "what\nt\no\n");
+
+    EXPECT_EQ(result.exitCode, 0) << result.output;
+    EXPECT_THAT(result.output,
+                AllOf(HasSubstr("1 of 2: the file \"b\" is removed by theirs and changed by ours."),
+                      HasSubstr("2 of 2: the \"Name\" of "),
+                      HasSubstr("The project's text is whole again.")));
+    settings_ = {};
+    settings_.folder = folder_.onDisk();
+    EXPECT_THAT(tool({"name"}), Prints("Valve\n"));
+    EXPECT_THAT(list(), ::testing::ElementsAre("a", "c"));
+}
+
+TEST_F(ResolveCommand, changesNothingForWhoeverThinksBetterOfIt) {
+    makeConflicts();
+    auto const before = readText();
+    settings_.onTerminal = true;
+    settings_.inputOnTerminal = true;
+
+    EXPECT_EQ(tool({"resolve"}, "t\nq\n").exitCode, 1);
+
+    EXPECT_EQ(readText(), before);
+}
+
 TEST_F(ResolveCommand, worksFromTheVersionsThatGitKeepsAlsoWhereGitMergedTheLines) {
     git({"config", "--remove-section", "merge.project-definition"});
     folder_.file(u"d");
