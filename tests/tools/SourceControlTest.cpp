@@ -72,8 +72,10 @@ TEST_F(InRepository, removeNamesWhatGitTrackedAndTheProjectNeverHad) {
     auto const removed = tool({"remove", "src"});
 
     EXPECT_EQ(removed.exitCode, 0);
-    EXPECT_EQ(removed.errors, "projectctl: warning: git no longer tracks \"" + inFolder("src/io/pump.cpp") +
-                                  "\", which is below a removed folder and was never in the project\n");
+    EXPECT_EQ(removed.errors,
+              "projectctl: warning: \"" + inFolder("src/io/pump.cpp") +
+                  "\" is below a removed folder and not in the project; git will not track it any "
+                  "more\n");
     EXPECT_THAT(status(), HasSubstr("D  src/io/pump.cpp\n"));
 }
 

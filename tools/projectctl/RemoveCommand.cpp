@@ -24,8 +24,8 @@ public:
     int run(OpenProject& project) override {
         auto const paths = paths_.read();
         for (auto const& path : project.trackedOutsideProject(paths)) {
-            printError("warning: git no longer tracks \"" + shown(path) +
-                       "\", which is below a removed folder and was never in the project");
+            printError("warning: \"" + shown(path) +
+                       "\" is below a removed folder and not in the project; git will not track it any more");
         }
         Progress const progress("Removing " + std::to_string(paths.size()) + " files and folders");
         auto const removed = project.files().remove(paths);
