@@ -1,0 +1,2 @@
+// Source control knows neither managers nor stores.
+#include "project/stores/TreeMetadataManager.hpp"
