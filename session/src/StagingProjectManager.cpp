@@ -4,8 +4,6 @@
 
 namespace project::session {
 
-using management::ProjectManagerDecorator;
-
 StagingProjectManager::StagingProjectManager(std::unique_ptr<management::ProjectManager> inner,
                                              DefinitionStager& stager)
     : ProjectManagerDecorator(std::move(inner)),

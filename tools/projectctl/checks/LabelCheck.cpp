@@ -10,6 +10,21 @@ namespace projectctl {
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
 
+namespace {
+
+Finding missing(std::string const& file, std::u16string const& uuid, std::string const& category) {
+    return Finding::fault(file + " bears the label " + inQuotes(uuid) + " of the category " + category +
+                          ", which does not exist");
+}
+
+Finding repeated(std::string const& file, std::u16string const& label, std::string const& category,
+                 std::size_t count) {
+    return Finding::note(file + " bears the label " + inQuotes(label) + " of the category " + category + ' ' +
+                         std::to_string(count) + " times");
+}
+
+} // namespace
+
 LabelCheck::LabelCheck(project::metadata::MetadataManager& store) {
     auto const head = MetadataPath::root().child(
         PathElement(std::u16string(schema::categories), std::u16string(schema::root)));
@@ -70,12 +85,9 @@ void LabelCheck::checkCategory(std::string const& file, std::u16string const& uu
         auto const known = category->second.labels.find(label);
         total += count;
         if (known == category->second.labels.end()) {
-            findings.push_back(Finding::fault(file + " bears the label " + inQuotes(label) +
-                                              " of the category " + name + ", which does not exist"));
+            findings.push_back(missing(file, label, name));
         } else if (count > 1 && !category->second.isSingleValued) {
-            findings.push_back(Finding::note(file + " bears the label " + inQuotes(known->second) +
-                                             " of the category " + name + ' ' + std::to_string(count) +
-                                             " times"));
+            findings.push_back(repeated(file, known->second, name, count));
         }
     }
     if (category->second.isSingleValued && total > 1) {

@@ -17,7 +17,6 @@ namespace projectctl {
 using fl::filesystem::Path;
 using project::management::ProjectManagerBase;
 using project::metadata::MetadataPath;
-using project::metadata::PathElement;
 
 namespace {
 

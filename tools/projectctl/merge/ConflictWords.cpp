@@ -56,7 +56,7 @@ std::optional<std::string> nounFor(std::u16string_view head, std::u16string_view
 }
 
 std::string described(MetadataPath const& address) {
-    auto const elements = address.getPath();
+    auto const& elements = address.getPath();
     auto const& leaf = address.leaf();
     auto const head = elements.front().getType();
     if (head == schema::files) {
