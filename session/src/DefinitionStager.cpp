@@ -54,6 +54,19 @@ void DefinitionStager::stageIfWritten() {
     watch_->hasWritten = false; // not before: what failed is to be tried again
 }
 
+void DefinitionStager::stageReturned(std::vector<Path> const& files) {
+    auto const guard = store_.acquireWriteLock();
+    std::vector<Path> returned;
+    for (auto const& [file, state] : adapter_.getFileStates(files)) {
+        if (state.getState() == LocalStatus::RemovalStaged) {
+            returned.push_back(file);
+        }
+    }
+    if (!returned.empty()) {
+        adapter_.addToSourceControl(returned);
+    }
+}
+
 void DefinitionStager::noteWritten() noexcept {
     watch_->hasWritten = true;
 }

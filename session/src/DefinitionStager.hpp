@@ -2,6 +2,7 @@
 
 #include <memory>
 #include <type_traits>
+#include <vector>
 
 #include "cmlink/CMAdapter.hpp"
 #include "project/metadata/MetadataManager.hpp"
@@ -21,6 +22,10 @@ public:
     /// Stages the text if the store was written since the last time, and source control tracks it. Takes the
     /// write lock, since an adapter is used by one thread at a time.
     void stageIfWritten();
+
+    /// Stages those of some files whose removal is staged. They came back into the project; the layer below
+    /// acts on what git does not know, and these it knows. Takes the write lock.
+    void stageReturned(std::vector<Path> const& files);
 
     /// Counts as a write of the store.
     void noteWritten() noexcept;

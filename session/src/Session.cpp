@@ -173,6 +173,12 @@ void Session::stage() {
     state_->stage();
 }
 
+void Session::stageReturned(std::vector<Path> const& files) {
+    if (state_->stager) {
+        state_->stager->stageReturned(files);
+    }
+}
+
 void Session::stageLater() noexcept {
     if (state_->stager) {
         state_->stager->noteWritten();

@@ -9,7 +9,10 @@ StagingFileManager::StagingFileManager(management::FileManager& inner, Definitio
 }
 
 void StagingFileManager::add(std::vector<management::Path> const& files) {
-    stager_.after([&] { FileManagerDecorator::add(files); });
+    stager_.after([&] {
+        FileManagerDecorator::add(files);
+        stager_.stageReturned(files);
+    });
 }
 
 std::vector<management::Path> StagingFileManager::remove(std::vector<management::Path> const& files) {

@@ -85,6 +85,19 @@ TEST_F(SessionInRepository, takesWhatIsRemovedOutOfTheIndexTogetherWithItsEntry)
     EXPECT_EQ(staged(), onDisk());
 }
 
+TEST_F(SessionInRepository, stagesAFileAgainThatComesBackBeforeItsRemovalIsCommitted) {
+    auto session = Session::make(folder_.root(), u"Engine");
+    auto const file = folder_.file(u"a");
+    session.project().getFileManager().add({file, folder_.file(u"b")});
+    commitAll();
+    session.project().getFileManager().remove({file});
+    ASSERT_EQ(status(), "M  .projectdata/project.jsonl\nD  a\n?? a\n");
+
+    session.project().getFileManager().add({file});
+
+    EXPECT_EQ(status(), "");
+}
+
 TEST_F(SessionInRepository, stagesTheTextAfterEveryKindOfChange) {
     auto session = Session::make(folder_.root(), u"Engine");
     auto& project = session.project();

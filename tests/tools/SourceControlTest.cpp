@@ -64,6 +64,17 @@ TEST_F(InRepository, removeTakesTheFilesOutOfTheIndexAndLeavesThemOnDisk) {
     EXPECT_EQ(staged(), readText());
 }
 
+TEST_F(InRepository, addBringsBackWhatWasRemovedAndNotYetCommitted) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
+    commitAll();
+    ASSERT_THAT(tool({"remove", "src"}), SucceedsSilently());
+
+    ASSERT_THAT(tool({"add", "-r", "src"}), SucceedsSilently());
+
+    EXPECT_EQ(status(), "");
+}
+
 TEST_F(InRepository, removeNamesWhatGitTrackedAndTheProjectNeverHad) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());

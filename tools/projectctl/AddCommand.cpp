@@ -51,6 +51,7 @@ private:
                      std::make_move_iterator(contents.end()));
         progress.begin("Adding " + std::to_string(paths.size()) + " files and folders");
         project.files().add(paths);
+        project.stageReturned(paths);
     }
 
     /// What the folders among the paths contain and the project does not have yet: what it has is not

@@ -60,6 +60,9 @@ public:
     /// open.
     void stage() { session_.stage(); }
 
+    /// Stages those of some files that were just added whose removal git has staged.
+    void stageReturned(std::vector<Path> const& files) { session_.stageReturned(files); }
+
     /// Has stage count what was changed through text().
     void stageLater() noexcept { session_.stageLater(); }
 

@@ -91,6 +91,10 @@ public:
     ///         tries again.
     void stage();
 
+    /// Stages those of some files that were just added whose removal git has staged, as after a remove:
+    /// source control places what git does not know. EachChange does so by itself. Takes the write lock.
+    void stageReturned(std::vector<Path> const& files);
+
     /// Has the next call of stage stage the text, whoever wrote it: for changes made through text().
     void stageLater() noexcept;
 
