@@ -42,17 +42,29 @@ void Repository::addWorkTreeConfiguration() {
     }
 }
 
+/// libgit2 1.5.1 looks at the size of the index before it opens it, so that one which git puts in its place
+/// in between reads as if it were cut off. What could not be read counts only if it is still there.
+template <typename Read>
+FileStamp Repository::readIndex(std::string const& file, Read const& read) const {
+    constexpr int tries = 100;
+    for (int count = 1;; ++count) {
+        auto const stamp = FileStamp::of(file);
+        auto const code = read();
+        if (code >= 0 || count == tries || stamp == FileStamp::of(file)) {
+            requireReadable(code);
+            return stamp;
+        }
+    }
+}
+
 void Repository::refresh() {
     if (index_ == nullptr) {
         openIndex();
     }
-    // Looked at before it is read: if it changes in between, it is read once more with the next call. One
-    // that can't be read is tried again with the next call, too.
-    auto const stamp = FileStamp::of(indexFile());
-    if (!isIndexRead_ || stamp != indexStamp_) {
+    // One that can't be read is tried again with the next call.
+    if (!isIndexRead_ || FileStamp::of(indexFile()) != indexStamp_) {
         isIndexRead_ = false;
-        requireReadable(git_index_read(index_.get(), 1));
-        indexStamp_ = stamp;
+        indexStamp_ = readIndex(indexFile(), [this] { return git_index_read(index_.get(), 1); });
         isIndexRead_ = true;
     }
     head_.refresh();
@@ -60,7 +72,8 @@ void Repository::refresh() {
 
 void Repository::openIndex() {
     git_index* index = nullptr;
-    requireReadable(git_repository_index(&index, get()));
+    readIndex(git_repository_path(get()) + std::string("index"),
+              [&] { return git_repository_index(&index, get()); });
     index_.reset(index);
     // By default it would be sorted and searched as core.ignoreCase says.
     require(git_index_set_caps(index, 0), indexFile(), "the index can't be used");

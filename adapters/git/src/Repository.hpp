@@ -71,6 +71,10 @@ private:
     void openIndex();
     void requireReadable(int code) const;
 
+    /// @return what the index file was like before it was read.
+    template <typename Read>
+    FileStamp readIndex(std::string const& file, Read const& read) const;
+
     RepositoryHandle handle_;
     ConfigHandle config_;
     IndexHandle index_;
