@@ -29,6 +29,10 @@ void removeLeftover(Disk& disk, std::string const& name) {
         setAside(disk, name); // nothing that a writer of ours has made
     } else if (!swap || swap->isOld(*file) || swap->isNew(*file)) {
         disk.remove(name);
+    } else if (swap->isOldFile(*file)) {
+        // The old text, as a power cut left it after the new one was durable; or an editor wrote into it. The
+        // new one may hold batches that were kept, so it stays.
+        setAside(disk, name);
     } else {
         settleStranger(disk, name, *swap);
     }

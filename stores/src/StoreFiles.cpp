@@ -27,11 +27,16 @@ std::string randomHex() {
     return hex((std::uint64_t{device()} << 32) | device());
 }
 
-/// A short text for what tells one state of a file from another, whatever name the file has.
+constexpr std::size_t digitsOfFile = 8; ///< of the 16 of a state
+
+/// A short text for what tells one state of a file from another, whatever name the file has: one half for the
+/// file, one for its state.
 std::string stateOf(FileIdentity const& file) {
-    std::array<std::uint64_t, 3> const parts{file.inode, file.size,
-                                             static_cast<std::uint64_t>(file.modified)};
-    return hex(XXH3_64bits(parts.data(), sizeof(parts)));
+    constexpr unsigned half = 32;
+    std::array<std::uint64_t, 2> const state{file.size, static_cast<std::uint64_t>(file.modified)};
+    auto const ofFile = XXH3_64bits(&file.inode, sizeof(file.inode)) >> half;
+    auto const ofState = XXH3_64bits(state.data(), sizeof(state)) >> half;
+    return hex((ofFile << half) | ofState);
 }
 
 } // namespace
@@ -64,6 +69,10 @@ bool StoreFiles::isDisplaced(std::string_view name) {
 
 bool StoreFiles::Swap::isOld(FileIdentity const& file) const {
     return stateOf(file) == oldState;
+}
+
+bool StoreFiles::Swap::isOldFile(FileIdentity const& file) const {
+    return stateOf(file).compare(0, digitsOfFile, oldState, 0, digitsOfFile) == 0;
 }
 
 bool StoreFiles::Swap::isNew(FileIdentity const& file) const {

@@ -44,6 +44,9 @@ struct StoreFiles {
 
         bool isOld(FileIdentity const& file) const;
         bool isNew(FileIdentity const& file) const;
+
+        /// The old text's file, whatever state it is in.
+        bool isOldFile(FileIdentity const& file) const;
     };
 
     /// Empty when the name is no swapping file's.

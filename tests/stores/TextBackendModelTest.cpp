@@ -363,6 +363,29 @@ TEST(TextBackendModel, afterAnyHistoryOfTwoProcessesAProjectHoldsWhatAPlainMapHo
     EXPECT_GT(rewrites, 100U);
 }
 
+/// An append whose sync fails for good, a rewrite over it, and a power cut that brings the old text back
+/// without the append: it must not be taken for a text that somebody else put in place.
+TEST(TextBackendModel, anOldTextThatAPowerCutToreDoesNotComeBackOverTheNewOne) {
+    using Kind = Step::Kind;
+    using Trouble = CrashingVolume::Trouble;
+    auto const head = Address::root().child(metadata::PathElement(u"Files", u"Root"));
+    auto const below = head.child(metadata::PathElement(u"DIR_SIGNIFIER", u"1"));
+    auto const other = Address::root().child(metadata::PathElement(u"LabelData", u""));
+    for (unsigned seed = 0; seed < 100; ++seed) {
+        Processes processes({std::chrono::milliseconds(20), 0, 1}, seed);
+        processes.take({Kind::Set,
+                        1,
+                        {{below, stores::plainNode()}, {other, stores::plainNode()}},
+                        {},
+                        Trouble::None,
+                        0});
+        processes.take({Kind::Remove, 0, {}, {head}, Trouble::FailsForGood, 10});
+        processes.take({Kind::Set, 0, {{head, stores::plainNode()}}, {}, Trouble::None, 0});
+        processes.take({Kind::PowerCut, 0, {}, {}, Trouble::None, 0});
+        processes.finish();
+    }
+}
+
 TEST(TextBackendModel, theSameHoldsForTextsOfTheRealLimits) {
     std::size_t appends = 0;
     std::size_t rewrites = 0;
