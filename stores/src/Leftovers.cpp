@@ -25,13 +25,13 @@ void removeLeftover(Disk& disk, std::string const& name) {
         return;
     }
     auto const swap = StoreFiles::parseSwapping(name);
-    if (!file->isRegular && !swap) {
-        setAside(disk, name); // nothing that a writer of ours has made
-    } else if (!swap || swap->isOld(*file) || swap->isNew(*file)) {
+    bool const isOurs = swap ? swap->isOld(*file) || swap->isNew(*file) : file->isRegular;
+    if (isOurs) {
         disk.remove(name);
-    } else if (swap->isOldFile(*file)) {
-        // The old text, as a power cut left it after the new one was durable; or an editor wrote into it. The
-        // new one may hold batches that were kept, so it stays.
+    } else if (!swap || swap->isOldFile(*file)) {
+        // Nothing that a writer of ours has made; or the old text, as a power cut left it after the new one
+        // was durable, or as an editor wrote into it. The new one may hold batches that were kept, so it
+        // stays.
         setAside(disk, name);
     } else {
         settleStranger(disk, name, *swap);
