@@ -44,6 +44,11 @@ void JsonRows::finish() {
     output().text() += isEmpty_ ? "[]" : "}\n]";
 }
 
+void JsonRows::finishOutput() {
+    finish();
+    output().text() += '\n';
+}
+
 void JsonRows::addKey(std::string_view key) {
     auto& out = output().text();
     out += isFirstMember_ ? "\"" : ", \"";

@@ -26,8 +26,11 @@ public:
     /// The members "path" and "kind" of a file.
     void addFile(std::u16string_view path, Kind kind);
 
-    /// Ends the array; without a line feed.
+    /// Ends the array, which is part of something.
     void finish();
+
+    /// Ends the array and the line: the output is nothing but this array.
+    void finishOutput();
 
 private:
     void addKey(std::string_view key);

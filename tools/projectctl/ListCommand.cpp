@@ -10,14 +10,10 @@
 #include "Output.hpp"
 #include "ProjectCommand.hpp"
 #include "ProjectFolder.hpp"
-#include "project/metadata/Messages.hpp"
-#include "project/metadata/ProjectException.hpp"
 
 namespace projectctl {
 
 namespace {
-
-using ZEPHRA::project::management::FileNotInProject;
 
 /// Lists the project's files and folders, all or those below one of them.
 class ListCommand : public ProjectCommand {
@@ -46,9 +42,7 @@ public:
 private:
     void writeList(OpenProject& project, Path const& path) const {
         FileList const list(project);
-        if (!project.files().isFileInProject(path)) {
-            project::exception::raise(FileNotInProject(path.native()));
-        }
+        project.requireInProject(path);
         if (json_) {
             writeJson(list, path);
         } else if (tree_) {
@@ -93,8 +87,7 @@ private:
             rows.begin();
             rows.addFile(file.path, file.kind);
         });
-        rows.finish();
-        output().text() += '\n';
+        rows.finishOutput();
     }
 
     std::optional<std::string> path_;

@@ -5,12 +5,15 @@
 #include "Output.hpp"
 #include "ProjectFolder.hpp"
 #include "Settings.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/ProjectException.hpp"
 
 namespace projectctl {
 
 using project::session::SourceControl;
 using project::stores::Fault;
 using project::stores::TextBackend;
+using ZEPHRA::project::management::FileNotInProject;
 
 namespace {
 
@@ -46,6 +49,12 @@ std::string OpenProject::textFile() const {
 
 std::string OpenProject::storeFile(std::string const& name) const {
     return shown(root() / TextBackend::folderName) + '/' + name;
+}
+
+void OpenProject::requireInProject(Path const& path) {
+    if (!files().isFileInProject(path)) {
+        project::exception::raise(FileNotInProject(path.native()));
+    }
 }
 
 void OpenProject::warnOfDamage() {

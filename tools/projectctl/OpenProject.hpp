@@ -39,6 +39,9 @@ public:
 
     project::management::FileManager& files() { return manager().getFileManager(); }
 
+    /// @throws FileNotInProject
+    void requireInProject(Path const& path);
+
     project::metadata::MetadataManager& store() noexcept { return session_.store(); }
 
     /// What the store keeps its tree in. While a guard of the store is open, this may be loaded from.

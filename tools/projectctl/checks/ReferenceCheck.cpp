@@ -16,15 +16,16 @@ using project::metadata::PathElement;
 
 Findings ReferenceCheck::run() {
     for (auto const* list : {&projectPath(), &projectReferences()}) {
-        checkForms(*list);
-        checkTargets(*list);
+        auto const references = list->manager(project_).getReferences();
+        checkForms(*list, references);
+        checkTargets(*list, references);
     }
     return std::move(findings_);
 }
 
-void ReferenceCheck::checkForms(ReferenceList const& list) {
+void ReferenceCheck::checkForms(ReferenceList const& list, References const& references) {
     std::set<std::u16string> read;
-    for (auto const& reference : list.manager(project_).getReferences()) {
+    for (auto const& reference : references) {
         read.insert(reference.getUUID());
     }
     auto const head =
@@ -41,8 +42,8 @@ void ReferenceCheck::checkForms(ReferenceList const& list) {
     }
 }
 
-void ReferenceCheck::checkTargets(ReferenceList const& list) {
-    for (auto const& reference : list.manager(project_).getReferences()) {
+void ReferenceCheck::checkTargets(ReferenceList const& list, References const& references) {
+    for (auto const& reference : references) {
         auto const& folder = reference.getLocation();
         auto const what = "the reference " + inQuotes(reference.getStoredPath()) + " in " + list.name;
         if (!project::metadata::is_directory(folder)) {

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <vector>
+
 #include "OpenProject.hpp"
 #include "checks/Finding.hpp"
 #include "references/ReferenceLists.hpp"
@@ -16,8 +18,10 @@ public:
     Findings run();
 
 private:
-    void checkForms(ReferenceList const& list);
-    void checkTargets(ReferenceList const& list);
+    using References = std::vector<project::management::FolderReference>; ///< that the list reads
+
+    void checkForms(ReferenceList const& list, References const& references);
+    void checkTargets(ReferenceList const& list, References const& references);
 
     OpenProject& project_;
     Findings findings_;

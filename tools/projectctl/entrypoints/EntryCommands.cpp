@@ -138,10 +138,7 @@ public:
         rows_.addTexts("extensions", extensions);
     }
 
-    void finish() {
-        rows_.finish();
-        output().text() += '\n';
-    }
+    void finish() { rows_.finishOutput(); }
 
 private:
     Path const& root_;
@@ -201,9 +198,7 @@ public:
         auto const file = absolutePath(*file_);
         project.warnOfDamage();
         auto const guard = project.store().acquireReadLock();
-        if (!project.files().isFileInProject(file)) {
-            project::exception::raise(FileNotInProject(file.native()));
-        }
+        project.requireInProject(file);
         auto const entry = project.manager().getEntryPointManager().getEntryPoint(file);
         if (entry->getUUID().empty()) {
             throw Failure('"' + shown(file) + "\" is no entry point. 'projectctl entry set' makes it one");
@@ -257,9 +252,7 @@ public:
         auto const files = paths_.read();
         auto const guard = project.store().acquireWriteLock();
         for (auto const& file : files) { // all of them, before the first is changed
-            if (!project.files().isFileInProject(file)) {
-                project::exception::raise(FileNotInProject(file.native()));
-            }
+            project.requireInProject(file);
         }
         for (auto const& file : files) {
             project.manager().getEntryPointManager().removeEntryPoint(file);

@@ -58,8 +58,7 @@ public:
             }
         }
         if (json_) {
-            rows.finish();
-            output().text() += '\n';
+            rows.finishOutput();
         }
         return 0;
     }

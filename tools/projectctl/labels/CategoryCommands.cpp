@@ -82,8 +82,7 @@ private:
             rows.addFlag("singleValued", category.isSingleValued());
             rows.addText("type", category.getDataType());
         }
-        rows.finish();
-        output().text() += '\n';
+        rows.finishOutput();
     }
 
     /// What sets it apart from a category made without options: " (read-only, type Number)".

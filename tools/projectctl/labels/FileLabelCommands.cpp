@@ -15,9 +15,7 @@
 #include "labels/LabelNames.hpp"
 #include "project/files/FileLabel.hpp"
 #include "project/files/LabelIDSet.hpp"
-#include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
-#include "project/metadata/ProjectException.hpp"
 
 namespace projectctl {
 
@@ -27,7 +25,6 @@ using project::management::FileLabel;
 using project::management::FileManager;
 using project::management::Label;
 using project::management::LabelIDSet;
-using ZEPHRA::project::management::FileNotInProject;
 
 LabelIDSet idsOf(Label const& label) {
     return {label.getCategory(), label.getLabelIdentifier()};
@@ -46,9 +43,7 @@ public:
         Progress const progress("Labelling " + std::to_string(paths.size()) + " files and folders");
         auto const guard = project.store().acquireWriteLock();
         for (auto const& path : paths) {
-            if (!project.files().isFileInProject(path)) {
-                project::exception::raise(FileNotInProject(path.native()));
-            }
+            project.requireInProject(path);
         }
         change(project, paths);
         return 0;
@@ -145,22 +140,21 @@ public:
         JsonRows rows;
         for (auto const& path : paths) {
             auto const relative = project::metadata::getRelativePath(project.root(), path);
-            for (auto const& label : labelsOf(project.files(), path)) {
+            for (auto const& label : labelsOf(project, path)) {
                 json_ ? writeJson(rows, relative, label) : writeLine(relative, label, paths.size() > 1);
             }
         }
         if (json_) {
-            rows.finish();
-            output().text() += '\n';
+            rows.finishOutput();
         }
         return 0;
     }
 
 private:
     /// The file manager gives a label that has data twice, with the data first.
-    static std::vector<FileLabel> labelsOf(FileManager& files, Path const& path) {
+    static std::vector<FileLabel> labelsOf(OpenProject& project, Path const& path) {
         std::vector<FileLabel> result;
-        for (auto const& label : readLabels(files, path)) {
+        for (auto const& label : readLabels(project, path)) {
             auto const isSame = [&label](FileLabel const& other) { return idsOf(other) == idsOf(label); };
             if (std::ranges::none_of(result, isSame)) {
                 result.push_back(label);
@@ -169,11 +163,9 @@ private:
         return result;
     }
 
-    static std::vector<FileLabel> readLabels(FileManager& files, Path const& path) {
-        if (!files.isFileInProject(path)) {
-            project::exception::raise(FileNotInProject(path.native()));
-        }
-        return path == files.getProjectRoot() ? std::vector<FileLabel>() : files.getLabels(path);
+    static std::vector<FileLabel> readLabels(OpenProject& project, Path const& path) {
+        project.requireInProject(path);
+        return path == project.root() ? std::vector<FileLabel>() : project.files().getLabels(path);
     }
 
     static void writeJson(JsonRows& rows, std::u16string const& path, FileLabel const& label) {
@@ -237,8 +229,7 @@ public:
             }
         });
         if (json_) {
-            rows_.finish();
-            output().text() += '\n';
+            rows_.finishOutput();
         }
         return 0;
     }

@@ -77,9 +77,8 @@ public:
     /// Puts a text in the place of one in which a merge left its markers, where all is settled that they
     /// stand for. To be called with no guard open; waits for other writers.
     /// @param settled a whole text; it is written in canonical form.
-    /// @throws StoreError when it is not whole, is damaged or has markers itself; or when the text on disk
-    /// has
-    ///         none, since somebody else has settled them.
+    /// @throws StoreError when it is not whole, is damaged or has markers itself, or when the text on disk
+    ///         has none.
     void settle(std::string settled);
 
     /// All faults of the text as it is on disk now, by line. To be called with no guard open. Takes no lock.

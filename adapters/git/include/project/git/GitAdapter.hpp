@@ -46,9 +46,8 @@ public:
     /// inside this one, and what is neither a file nor a link is passed over. An ignored file that is named
     /// is staged. The index is written once, or not at all when nothing is left to do or anything fails.
     /// @throws GitError when the index is locked (the error's file is the lock file) or can't be written,
-    /// when
-    ///         a file can't be read, or when one would have to go through a filter driver or be encoded anew,
-    ///         which git alone does.
+    ///         when a file can't be read, or when one would have to go through a filter driver or be encoded
+    ///         anew, which git alone does.
     void addToSourceControl(std::vector<Path> const& files) override;
 
     /// Takes these files, and all below these folders, out of the index, as `git rm --cached -r` does. What
