@@ -8,6 +8,13 @@ namespace project::stores {
 
 using metadata::PathElement;
 
+namespace {
+
+/// Beyond this it costs less to forget everything than to load again what each difference touches.
+constexpr std::size_t mostLoadedAgain = 4096;
+
+} // namespace
+
 /// Orders siblings, whose addresses differ in the last step only.
 struct MetadataTree::ByElement {
     using is_transparent = void;
@@ -239,15 +246,15 @@ void MetadataTree::forget() {
 }
 
 void MetadataTree::takeIn(Changes const& changes) {
-    if (changes.everything) {
+    if (changes.everything || changes.differences.size() > mostLoadedAgain) {
         forget();
         return;
     }
     // Whether an address exists can depend on what lies below it, so every level above a change is loaded
     // again; each level once, from the top.
     std::set<Address> levels;
-    for (auto const& address : changes.addresses) {
-        for (auto level = address; level.depth() > 0;) {
+    for (auto const& difference : changes.differences) {
+        for (auto level = difference.address; level.depth() > 0;) {
             level = level.parent();
             if (!levels.insert(level).second) {
                 break; // all above it are there already

@@ -1,6 +1,7 @@
 #include "ProjectText.hpp"
 
 #include <algorithm>
+#include <map>
 #include <utility>
 
 #include "TextContent.hpp"
@@ -11,13 +12,6 @@
 #include "TextTail.hpp"
 
 namespace project::stores {
-
-namespace {
-
-/// Beyond this it costs a reader less to forget everything than to look at each address.
-constexpr std::size_t mostDifferences = 4096;
-
-} // namespace
 
 class ProjectText::State {
 public:
@@ -50,26 +44,44 @@ public:
         return sound && (reading_.tail.empty() ? body() : reading_.tail).ends_with('\n');
     }
 
-    std::vector<Address> apply(std::vector<TailBatch> const& batches) {
-        std::vector<Address> touched;
-        for (TailBatch const& batch : batches) {
+    /// The batches that were appended; nothing when that is anything else.
+    std::optional<TailReading> readAppended(std::string_view added) const {
+        if (!canBeExtended() || !(added.empty() || added.ends_with('\n'))) {
+            return std::nullopt;
+        }
+        std::vector<TextLine> lines;
+        LineWalk walk(added, 0, 1);
+        while (walk.next()) {
+            lines.push_back(walk.line());
+        }
+        TailReading tail = readTail(lines, anchor());
+        return tail.faults.empty() ? std::optional(std::move(tail)) : std::nullopt;
+    }
+
+    void append(std::string_view added, TailReading const& tail) {
+        for (TailBatch const& batch : tail.batches) {
             for (Change const& change : batch.changes) {
-                touched.push_back(change.address);
-                if (change.kind == Change::Kind::Remove) {
-                    std::vector<Address> const below = content().standingWithin(change.address);
-                    touched.insert(touched.end(), below.begin(), below.end());
-                }
                 reading_.content.apply(change);
             }
         }
-        std::sort(touched.begin(), touched.end());
-        touched.erase(std::unique(touched.begin(), touched.end()), touched.end());
-        return touched;
+        reading_.tail += added;
+        anchor_ = tail.anchor;
     }
 
-    void noteTail(std::string_view added, std::string anchor) {
-        reading_.tail += added;
-        anchor_ = std::move(anchor);
+    /// What stands wherever some batches set or remove something.
+    std::map<Address, Standing> standingWhere(std::vector<TailBatch> const& batches) const {
+        std::map<Address, Standing> found;
+        for (TailBatch const& batch : batches) {
+            for (Change const& change : batch.changes) {
+                found.try_emplace(change.address, content().at(change.address));
+                if (change.kind == Change::Kind::Remove) {
+                    for (Address const& below : content().standingWithin(change.address)) {
+                        found.try_emplace(below, content().at(below));
+                    }
+                }
+            }
+        }
+        return found;
     }
 
 private:
@@ -102,21 +114,26 @@ Children ProjectText::children(Address const& parent) const {
     return state_->content().children(parent);
 }
 
-std::optional<std::vector<Address>> ProjectText::extend(std::string_view added) {
-    if (!state_->canBeExtended() || !(added.empty() || added.ends_with('\n'))) {
+std::optional<std::vector<Difference>> ProjectText::extend(std::string_view added) {
+    auto const tail = state_->readAppended(added);
+    if (!tail) {
         return std::nullopt;
     }
-    std::vector<TextLine> lines;
-    LineWalk walk(added, 0, 1);
-    while (walk.next()) {
-        lines.push_back(walk.line());
+    auto before = state_->standingWhere(tail->batches);
+    state_->append(added, *tail);
+    std::vector<Difference> found;
+    for (auto& [address, standing] : before) {
+        addIfDifferent(found, address, standing, state_->content().at(address));
     }
-    TailReading tail = readTail(lines, state_->anchor());
-    if (!tail.faults.empty()) {
-        return std::nullopt;
+    return found;
+}
+
+bool ProjectText::append(std::string_view lines) {
+    auto const tail = state_->readAppended(lines);
+    if (tail) {
+        state_->append(lines, *tail);
     }
-    state_->noteTail(added, std::move(tail.anchor));
-    return state_->apply(tail.batches);
+    return tail.has_value();
 }
 
 std::string ProjectText::tailFor(Batch const& batch) const {
@@ -129,9 +146,8 @@ ProjectText ProjectText::rewrittenWith(Batch const& batch) const {
     return ProjectText(std::make_unique<State>(std::move(reading)));
 }
 
-std::vector<Address> ProjectText::differencesTo(ProjectText const& other) const {
-    auto found = differences(state_->content(), other.state_->content(), mostDifferences);
-    return found ? *std::move(found) : std::vector{Address::root()};
+std::vector<Difference> ProjectText::differencesTo(ProjectText const& other) const {
+    return differences(state_->content(), other.state_->content());
 }
 
 std::size_t ProjectText::size() const noexcept {

@@ -35,8 +35,11 @@ public:
     Children children(Address const& parent) const;
 
     /// Takes in bytes that were appended behind what was read, if they are whole batches that chain to it.
-    /// @return the addresses that they touch; nothing, and the text unchanged, when they are anything else.
-    std::optional<std::vector<Address>> extend(std::string_view added);
+    /// @return what differs by them, sorted; nothing, and the text unchanged, when they are anything else.
+    std::optional<std::vector<Difference>> extend(std::string_view added);
+
+    /// The same for lines of which it is known what they change. @return false for anything else.
+    bool append(std::string_view lines);
 
     /// The lines of a batch with its closing line, to be appended behind this text.
     /// @throws StoreError when an address or a node is deeper than what the text can hold.
@@ -46,9 +49,8 @@ public:
     /// @throws StoreError as tailFor does.
     ProjectText rewrittenWith(Batch const& batch) const;
 
-    /// The addresses at which a node differs, came or went, from this text to the other; the root's address
-    /// alone when they are too many to be worth listing.
-    std::vector<Address> differencesTo(ProjectText const& other) const;
+    /// What differs from this text to the other, sorted.
+    std::vector<Difference> differencesTo(ProjectText const& other) const;
 
     /// All the bytes that were read or would be written, body and tail, a torn tail included.
     std::size_t size() const noexcept;

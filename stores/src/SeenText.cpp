@@ -29,13 +29,6 @@ bool isWithoutNodes(ProjectText const& text) {
     return text.tailSize() == 0 && text.body() == ProjectText::empty().body();
 }
 
-/// The root's address stands for more differences than are worth listing.
-Changes toChanges(std::vector<Address> addresses) {
-    bool const everything = std::any_of(addresses.begin(), addresses.end(),
-                                        [](Address const& address) { return address.depth() == 0; });
-    return everything ? Changes{true, {}} : Changes{false, std::move(addresses)};
-}
-
 } // namespace
 
 Changes SeenText::look(milliseconds patience) {
@@ -83,13 +76,13 @@ bool SeenText::takeInTail(Changes& changes) {
     if (!added || !added->identity.isSameFile(seen_->identity)) {
         return false;
     }
-    auto touched = seen_->text.extend(added->bytes);
-    if (!touched) {
+    auto differences = seen_->text.extend(added->bytes);
+    if (!differences) {
         return false;
     }
     seen_->identity = added->identity;
     seen_->isSettled = isSettledAt(added->identity, before);
-    addChanges(changes, toChanges(std::move(*touched)));
+    addChanges(changes, {false, std::move(*differences)});
     return true;
 }
 
@@ -112,7 +105,7 @@ bool SeenText::readAnew(Changes& changes) {
     if (!text) {
         return false;
     }
-    addChanges(changes, seen_ ? toChanges(seen_->text.differencesTo(*text)) : Changes{true, {}});
+    addChanges(changes, seen_ ? Changes{false, seen_->text.differencesTo(*text)} : Changes{true, {}});
     seen_ = Seen{std::move(*text), content->identity, isSettled};
     return true;
 }
@@ -133,7 +126,7 @@ void SeenText::replaced(ProjectText text, WrittenFile const& file) {
 
 void SeenText::appended(std::string_view lines, WrittenFile const& file) {
     // Where somebody else appended as well, the size tells, and the next look reads all of it.
-    bool const isWhole = seen_->text.extend(lines) && seen_->text.size() == file.identity.size;
+    bool const isWhole = seen_->text.append(lines) && seen_->text.size() == file.identity.size;
     seen_->identity = file.identity;
     seen_->isSettled = file.isStamped && isWhole;
 }
@@ -146,8 +139,8 @@ void SeenText::distrust() noexcept {
 
 void addChanges(Changes& earlier, Changes later) {
     earlier.everything = earlier.everything || later.everything;
-    earlier.addresses.insert(earlier.addresses.end(), std::make_move_iterator(later.addresses.begin()),
-                             std::make_move_iterator(later.addresses.end()));
+    earlier.differences.insert(earlier.differences.end(), std::make_move_iterator(later.differences.begin()),
+                               std::make_move_iterator(later.differences.end()));
 }
 
 } // namespace project::stores

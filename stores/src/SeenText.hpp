@@ -66,7 +66,7 @@ private:
     bool staysInFolder_ = false;
 };
 
-/// Appends to the addresses of the earlier changes those of the later ones.
+/// Appends to the earlier changes the later ones.
 void addChanges(Changes& earlier, Changes later);
 
 } // namespace project::stores

@@ -16,37 +16,26 @@ bool isSame(Standing const& left, Standing const& right) {
     return left.node == right.node || isEqual(*left.node, *right.node);
 }
 
-class Comparison {
+/// Finds the addresses at which two contents may differ: where their bodies' lines differ, and wherever one
+/// says something else than its body does.
+class Candidates {
 public:
-    Comparison(TextContent const& left, TextContent const& right, std::size_t limit)
-        : left_(left), right_(right), limit_(limit) {}
-
-    std::optional<std::vector<Address>> find() {
+    Candidates(TextContent const& left, TextContent const& right) : left_(left), right_(right) {
         compareBodies();
         lookThrough(left_);
         lookThrough(right_);
-        if (tooMany()) {
-            return std::nullopt;
-        }
-        return std::vector<Address>(found_.begin(), found_.end());
     }
+
+    std::set<Address> const& found() const noexcept { return found_; }
 
 private:
-    bool tooMany() const noexcept { return found_.size() > limit_; }
-
-    void look(Address const& address) {
-        if (!isSame(left_.at(address), right_.at(address))) {
-            found_.insert(address);
-        }
-    }
-
     void compareBodies() {
         TextBody const& left = left_.body();
         TextBody const& right = right_.body();
         std::size_t const same = firstDifference(left.bytes(), right.bytes());
         std::size_t l = std::min(left.linesBefore(same), right.linesBefore(same));
         std::size_t r = l;
-        while ((l < left.size() || r < right.size()) && !tooMany()) {
+        while (l < left.size() || r < right.size()) {
             if (l < left.size() && r < right.size() && left.line(l) == right.line(r)) {
                 ++l;
                 ++r;
@@ -56,19 +45,15 @@ private:
             auto const order = leftEnds            ? std::strong_ordering::greater
                                : r == right.size() ? std::strong_ordering::less
                                                    : compare(left.address(l), right.address(r));
-            look(toAddress(std::is_gt(order) ? right.address(r) : left.address(l)));
+            found_.insert(found_.end(), toAddress(std::is_gt(order) ? right.address(r) : left.address(l)));
             l += std::is_lteq(order) ? 1 : 0;
             r += std::is_gteq(order) ? 1 : 0;
         }
     }
 
-    /// Looks wherever a content says something else than its body does.
     void lookThrough(TextContent const& content) {
         for (auto const& [address, entry] : content.overlay().entries()) {
-            if (tooMany()) {
-                return;
-            }
-            look(address);
+            found_.insert(address);
             if (entry.hides) {
                 lookAtHidden(content.body(), address);
             }
@@ -77,22 +62,32 @@ private:
 
     void lookAtHidden(TextBody const& body, Address const& address) {
         TextBody::Range const hidden = body.within(AddressText(address).view());
-        for (std::size_t i = hidden.begin; i < hidden.end && !tooMany(); ++i) {
-            look(toAddress(body.address(i)));
+        for (std::size_t i = hidden.begin; i < hidden.end; ++i) {
+            found_.insert(toAddress(body.address(i)));
         }
     }
 
     TextContent const& left_;
     TextContent const& right_;
-    std::size_t limit_;
     std::set<Address> found_;
 };
 
 } // namespace
 
-std::optional<std::vector<Address>> differences(TextContent const& left, TextContent const& right,
-                                                std::size_t limit) {
-    return Comparison(left, right, limit).find();
+void addIfDifferent(std::vector<Difference>& found, Address const& address, Standing const& before,
+                    Standing const& after) {
+    if (!isSame(before, after)) {
+        found.push_back({address, before.node, after.node});
+    }
+}
+
+std::vector<Difference> differences(TextContent const& before, TextContent const& after) {
+    std::vector<Difference> found;
+    Candidates const candidates(before, after);
+    for (Address const& address : candidates.found()) {
+        addIfDifferent(found, address, before.at(address), after.at(address));
+    }
+    return found;
 }
 
 } // namespace project::stores

@@ -1,18 +1,18 @@
 #pragma once
 
-#include <cstddef>
-#include <optional>
 #include <vector>
 
 #include "TextContent.hpp"
 
 namespace project::stores {
 
-/// The addresses at which something else stands in one content than in the other, sorted.
-/// @return nothing when they are more than the limit.
+/// Where something else stands in one content than in the other, sorted.
 ///
 /// Compares lines as they stand; only where they differ, or something is laid over them, nodes are made.
-std::optional<std::vector<Address>> differences(TextContent const& left, TextContent const& right,
-                                                std::size_t limit);
+std::vector<Difference> differences(TextContent const& before, TextContent const& after);
+
+/// Notes a difference if there is one.
+void addIfDifferent(std::vector<Difference>& found, Address const& address, Standing const& before,
+                    Standing const& after);
 
 } // namespace project::stores

@@ -5,6 +5,7 @@
 #include <stdexcept>
 #include <utility>
 
+#include "ChangeLog.hpp"
 #include "ListenerList.hpp"
 #include "MetadataTree.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
@@ -57,6 +58,7 @@ public:
     std::unique_ptr<Backend> const backend;
     Path const metadataRoot;
     MetadataTree tree;
+    ChangeLog othersChanges;
     ListenerList listeners;
     bool writing = false;
     ReentrantReadWriteLock lock; // last: it enters and leaves the backend
@@ -68,6 +70,7 @@ private:
 void TreeMetadataManager::State::enter(Access access) {
     auto const changes = backend->enter(access);
     try {
+        othersChanges.add(changes);
         tree.takeIn(changes);
     } catch (...) {
         tree.takeIn({true, {}}); // what was half taken in is forgotten, and loaded again when asked for
@@ -199,6 +202,11 @@ void TreeMetadataManager::createPaths(std::vector<Address>& paths) {
 bool TreeMetadataManager::pathExists(Address path) {
     auto const guard = state_->lock.readLock();
     return state_->tree.exists(path);
+}
+
+Changes TreeMetadataManager::takeOthersChanges() {
+    auto const guard = state_->lock.readLock();
+    return state_->othersChanges.take();
 }
 
 } // namespace project::stores

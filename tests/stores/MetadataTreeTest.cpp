@@ -16,6 +16,8 @@ protected:
         return {PathElement(u"t", name), plainNode(), false, hasChildren};
     }
 
+    static Changes changeAt(Address const& address) { return {false, {{address, nullptr, nullptr}}}; }
+
     static Child bare(std::u16string const& name) { return {PathElement(u"t", name), nullptr, false, true}; }
 
     std::map<Address, Children> levels;
@@ -56,7 +58,7 @@ TEST_F(MetadataTreeTest, aChangedNodeIsLoadedAgainAndItsSiblingsStay) {
     loaded.clear();
 
     levels[a] = {plain(u"a"), plain(u"c")};
-    tree.takeIn({false, {a.child({u"t", u"c"})}});
+    tree.takeIn(changeAt(a.child({u"t", u"c"})));
 
     EXPECT_THAT(tree.children(a), ElementsAre(aa, a.child({u"t", u"c"})));
     EXPECT_EQ(tree.children(b).size(), 1U);
@@ -70,7 +72,7 @@ TEST_F(MetadataTreeTest, anAddressThatWasThereOnlyForWhatLayBelowGoesWithIt) {
 
     levels[root] = {plain(u"b")};
     levels[a] = {};
-    tree.takeIn({false, {aa}});
+    tree.takeIn(changeAt(aa));
 
     EXPECT_FALSE(tree.exists(a));
     EXPECT_THAT(tree.children(root), ElementsAre(b));
@@ -82,13 +84,13 @@ TEST_F(MetadataTreeTest, whatOthersPutBelowAnAddressWithoutChildrenIsFound) {
 
     levels[root] = {plain(u"a", true)};
     levels[a] = {plain(u"a")};
-    tree.takeIn({false, {aa}});
+    tree.takeIn(changeAt(aa));
 
     EXPECT_THAT(tree.children(a), ElementsAre(aa));
 }
 
 TEST_F(MetadataTreeTest, levelsThatWereNeverLoadedAreNotLoadedForAChange) {
-    tree.takeIn({false, {aa}});
+    tree.takeIn(changeAt(aa));
     EXPECT_THAT(loaded, IsEmpty());
 }
 

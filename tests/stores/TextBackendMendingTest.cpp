@@ -97,7 +97,7 @@ TEST_F(TextBackendMending, whatTidyFindsChangedIsToldByTheNextGuard) {
     EXPECT_TRUE(backend->tidy());
 
     Entered const entered(*backend);
-    EXPECT_THAT(entered.changes().addresses, ElementsAre(fileAddress(u"b")));
+    EXPECT_THAT(addressesOf(entered.changes().differences), ElementsAre(fileAddress(u"b")));
 }
 
 TEST_F(TextBackendMending, aDamagedTextIsNotTidied) {

@@ -124,7 +124,7 @@ TEST(TextDamage, anAlteredByteOfABodyIsSeenOrChangesItsLineAlone) {
             ParsedLine const was = parseBodyLine(lineAt(bytes, at));
             ParsedLine const is = parseBodyLine(lineAt(altered, at));
             ASSERT_TRUE(was.change && is.change) << at;
-            for (Address const& address : text->differencesTo(readWhole(bytes))) {
+            for (Address const& address : addressesOf(text->differencesTo(readWhole(bytes)))) {
                 ASSERT_TRUE(address == was.change->address || address == is.change->address) << at;
             }
         }

@@ -168,10 +168,10 @@ TEST(TextTail, whatWasAppendedIsTakenIn) {
     ProjectText text = readWhole(body);
     std::string const one = text.tailFor({set(fileAddress(u"d")), set(fileAddress(u"a"))});
     std::string const two = readWhole(body + one).tailFor({remove(fileAddress(u"folder"))});
-    auto const touched = text.extend(one + two);
-    ASSERT_TRUE(touched.has_value());
-    EXPECT_EQ(*touched, (std::vector{fileAddress(u"a"), fileAddress(u"d"), fileAddress(u"folder"),
-                                     fileAddress(u"folder/b"), fileAddress(u"folder/c")}));
+    auto const differences = text.extend(one + two);
+    ASSERT_TRUE(differences.has_value());
+    EXPECT_EQ(addressesOf(*differences),
+              (std::vector{fileAddress(u"d"), fileAddress(u"folder/b"), fileAddress(u"folder/c")}));
     EXPECT_TRUE(text.hasSameBytes(body + one + two));
     EXPECT_EQ(contentOf(text), contentOf(readWhole(body + one + two)));
     EXPECT_EQ(text.tailFor({set(fileAddress(u"e"))}),
@@ -199,7 +199,7 @@ TEST(TextTail, nothingElseIsTakenInAndTheTextStaysAsItWas) {
         EXPECT_TRUE(text.extend(one).has_value()) << added;
     }
     ProjectText text = readWhole(body);
-    EXPECT_EQ(text.extend(""), std::vector<Address>());
+    EXPECT_TRUE(text.extend("").value().empty());
 }
 
 TEST(TextTail, nothingIsTakenInBehindATornOrDamagedText) {

@@ -140,6 +140,15 @@ std::string told(std::vector<Fault> const& faults) {
     return result;
 }
 
+std::vector<Address> addressesOf(std::vector<Difference> const& differences) {
+    std::vector<Address> addresses;
+    addresses.reserve(differences.size());
+    for (auto const& difference : differences) {
+        addresses.push_back(difference.address);
+    }
+    return addresses;
+}
+
 Change set(Address const& address, Node const& node) {
     return {Change::Kind::Set, address, node};
 }

@@ -55,6 +55,9 @@ Content contentOf(ProjectText const& text);
 /// Kinds and lines, as "Damage 3, Conflict 5".
 std::string told(std::vector<Fault> const& faults);
 
+/// Where a difference is, in their order.
+std::vector<Address> addressesOf(std::vector<Difference> const& differences);
+
 Change set(Address const& address, Node const& node = plainNode());
 Change remove(Address const& address);
 Change make(Address const& address);

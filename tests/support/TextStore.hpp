@@ -28,6 +28,7 @@ using stores::Batch;
 using stores::FileChanges;
 using stores::StoreError;
 using stores::TextBackend;
+using stores::samples::addressesOf;
 using stores::samples::addressOf;
 using stores::samples::Content;
 using stores::samples::fileAddress;

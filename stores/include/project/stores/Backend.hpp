@@ -48,10 +48,17 @@ struct Change {
 
 using Batch = std::vector<Change>;
 
+/// What others have changed at one address: a node came, went or became another, or the address was made.
+struct Difference {
+    Address address;
+    Node before; ///< null where none was stored
+    Node after;  ///< null where none is stored
+};
+
 /// What others have changed since the last look.
 struct Changes {
-    bool everything = false;        ///< more than is worth listing: forget all that was loaded
-    std::vector<Address> addresses; ///< each address at which a node came, went or became another
+    bool everything = false; ///< nothing is known of what was there before: forget all that was loaded
+    std::vector<Difference> differences;
 };
 
 /// The files on disk that came into being or went with a batch, absolute.

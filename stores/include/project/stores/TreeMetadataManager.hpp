@@ -33,6 +33,14 @@ public:
     void createPaths(std::vector<metadata::MetadataPath>& paths) override;
     bool pathExists(metadata::MetadataPath path) override;
 
+    /// What others have changed in the store since the last call, or for the first call since the first
+    /// guard: one difference for each address, sorted, from before the first change of it to after the last.
+    /// What came back to what it was is left out.
+    ///
+    /// Takes the read lock, and so looks for changes unless a guard is open. Between two calls each address
+    /// that others have changed is kept, with both nodes.
+    Changes takeOthersChanges();
+
 private:
     class State;
 
