@@ -41,18 +41,20 @@ auto CrashingDisk::call(std::string const& name, Effect effect, Part part) {
     if (volume_->beforeCall) {
         volume_->beforeCall(name);
     }
-    auto const trouble = volume_->nextTrouble();
-    bool const before = volume_->pick(1) == 0;
+    auto const trouble = volume_->nextTrouble(name);
     if (trouble == Trouble::Fails || trouble == Trouble::FailsForGood) {
         part(true);
         throw StoreError(folder(), 0, "the disk fails at \"" + name + "\"", "");
     }
-    if (trouble == Trouble::Dies && before) {
+    if (trouble == Trouble::DiesBefore) {
+        die();
+    }
+    if (trouble == Trouble::DiesAmid) {
         part(false);
         die();
     }
     auto const result = effect();
-    if (trouble == Trouble::Dies) {
+    if (trouble == Trouble::DiesAfter) {
         die();
     }
     if (volume_->afterCall) {
@@ -80,11 +82,19 @@ CrashingVolume::Names& CrashingDisk::names() {
 }
 
 void CrashingDisk::bind(std::string const& name, std::shared_ptr<File> file) {
-    CrashingVolume::bind(*folder_, name, std::move(file));
+    volume_->bind(*folder_, name, std::move(file));
+}
+
+bool CrashingDisk::isTaken(std::string const& name) {
+    return volume_->find(names(), name) != names().end();
+}
+
+bool CrashingDisk::isFailingForGood() const {
+    return volume_->planned_ == Trouble::FailsForGood;
 }
 
 std::shared_ptr<CrashingDisk::File> CrashingDisk::find(std::string const& name) {
-    auto const found = names().find(name);
+    auto const found = volume_->find(names(), name);
     if (found == names().end()) {
         throw StoreError(name, 0, "is not there", "");
     }
@@ -102,25 +112,38 @@ bool CrashingDisk::openFolder() {
 }
 
 bool CrashingDisk::makeFolder() {
-    return call("makeFolder", [this] {
+    auto const make = [this] {
         bool const isMade = !volume_->folder_;
         if (isMade) {
-            volume_->makeFolder();
+            volume_->makeFolderUnsynced();
+        }
+        volume_->syncRoot();
+        if (folder_ != volume_->folder_) {
+            unlock();
         }
         folder_ = volume_->folder_;
         return isMade;
+    };
+    return call("makeFolder", make, [this](bool goesOn) {
+        // A disk that fails for good does not let it be removed again either.
+        if (!volume_->folder_ && (!goesOn || isFailingForGood())) {
+            volume_->makeFolderUnsynced();
+        }
     });
 }
 
 void CrashingDisk::removeFolder() noexcept {
-    if (isDead_) {
-        return;
+    try {
+        call("removeFolder", [this] {
+            if (folder_ && folder_ == volume_->folder_ && folder_->names.empty()) {
+                volume_->removeFolderUnsynced();
+            }
+            return true;
+        });
+    } catch (...) {
+        // the folder stays, or the process has died
     }
-    volume_->calls.emplace_back("removeFolder");
     unlock();
-    if (folder_ && folder_ == volume_->folder_ && folder_->names.empty()) {
-        volume_->folder_.reset();
-    }
     folder_.reset();
 }
 
@@ -151,8 +174,11 @@ std::string CrashingDisk::lockHolder() {
 }
 
 std::optional<FileIdentity> CrashingDisk::identifyIn(CrashingVolume::Folder* where, std::string const& name) {
-    auto const found = where != nullptr ? where->names.find(name) : CrashingVolume::Names::iterator();
-    if (where == nullptr || found == where->names.end()) {
+    if (where == nullptr) {
+        return std::nullopt;
+    }
+    auto const found = volume_->find(where->names, name);
+    if (found == where->names.end()) {
         return std::nullopt;
     }
     return CrashingVolume::identify(*found->second);
@@ -204,7 +230,7 @@ std::optional<WrittenFile> CrashingDisk::append(std::string const& name, FileIde
         if (identifyIn(folder_.get(), name) != expected) {
             return std::nullopt;
         }
-        written_ = names().find(name)->second;
+        written_ = find(name);
         if (volume_->amidAppend) {
             volume_->amidAppend();
         }
@@ -223,7 +249,7 @@ WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes
                                  std::optional<std::string> const& like) {
     auto const make = [&] {
         written_ = volume_->makeFile("");
-        if (names().contains(name)) {
+        if (isTaken(name)) {
             throw StoreError(name, 0, "is there already", "");
         }
         bind(name, written_);
@@ -237,7 +263,8 @@ WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes
         return WrittenFile{CrashingVolume::identify(*written_), isStamped};
     };
     return call("create " + kindOf(name) + (like ? " like " + *like : ""), make, [&](bool goesOn) {
-        if (!goesOn) {
+        // A disk that fails for good does not let the half be removed again either.
+        if (!goesOn || isFailingForGood()) {
             auto const half = volume_->makeFile("");
             volume_->write(*half, bytes.substr(0, volume_->pick(bytes.size())));
             bind(name, half);
@@ -286,7 +313,7 @@ void CrashingDisk::rename(std::string const& from, std::string const& to) {
 bool CrashingDisk::renameToFree(std::string const& from, std::string const& to) {
     return call("renameToFree " + kindOf(from) + " " + kindOf(to), [&] {
         auto const moved = find(from);
-        if (names().contains(to)) {
+        if (isTaken(to)) {
             return false;
         }
         moved->changed = volume_->clock_;
@@ -298,7 +325,7 @@ bool CrashingDisk::renameToFree(std::string const& from, std::string const& to) 
 
 bool CrashingDisk::remove(std::string const& name) {
     return call("remove " + kindOf(name), [&] {
-        bool const isThere = names().contains(name);
+        bool const isThere = isTaken(name);
         if (isThere) {
             bind(name, nullptr);
         }

@@ -19,10 +19,11 @@ struct ProcessDied {};
 
 /// A file system in memory that knows what of it would outlive a power cut: what was synced.
 ///
-/// It keeps, for each file, the writes since its last sync, and for each folder the names since its last
-/// sync. powerCut drops any of them and tears the last write. Calls of disks on it are recorded and can be
-/// made to fail or to be the last thing that a process does. The rest of the interface is for the stranger:
-/// git, an editor, or another program that takes no lock, whose changes are durable at once.
+/// It keeps, for each file, the writes since its last sync, and for the folder the names since its last sync.
+/// powerCut drops any of them, each by itself, so that what is left is what any order of writing can leave,
+/// and tears the writes. Calls of disks on it are recorded and can be made to fail or to be the last thing
+/// that a process does. The rest of the interface is for the stranger: git, an editor, or another program
+/// that takes no lock, whose changes are durable at once.
 class CrashingVolume {
 public:
     enum class Trouble {
@@ -30,6 +31,9 @@ public:
         Fails,        ///< this call fails, and what it was to do is done in part at most
         FailsForGood, ///< this call and all later ones fail
         Dies,         ///< the process dies before, in the middle of, or after this call
+        DiesBefore,   ///< the same at one of these moments
+        DiesAmid,     ///< what the call was to do is done in part at most
+        DiesAfter,
     };
 
     explicit CrashingVolume(unsigned seed = 1) : random_(seed) {}
@@ -49,6 +53,9 @@ public:
     bool canExchange = true;
     bool keepsStamps = true;
 
+    /// Whether names that differ in capitals alone lead to the same file.
+    bool foldsNames = false;
+
     /// Bytes that can still be written before the disk is full.
     std::optional<std::uint64_t> room;
 
@@ -57,6 +64,13 @@ public:
 
     /// Forgets what was planned. @return true when it has not happened yet.
     bool cancelPlan();
+
+    /// The first call that what was planned last has come to; empty before.
+    std::string const& troubled() const { return troubled_; }
+
+    /// A volume in the same state that goes its own way from here, by other random choices. Nobody holds a
+    /// lock on it.
+    std::shared_ptr<CrashingVolume> copy(unsigned seed) const;
 
     std::size_t count(std::string const& call) const;
 
@@ -80,7 +94,7 @@ public:
     // The stranger.
     void makeFolder();
 
-    void removeFolder() { folder_.reset(); }
+    void removeFolder() { putFolder(nullptr); }
 
     /// Puts an empty folder in the place of the store's. @return what brings the old one back.
     std::function<void()> moveFolderAway();
@@ -104,6 +118,7 @@ private:
         std::uint64_t inode = 0;
         std::int64_t modified = 0;
         std::int64_t changed = 0;
+        std::int64_t unstamped = 0; ///< the time without a stamp that was not synced
         bool isPipe = false;
         std::string bytes;
         std::string durable;
@@ -120,7 +135,16 @@ private:
     };
 
     /// Lets a name lead to a file, or to nothing.
-    static void bind(Folder& folder, std::string const& name, std::shared_ptr<File> file);
+    void bind(Folder& folder, std::string const& name, std::shared_ptr<File> file) const;
+
+    /// Where a name stands among others, which may be in other capitals.
+    Names::const_iterator find(Names const& names, std::string const& name) const;
+
+    void putFolder(std::shared_ptr<Folder> folder);
+    void makeFolderUnsynced();
+    void syncRoot();
+    void removeFolderUnsynced();
+    static std::shared_ptr<Folder> copyOf(Folder const& folder);
 
     std::shared_ptr<File> makeFile(std::string bytes);
     std::shared_ptr<File> file(std::string const& name) const;
@@ -129,7 +153,7 @@ private:
     static void sync(File& file);
     bool stamp(File& file);
     void setTimes(File& file) const;
-    Trouble nextTrouble();
+    Trouble nextTrouble(std::string const& call);
     std::size_t pick(std::size_t bound);
     void tear(File& file);
     static stores::FileIdentity identify(File const& file);
@@ -138,9 +162,12 @@ private:
     std::int64_t clock_ = 1'000'000'000'000'000'000;
     std::int64_t stamps_ = 0;
     std::uint64_t inodes_ = 0;
-    std::shared_ptr<Folder> folder_; ///< what the path from the project's root leads to
+    std::shared_ptr<Folder> folder_;                       ///< what the path from the project's root leads to
+    std::shared_ptr<Folder> durableFolder_;                ///< the same at the last sync of the root
+    std::vector<std::shared_ptr<Folder>> unsyncedFolders_; ///< and since
     Trouble planned_ = Trouble::None;
     std::size_t callsBefore_ = 0;
+    std::string troubled_;
 };
 
 /// The disk of one process on a CrashingVolume.
@@ -189,6 +216,8 @@ private:
     CrashingVolume::Names& names();
     std::shared_ptr<File> find(std::string const& name);
     void bind(std::string const& name, std::shared_ptr<File> file);
+    bool isTaken(std::string const& name);
+    bool isFailingForGood() const;
     std::optional<stores::FileIdentity> identifyIn(CrashingVolume::Folder* folder, std::string const& name);
     void writeWithinRoom(File& file, std::string_view bytes);
 

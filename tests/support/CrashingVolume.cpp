@@ -1,4 +1,5 @@
 #include <algorithm>
+#include <cctype>
 #include <utility>
 
 #include "support/CrashingDisk.hpp"
@@ -10,18 +11,26 @@ using stores::FileIdentity;
 void CrashingVolume::plan(Trouble trouble, std::size_t callsBefore) {
     planned_ = trouble;
     callsBefore_ = callsBefore;
+    troubled_.clear();
 }
 
 bool CrashingVolume::cancelPlan() {
     return std::exchange(planned_, Trouble::None) != Trouble::None;
 }
 
-CrashingVolume::Trouble CrashingVolume::nextTrouble() {
+CrashingVolume::Trouble CrashingVolume::nextTrouble(std::string const& call) {
     if (planned_ == Trouble::None || callsBefore_ > 0) {
         callsBefore_ -= callsBefore_ > 0 ? 1 : 0;
         return Trouble::None;
     }
-    return planned_ == Trouble::FailsForGood ? planned_ : std::exchange(planned_, Trouble::None);
+    if (troubled_.empty()) {
+        troubled_ = call;
+    }
+    if (planned_ == Trouble::FailsForGood) {
+        return planned_;
+    }
+    auto const trouble = std::exchange(planned_, Trouble::None);
+    return trouble != Trouble::Dies ? trouble : pick(1) == 0 ? Trouble::DiesAmid : Trouble::DiesAfter;
 }
 
 std::size_t CrashingVolume::count(std::string const& call) const {
@@ -33,6 +42,8 @@ std::size_t CrashingVolume::pick(std::size_t bound) {
 }
 
 void CrashingVolume::powerCut() {
+    unsyncedFolders_.push_back(durableFolder_);
+    putFolder(unsyncedFolders_[pick(unsyncedFolders_.size() - 1)]);
     if (!folder_) {
         return;
     }
@@ -53,7 +64,7 @@ void CrashingVolume::powerCut() {
     auto after = std::make_shared<Folder>();
     after->names = left;
     after->durable = std::move(left);
-    folder_ = std::move(after); // nobody holds a lock any more
+    putFolder(std::move(after)); // nobody holds a lock any more
 }
 
 /// Leaves of the writes that were not synced any or none, and of the last of those that are left a part: the
@@ -75,6 +86,7 @@ void CrashingVolume::tear(File& file) {
     file.bytes = bytes;
     file.durable = std::move(bytes);
     file.unsynced.clear();
+    file.modified = pick(1) == 0 ? file.modified : file.unstamped;
 }
 
 void CrashingVolume::apply(Write const& write, std::string& bytes) {
@@ -82,12 +94,68 @@ void CrashingVolume::apply(Write const& write, std::string& bytes) {
     bytes.replace(write.offset, write.bytes.size(), write.bytes);
 }
 
-void CrashingVolume::bind(Folder& folder, std::string const& name, std::shared_ptr<File> file) {
-    folder.unsynced[name].push_back(file);
-    folder.names.erase(name);
+void CrashingVolume::bind(Folder& folder, std::string const& name, std::shared_ptr<File> file) const {
+    auto const there = find(folder.names, name);
+    auto const entry = there != folder.names.end() ? there->first : name; // which keeps its capitals
+    folder.unsynced[entry].push_back(file);
+    folder.names.erase(entry);
     if (file) {
-        folder.names.emplace(name, std::move(file));
+        folder.names.emplace(entry, std::move(file));
     }
+}
+
+CrashingVolume::Names::const_iterator CrashingVolume::find(Names const& names,
+                                                           std::string const& name) const {
+    if (!foldsNames) {
+        return names.find(name);
+    }
+    return std::find_if(names.begin(), names.end(), [&name](auto const& entry) {
+        return std::equal(name.begin(), name.end(), entry.first.begin(), entry.first.end(),
+                          [](char left, char right) { return std::tolower(left) == std::tolower(right); });
+    });
+}
+
+std::shared_ptr<CrashingVolume> CrashingVolume::copy(unsigned seed) const {
+    auto result = std::make_shared<CrashingVolume>(*this);
+    result->random_.seed(seed);
+    result->calls.clear();
+    result->folder_ = folder_ ? copyOf(*folder_) : nullptr;
+    result->durableFolder_ = durableFolder_ && durableFolder_ != folder_ ? copyOf(*durableFolder_) : nullptr;
+    result->unsyncedFolders_.clear();
+    if (durableFolder_ == folder_) {
+        result->durableFolder_ = result->folder_;
+    }
+    for (auto const& folder : unsyncedFolders_) {
+        result->unsyncedFolders_.push_back(folder == folder_ ? result->folder_
+                                           : folder          ? copyOf(*folder)
+                                                             : nullptr);
+    }
+    return result;
+}
+
+/// Copies the files too, each once, whichever names lead to it.
+std::shared_ptr<CrashingVolume::Folder> CrashingVolume::copyOf(Folder const& folder) {
+    std::map<File const*, std::shared_ptr<File>> copies;
+    auto const copied = [&copies](std::shared_ptr<File> const& file) {
+        auto& result = copies[file.get()];
+        if (file && !result) {
+            result = std::make_shared<File>(*file);
+        }
+        return result;
+    };
+    auto result = std::make_shared<Folder>();
+    for (auto const& [name, file] : folder.names) {
+        result->names.emplace(name, copied(file));
+    }
+    for (auto const& [name, file] : folder.durable) {
+        result->durable.emplace(name, copied(file));
+    }
+    for (auto const& [name, files] : folder.unsynced) {
+        for (auto const& file : files) {
+            result->unsynced[name].push_back(copied(file));
+        }
+    }
+    return result;
 }
 
 std::vector<std::string> CrashingVolume::names() const {
@@ -114,11 +182,33 @@ std::string CrashingVolume::content(std::string const& name) const {
 }
 
 void CrashingVolume::makeFolder() {
-    folder_ = std::make_shared<Folder>();
+    putFolder(std::make_shared<Folder>());
 }
 
 std::function<void()> CrashingVolume::moveFolderAway() {
-    return [this, old = std::exchange(folder_, std::make_shared<Folder>())] { folder_ = old; };
+    auto old = folder_;
+    makeFolder();
+    return [this, old] { putFolder(old); };
+}
+
+void CrashingVolume::putFolder(std::shared_ptr<Folder> folder) {
+    folder_ = std::move(folder);
+    syncRoot();
+}
+
+void CrashingVolume::makeFolderUnsynced() {
+    folder_ = std::make_shared<Folder>();
+    unsyncedFolders_.push_back(folder_);
+}
+
+void CrashingVolume::removeFolderUnsynced() {
+    folder_.reset();
+    unsyncedFolders_.push_back(nullptr);
+}
+
+void CrashingVolume::syncRoot() {
+    durableFolder_ = folder_;
+    unsyncedFolders_.clear();
 }
 
 void CrashingVolume::replaceFile(std::string const& name, std::string bytes) {
@@ -168,7 +258,7 @@ std::shared_ptr<CrashingVolume::File> CrashingVolume::file(std::string const& na
     if (!folder_) {
         return nullptr;
     }
-    auto const found = folder_->names.find(name);
+    auto const found = find(folder_->names, name);
     return found == folder_->names.end() ? nullptr : found->second;
 }
 
@@ -179,6 +269,7 @@ void CrashingVolume::write(File& file, std::string_view bytes) {
 }
 
 void CrashingVolume::sync(File& file) {
+    file.unstamped = file.modified; // a new length takes the rest of what is known of the file with it
     std::erase_if(file.unsynced, [&file](Write const& write) {
         if (!write.isGivenUp) {
             apply(write, file.durable);
@@ -198,6 +289,7 @@ bool CrashingVolume::stamp(File& file) {
 void CrashingVolume::setTimes(File& file) const {
     file.modified = clock_;
     file.changed = clock_;
+    file.unstamped = clock_;
 }
 
 FileIdentity CrashingVolume::identify(File const& file) {

@@ -1,0 +1,286 @@
+#include <algorithm>
+#include <set>
+
+#include "project/stores/StoreError.hpp"
+#include "support/CrashingDisk.hpp"
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::IsSupersetOf;
+using testing::UnorderedElementsAre;
+
+namespace project::test {
+
+namespace {
+
+using stores::StoreError;
+
+/// What a disk in memory forgets: one that forgot nothing would prove nothing.
+class CrashingVolumeForgetting : public testing::Test {
+protected:
+    /// All that the given question finds after the power was cut in one or another way.
+    template <typename Question>
+    std::set<std::string> afterPowerCuts(Question const& question) const {
+        std::set<std::string> found;
+        for (unsigned seed = 0; seed < 300; ++seed) {
+            auto const cut = volume->copy(seed);
+            cut->powerCut();
+            found.insert(question(*cut));
+        }
+        return found;
+    }
+
+    std::set<std::string> contentsAfterPowerCuts(std::string const& name) const {
+        return afterPowerCuts([&name](CrashingVolume const& cut) { return cut.content(name); });
+    }
+
+    void append(std::string const& bytes) { disk.append("a", *disk.identify("a"), bytes); }
+
+    /// Names and what they lead to, "a=first b=second".
+    static std::string told(CrashingVolume const& cut) {
+        std::string result;
+        for (auto const& name : cut.names()) {
+            result += (result.empty() ? "" : " ") + name + "=" + cut.content(name);
+        }
+        return result;
+    }
+
+    void makeDurable(std::string const& name, std::string const& bytes) {
+        disk.create(name, bytes, std::nullopt);
+        disk.sync();
+        disk.syncFolder();
+    }
+
+    void SetUp() override { disk.makeFolder(); }
+
+    std::shared_ptr<CrashingVolume> const volume = std::make_shared<CrashingVolume>();
+    CrashingDisk disk{volume};
+};
+
+TEST_F(CrashingVolumeForgetting, whatWasSyncedIsThereAfterAnyPowerCut) {
+    makeDurable("a", "12");
+    append("34");
+    disk.sync();
+
+    EXPECT_THAT(contentsAfterPowerCuts("a"), ElementsAre("1234"));
+}
+
+TEST_F(CrashingVolumeForgetting, anySubsetOfTheWritesThatWereNotSyncedIsLeftAndThoseMayBeTorn) {
+    makeDurable("a", "");
+    append("12");
+    append("34");
+
+    auto const left = contentsAfterPowerCuts("a");
+
+    std::string const hole(2, '\0');
+    EXPECT_THAT(left, IsSupersetOf({std::string(), std::string("12"), std::string("1234"), hole + "34"}))
+        << "the later write without the earlier one is what a disk leaves that writes in another order";
+    EXPECT_THAT(left, IsSupersetOf({std::string("1"), std::string("123"), hole + "3"})) << "torn";
+    EXPECT_THAT(left, IsSupersetOf({std::string("1\0", 2), hole, std::string("123\0", 4)}))
+        << "the length of a write without its data";
+}
+
+TEST_F(CrashingVolumeForgetting, writesOfTwoFilesAreLostByThemselves) {
+    makeDurable("a", "");
+    makeDurable("b", "");
+    append("x");
+    disk.append("b", *disk.identify("b"), "y");
+
+    EXPECT_THAT(afterPowerCuts(told), IsSupersetOf({"a= b=", "a=x b=", "a= b=y", "a=x b=y"}));
+}
+
+TEST_F(CrashingVolumeForgetting, aNewNameIsLostUntilTheFolderIsSynced) {
+    disk.create("a", "x", std::nullopt);
+    disk.sync();
+    EXPECT_THAT(afterPowerCuts(told), UnorderedElementsAre("", "a=x"));
+
+    disk.syncFolder();
+    EXPECT_THAT(afterPowerCuts(told), ElementsAre("a=x"));
+}
+
+TEST_F(CrashingVolumeForgetting, aRemovedNameComesBackUntilTheFolderIsSynced) {
+    makeDurable("a", "x");
+    disk.remove("a");
+    EXPECT_THAT(afterPowerCuts(told), UnorderedElementsAre("", "a=x"));
+
+    disk.syncFolder();
+    EXPECT_THAT(afterPowerCuts(told), ElementsAre(""));
+}
+
+TEST_F(CrashingVolumeForgetting, eachNameOfARenamedFileIsThereOrNotByItself) {
+    makeDurable("a", "x");
+    disk.rename("a", "b");
+
+    EXPECT_THAT(afterPowerCuts(told), UnorderedElementsAre("", "a=x", "b=x", "a=x b=x"));
+}
+
+TEST_F(CrashingVolumeForgetting, eachOfTwoExchangedNamesLeadsToEitherFile) {
+    makeDurable("a", "x");
+    makeDurable("b", "y");
+    disk.exchange("a", "b");
+
+    EXPECT_THAT(afterPowerCuts(told), UnorderedElementsAre("a=x b=x", "a=x b=y", "a=y b=x", "a=y b=y"));
+}
+
+TEST_F(CrashingVolumeForgetting, aNameLeadsToAnyFileThatItLedToSinceTheLastSync) {
+    makeDurable("a", "1");
+    makeDurable("b", "2");
+    makeDurable("c", "3");
+    disk.rename("b", "a");
+    disk.rename("c", "a");
+
+    EXPECT_THAT(contentsAfterPowerCuts("a"), UnorderedElementsAre("1", "2", "3"));
+}
+
+TEST_F(CrashingVolumeForgetting, whatASyncFailedToWriteIsNotMadeDurableByALaterOne) {
+    makeDurable("a", "");
+    append("1");
+    volume->plan(CrashingVolume::Trouble::Fails, 0);
+    EXPECT_THROW(disk.sync(), StoreError);
+    append("2");
+    disk.sync();
+
+    auto const left = contentsAfterPowerCuts("a");
+
+    EXPECT_THAT(left, UnorderedElementsAre("12", std::string("\0", 1) + "2"));
+}
+
+TEST_F(CrashingVolumeForgetting, aStampIsLostUntilTheFileIsSynced) {
+    auto const made = disk.create("a", "x", std::nullopt);
+    disk.syncFolder();
+    auto const question = [&](CrashingVolume& cut) {
+        CrashingDisk after(std::shared_ptr<CrashingVolume>(&cut, [](auto*) {}));
+        after.openFolder();
+        return after.identify("a")->modified == made.identity.modified ? "kept" : "lost";
+    };
+    EXPECT_THAT(afterPowerCuts(question), UnorderedElementsAre("kept", "lost"));
+
+    disk.sync();
+    EXPECT_THAT(afterPowerCuts(question), ElementsAre("kept"));
+}
+
+TEST_F(CrashingVolumeForgetting, aFolderWhoseMakerDiedAtItMayGoAndOneThatWasMadeStays) {
+    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "gone"; }),
+                ElementsAre("there"));
+
+    volume->removeFolder();
+    volume->plan(CrashingVolume::Trouble::DiesAmid, 0);
+    EXPECT_THROW(CrashingDisk(volume).makeFolder(), ProcessDied);
+
+    ASSERT_TRUE(volume->hasFolder());
+    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "gone"; }),
+                UnorderedElementsAre("there", "gone"));
+}
+
+TEST_F(CrashingVolumeForgetting, aRemovedFolderMayComeBack) {
+    disk.removeFolder();
+
+    EXPECT_FALSE(volume->hasFolder());
+    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "gone"; }),
+                UnorderedElementsAre("there", "gone"));
+}
+
+TEST_F(CrashingVolumeForgetting, aCopyGoesItsOwnWay) {
+    makeDurable("a", "1");
+    append("2");
+    disk.rename("a", "b");
+    auto const copy = volume->copy(7);
+    CrashingDisk other(copy);
+    other.openFolder();
+
+    other.append("b", *other.identify("b"), "3");
+    other.sync();
+    other.syncFolder();
+
+    EXPECT_EQ("b=12", told(*volume));
+    EXPECT_EQ("b=123", told(*copy));
+    copy->powerCut();
+    EXPECT_EQ("b=123", told(*copy));
+    EXPECT_THAT(afterPowerCuts(told), IsSupersetOf({"", "a=1", "b=1", "a=12 b=12"}))
+        << "what the copy made durable is not so in the first";
+}
+
+/// The moments at which a process dies at a call.
+class CrashingVolumeDying : public CrashingVolumeForgetting {
+protected:
+    using Trouble = CrashingVolume::Trouble;
+
+    /// What stands in a file to which "12345678" was to be appended, over all ways to die so.
+    std::set<std::string> left(Trouble trouble) const {
+        std::set<std::string> found;
+        for (unsigned seed = 0; seed < 100; ++seed) {
+            auto const copy = volume->copy(seed);
+            CrashingDisk dying(copy);
+            dying.openFolder();
+            auto const before = *dying.identify("a");
+            copy->plan(trouble, 0);
+            EXPECT_THROW(dying.append("a", before, "12345678"), ProcessDied);
+            EXPECT_EQ("append a", copy->troubled());
+            EXPECT_THROW(dying.identify("a"), ProcessDied) << "it does nothing more";
+            found.insert(copy->content("a"));
+        }
+        return found;
+    }
+
+    void SetUp() override {
+        CrashingVolumeForgetting::SetUp();
+        makeDurable("a", "");
+    }
+};
+
+TEST_F(CrashingVolumeDying, beforeAmidAndAfterACallLeaveNothingAPartAndAll) {
+    EXPECT_THAT(left(Trouble::DiesBefore), ElementsAre(""));
+    EXPECT_THAT(left(Trouble::DiesAfter), ElementsAre("12345678"));
+    EXPECT_THAT(left(Trouble::DiesAmid),
+                ElementsAre("", "1", "12", "123", "1234", "12345", "123456", "1234567"));
+    EXPECT_THAT(left(Trouble::Dies), IsSupersetOf({"12345678", "1234"}));
+}
+
+TEST_F(CrashingVolumeDying, theLockGoesWithTheProcess) {
+    disk.openFolder();
+    disk.lock(std::chrono::milliseconds(1));
+    volume->plan(Trouble::DiesBefore, 0);
+    EXPECT_THROW(disk.identify("a"), ProcessDied);
+
+    CrashingDisk next(volume);
+    next.openFolder();
+    EXPECT_TRUE(next.lock(std::chrono::milliseconds(1)));
+}
+
+TEST_F(CrashingVolumeDying, aTroubleComesToTheCallThatIsMeantAndForGoodOrOnce) {
+    volume->plan(Trouble::Fails, 1);
+    disk.identify("a");
+    EXPECT_EQ("", volume->troubled());
+    EXPECT_THROW(disk.list(), StoreError);
+    EXPECT_EQ("list", volume->troubled());
+    EXPECT_THAT(disk.list(), ElementsAre("a"));
+
+    volume->plan(Trouble::FailsForGood, 0);
+    EXPECT_THROW(disk.list(), StoreError);
+    EXPECT_THROW(disk.identify("a"), StoreError);
+    volume->cancelPlan();
+    EXPECT_TRUE(disk.identify("a"));
+}
+
+TEST(CrashingVolumeFolding, namesInOtherCapitalsLeadToTheSameFileAndKeepTheirs) {
+    auto const volume = std::make_shared<CrashingVolume>();
+    volume->foldsNames = true;
+    volume->makeFolder();
+    volume->replaceFile("A", "x");
+    CrashingDisk disk(volume);
+    disk.openFolder();
+
+    EXPECT_TRUE(disk.identify("a"));
+    EXPECT_THROW(disk.create("a", "y", std::nullopt), StoreError);
+    disk.create("b", "y", std::nullopt);
+    EXPECT_FALSE(disk.renameToFree("b", "a"));
+    disk.exchange("b", "a");
+    EXPECT_THAT(volume->names(), ElementsAre("A", "b"));
+    EXPECT_EQ("y", volume->content("a"));
+    EXPECT_TRUE(disk.remove("a"));
+    EXPECT_THAT(volume->names(), ElementsAre("b"));
+}
+
+} // namespace
+
+} // namespace project::test
