@@ -167,6 +167,10 @@ bool ProjectText::hasSameBytes(std::string_view bytes) const noexcept {
            bytes.substr(bodySize()) == state_->reading().tail;
 }
 
+std::string ProjectText::bytes() const {
+    return body() + state_->reading().tail;
+}
+
 std::string const& ProjectText::body() const noexcept {
     return state_->body();
 }

@@ -57,6 +57,7 @@ public:
     std::size_t bodySize() const noexcept;
     std::size_t tailSize() const noexcept;
     bool hasSameBytes(std::string_view bytes) const noexcept;
+    std::string bytes() const;
 
     /// The body's bytes, which for a text without a tail is all of them.
     std::string const& body() const noexcept;

@@ -174,15 +174,16 @@ void StoreWriter::withdraw(Put const& put) {
 }
 
 /// The batch stands in the text and may not be durable; what the system still holds of the file can't be
-/// trusted after that. So the text without it is written to a new file.
+/// trusted after that. So the text without it is written to a new file, to the byte: where it has the markers
+/// of a merge or damage, those are not gone with a write that failed.
 void StoreWriter::takeBack(FileIdentity const& current, StoreError const& failure) {
     std::string reason = "another program wrote into it at the same time";
     try {
-        auto before = seen_.text().rewrittenWith({});
-        if (auto const replacement = put(before.body(), current)) {
+        auto before = seen_.text().bytes();
+        if (auto const replacement = put(before, current)) {
             disk_.syncFolder();
             removeOwn(replacement->beside, replacement->besideIdentity);
-            seen_.replaced(std::move(before), replacement->file);
+            seen_.replaced(*ProjectText::read(std::move(before), pathOfText()), replacement->file);
             return;
         }
         auto const there = identifyQuietly(StoreFiles::text);

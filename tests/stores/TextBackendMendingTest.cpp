@@ -205,6 +205,23 @@ TEST_F(TextBackendMending, settlingPutsAWholeTextInThePlaceOfOneWithMarkers) {
     commit(*backend, addFiles({u"e"}));
 }
 
+TEST_F(TextBackendMending, whenSettlingFailsTheMarkersAreThereAgain) {
+    auto const settled = textOf(addFiles({u"a", u"b"}));
+    auto conflict = textOf(addFiles({u"a", u"d"}));
+    conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
+    prepareText(conflict);
+    auto const backend = open();
+    failOnce("syncFolder");
+
+    EXPECT_EQ("Input/output error", errorOf([&] { backend->settle(settled); }).getProblem());
+
+    EXPECT_EQ(conflict, text());
+    EXPECT_EQ(contentAfter({addFiles({u"a", u"b", u"c", u"d"})}), contentOf(*backend));
+    EXPECT_THROW(commit(*backend, addFiles({u"e"})), StoreError) << "it is still to be settled";
+    backend->settle(settled);
+    EXPECT_EQ(settled, text());
+}
+
 TEST_F(TextBackendMending, settlingChangesNothingWhereThereIsNothingToSettle) {
     auto const sound = textOf(addFiles({u"a"}));
     prepareText(sound);
