@@ -66,17 +66,19 @@ public:
             sum.add(lines_[i].text);
             bodyLine(lines_[i]);
         }
-        if (i == lines_.size()) {
-            return false;
+        bool const ends = i < lines_.size();
+        if (ends) {
+            sum.add(lines_[i].text);
+            readTailOf(lines_.subspan(i + 1), sum.hex());
         }
-        sum.add(lines_[i].text);
-        readTailOf(lines_.subspan(i + 1), sum.hex());
-        return true;
+        content.finishJoining();
+        return ends;
     }
 
     TextContent content;
     std::vector<Fault> faults;
     std::map<std::size_t, std::string> damage;
+    bool torn = false;
 
 private:
     void bodyLine(TextLine const& line) {
@@ -94,6 +96,7 @@ private:
         takeIn(content, tail);
         std::move(tail.faults.begin(), tail.faults.end(), std::back_inserter(faults));
         damage.merge(tail.damage);
+        torn = tail.torn;
     }
 
     std::span<TextLine const> lines_;
@@ -134,7 +137,9 @@ std::optional<TextReading> readConflictedText(std::string bytes, std::string con
         }
         std::move(side->faults.begin(), side->faults.end(), std::back_inserter(reading.faults));
         reading.damage.merge(side->damage);
+        reading.torn = reading.torn || side->torn;
     }
+    reading.content.finishJoining();
     sortFaults(reading.faults);
     reading.canonical = false;
     reading.content.body() = TextBody(std::move(bytes));

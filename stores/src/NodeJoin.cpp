@@ -1,75 +1,67 @@
 #include "NodeJoin.hpp"
 
-#include <deque>
-#include <map>
-#include <memory>
-#include <set>
-#include <string>
+#include <utility>
 
 #include "NestedIdentity.hpp"
 #include "NodeCopy.hpp"
-#include "project/metadata/MetadataNodeSpecification.hpp"
 
 namespace project::stores {
 
 using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
 
-namespace {
+NodeJoin::NodeJoin(MetadataNode const& first)
+    : joined_(std::make_shared<MetadataNodeSpecification>(first)), type_(first.getType()) {
+}
 
-/// The nested nodes of a node, to be found by those of another one; each is found once.
-class Partners {
-public:
-    explicit Partners(MetadataNode const& node) {
+void NodeJoin::add(MetadataNode const& later) {
+    type_ = later.getType();
+    addTo(*joined_, later);
+}
+
+Node NodeJoin::take() && {
+    if (joined_->getType() != type_) {
+        auto const typed = std::make_shared<MetadataNodeSpecification>(type_);
+        copyInto(*typed, *joined_);
+        return typed;
+    }
+    return std::move(joined_);
+}
+
+NodeJoin::ByIdentity& NodeJoin::nestedIn(MetadataNode const& node) {
+    auto const [found, isNew] = nested_.try_emplace(&node);
+    if (isNew) {
         for (auto const& child : node.getChildren()) {
-            byIdentity_[identityOf(*child)].push_back(child.get());
+            found->second[identityOf(*child)].push_back(child.get());
         }
     }
+    return found->second;
+}
 
-    /// The next nested node with the identity of this one, or null.
-    MetadataNode const* take(MetadataNode const& node) {
-        auto const found = byIdentity_.find(identityOf(node));
-        if (found == byIdentity_.end() || found->second.empty()) {
-            return nullptr;
-        }
-        MetadataNode const* const partner = found->second.front();
-        found->second.pop_front();
-        taken_.insert(partner);
-        return partner;
-    }
-
-    bool isTaken(MetadataNode const& partner) const { return taken_.contains(&partner); }
-
-private:
-    std::map<std::string, std::deque<MetadataNode const*>> byIdentity_;
-    std::set<MetadataNode const*> taken_;
-};
-
-void joinInto(MetadataNode& target, MetadataNode const& earlier, MetadataNode const& later) {
-    putKeys(target, earlier);
+void NodeJoin::addTo(MetadataNode& target, MetadataNode const& later) {
     putKeys(target, later);
-    Partners partners(later);
-    for (auto const& child : earlier.getChildren()) {
-        MetadataNode& joined = *target.addChild(child->getType());
-        if (MetadataNode const* const partner = partners.take(*child)) {
-            joinInto(joined, *child, *partner);
-        } else {
-            copyInto(joined, *child);
-        }
+    if (later.getChildren().empty()) {
+        return;
     }
+    ByIdentity& known = nestedIn(target);
+    std::unordered_map<std::string, std::size_t> counts;
     for (auto const& child : later.getChildren()) {
-        if (!partners.isTaken(*child)) {
-            copyInto(*target.addChild(child->getType()), *child);
+        auto identity = identityOf(*child);
+        auto& same = known[identity];
+        auto const earlier = counts[std::move(identity)]++;
+        if (earlier >= same.size()) {
+            same.push_back(target.addChild(child->getType()));
+            copyInto(*same.back(), *child);
+        } else if (identifyingKey(*child)) { // else it is told by all of it, and has nothing to add
+            addTo(*same[earlier], *child);
         }
     }
 }
 
-} // namespace
-
 Node joinNodes(Node const& earlier, Node const& later) {
-    auto joined = std::make_shared<MetadataNodeSpecification>(later->getType());
-    joinInto(*joined, *earlier, *later);
-    return joined;
+    NodeJoin join(*earlier);
+    join.add(*later);
+    return std::move(join).take();
 }
 
 } // namespace project::stores

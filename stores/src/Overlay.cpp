@@ -1,6 +1,6 @@
 #include "Overlay.hpp"
 
-#include <algorithm>
+#include <iterator>
 #include <utility>
 
 namespace project::stores {
@@ -22,10 +22,13 @@ void Overlay::put(Address const& address, Standing standing) {
 void Overlay::remove(Address const& address) {
     auto const begin = entries_.lower_bound(address);
     auto const end = entries_.lower_bound(Order::EndOf{address});
-    hiding_ -= static_cast<std::size_t>(
-        std::count_if(begin, end, [](auto const& entry) { return entry.second.hides; }));
     entries_.emplace_hint(entries_.erase(begin, end), address, Entry{{}, true});
-    ++hiding_;
+    if (!isHidden(address)) {
+        auto next = hidden_.emplace_hint(hidden_.lower_bound(address), address);
+        for (++next; next != hidden_.end() && next->isWithin(address);) {
+            next = hidden_.erase(next);
+        }
+    }
 }
 
 Overlay::Entry const* Overlay::find(Address const& address) const {
@@ -34,16 +37,9 @@ Overlay::Entry const* Overlay::find(Address const& address) const {
 }
 
 bool Overlay::isHidden(Address const& address) const {
-    if (hiding_ == 0) {
-        return false;
-    }
-    for (Address above = address; above.depth() > 0; above = above.parent()) {
-        Entry const* const entry = find(above);
-        if (entry != nullptr && entry->hides) {
-            return true;
-        }
-    }
-    return false;
+    // None of them lies below another one, so one that is above the address comes right before it.
+    auto const next = hidden_.upper_bound(address);
+    return next != hidden_.begin() && address.isWithin(*std::prev(next));
 }
 
 Overlay::Range Overlay::below(Address const& address) const {

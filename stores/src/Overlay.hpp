@@ -1,7 +1,7 @@
 #pragma once
 
-#include <cstddef>
 #include <map>
+#include <set>
 
 #include "project/stores/Backend.hpp"
 
@@ -66,7 +66,8 @@ public:
     /// The entry of exactly this address, or null.
     Entry const* find(Address const& address) const;
 
-    /// True when what the body has at this address does not count: here or above something hides it.
+    /// True when what the body has at this address does not count: here or above something hides it. One
+    /// search, however deep the address is.
     bool isHidden(Address const& address) const;
 
     /// The entries strictly below an address.
@@ -78,7 +79,7 @@ public:
 
 private:
     Entries entries_;
-    std::size_t hiding_ = 0; ///< how many entries hide; without any, nobody has to look
+    std::set<Address> hidden_; ///< the addresses of entries that hide; of those below each other the topmost
 };
 
 } // namespace project::stores

@@ -4,7 +4,6 @@
 #include <utility>
 
 #include "LineParser.hpp"
-#include "NodeJoin.hpp"
 #include "NodeLine.hpp"
 #include "OverlaidChildren.hpp"
 
@@ -74,13 +73,46 @@ std::vector<Address> TextContent::standingWithin(Address const& address) const {
     return found;
 }
 
-void TextContent::join(Change const& change) {
-    Standing const earlier = at(change.address);
-    if (change.kind == Change::Kind::Set && earlier.node) {
-        overlay_.put(change.address, {joinNodes(earlier.node, change.node), false});
-    } else if (change.kind != Change::Kind::Make || !earlier) {
-        apply(change);
+void TextContent::apply(Change const& change) {
+    if (!joins_.empty()) {
+        auto const begin = joins_.lower_bound(change.address);
+        auto end = begin;
+        bool const withAllBelow = change.kind == Change::Kind::Remove;
+        while (end != joins_.end() &&
+               (withAllBelow ? end->first.isWithin(change.address) : end->first == change.address)) {
+            ++end;
+        }
+        joins_.erase(begin, end);
     }
+    overlay_.apply(change);
+}
+
+void TextContent::join(Change const& change) {
+    if (change.kind == Change::Kind::Remove) {
+        apply(change);
+        return;
+    }
+    auto open = joins_.find(change.address);
+    if (open == joins_.end()) {
+        Standing const earlier = at(change.address);
+        if (!earlier || (earlier.made && change.kind == Change::Kind::Set)) {
+            apply(change);
+            return;
+        }
+        if (earlier.node && change.kind == Change::Kind::Set) {
+            open = joins_.try_emplace(change.address, *earlier.node).first;
+        }
+    }
+    if (change.kind == Change::Kind::Set) {
+        open->second.add(*change.node);
+    }
+}
+
+void TextContent::finishJoining() {
+    for (auto& [address, join] : joins_) {
+        overlay_.put(address, {std::move(join).take(), false});
+    }
+    joins_.clear();
 }
 
 TextBody TextContent::write(Batch const& batch) const {

@@ -1,8 +1,10 @@
 #pragma once
 
+#include <map>
 #include <utility>
 #include <vector>
 
+#include "NodeJoin.hpp"
 #include "Overlay.hpp"
 #include "TextBody.hpp"
 #include "project/stores/Backend.hpp"
@@ -31,10 +33,14 @@ public:
     std::vector<Address> standingWithin(Address const& address) const;
 
     /// Lays one step of a batch over what is there.
-    void apply(Change const& change) { overlay_.apply(change); }
+    void apply(Change const& change);
 
-    /// Like apply, but what stands at an address already is joined with what is set there.
+    /// Like apply, but what stands at an address already is joined with what is set there. What was joined
+    /// shows after finishJoining.
     void join(Change const& change);
+
+    /// To be called once after all that is joined.
+    void finishJoining();
 
     /// A canonical body of all this, with a batch in it.
     TextBody write(Batch const& batch) const;
@@ -42,6 +48,7 @@ public:
 private:
     TextBody body_;
     Overlay overlay_;
+    std::map<Address, NodeJoin> joins_; ///< what is being joined; stands instead of what is laid over there
 };
 
 } // namespace project::stores

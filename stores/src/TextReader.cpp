@@ -142,6 +142,7 @@ private:
         if (!lines.empty()) {
             takeTail(lines);
         }
+        reading_.content.finishJoining();
         bool const ended = lines.empty() ? body_.bytes().ends_with('\n') : lines.back().hasEnd();
         if (!ended && !reading_.torn) {
             number_ = lines.empty() ? number_ - 1 : lines.back().number;

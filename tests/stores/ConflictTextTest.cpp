@@ -75,6 +75,16 @@ TEST(ConflictText, tailsOfBothSidesCount) {
     EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"("a")", R"("b")", R"("c")", R"("d")", R"("x")"}));
 }
 
+TEST(ConflictText, aTornTailOfASideIsTold) {
+    std::string const conflict = "<<<<<<< ours\n\"a\"\n=======\n\"b\"\n>>>>>>> theirs\n";
+
+    ProjectText const torn = readWhole(first + conflict + last + "\"half");
+
+    EXPECT_TRUE(torn.hasTornTail());
+    EXPECT_EQ(told(torn.faults()), "Conflict 2, TornTail 8");
+    EXPECT_FALSE(readWhole(first + conflict + last).hasTornTail());
+}
+
 TEST(ConflictText, inTheTailOfASideLaterLinesWin) {
     std::string const body = bodyOf({R"({"file":"a","keys":{"k":"1"}})"});
     std::string const tail =

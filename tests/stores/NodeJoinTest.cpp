@@ -63,6 +63,26 @@ TEST(NodeJoin, nestedNodesWithoutAnyNameAreKeptOnceWhereTheyAreEqual) {
               "Info(T(k=v;)T(k=v;))");
 }
 
+TEST(NodeJoin, nestedNodesThatAreThereTwiceMeetInTheirOrder) {
+    Nested const one{u"T", {{u"UUID", u"1"}, {u"k", u"a"}}, {}};
+    Nested const other{u"T", {{u"UUID", u"1"}, {u"l", u"b"}}, {}};
+    NodeJoin join(*makeNode(u"Info", {}, {one}));
+    join.add(*makeNode(u"Info", {}, {other, one}));
+    join.add(*makeNode(u"Info", {}, {other, other, one}));
+    EXPECT_EQ(told(std::move(join).take()), "Info(T(UUID=1;k=a;l=b;)T(UUID=1;k=a;l=b;)T(UUID=1;k=a;))");
+}
+
+RC_GTEST_PROP(NodeJoin, joiningManyIsJoiningOneByOne, ()) {
+    Node const first = *anyNode();
+    NodeJoin join(*first);
+    Node oneByOne = first;
+    for (Node const& later : *fewOf(4, anyNode())) {
+        join.add(*later);
+        oneByOne = joinNodes(oneByOne, later);
+    }
+    RC_ASSERT(told(std::move(join).take()) == told(oneByOne));
+}
+
 RC_GTEST_PROP(NodeJoin, aNodeJoinedWithItselfIsItself, ()) {
     Node const node = *anyNode();
     RC_ASSERT(joined(node, node) == told(node));
