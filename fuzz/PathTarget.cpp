@@ -1,0 +1,146 @@
+#include <array>
+#include <climits>
+#include <cstring>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "Target.hpp"
+#include "fl/filesystem/SystemName.hpp"
+#include "fl/i18n/Utf8.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+
+namespace {
+
+using namespace project::fuzz;
+using fl::filesystem::Path;
+using project::metadata::getParentFolder;
+using project::metadata::getRelativePath;
+using project::metadata::isParent;
+
+using Elements = std::vector<std::u16string>;
+
+Elements elementsOf(Path const& path) {
+    Elements elements;
+    std::u16string_view rest = path.native();
+    while (!rest.empty()) {
+        elements.emplace_back(fl::filesystem::detail::extract_first_element(rest));
+        std::size_t const before = rest.size();
+        rest = fl::filesystem::detail::move_down(rest);
+        require(rest.size() < before, "moving down comes to an end");
+    }
+    return elements;
+}
+
+bool isAbsolute(Path const& path) {
+    return path.native().starts_with(u'/');
+}
+
+std::optional<std::string> bytesOf(Path const& path) {
+    try {
+        return fl::filesystem::toSystem(path).native();
+    } catch (std::filesystem::filesystem_error const&) {
+        return std::nullopt;
+    }
+}
+
+/// Any bytes but NUL are a name on disk and come back.
+void checkName(std::string const& bytes) {
+    Path const path = fl::filesystem::fromSystem(bytes);
+    auto const back = bytesOf(path);
+    bool const holdsNul = bytes.find('\0') != std::string::npos;
+    require(back.has_value() != holdsNul, "whatever the disk has for a name has a text");
+    require(!back || *back == bytes, "a name on disk comes back");
+    fl::filesystem::SystemName const name(path);
+    bool const fits = back && back->size() < PATH_MAX;
+    require((name.get() != nullptr) == fits, "both ways to the disk take the same names");
+    require(!fits || *back == name.get(), "both ways to the disk give the same name");
+    std::u16string const text = fl::i18n::fromUtf8(bytes);
+    require(fl::i18n::fromUtf8(fl::i18n::toUtf8(text)) == text, "UTF-8 that was read comes back");
+}
+
+/// Any text has a name on disk that comes back, or none.
+void checkText(std::u16string const& text) {
+    auto const bytes = bytesOf(Path(text));
+    require(!bytes || fl::filesystem::fromSystem(*bytes).native() == text, "the text of a name comes back");
+    fl::i18n::toUtf8(text);
+}
+
+void checkRelative(Path const& base, Path const& target) {
+    Elements const from = elementsOf(base);
+    Elements const to = elementsOf(target);
+    bool const within = from.size() <= to.size() && std::equal(from.begin(), from.end(), to.begin());
+    bool const sameRoot = isAbsolute(base) == isAbsolute(target);
+    Path const relative(getRelativePath(base, target));
+    require(isParent(target, base) == (sameRoot && within && from.size() < to.size()),
+            "a folder is above what begins with its elements and has more");
+    require(relative.empty() == (from == to), "only the same place is no way off");
+    require(!isAbsolute(relative), "a way from one place to another is relative");
+    if (within && sameRoot) {
+        require(elementsOf(base / relative) == to, "the way down leads there");
+    } else {
+        require(elementsOf(relative).front() == u"..", "the way to what is not below leads up");
+    }
+    if (sameRoot) {
+        Elements reached = from;
+        for (auto const& element : elementsOf(relative)) {
+            bool const up =
+                element == u".." && !reached.empty() && reached.size() > (isAbsolute(base) ? 1U : 0U) &&
+                !std::equal(reached.begin(), reached.end(), to.begin(),
+                            to.begin() + static_cast<std::ptrdiff_t>(std::min(reached.size(), to.size())));
+            up ? reached.pop_back() : reached.push_back(element);
+        }
+        require(reached == to, "the way from one place leads to the other");
+    }
+}
+
+void checkJoined(Path const& left, Path const& right) {
+    Path const joined = left / right;
+    Elements expected = elementsOf(left);
+    Elements const added = elementsOf(right);
+    expected.insert(expected.end(), added.begin() + (isAbsolute(right) && !added.empty() ? 1 : 0),
+                    added.end());
+    require(elementsOf(joined) == expected, "joined paths have the elements of both");
+    Elements const names = elementsOf(left);
+    Elements above(names.begin(), names.empty() ? names.end() : names.end() - 1);
+    if (above.empty() && isAbsolute(left)) {
+        above = names; // above the root is the root
+    }
+    require(elementsOf(getParentFolder(left)) == above, "the folder of a path has all but its last element");
+}
+
+void checkOrder(Path const& left, Path const& right) {
+    Elements const leftElements = elementsOf(left);
+    Elements const rightElements = elementsOf(right);
+    require((left < right) == (leftElements < rightElements), "paths are ordered by their elements");
+    require((left == right) == (left.native() == right.native()), "paths are equal if their texts are");
+}
+
+std::u16string widened(std::string_view bytes) {
+    std::u16string text;
+    for (char const byte : bytes) {
+        text += static_cast<unsigned char>(byte);
+    }
+    return text;
+}
+
+/// A name on disk; the code units of the same bytes; and two paths, one behind the other with a line end
+/// between.
+void run(std::string_view input) {
+    checkName(std::string(input));
+    std::u16string units(input.size() / sizeof(char16_t), u'\0');
+    std::memcpy(units.data(), input.data(), units.size() * sizeof(char16_t));
+    checkText(units);
+    std::size_t const end = std::min(input.find('\n'), input.size());
+    Path const left(widened(input.substr(0, end)));
+    Path const right(widened(input.substr(std::min(end + 1, input.size()))));
+    checkOrder(left, right);
+    checkOrder(right, left);
+    checkJoined(left, right);
+    checkRelative(left, right);
+    checkRelative(right, left);
+}
+
+Registration const registration("path", run);
+
+} // namespace

@@ -1,0 +1,42 @@
+#include <string>
+
+#include "AttributeLine.hpp"
+#include "IgnoreRules.hpp"
+#include "NamePattern.hpp"
+#include "Target.hpp"
+
+namespace {
+
+using namespace project::fuzz;
+using project::git::AttributeLine;
+using project::git::IgnoreLine;
+using project::git::NamePattern;
+
+/// Where letters have the same case, or it counts for nothing, a pattern matches what it matches otherwise.
+void checkPattern(NamePattern const& pattern, std::string_view path) {
+    for (bool const ignoresCase : {false, true}) {
+        bool const asFile = pattern.matches(path, false, ignoresCase);
+        bool const asFolder = pattern.matches(path, true, ignoresCase);
+        require(!asFile || asFolder, "what is for files is for folders too");
+        require(asFile == pattern.matches(path, false, ignoresCase),
+                "a pattern is asked twice with one answer");
+    }
+}
+
+/// A line of git's files and a path.
+void run(std::string_view input) {
+    std::size_t const end = std::min(input.find('\n'), input.size());
+    std::string_view const line = input.substr(0, end);
+    std::string_view const path = input.substr(std::min(end + 1, input.size()));
+    if (auto const ignored = IgnoreLine::read(line)) {
+        checkPattern(ignored->pattern, path);
+    }
+    if (auto const attributes = AttributeLine::read(line); attributes && attributes->pattern) {
+        checkPattern(*attributes->pattern, path);
+    }
+    project::git::readAttributeLines(input);
+}
+
+Registration const registration("pattern", run);
+
+} // namespace
