@@ -1,0 +1,242 @@
+#include "support/TextStore.hpp"
+
+using testing::ElementsAreArray;
+using testing::IsEmpty;
+
+namespace project::test {
+
+namespace {
+
+using Calls = std::vector<std::string>;
+
+/// The first lock of a process, and any after others have written: what dead writers left is looked for.
+Calls const lockAndClear{
+    "openFolder", "lock", "isFolderInPlace", "identify project.jsonl", "list", "identify project.jsonl"};
+Calls const lockAgain{"openFolder", "lock", "isFolderInPlace", "identify project.jsonl"};
+Calls const look{"identifyByPath project.jsonl"};
+Calls const readForTheFirstTime{"openFolder", "read project.jsonl"};
+Calls const readInLockedFolder{"read project.jsonl"};
+Calls const lookAndRead{"identifyByPath project.jsonl", "openFolder", "read project.jsonl"};
+Calls const isInPlace{"isFolderInPlace", "identifyByPath project.jsonl"};
+Calls const append{"append project.jsonl", "sync"};
+Calls const writeNewText{"create temporary like project.jsonl", "sync", "renameToFree temporary swapping",
+                         "identify project.jsonl"};
+Calls const exchange{"exchange swapping project.jsonl", "identify swapping", "identify project.jsonl"};
+Calls const makeNamesDurable{"syncFolder", "identify swapping", "remove swapping"};
+
+Calls joined(std::initializer_list<Calls> parts) {
+    Calls result;
+    for (auto const& part : parts) {
+        result.insert(result.end(), part.begin(), part.end());
+    }
+    return result;
+}
+
+Calls const wholeAppend = joined({isInPlace, append, isInPlace});
+Calls const wholeRewrite = joined({isInPlace, writeNewText, exchange, isInPlace, makeNamesDurable});
+Calls const creation =
+    joined({{"openFolder", "openFolder", "makeFolder"},
+            lockAndClear,
+            readInLockedFolder,
+            {"create temporary", "sync", "renameToFree temporary .gitattributes", "identify .gitattributes"},
+            {"create temporary", "sync", "renameToFree temporary .gitignore", "identify .gitignore"},
+            {"create temporary", "sync", "renameToFree temporary project.jsonl", "identify project.jsonl"},
+            {"syncFolder"}});
+
+/// What each operation asks of the disk, to the call: a sync too many, or another reading of the text, would
+/// be a loss that nobody notices.
+class SyncCounts : public TextStore {
+protected:
+    template <typename Operation>
+    Calls callsOf(Operation const& operation) const {
+        volume->advanceBeyondTick();
+        volume->calls.clear();
+        operation();
+        return volume->calls;
+    }
+
+    Calls callsOfCommit(TextBackend& backend, char16_t const* file) const {
+        return callsOf([&] { commit(backend, addFiles({file})); });
+    }
+
+    Calls callsOfLook(TextBackend& backend) const {
+        return callsOf([&] { contentOf(backend); });
+    }
+};
+
+TEST_F(SyncCounts, aFirstBatchSyncsThreeFilesAndTheFolderAndIsThenWrittenLikeAnyOther) {
+    auto const backend = open();
+
+    EXPECT_THAT(callsOfCommit(*backend, u"a"), ElementsAreArray(joined({creation, wholeRewrite})));
+    EXPECT_EQ(4U, volume->count("sync"));
+    EXPECT_EQ(2U, volume->count("syncFolder"));
+}
+
+TEST_F(SyncCounts, anAppendIsOneWriteAndOneSync) {
+    prepare(manyFiles(20));
+    auto const backend = open(appending());
+    contentOf(*backend);
+
+    EXPECT_THAT(callsOfCommit(*backend, u"b"), ElementsAreArray(joined({lockAndClear, look, wholeAppend})));
+    EXPECT_THAT(callsOfCommit(*backend, u"c"), ElementsAreArray(joined({lockAgain, look, wholeAppend})));
+    EXPECT_EQ(1U, volume->count("sync"));
+    EXPECT_EQ(0U, volume->count("syncFolder"));
+}
+
+TEST_F(SyncCounts, aRewriteIsOneSyncOfTheFileAndOneOfTheFolder) {
+    prepare({u"a"});
+    auto const backend = open();
+    contentOf(*backend);
+
+    EXPECT_THAT(callsOfCommit(*backend, u"b"), ElementsAreArray(joined({lockAndClear, look, wholeRewrite})));
+    EXPECT_THAT(callsOfCommit(*backend, u"c"), ElementsAreArray(joined({lockAgain, look, wholeRewrite})));
+    EXPECT_EQ(1U, volume->count("sync"));
+    EXPECT_EQ(1U, volume->count("syncFolder"));
+}
+
+TEST_F(SyncCounts, aRewriteWithoutExchangeTakesNoSyncMore) {
+    prepare({u"a"});
+    volume->canExchange = false;
+    auto const backend = open();
+    contentOf(*backend);
+
+    EXPECT_THAT(callsOfCommit(*backend, u"b"),
+                ElementsAreArray(
+                    joined({lockAndClear,
+                            look,
+                            isInPlace,
+                            writeNewText,
+                            {"exchange swapping project.jsonl", "create temporary", "identify project.jsonl",
+                             "rename swapping project.jsonl", "identify project.jsonl"},
+                            isInPlace,
+                            {"syncFolder", "identify temporary", "remove temporary"}})));
+}
+
+TEST_F(SyncCounts, aWriterThatHasNotReadReadsOnce) {
+    prepare(manyFiles(20));
+
+    auto const backend = open(appending());
+
+    EXPECT_THAT(callsOfCommit(*backend, u"b"),
+                ElementsAreArray(joined({lockAndClear, readInLockedFolder, wholeAppend})));
+}
+
+TEST_F(SyncCounts, tidyingIsARewriteAndNothingWhereTheTextIsTidy) {
+    prepareText(textOf(addFiles(manyFiles(20)), {addFiles({u"b"})}));
+    auto const backend = open(appending());
+    contentOf(*backend);
+    auto const tidy = [&] { backend->tidy(); };
+
+    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAndClear, look, wholeRewrite})));
+    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAndClear, look})));
+    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAgain, look})));
+}
+
+TEST_F(SyncCounts, closingIsARewriteAfterAnAppendAndElseNothing) {
+    prepare(manyFiles(20));
+    auto reader = open(appending());
+    auto rewriter = open();
+    auto appender = open(appending());
+    contentOf(*reader);
+    commit(*rewriter, addFiles({u"b"}));
+    commit(*appender, addFiles({u"c"}));
+
+    EXPECT_THAT(callsOf([&] { appender.reset(); }),
+                ElementsAreArray(joined({lockAgain, look, wholeRewrite})));
+    EXPECT_THAT(callsOf([&] { rewriter.reset(); }), IsEmpty());
+    EXPECT_THAT(callsOf([&] { reader.reset(); }), IsEmpty());
+}
+
+TEST_F(SyncCounts, repairMakesTheDamagedLinesDurableFirst) {
+    auto damaged = textOf(addFiles({u"a", u"b", u"c"}));
+    damaged.replace(damaged.find("\"b\""), 3, "\"b  ");
+    prepareText(damaged);
+    auto const backend = open();
+
+    EXPECT_THAT(
+        callsOf([&] { backend->repair(); }),
+        ElementsAreArray(joined(
+            {lockAndClear, readInLockedFolder, {"create damaged", "sync", "syncFolder"}, wholeRewrite})));
+}
+
+TEST_F(SyncCounts, settlingIsARewrite) {
+    auto conflict = textOf(addFiles({u"a", u"d"}));
+    conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
+    prepareText(conflict);
+    auto const backend = open();
+
+    EXPECT_THAT(callsOf([&] { backend->settle(textOf(addFiles({u"a"}))); }),
+                ElementsAreArray(joined({lockAndClear, readInLockedFolder, wholeRewrite})));
+}
+
+TEST_F(SyncCounts, discardingABatchSyncsNothing) {
+    prepare({u"a"});
+    auto const backend = open();
+    contentOf(*backend);
+
+    EXPECT_THAT(callsOf([&] {
+                    Entered const entered(*backend, Access::Write);
+                    backend->write(addFiles({u"b"}));
+                    backend->discard();
+                }),
+                ElementsAreArray(joined({lockAndClear, look})));
+}
+
+TEST_F(SyncCounts, discardingAFirstBatchTakesAwayWhatWasMadeAndSyncsNothing) {
+    auto const backend = open();
+
+    EXPECT_THAT(callsOf([&] {
+                    Entered const entered(*backend, Access::Write);
+                    backend->write(addFiles({u"b"}));
+                    backend->discard();
+                }),
+                ElementsAreArray(joined({creation,
+                                         {"identify project.jsonl", "remove project.jsonl",
+                                          "identify .gitattributes", "remove .gitattributes",
+                                          "identify .gitignore", "remove .gitignore", "removeFolder"}})));
+}
+
+TEST_F(SyncCounts, aLookIsOneQuestionAndReadsOnlyWhatOthersHaveAdded) {
+    prepare(manyFiles(20));
+    auto const reader = open(appending());
+    auto const writer = open(appending());
+
+    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(readForTheFirstTime));
+    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(look));
+    commit(*writer, addFiles({u"b"}));
+    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(lookAndRead));
+    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(look));
+    EXPECT_THAT(callsOfLook(*writer), ElementsAreArray(look))
+        << "what it wrote itself it does not read again";
+    writer->tidy();
+    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(lookAndRead));
+    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(look));
+}
+
+TEST_F(SyncCounts, aFileSystemThatKeepsNoStampsCostsOneReadingMoreAfterAWrite) {
+    prepare({u"a"});
+    volume->keepsStamps = false;
+    auto const backend = open();
+    commit(*backend, addFiles({u"b"}));
+
+    EXPECT_THAT(callsOfLook(*backend), ElementsAreArray(lookAndRead));
+    EXPECT_THAT(callsOfLook(*backend), ElementsAreArray(look));
+}
+
+TEST_F(SyncCounts, aWriterThatFindsTheLeftoversOfADeadOneSyncsTheFolderOnceMore) {
+    prepare({u"a"});
+    volume->replaceFile("project.jsonl.1-0123456789abcdef.tmp", "half");
+    auto const backend = open();
+    contentOf(*backend);
+
+    EXPECT_THAT(callsOfCommit(*backend, u"b"),
+                ElementsAreArray(joined(
+                    {{"openFolder", "lock", "isFolderInPlace", "identify project.jsonl", "list", "syncFolder",
+                      "identify temporary", "remove temporary", "identify project.jsonl"},
+                     look,
+                     wholeRewrite})));
+}
+
+} // namespace
+
+} // namespace project::test

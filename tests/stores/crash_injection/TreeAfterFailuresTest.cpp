@@ -1,0 +1,183 @@
+#include <set>
+
+#include "project/metadata/FileChangeRequestListener.hpp"
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
+#include "support/TextStore.hpp"
+
+using testing::AnyOf;
+using testing::Eq;
+using testing::HasSubstr;
+
+namespace project::test {
+
+namespace {
+
+using metadata::MetadataNode;
+using metadata::MetadataNodeSpecification;
+using stores::TreeMetadataManager;
+
+/// Knows which files it was told to be there.
+class Listener : public metadata::FileChangeRequestListener {
+public:
+    void fileRemovalRequested(metadata::MetadataManager& /*store*/, Path const& /*root*/,
+                              std::vector<Path> const& files) override {
+        for (auto const& file : files) {
+            EXPECT_EQ(1U, there.erase(file)) << "it was not told of the file that is said to go";
+            ++removals;
+        }
+    }
+
+    void fileAdditionRequested(metadata::MetadataManager& /*store*/,
+                               std::vector<Path> const& files) override {
+        for (auto const& file : files) {
+            EXPECT_TRUE(there.insert(file).second) << "it was told of the file before";
+        }
+    }
+
+    bool acceptsFileChangeRequests() override { return true; }
+
+    std::set<Path> there;
+    std::size_t removals = 0;
+};
+
+using Write = void (*)(TreeMetadataManager&);
+
+void addAndChange(TreeMetadataManager& tree) {
+    std::map<Address, std::shared_ptr<MetadataNode>> nodes;
+    auto const changed = std::make_shared<MetadataNodeSpecification>(u"Info");
+    changed->put(u"Key", u"value");
+    nodes.emplace(fileAddress(u"many/0000"), changed);
+    nodes.emplace(fileAddress(u"new"), std::make_shared<MetadataNodeSpecification>(u"Info"));
+    tree.setNodes(nodes);
+}
+
+void removeSome(TreeMetadataManager& tree) {
+    std::vector<Address> addresses{fileAddress(u"many/0001"), fileAddress(u"not there")};
+    tree.removeNodes(addresses);
+}
+
+void addAnother(TreeMetadataManager& tree) {
+    std::map<Address, std::shared_ptr<MetadataNode>> nodes;
+    nodes.emplace(fileAddress(u"another"), std::make_shared<MetadataNodeSpecification>(u"Info"));
+    tree.setNodes(nodes);
+}
+
+void makeSome(TreeMetadataManager& tree) {
+    std::vector<Address> addresses{addressOf({u"Made", u"here"})};
+    tree.createPaths(addresses);
+}
+
+/// All that a tree answers.
+void collect(TreeMetadataManager& tree, Address const& parent, Content& content) {
+    for (auto const& child : tree.getChildNodes(parent)) {
+        EXPECT_TRUE(tree.pathExists(child));
+        auto const node = tree.getNode(child);
+        EXPECT_EQ(node != nullptr, tree.hasNode(child));
+        content.emplace(child, node ? stores::samples::told(*node) : "no node");
+        collect(tree, child, content);
+    }
+}
+
+Content contentOfTree(TreeMetadataManager& tree) {
+    auto const guard = tree.acquireReadLock();
+    Content content;
+    collect(tree, Address::root(), content);
+    return content;
+}
+
+std::unique_ptr<TreeMetadataManager> openTree(std::shared_ptr<CrashingVolume> const& volume,
+                                              TextBackend::Options options) {
+    return std::make_unique<TreeMetadataManager>(
+        std::make_unique<TextBackend>(std::make_unique<CrashingDisk>(volume), options),
+        u"/project/.projectdata");
+}
+
+/// A tree whose writes fail at one call after another.
+class TreeAfterFailures : public TextStore {
+protected:
+    using Trouble = CrashingVolume::Trouble;
+
+    /// @return false when the write makes fewer calls.
+    bool writeWithTrouble(Write write, Options options, Trouble trouble, std::size_t call);
+
+    void failEverywhere(Write write, Options options) {
+        for (auto const trouble : {Trouble::Fails, Trouble::FailsForGood}) {
+            for (std::size_t call = 0; writeWithTrouble(write, options, trouble, call); ++call) {
+            }
+        }
+    }
+
+    std::size_t failures = 0;
+    std::size_t reversals = 0;
+};
+
+bool TreeAfterFailures::writeWithTrouble(Write write, Options options, Trouble trouble, std::size_t call) {
+    auto const twin = openTree(volume->copy(1), options);
+    write(*twin);
+    auto const after = contentOfTree(*twin);
+    auto const now = volume->copy(1);
+    auto const tree = openTree(now, options);
+    auto const listener = std::make_shared<Listener>();
+    tree->subscribe(listener);
+    auto const before = contentOfTree(*tree);
+    SCOPED_TRACE("trouble at call " + std::to_string(call));
+
+    now->plan(trouble, call);
+    std::string problem;
+    try {
+        write(*tree);
+    } catch (StoreError const& error) {
+        problem = error.getProblem();
+    }
+    now->cancelPlan();
+
+    auto const found = contentOfTree(*openTree(now, options));
+    EXPECT_EQ(found, contentOfTree(*tree));
+    if (problem.empty()) {
+        EXPECT_EQ(after, found);
+        return !now->troubled().empty();
+    }
+    ++failures;
+    reversals += listener->removals;
+    EXPECT_TRUE(listener->there.empty()) << "it was told that files are there of a write that failed";
+    bool const isKnown = problem.find("nobody can tell") == std::string::npos &&
+                         problem.find("could not be put back") == std::string::npos;
+    if (isKnown) {
+        EXPECT_EQ(before, found);
+        write(*tree);
+        EXPECT_EQ(after, contentOfTree(*tree));
+        EXPECT_EQ(after, contentOfTree(*openTree(now, options)));
+    } else {
+        EXPECT_THAT(found, AnyOf(Eq(before), Eq(after)));
+        EXPECT_THAT(errorOf([&] { addAnother(*tree); }).getRemedy(), HasSubstr("Open the project anew"));
+    }
+    return true;
+}
+
+TEST_F(TreeAfterFailures, aWriteThatFailsAtAnyCallLeavesTheTreeAsItWas) {
+    prepare(manyFiles(20));
+
+    for (auto const write : {addAndChange, removeSome, makeSome}) {
+        failEverywhere(write, rewriting());
+        failEverywhere(write, appending());
+    }
+    volume->canExchange = false;
+    failEverywhere(addAndChange, rewriting());
+
+    EXPECT_GT(failures, 150U);
+    EXPECT_EQ(0U, reversals) << "no file comes or goes with a later batch";
+}
+
+TEST_F(TreeAfterFailures, aFirstWriteThatFailsAtAnyCallTellsListenersThatTheFilesWent) {
+    for (auto const write : {addAndChange, makeSome}) {
+        failEverywhere(write, rewriting());
+    }
+
+    EXPECT_GT(failures, 50U);
+    EXPECT_GT(reversals, 50U) << "files were made before the failure";
+}
+
+} // namespace
+
+} // namespace project::test
