@@ -121,7 +121,7 @@ void writeAll(int file, std::string_view bytes, std::string const& name) {
     }
 }
 
-WrittenFile stamp(int file) noexcept {
+std::optional<WrittenFile> stamp(int file) noexcept {
     auto const time = timeBetweenTicks();
     timespec const times[] = {{0, UTIME_OMIT}, time};
     bool const set = ::futimens(file, times) == 0;
@@ -129,10 +129,10 @@ WrittenFile stamp(int file) noexcept {
     struct stat status {};
 
     if (::fstat(file, &status) != 0) {
-        return {{}, false}; // a state that no file has: it will be read again
+        return std::nullopt;
     }
     auto const identity = toIdentity(status);
-    return {identity, set && identity.modified == nanoseconds(time)};
+    return WrittenFile{identity, set && identity.modified == nanoseconds(time)};
 }
 
 } // namespace project::stores

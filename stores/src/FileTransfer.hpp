@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -30,6 +31,7 @@ void writeAll(int file, std::string_view bytes, std::string const& name);
 /// same time. This one is taken from the fine clock, between two ticks: whoever writes after us, even at
 /// once, leaves another time behind. So our own writes need not be read again, as those of others are while
 /// their time is young.
-WrittenFile stamp(int file) noexcept;
+/// @return nothing, with errno set, when the system can't tell the state of the file.
+std::optional<WrittenFile> stamp(int file) noexcept;
 
 } // namespace project::stores

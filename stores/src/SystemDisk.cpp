@@ -60,15 +60,6 @@ bool isUnsupported(int error) noexcept {
     return error == ENOSYS || error == EINVAL || error == EOPNOTSUPP;
 }
 
-template <typename Call>
-int repeatWhenInterrupted(Call call) {
-    int result = 0;
-    do {
-        result = call();
-    } while (result != 0 && errno == EINTR);
-    return result;
-}
-
 /// The folder and its files through the system's calls, each relative to the open folder.
 class SystemDisk : public Disk {
 public:
@@ -179,7 +170,9 @@ std::optional<WrittenFile> SystemDisk::append(std::string const& name, FileIdent
         written_.close();
         throw;
     }
-    return stamp(written_.get());
+    // The batch stands there, also when nobody can tell its times: then it is read again.
+    WrittenFile const unseen{{expected.device, expected.inode, expected.size + bytes.size()}, false};
+    return stamp(written_.get()).value_or(unseen);
 }
 
 WrittenFile SystemDisk::create(std::string const& name, std::string_view bytes,
@@ -195,12 +188,15 @@ WrittenFile SystemDisk::create(std::string const& name, std::string_view bytes,
             takeModeAndOwner(folder, written_.get(), *like);
         }
         writeAll(written_.get(), bytes, writtenName_);
+        if (auto const made = stamp(written_.get())) {
+            return *made;
+        }
+        throwSystemError(writtenName_, "can't be looked at", errno);
     } catch (...) {
         written_.close();
         ::unlinkat(folder, name.c_str(), 0);
         throw;
     }
-    return stamp(written_.get());
 }
 
 void SystemDisk::sync() {
@@ -267,7 +263,8 @@ void SystemDisk::syncFolder() {
 }
 
 std::vector<std::string> SystemDisk::list() {
-    int const opened = ::openat(folder_.get(), ".", O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    int const opened = repeatWhenInterrupted(
+        [here = folder_.get()] { return ::openat(here, ".", O_RDONLY | O_DIRECTORY | O_CLOEXEC); });
     auto* const stream = opened >= 0 ? ::fdopendir(opened) : nullptr;
     if (stream == nullptr) {
         int const error = errno;

@@ -30,8 +30,19 @@ char const* remedyFor(int error) {
         return "Look whether the project was moved or removed.";
     case ESTALE:
         return "Open the project anew.";
+    case ENOMEM:
+        return "Free some memory and try again.";
+    case ENAMETOOLONG:
+    case EILSEQ:
+        return "The file system refuses the name: keep the project under a shorter path, or on another file "
+               "system.";
+    case EINVAL:
+    case ENOSYS:
+    case EOPNOTSUPP:
+    case ENOLCK:
+        return "The file system can't do what the store needs: keep the project on another file system.";
     default:
-        return "";
+        return "Try again; if it stays so, look into the system's log.";
     }
 }
 

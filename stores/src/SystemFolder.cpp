@@ -79,7 +79,7 @@ bool SystemFolder::make() {
     if (!openIn(root.get())) {
         throwSystemError(path_, "can't be opened", ENOENT);
     }
-    if (::fsync(root.get()) != 0) {
+    if (repeatWhenInterrupted([&root] { return ::fsync(root.get()); }) != 0) {
         auto const error = errno;
         if (made) {
             remove();
@@ -93,8 +93,12 @@ void SystemFolder::remove() noexcept {
     if (!folder_.isOpen()) {
         return;
     }
-    if (isInPlace()) {
-        ::rmdir(path_.c_str()); // fails when something lies in it
+    try {
+        if (isInPlace()) {
+            ::rmdir(path_.c_str()); // fails when something lies in it
+        }
+    } catch (StoreError const&) {
+        // what can't be looked at stays
     }
     folder_.close();
 }
@@ -102,10 +106,20 @@ void SystemFolder::remove() noexcept {
 bool SystemFolder::isInPlace() const {
     requireOwnProcess();
 
+    if (!folder_.isOpen()) {
+        return false;
+    }
+
     struct stat status {};
 
-    return folder_.isOpen() && ::lstat(path_.c_str(), &status) == 0 && S_ISDIR(status.st_mode) &&
-           identity_.isSameFile(toIdentity(status));
+    if (::lstat(path_.c_str(), &status) != 0) {
+        if (errno == ENOENT || errno == ENOTDIR) {
+            return false;
+        }
+        // Whoever takes that for a folder that was moved away tells of a batch that it is not in the project.
+        throwSystemError(path_, "can't be looked at", errno);
+    }
+    return S_ISDIR(status.st_mode) && identity_.isSameFile(toIdentity(status));
 }
 
 } // namespace project::stores
