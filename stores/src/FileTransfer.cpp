@@ -46,6 +46,13 @@ private:
     bool wasPending_;
 };
 
+void requireLength(std::uint64_t length, std::string const& name) {
+    if (length > Disk::longestFile) {
+        throw StoreError(name, 0, "is longer than the 1 GiB that a project's text may have",
+                         "Move it away, and restore the project's own file.");
+    }
+}
+
 /// The fine clock's time, made different from the coarse clock's when both happen to agree.
 timespec timeBetweenTicks() noexcept {
     timespec coarse{};
@@ -66,7 +73,8 @@ FileIdentity toIdentity(struct stat const& status) noexcept {
             static_cast<std::uint64_t>(status.st_size),
             nanoseconds(status.st_mtim),
             nanoseconds(status.st_ctim),
-            S_ISREG(status.st_mode)};
+            S_ISREG(status.st_mode),
+            status.st_nlink > 1};
 }
 
 FileIdentity identifyOpenFile(int file, std::string const& name) {
@@ -81,7 +89,15 @@ FileIdentity identifyOpenFile(int file, std::string const& name) {
     return toIdentity(status);
 }
 
+void requireRoom(std::uint64_t length, std::string const& name) {
+    if (length > Disk::longestFile) {
+        throw StoreError(name, 0, "would get longer than the 1 GiB that a project's text may have",
+                         "Split the project.");
+    }
+}
+
 std::string readFrom(int file, std::uint64_t offset, std::uint64_t expectedSize, std::string const& name) {
+    requireLength(expectedSize, name);
     std::string bytes;
     // One byte more than expected, so that one call that finds the end is enough.
     bytes.resize(expectedSize > offset ? expectedSize - offset + 1 : 1);
@@ -99,6 +115,7 @@ std::string readFrom(int file, std::uint64_t offset, std::uint64_t expectedSize,
             break;
         }
         length += static_cast<std::size_t>(count);
+        requireLength(offset + length, name); // it may grow as long as it is read
         if (length == bytes.size()) {
             bytes.resize(bytes.size() * 2);
         }

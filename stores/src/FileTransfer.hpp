@@ -18,7 +18,12 @@ FileIdentity toIdentity(struct stat const& status) noexcept;
 FileIdentity identifyOpenFile(int file, std::string const& name);
 
 /// Everything from an offset to the end.
+/// @throws StoreError also when the file is, or meanwhile gets, longer than Disk::longestFile.
 std::string readFrom(int file, std::uint64_t offset, std::uint64_t expectedSize, std::string const& name);
+
+/// @throws StoreError when a file is to get longer than Disk::longestFile, so that nobody could read it
+/// again.
+void requireRoom(std::uint64_t length, std::string const& name);
 
 /// Writes all the bytes at the end of a file that was opened to append or is new; in one call, if the system
 /// takes them all. A file that grows beyond the process's limit gives an error like a full disk, and not

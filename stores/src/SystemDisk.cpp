@@ -165,6 +165,7 @@ std::optional<WrittenFile> SystemDisk::append(std::string const& name, FileIdent
             written_.close();
             return std::nullopt;
         }
+        requireRoom(expected.size + bytes.size(), writtenName_);
         writeAll(written_.get(), bytes, writtenName_);
     } catch (...) {
         written_.close();
@@ -187,6 +188,7 @@ WrittenFile SystemDisk::create(std::string const& name, std::string_view bytes,
         if (like) {
             takeModeAndOwner(folder, written_.get(), *like);
         }
+        requireRoom(bytes.size(), writtenName_);
         writeAll(written_.get(), bytes, writtenName_);
         if (auto const made = stamp(written_.get())) {
             return *made;

@@ -239,12 +239,13 @@ Pending TextBackend::State::prepare(Batch const& batch) const {
 }
 
 /// Empty when the text is to be written anew: it is short, or what follows the body gets long against it, or
-/// there is something to put right.
+/// there is something to put right, or the file has another name, in a copy of the project that was made of
+/// links: what is appended here would stand there too.
 std::string TextBackend::State::linesToAppend(Batch const& batch) const {
     auto const& text = seen_.text();
     bool const isSound = text.faults().empty() && (text.tailSize() > 0 || text.isTidy());
     auto const room = text.bodySize() / options_.bodyToTail;
-    if (!isSound || text.bodySize() <= options_.alwaysRewritten ||
+    if (!isSound || seen_.identity().isShared || text.bodySize() <= options_.alwaysRewritten ||
         text.tailSize() + batch.size() * shortestLine > room) {
         return {};
     }

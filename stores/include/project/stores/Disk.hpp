@@ -19,6 +19,7 @@ struct FileIdentity {
     std::int64_t modified = 0; ///< nanoseconds since 1970
     std::int64_t changed = 0;  ///< nanoseconds since 1970
     bool isRegular = true;     ///< false for what is never opened: links, pipes, folders
+    bool isShared = false;     ///< it has more names than one, perhaps in other projects
 
     friend bool operator==(FileIdentity const&, FileIdentity const&) = default;
 
@@ -47,11 +48,15 @@ struct WrittenFile {
 /// The store's folder on disk, and all that a text backend does there.
 ///
 /// Names are plain file names in that folder. Nothing follows a symbolic link, opens anything but a regular
-/// file, or reaches outside the folder. Every operation but those on the path and the clock needs the folder
-/// open. All throw StoreError, naming the file, when the system fails them; results tell what is no failure.
-/// One thread at a time.
+/// file, or reaches outside the folder. No file longer than longestFile is read or written: what claims to be
+/// longer would take more memory than there is. Every operation but those on the path and the clock needs the
+/// folder open. All throw StoreError, naming the file, when the system fails them; results tell what is no
+/// failure. One thread at a time.
 class PROJECT_STORES_EXPORT Disk {
 public:
+    /// Some ten million files with labels. A sparse file takes no room on disk, whatever length it has.
+    static constexpr std::uint64_t longestFile = std::uint64_t{1} << 30;
+
     virtual ~Disk() = default;
 
     /// The folder's path, absolute, as the system has it.
