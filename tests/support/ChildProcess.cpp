@@ -7,6 +7,7 @@
 #include <stdexcept>
 #include <utility>
 
+#include <poll.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -86,6 +87,11 @@ std::string ChildProcess::hear() {
         line += byte;
     }
     return line;
+}
+
+bool ChildProcess::hasSaid() const {
+    pollfd said{from_, POLLIN, 0};
+    return ::poll(&said, 1, 0) == 1;
 }
 
 void ChildProcess::goOn() const {

@@ -37,6 +37,9 @@ public:
     /// The next line that the child says; empty when it has ended without one.
     std::string hear();
 
+    /// True when there is a line to hear, or the child has ended, so that hear does not wait.
+    bool hasSaid() const;
+
     /// Lets a child that awaits go on.
     void goOn() const;
 

@@ -1,0 +1,179 @@
+#include <chrono>
+#include <filesystem>
+#include <iostream>
+#include <list>
+#include <random>
+#include <thread>
+
+#include "KilledWriters.hpp"
+#include "support/NightlyScale.hpp"
+#include "support/TemporaryFolder.hpp"
+
+using testing::IsSubsetOf;
+
+namespace project::test {
+
+namespace {
+
+using std::chrono::steady_clock;
+
+/// What happened, so that a test in which nothing did shows.
+struct Counts {
+    std::size_t kills = 0;
+    std::size_t amidABatch = 0;     ///< of them
+    std::size_t keptAllTheSame = 0; ///< of those, the batch was in the project nevertheless
+    std::size_t batches = 0;
+    std::size_t projects = 0;
+};
+
+/// Kills writers of one project at random, and knows what the project has to hold.
+class Killer {
+public:
+    Killer(Counts& counts, std::mt19937_64& random) : counts_(counts), random_(random) {}
+
+    void run(std::size_t kills) {
+        ++counts_.projects;
+        for (std::size_t writer = upTo(2) + 1; writer > 0; --writer) {
+            start();
+        }
+        for (; kills > 0 && !testing::Test::HasFailure(); --kills) {
+            wait();
+            killOne();
+            check();
+            if (upTo(2) == 0) {
+                writeOne(); // beside the others, as another process
+                check();
+            }
+            start();
+        }
+        finish();
+    }
+
+private:
+    std::size_t upTo(std::size_t bound) {
+        return std::uniform_int_distribution<std::size_t>(0, bound)(random_);
+    }
+
+    /// Mostly short, so that many die while they make the store or open it, and some go on for a while.
+    void wait() {
+        constexpr std::size_t longest[] = {1'000, 5'000, 30'000};
+        std::this_thread::sleep_for(std::chrono::microseconds(upTo(longest[upTo(2)])));
+    }
+
+    void start() { alive_.emplace_back(root_.path(), ++started_, random_()); }
+
+    void killOne() {
+        auto const victim = std::next(alive_.begin(), static_cast<std::ptrdiff_t>(upTo(alive_.size() - 1)));
+        victim->kill();
+        EXPECT_EQ("", victim->complaint());
+        ++counts_.kills;
+        counts_.amidABatch += victim->isAmidABatch() ? 1 : 0;
+        dead_.splice(dead_.end(), alive_, victim);
+    }
+
+    std::unique_ptr<TextBackend> open() const {
+        return std::make_unique<TextBackend>(stores::makeSystemDisk(root_.path()));
+    }
+
+    /// Every batch that was said to be kept is there, of each writer at most the one that it had just begun
+    /// besides, and nothing else.
+    void check();
+    void writeOne();
+    void finish();
+    void checkWriter(KilledWriter& writer, std::size_t surely, Content const& found, Content& expected);
+
+    Counts& counts_;
+    std::mt19937_64& random_;
+    TemporaryFolder root_;
+    std::list<KilledWriter> alive_;
+    std::list<KilledWriter> dead_;
+    std::size_t started_ = 0;
+    Content own_;
+};
+
+void Killer::check() {
+    std::vector<std::size_t> surely;
+    for (auto& writer : alive_) {
+        writer.listen();
+        surely.push_back(writer.kept());
+    }
+    auto const found = contentOf(*open());
+    auto expected = own_;
+    auto kept = surely.begin();
+    for (auto& writer : alive_) {
+        writer.listen();
+        checkWriter(writer, *kept++, found, expected);
+    }
+    for (auto& writer : dead_) {
+        checkWriter(writer, writer.kept(), found, expected);
+        counts_.keptAllTheSame += writer.isAmidABatch() && writer.notedIn(found) == writer.begun() ? 1 : 0;
+        writer.settle(writer.notedIn(found));
+    }
+    EXPECT_EQ(expected, found);
+}
+
+void Killer::checkWriter(KilledWriter& writer, std::size_t surely, Content const& found, Content& expected) {
+    auto const noted = writer.notedIn(found);
+    EXPECT_GE(noted, surely) << "what was kept is not there";
+    EXPECT_LE(noted, writer.begun()) << "what was never begun is there";
+    expected.merge(writer.contentWith(noted));
+}
+
+void Killer::writeOne() {
+    auto const file = addFiles({u"own/" + std::u16string(1, static_cast<char16_t>(u'a' + upTo(25)))});
+    try {
+        commit(*open(), file);
+        own_.merge(contentAfter({file}));
+    } catch (StoreError const& error) {
+        EXPECT_EQ("Try again.", error.getRemedy()) << error.what(); // another one has just made the store
+    }
+}
+
+/// With all of them dead the project is there for the next one, at once and tidy.
+void Killer::finish() {
+    while (!alive_.empty()) {
+        killOne();
+    }
+    check();
+    for (auto const& writer : dead_) {
+        counts_.batches += writer.kept();
+    }
+    TextBackend next(stores::makeSystemDisk(root_.path()), {std::chrono::milliseconds(1'000), 0, 1});
+    commit(next, addFiles({u"own/last"}));
+    own_.merge(contentAfter({addFiles({u"own/last"})}));
+    check();
+    std::vector<std::string> names;
+    for (auto const& entry : std::filesystem::directory_iterator(root_.onDisk() / ".projectdata")) {
+        names.push_back(entry.path().filename().string());
+    }
+    EXPECT_THAT(names, IsSubsetOf({".gitattributes", ".gitignore", "project.jsonl"}));
+}
+
+/// On disk, where most of the time goes by in syncs, and in memory, where it does not.
+void useFolder(bool inMemory, std::string const& usual) {
+    bool const isThere = inMemory && std::filesystem::is_directory("/dev/shm");
+    ::setenv("TMPDIR", isThere ? "/dev/shm" : usual.c_str(), 1);
+}
+
+TEST(ProcessKills, whatWasKeptIsThereWhateverMomentAWriterIsKilledAt) {
+    auto const seed = testSeed();
+    SCOPED_TRACE("to repeat it, as far as the machine does: PROJECT_TEST_SEED=" + std::to_string(seed));
+    std::mt19937_64 random(seed);
+    Counts counts;
+    auto const usual = std::filesystem::temp_directory_path().string();
+    auto const end = steady_clock::now() + std::chrono::seconds(testSeconds(2));
+    for (bool inMemory = false; steady_clock::now() < end && !HasFailure(); inMemory = !inMemory) {
+        useFolder(inMemory, usual);
+        Killer(counts, random).run(10);
+    }
+    useFolder(false, usual);
+    std::cout << counts.kills << " writers of " << counts.projects << " projects were killed, "
+              << counts.amidABatch << " of them amid a batch, which was in the project "
+              << counts.keptAllTheSame << " times; " << counts.batches << " batches were kept\n";
+    EXPECT_GT(counts.amidABatch, 0U);
+    EXPECT_GT(counts.batches, 0U);
+}
+
+} // namespace
+
+} // namespace project::test
