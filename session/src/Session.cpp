@@ -1,10 +1,14 @@
 #include "project/session.hpp"
 
+#include <deque>
 #include <filesystem>
 #include <limits>
+#include <mutex>
+#include <optional>
 #include <system_error>
 #include <utility>
 
+#include "ChangeEvents.hpp"
 #include "DefinitionStager.hpp"
 #include "StagingProjectManager.hpp"
 #include "fl/i18n/Utf8.hpp"
@@ -38,6 +42,7 @@ public:
     bool makeProject(std::u16string const& name);
 
     void stage();
+    bool refresh();
 
     Path const root;
     TextBackend* text;                   ///< the store's
@@ -51,6 +56,11 @@ private:
     static TextBackend::Options textOptions(Options options);
     std::shared_ptr<TreeMetadataManager> makeStore(Options options);
     std::unique_ptr<ProjectManager> makeProject(Options options);
+    void noteEventsOfOthers();
+    std::optional<Event> nextEvent();
+
+    std::mutex waitingMutex_;
+    std::deque<Event> waiting_; ///< events of what others have changed, to be dispatched by refresh
 };
 
 Session::State::State(Path const& folder, Options options)
@@ -118,6 +128,38 @@ void Session::State::stage() {
     }
 }
 
+bool Session::State::refresh() {
+    noteEventsOfOthers();
+    bool hasTold = false;
+    while (auto const event = nextEvent()) {
+        hasTold = true;
+        (*event)(*events);
+    }
+    return hasTold;
+}
+
+void Session::State::noteEventsOfOthers() {
+    auto const guard = store->acquireReadLock(); // the project stays as the changes have left it
+    auto const changes = store->takeOthersChanges();
+    if (!changes.everything && changes.differences.empty()) {
+        return;
+    }
+    auto found = eventsOf(changes, store, root);
+    std::lock_guard const lock(waitingMutex_);
+    std::move(found.begin(), found.end(), std::back_inserter(waiting_));
+}
+
+/// Takes an event out before it is dispatched: one whose slot throws is not told twice.
+std::optional<Event> Session::State::nextEvent() {
+    std::lock_guard const lock(waitingMutex_);
+    if (waiting_.empty()) {
+        return std::nullopt;
+    }
+    auto event = std::move(waiting_.front());
+    waiting_.pop_front();
+    return event;
+}
+
 Session Session::open(Path const& root, Options options) {
     Session result(std::make_unique<State>(root, options));
     result.state_->requireProject();
@@ -159,6 +201,10 @@ std::shared_ptr<DispatchableProjectEventBroadcaster> const& Session::events() co
 
 Path const& Session::root() const noexcept {
     return state_->root;
+}
+
+bool Session::refresh() {
+    return state_->refresh();
 }
 
 metadata::MetadataManager& Session::store() noexcept {

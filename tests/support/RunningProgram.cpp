@@ -117,6 +117,18 @@ bool readSome(int descriptor, std::string& to) {
     return got > 0 || (got < 0 && errno == EINTR);
 }
 
+/// Byte by byte, so that nothing of the next line is taken.
+std::string lineFrom(int descriptor) {
+    constexpr int patience = 20'000; // milliseconds
+    std::string line;
+    pollfd waiting{descriptor, POLLIN, 0};
+    char byte = 0;
+    while (poll(&waiting, 1, patience) > 0 && read(descriptor, &byte, 1) == 1 && byte != '\n') {
+        line += byte;
+    }
+    return line;
+}
+
 } // namespace
 
 RunningProgram::RunningProgram(std::vector<std::string> const& command, ProgramSettings const& settings) {
@@ -168,6 +180,14 @@ std::string RunningProgram::readAndClose(std::size_t length) {
     }
     closeIfOpen(output_);
     return result;
+}
+
+std::string RunningProgram::readLine() const {
+    return lineFrom(output_);
+}
+
+std::string RunningProgram::readErrorLine() const {
+    return lineFrom(errors_);
 }
 
 bool RunningProgram::waitUntilItSleeps() const {

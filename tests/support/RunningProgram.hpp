@@ -47,6 +47,11 @@ public:
     /// Waits for this many bytes of standard output, and then goes away without reading the rest.
     std::string readAndClose(std::size_t length);
 
+    /// Waits for a line on standard output, or on standard error. @return it without its end; what there is
+    /// of one when the program has ended, or after a long time.
+    std::string readLine() const;
+    std::string readErrorLine() const;
+
     /// Waits until the program sleeps, for input or for a lock. @return false when it has ended instead.
     bool waitUntilItSleeps() const;
 

@@ -23,6 +23,7 @@ std::unique_ptr<Command> makeReferenceCommand();
 std::unique_ptr<Command> makeReferencesCommand();
 std::unique_ptr<Command> makeCheckCommand();
 std::unique_ptr<Command> makeTidyCommand();
+std::unique_ptr<Command> makeWatchCommand();
 std::unique_ptr<Command> makeSetupCommand();
 std::unique_ptr<Command> makeMergeCommand();
 std::unique_ptr<Command> makeResolveCommand();

@@ -1,30 +1,15 @@
 #pragma once
 
-#include <string>
-#include <string_view>
-#include <utility>
-#include <vector>
-
-#include "Kind.hpp"
+#include "JsonObject.hpp"
 
 namespace projectctl {
 
 /// A JSON array of objects on standard output, one a line.
 ///
 /// The order of use: for each object begin, then its members; finish at the end.
-class JsonRows {
+class JsonRows : public JsonObject {
 public:
     void begin();
-    void addText(std::string_view key, std::u16string_view text);
-
-    /// Several texts by name, as an object of their own.
-    using Texts = std::vector<std::pair<std::u16string, std::u16string>>;
-    void addTexts(std::string_view key, Texts const& texts);
-
-    void addFlag(std::string_view key, bool value);
-
-    /// The members "path" and "kind" of a file.
-    void addFile(std::u16string_view path, Kind kind);
 
     /// Ends the array, which is part of something.
     void finish();
@@ -33,10 +18,7 @@ public:
     void finishOutput();
 
 private:
-    void addKey(std::string_view key);
-
-    bool isEmpty_ = true;       ///< no object has begun
-    bool isFirstMember_ = true; ///< of the object
+    bool isEmpty_ = true; ///< no object has begun
 };
 
 } // namespace projectctl

@@ -59,6 +59,11 @@ public:
     /// may lack something then. To be called with no guard open.
     void warnOfDamage();
 
+    /// Takes in what others have changed, and dispatches the events that tell of it.
+    void refresh() { session_.refresh(); }
+
+    project::management::ProjectEventBroadcaster& events() noexcept { return *session_.events(); }
+
     /// Stages the project's text in git, if it was written and git tracks it. To be called with no guard
     /// open.
     void stage() { session_.stage(); }

@@ -69,6 +69,20 @@ public:
     /// store has been written.
     management::ProjectManager& project() noexcept;
 
+    /// Takes in what others have changed in the project - other processes, git, an editor - and tells
+    /// observers: dispatches the events that match on events(), and metadataChange for the rest.
+    ///
+    /// What others change is seen by every operation all the same; this makes it known. It tells all that has
+    /// changed since the last call, or since the project was first looked at, as one change: a file that came
+    /// and went again is not told. Files and labels are told as they are or, where they went, as they were.
+    ///
+    /// Events are dispatched on this thread with no lock held. What a slot throws leaves this; the events
+    /// behind it are dispatched by the next call. Takes the read lock first: while a guard is open there is
+    /// nothing new to see. Costs one system call when nothing has changed.
+    /// @return true if there was something to tell.
+    /// @throws stores::StoreError when the text can't be read, or stays incomplete.
+    bool refresh();
+
     /// Where observers connect; an application may dispatch events of its own here. It may outlive the
     /// session.
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> const& events() const noexcept;

@@ -1,0 +1,135 @@
+#include "ChangeEvents.hpp"
+
+#include <set>
+#include <utility>
+
+#include "CategoryEvents.hpp"
+#include "Schema.hpp"
+
+namespace project::session {
+
+using management::DispatchableProjectEventBroadcaster;
+using management::Path;
+using management::ProjectManagerBase;
+using stores::Changes;
+using stores::Difference;
+
+namespace {
+
+using Broadcaster = DispatchableProjectEventBroadcaster;
+
+/// Sorts differences by the event that tells of them.
+class Sorting {
+public:
+    explicit Sorting(Path const& root) : root_(root) {}
+
+    void take(Difference const& difference);
+
+    /// Has everything counted that may have changed unseen.
+    void takeTheRest() { rest_ = true; }
+
+    std::vector<Difference> const& categories() const noexcept { return categories_; }
+
+    /// @param ofCategories stand behind the name's.
+    std::vector<Event> events(std::vector<Event> ofCategories) const;
+
+private:
+    void takeName(Difference const& difference);
+    void takeFile(Difference const& difference);
+
+    Path const& root_;
+    bool name_ = false;
+    std::vector<Difference> categories_;
+    std::set<Path> files_;
+    std::set<Path> labelled_;
+    bool entryPoints_ = false;
+    bool path_ = false;
+    bool references_ = false;
+    bool rest_ = false;
+};
+
+void Sorting::take(Difference const& difference) {
+    auto const& head = difference.address[0];
+    auto const& type = head.getType();
+    if (difference.address == ProjectManagerBase::getRootNodePath()) {
+        takeName(difference);
+    } else if (type == schema::FILES && head.getLocation() == schema::FILE_LIST_SCOPE) {
+        takeFile(difference);
+    } else if (type == schema::CATEGORIES) {
+        categories_.push_back(difference);
+    } else if (type == schema::ENTRY_POINTS || type == schema::ENTRY_POINT_GROUPS) {
+        entryPoints_ = true;
+    } else if (type == schema::PROJECT_PATH) {
+        path_ = true;
+    } else if (type == schema::REFERENCES) {
+        references_ = true;
+    } else {
+        rest_ = true;
+    }
+}
+
+void Sorting::takeName(Difference const& difference) {
+    auto const nameOf = [](stores::Node const& node) {
+        return node ? node->get(ProjectManagerBase::NAME_FIELD) : std::u16string();
+    };
+    bool const isName = nameOf(difference.before) != nameOf(difference.after);
+    (isName ? name_ : rest_) = true;
+}
+
+/// A file stands at its own address, a folder at its marker; further down lies what belongs to their labels.
+void Sorting::takeFile(Difference const& difference) {
+    auto const& address = difference.address;
+    auto path = root_;
+    std::size_t index = 1;
+    for (; index < address.depth() && address[index].getType() == schema::FILE; ++index) {
+        path = path / Path(address[index].getLocation());
+    }
+    bool const isMarker = index + 1 == address.depth() && address[index].getType() == schema::DIR_SIGNIFIER;
+    bool const isItself = index == address.depth() || isMarker;
+    bool const cameOrWent = isItself && (difference.before == nullptr) != (difference.after == nullptr);
+    if (cameOrWent) {
+        files_.insert(path);
+    }
+    if (!cameOrWent || (difference.after && !difference.after->getChildren().empty())) {
+        labelled_.insert(path);
+    }
+}
+
+std::vector<Event> Sorting::events(std::vector<Event> ofCategories) const {
+    std::vector<Event> events;
+    auto const add = [&events](bool isDue, Event event) {
+        if (isDue) {
+            events.push_back(std::move(event));
+        }
+    };
+    add(name_, [](Broadcaster& to) { to.dispatchNameChanged(); });
+    std::move(ofCategories.begin(), ofCategories.end(), std::back_inserter(events));
+    add(!files_.empty(), [files = std::vector<Path>(files_.begin(), files_.end())](Broadcaster& to) {
+        to.dispatchOnFileListUpdate(files);
+    });
+    add(!labelled_.empty(), [files = std::vector<Path>(labelled_.begin(), labelled_.end())](Broadcaster& to) {
+        to.dispatchFileLabelsChanged(files);
+    });
+    add(entryPoints_, [](Broadcaster& to) { to.dispatchEntryPointsChanged(); });
+    add(path_, [](Broadcaster& to) { to.dispatchPathChanged(); });
+    add(references_, [](Broadcaster& to) { to.dispatchReferencesChanged(); });
+    add(rest_, [](Broadcaster& to) { to.dispatchMetadataChange(); });
+    return events;
+}
+
+} // namespace
+
+std::vector<Event> eventsOf(Changes const& changes, std::shared_ptr<metadata::MetadataManager> const& store,
+                            Path const& root) {
+    Sorting sorting(root);
+    for (auto const& difference : changes.differences) {
+        sorting.take(difference);
+    }
+    CategoryEvents categories(sorting.categories(), store, root);
+    if (changes.everything || categories.leaveSomething()) {
+        sorting.takeTheRest();
+    }
+    return sorting.events(categories.take());
+}
+
+} // namespace project::session

@@ -1,0 +1,117 @@
+#include <csignal>
+#include <filesystem>
+#include <fstream>
+
+#include "ToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+/// A project with two files, and a person who watches it.
+class WatchCommand : public ToolTest {
+protected:
+    void SetUp() override {
+        initProject();
+        folder_.file(u"src/pump.cpp");
+        folder_.file(u"valve.cpp");
+        ASSERT_EQ(tool({"add", "-r", "src"}).exitCode, 0);
+        ASSERT_EQ(tool({"category", "create", "Status"}).exitCode, 0);
+    }
+
+    /// A watch that has begun.
+    std::unique_ptr<RunningProgram> watch(std::vector<std::string> options = {}) const {
+        options.insert(options.begin(), "watch");
+        auto watching = std::make_unique<RunningProgram>(commandFor(std::move(options)), settings_);
+        EXPECT_TRUE(watching->waitUntilItSleeps());
+        return watching;
+    }
+
+    /// The line that somebody else's command makes a watch write.
+    std::string told(RunningProgram& watching, std::vector<std::string> command) const {
+        auto const result = tool(std::move(command));
+        EXPECT_EQ(result.exitCode, 0) << result.errors;
+        return watching.readLine();
+    }
+
+    static ProgramResult interrupt(RunningProgram& watching) {
+        watching.sendSignal(SIGINT);
+        return watching.finish();
+    }
+};
+
+TEST_F(WatchCommand, tellsEachEventInALine) {
+    auto const watching = watch();
+
+    EXPECT_EQ(told(*watching, {"add", "valve.cpp"}), "fileListUpdate\tvalve.cpp");
+    EXPECT_EQ(told(*watching, {"remove", "src"}), "fileListUpdate\tsrc\tsrc/pump.cpp");
+    EXPECT_EQ(told(*watching, {"category", "create", "Owner"}), "categoryAdded\tOwner");
+    EXPECT_EQ(told(*watching, {"category", "rename", "Owner", "Keeper"}), "categoryRenamed\tOwner");
+    EXPECT_EQ(told(*watching, {"label", "create", "Status", "Done"}), "labelModified\tStatus\tDone");
+    EXPECT_EQ(told(*watching, {"label", "put", "Status", "Done", "valve.cpp"}),
+              "fileLabelsChanged\tvalve.cpp");
+    EXPECT_EQ(told(*watching, {"name", "Engine"}), "nameChanged");
+    EXPECT_EQ(told(*watching, {"description", "Pumps"}), "metadataChange");
+    EXPECT_EQ(told(*watching, {"entry", "set", "valve.cpp"}), "entryPointsChanged");
+    EXPECT_EQ(interrupt(*watching).signal, SIGINT);
+}
+
+TEST_F(WatchCommand, tellsEachEventAsAnObjectOfJson) {
+    auto const watching = watch({"--json"});
+
+    EXPECT_EQ(told(*watching, {"add", "valve.cpp"}),
+              R"({"event": "fileListUpdate", "files": ["valve.cpp"]})");
+    EXPECT_EQ(told(*watching, {"remove", "src"}),
+              R"({"event": "fileListUpdate", "files": ["src", "src/pump.cpp"]})");
+    EXPECT_THAT(told(*watching, {"label", "create", "Status", "Done"}),
+                testing::MatchesRegex(R"(\{"event": "labelModified", "category": \{"uuid": "[-0-9a-f]+", )"
+                                      R"("name": "Status"\}, "label": \{"uuid": "[-0-9a-f]+", )"
+                                      R"("name": "Done"\}\})"));
+    EXPECT_EQ(told(*watching, {"name", "Engine"}), R"({"event": "nameChanged"})");
+}
+
+TEST_F(WatchCommand, keepsANameWithALineFeedInOneLine) {
+    folder_.addFile("two\nlines");
+    auto const watching = watch();
+
+    EXPECT_EQ(told(*watching, {"add", "two\nlines"}), "fileListUpdate\t\"two\\nlines\"");
+}
+
+TEST_F(WatchCommand, tellsWhatAnEditorChanges) {
+    auto const watching = watch();
+    insertLineBefore("\"src/pump.cpp\"", "\"src/a.cpp\"");
+
+    EXPECT_EQ(watching->readLine(), "fileListUpdate\tsrc/a.cpp");
+}
+
+TEST_F(WatchCommand, goesOnWhenTheTextCannotBeReadForAWhile) {
+    auto const watching = watch();
+    auto const good = readText();
+    std::filesystem::rename(text(), folder_.onDisk() / "aside");
+    writeText("hello\n");
+    ASSERT_NE(watching->readErrorLine().find("project.jsonl"), std::string::npos);
+    std::filesystem::rename(folder_.onDisk() / "aside", text());
+
+    EXPECT_EQ(told(*watching, {"name", "Engine"}), "nameChanged");
+    EXPECT_EQ(interrupt(*watching).errors, "");
+}
+
+TEST_F(WatchCommand, endsWithoutAWordWhenNobodyReadsItAnyMore) {
+    auto const watching = watch();
+    ASSERT_EQ(tool({"name", "Engine"}).exitCode, 0);
+    watching->readAndClose(1);
+    ASSERT_EQ(tool({"name", "Pump"}).exitCode, 0);
+
+    auto const result = watching->finish();
+
+    EXPECT_EQ(result.signal, SIGPIPE);
+    EXPECT_EQ(result.errors, "");
+}
+
+TEST_F(WatchCommand, isAnErrorOutsideAnyProject) {
+    std::filesystem::remove_all(folder_.onDisk() / ".projectdata");
+
+    EXPECT_THAT(tool({"watch"}), FailsWith(1, "project"));
+}
+
+} // namespace
+} // namespace project::test
