@@ -15,6 +15,11 @@ using std::chrono::milliseconds;
 /// The coarsest clock by which a kernel stamps files ticks a hundred times a second.
 constexpr std::int64_t youngerThanATick = 20'000'000;
 
+/// For how long there may be no text where the other files of a store are: git takes the old one away before
+/// it makes the new one, and makes it last where it brings a project. Then it is taken for what a writer left
+/// that died before it had made one.
+constexpr milliseconds longestWithoutText(200);
+
 std::string pathOfText(Disk const& disk) {
     return disk.folder() + "/" + StoreFiles::text;
 }
@@ -35,7 +40,7 @@ Changes SeenText::look(milliseconds patience) {
     Changes changes;
     milliseconds waited(0);
     milliseconds nap(1);
-    while (!lookOnce(changes)) {
+    while (!lookOnce(changes, waited >= std::min(patience, longestWithoutText))) {
         if (waited >= patience) {
             throw StoreError(
                 pathOfText(disk_), 0,
@@ -51,7 +56,7 @@ Changes SeenText::look(milliseconds patience) {
     return changes;
 }
 
-bool SeenText::lookOnce(Changes& changes) {
+bool SeenText::lookOnce(Changes& changes, bool mayBeUnmade) {
     if (seen_) {
         auto const now = disk_.identifyByPath(StoreFiles::text);
         if (!now) {
@@ -64,7 +69,7 @@ bool SeenText::lookOnce(Changes& changes) {
             return true;
         }
     }
-    return readAnew(changes);
+    return readAnew(changes, mayBeUnmade);
 }
 
 bool SeenText::takeInTail(Changes& changes) {
@@ -86,14 +91,15 @@ bool SeenText::takeInTail(Changes& changes) {
     return true;
 }
 
-bool SeenText::readAnew(Changes& changes) {
+bool SeenText::readAnew(Changes& changes, bool mayBeUnmade) {
     if (!staysInFolder_ && !disk_.openFolder()) {
         return acceptMissing();
     }
     auto const before = disk_.now();
     auto content = disk_.read(StoreFiles::text, 0);
     if (!content) {
-        return acceptMissing();
+        bool const isAwaited = !seen_ && !mayBeUnmade && disk_.identify(StoreFiles::attributes);
+        return !isAwaited && acceptMissing();
     }
     bool const isSettled = isSettledAt(content->identity, before);
     if (seen_ && seen_->text.hasSameBytes(content->bytes)) {

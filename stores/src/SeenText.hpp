@@ -56,9 +56,11 @@ private:
         bool isSettled; ///< any later change shows in the identity
     };
 
-    bool lookOnce(Changes& changes);
+    /// @param mayBeUnmade a store may be there whose text was never made.
+    /// @return false when the text is to be looked at again.
+    bool lookOnce(Changes& changes, bool mayBeUnmade);
     bool takeInTail(Changes& changes);
-    bool readAnew(Changes& changes);
+    bool readAnew(Changes& changes, bool mayBeUnmade);
     bool acceptMissing();
 
     Disk& disk_;

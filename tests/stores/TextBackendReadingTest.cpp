@@ -268,6 +268,34 @@ TEST_F(TextBackendReading, aTextThatVanishedIsWaitedForAndThenAnError) {
     EXPECT_EQ(contentAfter({addFiles({u"b"})}), contentOf(*backend));
 }
 
+TEST_F(TextBackendReading, aTextThatGitHasJustTakenAwayIsWaitedForAlsoByWhoOpensTheProject) {
+    for (auto const access : {Access::Read, Access::Write}) {
+        prepare({u"a"});
+        volume->remove("project.jsonl");
+        volume->beforeCall = [&](std::string const& call) {
+            if (call == "pause") {
+                volume->replaceFile("project.jsonl", textOf(addFiles({u"b"})));
+            }
+        };
+        auto const backend = open();
+        Entered const entered(*backend, access);
+
+        EXPECT_EQ(contentAfter({addFiles({u"b"})}), loadAll(*backend));
+    }
+}
+
+TEST_F(TextBackendReading, aStoreWhoseMakerDiedBeforeItsTextWasMadeIsAnEmptyProject) {
+    prepare({u"a"});
+    volume->remove("project.jsonl");
+
+    EXPECT_THAT(contentOf(*open({std::chrono::seconds(10), 0, 1})), IsEmpty());
+
+    EXPECT_GT(volume->count("pause"), 3U);
+    EXPECT_LT(volume->count("pause"), 15U);
+    commit(*open(), addFiles({u"b"}));
+    EXPECT_EQ(contentAfter({addFiles({u"b"})}), stored());
+}
+
 TEST_F(TextBackendReading, aFolderThatVanishedIsNoEmptyProject) {
     prepare({u"a"});
     auto const backend = open();

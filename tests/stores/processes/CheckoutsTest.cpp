@@ -1,0 +1,299 @@
+#include <algorithm>
+#include <atomic>
+#include <chrono>
+#include <cstring>
+#include <fstream>
+#include <iostream>
+#include <random>
+#include <thread>
+
+#include "GitFolder.hpp"
+#include "SharedMemory.hpp"
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
+#include "support/ChildProcess.hpp"
+#include "support/NightlyScale.hpp"
+#include "support/TemporaryFolder.hpp"
+#include "support/TextStore.hpp"
+
+namespace project::test {
+
+namespace {
+
+using namespace std::chrono_literals;
+using metadata::MetadataNodeSpecification;
+using stores::TreeMetadataManager;
+
+constexpr std::size_t folders = 200;
+constexpr std::size_t filesInFolder = 16;
+constexpr std::size_t groups = 4;
+constexpr std::size_t inGroup = folders / groups;
+
+/// Three files at the beginning, in the middle and at the end of the text. Every batch of a writer gives all
+/// of them one value.
+std::vector<std::u16string> const marked{u"a", u"folder100/marked", u"z"};
+
+std::u16string folderName(std::size_t number) {
+    auto const digits = std::to_string(1000 + number).substr(1);
+    return u"folder" + std::u16string(digits.begin(), digits.end());
+}
+
+/// One of the files that are in a project all together or not at all, spread over the whole text.
+Address inGroupOf(std::size_t group, std::size_t index) {
+    return fileAddress(folderName(index * groups + group) + u"/of a group");
+}
+
+Batch groupOf(std::size_t group) {
+    Batch batch;
+    for (std::size_t index = 0; index < inGroup; ++index) {
+        batch.push_back(set(inGroupOf(group, index)));
+    }
+    return batch;
+}
+
+Batch valueOfMarked(std::u16string const& value) {
+    Batch batch;
+    for (auto const& path : marked) {
+        batch.push_back(set(fileAddress(path), makeNode(u"Info", {{u"V", value}})));
+    }
+    return batch;
+}
+
+/// What the processes tell.
+struct Tally {
+    std::atomic<bool> stop;
+    std::atomic<unsigned> looks;     ///< guards of readers
+    std::atomic<unsigned> others;    ///< of them, those that showed something else than the one before
+    std::atomic<unsigned> written;   ///< batches
+    std::atomic<unsigned> refused;   ///< batches, with an error
+    std::atomic<unsigned> gitDid;    ///< commands
+    std::atomic<unsigned> gitFailed; ///< commands, because of what writers had changed, or in conflicts
+    std::array<char, 400> wrong;     ///< what a process found that must not be
+};
+
+/// What one look at a project shows of it.
+struct Sight {
+    std::array<std::size_t, groups> groupFiles; ///< how many are there
+    std::array<std::u16string, 3> values;
+    std::size_t others; ///< files that are in every version, of a sample
+
+    friend bool operator==(Sight const&, Sight const&) = default;
+};
+
+Sight lookAt(TreeMetadataManager& store) {
+    Sight sight{};
+    for (std::size_t group = 0; group < groups; ++group) {
+        for (std::size_t index = 0; index < inGroup; ++index) {
+            sight.groupFiles[group] += store.hasNode(inGroupOf(group, index)) ? 1U : 0U;
+        }
+    }
+    for (std::size_t index = 0; index < marked.size(); ++index) {
+        auto const node = store.getNode(fileAddress(marked[index]));
+        sight.values[index] = node ? node->get(u"V") : u"none";
+    }
+    for (std::size_t folder = 0; folder < folders; folder += 20) {
+        sight.others += store.hasNode(fileAddress(folderName(folder) + u"/0003")) ? 1U : 0U;
+    }
+    return sight;
+}
+
+/// What of it belongs to no version that was ever whole; empty when all of it does.
+std::string wrongWith(Sight const& sight) {
+    if (sight.others != folders / 20) {
+        return "files are missing that are in every version: " + std::to_string(sight.others);
+    }
+    for (std::size_t group = 0; group < groups; ++group) {
+        if (sight.groupFiles[group] != inGroup && (group == 0 || sight.groupFiles[group] != 0)) {
+            return "half of group " + std::to_string(group) + ": " + std::to_string(sight.groupFiles[group]);
+        }
+    }
+    if (sight.values[0] != sight.values[1] || sight.values[0] != sight.values[2] ||
+        sight.values[0] == u"none") {
+        return "half of a batch";
+    }
+    return {};
+}
+
+/// A repository with a project in several versions: main has group 0, each other branch one more, two of them
+/// in batches behind the text. Git, readers and writers work on it at the same time.
+class Checkouts : public testing::Test {
+protected:
+    void SetUp() override {
+        Batch all = groupOf(0);
+        for (std::size_t folder = 0; folder < folders; ++folder) {
+            auto const more = addFiles(manyFiles(filesInFolder, folderName(folder)));
+            all.insert(all.end(), more.begin(), more.end());
+        }
+        auto const values = valueOfMarked(u"0");
+        all.insert(all.end(), values.begin(), values.end());
+        makeBranches(all);
+    }
+
+    void makeBranches(Batch const& all) {
+        commit(*open(), all);
+        git.commitAll();
+        for (std::size_t group = 1; group < groups; ++group) {
+            git.run({"switch", "-q", "-c", branch(group), "main"});
+            bool const isTail = group > 1;
+            root.addFile("work/.projectdata/project.jsonl",
+                         isTail ? textOf(all, {groupOf(group)}) : textOf(joined(all, groupOf(group))));
+            git.commitAll();
+        }
+        git.run({"switch", "-q", "main"});
+    }
+
+    static Batch joined(Batch first, Batch const& second) {
+        first.insert(first.end(), second.begin(), second.end());
+        return first;
+    }
+
+    static std::string branch(std::size_t number) {
+        return number == 0 ? "main" : "group" + std::to_string(number);
+    }
+
+    std::unique_ptr<TextBackend> open() const {
+        return std::make_unique<TextBackend>(stores::makeSystemDisk(root.path(u"work")));
+    }
+
+    std::unique_ptr<TreeMetadataManager> openStore() const {
+        return std::make_unique<TreeMetadataManager>(open(), root.path(u"work/.projectdata"));
+    }
+
+    /// Runs until the end, or until something is wrong.
+    std::unique_ptr<ChildProcess> start(std::function<void(std::mt19937&)> const& act) {
+        auto const childSeed = random();
+        return std::make_unique<ChildProcess>([this, act, childSeed](ChildProcess::Parent const&) {
+            std::mt19937 ownRandom(childSeed);
+            try {
+                while (!tally->stop) {
+                    act(ownRandom);
+                }
+            } catch (std::exception const& error) {
+                std::strncpy(tally->wrong.data(), error.what(), tally->wrong.size() - 1);
+                tally->stop = true;
+            }
+        });
+    }
+
+    void require(Sight const& sight) const {
+        if (auto const wrong = wrongWith(sight); !wrong.empty()) {
+            throw std::runtime_error(wrong);
+        }
+    }
+
+    Sight readTwice(TreeMetadataManager& store) const {
+        auto const guard = store.acquireReadLock();
+        auto const sight = lookAt(store);
+        require(sight);
+        std::this_thread::sleep_for(1ms);
+        if (lookAt(store) != sight) {
+            throw std::runtime_error("what a guard shows has changed under it");
+        }
+        ++tally->looks;
+        return sight;
+    }
+
+    /// Gives the three marked files another value. That may be refused, but it is never done by half.
+    void write(TreeMetadataManager& store, std::mt19937& ownRandom) const {
+        auto const digits = std::to_string(ownRandom());
+        std::map<Address, std::shared_ptr<metadata::MetadataNode>> nodes;
+        for (auto const& path : marked) {
+            auto node = std::make_shared<MetadataNodeSpecification>(u"Info");
+            node->put(u"V", std::u16string(digits.begin(), digits.end()));
+            nodes.emplace(fileAddress(path), std::move(node));
+        }
+        try {
+            store.setNodes(nodes);
+            ++tally->written;
+        } catch (StoreError const&) {
+            ++tally->refused;
+        }
+    }
+
+    void tryTo(std::vector<std::string> const& arguments) const {
+        ++tally->gitDid;
+        tally->gitFailed += git.tryTo(arguments) ? 0U : 1U;
+    }
+
+    void doWithGit(std::mt19937& ownRandom) const {
+        auto const here = branch(ownRandom() % groups);
+        auto const there = branch(ownRandom() % groups);
+        switch (ownRandom() % 5) {
+        case 0:
+            tryTo({"checkout", "-q", "-f", here});
+            break;
+        case 1:
+            tryTo({"switch", "-q", here});
+            break;
+        case 2:
+            tryTo({"stash", "-q"});
+            tryTo({"checkout", "-q", "-f", here});
+            tryTo({"stash", "pop", "-q"});
+            break;
+        case 3:
+            tryTo({"checkout", "-q", "-f", "--detach", here});
+            tryTo({"merge", "-q", "-m", "merged", there});
+            break;
+        default:
+            tryTo({"clean", "-q", "-xdf"});
+        }
+        tryTo({"reset", "-q", "--hard"});
+        git.tryTo({"stash", "clear"});
+    }
+
+    TemporaryFolder root;
+    std::filesystem::path const work = root.addFolder("work");
+    GitFolder const git{work};
+    std::uint64_t const seed = testSeed();
+    std::mt19937 random{static_cast<std::mt19937::result_type>(seed)};
+    SharedMemory<Tally> tally;
+};
+
+TEST_F(Checkouts, besideReadersAndWritersShowWholeVersionsOnly) {
+    auto const store = openStore();
+    auto last = readTwice(*store);
+    std::vector<std::unique_ptr<ChildProcess>> processes;
+    processes.push_back(start([this](std::mt19937& ownRandom) { doWithGit(ownRandom); }));
+    for (int writer = 0; writer < 2; ++writer) {
+        processes.push_back(
+            start([this, own = std::shared_ptr(openStore())](std::mt19937& ownRandom) mutable {
+                if (ownRandom() % 10 == 0) {
+                    own = openStore();
+                }
+                write(*own, ownRandom);
+                std::this_thread::sleep_for(std::chrono::milliseconds(ownRandom() % 10));
+            }));
+    }
+    processes.push_back(start([this](std::mt19937&) { readTwice(*openStore()); }));
+    auto const end = std::chrono::steady_clock::now() + std::chrono::seconds(testSeconds(2));
+    try {
+        while (!tally->stop && std::chrono::steady_clock::now() < end) {
+            auto const now = readTwice(*store);
+            tally->others += now == last ? 0U : 1U;
+            last = now;
+        }
+    } catch (StoreError const& error) {
+        ADD_FAILURE() << error.what();
+    } catch (std::runtime_error const& error) {
+        ADD_FAILURE() << error.what();
+    }
+    tally->stop = true;
+    for (auto const& process : processes) {
+        EXPECT_TRUE(process->join());
+    }
+
+    EXPECT_STREQ("", tally->wrong.data());
+    std::cout << tally->looks << " looks of readers, one of them at " << tally->others << " changes; "
+              << tally->written << " batches, " << tally->refused << " refused; " << tally->gitDid
+              << " commands of git, " << tally->gitFailed << " failed\n";
+    EXPECT_GT(tally->others, 0U);
+    EXPECT_GT(tally->written, 0U);
+    EXPECT_GT(tally->gitDid, tally->gitFailed);
+    if (HasFailure()) {
+        ADD_FAILURE() << "repeat with PROJECT_TEST_SEED=" << seed;
+    }
+}
+
+} // namespace
+
+} // namespace project::test
