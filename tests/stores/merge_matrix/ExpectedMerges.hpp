@@ -1,0 +1,41 @@
+#pragma once
+
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "stores/merge_matrix/ProjectChanges.hpp"
+
+namespace project::test {
+
+/// What a text says, whatever the order of nested nodes, an address a line.
+std::string contentOf(std::string const& text);
+
+/// What the merge of any two changes has to come to.
+class ExpectedMerges {
+public:
+    ExpectedMerges();
+
+    /// The conflict of two changes, told as tests of merging tell it; empty when they merge clean.
+    static std::string conflict(std::string const& ours, std::string const& theirs);
+
+    /// The pairs of names that these tables make exceptions of.
+    static std::vector<std::pair<std::string, std::string>> exceptions();
+
+    /// Fails the test unless a merged text says what both changes come to in one project, one after the other
+    /// in each order that the managers allow.
+    void expectBoth(std::string const& merged, NamedChange const& one, NamedChange const& other) const;
+
+    SampleProject const& project() const noexcept { return project_; }
+
+    /// The version that all changes start from.
+    std::string const& common() const noexcept { return common_; }
+
+private:
+    bool expectAfter(std::string const& merged, NamedChange const& first, NamedChange const& second) const;
+
+    SampleProject project_;
+    std::string common_;
+};
+
+} // namespace project::test
