@@ -106,7 +106,7 @@ std::optional<StoreWriter::Put> StoreWriter::put(std::string_view bytes, FileIde
 
 std::optional<StoreWriter::Put> StoreWriter::swapIn(std::string const& name, WrittenFile const& file,
                                                     FileIdentity const& expected) {
-    if (identifyQuietly(StoreFiles::text) != expected) {
+    if (disk_.identify(StoreFiles::text) != expected) {
         removeOwn(name, file.identity);
         return std::nullopt;
     }
@@ -120,8 +120,7 @@ std::optional<StoreWriter::Put> StoreWriter::swapIn(std::string const& name, Wri
             return std::nullopt;
         }
         disk_.rename(name, StoreFiles::text);
-    } else if (auto const old = identifyQuietly(name); !old || !old->isSameState(expected)) {
-        putBack(name, file.identity);
+    } else if (!hasComeOut(name, expected, file.identity)) {
         return std::nullopt;
     }
     // A new name changes one of the file's times.
@@ -129,6 +128,24 @@ std::optional<StoreWriter::Put> StoreWriter::swapIn(std::string const& name, Wri
     bool const isKnown = now && now->isSameState(file.identity);
     result.file = {isKnown ? *now : file.identity, isKnown && file.isStamped};
     return result;
+}
+
+/// Looks whether an exchange has given a name to the text that was read; anything else goes back, and also
+/// when the disk can't tell.
+bool StoreWriter::hasComeOut(std::string const& name, FileIdentity const& expected,
+                             FileIdentity const& ours) {
+    std::optional<FileIdentity> old;
+    try {
+        old = disk_.identify(name);
+    } catch (StoreError const&) {
+        putBack(name, ours);
+        throw;
+    }
+    bool const isExpected = old && old->isSameState(expected);
+    if (!isExpected) {
+        putBack(name, ours);
+    }
+    return isExpected;
 }
 
 /// What came out was not what was read: somebody put it there at the last moment, and it goes there again.
@@ -158,8 +175,8 @@ void StoreWriter::throwNotPutBack(std::string const& name, FileIdentity const& o
     }
     throw StoreError(
         pathOfText(), 0,
-        "was replaced by another program while a batch was written, and could not be put back: it "
-        "is " +
+        "was perhaps replaced by another program while a batch was written, and could not be put back: "
+        "it is " +
             aside + " now, and the text in its place has the batch",
         "Compare the two files and keep what is right.");
 }

@@ -43,6 +43,7 @@ private:
     std::optional<WrittenFile> appendOrTakeBack(std::string_view lines, FileIdentity const& before);
     std::optional<Put> put(std::string_view bytes, FileIdentity const& expected);
     std::optional<Put> swapIn(std::string const& name, WrittenFile const& file, FileIdentity const& expected);
+    bool hasComeOut(std::string const& name, FileIdentity const& expected, FileIdentity const& ours);
     void putBack(std::string const& name, FileIdentity const& ours);
     [[noreturn]] void throwNotPutBack(std::string const& name, FileIdentity const& ours);
     void withdraw(Put const& put);

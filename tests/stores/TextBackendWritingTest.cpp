@@ -411,6 +411,20 @@ TEST_F(TextBackendWriting, whenTheFolderCannotBeSyncedAfterARewriteTheTextWithou
     EXPECT_EQ(textOf(addFiles({u"a", u"c"})), text());
 }
 
+TEST_F(TextBackendWriting, aDiskThatCanNotTellWhatAnExchangeTookOutIsNotTakenForAnotherProgram) {
+    prepare({u"a"});
+    auto const before = text();
+    auto const backend = open();
+    failOnce("identify swapping");
+
+    EXPECT_EQ("Input/output error", errorOf([&] { commit(*backend, addFiles({u"b"})); }).getProblem());
+
+    EXPECT_EQ(before, text());
+    EXPECT_THAT(volume->names(), ElementsAre(".gitattributes", ".gitignore", "project.jsonl"));
+    volume->powerCut();
+    EXPECT_EQ(before, text());
+}
+
 TEST_F(TextBackendWriting, whenAnyCallFailsTheBatchIsWhollyInOrWhollyOutAsTheErrorSays) {
     for (auto const& options : {rewriting(), appending()}) {
         prepare(manyFiles(20));
