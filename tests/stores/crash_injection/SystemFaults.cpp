@@ -1,0 +1,106 @@
+#include "SystemFaults.hpp"
+
+#include <cstdlib>
+#include <filesystem>
+#include <set>
+#include <system_error>
+
+using testing::Contains;
+using testing::IsEmpty;
+using testing::Not;
+using testing::StartsWith;
+
+namespace project::test {
+
+namespace {
+
+bool saysUnknown(std::string const& problem) {
+    return problem.find("nobody can tell") != std::string::npos ||
+           problem.find("could not be put back") != std::string::npos;
+}
+
+} // namespace
+
+void SystemFaults::SetUpTestSuite() {
+    if (std::filesystem::is_directory("/dev/shm")) {
+        ::setenv("TMPDIR", "/dev/shm", 0);
+    }
+}
+
+std::optional<StoreError> SystemFaults::perform(SystemDeed const& deed, RealProject& project,
+                                                SystemCalls::Answer const& answer) {
+    SystemCalls const calls(answer);
+    try {
+        deed.perform(project);
+    } catch (StoreError const& error) {
+        return error;
+    }
+    return std::nullopt;
+}
+
+bool SystemFaults::failAt(SystemDeed const& deed, std::size_t callsBefore, int error, bool isForGood,
+                          SystemCalls::Answer const& system) {
+    auto const project = projectFor(deed);
+    std::size_t count = 0;
+    std::string failed;
+    auto const thrown = perform(deed, *project, [&](SystemCall const& call) {
+        bool const isHit = count == callsBefore || (isForGood && count > callsBefore);
+        ++count;
+        if (isHit && failed.empty()) {
+            failed = call.name;
+        }
+        return isHit ? error : system ? system(call) : 0;
+    });
+    SCOPED_TRACE(std::string(deed.name) + ": " + std::generic_category().message(error) +
+                 (isForGood ? " from call " : " at call ") + std::to_string(callsBefore) + ", " + failed);
+    if (thrown) {
+        EXPECT_FALSE(failed.empty()) << thrown->what();
+        EXPECT_THAT(thrown->getFile(), StartsWith(project->root.onDisk().string())) << thrown->what();
+        EXPECT_THAT(thrown->getRemedy(), Not(IsEmpty())) << thrown->what();
+    }
+    checkAfterwards(deed, *project, thrown);
+    if (!failed.empty()) {
+        ++hits[failed];
+    }
+    return !failed.empty();
+}
+
+void SystemFaults::checkAfterwards(SystemDeed const& deed, RealProject& project,
+                                   std::optional<StoreError> const& error) {
+    SystemCalls const withoutSyncs;
+    auto const found = contentOf(*project.open(deed.options));
+    if (error && saysUnknown(error->getProblem())) {
+        EXPECT_THAT((std::vector<Content>{deed.before, deed.after}), Contains(found));
+    } else {
+        EXPECT_EQ(error ? deed.before : deed.after, found) << (error ? error->what() : "no error");
+    }
+    if (project.backend) {
+        EXPECT_EQ(found, contentOf(*project.backend));
+    }
+    project.backend.reset();
+    checkNextWriter(deed, project, found);
+}
+
+void SystemFaults::checkNextWriter(SystemDeed const& deed, RealProject const& project, Content const& found) {
+    auto const writer = project.open(deed.options);
+    std::set<std::string> allowed{".gitattributes", ".gitignore", "project.jsonl"};
+    for (auto const& fault : writer->check()) {
+        if (fault.kind == stores::Fault::Kind::Damage) {
+            EXPECT_NE(std::string::npos, project.text().find("\"a name without its end\n"));
+            writer->repair();
+        } else if (fault.kind == stores::Fault::Kind::Conflict) {
+            writer->settle(textOf(addFiles(manyFiles(20))));
+        }
+    }
+    auto const before = contentOf(*writer);
+    commit(*writer, addFiles({u"z"}));
+    auto after = before;
+    after.insert(*contentAfter({addFiles({u"z"})}).begin());
+    EXPECT_EQ(after, contentOf(*project.open(deed.options)));
+    EXPECT_TRUE(before == found || deed.name == std::string("settle"));
+    for (auto const& name : project.names()) {
+        EXPECT_TRUE(allowed.contains(name) || name.starts_with("damaged-")) << name << " was left";
+    }
+}
+
+} // namespace project::test
