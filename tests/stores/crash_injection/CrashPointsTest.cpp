@@ -45,7 +45,8 @@ public:
     /// All calls of one kind of deed, with all kinds of trouble.
     void visit(KindOfDeed const& kind, Situation const& start) {
         for (auto const& trouble : kindsOfTrouble()) {
-            for (std::size_t call = 0; visitCall(start, kind, trouble, call, false); ++call) {
+            auto const same = choices_; // the same deed each time, so that no call of it is left out
+            for (std::size_t call = 0; visitCall(start, kind, same, trouble, call, false); ++call) {
                 if (testing::Test::HasFailure()) {
                     return;
                 }
@@ -54,8 +55,8 @@ public:
     }
 
 private:
-    bool visitCall(Situation const& start, KindOfDeed const& kind, KindOfTrouble const& trouble,
-                   std::size_t call, bool isInRecovery);
+    bool visitCall(Situation const& start, KindOfDeed const& kind, Choices ofDeed,
+                   KindOfTrouble const& trouble, std::size_t call, bool isInRecovery);
     Outcome perform(Deed& deed, CrashingVolume& volume, KindOfTrouble const& trouble, std::size_t call);
     void checkContent(Situation& now, Deed& deed, Outcome outcome, bool makesDurable, bool cutsPower);
     void checkSameProcess(Situation& now, Deed& deed, Outcome outcome);
@@ -88,11 +89,12 @@ Outcome CrashPoints::perform(Deed& deed, CrashingVolume& volume, KindOfTrouble c
 }
 
 /// @return false when the deed makes fewer calls.
-bool CrashPoints::visitCall(Situation const& start, KindOfDeed const& kind, KindOfTrouble const& trouble,
-                            std::size_t call, bool isInRecovery) {
+bool CrashPoints::visitCall(Situation const& start, KindOfDeed const& kind, Choices ofDeed,
+                            KindOfTrouble const& trouble, std::size_t call, bool isInRecovery) {
     auto now = start;
     now.volume = start.volume->copy(choices_.seed());
-    auto deed = kind.make(now, choices_);
+    auto deed = kind.make(now, ofDeed);
+    choices_.goOnAfter(ofDeed);
     auto const outcome = perform(deed, *now.volume, trouble, call);
     auto const troubled = now.volume->troubled();
     SCOPED_TRACE(std::string(kind.name) + " in " + toString(start.story) + ": " + trouble.name + " at call " +
@@ -167,7 +169,7 @@ void CrashPoints::recover(Situation const& dead) {
         auto const& kind = kinds[choices_.upTo(kinds.size() - 1)];
         auto const& trouble = kindsOfTrouble()[choices_.upTo(kindsOfTrouble().size() - 1)];
         auto call = choices_.upTo(24);
-        while (!visitCall(dead, kind, trouble, call, true) && call > 0) {
+        while (!visitCall(dead, kind, choices_, trouble, call, true) && call > 0) {
             call = choices_.upTo(call - 1);
         }
     }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <memory>
 #include <random>
 #include <string>
@@ -51,6 +52,9 @@ public:
     std::size_t upTo(std::size_t bound);
 
     bool oneIn(std::size_t count) { return upTo(count - 1) == 0; }
+
+    /// What is new differs from what another one has made by now, too.
+    void goOnAfter(Choices const& other) { count_ = std::max(count_, other.count_); }
 
     unsigned seed() { return static_cast<unsigned>(random_()); }
 

@@ -7,6 +7,7 @@
 #include "support/NightlyScale.hpp"
 
 using testing::HasSubstr;
+using testing::UnorderedElementsAre;
 
 namespace project::test {
 
@@ -108,6 +109,33 @@ TEST_F(SystemFaults, aNewTextThatCanNotBeLookedAtIsNotPutInPlace) {
     EXPECT_THAT(thrown->getFile(), HasSubstr(".tmp"));
     EXPECT_EQ("can't be looked at: Input/output error", thrown->getProblem());
     checkAfterwards(deed, *project, thrown);
+}
+
+TEST_F(SystemFaults, whenANewTextCanNotBeWrittenNothingOfItIsLeft) {
+    auto const deed = rewritingDeed();
+    auto const project = projectFor(deed);
+
+    auto const thrown = perform(deed, *project, failing("write", 0));
+
+    ASSERT_TRUE(thrown);
+    EXPECT_THAT(project->names(), UnorderedElementsAre(".gitattributes", ".gitignore", "project.jsonl"));
+}
+
+/// On some file systems it is at closing that a full disk shows.
+TEST_F(SystemFaults, aFileThatCanNotBeClosedAfterASyncIsNotDurable) {
+    for (auto const& deed : {appendingDeed(), rewritingDeed(), creatingDeed()}) {
+        auto const project = projectFor(deed);
+
+        auto const thrown = perform(deed, *project, [wasSynced = false](SystemCall const& call) mutable {
+            bool const isHit = wasSynced && call.name == "close";
+            wasSynced = call.name == "fdatasync";
+            return isHit ? ENOSPC : 0;
+        });
+
+        ASSERT_TRUE(thrown) << deed.name;
+        EXPECT_EQ("Make room on the disk and try again.", thrown->getRemedy().substr(0, 36));
+        checkAfterwards(deed, *project, thrown);
+    }
 }
 
 } // namespace
