@@ -7,6 +7,16 @@
 
 namespace project::stores {
 
+namespace {
+
+/// What to do when nobody can tell whether a batch is in the project.
+std::string openAnewAfter(StoreError const& failure) {
+    return failure.getRemedy() + (failure.getRemedy().empty() ? "" : " ") +
+           "Then open the project anew, and look whether the last change is there.";
+}
+
+} // namespace
+
 void StoreWriter::append(std::string_view lines) {
     auto const before = seen_.identity();
     if (!isInPlace(before)) {
@@ -159,7 +169,15 @@ void StoreWriter::putBack(std::string const& name, FileIdentity const& ours) {
     if (!isBack) {
         throwNotPutBack(name, ours);
     }
-    disk_.syncFolder(); // or the batch could come back with a power cut
+    try {
+        disk_.syncFolder(); // or the batch could come back with a power cut
+    } catch (StoreError const& failure) {
+        loseTrack(ours);
+        throw StoreError(pathOfText(), 0,
+                         failure.getProblem() + "; the text that stood there is back, but after a power cut "
+                                                "nobody can tell whether the batch is in the project",
+                         openAnewAfter(failure));
+    }
     if (!removeOwn(name, ours)) {
         setAside(disk_, name); // yet another one came in between
     }
@@ -214,8 +232,7 @@ void StoreWriter::takeBack(FileIdentity const& current, StoreError const& failur
     throw StoreError(pathOfText(), 0,
                      failure.getProblem() + "; writing the text without the last batch failed too (" +
                          reason + "): nobody can tell whether the batch is in the project",
-                     failure.getRemedy() + " Then open the project anew, and look whether the last change is "
-                                           "there.");
+                     openAnewAfter(failure));
 }
 
 /// Nothing is written any more by this object. What the system holds of the text may differ from what is on

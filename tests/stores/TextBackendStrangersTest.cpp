@@ -1,5 +1,6 @@
 #include "support/TextStore.hpp"
 
+using testing::Contains;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
@@ -133,6 +134,28 @@ TEST_F(TextBackendStrangers, aTextThatWasPutBackStaysAfterAPowerCut) {
         volume->powerCut();
 
         EXPECT_EQ(theirs, text());
+    }
+}
+
+TEST_F(TextBackendStrangers, whenAPutBackTextCannotBeMadeDurableTheOutcomeIsCalledUnknown) {
+    for (unsigned seed = 0; seed < 20; ++seed) {
+        *volume = CrashingVolume(seed);
+        prepare({u"a"});
+        auto const backend = open();
+        once(volume->beforeCall, "exchange swapping project.jsonl",
+             [&] { volume->replaceFile("project.jsonl", theirs); });
+        once(volume->afterCall, "identify swapping", [&] { failOnce("syncFolder"); });
+
+        auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
+
+        EXPECT_THAT(error.getProblem(), HasSubstr("nobody can tell whether the batch is in the project"));
+        EXPECT_EQ(theirs, text());
+        EXPECT_THAT(errorOf([&] { commit(*backend, addFiles({u"c"})); }).getRemedy(),
+                    HasSubstr("Open the project anew"));
+        volume->powerCut();
+        EXPECT_THAT((std::vector<Content>{contentAfter({addFiles({u"a", u"b"})}),
+                                          contentAfter({addFiles({u"their file"})})}),
+                    Contains(stored()));
     }
 }
 
