@@ -34,6 +34,7 @@ TEST(RealSyncCounts, eachOperationSyncsAsOftenAsItMustAndNotMore) {
         {"rewrite", {1, 1}},
         {"create", {4, 3}},  // the root for the folder, the folder for the new store, and for the first batch
         {"recover", {1, 2}}, // the folder before a dead writer's files go
+        {"rewrite somebody else's text", {1, 1}},
         {"append after others", {1, 0}},
         {"look after others", {0, 0}},
         {"close", {1, 1}},

@@ -4,6 +4,8 @@
 #include <fstream>
 #include <sstream>
 
+#include <unistd.h>
+
 #include "StoreFiles.hpp"
 
 namespace project::test {
@@ -53,6 +55,13 @@ void letAnotherProcessAppend(RealProject& project) {
 
 void leaveWhatADeadWriterLeft(RealProject& project) {
     project.root.addFile(".projectdata/project.jsonl.1-0123456789abcdef.tmp", "half a text");
+}
+
+/// A new text gets the owner of the old one, if it may.
+void giveAway(RealProject& project) {
+    constexpr uid_t nobody = 65534;
+    static_cast<void>(
+        ::chown((project.root.onDisk() / ".projectdata/project.jsonl").c_str(), nobody, nobody));
 }
 
 void discardOne(RealProject& project) {
@@ -140,6 +149,8 @@ std::vector<SystemDeed> systemDeeds() {
         rewritingDeed(),
         creatingDeed(),
         withAfter(deed("recover", text, rewriting, leaveWhatADeadWriterLeft, commitOne),
+                  contentAfter({many, one})),
+        withAfter(deed("rewrite somebody else's text", text, rewriting, giveAway, commitOne),
                   contentAfter({many, one})),
         withAfter(afterOthers, contentAfter({many, one, another})),
         withAfter(lookAfterOthers, contentAfter({many, one})),
