@@ -88,7 +88,7 @@ void Sorting::takeFile(Difference const& difference) {
     bool const isItself = index == address.depth() || isMarker;
     bool const cameOrWent = isItself && (difference.before == nullptr) != (difference.after == nullptr);
     if (cameOrWent) {
-        files_.insert(path);
+        files_.insert(files_.end(), path); // they come sorted, but for odd names
     }
     if (!cameOrWent || (difference.after && !difference.after->getChildren().empty())) {
         labelled_.insert(path);

@@ -18,7 +18,8 @@ void ChangeLog::add(Changes const& changes) {
     }
     everything_ = everything_ || changes.everything;
     for (auto const& [address, before, after] : changes.differences) {
-        differences_.try_emplace(address, Ends{before, nullptr}).first->second.after = after;
+        // Most often they come sorted, and behind what is there.
+        differences_.try_emplace(differences_.end(), address, Ends{before, nullptr})->second.after = after;
     }
 }
 

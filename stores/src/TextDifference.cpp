@@ -1,7 +1,7 @@
 #include "TextDifference.hpp"
 
 #include <algorithm>
-#include <set>
+#include <vector>
 
 #include "JsonText.hpp"
 
@@ -22,11 +22,17 @@ class Candidates {
 public:
     Candidates(TextContent const& left, TextContent const& right) : left_(left), right_(right) {
         compareBodies();
+        auto const ofBodies = found_.size();
         lookThrough(left_);
         lookThrough(right_);
+        if (found_.size() > ofBodies) {
+            std::sort(found_.begin(), found_.end());
+            found_.erase(std::unique(found_.begin(), found_.end()), found_.end());
+        }
     }
 
-    std::set<Address> const& found() const noexcept { return found_; }
+    /// Sorted.
+    std::vector<Address> const& found() const noexcept { return found_; }
 
 private:
     void compareBodies() {
@@ -45,7 +51,7 @@ private:
             auto const order = leftEnds            ? std::strong_ordering::greater
                                : r == right.size() ? std::strong_ordering::less
                                                    : compare(left.address(l), right.address(r));
-            found_.insert(found_.end(), toAddress(std::is_gt(order) ? right.address(r) : left.address(l)));
+            found_.push_back(toAddress(std::is_gt(order) ? right.address(r) : left.address(l)));
             l += std::is_lteq(order) ? 1 : 0;
             r += std::is_gteq(order) ? 1 : 0;
         }
@@ -53,7 +59,7 @@ private:
 
     void lookThrough(TextContent const& content) {
         for (auto const& [address, entry] : content.overlay().entries()) {
-            found_.insert(address);
+            found_.push_back(address);
             if (entry.hides) {
                 lookAtHidden(content.body(), address);
             }
@@ -63,13 +69,13 @@ private:
     void lookAtHidden(TextBody const& body, Address const& address) {
         TextBody::Range const hidden = body.within(AddressText(address).view());
         for (std::size_t i = hidden.begin; i < hidden.end; ++i) {
-            found_.insert(toAddress(body.address(i)));
+            found_.push_back(toAddress(body.address(i)));
         }
     }
 
     TextContent const& left_;
     TextContent const& right_;
-    std::set<Address> found_;
+    std::vector<Address> found_;
 };
 
 } // namespace
