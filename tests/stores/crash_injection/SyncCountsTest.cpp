@@ -15,7 +15,8 @@ Calls const lockAndClear{
 Calls const lockAgain{"openFolder", "lock", "isFolderInPlace", "identify project.jsonl"};
 Calls const look{"identifyByPath project.jsonl"};
 Calls const readForTheFirstTime{"openFolder", "read project.jsonl"};
-Calls const findNoStoreInLockedFolder{"read project.jsonl", "identify .gitattributes"};
+Calls const readInLockedFolder{"read project.jsonl"};
+Calls const findNoStore{"read project.jsonl", "identify .gitattributes"};
 Calls const lookAndRead{"identifyByPath project.jsonl", "openFolder", "read project.jsonl"};
 Calls const isInPlace{"isFolderInPlace", "identifyByPath project.jsonl"};
 Calls const append{"append project.jsonl", "sync"};
@@ -37,7 +38,7 @@ Calls const wholeRewrite = joined({isInPlace, writeNewText, exchange, isInPlace,
 Calls const creation =
     joined({{"openFolder", "openFolder", "makeFolder"},
             lockAndClear,
-            findNoStoreInLockedFolder,
+            findNoStore,
             {"create temporary", "sync", "renameToFree temporary .gitattributes", "identify .gitattributes"},
             {"create temporary", "sync", "renameToFree temporary .gitignore", "identify .gitignore"},
             {"create temporary", "sync", "renameToFree temporary project.jsonl", "identify project.jsonl"},

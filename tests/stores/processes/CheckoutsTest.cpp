@@ -256,8 +256,8 @@ TEST_F(Checkouts, besideReadersAndWritersShowWholeVersionsOnly) {
     processes.push_back(start([this](std::mt19937& ownRandom) { doWithGit(ownRandom); }));
     for (int writer = 0; writer < 2; ++writer) {
         processes.push_back(
-            start([this, own = std::shared_ptr(openStore())](std::mt19937& ownRandom) mutable {
-                if (ownRandom() % 10 == 0) {
+            start([this, own = std::shared_ptr<TreeMetadataManager>()](std::mt19937& ownRandom) mutable {
+                if (!own || ownRandom() % 10 == 0) {
                     own = openStore();
                 }
                 write(*own, ownRandom);
