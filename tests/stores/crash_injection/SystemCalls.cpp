@@ -89,6 +89,7 @@ int __real_unlinkat(int folder, char const* path, int flags);
 int __real_mkdirat(int folder, char const* path, mode_t mode);
 int __real_rmdir(char const* path);
 int __real_flock(int file, int operation);
+int __real_fcntl(int file, int command, ...);
 DIR* __real_fdopendir(int folder);
 dirent* __real_readdir(DIR* folder);
 
@@ -181,6 +182,14 @@ int __wrap_rmdir(char const* path) {
 
 int __wrap_flock(int file, int operation) {
     return fails("flock") ? -1 : __real_flock(file, operation);
+}
+
+int __wrap_fcntl(int file, int command, ...) {
+    va_list rest;
+    va_start(rest, command);
+    auto* const argument = va_arg(rest, void*); // what locks are asked for by
+    va_end(rest);
+    return fails("fcntl") ? -1 : __real_fcntl(file, command, argument);
 }
 
 DIR* __wrap_fdopendir(int folder) {
