@@ -3,8 +3,10 @@
 namespace project::test {
 namespace {
 
+using ::testing::AllOf;
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
+using ::testing::Not;
 
 /// A project whose text something happened to.
 class BadStore : public ToolTest {
@@ -72,6 +74,61 @@ TEST_F(BadStore, withConflictMarkersIsListedAndNotWritten) {
     folder_.file(u"d");
     EXPECT_THAT(tool({"add", "d"}), FailsWith(1, text().string() + ":3: "));
     EXPECT_EQ(readText(), content);
+}
+
+/// The project lies in a folder of a repository, and its text lists what lies beside it.
+class StoreThatLeadsOutside : public BadStore {
+protected:
+    void SetUp() override {
+        folder_.file(u"beside.txt");
+        folder_.file(u"project/a");
+        settings_.folder = folder_.onDisk() / "project";
+        git({"init", "--quiet", ".."});
+        initProject();
+        ASSERT_THAT(tool({"add", "a"}), SucceedsSilently());
+        auto content = readProjectText();
+        content.replace(content.find("\"a\"\n"), 4,
+                        "\"..\"\n\"../beside.txt\"\n"
+                        "{\"at\":[\"Files\",\"Root\",\"File\",\"../beside.txt\"]}\n\"a\"\n");
+        std::ofstream(projectText(), std::ios::binary) << content;
+        git({"add", "--all", ".."});
+        git({"-c", "user.name=n", "-c", "user.email=e", "commit", "--quiet", "--message=all"});
+    }
+
+    std::filesystem::path projectText() const { return settings_.folder / ".projectdata/project.jsonl"; }
+
+    std::string readProjectText() const {
+        std::ifstream file(projectText(), std::ios::binary);
+        return {std::istreambuf_iterator<char>(file), {}};
+    }
+
+    std::string git(std::vector<std::string> arguments) const {
+        arguments.insert(arguments.begin(), "git");
+        auto const result = runProgram(arguments, settings_);
+        EXPECT_EQ(result.exitCode, 0) << result.errors;
+        return result.output;
+    }
+};
+
+TEST_F(StoreThatLeadsOutside, asksTheDiskForNothingThere) {
+    EXPECT_THAT(tool({"status"}).output, AllOf(HasSubstr("gone ../beside.txt\n"), HasSubstr("gone ..\n")));
+}
+
+TEST_F(StoreThatLeadsOutside, isToldOfByCheck) {
+    auto const checked = tool({"check"});
+
+    EXPECT_EQ(checked.exitCode, 1);
+    EXPECT_THAT(checked.output, AllOf(HasSubstr("no file can have the name \"..\""),
+                                      HasSubstr("no file can have the name \"../beside.txt\"")));
+}
+
+TEST_F(StoreThatLeadsOutside, takesNothingThereOutOfGitsIndex) {
+    for (auto const* path : {"../beside.txt", ".."}) {
+        EXPECT_THAT(tool({"remove", path}), FailsWith(1, "outside the project's folder"));
+    }
+    EXPECT_THAT(tool({"remove", "a"}), SucceedsSilently());
+
+    EXPECT_THAT(git({"status", "--porcelain", ".."}), Not(HasSubstr("beside.txt")));
 }
 
 TEST_F(BadStore, withATornTailHasLostNothing) {

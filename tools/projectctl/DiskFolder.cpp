@@ -104,6 +104,12 @@ bool isOnDisk(Path const& path) {
                                      (errno != ENOENT && errno != ENOTDIR && errno != ENAMETOOLONG));
 }
 
+bool isOnDisk(Path const& folder, std::u16string const& name) {
+    bool const leadsElsewhere =
+        name.empty() || name == u"." || name == u".." || name.find(u'/') != std::u16string::npos;
+    return !leadsElsewhere && isOnDisk(folder / Path(name));
+}
+
 bool isFolderItself(Path const& path) {
     SystemName const name(path);
 

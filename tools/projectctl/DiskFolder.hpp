@@ -28,6 +28,11 @@ std::vector<DiskEntry> readDiskFolder(Path const& folder);
 /// for want of a permission, counts as there.
 bool isOnDisk(Path const& path);
 
+/// The same for what the project lists in a folder. False, without a question to the disk, for names that
+/// nothing in a folder can have and that lead elsewhere: "..", ".", or one with a separator in it. A text
+/// that somebody else made may hold them.
+bool isOnDisk(Path const& folder, std::u16string const& name);
+
 /// True when the path itself is a folder, and no symbolic link to one.
 bool isFolderItself(Path const& path);
 

@@ -1,9 +1,14 @@
+#include <string>
+#include <vector>
+
 #include "Commands.hpp"
+#include "Failure.hpp"
 #include "Output.hpp"
 #include "PathArguments.hpp"
 #include "Progress.hpp"
 #include "ProjectCommand.hpp"
 #include "ProjectFolder.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
 
@@ -23,6 +28,7 @@ public:
 
     int run(OpenProject& project) override {
         auto const paths = paths_.read();
+        requireWithin(project, paths);
         for (auto const& path : project.trackedOutsideProject(paths)) {
             printError("warning: \"" + shown(path) +
                        "\" is below a removed folder and not in the project; git will not track it any more");
@@ -34,6 +40,23 @@ public:
     }
 
 private:
+    /// A text that somebody else made may list what lies outside the project. Git would take that out of its
+    /// own list too, where it belongs to another part of the repository.
+    static void requireWithin(OpenProject& project, std::vector<Path> const& paths) {
+        auto const isOutside = [&project](Path const& path) {
+            return path != project.root() && !project::metadata::isParent(path, project.root());
+        };
+        auto const guard = project.store().acquireReadLock();
+        for (auto const& path : paths) {
+            if (isOutside(path) && project.files().isFileInProject(path)) {
+                throw Failure(
+                    '"' + shown(path) +
+                    "\" lies outside the project's folder; nothing was removed. Take its line out of "
+                    "the project's text in an editor.");
+            }
+        }
+    }
+
     PathArguments paths_;
 };
 

@@ -64,11 +64,12 @@ void StatusScan::compareListed(Path const& path, Address const& address) {
 }
 
 void StatusScan::lookFor(Path const& folder, Address const& address, Child const& file) {
-    auto const path = folder / Path(file.element.getLocation());
+    auto const& name = file.element.getLocation();
+    auto const path = folder / Path(name);
     if (!file.node) {
         return; // it is not in the project
     }
-    if (isOnDisk(path)) {
+    if (isOnDisk(folder, name)) {
         compareListed(path, address.child(file.element)); // of a kind that is left out, but somebody added it
     } else {
         takeGone(path);
