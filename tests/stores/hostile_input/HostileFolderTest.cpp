@@ -87,7 +87,14 @@ protected:
 
     fs::path outside() const { return folder_.onDisk() / "outside.jsonl"; }
 
-    static std::string outsideText() { return bodyOf({"\"secret\""}); }
+    /// So long that a text with it is appended to and not written anew.
+    static std::u16string longName() { return std::u16string(500, u'0'); }
+
+    static std::string longText(std::string const& file) {
+        return bodyOf({'"' + std::string(500, '0') + '"', '"' + file + '"'});
+    }
+
+    static std::string outsideText() { return longText("secret"); }
 
     static std::string contentAt(fs::path const& path) {
         std::ifstream file(path, std::ios::binary);
@@ -213,7 +220,7 @@ TEST_F(HostileFolder, aTextThatGrowsAsItIsReadComesToAnEnd) {
 }
 
 TEST_F(HostileFolder, aTextThatIsSharedWithACopyOfTheProjectIsNeverAppendedTo) {
-    prepareText(bodyOf({"\"a\""}));
+    prepareText(longText("a"));
     auto const copy = folder_.addFolder("copy");
     fs::create_directory(copy / ".projectdata");
     fs::create_hard_link(inStore("project.jsonl"), copy / ".projectdata/project.jsonl");
@@ -222,14 +229,14 @@ TEST_F(HostileFolder, aTextThatIsSharedWithACopyOfTheProjectIsNeverAppendedTo) {
     commit(*open(), addFiles({u"b"}));
 
     EXPECT_EQ(contentAt(copy / ".projectdata/project.jsonl"), before);
-    EXPECT_EQ(contentOf(*open()), contentAfter({addFiles({u"a", u"b"})}));
+    EXPECT_EQ(contentOf(*open()), contentAfter({addFiles({longName(), u"a", u"b"})}));
     commit(*open(copy), addFiles({u"c"}));
-    EXPECT_EQ(contentOf(*open(copy)), contentAfter({addFiles({u"a", u"c"})}));
-    EXPECT_EQ(contentOf(*open()), contentAfter({addFiles({u"a", u"b"})}));
+    EXPECT_EQ(contentOf(*open(copy)), contentAfter({addFiles({longName(), u"a", u"c"})}));
+    EXPECT_EQ(contentOf(*open()), contentAfter({addFiles({longName(), u"a", u"b"})}));
 }
 
 TEST_F(HostileFolder, aTextThatGetsSharedWhileItIsOpenIsNotAppendedToEither) {
-    prepareText(bodyOf({"\"a\""}));
+    prepareText(longText("a"));
     auto const store = open();
     contentOf(*store);
     fs::create_hard_link(inStore("project.jsonl"), folder_.onDisk() / "copy.jsonl");
@@ -247,7 +254,7 @@ TEST_F(HostileFolder, aTextLinkedToAFileOutsideLeavesThatFileAlone) {
     commit(*open(), addFiles({u"b"}));
     open()->tidy();
 
-    EXPECT_EQ(contentOf(*open()), contentAfter({addFiles({u"b", u"secret"})}));
+    EXPECT_EQ(contentOf(*open()), contentAfter({addFiles({longName(), u"b", u"secret"})}));
 }
 
 TEST_F(HostileFolder, thousandsOfLeftoversAndStrangeNamesStandInNobodysWay) {
