@@ -1,4 +1,4 @@
-#include <array>
+#include <algorithm>
 #include <climits>
 #include <cstring>
 #include <optional>
@@ -66,6 +66,21 @@ void checkText(std::u16string const& text) {
     fl::i18n::toUtf8(text);
 }
 
+/// Where a way leads: ".." leads up, as long as one is not yet above the target, whose own names may be "..".
+Elements walked(Elements place, Path const& way, Elements const& target) {
+    std::size_t const root = !place.empty() && place.front() == u"/" ? 1 : 0;
+    for (auto const& element : elementsOf(way)) {
+        bool const isAboveTarget =
+            place.size() <= target.size() && std::equal(place.begin(), place.end(), target.begin());
+        if (element == u".." && place.size() > root && !isAboveTarget) {
+            place.pop_back();
+        } else {
+            place.push_back(element);
+        }
+    }
+    return place;
+}
+
 void checkRelative(Path const& base, Path const& target) {
     Elements const from = elementsOf(base);
     Elements const to = elementsOf(target);
@@ -82,15 +97,7 @@ void checkRelative(Path const& base, Path const& target) {
         require(elementsOf(relative).front() == u"..", "the way to what is not below leads up");
     }
     if (sameRoot) {
-        Elements reached = from;
-        for (auto const& element : elementsOf(relative)) {
-            bool const up =
-                element == u".." && !reached.empty() && reached.size() > (isAbsolute(base) ? 1U : 0U) &&
-                !std::equal(reached.begin(), reached.end(), to.begin(),
-                            to.begin() + static_cast<std::ptrdiff_t>(std::min(reached.size(), to.size())));
-            up ? reached.pop_back() : reached.push_back(element);
-        }
-        require(reached == to, "the way from one place leads to the other");
+        require(walked(from, relative, to) == to, "the way from one place leads to the other");
     }
 }
 
