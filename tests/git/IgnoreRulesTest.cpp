@@ -118,5 +118,15 @@ TEST_F(IgnoreRules, withManyStarsTakeNoTime) {
     EXPECT_EQ(stateOf(std::string(200, 'a')), 0);
 }
 
+TEST_F(IgnoreRules, ofAMillionSignsTakeNoMemoryToSpeakOf) {
+    repository.write("a");
+    std::string rule;
+    for (int i = 0; i < 400'000; ++i) {
+        rule += "**/";
+    }
+    repository.write(".gitignore", rule + "a\n");
+    EXPECT_EQ(stateOf("a"), 0);
+}
+
 } // namespace
 } // namespace project::git

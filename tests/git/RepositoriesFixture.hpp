@@ -17,17 +17,18 @@ protected:
     }
 
     /// The states of everything that git knows of, then the same after a file was added and one was removed.
-    static void expectAgreement(GitRepository const& repository, GitAdapter& adapter) {
+    static void expectAgreement(GitRepository const& repository, GitAdapter& adapter,
+                                std::string const& removed = "kept") {
         repository.write(".gitignore", "*.o\n");
         repository.write("d/new");
         repository.write("x.o");
         expectStates(repository, adapter);
         adapter.addToSourceControl({repository.path("d/new")});
-        adapter.removeFromSourceControl({repository.path("kept")});
+        adapter.removeFromSourceControl({repository.path(removed)});
         expectStates(repository, adapter);
         EXPECT_EQ(repository.statusStates().at("d/new"), 5);
-        EXPECT_EQ(repository.statusStates().at("kept"), 6);
-        EXPECT_TRUE(std::filesystem::exists(repository.onDisk() / "kept"));
+        EXPECT_EQ(repository.statusStates().at(removed), 6);
+        EXPECT_TRUE(std::filesystem::exists(repository.onDisk() / removed));
     }
 
     static void expectStates(GitRepository const& repository, GitAdapter& adapter) {

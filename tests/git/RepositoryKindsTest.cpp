@@ -47,7 +47,7 @@ TEST_F(RepositoryKinds, aPlainRepository) {
 TEST_F(RepositoryKinds, aProjectInAFolderOfTheWorkTree) {
     auto const repository = committed("work");
     GitAdapter adapter(repository.path("d"));
-    expectAgreement(repository, adapter);
+    expectAgreement(repository, adapter, "d/kept");
 }
 
 TEST_F(RepositoryKinds, aRepositoryWithoutACommit) {

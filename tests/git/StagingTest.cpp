@@ -69,6 +69,27 @@ TEST_F(Staging, whatCannotBeStagedIsPassedOver) {
     EXPECT_EQ(tracked(), std::vector<std::string>{"a"});
 }
 
+TEST_F(Staging, whatLiesOutsideTheProjectsFolderIsNeitherStagedNorTakenOut) {
+    for (auto const* name : {"outside", "project/a", "project2/b"}) {
+        repository.write(name);
+    }
+    repository.commitAll();
+    repository.write("outside", "changed");
+    repository.write("project/a", "changed");
+    GitAdapter ofFolder(repository.path("project"));
+    auto const inProject = [this](std::string const& name) {
+        return repository.path("project") / Path(fl::filesystem::fromSystem(name));
+    };
+
+    ofFolder.addToSourceControl({inProject("a"), inProject("../outside"), repository.path("outside")});
+    EXPECT_EQ(repository.run({"diff", "--cached", "--name-only"}), "project/a\n");
+    ofFolder.removeFromSourceControl(
+        {inProject("../outside"), inProject("d/../../project2"), repository.root()});
+
+    EXPECT_EQ(tracked(), (std::vector<std::string>{"outside", "project/a", "project2/b"}));
+    EXPECT_TRUE(ofFolder.trackedBelow({inProject(".."), inProject("../project2")}).empty());
+}
+
 TEST_F(Staging, anIgnoredFileThatIsNamedIsStaged) {
     repository.write(".gitignore", "*.o\n");
     repository.write("a.o");

@@ -45,7 +45,7 @@ void Staging::remove(std::vector<fl::filesystem::Path> const& files) {
     repository_.refresh();
     IndexChanges changes;
     for (auto const& file : files) {
-        auto const path = repository_.workTree().relative(file);
+        auto const path = repository_.workTree().relativeInProject(file);
         if (path && trackedAt(repository_.index(), *path) != nullptr) {
             changes.removed.insert(*path);
         }
@@ -64,7 +64,7 @@ Staging::Names Staging::stageable(std::vector<fl::filesystem::Path> const& files
     ContentRules rules(repository_);
     Names result;
     for (auto const& file : files) {
-        auto const path = repository_.workTree().relative(file);
+        auto const path = repository_.workTree().relativeInProject(file);
         if (!path || folders.kindOf(parentOf(*path)) != FolderKind::Ours || nameOf(*path) == ".git") {
             continue;
         }

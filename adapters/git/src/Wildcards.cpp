@@ -188,7 +188,8 @@ private:
 } // namespace
 
 bool matchesWildcards(std::string_view pattern, std::string_view text, WildcardMode mode) {
-    return Matcher(pattern, text, mode).matches(0, 0);
+    constexpr std::size_t longestPattern = 8192; // twice the longest path: each sign may be escaped
+    return pattern.size() <= longestPattern && Matcher(pattern, text, mode).matches(0, 0);
 }
 
 } // namespace project::git

@@ -14,7 +14,8 @@ struct WildcardMode {
 /// slashes,
 /// "[a-z]", "[!a]", "[[:digit:]]", and a backslash before what is meant as it is. All are bytes, as in git.
 ///
-/// Takes at most time in proportion to the lengths of both, multiplied.
+/// A pattern much longer than any path matches nothing. Takes at most time and memory in proportion to the
+/// lengths of both, multiplied.
 bool matchesWildcards(std::string_view pattern, std::string_view text, WildcardMode mode);
 
 } // namespace project::git

@@ -67,4 +67,9 @@ std::optional<TreePath> WorkTreeRoot::relative(fl::filesystem::Path const& path)
     return name.substr(std::min(workTree_.size() + 1, name.size()));
 }
 
+std::optional<TreePath> WorkTreeRoot::relativeInProject(fl::filesystem::Path const& path) const {
+    auto result = relative(path);
+    return result && isAtOrBelow(onDisk(*result), realRoot_) ? result : std::nullopt;
+}
+
 } // namespace project::git

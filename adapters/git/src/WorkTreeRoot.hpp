@@ -28,6 +28,10 @@ public:
     /// Nothing for a path that is not in the work tree, or that nothing on disk can have.
     std::optional<TreePath> relative(fl::filesystem::Path const& path) const;
 
+    /// The same, and nothing for a path outside the project's folder either. What a project lists comes from
+    /// whoever wrote its text, and nothing elsewhere in the work tree may be staged for it.
+    std::optional<TreePath> relativeInProject(fl::filesystem::Path const& path) const;
+
     /// The name on disk of an entry.
     std::string onDisk(TreePath const& path) const { return workTree_ + '/' + path; }
 

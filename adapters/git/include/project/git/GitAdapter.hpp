@@ -42,16 +42,18 @@ public:
 
     /// Stages these files as `git add --force --sparse` does, and of a folder nothing, since git knows none.
     ///
-    /// What is not there, what lies outside the work tree, beyond a symbolic link or in another repository
-    /// inside this one, and what is neither a file nor a link is passed over. An ignored file that is named
-    /// is staged. The index is written once, or not at all when nothing is left to do or anything fails.
+    /// What is not there, what lies outside the project's folder or the work tree, beyond a symbolic link or
+    /// in another repository inside this one, and what is neither a file nor a link is passed over. An
+    /// ignored file that is named is staged. The index is written once, or not at all when nothing is left to
+    /// do or anything fails.
     /// @throws GitError when the index is locked (the error's file is the lock file) or can't be written,
     ///         when a file can't be read, or when one would have to go through a filter driver or be encoded
     ///         anew, which git alone does.
     void addToSourceControl(std::vector<Path> const& files) override;
 
     /// Takes these files, and all below these folders, out of the index, as `git rm --cached -r` does. What
-    /// isn't tracked is passed over. The disk is left alone, and need not have the files any more.
+    /// isn't tracked, or lies outside the project's folder, is passed over. The disk is left alone, and need
+    /// not have the files any more.
     /// @throws GitError when the index is locked (the error's file is the lock file) or can't be written.
     void removeFromSourceControl(std::vector<Path> const& files) override;
 
