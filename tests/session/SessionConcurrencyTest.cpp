@@ -6,25 +6,16 @@
 #include <gtest/gtest.h>
 
 #include "project/session.hpp"
-#include "support/RunningProgram.hpp"
+#include "support/GitFolder.hpp"
 #include "support/TemporaryFolder.hpp"
 
 namespace project::session {
 namespace {
 
-std::string git(test::TemporaryFolder const& folder, std::vector<std::string> arguments) {
-    arguments.insert(arguments.begin(), "git");
-    test::ProgramSettings settings;
-    settings.folder = folder.onDisk();
-    auto const result = test::runProgram(arguments, settings);
-    EXPECT_EQ(result.exitCode, 0) << result.errors;
-    return result.output;
-}
-
 TEST(SessionConcurrency, threadsThatChangeTheProjectStageWhatTheLastOfThemWrote) {
     constexpr int changes = 30;
     test::TemporaryFolder const folder;
-    git(folder, {"init", "-q", "."});
+    test::GitFolder const git(folder.onDisk());
     auto session = Session::make(folder.root(), u"Engine");
     auto& project = session.project();
     auto const file = folder.file(u"a");
@@ -55,7 +46,7 @@ TEST(SessionConcurrency, threadsThatChangeTheProjectStageWhatTheLastOfThemWrote)
     EXPECT_EQ(events, changes);
     std::ifstream text(folder.onDisk() / ".projectdata" / "project.jsonl", std::ios::binary);
     std::string const onDisk{std::istreambuf_iterator<char>(text), {}};
-    EXPECT_EQ(git(folder, {"show", ":.projectdata/project.jsonl"}), onDisk);
+    EXPECT_EQ(git.run({"show", ":.projectdata/project.jsonl"}), onDisk);
     EXPECT_THAT(onDisk, ::testing::AllOf(::testing::HasSubstr("Valve"), ::testing::HasSubstr("two")));
 }
 

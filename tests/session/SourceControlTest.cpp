@@ -7,7 +7,7 @@
 
 #include "project/git/GitError.hpp"
 #include "project/session.hpp"
-#include "support/RunningProgram.hpp"
+#include "support/GitFolder.hpp"
 #include "support/TemporaryFolder.hpp"
 
 namespace project::session {
@@ -22,40 +22,23 @@ using ::testing::Not;
 /// A folder in a git repository with a first commit in it.
 class SessionInRepository : public ::testing::Test {
 protected:
-    void SetUp() override {
-        git({"init", "-q", "."});
-        git({"commit", "-q", "--allow-empty", "-m", "first"});
-    }
-
-    std::string git(std::vector<std::string> arguments) const {
-        arguments.insert(arguments.begin(),
-                         {"git", "-c", "user.name=Ada", "-c", "user.email=ada@example.org"});
-        test::ProgramSettings settings;
-        settings.folder = folder_.onDisk();
-        auto const result = test::runProgram(arguments, settings);
-        EXPECT_EQ(result.exitCode, 0) << result.errors;
-        return result.output;
-    }
+    void SetUp() override { git_.run({"commit", "-q", "--allow-empty", "-m", "first"}); }
 
     /// What would be committed, and what is left out of it.
-    std::string status() const { return git({"status", "--porcelain", "--untracked-files=all"}); }
+    std::string status() const { return git_.run({"status", "--porcelain", "--untracked-files=all"}); }
 
-    std::string staged() const { return git({"show", ":.projectdata/project.jsonl"}); }
+    std::string staged() const { return git_.run({"show", ":.projectdata/project.jsonl"}); }
 
     std::string onDisk() const {
         std::ifstream file(folder_.onDisk() / ".projectdata" / "project.jsonl", std::ios::binary);
         return {std::istreambuf_iterator<char>(file), {}};
     }
 
-    void commitAll() const {
-        git({"add", "--all"});
-        git({"commit", "-q", "-m", "all"});
-    }
-
     static constexpr char const* storeAdded =
         "A  .projectdata/.gitattributes\nA  .projectdata/.gitignore\nA  .projectdata/project.jsonl\n";
 
     test::TemporaryFolder folder_;
+    test::GitFolder const git_{folder_.onDisk()};
 };
 
 TEST_F(SessionInRepository, stagesTheFilesOfANewProjectWithAllThatIsInThem) {
@@ -77,7 +60,7 @@ TEST_F(SessionInRepository, stagesWhatIsAddedTogetherWithItsEntry) {
 TEST_F(SessionInRepository, takesWhatIsRemovedOutOfTheIndexTogetherWithItsEntry) {
     auto session = Session::make(folder_.root(), u"Engine");
     session.project().getFileManager().add({folder_.file(u"src/pump.cpp")});
-    commitAll();
+    git_.commitAll();
 
     session.project().getFileManager().remove({folder_.path(u"src")});
 
@@ -89,7 +72,7 @@ TEST_F(SessionInRepository, stagesAFileAgainThatComesBackBeforeItsRemovalIsCommi
     auto session = Session::make(folder_.root(), u"Engine");
     auto const file = folder_.file(u"a");
     session.project().getFileManager().add({file, folder_.file(u"b")});
-    commitAll();
+    git_.commitAll();
     session.project().getFileManager().remove({file});
     ASSERT_EQ(status(), "M  .projectdata/project.jsonl\nD  a\n?? a\n");
 
@@ -109,7 +92,7 @@ TEST_F(SessionInRepository, stagesTheTextAfterEveryKindOfChange) {
     management::EntryPointDefinition entry(file);
     management::EntryPointGroupDefinition const group(u"Nightly", u"g");
     std::vector const reference{management::relativeFolderReference(folder_.root(), folder_.root())};
-    commitAll();
+    git_.commitAll();
 
     std::vector<std::function<void()>> const changes{
         [&] { project.setName(u"Pump"); },
@@ -155,7 +138,7 @@ TEST_F(SessionInRepository, stagesBeforeItTellsObservers) {
 
 TEST_F(SessionInRepository, stagesNothingOfATextThatGitDoesNotTrack) {
     auto session = Session::make(folder_.root(), u"Engine");
-    git({"rm", "-q", "-r", "--cached", ".projectdata"});
+    git_.run({"rm", "-q", "-r", "--cached", ".projectdata"});
 
     session.project().setName(u"Pump");
 
@@ -240,7 +223,7 @@ TEST_F(SessionInRepository, namesWhatGitTracksBelowAFolderAndTheProjectDoesNotHa
     auto const tracked = folder_.file(u"src/b");
     auto const elsewhere = folder_.file(u"other/c");
     session.project().getFileManager().add({inProject});
-    commitAll();
+    git_.commitAll();
 
     EXPECT_THAT(session.trackedOutsideProject({folder_.path(u"src")}), ElementsAre(tracked));
     EXPECT_THAT(session.trackedOutsideProject({inProject, elsewhere}), IsEmpty());

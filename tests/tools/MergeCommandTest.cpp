@@ -1,4 +1,5 @@
 #include "ToolTest.hpp"
+#include "support/GitFolder.hpp"
 
 namespace project::test {
 namespace {
@@ -11,9 +12,7 @@ using ::testing::Not;
 class MergeCommand : public ToolTest {
 protected:
     void SetUp() override {
-        auto const folder = std::filesystem::path(PROJECTCTL).parent_path().string();
-        settings_.environment["PATH"] = folder + ":/usr/bin:/bin";
-        git({"init", "-q", "-b", "main", "."});
+        settings_.environment["PATH"] = pathWithTool;
         initProject();
         for (auto const* name : {u"a", u"b", u"c"}) {
             folder_.file(name);
@@ -25,32 +24,24 @@ protected:
         commit("the project");
     }
 
-    ProgramResult runGit(std::vector<std::string> arguments) const {
-        arguments.insert(arguments.begin(),
-                         {"git", "-c", "user.name=Ada", "-c", "user.email=ada@example.org"});
-        return runProgram(arguments, settings_);
-    }
-
-    std::string git(std::vector<std::string> const& arguments) const {
-        auto const result = runGit(arguments);
-        EXPECT_EQ(result.exitCode, 0) << result.output << result.errors;
-        return result.output;
-    }
-
     /// Commits what the tool has staged.
-    void commit(std::string const& message) const { git({"commit", "-q", "-m", message}); }
+    void commit(std::string const& message) const { git_.run({"commit", "-q", "-m", message}); }
 
     /// Does one thing on a branch of its own, another on the main branch, and merges.
     ProgramResult mergeOf(std::vector<std::string> const& theirs,
                           std::vector<std::string> const& ours) const {
-        git({"switch", "-q", "-c", "hers"});
+        git_.run({"switch", "-q", "-c", "hers"});
         EXPECT_THAT(tool(theirs), SucceedsSilently());
         commit("hers");
-        git({"switch", "-q", "-f", "main"});
+        git_.run({"switch", "-q", "-f", "main"});
         EXPECT_THAT(tool(ours), SucceedsSilently());
         commit("his");
-        return runGit({"merge", "-q", "-m", "both", "hers"});
+        return git_.tryTo({"merge", "-q", "-m", "both", "hers"});
     }
+
+    std::string const pathWithTool =
+        std::filesystem::path(PROJECTCTL).parent_path().string() + ":/usr/bin:/bin";
+    GitFolder const git_{folder_.onDisk(), {{"PATH", pathWithTool}}};
 };
 
 TEST_F(MergeCommand, bringsTogetherWhatTwoPeopleDidToOneFile) {
@@ -108,33 +99,33 @@ TEST_F(MergeCommand, namesTheFileThatOneSideLabelledAndTheOtherRemoved) {
 
 TEST_F(MergeCommand, marksOnlyWhatIsInConflict) {
     folder_.file(u"d");
-    git({"switch", "-q", "-c", "hers"});
+    git_.run({"switch", "-q", "-c", "hers"});
     ASSERT_THAT(tool({"name", "Pump"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "d"}), SucceedsSilently());
     commit("hers");
-    git({"switch", "-q", "-f", "main"});
+    git_.run({"switch", "-q", "-f", "main"});
     ASSERT_THAT(tool({"name", "Valve"}), SucceedsSilently());
     ASSERT_THAT(tool({"remove", "a"}), SucceedsSilently());
     commit("his");
 
-    EXPECT_EQ(runGit({"merge", "-q", "-m", "both", "hers"}).exitCode, 1);
+    EXPECT_EQ(git_.tryTo({"merge", "-q", "-m", "both", "hers"}).exitCode, 1);
 
     EXPECT_EQ(tool({"list"}).output, "b\nc\nd\n");
 }
 
 TEST_F(MergeCommand, mergesProjectsThatBothSidesMade) {
-    git({"switch", "-q", "--orphan", "hers"});
+    git_.run({"switch", "-q", "--orphan", "hers"});
     ASSERT_THAT(tool({"init", "--name", "Engine"}), SucceedsSilently());
     folder_.file(u"x");
     ASSERT_THAT(tool({"add", "x"}), SucceedsSilently());
     commit("hers");
-    git({"switch", "-q", "--orphan", "his"});
+    git_.run({"switch", "-q", "--orphan", "his"});
     ASSERT_THAT(tool({"init", "--name", "Engine"}), SucceedsSilently());
     folder_.file(u"y");
     ASSERT_THAT(tool({"add", "y"}), SucceedsSilently());
     commit("his");
 
-    auto const merged = runGit({"merge", "-q", "--allow-unrelated-histories", "-m", "both", "hers"});
+    auto const merged = git_.tryTo({"merge", "-q", "--allow-unrelated-histories", "-m", "both", "hers"});
 
     EXPECT_EQ(merged.exitCode, 0) << merged.output << merged.errors;
     EXPECT_THAT(list(), ::testing::ElementsAre("x", "y"));
@@ -166,15 +157,15 @@ class ResolveCommand : public MergeCommand {
 protected:
     /// Both branches name the project, and label the file "a"; one removes "b", the other one labels it.
     void makeConflicts() const {
-        git({"switch", "-q", "-c", "hers"});
+        git_.run({"switch", "-q", "-c", "hers"});
         ASSERT_THAT(tool({"name", "Pump"}), SucceedsSilently());
         ASSERT_THAT(tool({"remove", "b"}), SucceedsSilently());
         commit("hers");
-        git({"switch", "-q", "-f", "main"});
+        git_.run({"switch", "-q", "-f", "main"});
         ASSERT_THAT(tool({"name", "Valve"}), SucceedsSilently());
         ASSERT_THAT(tool({"label", "put", "Status", "Done", "b"}), SucceedsSilently());
         commit("his");
-        ASSERT_EQ(runGit({"merge", "-q", "-m", "both", "hers"}).exitCode, 1);
+        ASSERT_EQ(git_.tryTo({"merge", "-q", "-m", "both", "hers"}).exitCode, 1);
     }
 };
 
@@ -186,7 +177,7 @@ TEST_F(ResolveCommand, keepsOursOfAllThatBothChanged) {
     EXPECT_THAT(tool({"name"}), Prints("Valve\n"));
     EXPECT_THAT(tool({"label", "show", "b"}), Prints("Status: Done\n"));
     EXPECT_THAT(tool({"check"}), SucceedsSilently());
-    EXPECT_EQ(git({"ls-files", "-u", ".projectdata"}), "");
+    EXPECT_EQ(git_.run({"ls-files", "-u", ".projectdata"}), "");
 }
 
 TEST_F(ResolveCommand, takesTheirsOfAllThatBothChanged) {
@@ -241,7 +232,7 @@ TEST_F(ResolveCommand, changesNothingForWhoeverThinksBetterOfIt) {
 }
 
 TEST_F(ResolveCommand, worksFromTheVersionsThatGitKeepsAlsoWhereGitMergedTheLines) {
-    git({"config", "--remove-section", "merge.project-definition"});
+    git_.run({"config", "--remove-section", "merge.project-definition"});
     folder_.file(u"d");
     folder_.file(u"e");
     ASSERT_EQ(mergeOf({"add", "d"}, {"add", "e"}).exitCode, 1);
@@ -249,7 +240,7 @@ TEST_F(ResolveCommand, worksFromTheVersionsThatGitKeepsAlsoWhereGitMergedTheLine
     ASSERT_THAT(tool({"resolve"}), SucceedsSilently());
 
     EXPECT_THAT(list(), ::testing::ElementsAre("a", "b", "c", "d", "e"));
-    EXPECT_EQ(git({"status", "--porcelain", "--untracked-files=no"}).substr(0, 2), "M ");
+    EXPECT_EQ(git_.run({"status", "--porcelain", "--untracked-files=no"}).substr(0, 2), "M ");
 }
 
 TEST_F(ResolveCommand, hasNothingToDoWithoutAConflict) {
@@ -259,7 +250,7 @@ TEST_F(ResolveCommand, hasNothingToDoWithoutAConflict) {
 
 TEST_F(ResolveCommand, leavesATextAloneThatSomebodyHasSettledAlready) {
     makeConflicts();
-    auto const settled = git({"show", ":2:.projectdata/project.jsonl"});
+    auto const settled = git_.run({"show", ":2:.projectdata/project.jsonl"});
     writeText(settled);
 
     EXPECT_THAT(tool({"resolve", "--theirs"}), FailsWith(1, "the text has no markers of a merge"));
@@ -270,11 +261,11 @@ TEST_F(ResolveCommand, leavesATextAloneThatSomebodyHasSettledAlready) {
 class SetupCommand : public MergeCommand {};
 
 TEST_F(SetupCommand, isDoneByInit) {
-    EXPECT_EQ(git({"config", "merge.project-definition.driver"}), "projectctl merge %O %A %B %P\n");
+    EXPECT_EQ(git_.run({"config", "merge.project-definition.driver"}), "projectctl merge %O %A %B %P\n");
 }
 
 TEST_F(SetupCommand, isAskedForByStatusInAFreshClone) {
-    git({"config", "--remove-section", "merge.project-definition"});
+    git_.run({"config", "--remove-section", "merge.project-definition"});
 
     EXPECT_THAT(tool({"status"}).output,
                 HasSubstr("note git merges the project's text line by line: 'projectctl "
@@ -282,16 +273,16 @@ TEST_F(SetupCommand, isAskedForByStatusInAFreshClone) {
     EXPECT_THAT(tool({"status", "--no-source-control"}), SucceedsSilently());
     ASSERT_THAT(tool({"setup"}), SucceedsSilently());
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
-    EXPECT_EQ(git({"config", "merge.project-definition.driver"}), "projectctl merge %O %A %B %P\n");
+    EXPECT_EQ(git_.run({"config", "merge.project-definition.driver"}), "projectctl merge %O %A %B %P\n");
 }
 
 TEST_F(SetupCommand, isLeftOutByInitThatLeavesGitAlone) {
     folder_.addFolder("other");
-    git({"config", "--remove-section", "merge.project-definition"});
+    git_.run({"config", "--remove-section", "merge.project-definition"});
 
     ASSERT_THAT(tool({"init", "other", "--no-source-control"}), SucceedsSilently());
 
-    EXPECT_NE(runGit({"config", "merge.project-definition.driver"}).exitCode, 0);
+    EXPECT_NE(git_.tryTo({"config", "merge.project-definition.driver"}).exitCode, 0);
 }
 
 class SetupOutsideAnyRepository : public ToolTest {};

@@ -1,4 +1,5 @@
 #include "ToolTest.hpp"
+#include "support/GitFolder.hpp"
 
 namespace project::test {
 namespace {
@@ -10,32 +11,18 @@ using ::testing::HasSubstr;
 class InRepository : public ToolTest {
 protected:
     void SetUp() override {
-        git({"init", "-q", "."});
         folder_.file(u"src/io/pump.cpp");
         folder_.file(u"src/main.cpp");
     }
 
-    std::string git(std::vector<std::string> arguments) const {
-        arguments.insert(arguments.begin(),
-                         {"git", "-c", "user.name=Ada", "-c", "user.email=ada@example.org"});
-        ProgramSettings settings;
-        settings.folder = folder_.onDisk();
-        auto const result = runProgram(arguments, settings);
-        EXPECT_EQ(result.exitCode, 0) << result.errors;
-        return result.output;
-    }
+    std::string status() const { return git_.run({"status", "--porcelain", "--untracked-files=all"}); }
 
-    void commitAll() const {
-        git({"add", "--all"});
-        git({"commit", "-q", "-m", "all"});
-    }
-
-    std::string status() const { return git({"status", "--porcelain", "--untracked-files=all"}); }
-
-    std::string staged() const { return git({"show", ":.projectdata/project.jsonl"}); }
+    std::string staged() const { return git_.run({"show", ":.projectdata/project.jsonl"}); }
 
     static constexpr char const* storeAdded =
         "A  .projectdata/.gitattributes\nA  .projectdata/.gitignore\nA  .projectdata/project.jsonl\n";
+
+    GitFolder const git_{folder_.onDisk()};
 };
 
 TEST_F(InRepository, initStagesTheProjectsFiles) {
@@ -56,7 +43,7 @@ TEST_F(InRepository, addStagesTheFilesAndTheirEntries) {
 TEST_F(InRepository, removeTakesTheFilesOutOfTheIndexAndLeavesThemOnDisk) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
-    commitAll();
+    git_.commitAll();
 
     ASSERT_THAT(tool({"remove", "src/io"}), SucceedsSilently());
 
@@ -67,7 +54,7 @@ TEST_F(InRepository, removeTakesTheFilesOutOfTheIndexAndLeavesThemOnDisk) {
 TEST_F(InRepository, addBringsBackWhatWasRemovedAndNotYetCommitted) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
-    commitAll();
+    git_.commitAll();
     ASSERT_THAT(tool({"remove", "src"}), SucceedsSilently());
 
     ASSERT_THAT(tool({"add", "-r", "src"}), SucceedsSilently());
@@ -78,7 +65,7 @@ TEST_F(InRepository, addBringsBackWhatWasRemovedAndNotYetCommitted) {
 TEST_F(InRepository, removeNamesWhatGitTrackedAndTheProjectNeverHad) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
-    commitAll();
+    git_.commitAll();
 
     auto const removed = tool({"remove", "src"});
 
@@ -93,7 +80,7 @@ TEST_F(InRepository, removeNamesWhatGitTrackedAndTheProjectNeverHad) {
 TEST_F(InRepository, everyOtherChangeStagesTheTextAlone) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
-    commitAll();
+    git_.commitAll();
 
     for (auto const& command :
          std::vector<std::vector<std::string>>{{"name", "Engine"},
@@ -113,7 +100,7 @@ TEST_F(InRepository, everyOtherChangeStagesTheTextAlone) {
 TEST_F(InRepository, tidyStagesTheTidyText) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
-    commitAll();
+    git_.commitAll();
     auto const tidied = readText();
     insertLineBefore("\"src/main.cpp\"", "\"zebra\"");
 
@@ -125,7 +112,7 @@ TEST_F(InRepository, tidyStagesTheTidyText) {
 
 TEST_F(InRepository, queriesStageNothing) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
-    commitAll();
+    git_.commitAll();
     insertLineBefore("{\"at\":[\"Info\"", "\"src\"");
     auto const before = status();
 
@@ -142,7 +129,7 @@ TEST_F(InRepository, leavesGitAloneWhenToldSo) {
     ASSERT_THAT(tool({"init", "--no-source-control"}), SucceedsSilently());
     ASSERT_THAT(tool({"--no-source-control", "add", "-r", "."}), SucceedsSilently());
     EXPECT_THAT(status(), ::testing::Not(HasSubstr("A ")));
-    commitAll();
+    git_.commitAll();
 
     EXPECT_THAT(tool({"remove", "src", "--no-source-control"}), SucceedsSilently());
 
@@ -177,7 +164,7 @@ TEST_F(InRepository, takesTheRepositoryThatTheEnvironmentNames) {
     settings_.environment["GIT_WORK_TREE"] = folder_.onDisk().string();
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
 
-    EXPECT_THAT(git({"--git-dir=elsewhere.git", "--work-tree=.", "status", "--porcelain", "-uno"}),
+    EXPECT_THAT(git_.run({"--git-dir=elsewhere.git", "--work-tree=.", "status", "--porcelain", "-uno"}),
                 ::testing::Eq(storeAdded));
 }
 

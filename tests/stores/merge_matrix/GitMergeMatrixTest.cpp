@@ -14,8 +14,8 @@
 #include "project/core/FileManager.hpp"
 #include "project/stores/TextMerge.hpp"
 #include "stores/merge_matrix/ExpectedMerges.hpp"
+#include "support/GitFolder.hpp"
 #include "support/NightlyScale.hpp"
-#include "support/RunningProgram.hpp"
 
 namespace project::test {
 
@@ -30,11 +30,9 @@ constexpr char const* attributes = "project.jsonl -text merge=project-definition
 class MergingRepository {
 public:
     MergingRepository() {
-        settings_.folder = folder_.onDisk();
-        auto const tool = std::filesystem::path(PROJECTCTL).parent_path().string();
-        settings_.environment["PATH"] = tool + ":/usr/bin:/bin";
-        git({"init", "-q", "-b", "main", "."});
-        auto const result = runProgram({PROJECTCTL, "init"}, settings_); // which tells git of the driver
+        ProgramSettings settings;
+        settings.folder = folder_.onDisk();
+        auto const result = runProgram({PROJECTCTL, "init"}, settings); // which tells git of the driver
         EXPECT_EQ(result.exitCode, 0) << result.errors;
     }
 
@@ -53,10 +51,10 @@ public:
                        << content << '\n';
             }
         }
-        git({"fast-import", "--quiet", "--force"}, stream.str());
+        git_.run({"fast-import", "--quiet", "--force"}, stream.str());
     }
 
-    void checkOut(std::string const& branch) const { git({"checkout", "-q", "-f", "--detach", branch}); }
+    void checkOut(std::string const& branch) const { git_.run({"checkout", "-q", "-f", "--detach", branch}); }
 
     struct Pair {
         std::string ours;
@@ -77,11 +75,11 @@ public:
         std::vector<Merged> result;
         std::string trees;
         for (auto const& [isClean, tree] :
-             mergesIn(git({"merge-tree", "--stdin", "--allow-unrelated-histories"}, input))) {
+             mergesIn(git_.run({"merge-tree", "--stdin", "--allow-unrelated-histories"}, input))) {
             result.push_back({isClean, {}});
             trees += tree + ':' + textPath + '\n';
         }
-        std::istringstream texts(git({"cat-file", "--batch"}, trees));
+        std::istringstream texts(git_.run({"cat-file", "--batch"}, trees));
         for (auto& merged : result) {
             merged.text = nextObject(texts);
         }
@@ -91,27 +89,16 @@ public:
     /// Merges one pair as people do, in the work tree.
     Merged mergeHere(Pair const& pair) const {
         checkOut(pair.ours);
-        auto const merge = run({"merge", "-q", "-m", "both", "--allow-unrelated-histories", pair.theirs});
+        auto const merge =
+            git_.tryTo({"merge", "-q", "-m", "both", "--allow-unrelated-histories", pair.theirs});
         std::ifstream file(folder_.onDisk() / textPath, std::ios::binary);
         Merged result{merge.exitCode == 0, {std::istreambuf_iterator<char>(file), {}}};
-        EXPECT_EQ(git({"status", "--porcelain"}).empty(), result.isClean);
-        run({"merge", "--abort"});
+        EXPECT_EQ(git_.run({"status", "--porcelain"}).empty(), result.isClean);
+        git_.tryTo({"merge", "--abort"});
         return result;
     }
 
 private:
-    ProgramResult run(std::vector<std::string> arguments, std::string_view input = {}) const {
-        arguments.insert(arguments.begin(), {"git", "-c", "user.name=Ada", "-c", "user.email=ada@example.org",
-                                             "-c", "gc.auto=0"});
-        return runProgram(arguments, settings_, input);
-    }
-
-    std::string git(std::vector<std::string> const& arguments, std::string_view input = {}) const {
-        auto const result = run(arguments, input);
-        EXPECT_EQ(result.exitCode, 0) << arguments.front() << ": " << result.errors.substr(0, 1000);
-        return result.output;
-    }
-
     /// Of each merge: whether it is clean, and its tree. A record ends with an empty field behind its
     /// messages.
     static std::vector<std::pair<bool, std::string>> mergesIn(std::string const& output) {
@@ -146,7 +133,9 @@ private:
     }
 
     TemporaryFolder folder_;
-    ProgramSettings settings_;
+    GitFolder const git_{
+        folder_.onDisk(),
+        {{"PATH", std::filesystem::path(PROJECTCTL).parent_path().string() + ":/usr/bin:/bin"}}};
 };
 
 /// Two changes, and how the versions that have them are written.

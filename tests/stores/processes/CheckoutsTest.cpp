@@ -7,11 +7,11 @@
 #include <random>
 #include <thread>
 
-#include "GitFolder.hpp"
 #include "SharedMemory.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 #include "support/ChildProcess.hpp"
+#include "support/GitFolder.hpp"
 #include "support/NightlyScale.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/TextStore.hpp"
@@ -216,7 +216,7 @@ protected:
 
     void tryTo(std::vector<std::string> const& arguments) const {
         ++tally->gitDid;
-        tally->gitFailed += git.tryTo(arguments) ? 0U : 1U;
+        tally->gitFailed += git.tryTo(arguments).exitCode == 0 ? 0U : 1U;
     }
 
     void doWithGit(std::mt19937& ownRandom) const {
