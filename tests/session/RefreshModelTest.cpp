@@ -130,7 +130,7 @@ Lines eventsBetween(Picture const& before, Picture const& after) {
 class RandomPerson {
 public:
     RandomPerson(ProjectManager& project, test::TemporaryFolder const& folder, std::uint64_t seed)
-        : project_(project), folder_(folder), random_(seed) {
+        : project_(project), random_(seed) {
         for (auto const* name : {u"a", u"b", u"src/a", u"src/b", u"src/io/a", u"src/io/b"}) {
             files_.push_back(folder.file(name));
         }
@@ -229,7 +229,6 @@ private:
     }
 
     ProjectManager& project_;
-    test::TemporaryFolder const& folder_;
     std::mt19937_64 random_;
     std::vector<Path> files_;
 };
