@@ -17,7 +17,7 @@ namespace project::stores {
 /// The queue only orders those who wait. A file system without such locks has no queue, and nothing else is
 /// amiss there.
 ///
-/// The order of use: take; then stepsToFirst as often as needed; the place is let go with the object.
+/// The order of use: take; then firstInFront as often as needed; the place is let go with the object.
 class QueuePlace {
 public:
     /// @param folder the open folder's descriptor, which outlives this.
