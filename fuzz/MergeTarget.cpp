@@ -16,7 +16,6 @@ using namespace project::fuzz;
 using project::stores::Fault;
 using project::stores::MergeSide;
 using project::stores::mergeTexts;
-using project::stores::ProjectText;
 using project::stores::TextMerge;
 
 /// Lines of a body, and behind a line "+" those of a tail.
