@@ -48,10 +48,19 @@ std::optional<WrittenFile> StoreWriter::appendOrTakeBack(std::string_view lines,
     try {
         return disk_.append(StoreFiles::text, before, lines);
     } catch (StoreError const& failure) {
-        // A torn batch is counted by nobody and may stay. One that lacks just the last line's end is whole.
-        auto const now = identifyQuietly(StoreFiles::text);
-        if (now && now->isSameFile(before) && now->size + 1 >= before.size + lines.size()) {
-            takeBack(*now, failure);
+        auto left = before;
+        bool mayCount = true;
+        try {
+            // A torn batch is counted by nobody and may stay. One that lacks just the last line's end is
+            // whole.
+            auto const now = disk_.identify(StoreFiles::text);
+            mayCount = now && now->isSameFile(before) && now->size + 1 >= before.size + lines.size();
+            left = now.value_or(before);
+        } catch (StoreError const&) {
+            // For all that can be known it is whole.
+        }
+        if (mayCount) {
+            takeBack(left, failure);
         }
         throw;
     }

@@ -336,6 +336,25 @@ TEST_F(TextBackendWriting, aBatchThatLacksJustItsLastByteWhenTheDiskIsFullIsTake
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), contentOf(*backend));
 }
 
+TEST_F(TextBackendWriting, aBatchThatLacksJustItsLastByteWhereTheDiskThenFailsIsCalledUnknown) {
+    prepare(manyFiles(20));
+    auto const lines = textOf(addFiles(manyFiles(20)), {addFiles({u"b"})}).substr(text().size());
+    auto const backend = open(appending());
+    volume->room = lines.size() - 1;
+    volume->beforeCall = [hasAppended = false](std::string const& call) mutable {
+        if (hasAppended) {
+            throw StoreError("", 0, "Input/output error", "");
+        }
+        hasAppended = call.starts_with("append");
+    };
+
+    auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
+
+    EXPECT_THAT(error.getProblem(), HasSubstr("nobody can tell whether the batch is in the project"));
+    volume->beforeCall = nullptr;
+    EXPECT_EQ(1U, stored(appending()).count(fileAddress(u"b")));
+}
+
 TEST_F(TextBackendWriting, aFullDiskAtARewriteLeavesTheTextAndNoTemporaryFile) {
     prepare({u"a"});
     auto const before = text();
