@@ -8,7 +8,7 @@
 
 #include <dlfcn.h>
 
-#include "support/AllocationCount.hpp"
+#include "support/Allocations.hpp"
 
 namespace foundation::core::diag {
 namespace {
@@ -111,13 +111,13 @@ TEST(StackTrace, aCopyKeepsTheFramesWhenTheOriginalGoes) {
 
 TEST(StackTrace, captureAllocatesNothing) {
     stacktrace_base trace;
-    project::test::AllocationCount const allocations;
+    project::test::Allocations const allocations;
 
     captureBelow(trace, 0, 10);
 
-    EXPECT_EQ(allocations.get(), 0);
+    EXPECT_EQ(allocations.count(), 0U);
     EXPECT_FALSE(trace.getFrames().empty());
-    EXPECT_GT(allocations.get(), 0) << "the list of frames must have been counted";
+    EXPECT_GT(allocations.count(), 0U) << "the list of frames must have been counted";
 }
 
 TEST(StackTrace, namesFunctionsThatHaveADynamicSymbol) {

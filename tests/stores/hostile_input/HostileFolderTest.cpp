@@ -15,7 +15,7 @@
 #include <sys/un.h>
 #include <unistd.h>
 
-#include "support/AllocatedBytes.hpp"
+#include "support/Allocations.hpp"
 #include "support/NightlyScale.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/TextStore.hpp"
@@ -193,7 +193,7 @@ TEST_F(HostileFolder, aTextOfAnImpossibleLengthIsAnErrorAtOnce) {
     if (::truncate(inStore("project.jsonl").c_str(), tebibyte) != 0) {
         GTEST_SKIP() << "this file system has no file as long";
     }
-    AllocatedBytes const allocated;
+    Allocations const allocated;
 
     EXPECT_THAT(errorOf([&] { contentOf(*open()); }).what(), HasSubstr("is longer than the 1 GiB"));
 

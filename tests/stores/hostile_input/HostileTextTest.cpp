@@ -8,7 +8,7 @@
 #include "ProjectText.hpp"
 #include "project/stores/StoreError.hpp"
 #include "project/stores/TextMerge.hpp"
-#include "support/AllocatedBytes.hpp"
+#include "support/Allocations.hpp"
 #include "support/NightlyScale.hpp"
 
 namespace project::test {
@@ -56,7 +56,7 @@ double cpuSeconds() {
 template <typename Work>
 Costs costsOf(std::string const& text, Work const& work) {
     double const before = cpuSeconds();
-    AllocatedBytes const allocated;
+    Allocations const allocated;
     work(text);
     return {allocated.peak(), allocated.total(), cpuSeconds() - before};
 }

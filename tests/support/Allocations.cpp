@@ -1,4 +1,4 @@
-#include "support/AllocatedBytes.hpp"
+#include "support/Allocations.hpp"
 
 #include <algorithm>
 
@@ -15,15 +15,17 @@
 namespace {
 
 struct Tally {
+    std::size_t count;
     std::size_t total;
     std::ptrdiff_t held; ///< less than nothing when more was freed than allocated
     std::ptrdiff_t peak;
 };
 
 // Of a kind that needs no allocation itself when a thread first touches it.
-[[gnu::tls_model("initial-exec")]] thread_local Tally tally{0, 0, 0};
+[[gnu::tls_model("initial-exec")]] thread_local Tally tally{0, 0, 0, 0};
 
 void noteAllocated(std::size_t size) {
+    ++tally.count;
     tally.total += size;
     tally.held += static_cast<std::ptrdiff_t>(size);
     tally.peak = std::max(tally.peak, tally.held);
@@ -94,15 +96,19 @@ void free(void* block) {
 
 namespace project::test {
 
-AllocatedBytes::AllocatedBytes() {
-    tally = {0, 0, 0};
+Allocations::Allocations() {
+    tally = {0, 0, 0, 0};
 }
 
-std::size_t AllocatedBytes::total() const {
+std::size_t Allocations::count() const {
+    return tally.count;
+}
+
+std::size_t Allocations::total() const {
     return tally.total;
 }
 
-std::size_t AllocatedBytes::peak() const {
+std::size_t Allocations::peak() const {
     return static_cast<std::size_t>(tally.peak);
 }
 
