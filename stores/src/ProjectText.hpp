@@ -13,7 +13,7 @@
 namespace project::stores {
 
 /// The text of a project as it was read: a sorted body, a tail of batches laid over it, and what is wrong
-/// with it. Works on bytes alone and knows nothing of disks; docs/store.md tells the format.
+/// with it. Works on bytes alone and knows nothing of disks; docs/store/format.md describes the format.
 ///
 /// The order is checked in one pass at reading; nodes are made from lines when somebody asks for them.
 /// children may be called from several threads as long as nothing else is.

@@ -27,7 +27,7 @@ struct Fault {
 
 /// Keeps a project's definition in one text file, `.projectdata/project.jsonl` in the project's root.
 ///
-/// docs/store.md tells the format, the order of steps of a write and what is promised. Nothing is read
+/// docs/store/ describes the format, the steps of a commit and the promises of the store. Nothing is read
 /// before the first guard, and nothing is written before the first batch.
 class PROJECT_STORES_EXPORT TextBackend : public Backend {
 public:

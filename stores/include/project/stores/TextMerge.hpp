@@ -10,9 +10,9 @@
 
 namespace project::stores {
 
-/// Two versions of a project's text, merged over the version that both come from: by address, by key, and by
-/// the identity of nested nodes. docs/store.md tells the rules. What only one side changed is taken, what
-/// both changed alike is taken once, and what is left are the conflicts.
+/// Two versions of a project's text, merged with their common version: by address, by key, and by the
+/// identity of nested nodes. docs/store/merging.md describes the rules. A change that one side made is taken,
+/// a change that both made is taken once, and the rest are conflicts.
 class PROJECT_STORES_EXPORT TextMerge {
 public:
     TextMerge(TextMerge&&) noexcept;
