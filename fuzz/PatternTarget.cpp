@@ -1,9 +1,9 @@
 #include <string>
 
-#include "AttributeLine.hpp"
-#include "IgnoreRules.hpp"
-#include "NamePattern.hpp"
 #include "Target.hpp"
+#include "rules/AttributeLine.hpp"
+#include "rules/IgnoreRules.hpp"
+#include "rules/NamePattern.hpp"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "GitRepository.hpp"
+#include "git/GitRepository.hpp"
 
 #include <fstream>
 #include <stdexcept>

@@ -4,7 +4,7 @@
 
 #include <sys/stat.h>
 
-#include "GitRepository.hpp"
+#include "git/GitRepository.hpp"
 #include "project/git/GitError.hpp"
 
 namespace project::git {

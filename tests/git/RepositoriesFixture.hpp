@@ -1,6 +1,6 @@
 #pragma once
 
-#include "GitRepository.hpp"
+#include "git/GitRepository.hpp"
 
 namespace project::git {
 

@@ -1,4 +1,4 @@
-#include "RepositoriesFixture.hpp"
+#include "git/RepositoriesFixture.hpp"
 #include "project/git/GitError.hpp"
 
 namespace project::git {

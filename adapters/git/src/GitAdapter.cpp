@@ -1,9 +1,9 @@
 #include "project/git/GitAdapter.hpp"
 
-#include "RepositoryFinder.hpp"
-#include "Staging.hpp"
-#include "StateQuery.hpp"
-#include "TrackedFiles.hpp"
+#include "index/Staging.hpp"
+#include "repository/RepositoryFinder.hpp"
+#include "repository/TrackedFiles.hpp"
+#include "states/StateQuery.hpp"
 
 namespace project::git {
 

@@ -7,16 +7,11 @@
 
 #include "cmlink/CMAdapter.hpp"
 #include "project/git/Export.hpp"
+#include "project/git/GitEnvironment.hpp"
 
 namespace project::git {
 
 class RepositoryFinder;
-
-/// Whether the variables GIT_DIR, GIT_WORK_TREE and GIT_INDEX_FILE of this process count.
-enum class GitEnvironment {
-    Ignored,  ///< the folder alone tells which repository is meant
-    Honoured, ///< as the git command would that is started in the process's working folder
-};
 
 /// Source control by git, for the project in one folder.
 ///

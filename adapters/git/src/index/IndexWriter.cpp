@@ -1,0 +1,61 @@
+#include "index/IndexWriter.hpp"
+
+#include "repository/DiskEntry.hpp"
+
+namespace project::git {
+
+namespace {
+
+constexpr auto unwritable = "the index can't be written";
+
+} // namespace
+
+IndexWriter::IndexWriter(Repository& repository, IndexLock const& lock)
+    : repository_(repository), lock_(lock), comparison_(repository) {
+    git_index* made = nullptr;
+    require(git_index_open(&made, lock.newIndex().c_str()), lock.newIndex(), unwritable);
+    result_.reset(made);
+    require(git_index_set_version(made, git_index_version(repository.index())), lock.newIndex(), unwritable);
+}
+
+void IndexWriter::write(IndexChanges const& changes) {
+    auto* const old = repository_.index();
+    auto staged = changes.staged.begin();
+    auto const addStagedBefore = [&](char const* path) {
+        for (; staged != changes.staged.end() && (path == nullptr || staged->first < path); ++staged) {
+            auto entry = staged->second;
+            entry.path = staged->first.c_str();
+            add(entry);
+        }
+    };
+    for (std::size_t position = 0; position < git_index_entrycount(old); ++position) {
+        auto const& entry = *git_index_get_byindex(old, position);
+        addStagedBefore(entry.path);
+        if (!changes.replace(entry.path)) {
+            keep(entry);
+        }
+    }
+    addStagedBefore(nullptr);
+    require(git_index_write(result_.get()), lock_.newIndex(), unwritable);
+    lock_.replaceIndex();
+}
+
+/// An entry as young as the old index is not as young as the new one; a size of 0 tells that its file has to
+/// be read all the same.
+void IndexWriter::keep(git_index_entry const& entry) {
+    auto kept = entry;
+    if (comparison_.hidesChanges(entry)) {
+        auto const onDisk = lookAt(repository_.workTree().onDisk(entry.path));
+        if (onDisk && isFileOrLink(*onDisk) && comparison_.isModified(entry, *onDisk)) {
+            kept.file_size = 0;
+        }
+    }
+    add(kept);
+}
+
+void IndexWriter::add(git_index_entry const& entry) {
+    require(git_index_add(result_.get(), &entry), repository_.workTree().onDisk(entry.path),
+            "the file can't stand in the index");
+}
+
+} // namespace project::git

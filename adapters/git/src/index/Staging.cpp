@@ -1,0 +1,116 @@
+#include "index/Staging.hpp"
+
+#include "index/IndexLock.hpp"
+#include "index/IndexWriter.hpp"
+#include "project/git/GitError.hpp"
+#include "repository/DiskEntry.hpp"
+#include "repository/TrackedFiles.hpp"
+#include "rules/ContentRules.hpp"
+#include "states/EntryComparison.hpp"
+#include "states/WorkTreeFolders.hpp"
+
+namespace project::git {
+
+namespace {
+
+void requireNothingForeign(std::string const& file, Conversion const& conversion) {
+    if (!conversion.foreign.empty()) {
+        throw GitError(file,
+                       "the file can't be staged here: " + conversion.foreign + " has to be applied to it",
+                       "Stage it with `git add`, then try again.");
+    }
+}
+
+} // namespace
+
+void Staging::add(std::vector<fl::filesystem::Path> const& files) {
+    auto const names = stageable(files);
+    if (names.empty()) {
+        return;
+    }
+    IndexLock const lock(repository_.indexFile());
+    repository_.refresh();
+    IndexChanges changes;
+    BlobWriter blobs(repository_);
+    for (auto const& [name, isConverted] : names) {
+        stage(name, isConverted, blobs, changes);
+    }
+    if (!changes.empty()) {
+        IndexWriter(repository_, lock).write(changes);
+    }
+}
+
+void Staging::remove(std::vector<fl::filesystem::Path> const& files) {
+    IndexLock const lock(repository_.indexFile());
+    repository_.refresh();
+    IndexChanges changes;
+    for (auto const& file : files) {
+        auto const path = repository_.workTree().relativeInProject(file);
+        if (path && trackedAt(repository_.index(), *path) != nullptr) {
+            changes.removed.insert(*path);
+        }
+        if (path) {
+            removeBelow(*path, changes);
+        }
+    }
+    if (!changes.empty()) {
+        IndexWriter(repository_, lock).write(changes);
+    }
+}
+
+/// What of the list can be staged; throws before anything is when git alone could do it.
+Staging::Names Staging::stageable(std::vector<fl::filesystem::Path> const& files) const {
+    WorkTreeFolders folders(repository_);
+    ContentRules rules(repository_);
+    Names result;
+    for (auto const& file : files) {
+        auto const path = repository_.workTree().relativeInProject(file);
+        if (!path || folders.kindOf(parentOf(*path)) != FolderKind::Ours || nameOf(*path) == ".git") {
+            continue;
+        }
+        auto const name = repository_.workTree().onDisk(*path);
+        auto const onDisk = lookAt(name);
+        if (!onDisk || !isFileOrLink(*onDisk)) {
+            continue;
+        }
+        auto const conversion = S_ISREG(onDisk->st_mode) ? rules.conversionOf(*path) : Conversion{};
+        requireNothingForeign(name, conversion);
+        result.try_emplace(*path, conversion.isNeeded);
+    }
+    return result;
+}
+
+void Staging::stage(TreePath const& path, bool isConverted, BlobWriter& blobs, IndexChanges& changes) const {
+    auto const onDisk = lookAt(repository_.workTree().onDisk(path)); // with the times before it is read
+    git_index_entry entry{};
+    if (!onDisk || !isFileOrLink(*onDisk) || !blobs.write(path, *onDisk, isConverted, entry.id)) {
+        return; // went in the meantime
+    }
+    record(*onDisk, entry);
+    entry.mode = modeOf(*onDisk, trackedAt(repository_.index(), path), repository_.settings());
+    removeWhatCannotStandBeside(path, changes);
+    changes.staged.insert_or_assign(path, entry);
+}
+
+/// The disk has a file where the index has a folder, or the other way round.
+void Staging::removeWhatCannotStandBeside(TreePath const& path, IndexChanges& changes) const {
+    for (auto folder = parentOf(path); !folder.empty(); folder = parentOf(folder)) {
+        if (trackedAt(repository_.index(), folder) != nullptr) {
+            changes.removed.insert(folder);
+        }
+    }
+    removeBelow(path, changes);
+}
+
+void Staging::removeBelow(TreePath const& folder, IndexChanges& changes) const {
+    auto* const index = repository_.index();
+    for (auto position = firstBelow(index, folder); position < git_index_entrycount(index); ++position) {
+        auto const* const entry = git_index_get_byindex(index, position);
+        if (!isBelow(entry->path, folder)) {
+            return;
+        }
+        changes.removed.insert(entry->path);
+    }
+}
+
+} // namespace project::git

@@ -1,0 +1,32 @@
+#pragma once
+
+#include <map>
+#include <vector>
+
+#include "fl/filesystem/Path.hpp"
+#include "index/BlobWriter.hpp"
+#include "index/IndexChanges.hpp"
+#include "repository/Repository.hpp"
+
+namespace project::git {
+
+/// Does what one call asks for to the index: all of it, or nothing.
+class Staging {
+public:
+    explicit Staging(Repository& repository) : repository_(repository) {}
+
+    void add(std::vector<fl::filesystem::Path> const& files);
+    void remove(std::vector<fl::filesystem::Path> const& files);
+
+private:
+    using Names = std::map<TreePath, bool>; // whether the content is converted
+
+    Names stageable(std::vector<fl::filesystem::Path> const& files) const;
+    void stage(TreePath const& path, bool isConverted, BlobWriter& blobs, IndexChanges& changes) const;
+    void removeWhatCannotStandBeside(TreePath const& path, IndexChanges& changes) const;
+    void removeBelow(TreePath const& folder, IndexChanges& changes) const;
+
+    Repository& repository_;
+};
+
+} // namespace project::git

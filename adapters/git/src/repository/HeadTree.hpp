@@ -1,0 +1,33 @@
+#pragma once
+
+#include <string>
+#include <unordered_map>
+
+#include "repository/LibGit.hpp"
+#include "repository/WorkTreeRoot.hpp"
+
+namespace project::git {
+
+/// The files of the last commit. Each of its folders is read when it is first asked for, and kept until there
+/// is another commit.
+class HeadTree {
+public:
+    explicit HeadTree(git_repository* repository) : repository_(repository) {}
+
+    /// Looks which commit is the last one. Before the first commit there are no files.
+    /// @throws GitError when it can't be read.
+    void refresh();
+
+    /// The file, link or submodule at a path; null when there is none. Valid until the next refresh.
+    git_tree_entry const* find(TreePath const& path);
+
+private:
+    git_tree* folder(TreePath const& path);
+    TreeHandle load(TreePath const& path);
+
+    git_repository* repository_;
+    git_oid root_{};
+    std::unordered_map<TreePath, TreeHandle> folders_; // null where the commit has none
+};
+
+} // namespace project::git

@@ -1,0 +1,51 @@
+#include "repository/LibGit.hpp"
+
+#include <cerrno>
+
+#include <unistd.h>
+
+#include "project/git/GitError.hpp"
+
+namespace project::git {
+
+namespace {
+
+/// A user's configuration that this process may not read does not count for git (config.c, "access_or_die"
+/// with ACCESS_EACCES_OK), while libgit2 1.5.1 opens no repository then. It happens where somebody else's
+/// environment was taken over, as by `su` without a login.
+void passOverUnreadable(git_config_level_t level, char const* file) {
+    git_buf folder = GIT_BUF_INIT;
+    if (git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, level, &folder) != 0) {
+        return;
+    }
+    auto const name = std::string(folder.ptr, folder.size) + '/' + file;
+    if (folder.size > 0 && access(name.c_str(), R_OK) != 0 && errno == EACCES) {
+        git_libgit2_opts(GIT_OPT_SET_SEARCH_PATH, level, "");
+    }
+    git_buf_dispose(&folder);
+}
+
+} // namespace
+
+LibGit::LibGit() {
+    require(git_libgit2_init(), "", "libgit2 can't be used");
+    passOverUnreadable(GIT_CONFIG_LEVEL_GLOBAL, ".gitconfig");
+    passOverUnreadable(GIT_CONFIG_LEVEL_XDG, "config");
+}
+
+LibGit::~LibGit() {
+    git_libgit2_shutdown();
+}
+
+void throwLibGitError(std::string const& file, std::string const& action, std::string const& remedy) {
+    auto const* const error = git_error_last();
+    throw GitError(file, action + (error == nullptr ? "" : ": " + std::string(error->message)), remedy);
+}
+
+void require(int code, std::string const& file, char const* action) {
+    if (code < 0) {
+        throwLibGitError(file, action);
+    }
+}
+
+} // namespace project::git

@@ -1,0 +1,138 @@
+#include "repository/Repository.hpp"
+
+#include <utility>
+
+#include "repository/FileContent.hpp"
+
+namespace project::git {
+
+namespace {
+
+ConfigHandle configOf(git_repository* repository) {
+    git_config* config = nullptr;
+    require(git_repository_config(&config, repository), git_repository_path(repository),
+            "the configuration can't be read");
+    return ConfigHandle(config);
+}
+
+} // namespace
+
+Repository::Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot)
+    : handle_(std::move(handle)),
+      config_(configOf(handle_.get())),
+      head_(handle_.get()),
+      workTree_(git_repository_workdir(handle_.get()), projectRoot),
+      configuration_(stampConfiguration()) {
+    addWorkTreeConfiguration();
+    settings_ = {isSet("core.fileMode", true), isSet("core.symlinks", true),
+                 isSet("core.sparseCheckout", false)};
+}
+
+std::array<FileStamp, 2> Repository::stampConfiguration() const {
+    return {FileStamp::of(git_repository_commondir(get()) + std::string("config")),
+            FileStamp::of(git_repository_path(get()) + std::string("config.worktree"))};
+}
+
+// git keeps the settings of a sparse checkout in a file that libgit2 reads from version 1.8 on only.
+void Repository::addWorkTreeConfiguration() {
+    auto const file = git_repository_path(get()) + std::string("config.worktree");
+    if (isSet("extensions.worktreeConfig", false) && FileStamp::of(file) != FileStamp()) {
+        require(git_config_add_file_ondisk(config_.get(), file.c_str(), GIT_CONFIG_LEVEL_APP, get(), 1), file,
+                "the configuration can't be read");
+    }
+}
+
+/// libgit2 1.5.1 looks at the size of the index before it opens it, so that one which git puts in its place
+/// in between reads as if it were cut off. What could not be read counts only if it is still there.
+template <typename Read>
+FileStamp Repository::readIndex(std::string const& file, Read const& read) const {
+    constexpr int tries = 100;
+    for (int count = 1;; ++count) {
+        auto const stamp = FileStamp::of(file);
+        auto const code = read();
+        if (code >= 0 || count == tries || stamp == FileStamp::of(file)) {
+            requireReadable(code);
+            return stamp;
+        }
+    }
+}
+
+void Repository::refresh() {
+    if (index_ == nullptr) {
+        openIndex();
+    }
+    // One that can't be read is tried again with the next call.
+    if (!isIndexRead_ || FileStamp::of(indexFile()) != indexStamp_) {
+        isIndexRead_ = false;
+        indexStamp_ = readIndex(indexFile(), [this] { return git_index_read(index_.get(), 1); });
+        isIndexRead_ = true;
+    }
+    head_.refresh();
+}
+
+void Repository::openIndex() {
+    git_index* index = nullptr;
+    readIndex(git_repository_path(get()) + std::string("index"),
+              [&] { return git_repository_index(&index, get()); });
+    index_.reset(index);
+    // By default it would be sorted and searched as core.ignoreCase says.
+    require(git_index_set_caps(index, 0), indexFile(), "the index can't be used");
+}
+
+void Repository::requireReadable(int code) const {
+    if (code < 0) {
+        throwLibGitError(git_repository_path(get()) + std::string("index"), "the index can't be read",
+                         "If `git status` reads it, it is written in a way that is not known here: "
+                         "`git update-index --no-split-index --index-version 2` and "
+                         "`git sparse-checkout reapply --no-sparse-index` write it plainly.");
+    }
+}
+
+bool Repository::isSet(std::string const& name, bool whenAbsent) const {
+    int value = 0;
+    return git_config_get_bool(&value, config_.get(), name.c_str()) == 0 ? value != 0 : whenAbsent;
+}
+
+std::string Repository::configured(std::string const& name) const {
+    return textOf(name, git_config_get_string_buf);
+}
+
+std::string Repository::configuredPath(std::string const& name) const {
+    return textOf(name, git_config_get_path);
+}
+
+std::string Repository::usersFile(char const* name) const {
+    git_buf folder = GIT_BUF_INIT;
+    std::string result;
+    if (git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, GIT_CONFIG_LEVEL_XDG, &folder) == 0 && folder.size > 0) {
+        result = std::string(folder.ptr, folder.size) + '/' + name;
+    }
+    git_buf_dispose(&folder);
+    return result;
+}
+
+std::string Repository::contentOf(TreePath const& path) const {
+    if (auto content = readFile(workTree_.onDisk(path), Links::NotFollowed)) {
+        return *std::move(content);
+    }
+    auto const* const entry = git_index_get_bypath(index(), path.c_str(), 0);
+    git_blob* blob = nullptr;
+    if (entry == nullptr || git_blob_lookup(&blob, get(), &entry->id) != 0) {
+        return {};
+    }
+    BlobHandle const owned(blob);
+    return {static_cast<char const*>(git_blob_rawcontent(blob)),
+            static_cast<std::size_t>(git_blob_rawsize(blob))};
+}
+
+std::string Repository::textOf(std::string const& name, TextGetter read) const {
+    git_buf value = GIT_BUF_INIT;
+    std::string result;
+    if (read(&value, config_.get(), name.c_str()) == 0) {
+        result.assign(value.ptr, value.size);
+    }
+    git_buf_dispose(&value);
+    return result;
+}
+
+} // namespace project::git

@@ -1,0 +1,130 @@
+#include "repository/RepositoryFinder.hpp"
+
+#include <cstdlib>
+#include <filesystem>
+#include <utility>
+
+#include <git2/sys/repository.h>
+
+#include "fl/filesystem/SystemName.hpp"
+#include "project/git/GitError.hpp"
+
+namespace project::git {
+
+namespace {
+
+[[noreturn]] void throwOwnerError(std::string const& place) {
+    throw GitError(
+        place, "the repository can't be used: it belongs to somebody else",
+        "If you trust its owner, enter `git config --global --add safe.directory` with the top folder "
+        "of its work tree.");
+}
+
+/// libgit2 1.5.1 tells a repository of somebody else like one that isn't there, unless the configuration has
+/// a `safe.directory` for another one. Looking for it alone doesn't ask for its owner.
+bool isRepositoryFound(char const* place) {
+    git_buf found = GIT_BUF_INIT;
+    bool const result = git_repository_discover(&found, place, 0, nullptr) == 0;
+    git_buf_dispose(&found);
+    return result;
+}
+
+/// @return null when there is none.
+RepositoryHandle openAround(char const* root) {
+    git_repository* found = nullptr;
+    auto const code = git_repository_open_ext(&found, root, 0, nullptr);
+    if (code == GIT_EOWNER || (code == GIT_ENOTFOUND && isRepositoryFound(root))) {
+        throwOwnerError(root);
+    }
+    if (code != GIT_ENOTFOUND) {
+        require(code, root, "the repository can't be opened");
+    }
+    return RepositoryHandle(found);
+}
+
+RepositoryHandle openNamed(char const* repository) {
+    git_repository* found = nullptr;
+    auto const flags = GIT_REPOSITORY_OPEN_NO_SEARCH | GIT_REPOSITORY_OPEN_NO_DOTGIT;
+    require(git_repository_open_ext(&found, repository, flags, nullptr), repository,
+            "the repository that GIT_DIR names can't be opened");
+    return RepositoryHandle(found);
+}
+
+void setWorkTreeTo(git_repository* repository, std::filesystem::path const& folder) {
+    auto const* const current = git_repository_workdir(repository);
+    std::error_code notThere;
+    if (current != nullptr && std::filesystem::equivalent(current, folder, notThere)) {
+        return; // libgit2 1.5.1 leaks memory when it is told what it knows
+    }
+    require(git_repository_set_workdir(repository, folder.c_str(), 0), folder, "the work tree can't be used");
+}
+
+/// git's own rule (git(1), "The Git Repository"): with GIT_DIR alone, the working folder is the work tree.
+void setWorkTree(git_repository* repository) {
+    auto const* const folder = std::getenv("GIT_WORK_TREE");
+    if (folder != nullptr) {
+        setWorkTreeTo(repository, folder);
+        return;
+    }
+    git_config* config = nullptr;
+    require(git_repository_config(&config, repository), git_repository_path(repository),
+            "the configuration can't be read");
+    ConfigHandle const owned(config);
+    git_config_entry* entry = nullptr;
+    int isBare = 0;
+    bool const isConfigured = git_config_get_entry(&entry, config, "core.worktree") == 0;
+    git_config_entry_free(entry);
+    if (!isConfigured && (git_config_get_bool(&isBare, config, "core.bare") != 0 || isBare == 0)) {
+        setWorkTreeTo(repository, std::filesystem::current_path());
+    }
+}
+
+void setIndex(git_repository* repository, char const* file) {
+    git_index* index = nullptr;
+    require(git_index_open(&index, file), file, "the index can't be read");
+    IndexHandle const owned(index);
+    require(git_repository_set_index(repository, index), file, "the index can't be used");
+}
+
+/// libgit2 1.5 reads these variables when asked to, but gives up when it finds GIT_WORK_TREE.
+RepositoryHandle openFromEnvironment(char const* root) {
+    auto const* const repository = std::getenv("GIT_DIR");
+    auto result = repository == nullptr ? openAround(root) : openNamed(repository);
+    if (result != nullptr && (repository != nullptr || std::getenv("GIT_WORK_TREE") != nullptr)) {
+        setWorkTree(result.get());
+    }
+    auto const* const index = std::getenv("GIT_INDEX_FILE");
+    if (result != nullptr && index != nullptr) {
+        setIndex(result.get(), index);
+    }
+    return result;
+}
+
+} // namespace
+
+RepositoryFinder::RepositoryFinder(fl::filesystem::Path root, GitEnvironment environment)
+    : root_(std::move(root)), environment_(environment) {
+}
+
+Repository* RepositoryFinder::find() {
+    if (repository_ == nullptr || !repository_->isAsOpened()) {
+        repository_ = nullptr;
+        auto handle = open();
+        if (handle == nullptr || git_repository_workdir(handle.get()) == nullptr) {
+            return nullptr;
+        }
+        repository_ = std::make_unique<Repository>(std::move(handle), root_);
+    }
+    repository_->refresh();
+    return repository_.get();
+}
+
+RepositoryHandle RepositoryFinder::open() const {
+    fl::filesystem::SystemName const root(root_);
+    if (root.get() == nullptr) {
+        return nullptr;
+    }
+    return environment_ == GitEnvironment::Ignored ? openAround(root.get()) : openFromEnvironment(root.get());
+}
+
+} // namespace project::git

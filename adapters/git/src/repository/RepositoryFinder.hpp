@@ -1,0 +1,30 @@
+#pragma once
+
+#include <memory>
+
+#include "project/git/GitEnvironment.hpp"
+#include "repository/LibGit.hpp"
+#include "repository/Repository.hpp"
+
+namespace project::git {
+
+/// Finds the repository of a project's folder and keeps it open.
+class RepositoryFinder {
+public:
+    RepositoryFinder(fl::filesystem::Path root, GitEnvironment environment);
+
+    /// The repository with what others did to it meanwhile; null when there is none, or none with a work
+    /// tree.
+    /// @throws GitError when there is one that can't be read.
+    Repository* find();
+
+private:
+    RepositoryHandle open() const;
+
+    LibGit library_; // outlives the repository
+    fl::filesystem::Path root_;
+    GitEnvironment environment_;
+    std::unique_ptr<Repository> repository_;
+};
+
+} // namespace project::git

@@ -1,0 +1,131 @@
+#include "rules/AttributeLine.hpp"
+
+#include <algorithm>
+#include <cctype>
+#include <utility>
+
+namespace project::git {
+
+namespace {
+
+constexpr std::string_view blanks = " \t\r\n";
+constexpr std::string_view macroSign = "[attr]";
+
+void skipBlanks(std::string_view& text) {
+    text.remove_prefix(std::min(text.find_first_not_of(blanks), text.size()));
+}
+
+std::string_view takeWord(std::string_view& text) {
+    auto const word = text.substr(0, text.find_first_of(blanks));
+    text.remove_prefix(word.size());
+    return word;
+}
+
+/// Takes up to three octal digits.
+char takeOctal(std::string_view& text) {
+    unsigned value = 0;
+    for (int digits = 0; digits < 3 && !text.empty() && text[0] >= '0' && text[0] <= '7'; ++digits) {
+        value = value * 8 + static_cast<unsigned>(text[0] - '0');
+        text.remove_prefix(1);
+    }
+    return static_cast<char>(value);
+}
+
+char takeEscaped(std::string_view& text) {
+    constexpr std::string_view letters = "abfnrtv";
+    constexpr std::string_view meanings = "\a\b\f\n\r\t\v";
+    if (text[0] >= '0' && text[0] <= '3') {
+        return takeOctal(text);
+    }
+    auto const known = letters.find(text[0]);
+    auto const result = known == std::string_view::npos ? text[0] : meanings[known];
+    text.remove_prefix(1);
+    return result;
+}
+
+/// A pattern in quotes, written as in C; nothing when the quotes aren't closed.
+std::optional<std::string> takeQuoted(std::string_view& text) {
+    auto rest = text.substr(1);
+    std::string result;
+    while (!rest.empty() && rest[0] != '"') {
+        bool const isEscaped = rest[0] == '\\' && rest.size() > 1;
+        rest.remove_prefix(isEscaped ? 1 : 0);
+        result += isEscaped ? takeEscaped(rest) : rest[0];
+        rest.remove_prefix(isEscaped ? 0 : 1);
+    }
+    if (rest.empty()) {
+        return std::nullopt;
+    }
+    text = rest.substr(1);
+    return result;
+}
+
+bool isAttributeName(std::string_view name) {
+    auto const isAllowed = [](char sign) {
+        return std::isalnum(static_cast<unsigned char>(sign)) != 0 || sign == '-' || sign == '_' ||
+               sign == '.';
+    };
+    return !name.empty() && name[0] != '-' && std::all_of(name.begin(), name.end(), isAllowed);
+}
+
+std::optional<AttributeState> readState(std::string_view word) {
+    using Kind = AttributeValue::Kind;
+    auto const equals = word.find('=');
+    auto name = word.substr(0, equals);
+    AttributeValue value{Kind::Set};
+    if (name.starts_with('-') || name.starts_with('!')) {
+        value.kind = name[0] == '-' ? Kind::Unset : Kind::Unspecified;
+        name.remove_prefix(1);
+    } else if (equals != std::string_view::npos) {
+        value = {Kind::Text, std::string(word.substr(equals + 1))};
+    }
+    return isAttributeName(name) ? std::optional(AttributeState{std::string(name), std::move(value)})
+                                 : std::nullopt;
+}
+
+} // namespace
+
+std::optional<AttributeLine> AttributeLine::read(std::string_view line) {
+    skipBlanks(line);
+    if (line.empty() || line[0] == '#') {
+        return std::nullopt;
+    }
+    AttributeLine result;
+    auto quoted = line[0] == '"' ? takeQuoted(line) : std::nullopt;
+    if (!quoted && line.starts_with(macroSign) && line.size() > macroSign.size()) {
+        line.remove_prefix(macroSign.size());
+        skipBlanks(line);
+        result.macro = takeWord(line);
+        if (!isAttributeName(result.macro)) {
+            return std::nullopt;
+        }
+    } else {
+        auto const text = quoted ? *std::move(quoted) : std::string(takeWord(line));
+        result.pattern = text.starts_with('!') ? std::nullopt : NamePattern::of(text);
+    }
+    for (skipBlanks(line); !line.empty(); skipBlanks(line)) {
+        auto state = readState(takeWord(line));
+        if (!state) {
+            return std::nullopt;
+        }
+        result.states.push_back(*std::move(state)); // NOLINT: their number shows only now
+    }
+    return result;
+}
+
+std::vector<AttributeLine> readAttributeLines(std::string_view text) {
+    if (text.starts_with("\xEF\xBB\xBF")) {
+        text.remove_prefix(3);
+    }
+    std::vector<AttributeLine> result;
+    while (!text.empty()) {
+        auto const end = std::min(text.find('\n'), text.size());
+        if (auto line = AttributeLine::read(text.substr(0, end))) {
+            result.push_back(*std::move(line)); // NOLINT: their number shows only now
+        }
+        text.remove_prefix(std::min(end + 1, text.size()));
+    }
+    return result;
+}
+
+} // namespace project::git

@@ -1,0 +1,47 @@
+#pragma once
+
+#include <optional>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "repository/Repository.hpp"
+#include "rules/NamePattern.hpp"
+
+namespace project::git {
+
+/// One line of a `.gitignore`.
+struct IgnoreLine {
+    /// Nothing for a line without a pattern.
+    static std::optional<IgnoreLine> read(std::string_view line);
+
+    NamePattern pattern;
+    bool isNegative; ///< whether what matches is taken in again
+};
+
+/// The rules of a repository that tell which files are ignored (gitignore(5)): those of the folders, of
+/// `info/exclude` and of `core.excludesFile`. Each file of rules is read once.
+///
+/// libgit2 has these rules too, but drops a line that takes back what another file ignores (its issue 7284),
+/// and looks at every file of rules again for each question.
+class IgnoreRules {
+public:
+    explicit IgnoreRules(Repository const& repository);
+
+    /// Whether a rule ignores a path whose folders are not ignored.
+    bool ignore(TreePath const& path, bool isFolder);
+
+private:
+    using Lines = std::vector<IgnoreLine>;
+
+    Lines const& ofFolder(TreePath const& folder);
+    std::optional<bool> decide(Lines const& lines, std::string_view path, bool isFolder) const;
+
+    Repository const& repository_;
+    bool ignoresCase_;
+    std::vector<Lines> general_; // the first counts before the others
+    std::unordered_map<TreePath, Lines> folders_;
+};
+
+} // namespace project::git

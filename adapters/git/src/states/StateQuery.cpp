@@ -1,0 +1,113 @@
+#include "states/StateQuery.hpp"
+
+#include "repository/DiskEntry.hpp"
+#include "repository/TrackedFiles.hpp"
+
+namespace project::git {
+
+using cmlink::LocalStatus;
+
+namespace {
+
+bool isOfSameType(std::uint32_t left, std::uint32_t right) {
+    return (left & S_IFMT) == (right & S_IFMT);
+}
+
+} // namespace
+
+LocalStatus StateQuery::stateOf(fl::filesystem::Path const& path) {
+    auto const place = repository_.workTree().relative(path);
+    if (!place) {
+        return LocalStatus::NotInRepository;
+    }
+    auto const* const entry = trackedAt(repository_.index(), *place);
+    return entry == nullptr ? untrackedState(*place) : trackedState(*entry);
+}
+
+LocalStatus StateQuery::trackedState(git_index_entry const& entry) {
+    if (git_index_entry_is_conflict(&entry) != 0) {
+        return LocalStatus::Conflicted;
+    }
+    auto const onDisk = lookBeyondNoLink(entry.path);
+    bool const isThere = onDisk && (!S_ISDIR(onDisk->st_mode) || isSubmodule(entry));
+    bool const isLeft = isLeftToIndex(entry, isThere);
+    if (!isThere && !isLeft) {
+        return LocalStatus::Modified;
+    }
+    auto const* const committed = repository_.head().find(entry.path);
+    if (committed == nullptr) {
+        return LocalStatus::Added;
+    }
+    auto const committedMode = git_tree_entry_filemode(committed);
+    if (!isOfSameType(committedMode, entry.mode)) {
+        return LocalStatus::Renamed;
+    }
+    auto const state = isLeft ? LocalStatus::Unmodified : presentState(entry, *onDisk);
+    bool const isStaged =
+        committedMode != entry.mode || git_oid_equal(git_tree_entry_id(committed), &entry.id) == 0;
+    return state == LocalStatus::Unmodified && isStaged ? LocalStatus::Modified : state;
+}
+
+LocalStatus StateQuery::presentState(git_index_entry const& entry, struct stat const& onDisk) {
+    if (isSubmodule(entry)) {
+        return submoduleState(entry, onDisk);
+    }
+    if (!isFileOrLink(onDisk) || !isOfSameType(modeOf(onDisk, &entry, repository_.settings()), entry.mode)) {
+        return LocalStatus::Renamed;
+    }
+    return comparison_.isModified(entry, onDisk) ? LocalStatus::Modified : LocalStatus::Unmodified;
+}
+
+LocalStatus StateQuery::submoduleState(git_index_entry const& entry, struct stat const& onDisk) const {
+    if (!S_ISDIR(onDisk.st_mode)) {
+        return LocalStatus::Renamed;
+    }
+    auto const folder = repository_.workTree().onDisk(entry.path);
+    git_repository* opened = nullptr;
+    auto const code =
+        git_repository_open_ext(&opened, folder.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
+    RepositoryHandle const submodule(opened);
+    git_oid checkedOut{};
+    if (code != 0 || git_reference_name_to_id(&checkedOut, opened, "HEAD") != 0) {
+        return LocalStatus::Unmodified; // not checked out at all
+    }
+    return git_oid_equal(&checkedOut, &entry.id) != 0 ? LocalStatus::Unmodified : LocalStatus::Modified;
+}
+
+LocalStatus StateQuery::untrackedState(TreePath const& path) {
+    auto const above = folders_.kindOf(parentOf(path));
+    auto const onDisk = lookBeyondNoLink(path);
+    bool const isFolder = !onDisk || S_ISDIR(onDisk->st_mode);
+    if (isFolder && isAnythingTrackedBelow(repository_.index(), path)) {
+        return LocalStatus::Unmodified;
+    }
+    if (!path.empty() && repository_.head().find(path) != nullptr) {
+        return LocalStatus::RemovalStaged;
+    }
+    if (above == FolderKind::OtherRepository || above == FolderKind::BeyondLink || nameOf(path) == ".git") {
+        return LocalStatus::NotInRepository;
+    }
+    if (!onDisk || (!isFolder && !isFileOrLink(*onDisk))) {
+        return LocalStatus::Unknown;
+    }
+    bool const isIgnored = isFolder ? folders_.isFolderIgnored(path) : folders_.isFileIgnored(path);
+    return isIgnored ? LocalStatus::Ignored : LocalStatus::NotUnderSourceControl;
+}
+
+std::optional<struct stat> StateQuery::lookBeyondNoLink(TreePath const& path) {
+    auto const above = folders_.kindOf(parentOf(path));
+    if (above == FolderKind::Missing || above == FolderKind::BeyondLink) {
+        return std::nullopt;
+    }
+    return lookAt(repository_.workTree().onDisk(path));
+}
+
+/// Whether the disk has no say: somebody told git so (git-update-index(1)), or a sparse checkout left the
+/// file out. One that is there in spite of that counts again (git-sparse-checkout(1)).
+bool StateQuery::isLeftToIndex(git_index_entry const& entry, bool isOnDisk) const {
+    bool const isSkipped = (entry.flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0;
+    return (entry.flags & GIT_INDEX_ENTRY_VALID) != 0 ||
+           (isSkipped && !(isOnDisk && repository_.settings().isSparse));
+}
+
+} // namespace project::git

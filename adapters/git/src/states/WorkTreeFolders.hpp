@@ -1,0 +1,50 @@
+#pragma once
+
+#include <string>
+#include <unordered_map>
+
+#include "repository/Repository.hpp"
+#include "rules/IgnoreRules.hpp"
+
+namespace project::git {
+
+/// What a folder of the work tree is to the repository.
+enum class FolderKind {
+    Ours,            ///< a folder whose files the repository may track
+    Missing,         ///< not on disk, or no folder there
+    OtherRepository, ///< the repository's own, a submodule, a repository inside this one, or below one
+    BeyondLink,      ///< a symbolic link, or below one
+};
+
+/// The folders that one call comes by, each looked at once.
+class WorkTreeFolders {
+public:
+    explicit WorkTreeFolders(Repository const& repository) : repository_(repository), rules_(repository) {}
+
+    FolderKind kindOf(TreePath const& folder) { return at(folder).kind; }
+
+    /// Whether a rule of the repository ignores a file or a link. What lies in an ignored folder is ignored,
+    /// whatever more special rules say.
+    bool isFileIgnored(TreePath const& path);
+
+    /// The same for a folder.
+    bool isFolderIgnored(TreePath const& path) { return at(path).isIgnored; }
+
+    /// Whether a folder is the top of a repository's work tree.
+    bool isOtherRepository(TreePath const& folder) const;
+
+private:
+    struct Folder {
+        FolderKind kind;
+        bool isIgnored;
+    };
+
+    Folder const& at(TreePath const& folder);
+    FolderKind look(TreePath const& folder, FolderKind above) const;
+
+    Repository const& repository_;
+    IgnoreRules rules_;
+    std::unordered_map<TreePath, Folder> folders_;
+};
+
+} // namespace project::git
