@@ -7,6 +7,7 @@
 
 #include "Process.hpp"
 #include "project/core/FileManager.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 
@@ -59,7 +60,8 @@ fl::filesystem::Path GeneratedTree::makeFile(std::string const& name) const {
 }
 
 std::unique_ptr<management::ProjectManager> GeneratedTree::openProject() const {
-    auto backend = std::make_unique<stores::TextBackend>(stores::makeSystemDisk(rootPath_));
+    auto backend = std::make_unique<stores::TextBackend>(
+        stores::makeSystemDisk(rootPath_, stores::TextBackend::folderName));
     auto store = std::make_shared<stores::TreeMetadataManager>(
         std::move(backend), rootPath_ / fl::filesystem::Path(stores::TextBackend::folderName));
     return std::make_unique<management::ProjectManagerBase>(rootPath_, std::move(store));

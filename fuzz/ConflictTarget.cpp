@@ -3,7 +3,7 @@
 
 #include "Target.hpp"
 #include "TextContents.hpp"
-#include "TextLines.hpp"
+#include "text/TextLines.hpp"
 
 namespace {
 

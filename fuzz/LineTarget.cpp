@@ -1,9 +1,9 @@
 #include <string>
 
-#include "CanonicalLine.hpp"
-#include "LineParser.hpp"
-#include "NodeLine.hpp"
 #include "Target.hpp"
+#include "line/CanonicalLine.hpp"
+#include "line/LineParser.hpp"
+#include "line/NodeLine.hpp"
 #include "project/metadata/MetadataNode.hpp"
 
 namespace {

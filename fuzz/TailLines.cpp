@@ -1,7 +1,7 @@
 #include "TailLines.hpp"
 
-#include "TextLines.hpp"
-#include "TextSum.hpp"
+#include "text/TextLines.hpp"
+#include "text/TextSum.hpp"
 
 namespace project::fuzz {
 

@@ -1,8 +1,8 @@
-#include "LineParser.hpp"
 #include "TailLines.hpp"
 #include "Target.hpp"
 #include "TextContents.hpp"
-#include "TextLines.hpp"
+#include "line/LineParser.hpp"
+#include "text/TextLines.hpp"
 
 namespace {
 

@@ -2,10 +2,10 @@
 
 #include <algorithm>
 
-#include "NodeLine.hpp"
 #include "Target.hpp"
-#include "TextFrame.hpp"
+#include "line/NodeLine.hpp"
 #include "project/stores/StoreError.hpp"
+#include "text/TextFrame.hpp"
 
 namespace project::fuzz {
 

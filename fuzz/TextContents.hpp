@@ -5,7 +5,7 @@
 #include <string>
 #include <string_view>
 
-#include "ProjectText.hpp"
+#include "text/ProjectText.hpp"
 
 namespace project::fuzz {
 

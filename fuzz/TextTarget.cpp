@@ -1,6 +1,6 @@
 #include "Target.hpp"
 #include "TextContents.hpp"
-#include "TextFrame.hpp"
+#include "text/TextFrame.hpp"
 
 namespace {
 

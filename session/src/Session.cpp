@@ -14,6 +14,7 @@
 #include "fl/i18n/Utf8.hpp"
 #include "project/git/GitAdapter.hpp"
 #include "project/stores/StoreError.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 
@@ -86,7 +87,8 @@ TextBackend::Options Session::State::textOptions(Options options) {
 }
 
 std::shared_ptr<TreeMetadataManager> Session::State::makeStore(Options options) {
-    auto backend = std::make_unique<TextBackend>(stores::makeSystemDisk(root), textOptions(options));
+    auto backend = std::make_unique<TextBackend>(stores::makeSystemDisk(root, TextBackend::folderName),
+                                                 textOptions(options));
     text = backend.get();
     return std::make_shared<TreeMetadataManager>(std::move(backend), root / TextBackend::folderName);
 }

@@ -5,6 +5,7 @@
 #include <gmock/gmock.h>
 
 #include "project/management.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 #include "support/ErrorMatchers.hpp"
@@ -71,7 +72,8 @@ protected:
 
     test::TemporaryFolder folder;
     std::shared_ptr<MetadataManager> store = std::make_shared<stores::TreeMetadataManager>(
-        std::make_unique<stores::TextBackend>(stores::makeSystemDisk(folder.root())),
+        std::make_unique<stores::TextBackend>(
+            stores::makeSystemDisk(folder.root(), stores::TextBackend::folderName)),
         folder.path(u".projectdata"));
     test::RecordingCMAdapter adapter;
     std::unique_ptr<ProjectManager> project = std::make_unique<CMAwareProjectManager>(

@@ -6,6 +6,7 @@
 
 #include "core/DeletionLog.hpp"
 #include "project/management.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 #include "support/ErrorMatchers.hpp"
@@ -77,9 +78,10 @@ protected:
         std::make_shared<DispatchableProjectEventBroadcaster>();
     test::EventLog log{*broadcaster}; // of the events and the adapter's calls
     test::RecordingCMAdapter adapter;
-    std::shared_ptr<stores::TreeMetadataManager> store{new stores::TreeMetadataManager(
-        std::make_unique<stores::TextBackend>(stores::makeSystemDisk(folder.root())),
-        folder.path(u".projectdata"))};
+    std::shared_ptr<stores::TreeMetadataManager> store{
+        new stores::TreeMetadataManager(std::make_unique<stores::TextBackend>(stores::makeSystemDisk(
+                                            folder.root(), stores::TextBackend::folderName)),
+                                        folder.path(u".projectdata"))};
     ProjectManagerBase* const base = new ProjectManagerBase(folder.root(), store); // owned by the stack
     std::vector<ProjectManager*> layers; // the base first, then those that wrap it
     std::unique_ptr<ProjectManager> project;

@@ -1,7 +1,7 @@
-#include "ProjectText.hpp"
+#include "text/ProjectText.hpp"
 
-#include "TextFrame.hpp"
 #include "support/ProjectTextSamples.hpp"
+#include "text/TextFrame.hpp"
 
 namespace project::stores {
 

@@ -1,5 +1,5 @@
 // Checked-in sample projects: whoever changes the format sees it here first.
-#include "ProjectText.hpp"
+#include "text/ProjectText.hpp"
 
 #include <algorithm>
 #include <fstream>

@@ -1,4 +1,4 @@
-#include "JsonText.hpp"
+#include "line/JsonText.hpp"
 
 #include <rapidcheck/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "LineAddress.hpp"
+#include "line/LineAddress.hpp"
 
 #include <rapidcheck/gtest.h>
 

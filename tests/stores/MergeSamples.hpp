@@ -3,10 +3,10 @@
 #include <string>
 #include <vector>
 
-#include "LineAddress.hpp"
-#include "ProjectText.hpp"
+#include "line/LineAddress.hpp"
 #include "project/stores/TextMerge.hpp"
 #include "support/ProjectTextSamples.hpp"
+#include "text/ProjectText.hpp"
 
 namespace project::stores::samples {
 

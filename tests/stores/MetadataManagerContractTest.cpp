@@ -7,6 +7,7 @@
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/MemoryBackend.hpp"
 #include "project/stores/StoreError.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 #include "support/TemporaryFolder.hpp"
@@ -376,7 +377,8 @@ INSTANTIATE_TEST_SUITE_P(
     testing::Values(StoreKind{"memory", [](Path const&) { return std::make_unique<MemoryBackend>(); }},
                     StoreKind{"text",
                               [](Path const& root) {
-                                  return std::make_unique<TextBackend>(makeSystemDisk(root));
+                                  return std::make_unique<TextBackend>(
+                                      makeSystemDisk(root, stores::TextBackend::folderName));
                               }}),
     [](auto const& kind) { return kind.param.name; });
 

@@ -1,4 +1,4 @@
-#include "MetadataTree.hpp"
+#include "tree/MetadataTree.hpp"
 
 #include <gmock/gmock.h>
 

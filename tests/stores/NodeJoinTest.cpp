@@ -1,4 +1,4 @@
-#include "NodeJoin.hpp"
+#include "node/NodeJoin.hpp"
 
 #include <rapidcheck/gtest.h>
 

@@ -1,9 +1,9 @@
-#include "NodeLine.hpp"
+#include "line/NodeLine.hpp"
 
 #include <rapidcheck/gtest.h>
 
-#include "CanonicalLine.hpp"
-#include "LineParser.hpp"
+#include "line/CanonicalLine.hpp"
+#include "line/LineParser.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/StoreError.hpp"
 #include "support/TextGenerators.hpp"

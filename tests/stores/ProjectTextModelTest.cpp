@@ -1,12 +1,12 @@
 // Random batches against a plain map: whatever the history, the content is the map's, and the bytes after
 // tidying depend on nothing else.
-#include "ProjectText.hpp"
+#include "text/ProjectText.hpp"
 
 #include <rapidcheck/gtest.h>
 
-#include "NodeLine.hpp"
-#include "TextFrame.hpp"
+#include "line/NodeLine.hpp"
 #include "support/TextGenerators.hpp"
+#include "text/TextFrame.hpp"
 
 namespace project::stores {
 

@@ -1,8 +1,8 @@
-#include "ProjectText.hpp"
+#include "text/ProjectText.hpp"
 
-#include "TextFrame.hpp"
 #include "project/stores/StoreError.hpp"
 #include "support/ProjectTextSamples.hpp"
+#include "text/TextFrame.hpp"
 
 namespace project::stores {
 

@@ -10,8 +10,9 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include "FileTransfer.hpp"
+#include "disk/FileTransfer.hpp"
 #include "project/stores/StoreError.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "support/ChildProcess.hpp"
 #include "support/TemporaryFolder.hpp"
@@ -63,7 +64,7 @@ private:
 class SystemDisk : public testing::Test {
 protected:
     std::unique_ptr<Disk> openDisk() const {
-        auto disk = makeSystemDisk(root.path());
+        auto disk = makeSystemDisk(root.path(), stores::TextBackend::folderName);
         disk->makeFolder();
         return disk;
     }
@@ -88,7 +89,7 @@ protected:
 };
 
 TEST_F(SystemDisk, theFolderIsMadeOnceAndRemovedWhenEmpty) {
-    auto const disk = makeSystemDisk(root.path());
+    auto const disk = makeSystemDisk(root.path(), stores::TextBackend::folderName);
     EXPECT_FALSE(disk->openFolder());
 
     EXPECT_TRUE(disk->makeFolder());
@@ -105,7 +106,7 @@ TEST_F(SystemDisk, theFolderIsMadeOnceAndRemovedWhenEmpty) {
 }
 
 TEST_F(SystemDisk, aMissingRootIsAnErrorThatNamesIt) {
-    auto const disk = makeSystemDisk(root.path(u"gone"));
+    auto const disk = makeSystemDisk(root.path(u"gone"), stores::TextBackend::folderName);
 
     auto const error = errorOf([&] { disk->openFolder(); });
 
@@ -266,7 +267,7 @@ TEST_F(SystemDisk, noLinkIsFollowedToAFile) {
 TEST_F(SystemDisk, noLinkIsFollowedToTheFolder) {
     root.addFolder("outside");
     root.addLink(".projectdata", root.onDisk() / "outside");
-    auto const disk = makeSystemDisk(root.path());
+    auto const disk = makeSystemDisk(root.path(), stores::TextBackend::folderName);
 
     auto const error = errorOf([&] { disk->openFolder(); });
 
@@ -277,7 +278,7 @@ TEST_F(SystemDisk, noLinkIsFollowedToTheFolder) {
 
 TEST_F(SystemDisk, aFileInThePlaceOfTheFolderIsAnError) {
     root.addFile(".projectdata");
-    auto const disk = makeSystemDisk(root.path());
+    auto const disk = makeSystemDisk(root.path(), stores::TextBackend::folderName);
 
     EXPECT_EQ("is no folder", errorOf([&] { disk->openFolder(); }).getProblem());
     EXPECT_FALSE(disk->identifyByPath("project.jsonl"));

@@ -1,13 +1,13 @@
 // What becomes of a text of which a part is missing or altered.
-#include "ProjectText.hpp"
+#include "text/ProjectText.hpp"
 
 #include <algorithm>
 #include <optional>
 
-#include "LineParser.hpp"
-#include "TextFrame.hpp"
+#include "line/LineParser.hpp"
 #include "project/stores/StoreError.hpp"
 #include "support/ProjectTextSamples.hpp"
+#include "text/TextFrame.hpp"
 
 namespace project::stores {
 

@@ -4,9 +4,9 @@
 #include <ostream>
 #include <stdexcept>
 
-#include "TextFrame.hpp"
 #include "stores/MergeSamples.hpp"
 #include "support/TextStore.hpp"
+#include "text/TextFrame.hpp"
 
 namespace project::stores {
 

@@ -6,6 +6,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "project/stores/SystemDisk.hpp"
 #include "support/ChildProcess.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/TextStore.hpp"
@@ -23,7 +24,8 @@ namespace {
 class TextStoreOnDisk : public testing::Test {
 protected:
     std::unique_ptr<TextBackend> open(TextBackend::Options options = {}) const {
-        return std::make_unique<TextBackend>(stores::makeSystemDisk(root.path()), options);
+        return std::make_unique<TextBackend>(
+            stores::makeSystemDisk(root.path(), stores::TextBackend::folderName), options);
     }
 
     static TextBackend::Options impatient() { return {std::chrono::milliseconds(50), 256 * 1024, 16}; }

@@ -1,4 +1,4 @@
-#include "ProjectText.hpp"
+#include "text/ProjectText.hpp"
 
 #include "project/stores/StoreError.hpp"
 #include "support/ProjectTextSamples.hpp"

@@ -4,9 +4,9 @@
 
 #include <gtest/gtest.h>
 
-#include "TextFrame.hpp"
-#include "TextSum.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
+#include "text/TextFrame.hpp"
+#include "text/TextSum.hpp"
 
 namespace project::stores::samples {
 

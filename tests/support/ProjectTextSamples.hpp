@@ -7,7 +7,7 @@
 #include <utility>
 #include <vector>
 
-#include "ProjectText.hpp"
+#include "text/ProjectText.hpp"
 
 namespace project::stores::samples {
 

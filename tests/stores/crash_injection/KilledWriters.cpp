@@ -3,6 +3,8 @@
 #include <charconv>
 #include <random>
 
+#include "project/stores/SystemDisk.hpp"
+
 namespace project::test {
 
 namespace {
@@ -41,7 +43,8 @@ public:
 
     [[noreturn]] void goOnForGood() {
         for (;;) {
-            TextBackend backend(stores::makeSystemDisk(root_), upTo(1) == 0 ? appending() : rewriting());
+            TextBackend backend(stores::makeSystemDisk(root_, stores::TextBackend::folderName),
+                                upTo(1) == 0 ? appending() : rewriting());
             for (auto count = upTo(12); count > 0; --count) {
                 if (auto const choice = upTo(20); choice == 0) {
                     backend.tidy();

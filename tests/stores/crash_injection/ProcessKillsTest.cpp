@@ -6,6 +6,7 @@
 #include <thread>
 
 #include "KilledWriters.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "support/NightlyScale.hpp"
 #include "support/TemporaryFolder.hpp"
 
@@ -72,7 +73,8 @@ private:
     }
 
     std::unique_ptr<TextBackend> open() const {
-        return std::make_unique<TextBackend>(stores::makeSystemDisk(root_.path()));
+        return std::make_unique<TextBackend>(
+            stores::makeSystemDisk(root_.path(), stores::TextBackend::folderName));
     }
 
     /// Every batch that was said to be kept is there, of each writer at most the one that it had just begun
@@ -138,7 +140,8 @@ void Killer::finish() {
     for (auto const& writer : dead_) {
         counts_.batches += writer.kept();
     }
-    TextBackend next(stores::makeSystemDisk(root_.path()), {std::chrono::milliseconds(1'000), 0, 1});
+    TextBackend next(stores::makeSystemDisk(root_.path(), stores::TextBackend::folderName),
+                     {std::chrono::milliseconds(1'000), 0, 1});
     commit(next, addFiles({u"own/last"}));
     own_.merge(contentAfter({addFiles({u"own/last"})}));
     check();

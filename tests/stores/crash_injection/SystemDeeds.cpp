@@ -6,7 +6,8 @@
 
 #include <unistd.h>
 
-#include "StoreFiles.hpp"
+#include "project/stores/SystemDisk.hpp"
+#include "writing/StoreFiles.hpp"
 
 namespace project::test {
 
@@ -89,7 +90,8 @@ SystemDeed withAfter(SystemDeed deed, Content after) {
 } // namespace
 
 std::unique_ptr<TextBackend> RealProject::open(TextBackend::Options options) const {
-    return std::make_unique<TextBackend>(stores::makeSystemDisk(root.path()), options);
+    return std::make_unique<TextBackend>(stores::makeSystemDisk(root.path(), stores::TextBackend::folderName),
+                                         options);
 }
 
 std::string RealProject::text() const {

@@ -15,6 +15,7 @@
 #include <sys/un.h>
 #include <unistd.h>
 
+#include "project/stores/SystemDisk.hpp"
 #include "support/Allocations.hpp"
 #include "support/NightlyScale.hpp"
 #include "support/TemporaryFolder.hpp"
@@ -109,8 +110,9 @@ protected:
     /// Does not wait for others, and appends whatever can be appended.
     static std::unique_ptr<TextBackend> open(fs::path const& where) {
         TextBackend::Options const options{std::chrono::milliseconds(20), 0, 1};
-        return std::make_unique<TextBackend>(stores::makeSystemDisk(fl::filesystem::fromSystem(where)),
-                                             options);
+        return std::make_unique<TextBackend>(
+            stores::makeSystemDisk(fl::filesystem::fromSystem(where), stores::TextBackend::folderName),
+            options);
     }
 
     std::unique_ptr<TextBackend> open() const { return open(root()); }

@@ -5,11 +5,11 @@
 
 #include <gtest/gtest.h>
 
-#include "ProjectText.hpp"
 #include "project/stores/StoreError.hpp"
 #include "project/stores/TextMerge.hpp"
 #include "support/Allocations.hpp"
 #include "support/NightlyScale.hpp"
+#include "text/ProjectText.hpp"
 
 namespace project::test {
 namespace {

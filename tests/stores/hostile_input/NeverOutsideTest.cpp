@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include "RecordedCalls.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/TextStore.hpp"
 
@@ -62,8 +63,9 @@ protected:
 
     std::unique_ptr<TextBackend> open() const {
         TextBackend::Options const options{std::chrono::milliseconds(20), 0, 1};
-        return std::make_unique<TextBackend>(stores::makeSystemDisk(fl::filesystem::fromSystem(root())),
-                                             options);
+        return std::make_unique<TextBackend>(
+            stores::makeSystemDisk(fl::filesystem::fromSystem(root()), stores::TextBackend::folderName),
+            options);
     }
 
     /// What was called for a place that is not the store's. The root is opened to find the folder in it, and

@@ -9,6 +9,7 @@
 
 #include "SharedMemory.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 #include "support/ChildProcess.hpp"
 #include "support/GitFolder.hpp"
@@ -152,7 +153,8 @@ protected:
     }
 
     std::unique_ptr<TextBackend> open() const {
-        return std::make_unique<TextBackend>(stores::makeSystemDisk(root.path(u"work")));
+        return std::make_unique<TextBackend>(
+            stores::makeSystemDisk(root.path(u"work"), TextBackend::folderName));
     }
 
     std::unique_ptr<TreeMetadataManager> openStore() const {

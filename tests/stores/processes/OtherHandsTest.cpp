@@ -8,6 +8,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "project/stores/SystemDisk.hpp"
 #include "support/GitFolder.hpp"
 #include "support/RunningProgram.hpp"
 #include "support/TemporaryFolder.hpp"
@@ -67,7 +68,8 @@ protected:
 
     static std::unique_ptr<TextBackend> openIn(Path const& project,
                                                TextBackend::Options options = rewriting()) {
-        return std::make_unique<TextBackend>(stores::makeSystemDisk(project), options);
+        return std::make_unique<TextBackend>(stores::makeSystemDisk(project, TextBackend::folderName),
+                                             options);
     }
 
     /// A store that leaves its tail behind, as one does whose process is killed.

@@ -9,6 +9,7 @@
 #include "OneOrder.hpp"
 #include "SharedMemory.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 #include "support/ChildProcess.hpp"
 #include "support/NightlyScale.hpp"
@@ -110,7 +111,8 @@ private:
         // Some write each batch behind the text, some all of it anew.
         auto const options =
             below(3) > 0 ? TextBackend::Options{60s, 0, 1} : TextBackend::Options{60s, 1U << 20U, 16};
-        auto backend = std::make_unique<TextBackend>(stores::makeSystemDisk(root_), options);
+        auto backend =
+            std::make_unique<TextBackend>(stores::makeSystemDisk(root_, TextBackend::folderName), options);
         backend_ = backend.get();
         store_.reset();
         store_ = std::make_unique<TreeMetadataManager>(std::move(backend), root_ / u".projectdata");
@@ -234,15 +236,16 @@ std::string findWithoutOrder(History const& history) {
 class RandomOperations : public testing::Test {
 protected:
     RandomOperations() {
-        TextBackend backend(stores::makeSystemDisk(root.path()));
+        TextBackend backend(stores::makeSystemDisk(root.path(), TextBackend::folderName));
         commit(backend, addFiles(manyFiles(100)));
     }
 
     /// What can be read does not tell an address that was made from one that only has something below it, so
     /// each round begins with nothing in the slots.
     void emptySlots() {
-        TreeMetadataManager store(std::make_unique<TextBackend>(stores::makeSystemDisk(root.path())),
-                                  root.path(u".projectdata"));
+        TreeMetadataManager store(
+            std::make_unique<TextBackend>(stores::makeSystemDisk(root.path(), TextBackend::folderName)),
+            root.path(u".projectdata"));
         std::vector<Address> tops;
         for (std::size_t slot = 0; slot < Slots::count; slot += Slots::inGroup) {
             tops.push_back(addressOfSlot(slot));

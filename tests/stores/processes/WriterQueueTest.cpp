@@ -19,6 +19,7 @@
 #include <unistd.h>
 
 #include "SharedMemory.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "support/ChildProcess.hpp"
 #include "support/NightlyScale.hpp"
 #include "support/TemporaryFolder.hpp"
@@ -71,7 +72,7 @@ protected:
     WriterQueue() { openDisk(); }
 
     std::unique_ptr<Disk> openDisk() const {
-        auto disk = stores::makeSystemDisk(root.path());
+        auto disk = stores::makeSystemDisk(root.path(), TextBackend::folderName);
         disk->makeFolder();
         return disk;
     }
@@ -351,7 +352,7 @@ TEST_F(WriterQueue, inACrowdAWaitIsAsLongAsTheQueue) {
     SharedMemory<Crowd> crowd;
     auto const open = [this] {
         // appended, which is what a large project does
-        return std::make_unique<TextBackend>(stores::makeSystemDisk(root.path()),
+        return std::make_unique<TextBackend>(stores::makeSystemDisk(root.path(), TextBackend::folderName),
                                              TextBackend::Options{60s, 0, 1});
     };
     root.remove(u".projectdata");

@@ -1,71 +1,13 @@
 #pragma once
 
-#include <memory>
-#include <vector>
-
 #include "cmlink/ReentrantReadWriteLock.hpp"
-#include "fl/filesystem/Path.hpp"
-#include "project/metadata/MetadataNode.hpp"
-#include "project/metadata/MetadataPath.hpp"
+#include "project/stores/Change.hpp"
 #include "project/stores/Export.hpp"
+#include "project/stores/Node.hpp"
 
 namespace project::stores {
 
 using Access = cmlink::ReentrantReadWriteLock::Access;
-using Address = metadata::MetadataPath;
-using fl::filesystem::Path;
-
-/// A stored node: never changed once it is stored, shared by whoever needs it. Null where none is stored.
-using Node = std::shared_ptr<metadata::MetadataNode const>;
-
-/// The node of type "Info" without keys and children. Most nodes are like it, and all of them share this one.
-PROJECT_STORES_EXPORT Node const& plainNode();
-
-/// One address directly below another.
-struct Child {
-    metadata::PathElement element;
-    Node node;        ///< null when none is stored there
-    bool made;        ///< there is no node, and the address stays also when nothing lies below it
-    bool hasChildren; ///< something is stored below; when false, nothing is
-};
-
-/// What lies directly below one address, sorted by element, each element once. Every child has a node, was
-/// made, or has children.
-using Children = std::vector<Child>;
-
-/// One step of a batch. The steps of a batch are applied in order.
-struct Change {
-    enum class Kind {
-        Set,    ///< the node replaces what stands at the address
-        Remove, ///< the address goes with everything below it
-        Make,   ///< the address comes into being without a node; given only where nothing exists
-    };
-
-    Kind kind;
-    Address address; ///< never the root's
-    Node node;       ///< of Set, not null; otherwise null
-};
-
-using Batch = std::vector<Change>;
-
-/// What others have changed at one address: a node came, went or became another, or the address was made.
-struct Difference {
-    Address address;
-    Node before; ///< null where none was stored
-    Node after;  ///< null where none is stored
-};
-
-/// What others have changed since the last look.
-struct Changes {
-    bool everything = false; ///< nothing is known of what was there before: forget all that was loaded
-    std::vector<Difference> differences;
-};
-
-/// The files on disk that came into being or went with a batch, absolute.
-struct FileChanges {
-    std::vector<Path> added;
-    std::vector<Path> removed;
-};
 
 /// Where a TreeMetadataManager keeps its tree.
 ///

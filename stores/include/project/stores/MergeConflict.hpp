@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "project/stores/Backend.hpp"
+#include "project/stores/Node.hpp"
 
 namespace project::stores {
 

@@ -1,0 +1,155 @@
+#include "disk/FileTransfer.hpp"
+
+#include <cerrno>
+#include <csignal>
+#include <ctime>
+
+#include <unistd.h>
+
+#include "disk/SystemError.hpp"
+
+namespace project::stores {
+
+namespace {
+
+std::int64_t nanoseconds(timespec const& time) noexcept {
+    return std::int64_t{time.tv_sec} * 1'000'000'000 + time.tv_nsec;
+}
+
+/// Keeps the signal for a file beyond the limit away from this thread, and takes it when one came.
+class FileSizeSignalBlocked {
+public:
+    FileSizeSignalBlocked() noexcept {
+        sigemptyset(&signal_);
+        sigaddset(&signal_, SIGXFSZ);
+        sigset_t pending;
+        sigpending(&pending);
+        wasPending_ = sigismember(&pending, SIGXFSZ) == 1;
+        pthread_sigmask(SIG_BLOCK, &signal_, &before_);
+    }
+
+    ~FileSizeSignalBlocked() {
+        if (!wasPending_) {
+            timespec const atOnce{};
+            while (sigtimedwait(&signal_, nullptr, &atOnce) < 0 && errno == EINTR) {
+            }
+        }
+        pthread_sigmask(SIG_SETMASK, &before_, nullptr);
+    }
+
+    FileSizeSignalBlocked(FileSizeSignalBlocked const&) = delete;
+    FileSizeSignalBlocked& operator=(FileSizeSignalBlocked const&) = delete;
+
+private:
+    sigset_t signal_;
+    sigset_t before_;
+    bool wasPending_;
+};
+
+void requireLength(std::uint64_t length, std::string const& name) {
+    if (length > Disk::longestFile) {
+        throw StoreError(name, 0, "is longer than the 1 GiB that a project's text may have",
+                         "Move it away, and restore the project's own file.");
+    }
+}
+
+/// The fine clock's time, made different from the coarse clock's when both happen to agree.
+timespec timeBetweenTicks() noexcept {
+    timespec coarse{};
+    timespec fine{};
+    ::clock_gettime(CLOCK_REALTIME_COARSE, &coarse);
+    ::clock_gettime(CLOCK_REALTIME, &fine);
+    if (nanoseconds(coarse) == nanoseconds(fine)) {
+        fine.tv_nsec += fine.tv_nsec < 999'999'999 ? 1 : -1;
+    }
+    return fine;
+}
+
+} // namespace
+
+FileIdentity toIdentity(struct stat const& status) noexcept {
+    return {status.st_dev,
+            status.st_ino,
+            static_cast<std::uint64_t>(status.st_size),
+            nanoseconds(status.st_mtim),
+            nanoseconds(status.st_ctim),
+            S_ISREG(status.st_mode),
+            status.st_nlink > 1};
+}
+
+FileIdentity identifyOpenFile(int file, std::string const& name) {
+    struct stat status {};
+
+    if (::fstat(file, &status) != 0) {
+        throwSystemError(name, "can't be looked at", errno);
+    }
+    if (!S_ISREG(status.st_mode)) {
+        throw StoreError(name, 0, "is no regular file", "Move it away, and restore the project's own file.");
+    }
+    return toIdentity(status);
+}
+
+void requireRoom(std::uint64_t length, std::string const& name) {
+    if (length > Disk::longestFile) {
+        throw StoreError(name, 0, "would get longer than the 1 GiB that a project's text may have",
+                         "Split the project.");
+    }
+}
+
+std::string readFrom(int file, std::uint64_t offset, std::uint64_t expectedSize, std::string const& name) {
+    requireLength(expectedSize, name);
+    std::string bytes;
+    // One byte more than expected, so that one call that finds the end is enough.
+    bytes.resize(expectedSize > offset ? expectedSize - offset + 1 : 1);
+    std::size_t length = 0;
+    for (;;) {
+        auto const count =
+            ::pread(file, bytes.data() + length, bytes.size() - length, static_cast<off_t>(offset + length));
+        if (count < 0 && errno == EINTR) {
+            continue;
+        }
+        if (count < 0) {
+            throwSystemError(name, "can't be read", errno);
+        }
+        if (count == 0) {
+            break;
+        }
+        length += static_cast<std::size_t>(count);
+        requireLength(offset + length, name); // it may grow as long as it is read
+        if (length == bytes.size()) {
+            bytes.resize(bytes.size() * 2);
+        }
+    }
+    bytes.resize(length);
+    return bytes;
+}
+
+void writeAll(int file, std::string_view bytes, std::string const& name) {
+    FileSizeSignalBlocked const blocked;
+    while (!bytes.empty()) {
+        auto const count = ::write(file, bytes.data(), bytes.size());
+        if (count < 0 && errno == EINTR) {
+            continue;
+        }
+        if (count < 0) {
+            throwSystemError(name, "can't be written", errno);
+        }
+        bytes.remove_prefix(static_cast<std::size_t>(count));
+    }
+}
+
+std::optional<WrittenFile> stamp(int file) noexcept {
+    auto const time = timeBetweenTicks();
+    timespec const times[] = {{0, UTIME_OMIT}, time};
+    bool const set = ::futimens(file, times) == 0;
+
+    struct stat status {};
+
+    if (::fstat(file, &status) != 0) {
+        return std::nullopt;
+    }
+    auto const identity = toIdentity(status);
+    return WrittenFile{identity, set && identity.modified == nanoseconds(time)};
+}
+
+} // namespace project::stores

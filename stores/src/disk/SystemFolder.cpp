@@ -1,0 +1,125 @@
+#include "disk/SystemFolder.hpp"
+
+#include <cerrno>
+#include <utility>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "disk/FileTransfer.hpp"
+#include "disk/SystemError.hpp"
+
+namespace project::stores {
+
+SystemFolder::SystemFolder(std::string root, std::string const& name)
+    : root_(std::move(root)), name_(name), path_(root_ + (root_.ends_with('/') ? "" : "/") + name) {
+}
+
+int SystemFolder::get() const {
+    requireOwnProcess();
+    if (!folder_.isOpen()) {
+        throwSystemError(path_, "can't be used", ENOENT);
+    }
+    return folder_.get();
+}
+
+void SystemFolder::requireOwnProcess() const {
+    if (folder_.isInForkedChild()) {
+        throw StoreError(path_, 0, "was opened by the process that this one was forked from",
+                         "Open the project anew in the child.");
+    }
+}
+
+void SystemFolder::openRoot(ForkSafeDescriptor& root, int flags) const {
+    requireOwnProcess();
+    if (!root.open([&] { return ::open(root_.c_str(), flags | O_DIRECTORY | O_CLOEXEC); })) {
+        throwSystemError(root_, "can't be opened", errno);
+    }
+}
+
+bool SystemFolder::open() {
+    ForkSafeDescriptor root;
+    openRoot(root, O_PATH);
+    return openIn(root.get());
+}
+
+bool SystemFolder::openIn(int root) {
+    struct stat status {};
+
+    if (::fstatat(root, name_.c_str(), &status, AT_SYMLINK_NOFOLLOW) != 0) {
+        if (errno == ENOENT) {
+            return false;
+        }
+        throwSystemError(path_, "can't be looked at", errno);
+    }
+    if (!S_ISDIR(status.st_mode)) {
+        throw StoreError(path_, 0, S_ISLNK(status.st_mode) ? "is a symbolic link" : "is no folder",
+                         "Move it away: the store keeps a folder of its own there and follows no links.");
+    }
+    if (folder_.isOpen() && identity_.isSameFile(toIdentity(status))) {
+        return true;
+    }
+    int const flags = O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC;
+    if (!folder_.open([&] { return ::openat(root, name_.c_str(), flags); }) ||
+        ::fstat(folder_.get(), &status) != 0) {
+        throwSystemError(path_, "can't be opened", errno);
+    }
+    identity_ = toIdentity(status);
+    return true;
+}
+
+bool SystemFolder::make() {
+    ForkSafeDescriptor root;
+    openRoot(root, O_RDONLY);
+    bool const made = ::mkdirat(root.get(), name_.c_str(), 0777) == 0;
+    if (!made && errno != EEXIST) {
+        throwSystemError(path_, "can't be made", errno);
+    }
+    if (!openIn(root.get())) {
+        throwSystemError(path_, "can't be opened", ENOENT);
+    }
+    if (repeatWhenInterrupted([&root] { return ::fsync(root.get()); }) != 0) {
+        auto const error = errno;
+        if (made) {
+            remove();
+        }
+        throwSystemError(root_, "can't be made durable", error);
+    }
+    return made;
+}
+
+void SystemFolder::remove() noexcept {
+    if (!folder_.isOpen()) {
+        return;
+    }
+    try {
+        if (isInPlace()) {
+            ::rmdir(path_.c_str()); // fails when something lies in it
+        }
+    } catch (StoreError const&) {
+        // what can't be looked at stays
+    }
+    folder_.close();
+}
+
+bool SystemFolder::isInPlace() const {
+    requireOwnProcess();
+
+    if (!folder_.isOpen()) {
+        return false;
+    }
+
+    struct stat status {};
+
+    if (::lstat(path_.c_str(), &status) != 0) {
+        if (errno == ENOENT || errno == ENOTDIR) {
+            return false;
+        }
+        // Whoever takes that for a folder that was moved away tells of a batch that it is not in the project.
+        throwSystemError(path_, "can't be looked at", errno);
+    }
+    return S_ISDIR(status.st_mode) && identity_.isSameFile(toIdentity(status));
+}
+
+} // namespace project::stores

@@ -1,0 +1,187 @@
+#include "line/CanonicalLine.hpp"
+
+#include <array>
+
+#include "line/JsonText.hpp"
+#include "line/NodeLine.hpp"
+
+namespace project::stores {
+
+namespace {
+
+constexpr std::string_view pathOpening = R"({"file":")";
+constexpr std::string_view stepsOpening = R"({"at":[)";
+
+constexpr std::size_t longestSurelyShallowPath = deepestAddress;
+
+constexpr std::array<bool, 256> plainCharacters = [] {
+    std::array<bool, 256> plain{};
+    for (std::size_t c = 0x20; c < 0x80; ++c) {
+        plain[c] = c != '"' && c != '\\' && c != '/';
+    }
+    return plain;
+}();
+
+/// Passes over a line in the one form and order in which it is written.
+class Scanner {
+public:
+    explicit Scanner(std::string_view line) noexcept : line_(line) {}
+
+    std::optional<LineAddress> path() noexcept {
+        std::string_view content;
+        if (!string(content) || !isPathContent(content)) {
+            return std::nullopt;
+        }
+        return LineAddress{LineAddress::Form::Names, content};
+    }
+
+    std::optional<LineAddress> object() noexcept {
+        std::optional<LineAddress> const address = line_.starts_with(pathOpening) ? file() : steps();
+        std::size_t const behindAddress = at_;
+        bool const whole = address && (pass(R"(,"node":false)") || body("Info", 0)) && pass("}") && atEnd();
+        bool const plain = behindAddress + 1 == at_;
+        if (!whole || (plain && address->form == LineAddress::Form::Names)) {
+            return std::nullopt;
+        }
+        return address;
+    }
+
+    bool atEnd() const noexcept { return at_ == line_.size(); }
+
+private:
+    bool pass(std::string_view expected) noexcept {
+        if (line_.substr(at_, expected.size()) != expected) {
+            return false;
+        }
+        at_ += expected.size();
+        return true;
+    }
+
+    bool string(std::string_view& content) noexcept {
+        if (!pass("\"")) {
+            return false;
+        }
+        JsonContentScan const scan = scanJsonContent(line_, at_);
+        if (scan.problem != nullptr || !scan.canonical) {
+            return false;
+        }
+        content = line_.substr(at_, scan.end - at_);
+        at_ = scan.end + 1;
+        return true;
+    }
+
+    std::optional<LineAddress> file() noexcept {
+        at_ = pathOpening.size() - 1;
+        return path();
+    }
+
+    std::optional<LineAddress> steps() noexcept {
+        if (!pass(stepsOpening)) {
+            return std::nullopt;
+        }
+        std::size_t depth = 0;
+        std::string_view content;
+        do {
+            if (!string(content) || !pass(",") || !string(content) || ++depth > deepestAddress) {
+                return std::nullopt;
+            }
+        } while (pass(","));
+        LineAddress const address{LineAddress::Form::Steps, line_.substr(stepsOpening.size())};
+        if (!pass("]") || isWrittenAsPath(address)) {
+            return std::nullopt;
+        }
+        return address;
+    }
+
+    /// Type, keys and children as far as they are written. @param unwritten the type that is left out.
+    bool body(std::string_view unwritten, std::size_t nesting) noexcept {
+        std::string_view type;
+        if (pass(R"(,"type":)") && (!string(type) || type == unwritten)) {
+            return false;
+        }
+        return keysAndChildren(nesting);
+    }
+
+    bool keysAndChildren(std::size_t nesting) noexcept {
+        if (pass(R"(,"keys":)") && !keys()) {
+            return false;
+        }
+        return !pass(R"(,"children":)") || children(nesting + 1);
+    }
+
+    bool keys() noexcept {
+        std::string_view previous;
+        std::string_view key;
+        std::string_view value;
+        for (bool first = true; first || pass(","); first = false) {
+            if (first && !pass("{")) {
+                return false;
+            }
+            if (!string(key) || !pass(":") || !string(value) ||
+                (!first && std::is_gteq(compareJsonContents(previous, key)))) {
+                return false;
+            }
+            previous = key;
+        }
+        return pass("}");
+    }
+
+    bool children(std::size_t nesting) noexcept {
+        if (nesting > deepestNesting || !pass("[")) {
+            return false;
+        }
+        do {
+            std::string_view type;
+            if (!pass(R"({"type":)") || !string(type) || !keysAndChildren(nesting) || !pass("}")) {
+                return false;
+            }
+        } while (pass(","));
+        return pass("]");
+    }
+
+    std::string_view line_;
+    std::size_t at_ = 0;
+};
+
+} // namespace
+
+std::optional<LineAddress> canonicalAddress(std::string_view line) noexcept {
+    Scanner scanner(line);
+    if (!line.starts_with('"')) {
+        return scanner.object();
+    }
+    std::optional<LineAddress> const path = scanner.path();
+    return scanner.atEnd() ? path : std::nullopt;
+}
+
+LineAddress addressOfCanonical(std::string_view line) noexcept {
+    if (line.front() == '"') {
+        return {LineAddress::Form::Names, line.substr(1, line.size() - 2)};
+    }
+    if (line.starts_with(stepsOpening)) {
+        return {LineAddress::Form::Steps, line.substr(stepsOpening.size())};
+    }
+    std::size_t end = pathOpening.size();
+    while (line[end] != '"') {
+        end += line[end] == '\\' ? 2 : 1;
+    }
+    return {LineAddress::Form::Names, line.substr(pathOpening.size(), end - pathOpening.size())};
+}
+
+std::size_t plainPathLength(char const* line) noexcept {
+    char const* const begin = line + 1;
+    char const* at = begin;
+    do {
+        char const* const name = at;
+        while (plainCharacters[static_cast<unsigned char>(*at)]) {
+            ++at;
+        }
+        if (at == name && (*at == '/' || at == begin)) {
+            return 0;
+        }
+    } while (*at == '/' && ++at);
+    auto const length = static_cast<std::size_t>(at - begin);
+    return *line == '"' && *at == '"' && length <= longestSurelyShallowPath ? length : 0;
+}
+
+} // namespace project::stores

@@ -1,0 +1,366 @@
+#include "line/JsonText.hpp"
+
+#include <algorithm>
+#include <bit>
+#include <cstdint>
+#include <cstring>
+
+namespace project::stores {
+
+namespace {
+
+constexpr char lowerDigits[] = "0123456789abcdef";
+constexpr int endOfContent = -1;
+
+bool isHighSurrogate(unsigned unit) noexcept {
+    return unit >= 0xD800 && unit < 0xDC00;
+}
+
+bool isLowSurrogate(unsigned unit) noexcept {
+    return unit >= 0xDC00 && unit < 0xE000;
+}
+
+/// Written as it is, in one byte.
+bool isPlainAscii(unsigned unit) noexcept {
+    return unit >= 0x20 && unit < 0x80 && unit != '"' && unit != '\\';
+}
+
+/// The letter of the two-byte escape of a character, or 0 when it has none.
+char shortEscape(unsigned unit) noexcept {
+    switch (unit) {
+    case '"':
+        return '"';
+    case '\\':
+        return '\\';
+    case '\b':
+        return 'b';
+    case '\f':
+        return 'f';
+    case '\n':
+        return 'n';
+    case '\r':
+        return 'r';
+    case '\t':
+        return 't';
+    default:
+        return 0;
+    }
+}
+
+/// The character of a two-byte escape by its letter, or -1 when there is no such escape.
+int unescaped(char letter) noexcept {
+    switch (letter) {
+    case '"':
+        return '"';
+    case '\\':
+        return '\\';
+    case '/':
+        return '/';
+    case 'b':
+        return '\b';
+    case 'f':
+        return '\f';
+    case 'n':
+        return '\n';
+    case 'r':
+        return '\r';
+    case 't':
+        return '\t';
+    default:
+        return -1;
+    }
+}
+
+void appendEscaped(std::string& out, unsigned unit) {
+    out += '\\';
+    if (char const letter = shortEscape(unit)) {
+        out += letter;
+        return;
+    }
+    out += 'u';
+    for (int shift = 12; shift >= 0; shift -= 4) {
+        out += lowerDigits[(unit >> shift) & 0xF];
+    }
+}
+
+void appendUtf8(std::string& out, char32_t point) {
+    auto const byte = [&out](char32_t value) { out += static_cast<char>(static_cast<unsigned char>(value)); };
+    if (point < 0x800) {
+        byte(0xC0 | (point >> 6));
+    } else if (point < 0x10000) {
+        byte(0xE0 | (point >> 12));
+        byte(0x80 | ((point >> 6) & 0x3F));
+    } else {
+        byte(0xF0 | (point >> 18));
+        byte(0x80 | ((point >> 12) & 0x3F));
+        byte(0x80 | ((point >> 6) & 0x3F));
+    }
+    byte(0x80 | (point & 0x3F));
+}
+
+int hexDigit(char c) noexcept {
+    if (c >= '0' && c <= '9') {
+        return c - '0';
+    }
+    if (c >= 'a' && c <= 'f') {
+        return c - 'a' + 10;
+    }
+    return c >= 'A' && c <= 'F' ? c - 'A' + 10 : -1;
+}
+
+/// The code unit of four hexadecimal digits, or -1.
+int fourDigits(std::string_view text, std::size_t from) noexcept {
+    if (text.size() - from < 4) {
+        return -1;
+    }
+    int unit = 0;
+    for (std::size_t i = from; i < from + 4; ++i) {
+        int const digit = hexDigit(text[i]);
+        if (digit < 0) {
+            return -1;
+        }
+        unit = unit * 16 + digit;
+    }
+    return unit;
+}
+
+/// How many bytes the character that begins here has, or 0 when it is no well-formed UTF-8.
+std::size_t utf8Length(std::string_view text, std::size_t from) noexcept {
+    auto const byte = [&](std::size_t i) {
+        return from + i < text.size() ? static_cast<unsigned char>(text[from + i]) : 0U;
+    };
+    auto const follows = [&](std::size_t i, unsigned low = 0x80, unsigned high = 0xBF) {
+        return byte(i) >= low && byte(i) <= high;
+    };
+    unsigned const lead = byte(0);
+    if (lead >= 0xC2 && lead <= 0xDF) {
+        return follows(1) ? 2 : 0;
+    }
+    if (lead >= 0xE0 && lead <= 0xEF) {
+        bool const second = follows(1, lead == 0xE0 ? 0xA0 : 0x80, lead == 0xED ? 0x9F : 0xBF);
+        return second && follows(2) ? 3 : 0;
+    }
+    if (lead >= 0xF0 && lead <= 0xF4) {
+        bool const second = follows(1, lead == 0xF0 ? 0x90 : 0x80, lead == 0xF4 ? 0x8F : 0xBF);
+        return second && follows(2) && follows(3) ? 4 : 0;
+    }
+    return 0;
+}
+
+char32_t decodeUtf8(std::string_view bytes) noexcept {
+    auto const tail = [&](std::size_t i) { return static_cast<char32_t>(bytes[i]) & 0x3F; };
+    auto const lead = static_cast<char32_t>(static_cast<unsigned char>(bytes[0]));
+    switch (bytes.size()) {
+    case 2:
+        return ((lead & 0x1F) << 6) | tail(1);
+    case 3:
+        return ((lead & 0x0F) << 12) | (tail(1) << 6) | tail(2);
+    default:
+        return ((lead & 0x07) << 18) | (tail(1) << 12) | (tail(2) << 6) | tail(3);
+    }
+}
+
+/// Gives the code units of a well-formed content, one after the other.
+class CodeUnits {
+public:
+    explicit CodeUnits(std::string_view content) noexcept : content_(content) {}
+
+    int next() noexcept {
+        if (pending_ != 0) {
+            int const unit = pending_;
+            pending_ = 0;
+            return unit;
+        }
+        if (at_ >= content_.size()) {
+            return endOfContent;
+        }
+        auto const byte = static_cast<unsigned char>(content_[at_]);
+        return byte == '\\' ? escape() : byte < 0x80 ? content_[at_++] : character();
+    }
+
+private:
+    int escape() noexcept {
+        char const letter = content_[at_ + 1];
+        if (letter != 'u') {
+            at_ += 2;
+            return unescaped(letter);
+        }
+        int const unit = fourDigits(content_, at_ + 2);
+        at_ += 6;
+        return unit;
+    }
+
+    int character() noexcept {
+        std::size_t const length = utf8Length(content_, at_);
+        char32_t const point = decodeUtf8(content_.substr(at_, length));
+        at_ += length;
+        if (point < 0x10000) {
+            return static_cast<int>(point);
+        }
+        pending_ = static_cast<int>(0xDC00 + ((point - 0x10000) & 0x3FF));
+        return static_cast<int>(0xD800 + ((point - 0x10000) >> 10));
+    }
+
+    std::string_view content_;
+    std::size_t at_ = 0;
+    int pending_ = 0;
+};
+
+/// Checks the escape at a position of a content.
+class EscapeCheck {
+public:
+    /// @return how many bytes the escape has, or 0 when it is none.
+    std::size_t length(std::string_view text, std::size_t at) noexcept {
+        if (at + 1 >= text.size()) {
+            return 0;
+        }
+        bool const afterHigh = at == endOfHigh_;
+        if (text[at + 1] != 'u') {
+            canonical_ = canonical_ && text[at + 1] != '/';
+            return unescaped(text[at + 1]) < 0 ? 0 : 2;
+        }
+        int const unit = fourDigits(text, at + 2);
+        if (unit < 0) {
+            return 0;
+        }
+        noteUnit(static_cast<unsigned>(unit), text.substr(at + 2, 4), afterHigh);
+        if (isHighSurrogate(static_cast<unsigned>(unit))) {
+            endOfHigh_ = at + 6;
+        }
+        return 6;
+    }
+
+    bool isCanonical() const noexcept { return canonical_; }
+
+private:
+    /// Only a control character without a letter of its own and a lone surrogate are written so; two escapes
+    /// that make a pair stand for a character that UTF-8 has.
+    void noteUnit(unsigned unit, std::string_view digits, bool afterHigh) noexcept {
+        bool const control = unit < 0x20 && shortEscape(unit) == 0;
+        bool const lone = isHighSurrogate(unit) || (isLowSurrogate(unit) && !afterHigh);
+        bool const upper =
+            std::any_of(digits.begin(), digits.end(), [](char c) { return c >= 'A' && c <= 'F'; });
+        canonical_ = canonical_ && (control || lone) && !upper;
+    }
+
+    bool canonical_ = true;
+    std::size_t endOfHigh_ = std::string_view::npos;
+};
+
+} // namespace
+
+void appendJsonContent(std::string& out, std::u16string_view text) {
+    std::size_t i = 0;
+    while (i < text.size()) {
+        auto const stop =
+            std::find_if_not(text.begin() + static_cast<std::ptrdiff_t>(i), text.end(), isPlainAscii);
+        auto const run = static_cast<std::size_t>(stop - text.begin()) - i;
+        if (run > 0) {
+            std::size_t const size = out.size();
+            out.resize(size + run);
+            std::transform(text.data() + i, text.data() + i + run, out.data() + size,
+                           [](char16_t unit) { return static_cast<char>(unit); });
+            i += run;
+            continue;
+        }
+        char16_t const unit = text[i++];
+        if (isHighSurrogate(unit) && i < text.size() && isLowSurrogate(text[i])) {
+            appendUtf8(out, 0x10000 + ((char32_t{unit} - 0xD800) << 10) + (char32_t{text[i++]} - 0xDC00));
+        } else if (unit < 0x80 || isHighSurrogate(unit) || isLowSurrogate(unit)) {
+            appendEscaped(out, unit);
+        } else {
+            appendUtf8(out, unit);
+        }
+    }
+}
+
+void appendJsonString(std::string& out, std::u16string_view text) {
+    out += '"';
+    appendJsonContent(out, text);
+    out += '"';
+}
+
+std::u16string decodeJsonContent(std::string_view content) {
+    std::u16string text;
+    bool const plain = std::all_of(content.begin(), content.end(),
+                                   [](char c) { return static_cast<signed char>(c) >= 0 && c != '\\'; });
+    if (plain) {
+        text.assign(content.begin(), content.end());
+        return text;
+    }
+    CodeUnits units(content);
+    for (int unit = units.next(); unit != endOfContent; unit = units.next()) {
+        text += static_cast<char16_t>(unit);
+    }
+    return text;
+}
+
+std::size_t firstDifference(std::string_view left, std::string_view right) noexcept {
+    std::size_t const shorter = std::min(left.size(), right.size());
+    std::size_t i = 0;
+    for (; i + sizeof(std::uint64_t) <= shorter; i += sizeof(std::uint64_t)) {
+        std::uint64_t l = 0;
+        std::uint64_t r = 0;
+        std::memcpy(&l, left.data() + i, sizeof l);
+        std::memcpy(&r, right.data() + i, sizeof r);
+        if (l != r) {
+            auto const bits = std::endian::native == std::endian::little ? std::countr_zero(l ^ r)
+                                                                         : std::countl_zero(l ^ r);
+            return i + static_cast<std::size_t>(bits / 8);
+        }
+    }
+    while (i < shorter && left[i] == right[i]) {
+        ++i;
+    }
+    return i;
+}
+
+std::strong_ordering compareJsonContents(std::string_view left, std::string_view right) noexcept {
+    std::size_t const at = firstDifference(left, right);
+    if (at == left.size() || at == right.size()) {
+        return left.size() <=> right.size();
+    }
+    if (isUnescapedAt(left, at) && isUnescapedAt(right, at)) {
+        return codeUnitRank(static_cast<unsigned char>(left[at])) <=>
+               codeUnitRank(static_cast<unsigned char>(right[at]));
+    }
+    CodeUnits leftUnits(left);
+    CodeUnits rightUnits(right);
+    while (true) {
+        int const l = leftUnits.next();
+        int const r = rightUnits.next();
+        if (l != r || l == endOfContent) {
+            return l <=> r;
+        }
+    }
+}
+
+JsonContentScan scanJsonContent(std::string_view text, std::size_t from) noexcept {
+    EscapeCheck escapes;
+    std::size_t at = from;
+    while (at < text.size()) {
+        auto const byte = static_cast<unsigned char>(text[at]);
+        if (isPlainAscii(byte)) {
+            ++at;
+        } else if (byte == '"') {
+            return {at, escapes.isCanonical(), nullptr};
+        } else if (byte < 0x20) {
+            return {at, false, "a string holds a control character"};
+        } else if (byte == '\\') {
+            std::size_t const length = escapes.length(text, at);
+            if (length == 0) {
+                return {at, false, "a string holds a wrong escape"};
+            }
+            at += length;
+        } else {
+            std::size_t const length = utf8Length(text, at);
+            if (length == 0) {
+                return {at, false, "a string is no UTF-8"};
+            }
+            at += length;
+        }
+    }
+    return {at, false, "a string does not end"};
+}
+
+} // namespace project::stores

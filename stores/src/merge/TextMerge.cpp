@@ -1,0 +1,121 @@
+#include "project/stores/TextMerge.hpp"
+
+#include <algorithm>
+#include <optional>
+#include <stdexcept>
+#include <utility>
+
+#include "merge/MergedBody.hpp"
+#include "project/stores/StoreError.hpp"
+#include "text/TextFrame.hpp"
+#include "text/TextReader.hpp"
+
+namespace project::stores {
+
+namespace {
+
+/// Refuses what could lose something without a word. A torn tail counts for nobody, nor does it here.
+void requireSound(TextReading const& reading, char const* version) {
+    for (Fault const& fault : reading.faults) {
+        if (fault.kind == Fault::Kind::Damage) {
+            throw StoreError(version, fault.line, "the text is damaged: " + fault.problem,
+                             "Mend that version before it is merged.");
+        }
+        if (fault.kind == Fault::Kind::Conflict) {
+            throw StoreError(version, fault.line, "another merge left its markers",
+                             "Resolve them in that version before it is merged.");
+        }
+    }
+}
+
+TextBody readBody(std::string_view text, char const* version) {
+    std::optional<TextReading> reading = readText(std::string(text), version);
+    if (!reading) {
+        auto const lines = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
+        throw StoreError(version, lines + (text.empty() || text.back() != '\n' ? 1 : 0),
+                         "the text ends before the last line of its body", "");
+    }
+    requireSound(*reading, version);
+    bool const tidy = reading->canonical && reading->content.overlay().empty();
+    return tidy ? std::move(reading->content.body()) : reading->content.write({});
+}
+
+void appendPart(std::string& out, std::string_view marker, std::string_view lines) {
+    out += marker;
+    out += '\n';
+    out += lines;
+}
+
+std::string withMarkers(ThreeWay<std::string> const& lines) {
+    std::string text;
+    appendPart(text, "<<<<<<< ours", lines.ours);
+    appendPart(text, "||||||| base", lines.base);
+    appendPart(text, "=======", lines.theirs);
+    appendPart(text, ">>>>>>> theirs", "");
+    return text;
+}
+
+} // namespace
+
+class TextMerge::State {
+public:
+    explicit State(MergedBody merged) : merged_(std::move(merged)) {}
+
+    std::vector<MergeConflict> const& conflicts() const noexcept { return merged_.conflicts; }
+
+    /// @param linesOf gives the lines of a site.
+    template <typename LinesOf>
+    std::string text(LinesOf const& linesOf) const {
+        std::string text;
+        text.reserve(merged_.lines.size() + firstLine.size() + endLine.size() + 2);
+        text += firstLine;
+        text += '\n';
+        std::size_t written = 0;
+        for (MergeSite const& site : merged_.sites) {
+            text.append(merged_.lines, written, site.offset - written);
+            text += linesOf(site);
+            written = site.offset;
+        }
+        text.append(merged_.lines, written);
+        text += endLine;
+        text += '\n';
+        return text;
+    }
+
+private:
+    MergedBody merged_;
+};
+
+TextMerge::TextMerge(std::unique_ptr<State const> state) noexcept : state_(std::move(state)) {
+}
+
+TextMerge::TextMerge(TextMerge&&) noexcept = default;
+TextMerge& TextMerge::operator=(TextMerge&&) noexcept = default;
+TextMerge::~TextMerge() = default;
+
+std::vector<MergeConflict> const& TextMerge::conflicts() const noexcept {
+    return state_->conflicts();
+}
+
+std::string TextMerge::text(std::vector<MergeSide> const& choices) const {
+    if (choices.size() != conflicts().size()) {
+        throw std::invalid_argument("a merge needs one choice for each of its conflicts");
+    }
+    MergeSide const* next = choices.data();
+    return state_->text([&](MergeSite const& site) {
+        MergeSide const* const own = std::exchange(next, next + site.conflicts);
+        return chosenLines(site, own);
+    });
+}
+
+std::string TextMerge::textWithMarkers() const {
+    return state_->text([](MergeSite const& site) { return withMarkers(site.lines); });
+}
+
+TextMerge mergeTexts(std::string_view base, std::string_view ours, std::string_view theirs) {
+    ThreeWay<TextBody> const bodies{base.empty() ? TextBody() : readBody(base, "base"),
+                                    readBody(ours, "ours"), readBody(theirs, "theirs")};
+    return TextMerge(std::make_unique<TextMerge::State const>(mergeBodies(bodies)));
+}
+
+} // namespace project::stores

@@ -1,0 +1,198 @@
+#include "text/ProjectText.hpp"
+
+#include <algorithm>
+#include <map>
+#include <utility>
+
+#include "text/TextContent.hpp"
+#include "text/TextDifference.hpp"
+#include "text/TextLines.hpp"
+#include "text/TextReader.hpp"
+#include "text/TextSum.hpp"
+#include "text/TextTail.hpp"
+
+namespace project::stores {
+
+class ProjectText::State {
+public:
+    explicit State(TextReading reading) : reading_(std::move(reading)) {}
+
+    TextReading const& reading() const noexcept { return reading_; }
+
+    TextContent const& content() const noexcept { return reading_.content; }
+
+    std::string const& body() const noexcept { return reading_.content.body().bytes(); }
+
+    /// The sum that the next batch has to name. Costs a walk through the body the first time.
+    std::string const& anchor() const {
+        if (anchor_.empty()) {
+            anchor_ = reading_.anchor;
+        }
+        if (anchor_.empty()) {
+            TextSum sum;
+            sum.addLines(body());
+            anchor_ = sum.hex();
+        }
+        return anchor_;
+    }
+
+    /// True when what is appended stands behind a whole text, in a line of its own.
+    bool canBeExtended() const noexcept {
+        bool const sound =
+            std::none_of(reading_.faults.begin(), reading_.faults.end(),
+                         [](Fault const& fault) { return fault.kind != Fault::Kind::Irregular; });
+        return sound && (reading_.tail.empty() ? body() : reading_.tail).ends_with('\n');
+    }
+
+    /// The batches that were appended; nothing when that is anything else.
+    std::optional<TailReading> readAppended(std::string_view added) const {
+        if (!canBeExtended() || !(added.empty() || added.ends_with('\n'))) {
+            return std::nullopt;
+        }
+        std::vector<TextLine> lines;
+        LineWalk walk(added, 0, 1);
+        while (walk.next()) {
+            lines.push_back(walk.line());
+        }
+        TailReading tail = readTail(lines, anchor());
+        return tail.faults.empty() ? std::optional(std::move(tail)) : std::nullopt;
+    }
+
+    void append(std::string_view added, TailReading const& tail) {
+        for (TailBatch const& batch : tail.batches) {
+            for (Change const& change : batch.changes) {
+                reading_.content.apply(change);
+            }
+        }
+        reading_.tail += added;
+        anchor_ = tail.anchor;
+    }
+
+    /// What stands wherever some batches set or remove something.
+    std::map<Address, Standing> standingWhere(std::vector<TailBatch> const& batches) const {
+        std::map<Address, Standing> found;
+        for (TailBatch const& batch : batches) {
+            for (Change const& change : batch.changes) {
+                found.try_emplace(change.address, content().at(change.address));
+                if (change.kind == Change::Kind::Remove) {
+                    for (Address const& below : content().standingWithin(change.address)) {
+                        found.try_emplace(below, content().at(below));
+                    }
+                }
+            }
+        }
+        return found;
+    }
+
+private:
+    TextReading reading_;
+    mutable std::string anchor_;
+};
+
+ProjectText::ProjectText(std::unique_ptr<State> state) noexcept : state_(std::move(state)) {
+}
+
+ProjectText::ProjectText(ProjectText&&) noexcept = default;
+ProjectText& ProjectText::operator=(ProjectText&&) noexcept = default;
+ProjectText::~ProjectText() = default;
+
+ProjectText ProjectText::empty() {
+    TextReading reading;
+    reading.content = TextContent(TextContent().write({}));
+    return ProjectText(std::make_unique<State>(std::move(reading)));
+}
+
+std::optional<ProjectText> ProjectText::read(std::string bytes, std::string const& file) {
+    std::optional<TextReading> reading = readText(std::move(bytes), file);
+    if (!reading) {
+        return std::nullopt;
+    }
+    return ProjectText(std::make_unique<State>(*std::move(reading)));
+}
+
+Children ProjectText::children(Address const& parent) const {
+    return state_->content().children(parent);
+}
+
+std::optional<std::vector<Difference>> ProjectText::extend(std::string_view added) {
+    auto const tail = state_->readAppended(added);
+    if (!tail) {
+        return std::nullopt;
+    }
+    auto before = state_->standingWhere(tail->batches);
+    state_->append(added, *tail);
+    std::vector<Difference> found;
+    for (auto& [address, standing] : before) {
+        addIfDifferent(found, address, standing, state_->content().at(address));
+    }
+    return found;
+}
+
+bool ProjectText::append(std::string_view lines) {
+    auto const tail = state_->readAppended(lines);
+    if (tail) {
+        state_->append(lines, *tail);
+    }
+    return tail.has_value();
+}
+
+std::string ProjectText::tailFor(Batch const& batch) const {
+    return writeBatch(batch, state_->anchor());
+}
+
+ProjectText ProjectText::rewrittenWith(Batch const& batch) const {
+    TextReading reading;
+    reading.content = TextContent(state_->content().write(batch));
+    return ProjectText(std::make_unique<State>(std::move(reading)));
+}
+
+std::vector<Difference> ProjectText::differencesTo(ProjectText const& other) const {
+    return differences(state_->content(), other.state_->content());
+}
+
+std::size_t ProjectText::size() const noexcept {
+    return bodySize() + tailSize();
+}
+
+std::size_t ProjectText::bodySize() const noexcept {
+    return body().size();
+}
+
+std::size_t ProjectText::tailSize() const noexcept {
+    return state_->reading().tail.size();
+}
+
+bool ProjectText::hasSameBytes(std::string_view bytes) const noexcept {
+    return bytes.size() == size() && bytes.starts_with(body()) &&
+           bytes.substr(bodySize()) == state_->reading().tail;
+}
+
+std::string ProjectText::bytes() const {
+    return body() + state_->reading().tail;
+}
+
+std::string const& ProjectText::body() const noexcept {
+    return state_->body();
+}
+
+bool ProjectText::isTidy() const noexcept {
+    return state_->reading().canonical && state_->reading().tail.empty();
+}
+
+bool ProjectText::hasTornTail() const noexcept {
+    return state_->reading().torn;
+}
+
+std::vector<Fault> const& ProjectText::faults() const noexcept {
+    return state_->reading().faults;
+}
+
+std::string ProjectText::damagedLines() const {
+    std::string lines;
+    for (auto const& [number, line] : state_->reading().damage) {
+        lines += line;
+    }
+    return lines;
+}
+
+} // namespace project::stores

@@ -1,0 +1,139 @@
+#include "text/TextBody.hpp"
+
+#include <algorithm>
+#include <utility>
+
+#include "line/CanonicalLine.hpp"
+#include "line/LineParser.hpp"
+#include "text/TextFrame.hpp"
+
+namespace project::stores {
+
+namespace {
+
+/// The first index of a range for which the condition no longer holds, which holds up to there and not from
+/// there on: by steps that double, then by halves.
+template <typename Condition>
+std::size_t gallop(TextBody::Range range, Condition const& holds) noexcept(noexcept(holds(0))) {
+    std::size_t low = range.begin;
+    std::size_t step = 1;
+    while (low < range.end && holds(std::min(low + step, range.end) - 1)) {
+        low = std::min(low + step, range.end);
+        step *= 2;
+    }
+    std::size_t high = std::min(low + step, range.end);
+    while (low < high) {
+        std::size_t const middle = low + (high - low) / 2;
+        if (holds(middle)) {
+            low = middle + 1;
+        } else {
+            high = middle;
+        }
+    }
+    return low;
+}
+
+} // namespace
+
+std::string_view TextBody::line(std::size_t index) const noexcept {
+    std::size_t const begin = starts_[index];
+    return {bytes_.data() + begin, bytes_.find('\n', begin) - begin};
+}
+
+LineAddress TextBody::address(std::size_t index) const noexcept {
+    return addressOfCanonical(line(index));
+}
+
+std::size_t TextBody::lowerBound(Range range, LineAddress const& wanted) const noexcept {
+    return gallop(range, [&](std::size_t i) noexcept { return std::is_lt(compare(address(i), wanted)); });
+}
+
+std::size_t TextBody::endOf(Range range, LineAddress const& wanted) const noexcept {
+    return gallop(range, [&](std::size_t i) noexcept { return isWithin(address(i), wanted); });
+}
+
+TextBody::Range TextBody::within(LineAddress const& wanted) const noexcept {
+    std::size_t const begin = lowerBound(all(), wanted);
+    return {begin, endOf({begin, size()}, wanted)};
+}
+
+std::optional<std::size_t> TextBody::find(LineAddress const& wanted) const noexcept {
+    std::size_t const found = lowerBound(all(), wanted);
+    bool const exact = found < size() && std::is_eq(compare(address(found), wanted));
+    return exact ? std::optional(found) : std::nullopt;
+}
+
+std::size_t TextBody::linesBefore(std::size_t offset) const noexcept {
+    auto const next = std::lower_bound(starts_.begin(), starts_.end(), offset);
+    auto const begun = static_cast<std::size_t>(next - starts_.begin());
+    return begun == 0 ? 0 : begun - 1;
+}
+
+Children TextBody::children(Range below, std::size_t depth) const {
+    Children children;
+    while (!below.empty()) {
+        LineSteps steps(address(below.begin));
+        for (std::size_t i = 0; i <= depth; ++i) {
+            steps.next();
+        }
+        Child child{toElement(steps), nullptr, false, false};
+        LineAddress const prefix = steps.prefix();
+        if (!steps.next()) {
+            child.node = nodeOfLine(line(below.begin));
+            child.made = child.node == nullptr;
+            ++below.begin;
+        }
+        std::size_t const end = endOf(below, prefix);
+        child.hasChildren = end > below.begin;
+        below.begin = end;
+        children.push_back(std::move(child));
+    }
+    return children;
+}
+
+std::string TextBody::cutAt(std::size_t size) {
+    std::string rest = bytes_.substr(size);
+    bytes_.resize(size);
+    return rest;
+}
+
+BodyWriter::BodyWriter(TextBody const& old, std::size_t added) : old_(old) {
+    written_.bytes_.reserve(old.bytes().size() + added + firstLine.size() + endLine.size() + 2);
+    written_.bytes_ += firstLine;
+    written_.bytes_ += '\n';
+}
+
+void BodyWriter::copy(TextBody::Range run) {
+    if (run.empty()) {
+        return;
+    }
+    if (!old_.isGapless()) {
+        for (std::size_t i = run.begin; i < run.end; ++i) {
+            add(old_.line(i));
+        }
+        return;
+    }
+    std::size_t const first = old_.starts_[run.begin];
+    std::size_t const last = old_.starts_[run.end - 1];
+    std::size_t const end = last + old_.line(run.end - 1).size() + 1;
+    std::size_t const moved = written_.bytes_.size() - first; // wraps round where lines move forward
+    written_.bytes_.append(old_.bytes_, first, end - first);
+    for (std::size_t i = run.begin; i < run.end; ++i) {
+        written_.starts_.push_back(old_.starts_[i] + moved);
+    }
+}
+
+void BodyWriter::add(std::string_view line) {
+    written_.starts_.push_back(written_.bytes_.size());
+    written_.bytes_ += line;
+    written_.bytes_ += '\n';
+}
+
+TextBody BodyWriter::finish() && {
+    written_.bytes_ += endLine;
+    written_.bytes_ += '\n';
+    written_.gapless_ = true;
+    return std::move(written_);
+}
+
+} // namespace project::stores

@@ -1,0 +1,191 @@
+#include "text/TextReader.hpp"
+
+#include <algorithm>
+#include <iterator>
+#include <utility>
+
+#include "line/CanonicalLine.hpp"
+#include "line/LineParser.hpp"
+#include "text/ConflictReader.hpp"
+#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
+#include "text/TextSum.hpp"
+#include "text/TextTail.hpp"
+
+namespace project::stores {
+
+namespace {
+
+/// Goes through a text without merge markers, from its first line to its last.
+class Reader {
+public:
+    explicit Reader(std::string bytes) : body_(reading_.content.body()) {
+        constexpr std::size_t usualLine = 40;
+        body_ = TextBody(std::move(bytes));
+        body_.reserve(body_.bytes().size() / usualLine);
+        reading_.canonical = true;
+    }
+
+    enum class Outcome { Whole, Incomplete, Conflict };
+
+    Outcome read(std::string const& file) {
+        LineWalk first(body_.bytes(), 0, 1);
+        if (!first.next()) {
+            return Outcome::Incomplete;
+        }
+        if (mergeMarker(first.line().text) != MergeMarker::None) {
+            return Outcome::Conflict;
+        }
+        if (!checkFirstLine(first.line().text, first.line().hasEnd(), file)) {
+            return Outcome::Incomplete;
+        }
+        bool const plain = first.line().text == firstLine && first.line().endsPlainly();
+        offset_ = first.offset();
+        ++number_;
+        Outcome const outcome = readBody();
+        body_.setGapless(reading_.canonical);
+        reading_.canonical = reading_.canonical && plain && endsPlainly_;
+        return outcome == Outcome::Whole ? readTailOf() : outcome;
+    }
+
+    TextReading result() && { return std::move(reading_); }
+
+    std::string takeBytes() && { return body_.cutAt(0) + reading_.tail; }
+
+private:
+    Outcome readBody() {
+        std::string const& bytes = body_.bytes();
+        while (offset_ < bytes.size()) {
+            std::size_t const length = plainPathLength(bytes.data() + offset_);
+            LineAddress const path{LineAddress::Form::Names, {bytes.data() + offset_ + 1, length}};
+            constexpr std::size_t quotes = 2;
+            if (length > 0 && bytes[offset_ + length + quotes] == '\n' && std::is_lt(compare(last_, path))) {
+                body_.addLine(offset_);
+                last_ = path;
+                offset_ += length + quotes + 1;
+                ++number_;
+            } else if (std::optional<Outcome> const outcome = readLine()) {
+                return *outcome;
+            }
+        }
+        return Outcome::Incomplete;
+    }
+
+    /// Reads a line that is no path of plain characters in its place. @return the outcome if it is the last.
+    std::optional<Outcome> readLine() {
+        LineWalk walk(body_.bytes(), offset_, number_);
+        walk.next();
+        TextLine const& line = walk.line();
+        if (line.text == endLine) {
+            endsPlainly_ = line.endsPlainly();
+            bodySize_ = walk.offset();
+            ++number_;
+            return Outcome::Whole;
+        }
+        if (!line.hasEnd()) {
+            return Outcome::Incomplete;
+        }
+        if (mergeMarker(line.text) != MergeMarker::None) {
+            return Outcome::Conflict;
+        }
+        std::optional<LineAddress> const address =
+            line.endsPlainly() ? canonicalAddress(line.text) : std::nullopt;
+        if (address && std::is_lt(compare(last_, *address))) {
+            body_.addLine(offset_);
+            last_ = *address;
+        } else {
+            layOver(line);
+        }
+        offset_ = walk.offset();
+        ++number_;
+        return std::nullopt;
+    }
+
+    /// Takes in what a line says that cannot be found among the others.
+    void layOver(TextLine const& line) {
+        reading_.canonical = false;
+        ParsedLine parsed = parseBodyLine(line.text);
+        if (line.text.empty()) {
+            fault(Fault::Kind::Irregular, "an empty line");
+        } else if (!parsed.change) {
+            fault(Fault::Kind::Damage, parsed.problem);
+            reading_.damage.emplace(line.number, line.whole);
+        } else {
+            place(*parsed.change);
+            reading_.content.join(*parsed.change);
+        }
+    }
+
+    void place(Change const& change) {
+        AddressText address(change.address);
+        auto const order = compare(last_, address.view());
+        if (std::is_gt(order)) {
+            fault(Fault::Kind::Irregular, "the line is not in its place");
+        } else if (std::is_eq(order)) {
+            fault(Fault::Kind::Irregular, "the line stands for the same address as the one before it");
+        } else {
+            lastText_ = std::move(address);
+            last_ = lastText_.view();
+        }
+    }
+
+    Outcome readTailOf() {
+        reading_.tail = body_.cutAt(bodySize_);
+        std::vector<TextLine> lines;
+        LineWalk walk(reading_.tail, 0, number_);
+        while (walk.next()) {
+            if (mergeMarker(walk.line().text) != MergeMarker::None) {
+                return Outcome::Conflict;
+            }
+            lines.push_back(walk.line());
+        }
+        if (!lines.empty()) {
+            takeTail(lines);
+        }
+        reading_.content.finishJoining();
+        bool const ended = lines.empty() ? body_.bytes().ends_with('\n') : lines.back().hasEnd();
+        if (!ended && !reading_.torn) {
+            number_ = lines.empty() ? number_ - 1 : lines.back().number;
+            fault(Fault::Kind::Irregular, "the last line has no line end");
+        }
+        return Outcome::Whole;
+    }
+
+    void takeTail(std::vector<TextLine> const& lines) {
+        TextSum sum;
+        sum.addLines(body_.bytes());
+        TailReading tail = readTail(lines, sum.hex());
+        takeIn(reading_.content, tail);
+        std::move(tail.faults.begin(), tail.faults.end(), std::back_inserter(reading_.faults));
+        reading_.damage.merge(tail.damage);
+        reading_.anchor = std::move(tail.anchor);
+        reading_.torn = tail.torn;
+    }
+
+    void fault(Fault::Kind kind, char const* problem) { reading_.faults.push_back({kind, number_, problem}); }
+
+    TextReading reading_;
+    TextBody& body_;
+    std::size_t offset_ = 0;
+    std::size_t number_ = 1;
+    std::size_t bodySize_ = 0;
+    bool endsPlainly_ = false;
+    AddressText lastText_{Address::root()};
+    LineAddress last_ = lastText_.view(); ///< of the last line that is in its place
+};
+
+} // namespace
+
+std::optional<TextReading> readText(std::string bytes, std::string const& file) {
+    Reader reader(std::move(bytes));
+    switch (reader.read(file)) {
+    case Reader::Outcome::Whole:
+        return std::move(reader).result();
+    case Reader::Outcome::Conflict:
+        return readConflictedText(std::move(reader).takeBytes(), file);
+    default:
+        return std::nullopt;
+    }
+}
+
+} // namespace project::stores

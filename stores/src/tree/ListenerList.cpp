@@ -1,0 +1,79 @@
+#include "tree/ListenerList.hpp"
+
+#include <algorithm>
+
+namespace project::stores {
+
+void ListenerList::add(std::weak_ptr<Listener> listener) {
+    std::lock_guard const guard(mutex_);
+    std::erase_if(listeners_, [](auto const& known) { return known.expired(); });
+    listeners_.push_back(std::move(listener));
+}
+
+std::vector<std::shared_ptr<ListenerList::Listener>> ListenerList::accepting() {
+    std::vector<std::shared_ptr<Listener>> result;
+    {
+        std::lock_guard const guard(mutex_);
+        for (auto const& weak : listeners_) {
+            if (auto listener = weak.lock()) {
+                result.push_back(std::move(listener));
+            }
+        }
+    }
+    // Asked without the mutex, so that a listener may subscribe another one while it is asked.
+    std::erase_if(result, [](auto const& listener) { return !listener->acceptsFileChangeRequests(); });
+    return result;
+}
+
+void ListenerList::Report::tell(FileChanges files, Always always) {
+    current_ = listeners_.accepting();
+    files_ = std::move(files);
+    bool const removalFirst = always == Always::Removal;
+    auto const additions = [&] {
+        if (always == Always::Addition || !files_.added.empty()) {
+            tellAll(Kind::Addition, files_.added);
+        }
+    };
+    if (!removalFirst) {
+        additions();
+    }
+    if (removalFirst || !files_.removed.empty()) {
+        tellAll(Kind::Removal, files_.removed);
+    }
+    if (removalFirst) {
+        additions();
+    }
+}
+
+void ListenerList::Report::tellAll(Kind kind, std::vector<Path> const& files) {
+    for (auto const& listener : current_) {
+        tell(*listener, kind, files);
+        told_.emplace_back(listener, kind);
+    }
+}
+
+void ListenerList::Report::tell(Listener& listener, Kind kind, std::vector<Path> const& files) {
+    if (kind == Kind::Addition) {
+        listener.fileAdditionRequested(store_, files);
+    } else {
+        listener.fileRemovalRequested(store_, metadataRoot_, files);
+    }
+}
+
+void ListenerList::Report::tellReverse() noexcept {
+    for (auto told = told_.rbegin(); told != told_.rend(); ++told) {
+        bool const wasAddition = told->second == Kind::Addition;
+        auto const& files = wasAddition ? files_.added : files_.removed;
+        if (files.empty()) {
+            continue;
+        }
+        try {
+            tell(*told->first, wasAddition ? Kind::Removal : Kind::Addition, files);
+        } catch (...) {
+            // The write has failed already, and that is the error that the caller must see.
+            continue;
+        }
+    }
+}
+
+} // namespace project::stores

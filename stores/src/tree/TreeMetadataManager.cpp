@@ -1,0 +1,212 @@
+#include "project/stores/TreeMetadataManager.hpp"
+
+#include <algorithm>
+#include <set>
+#include <stdexcept>
+#include <utility>
+
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/stores/StoreError.hpp"
+#include "tree/ChangeLog.hpp"
+#include "tree/ListenerList.hpp"
+#include "tree/MetadataTree.hpp"
+
+namespace project::stores {
+
+using cmlink::ReentrantReadWriteLock;
+using metadata::MetadataNode;
+using metadata::MetadataNodeSpecification;
+
+namespace {
+
+/// The caller's node is copied, so that nothing the caller does with it later changes the store.
+Node copyOf(MetadataNode const& node) {
+    return isEqual(node, *plainNode()) ? plainNode()
+                                       : std::make_shared<MetadataNodeSpecification const>(node);
+}
+
+/// True while a batch is written and not yet kept.
+class WritingMark {
+public:
+    explicit WritingMark(bool& mark) : mark_(mark) { mark_ = true; }
+
+    ~WritingMark() { mark_ = false; }
+
+    WritingMark(WritingMark const&) = delete;
+    WritingMark& operator=(WritingMark const&) = delete;
+
+private:
+    bool& mark_;
+};
+
+} // namespace
+
+class TreeMetadataManager::State {
+public:
+    State(std::unique_ptr<Backend> storage, Path root)
+        : backend(std::move(storage)),
+          metadataRoot(std::move(root)),
+          tree([this](Address const& address) { return backend->load(address); }),
+          lock({[this](Access access) { enter(access); }, [this] { backend->leave(); }}) {}
+
+    /// Writes a batch through to the backend, tells the listeners, and makes it stand.
+    void write(MetadataManager& store, Batch const& batch, ListenerList::Always always);
+
+    /// @throws StoreError for a listener that writes while it is told of a write.
+    void requireNotWriting() const;
+
+    std::unique_ptr<Backend> const backend;
+    Path const metadataRoot;
+    MetadataTree tree;
+    ChangeLog othersChanges;
+    ListenerList listeners;
+    bool writing = false;
+    ReentrantReadWriteLock lock; // last: it enters and leaves the backend
+
+private:
+    void enter(Access access);
+};
+
+void TreeMetadataManager::State::enter(Access access) {
+    auto const changes = backend->enter(access);
+    try {
+        othersChanges.add(changes);
+        tree.takeIn(changes);
+    } catch (...) {
+        tree.takeIn({true, {}}); // what was half taken in is forgotten, and loaded again when asked for
+        backend->leave();
+        throw;
+    }
+}
+
+void TreeMetadataManager::State::requireNotWriting() const {
+    if (writing) {
+        throw StoreError(fl::filesystem::toSystem(metadataRoot).string(), 0,
+                         "a listener wrote into the store while it was told of a write",
+                         "Let it note what it wants to write, and write when the operation has returned.");
+    }
+}
+
+void TreeMetadataManager::State::write(MetadataManager& store, Batch const& batch,
+                                       ListenerList::Always always) {
+    WritingMark const mark(writing);
+    ListenerList::Report report(listeners, store, metadataRoot);
+    if (batch.empty()) {
+        report.tell({}, always);
+        return;
+    }
+    MetadataTree::Undo undo;
+    try {
+        auto const files = backend->write(batch);
+        undo = tree.apply(batch);
+        report.tell(files, always);
+        backend->keep();
+    } catch (...) {
+        backend->discard();
+        tree.undo(std::move(undo));
+        report.tellReverse();
+        throw;
+    }
+}
+
+TreeMetadataManager::TreeMetadataManager(std::unique_ptr<Backend> backend, Path metadataRoot)
+    : state_(std::make_unique<State>(std::move(backend), std::move(metadataRoot))) {
+}
+
+TreeMetadataManager::~TreeMetadataManager() = default;
+
+ReentrantReadWriteLock::LockGuard TreeMetadataManager::acquireReadLock() {
+    return state_->lock.readLock();
+}
+
+ReentrantReadWriteLock::LockGuard TreeMetadataManager::acquireWriteLock() {
+    return state_->lock.writeLock();
+}
+
+Path TreeMetadataManager::getMetadataRoot() {
+    return state_->metadataRoot;
+}
+
+std::unique_ptr<MetadataNode> TreeMetadataManager::getNode(Address const& path) {
+    auto const guard = state_->lock.readLock();
+    auto const node = state_->tree.node(path);
+    return node ? std::make_unique<MetadataNodeSpecification>(*node) : nullptr;
+}
+
+void TreeMetadataManager::setNodes(std::map<Address, std::shared_ptr<MetadataNode>>& nodes) {
+    auto const guard = state_->lock.writeLock();
+    state_->requireNotWriting();
+    Batch batch;
+    for (auto const& [address, node] : nodes) {
+        if (!node || address.depth() == 0) {
+            throw std::invalid_argument(node ? "a node can't be stored at the root of the metadata tree"
+                                             : "a null node was given to the metadata store");
+        }
+        auto const before = state_->tree.node(address);
+        if (!before || !isEqual(*before, *node)) {
+            batch.push_back({Change::Kind::Set, address, copyOf(*node)});
+        }
+    }
+    state_->write(*this, batch, ListenerList::Always::Addition);
+}
+
+bool TreeMetadataManager::hasNode(Address const& path) {
+    auto const guard = state_->lock.readLock();
+    return state_->tree.node(path) != nullptr;
+}
+
+std::vector<Address> TreeMetadataManager::getChildNodes(Address const& path) {
+    auto const guard = state_->lock.readLock();
+    return state_->tree.children(path);
+}
+
+void TreeMetadataManager::subscribe(std::weak_ptr<metadata::FileChangeRequestListener> listener) {
+    state_->listeners.add(std::move(listener));
+}
+
+void TreeMetadataManager::removeNodes(std::vector<Address>& paths) {
+    auto const guard = state_->lock.writeLock();
+    state_->requireNotWriting();
+    std::set<Address> all;
+    for (auto const& path : paths) {
+        if (path.depth() == 0) {
+            auto const top = state_->tree.children(path);
+            all.insert(top.begin(), top.end());
+        } else if (state_->tree.exists(path)) {
+            all.insert(path);
+        }
+    }
+    Batch batch;
+    for (auto const& address : all) {
+        if (batch.empty() || !address.isWithin(batch.back().address)) { // else it goes with the one above
+            batch.push_back({Change::Kind::Remove, address, nullptr});
+        }
+    }
+    state_->write(*this, batch, ListenerList::Always::Removal);
+}
+
+void TreeMetadataManager::createPaths(std::vector<Address>& paths) {
+    auto const guard = state_->lock.writeLock();
+    state_->requireNotWriting();
+    Batch batch;
+    for (auto const& path : paths) {
+        bool const comesAnyway = std::any_of(
+            batch.begin(), batch.end(), [&](Change const& change) { return change.address.isWithin(path); });
+        if (path.depth() > 0 && !comesAnyway && !state_->tree.exists(path)) {
+            batch.push_back({Change::Kind::Make, path, nullptr});
+        }
+    }
+    state_->write(*this, batch, ListenerList::Always::None);
+}
+
+bool TreeMetadataManager::pathExists(Address path) {
+    auto const guard = state_->lock.readLock();
+    return state_->tree.exists(path);
+}
+
+Changes TreeMetadataManager::takeOthersChanges() {
+    auto const guard = state_->lock.readLock();
+    return state_->othersChanges.take();
+}
+
+} // namespace project::stores
