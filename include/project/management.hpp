@@ -43,4 +43,5 @@
 #include "project/metadata/MetadataPathBuilder.hpp"
 #include "project/metadata/PathElement.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "project/metadata/TreeSchema.hpp"
 #include "project/references/FolderReference.hpp"

@@ -2,27 +2,29 @@
 
 #include <utility>
 
-#include "core/Schema.hpp"
 #include "entrypoints/EntryPointManagerBase.hpp"
 #include "files/FileManagerBase.hpp"
 #include "labels/LabelManagerBase.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/MetadataPathBuilder.hpp"
+#include "project/metadata/TreeSchema.hpp"
 #include "references/ProjectPathManagerBase.hpp"
 #include "references/ProjectReferenceManagerBase.hpp"
 
 namespace project::management {
 
+namespace schema = metadata::schema;
+
 using metadata::MetadataNodeSpecification;
 using metadata::MetadataPath;
 using metadata::MetadataPathBuilder;
 
-std::u16string const ProjectManagerBase::NAME_FIELD = u"Name";
-std::u16string const ProjectManagerBase::DESCRIPTION_FIELD = u"description";
-std::u16string const ProjectManagerBase::ROOT_METADATA = u"ProjectData";
-std::u16string const ProjectManagerBase::ROOT_EXTENSTION = u"Extensions";
-std::u16string const ProjectManagerBase::TYPE_EXTENSTION = u"Extension";
-std::u16string const ProjectManagerBase::INFORMATION = u"Information";
+std::u16string const ProjectManagerBase::NAME_FIELD = schema::information::nameKey;
+std::u16string const ProjectManagerBase::DESCRIPTION_FIELD = schema::information::descriptionKey;
+std::u16string const ProjectManagerBase::ROOT_METADATA = schema::information::nameLocation;
+std::u16string const ProjectManagerBase::ROOT_EXTENSTION = schema::information::extensionsLocation;
+std::u16string const ProjectManagerBase::TYPE_EXTENSTION = schema::information::descriptionType;
+std::u16string const ProjectManagerBase::INFORMATION = schema::information::descriptionLocation;
 
 ProjectManagerBase::ProjectManagerBase(Path projectRoot,
                                        std::shared_ptr<metadata::MetadataManager> metadataManager)
@@ -86,12 +88,12 @@ void ProjectManagerBase::create(std::u16string const& name) {
 }
 
 MetadataPath ProjectManagerBase::getRootNodePath() {
-    return MetadataPathBuilder().add(core::INFO_ELEMENT, ROOT_METADATA).build();
+    return MetadataPathBuilder().add(schema::information::nameType, ROOT_METADATA).build();
 }
 
 MetadataPath ProjectManagerBase::getDescriptionNodePath() {
     return MetadataPathBuilder()
-        .add(core::ROOT_ELEMENT, ROOT_EXTENSTION)
+        .add(schema::information::extensionsType, ROOT_EXTENSTION)
         .add(TYPE_EXTENSTION, INFORMATION)
         .build();
 }

@@ -1,10 +1,12 @@
 #include "entrypoints/EntryPointGroupBase.hpp"
 
-#include "entrypoints/Schema.hpp"
 #include "fl/i18n/MessageCatalog.hpp"
 #include "project/metadata/Messages.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 EntryPointGroupBase::EntryPointGroupBase(std::u16string const& name, std::u16string const& uuid)
     : EntryPointGroupDefinition(name, uuid) {
@@ -13,7 +15,7 @@ EntryPointGroupBase::EntryPointGroupBase(std::u16string const& name, std::u16str
 std::unique_ptr<EntryPointGroup> getDefaultGroup() {
     static std::u16string const name =
         fl::i18n::MessageCatalog::get_message(ZEPHRA::project::management::entryPointGroupDefaultName());
-    return std::make_unique<EntryPointGroupBase>(name, entrypoints::DEFAULT_GROUP_UUID);
+    return std::make_unique<EntryPointGroupBase>(name, schema::entrypoints::defaultGroupUUID);
 }
 
 } // namespace project::management

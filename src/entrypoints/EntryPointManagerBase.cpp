@@ -5,14 +5,16 @@
 
 #include "entrypoints/EntryPointBase.hpp"
 #include "entrypoints/EntryPointGroupBase.hpp"
-#include "entrypoints/Schema.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/MetadataPathBuilder.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
@@ -23,17 +25,20 @@ using ZEPHRA::project::management::FileNotInProject;
 namespace {
 
 MetadataPath entryPointsHead() {
-    return MetadataPathBuilder().add(entrypoints::ENTRY_POINTS, entrypoints::HEAD_LOCATION).build();
+    return MetadataPathBuilder().add(schema::entrypoints::entryPointsType, schema::rootLocation).build();
 }
 
 MetadataPath entryPointPath(std::u16string const& uuid) {
-    return MetadataPathBuilder().add(entryPointsHead()).add(entrypoints::ENTRY_POINT, uuid).build();
+    return MetadataPathBuilder()
+        .add(entryPointsHead())
+        .add(schema::entrypoints::entryPointType, uuid)
+        .build();
 }
 
 std::unique_ptr<EntryPointGroup>
 findGroup(std::map<std::u16string, std::unique_ptr<EntryPointGroup>> const& groups,
           std::u16string const& storedUUID) {
-    auto const found = groups.find(storedUUID.empty() ? entrypoints::DEFAULT_GROUP_UUID : storedUUID);
+    auto const found = groups.find(storedUUID.empty() ? schema::entrypoints::defaultGroupUUID : storedUUID);
     if (found == groups.end()) {
         // The group was deleted, or comes with another branch that is yet to be merged. The entry point goes
         // without until then; its stored UUID stays.
@@ -45,9 +50,9 @@ findGroup(std::map<std::u16string, std::unique_ptr<EntryPointGroup>> const& grou
 std::map<std::u16string, std::u16string> readExtensionData(MetadataNode const& node) {
     std::map<std::u16string, std::u16string> result;
     for (auto const& child : node.getChildren()) {
-        if (child->getType() == entrypoints::EXTENSION) {
-            result[child->get(entrypoints::EXTENSION_NAME_KEY)] =
-                child->get(entrypoints::EXTENSION_VALUE_KEY);
+        if (child->getType() == schema::entrypoints::extensionType) {
+            result[child->get(schema::entrypoints::extensionNameKey)] =
+                child->get(schema::entrypoints::extensionValueKey);
         }
     }
     return result;
@@ -55,10 +60,10 @@ std::map<std::u16string, std::u16string> readExtensionData(MetadataNode const& n
 
 void addExtensionData(MetadataNode& node, EntryPoint const& entryPoint) {
     for (auto const& key : entryPoint.getExtensionKeys()) {
-        auto* const child = node.addChild(entrypoints::EXTENSION);
-        child->put(entrypoints::EXTENSION_NAME_KEY, key);
+        auto* const child = node.addChild(schema::entrypoints::extensionType);
+        child->put(schema::entrypoints::extensionNameKey, key);
         if (auto const value = entryPoint.getExtensionData(key)) {
-            child->put(entrypoints::EXTENSION_VALUE_KEY, *value);
+            child->put(schema::entrypoints::extensionValueKey, *value);
         }
     }
 }
@@ -108,7 +113,7 @@ void EntryPointManagerBase::removeEntryPoint(Path file) {
     std::vector<MetadataPath> found;
     for (auto const& path : getEntryPointNodes()) {
         auto const node = metadataManager_->getNode(path);
-        if (node && node->get(entrypoints::FILE_KEY) == storedFile) {
+        if (node && node->get(schema::entrypoints::fileKey) == storedFile) {
             found.push_back(path);
         }
     }
@@ -143,7 +148,7 @@ std::u16string EntryPointManagerBase::findUUIDForFile(Path const& file) const {
     auto const storedFile = getStoredFile(file);
     for (auto const& path : getEntryPointNodes()) {
         auto const node = metadataManager_->getNode(path);
-        if (node && node->get(entrypoints::FILE_KEY) == storedFile) {
+        if (node && node->get(schema::entrypoints::fileKey) == storedFile) {
             return path.getLeaf().getLocation();
         }
     }
@@ -168,29 +173,31 @@ std::unique_ptr<EntryPoint> EntryPointManagerBase::readEntryPoint(MetadataPath c
     if (!node) {
         return nullptr;
     }
-    auto file = projectRoot_ / node->get(entrypoints::FILE_KEY);
+    auto file = projectRoot_ / node->get(schema::entrypoints::fileKey);
     // Asked before anything else is read, so that a damaged entry of a file that has left the project does
     // not spoil the whole list.
     if (!fileManager_->isFileInProject(file)) {
         return nullptr;
     }
     return std::make_unique<EntryPointBase>(
-        std::move(file), getFromName(node->get(entrypoints::TYPE_KEY)), node->get(entrypoints::NAME_KEY),
-        path.getLeaf().getLocation(), node->get(entrypoints::VISIBLE_KEY) != entrypoints::HIDDEN,
-        findGroup(groups, node->get(entrypoints::GROUP_UUID_KEY)), readExtensionData(*node));
+        std::move(file), getFromName(node->get(schema::entrypoints::typeKey)),
+        node->get(schema::entrypoints::nameKey), path.getLeaf().getLocation(),
+        node->get(schema::entrypoints::visibleKey) != schema::entrypoints::hidden,
+        findGroup(groups, node->get(schema::entrypoints::groupUUIDKey)), readExtensionData(*node));
 }
 
 void EntryPointManagerBase::writeEntryPoint(EntryPoint const& entryPoint) {
     auto const uuid = getUUIDToWrite(entryPoint);
-    auto const node = std::make_shared<MetadataNodeSpecification>(entrypoints::NODE);
-    node->put(entrypoints::FILE_KEY, getStoredFile(entryPoint.getFile()));
-    node->put(entrypoints::NAME_KEY, entryPoint.getName());
-    node->put(entrypoints::TYPE_KEY, toString(entryPoint.getType()));
-    node->put(entrypoints::VISIBLE_KEY, entryPoint.isVisible() ? entrypoints::VISIBLE : entrypoints::HIDDEN);
+    auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
+    node->put(schema::entrypoints::fileKey, getStoredFile(entryPoint.getFile()));
+    node->put(schema::entrypoints::nameKey, entryPoint.getName());
+    node->put(schema::entrypoints::typeKey, toString(entryPoint.getType()));
+    node->put(schema::entrypoints::visibleKey,
+              entryPoint.isVisible() ? schema::entrypoints::visible : schema::entrypoints::hidden);
     // Without a group nothing is stored, which reads as the default group: writing back an entry point whose
     // group was deleted brings it there.
     if (auto const group = entryPoint.getGroup()) {
-        node->put(entrypoints::GROUP_UUID_KEY, group->getUUID());
+        node->put(schema::entrypoints::groupUUIDKey, group->getUUID());
     }
     addExtensionData(*node, entryPoint);
     write(entryPointPath(uuid), node);

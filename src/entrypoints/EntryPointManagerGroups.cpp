@@ -5,13 +5,15 @@
 
 #include "entrypoints/EntryPointGroupBase.hpp"
 #include "entrypoints/EntryPointManagerBase.hpp"
-#include "entrypoints/Schema.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/MetadataPathBuilder.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using metadata::MetadataNodeSpecification;
 using metadata::MetadataPath;
@@ -22,11 +24,11 @@ using ZEPHRA::project::management::EntryPointGroupUUIDDefined;
 namespace {
 
 MetadataPath groupsHead() {
-    return MetadataPathBuilder().add(entrypoints::GROUPS, entrypoints::HEAD_LOCATION).build();
+    return MetadataPathBuilder().add(schema::entrypoints::groupsType, schema::rootLocation).build();
 }
 
 MetadataPath groupPath(std::u16string const& uuid) {
-    return MetadataPathBuilder().add(groupsHead()).add(entrypoints::GROUP, uuid).build();
+    return MetadataPathBuilder().add(groupsHead()).add(schema::entrypoints::groupType, uuid).build();
 }
 
 } // namespace
@@ -41,11 +43,11 @@ std::vector<std::unique_ptr<EntryPointGroup>> EntryPointManagerBase::getEntryPoi
     }
     for (auto const& path : metadataManager_->getChildNodes(head)) {
         auto const leaf = path.getLeaf();
-        if (leaf.getType() != entrypoints::GROUP) {
+        if (leaf.getType() != schema::entrypoints::groupType) {
             continue;
         }
         if (auto const node = metadataManager_->getNode(path)) {
-            auto const& name = node->get(entrypoints::GROUP_NAME_KEY);
+            auto const& name = node->get(schema::entrypoints::groupNameKey);
             result.push_back(std::make_unique<EntryPointGroupBase>(name, leaf.getLocation()));
         }
     }
@@ -58,7 +60,7 @@ void EntryPointManagerBase::deleteEntryPointGroup(EntryPointGroup const& group) 
     std::vector<MetadataPath> found;
     for (auto const& path : metadataManager_->getChildNodes(groupsHead())) {
         auto const leaf = path.getLeaf();
-        if (leaf.getType() == entrypoints::GROUP && leaf.getLocation() == uuid) {
+        if (leaf.getType() == schema::entrypoints::groupType && leaf.getLocation() == uuid) {
             found.push_back(path);
         }
     }
@@ -126,8 +128,8 @@ void EntryPointManagerBase::checkNewGroup(EntryPointGroup const& group) {
 }
 
 void EntryPointManagerBase::writeGroup(EntryPointGroup const& group) {
-    auto const node = std::make_shared<MetadataNodeSpecification>(entrypoints::NODE);
-    node->put(entrypoints::GROUP_NAME_KEY, group.getName());
+    auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
+    node->put(schema::entrypoints::groupNameKey, group.getName());
     write(groupPath(group.getUUID()), node);
 }
 

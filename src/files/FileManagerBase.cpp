@@ -4,14 +4,16 @@
 #include <utility>
 
 #include "files/PathSets.hpp"
-#include "files/Schema.hpp"
 #include "project/entrypoints/EntryPoint.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using metadata::MetadataNodeSpecification;
 using metadata::MetadataPath;
@@ -25,7 +27,7 @@ FileManagerBase::FileManagerBase(Path projectRoot, std::shared_ptr<metadata::Met
     : projectRoot_(std::move(projectRoot)),
       metadataManager_(std::move(metadataManager)),
       fileStore_(std::make_unique<PathLocalizedFileMetadataManager>(projectRoot_, metadataManager_,
-                                                                    files::FILE_LIST_SCOPE)) {
+                                                                    schema::files::fileListScope)) {
 }
 
 FileManagerBase::~FileManagerBase() = default;
@@ -54,7 +56,7 @@ void FileManagerBase::add(std::vector<Path> const& files) {
         // A new empty node also for what is in the project already: adding a file again drops its labels,
         // and those of the folders above it. Callers count on a file that was just added being bare.
         batch.emplace_hint(batch.end(), std::move(path),
-                           std::make_shared<MetadataNodeSpecification>(files::NODE));
+                           std::make_shared<MetadataNodeSpecification>(schema::nodeType));
     }
     fileStore_->setFileNodes(std::move(batch));
 }
@@ -118,7 +120,7 @@ void FileManagerBase::removeEntryPointsOf(std::vector<Path> const& files) {
 void FileManagerBase::removeFromEveryScope(std::vector<Path> const& files) {
     for (auto const& head : metadataManager_->getChildNodes(MetadataPath::root())) {
         auto const leaf = head.getLeaf();
-        if (leaf.getType() == files::FILES) {
+        if (leaf.getType() == schema::files::filesType) {
             getFileMetadataManagerFor(leaf.getLocation())->removeFileNodes(files);
         }
     }

@@ -5,13 +5,15 @@
 #include <utility>
 
 #include "files/FileManagerBase.hpp"
-#include "files/Schema.hpp"
 #include "project/files/FileLabel.hpp"
 #include "project/files/LabelIDSet.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
@@ -42,14 +44,14 @@ MetadataNode* findChild(MetadataNode const& node, std::u16string_view type, std:
 }
 
 MetadataNode* findCategory(MetadataNode const& fileNode, std::u16string const& uuid) {
-    return findChild(fileNode, files::CATEGORY, files::CATEGORY_UUID, uuid);
+    return findChild(fileNode, schema::files::categoryType, schema::files::categoryUUIDKey, uuid);
 }
 
 /// @return whether the label had data.
 bool removeLabelData(MetadataNode& dataNode, Label const& label) {
     bool removed = false;
     for (auto* const record : childrenOf(dataNode)) {
-        if (record->get(files::RECORD_UUID) == label.getUUID()) {
+        if (record->get(schema::files::recordUUIDKey) == label.getUUID()) {
             dataNode.removeChild(record);
             removed = true;
         }
@@ -64,7 +66,8 @@ bool removeLabel(MetadataNode& fileNode, MetadataNode& dataNode, Label const& la
     if (categoryNode == nullptr) {
         return false;
     }
-    auto* const labelNode = findChild(*categoryNode, files::LABEL, files::LABEL_UUID, label.getUUID());
+    auto* const labelNode =
+        findChild(*categoryNode, schema::files::labelType, schema::files::labelUUIDKey, label.getUUID());
     if (labelNode == nullptr) {
         return false;
     }
@@ -76,13 +79,13 @@ bool removeLabel(MetadataNode& fileNode, MetadataNode& dataNode, Label const& la
 }
 
 void appendLabelIDSets(MetadataNode const& categoryNode, std::vector<LabelIDSet>& result) {
-    auto const& categoryUUID = categoryNode.get(files::CATEGORY_UUID);
+    auto const& categoryUUID = categoryNode.get(schema::files::categoryUUIDKey);
     if (categoryUUID.empty()) {
         return;
     }
     for (auto const& child : categoryNode.getChildren()) {
-        auto const& labelUUID = child->get(files::LABEL_UUID);
-        if (child->getType() == files::LABEL && !labelUUID.empty()) {
+        auto const& labelUUID = child->get(schema::files::labelUUIDKey);
+        if (child->getType() == schema::files::labelType && !labelUUID.empty()) {
             result.emplace_back(categoryUUID, labelUUID);
         }
     }
@@ -128,12 +131,12 @@ std::vector<FileLabel> FileManagerBase::addLabelToNode(MetadataNode& node, Label
     auto const& category = label.getCategory();
     auto* categoryNode = findCategory(node, category.getUUID());
     if (categoryNode == nullptr) {
-        categoryNode = node.addChild(files::CATEGORY);
-        categoryNode->put(files::CATEGORY_UUID, category.getUUID());
+        categoryNode = node.addChild(schema::files::categoryType);
+        categoryNode->put(schema::files::categoryUUIDKey, category.getUUID());
     } else if (category.isSingleValued()) {
         displaced = takeCategoryLabels(category, path, *categoryNode);
     }
-    categoryNode->addChild(files::LABEL)->put(files::LABEL_UUID, label.getUUID());
+    categoryNode->addChild(schema::files::labelType)->put(schema::files::labelUUIDKey, label.getUUID());
     return displaced;
 }
 
@@ -141,10 +144,10 @@ std::vector<FileLabel> FileManagerBase::takeCategoryLabels(CategoryIdentifier co
                                                            Path const& path, MetadataNode& categoryNode) {
     std::vector<FileLabel> taken;
     for (auto* const child : childrenOf(categoryNode)) {
-        auto const uuid = child->get(files::LABEL_UUID);
+        auto const uuid = child->get(schema::files::labelUUIDKey);
         try {
             taken.emplace_back(category, labelManager_->getLabelByUUID(category, uuid), path,
-                               child->get(files::LABEL_VALUE));
+                               child->get(schema::files::labelValueKey));
         } catch (exception::ProjectException const&) {
             // A label that was deleted meanwhile can't be told of, and must not keep others from the file.
         }
@@ -178,7 +181,7 @@ std::vector<LabelIDSet> FileManagerBase::getLabelIDSets(Path const& path) {
     std::vector<LabelIDSet> result;
     auto const node = fileStore_->getFileNode(path);
     for (auto const& child : node->getChildren()) {
-        if (child->getType() == files::CATEGORY) {
+        if (child->getType() == schema::files::categoryType) {
             appendLabelIDSets(*child, result);
         }
     }
@@ -194,10 +197,10 @@ std::vector<FileLabel> FileManagerBase::getLabels(Path const& path) {
         auto const category = labelManager_->getCategoryByUUID(pair.getCategoryUUID());
         auto const label = labelManager_->getLabelByUUID(category, pair.getLabelUUID());
         auto const record = std::ranges::find_if(records, [&](auto const& candidate) {
-            return candidate->get(files::RECORD_UUID) == pair.getLabelUUID();
+            return candidate->get(schema::files::recordUUIDKey) == pair.getLabelUUID();
         });
         if (record != records.end()) {
-            result.emplace_back(category, label, path, (*record)->get(files::RECORD_VALUE));
+            result.emplace_back(category, label, path, (*record)->get(schema::files::recordValueKey));
         }
         // Once more without data, whether or not there was a record: so every label on the file has an entry
         // without data, by which callers count; who needs the data takes the first entry.
@@ -221,13 +224,14 @@ void FileManagerBase::removeCategory(std::vector<Path> const& files, CategoryIde
 }
 
 MetadataPath FileManagerBase::getLabelDataPath(Path const& path) const {
-    return fileStore_->toMetadataPath(path).child(PathElement(files::LABEL_DATA, files::LABEL_DATA_LOCATION));
+    return fileStore_->toMetadataPath(path).child(
+        PathElement(schema::files::labelDataType, schema::files::labelDataLocation));
 }
 
 std::unique_ptr<MetadataNode> FileManagerBase::getLabelDataNode(Path const& path) const {
     auto const address = getLabelDataPath(path);
     auto node = metadataManager_->pathExists(address) ? metadataManager_->getNode(address) : nullptr;
-    return node ? std::move(node) : std::make_unique<MetadataNodeSpecification>(files::NODE);
+    return node ? std::move(node) : std::make_unique<MetadataNodeSpecification>(schema::nodeType);
 }
 
 void FileManagerBase::writeLabelDataNodes(FileNodes const& nodes) {

@@ -2,13 +2,15 @@
 
 #include <utility>
 
-#include "files/Schema.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
@@ -100,14 +102,14 @@ std::vector<Path> PathLocalizedFileMetadataManager::getChildFiles(Path file) {
 }
 
 MetadataPath PathLocalizedFileMetadataManager::toMetadataPath(Path const& file) const {
-    auto result = MetadataPath::root().child(PathElement(files::FILES, scope_));
+    auto result = MetadataPath::root().child(PathElement(schema::files::filesType, scope_));
     if (file == root_) {
         return result;
     }
     auto const relative = metadata::getRelativePath(root_, file);
     for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
         auto const element = fl::filesystem::detail::extract_first_element(rest);
-        result = result.child(PathElement(files::FILE, std::u16string(element)));
+        result = result.child(PathElement(schema::files::fileType, std::u16string(element)));
     }
     return result;
 }
@@ -132,7 +134,7 @@ bool PathLocalizedFileMetadataManager::isFileMetadataPath(MetadataPath const& pa
         return false;
     }
     auto const& type = path.leaf().getType();
-    return type == files::FILES || type == files::FILE;
+    return type == schema::files::filesType || type == schema::files::fileType;
 }
 
 void PathLocalizedFileMetadataManager::addFileNode(
@@ -143,9 +145,9 @@ void PathLocalizedFileMetadataManager::addFileNode(
     // Files come in Path order, which is the order of their addresses, so the end is the place to try first.
     batch.insert_or_assign(batch.end(), path, std::move(node));
     if (metadata::is_directory(file)) {
-        auto marker = path.child(PathElement(files::DIR_SIGNIFIER, files::DIR_SIGNIFIER_LOCATION));
+        auto marker = path.child(PathElement(schema::files::markerType, schema::files::markerLocation));
         batch.insert_or_assign(batch.end(), std::move(marker),
-                               std::make_shared<MetadataNodeSpecification>(files::NODE));
+                               std::make_shared<MetadataNodeSpecification>(schema::nodeType));
     }
 }
 

@@ -2,15 +2,17 @@
 
 #include <utility>
 
-#include "labels/Schema.hpp"
 #include "project/files/FileLabel.hpp"
 #include "project/labels/Label.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/MetadataPathBuilder.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
@@ -27,26 +29,26 @@ using ZEPHRA::project::management::LabelExistsByName;
 namespace {
 
 MetadataPath getCategoriesPath() {
-    return MetadataPathBuilder().add(labels::CATEGORIES, labels::CATEGORIES_LOCATION).build();
+    return MetadataPathBuilder().add(schema::categories::categoriesType, schema::rootLocation).build();
 }
 
 MetadataPath getCategoryPath(std::u16string const& uuid) {
-    return MetadataPathBuilder().add(getCategoriesPath()).add(labels::CATEGORY, uuid).build();
+    return MetadataPathBuilder().add(getCategoriesPath()).add(schema::categories::categoryType, uuid).build();
 }
 
 MetadataPath getLabelPath(CategoryIdentifier const& category, std::u16string const& labelUUID) {
     return MetadataPathBuilder()
         .add(getCategoryPath(category.getUUID()))
-        .add(labels::LABEL, labelUUID)
+        .add(schema::categories::labelType, labelUUID)
         .build();
 }
 
 bool isLabelPath(MetadataPath const& path) {
-    return path.getLeaf().getType() == labels::LABEL;
+    return path.getLeaf().getType() == schema::categories::labelType;
 }
 
 std::u16string boolToFlag(bool value) {
-    return value ? labels::FLAG_TRUE : labels::FLAG_FALSE;
+    return value ? schema::categories::flagTrue : schema::categories::flagFalse;
 }
 
 // Both writability checks look at what the caller passed and not at the store: the caller's object is the
@@ -78,11 +80,11 @@ void LabelManagerBase::createCategory(CategoryIdentifier const& category) {
     requireCategoryNameFree(category.getName());
     // That the UUID is new is not checked: under the UUID of another category this one replaces it and keeps
     // its labels, the only way to give a category other flags.
-    auto const node = std::make_shared<MetadataNodeSpecification>(labels::NODE);
-    node->put(labels::CATEGORY_READ_ONLY, boolToFlag(category.isReadOnly()));
-    node->put(labels::CATEGORY_SINGLE_VALUED, boolToFlag(category.isSingleValued()));
-    node->put(labels::CATEGORY_NAME, category.getName());
-    node->put(labels::CATEGORY_DATA_TYPE, category.getDataType());
+    auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
+    node->put(schema::categories::categoryReadOnlyKey, boolToFlag(category.isReadOnly()));
+    node->put(schema::categories::categorySingleValuedKey, boolToFlag(category.isSingleValued()));
+    node->put(schema::categories::categoryNameKey, category.getName());
+    node->put(schema::categories::categoryDataTypeKey, category.getDataType());
     write(getCategoryPath(category.getUUID()), node);
 }
 
@@ -113,7 +115,7 @@ void LabelManagerBase::renameCategory(CategoryIdentifier const& category, std::u
     // The name is not checked, unlike in createCategory: files refer to the category by UUID, and clients
     // that exchange the names of two categories pass through a state in which both have the same one.
     auto const node = std::make_shared<MetadataNodeSpecification>(*stored);
-    node->put(labels::CATEGORY_NAME, newName);
+    node->put(schema::categories::categoryNameKey, newName);
     write(path, node);
 }
 
@@ -132,9 +134,9 @@ void LabelManagerBase::createLabel(CategoryIdentifier const& category, LabelIden
     auto const guard = metadataManager_->acquireWriteLock();
     // Read-only categories take new labels too: being read-only guards what is there.
     requireLabelNameFree(category, label.getName());
-    auto const node = std::make_shared<MetadataNodeSpecification>(labels::NODE);
-    node->put(labels::LABEL_NAME, label.getName());
-    node->put(labels::LABEL_READ_ONLY, labelTypeToString(label.isReadOnly()));
+    auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
+    node->put(schema::categories::labelNameKey, label.getName());
+    node->put(schema::categories::labelReadOnlyKey, labelTypeToString(label.isReadOnly()));
     write(getLabelPath(category, label.getUUID()), node);
 }
 
@@ -167,15 +169,16 @@ void LabelManagerBase::deleteLabel(CategoryIdentifier const& category, LabelIden
 }
 
 bool LabelManagerBase::isCategoryPath(MetadataPath const& path) {
-    return path.getLeaf().getType() == labels::CATEGORY && metadataManager_->hasNode(path);
+    return path.getLeaf().getType() == schema::categories::categoryType && metadataManager_->hasNode(path);
 }
 
 CategoryIdentifier LabelManagerBase::readCategory(MetadataPath const& path) {
     auto const node = metadataManager_->getNode(path);
-    CategoryDefinition category(node->get(labels::CATEGORY_NAME), path.getLeaf().getLocation());
-    category.setIsReadOnly(node->get(labels::CATEGORY_READ_ONLY) == labels::FLAG_TRUE)
-        .setIsSingleValued(node->get(labels::CATEGORY_SINGLE_VALUED) == labels::FLAG_TRUE)
-        .setDataType(node->get(labels::CATEGORY_DATA_TYPE));
+    CategoryDefinition category(node->get(schema::categories::categoryNameKey), path.getLeaf().getLocation());
+    category.setIsReadOnly(node->get(schema::categories::categoryReadOnlyKey) == schema::categories::flagTrue)
+        .setIsSingleValued(node->get(schema::categories::categorySingleValuedKey) ==
+                           schema::categories::flagTrue)
+        .setDataType(node->get(schema::categories::categoryDataTypeKey));
     return category;
 }
 
@@ -183,10 +186,10 @@ LabelIdentifier LabelManagerBase::readLabel(MetadataPath const& path) {
     std::unique_ptr<MetadataNode const> node = metadataManager_->getNode(path);
     if (!node) {
         // An address may exist without a node, and getLabelByUUID asks for no more: it reads as an empty one.
-        node = std::make_unique<MetadataNodeSpecification>(labels::NODE);
+        node = std::make_unique<MetadataNodeSpecification>(schema::nodeType);
     }
-    LabelDefinition label(node->get(labels::LABEL_NAME), path.getLeaf().getLocation());
-    label.setIsReadOnly(getLabelStateFromName(node->get(labels::LABEL_READ_ONLY)));
+    LabelDefinition label(node->get(schema::categories::labelNameKey), path.getLeaf().getLocation());
+    label.setIsReadOnly(getLabelStateFromName(node->get(schema::categories::labelReadOnlyKey)));
     return label;
 }
 

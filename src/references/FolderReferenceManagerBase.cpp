@@ -8,9 +8,11 @@
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/MetadataPathBuilder.hpp"
-#include "references/Schema.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
@@ -30,9 +32,9 @@ std::vector<Path> sortedLocations(std::vector<FolderReference> const& folders) {
 }
 
 std::shared_ptr<MetadataNode> makeNode(FolderReference const& reference) {
-    auto const node = std::make_shared<MetadataNodeSpecification>(references::NODE);
-    node->put(references::STORED_PATH_KEY, reference.getStoredPath());
-    node->put(references::TYPE_KEY, reference.getType());
+    auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
+    node->put(schema::references::storedPathKey, reference.getStoredPath());
+    node->put(schema::references::typeKey, reference.getType());
     return node;
 }
 
@@ -54,7 +56,7 @@ std::vector<FolderReference> FolderReferenceManagerBase::getReferences() const {
     }
     std::vector<FolderReference> result;
     for (auto const& path : metadataManager_->getChildNodes(head)) {
-        if (path.getLeaf().getType() != references::REFERENCE) {
+        if (path.getLeaf().getType() != schema::references::referenceType) {
             continue;
         }
         if (auto reference = readReference(path)) {
@@ -112,7 +114,7 @@ std::optional<FolderReference> FolderReferenceManagerBase::getRootReferenceFor(P
 MetadataPath FolderReferenceManagerBase::getReferencePath(FolderReference const& reference) const {
     return MetadataPathBuilder()
         .add(customization_->getRootPath())
-        .add(references::REFERENCE, reference.getUUID())
+        .add(schema::references::referenceType, reference.getUUID())
         .build();
 }
 
@@ -121,10 +123,10 @@ std::optional<FolderReference> FolderReferenceManagerBase::readReference(Metadat
     if (!node) {
         return std::nullopt;
     }
-    auto const& type = node->get(references::TYPE_KEY);
+    auto const& type = node->get(schema::references::typeKey);
     for (auto const& reader : customization_->getReaders()) {
         if (reader->canRead(type)) {
-            return reader->read(node->get(references::STORED_PATH_KEY), path.getLeaf().getLocation());
+            return reader->read(node->get(schema::references::storedPathKey), path.getLeaf().getLocation());
         }
     }
     return std::nullopt;

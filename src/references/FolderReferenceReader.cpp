@@ -2,7 +2,11 @@
 
 #include <utility>
 
+#include "project/metadata/TreeSchema.hpp"
+
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 namespace {
 
@@ -18,12 +22,12 @@ Path canonicalIfPossible(Path path) {
 } // namespace
 
 std::u16string const& absoluteReferenceType() {
-    static std::u16string const type = u"Absolute";
+    static std::u16string const type = schema::references::absolute;
     return type;
 }
 
 std::u16string const& relativeReferenceType() {
-    static std::u16string const type = u"Relative";
+    static std::u16string const type = schema::references::relative;
     return type;
 }
 

@@ -3,9 +3,11 @@
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataPathBuilder.hpp"
 #include "project/metadata/ProjectException.hpp"
-#include "references/Schema.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using ZEPHRA::project::management::DuplicateReferenceException;
 
@@ -18,7 +20,9 @@ void ProjectFolderReferenceCustomization::validateReference(FolderReference cons
 }
 
 metadata::MetadataPath ProjectFolderReferenceCustomization::getRootPath() const {
-    return metadata::MetadataPathBuilder().add(references::REFERENCES, references::HEAD_LOCATION).build();
+    return metadata::MetadataPathBuilder()
+        .add(schema::references::referencesType, schema::rootLocation)
+        .build();
 }
 
 void ProjectFolderReferenceCustomization::throwDuplicate(Path const& location) const {

@@ -3,9 +3,11 @@
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataPathBuilder.hpp"
 #include "project/metadata/ProjectException.hpp"
-#include "references/Schema.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::management {
+
+namespace schema = metadata::schema;
 
 using ZEPHRA::project::management::DuplicatePathEntryException;
 
@@ -20,7 +22,9 @@ void ProjectPathFolderReferenceCustomization::validateReference(FolderReference 
 }
 
 metadata::MetadataPath ProjectPathFolderReferenceCustomization::getRootPath() const {
-    return metadata::MetadataPathBuilder().add(references::PROJECT_PATH, references::HEAD_LOCATION).build();
+    return metadata::MetadataPathBuilder()
+        .add(schema::references::projectPathType, schema::rootLocation)
+        .build();
 }
 
 void ProjectPathFolderReferenceCustomization::throwDuplicate(Path const& location) const {
