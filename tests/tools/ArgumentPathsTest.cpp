@@ -1,8 +1,8 @@
-#include "ArgumentPaths.hpp"
+#include "cli/ArgumentPaths.hpp"
 
 #include <gtest/gtest.h>
 
-#include "Failure.hpp"
+#include "output/Failure.hpp"
 #include "support/TemporaryFolder.hpp"
 
 namespace projectctl {

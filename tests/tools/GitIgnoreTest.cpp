@@ -1,4 +1,4 @@
-#include "GitIgnore.hpp"
+#include "git/GitIgnore.hpp"
 
 #include "ToolTest.hpp"
 

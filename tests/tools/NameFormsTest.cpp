@@ -1,4 +1,4 @@
-#include "NameForms.hpp"
+#include "output/NameForms.hpp"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "PipedProcess.hpp"
+#include "git/PipedProcess.hpp"
 
 #include <csignal>
 #include <system_error>

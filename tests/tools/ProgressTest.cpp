@@ -1,4 +1,4 @@
-#include "Progress.hpp"
+#include "output/Progress.hpp"
 
 #include <array>
 #include <csignal>

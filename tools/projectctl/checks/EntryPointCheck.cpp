@@ -2,8 +2,8 @@
 
 #include <utility>
 
-#include "NameForms.hpp"
-#include "Schema.hpp"
+#include "output/NameForms.hpp"
+#include "project/Schema.hpp"
 #include "project/core/EntryPointManager.hpp"
 #include "project/entrypoints/EntryPointGroup.hpp"
 #include "project/metadata/MetadataFunctions.hpp"

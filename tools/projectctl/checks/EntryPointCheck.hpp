@@ -4,8 +4,8 @@
 #include <set>
 #include <string>
 
-#include "OpenProject.hpp"
 #include "checks/Finding.hpp"
+#include "project/OpenProject.hpp"
 
 namespace projectctl {
 

@@ -2,8 +2,8 @@
 
 #include <cstddef>
 
-#include "NameForms.hpp"
-#include "Schema.hpp"
+#include "output/NameForms.hpp"
+#include "project/Schema.hpp"
 
 namespace projectctl {
 

@@ -1,6 +1,6 @@
 #include "checks/NameCheck.hpp"
 
-#include "NameForms.hpp"
+#include "output/NameForms.hpp"
 
 namespace projectctl {
 

@@ -1,10 +1,10 @@
 #include "checks/Problems.hpp"
 
-#include "FileList.hpp"
 #include "checks/EntryPointCheck.hpp"
 #include "checks/LabelCheck.hpp"
 #include "checks/NameCheck.hpp"
 #include "checks/ReferenceCheck.hpp"
+#include "project/FileList.hpp"
 
 namespace projectctl {
 

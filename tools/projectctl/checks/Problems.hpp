@@ -1,7 +1,7 @@
 #pragma once
 
-#include "OpenProject.hpp"
 #include "checks/Finding.hpp"
+#include "project/OpenProject.hpp"
 
 namespace projectctl {
 

@@ -3,9 +3,9 @@
 #include <set>
 #include <utility>
 
-#include "NameForms.hpp"
-#include "ProjectFolder.hpp"
-#include "Schema.hpp"
+#include "output/NameForms.hpp"
+#include "project/ProjectFolder.hpp"
+#include "project/Schema.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/references/FolderReference.hpp"
 

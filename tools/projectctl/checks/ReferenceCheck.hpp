@@ -2,8 +2,8 @@
 
 #include <vector>
 
-#include "OpenProject.hpp"
 #include "checks/Finding.hpp"
+#include "project/OpenProject.hpp"
 #include "references/ReferenceLists.hpp"
 
 namespace projectctl {

@@ -4,12 +4,12 @@
 #include <string_view>
 #include <utility>
 
-#include "NameForms.hpp"
-#include "Schema.hpp"
 #include "checks/EntryPointCheck.hpp"
 #include "checks/NameCheck.hpp"
 #include "checks/ReferenceCheck.hpp"
 #include "fl/filesystem/SystemName.hpp"
+#include "output/NameForms.hpp"
+#include "project/Schema.hpp"
 #include "project/core/ProjectManagerBase.hpp"
 
 namespace projectctl {

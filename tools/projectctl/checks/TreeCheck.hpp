@@ -2,9 +2,9 @@
 
 #include <string>
 
-#include "OpenProject.hpp"
 #include "checks/Finding.hpp"
 #include "checks/LabelCheck.hpp"
+#include "project/OpenProject.hpp"
 
 namespace projectctl {
 

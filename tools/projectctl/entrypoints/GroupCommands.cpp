@@ -1,15 +1,15 @@
 #include <optional>
 #include <string>
 
-#include "CommandGroup.hpp"
-#include "CommandLine.hpp"
-#include "Commands.hpp"
-#include "Failure.hpp"
-#include "JsonRows.hpp"
-#include "NameForms.hpp"
-#include "Output.hpp"
-#include "ProjectCommand.hpp"
+#include "cli/CommandGroup.hpp"
+#include "cli/TextArguments.hpp"
+#include "entrypoints/Commands.hpp"
 #include "entrypoints/Groups.hpp"
+#include "output/Failure.hpp"
+#include "output/JsonRows.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
 
 namespace projectctl {
 

@@ -1,8 +1,8 @@
 #include "entrypoints/Groups.hpp"
 
-#include "Choice.hpp"
-#include "Failure.hpp"
-#include "NameForms.hpp"
+#include "cli/Choice.hpp"
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
 
 namespace projectctl {
 

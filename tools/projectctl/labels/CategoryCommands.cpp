@@ -2,15 +2,15 @@
 #include <optional>
 #include <string>
 
-#include "CommandGroup.hpp"
-#include "CommandLine.hpp"
-#include "Commands.hpp"
-#include "JsonRows.hpp"
-#include "NameForms.hpp"
-#include "Output.hpp"
-#include "Progress.hpp"
-#include "ProjectCommand.hpp"
+#include "cli/CommandGroup.hpp"
+#include "cli/TextArguments.hpp"
+#include "labels/Commands.hpp"
 #include "labels/LabelNames.hpp"
+#include "output/JsonRows.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "output/Progress.hpp"
+#include "project/ProjectCommand.hpp"
 
 namespace projectctl {
 

@@ -2,7 +2,7 @@
 
 #include <memory>
 
-#include "Command.hpp"
+#include "cli/Command.hpp"
 
 namespace projectctl {
 

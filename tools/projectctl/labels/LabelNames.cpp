@@ -2,9 +2,9 @@
 
 #include <vector>
 
-#include "Choice.hpp"
-#include "Failure.hpp"
-#include "NameForms.hpp"
+#include "cli/Choice.hpp"
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/ProjectException.hpp"
 

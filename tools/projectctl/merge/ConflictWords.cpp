@@ -3,8 +3,8 @@
 #include <optional>
 #include <string_view>
 
-#include "NameForms.hpp"
-#include "Schema.hpp"
+#include "output/NameForms.hpp"
+#include "project/Schema.hpp"
 
 namespace projectctl {
 

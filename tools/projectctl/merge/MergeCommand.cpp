@@ -4,12 +4,12 @@
 #include <optional>
 #include <string>
 
-#include "CommandLine.hpp"
-#include "Commands.hpp"
-#include "Failure.hpp"
-#include "NameForms.hpp"
-#include "Output.hpp"
+#include "cli/TextArguments.hpp"
+#include "merge/Commands.hpp"
 #include "merge/ConflictWords.hpp"
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
 #include "project/stores/TextMerge.hpp"
 
 namespace projectctl {

@@ -6,13 +6,13 @@
 
 #include <unistd.h>
 
-#include "Commands.hpp"
-#include "Failure.hpp"
-#include "GitCommand.hpp"
-#include "NameForms.hpp"
-#include "Output.hpp"
-#include "ProjectCommand.hpp"
+#include "git/GitCommand.hpp"
+#include "merge/Commands.hpp"
 #include "merge/ConflictWords.hpp"
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
 #include "project/stores/TextMerge.hpp"
 
 namespace projectctl {

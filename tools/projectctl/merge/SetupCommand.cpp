@@ -1,8 +1,10 @@
-#include "Commands.hpp"
-#include "Failure.hpp"
-#include "Output.hpp"
-#include "ProjectFolder.hpp"
-#include "merge/MergeSetup.hpp"
+#include "cli/WorkingFolder.hpp"
+#include "git/MergeSetup.hpp"
+#include "merge/Commands.hpp"
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectFolder.hpp"
 
 namespace projectctl {
 

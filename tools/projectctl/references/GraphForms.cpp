@@ -3,10 +3,10 @@
 #include <set>
 #include <string_view>
 
-#include "JsonRows.hpp"
-#include "NameForms.hpp"
-#include "Output.hpp"
 #include "fl/i18n/Utf8.hpp"
+#include "output/JsonRows.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
 
 namespace projectctl {
 

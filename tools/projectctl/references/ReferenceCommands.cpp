@@ -3,20 +3,20 @@
 #include <optional>
 #include <vector>
 
-#include "ArgumentPaths.hpp"
-#include "Choice.hpp"
-#include "CommandGroup.hpp"
-#include "CommandLine.hpp"
-#include "Commands.hpp"
-#include "Failure.hpp"
-#include "JsonRows.hpp"
-#include "NameForms.hpp"
-#include "Output.hpp"
-#include "ProjectCommand.hpp"
-#include "ProjectFolder.hpp"
-#include "Schema.hpp"
+#include "cli/ArgumentPaths.hpp"
+#include "cli/Choice.hpp"
+#include "cli/CommandGroup.hpp"
+#include "cli/TextArguments.hpp"
+#include "cli/WorkingFolder.hpp"
+#include "output/Failure.hpp"
+#include "output/JsonRows.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
+#include "project/Schema.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/references/FolderReference.hpp"
+#include "references/Commands.hpp"
 #include "references/ReferenceLists.hpp"
 
 namespace projectctl {

@@ -4,8 +4,8 @@
 #include <exception>
 #include <functional>
 
-#include "OpenProject.hpp"
-#include "ProjectFolder.hpp"
+#include "project/OpenProject.hpp"
+#include "project/ProjectFolder.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/references/FolderReference.hpp"
 #include "references/ReferenceLists.hpp"

@@ -2,7 +2,7 @@
 
 #include <exception>
 
-#include "Schema.hpp"
+#include "project/Schema.hpp"
 #include "project/core/ProjectPathManager.hpp"
 #include "project/core/ProjectReferenceManager.hpp"
 

@@ -3,7 +3,7 @@
 #include <string>
 #include <string_view>
 
-#include "OpenProject.hpp"
+#include "project/OpenProject.hpp"
 #include "project/core/FolderReferenceManager.hpp"
 
 namespace projectctl {

@@ -1,7 +1,7 @@
-#include "CommandLine.hpp"
-#include "Commands.hpp"
-#include "OpenProject.hpp"
-#include "ProjectFolder.hpp"
+#include "cli/WorkingFolder.hpp"
+#include "project/OpenProject.hpp"
+#include "project/ProjectFolder.hpp"
+#include "references/Commands.hpp"
 #include "references/GraphForms.hpp"
 #include "references/ReferenceGraph.hpp"
 

@@ -1,0 +1,88 @@
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "checks/Commands.hpp"
+#include "checks/TreeCheck.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "output/Progress.hpp"
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::stores::Fault;
+
+/// Looks for faults in the project's text and in what it says, and tells all of them.
+class CheckCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand("check", "Look through the whole project for faults");
+        app->add_flag("--repair", repair_,
+                      "First set damaged lines aside into a file of their own, and write the rest anew");
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        if (repair_) {
+            repair(project);
+        }
+        Progress progress("Looking through the project");
+        std::size_t faults = 0;
+        auto const file = project.textFile();
+        auto const faultsOfText = project.text().check();
+        for (auto const& fault : faultsOfText) {
+            ++faults;
+            auto const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
+            tell(file + line + ": " + fault.problem);
+        }
+        for (auto const& finding : TreeCheck(project).run()) {
+            bool const isFault = finding.weight == Finding::Weight::Fault;
+            faults += isFault ? 1 : 0;
+            tell(file + (isFault ? ": " : ": note: ") + finding.text);
+        }
+        output().say(faults == 0 ? "The project has no faults." : adviceFor(faultsOfText));
+        return faults == 0 ? 0 : 1;
+    }
+
+private:
+    static void repair(OpenProject& project) {
+        project.shield().raise();
+        auto const aside = project.text().repair();
+        if (!aside.empty()) {
+            project.stageLater();
+            tell("what was damaged stands in " + project.storeFile(aside) + " now");
+        }
+    }
+
+    static char const* adviceFor(std::vector<Fault> const& faults) {
+        auto const has = [&faults](Fault::Kind kind) {
+            return std::ranges::find(faults, kind, &Fault::kind) != faults.end();
+        };
+        if (has(Fault::Kind::Conflict)) {
+            return "'projectctl resolve' settles what a merge left.";
+        }
+        if (has(Fault::Kind::Damage)) {
+            return "'projectctl check --repair' sets damaged lines aside.";
+        }
+        if (has(Fault::Kind::Irregular) || has(Fault::Kind::TornTail)) {
+            return "'projectctl tidy' puts right what is only irregular or torn.";
+        }
+        return "What the lines say is to be put right in an editor.";
+    }
+
+    /// One line, whatever is in it.
+    static void tell(std::string const& text) { output().text() += withoutControls(text, false) + '\n'; }
+
+    bool repair_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeCheckCommand() {
+    return std::make_unique<CheckCommand>();
+}
+
+} // namespace projectctl

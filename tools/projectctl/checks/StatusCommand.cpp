@@ -1,0 +1,143 @@
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "checks/Commands.hpp"
+#include "checks/Problems.hpp"
+#include "checks/StatusScan.hpp"
+#include "cli/Settings.hpp"
+#include "git/GitIgnore.hpp"
+#include "git/MergeSetup.hpp"
+#include "output/JsonRows.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "output/Progress.hpp"
+#include "project/ProjectCommand.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// Tells in what the project and the disk differ.
+class StatusCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand(
+            "status",
+            "Tell what is new on disk and not in the project, what is in the project and gone, and what "
+            "in the project refers to something that is gone");
+        app->add_flag("--json", json_, "As a JSON object with the arrays \"new\", \"gone\" and \"problems\"");
+        app->add_flag("--gitignore", gitignore_, "Leave out what git ignores");
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        root_ = project.root();
+        project.warnOfDamage();
+        auto const scan = compare(project);
+        for (auto const& line : scan.unreadable()) {
+            printError("warning: " + line);
+        }
+        Differences found{gitignore_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
+                          findProblems(project)};
+        if (settings().sourceControl && lookForMergeSetup(root_) == MergeSetup::Missing) {
+            found.problems.push_back(Finding::note("git merges the project's text line by line: 'projectctl "
+                                                   "setup' has it done by what the text says"));
+        }
+        json_ ? writeJson(found) : writeLines(found);
+        return 0;
+    }
+
+private:
+    using Files = std::vector<StatusScan::File>;
+
+    struct Differences {
+        Files added;
+        Files gone;
+        Findings problems;
+    };
+
+    static StatusScan compare(OpenProject& project) {
+        Progress progress("Comparing the project with the disk");
+        StatusScan scan(project);
+        scan.run(progress);
+        return scan;
+    }
+
+    Files withoutIgnored(Files const& files) const {
+        std::vector<Path> paths;
+        for (auto const& file : files) {
+            paths.push_back(file.path);
+        }
+        auto const kept = withoutIgnoredByGit(root_, std::move(paths));
+        Files result;
+        for (auto const& file : files) {
+            if (result.size() < kept.size() && file.path == kept[result.size()]) { // they keep their order
+                result.push_back(file);
+            }
+        }
+        return result;
+    }
+
+    void writeLines(Differences const& found) const {
+        writeLines("new  ", found.added, true);
+        writeLines("gone ", found.gone, false);
+        for (auto const& problem : found.problems) {
+            bool const isFault = problem.weight == Finding::Weight::Fault;
+            output().text() += (isFault ? "bad  " : "note ") + withoutControls(problem.text, false) + '\n';
+        }
+        if (found.added.empty() && found.gone.empty() && found.problems.empty()) {
+            output().say("The project and the disk hold the same files.");
+        }
+    }
+
+    /// @param standsForContents whether a folder is shown alone instead of what is in it.
+    void writeLines(char const* word, Files const& files, bool standsForContents) const {
+        for (auto const& file : files) {
+            std::u16string path = project::metadata::getRelativePath(root_, file.path);
+            path += standsForContents && file.kind == Kind::Folder ? u"/" : u"";
+            output().text() += word;
+            output().name(path);
+            output().text() += '\n';
+            output().settle();
+        }
+    }
+
+    void writeJson(Differences const& found) const {
+        output().text() += "{\"new\": ";
+        writeJson(found.added);
+        output().text() += ",\n\"gone\": ";
+        writeJson(found.gone);
+        output().text() += ",\n\"problems\": ";
+        JsonRows rows;
+        for (auto const& problem : found.problems) {
+            rows.begin();
+            rows.addFlag("fault", problem.weight == Finding::Weight::Fault);
+            rows.addText("text", textOf(problem.text));
+        }
+        rows.finish();
+        output().text() += "}\n";
+    }
+
+    void writeJson(Files const& files) const {
+        JsonRows rows;
+        for (auto const& file : files) {
+            rows.begin();
+            rows.addFile(project::metadata::getRelativePath(root_, file.path), file.kind);
+        }
+        rows.finish();
+    }
+
+    Path root_;
+    bool json_ = false;
+    bool gitignore_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeStatusCommand() {
+    return std::make_unique<StatusCommand>();
+}
+
+} // namespace projectctl

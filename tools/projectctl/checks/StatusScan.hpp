@@ -1,0 +1,54 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "files/DiskFolder.hpp"
+#include "output/Progress.hpp"
+#include "project/FileList.hpp"
+#include "project/OpenProject.hpp"
+
+namespace projectctl {
+
+/// Compares the file list with the disk, folder by folder.
+class StatusScan {
+public:
+    struct File {
+        Path path; ///< absolute
+        Kind kind;
+    };
+
+    explicit StatusScan(OpenProject& project);
+
+    /// To be called once.
+    void run(Progress& progress);
+
+    /// On disk and not in the project. A folder stands for everything below it, none of which is in the
+    /// project either.
+    std::vector<File> const& added() const noexcept { return added_; }
+
+    /// In the project and gone from the disk.
+    std::vector<File> const& gone() const noexcept { return gone_; }
+
+    /// One line for each folder that could not be looked into.
+    std::vector<std::string> const& unreadable() const noexcept { return unreadable_; }
+
+private:
+    using Address = project::metadata::MetadataPath;
+
+    void compare(Path const& folder, Address const& address, project::stores::Children const& listed,
+                 Progress& progress);
+    void compareListed(Path const& path, Address const& address);
+    void lookFor(Path const& folder, Address const& address, project::stores::Child const& file);
+    void takeAdded(Path const& folder, DiskEntry const& entry);
+    void takeGone(Path const& path);
+
+    Path root_;
+    FileList list_;
+    std::size_t seen_ = 0;
+    std::vector<File> added_;
+    std::vector<File> gone_;
+    std::vector<std::string> unreadable_;
+};
+
+} // namespace projectctl

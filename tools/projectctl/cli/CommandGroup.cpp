@@ -1,0 +1,30 @@
+#include "cli/CommandGroup.hpp"
+
+#include <algorithm>
+#include <cstddef>
+#include <utility>
+
+namespace projectctl {
+
+CommandGroup::CommandGroup(std::string name, std::string description,
+                           std::vector<std::unique_ptr<Command>> members)
+    : name_(std::move(name)), description_(std::move(description)), members_(std::move(members)) {
+}
+
+CLI::App* CommandGroup::declare(CLI::App& tool) {
+    auto* const app = tool.add_subcommand(name_, description_);
+    app->require_subcommand(1);
+    declared_.reserve(members_.size());
+    for (auto const& member : members_) {
+        declared_.push_back(member->declare(*app));
+    }
+    return app;
+}
+
+int CommandGroup::run() {
+    auto const called =
+        std::find_if(declared_.begin(), declared_.end(), [](auto* app) { return app->parsed(); });
+    return members_[static_cast<std::size_t>(called - declared_.begin())]->run();
+}
+
+} // namespace projectctl

@@ -1,0 +1,27 @@
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "cli/Command.hpp"
+
+namespace projectctl {
+
+/// Commands about one thing, called by its name and then their own: `projectctl category rename`.
+class CommandGroup : public Command {
+public:
+    /// @param members in the order in which help shows them.
+    CommandGroup(std::string name, std::string description, std::vector<std::unique_ptr<Command>> members);
+
+    CLI::App* declare(CLI::App& tool) override;
+    int run() override;
+
+private:
+    std::string name_;
+    std::string description_;
+    std::vector<std::unique_ptr<Command>> members_;
+    std::vector<CLI::App*> declared_; ///< one for each member
+};
+
+} // namespace projectctl

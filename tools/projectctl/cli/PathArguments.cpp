@@ -1,0 +1,39 @@
+#include "cli/PathArguments.hpp"
+
+#include <iostream>
+
+#include "cli/ArgumentPaths.hpp"
+#include "cli/TextArguments.hpp"
+#include "cli/WorkingFolder.hpp"
+
+namespace projectctl {
+
+void PathArguments::declare(CLI::App& app, std::string const& description) {
+    takeTexts(app, "PATH", arguments_, description + "; - for the lines of standard input");
+    app.add_flag("-0,--null", null_, "Read paths from standard input too, with a zero byte behind each");
+    app.final_callback([this] {
+        if (arguments_.empty() && !null_) {
+            throw CLI::RequiredError("PATH");
+        }
+    });
+}
+
+std::vector<Path> PathArguments::read() const {
+    ArgumentPaths absolute(workingFolder());
+    std::vector<Path> result;
+    bool readsInput = null_;
+    for (auto const& argument : arguments_) {
+        if (argument == "-") {
+            readsInput = true;
+        } else {
+            result.push_back(absolute.absolute(argument));
+        }
+    }
+    std::cin.sync_with_stdio(false);
+    for (std::string line; readsInput && std::getline(std::cin, line, null_ ? '\0' : '\n');) {
+        result.push_back(absolute.absolute(line));
+    }
+    return result;
+}
+
+} // namespace projectctl

@@ -1,0 +1,74 @@
+#include "cli/TextArguments.hpp"
+
+#include <algorithm>
+#include <cstddef>
+#include <iterator>
+#include <span>
+#include <string_view>
+
+namespace projectctl {
+
+namespace {
+
+// Arguments are bytes of names, and the parser has views on some: it takes "[a,b]" apart as a list, "++" ends
+// a command, and what follows "--" is an argument only if none came before. A mark in front keeps it off
+// them.
+constexpr char mark = '\x01';
+
+bool isSpecial(std::string_view text) {
+    return text.starts_with('[') || text == "++";
+}
+
+/// What is left without the marks that the argument had to begin with.
+std::string_view behindMarks(std::string_view text) {
+    return text.substr(std::min(text.find_first_not_of(mark), text.size()));
+}
+
+std::string unmarked(std::string const& argument) {
+    auto const rest = behindMarks(argument);
+    bool const isMarked = rest.size() < argument.size() && (isSpecial(rest) || rest.starts_with('-'));
+    return isMarked ? argument.substr(1) : argument;
+}
+
+} // namespace
+
+CLI::Option* takeText(CLI::App& app, std::string const& name, std::optional<std::string>& value,
+                      std::string const& description) {
+    auto const take = [&value](CLI::results_t const& given) {
+        value = unmarked(given.front());
+        return true;
+    };
+    return app.add_option(name, take, description);
+}
+
+CLI::Option* takeTexts(CLI::App& app, std::string const& name, std::vector<std::string>& values,
+                       std::string const& description) {
+    auto const take = [&values](CLI::results_t const& given) {
+        std::ranges::transform(given, std::back_inserter(values), unmarked);
+        return true;
+    };
+    return app.add_option(name, take, description)->expected(CLI::detail::expected_max_vector_size);
+}
+
+std::vector<std::string> markedArguments(int argc, char const* const* argv) {
+    std::vector<std::string> result;
+    bool optionsEnded = false;
+    for (std::string_view const argument : std::span(argv, static_cast<std::size_t>(argc)).subspan(1)) {
+        if (argument == "--" && !optionsEnded) {
+            optionsEnded = true;
+            continue;
+        }
+        auto const rest = behindMarks(argument);
+        bool const isDashed = rest.starts_with('-') && (optionsEnded || rest.size() < argument.size());
+        result.push_back((isSpecial(rest) || isDashed ? std::string(1, mark) : std::string()) +
+                         std::string(argument));
+    }
+    return result;
+}
+
+std::string withoutMarks(std::string text) {
+    std::erase(text, mark);
+    return text;
+}
+
+} // namespace projectctl

@@ -1,0 +1,19 @@
+#include "cli/WorkingFolder.hpp"
+
+#include <filesystem>
+#include <system_error>
+
+#include "output/Failure.hpp"
+
+namespace projectctl {
+
+fl::filesystem::Path workingFolder() {
+    std::error_code error;
+    auto const folder = std::filesystem::current_path(error);
+    if (error) {
+        throw Failure("the working folder cannot be found: " + error.message());
+    }
+    return fl::filesystem::fromSystem(folder);
+}
+
+} // namespace projectctl

@@ -1,0 +1,121 @@
+#include "files/DiskFolder.hpp"
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <memory>
+#include <optional>
+#include <string_view>
+#include <system_error>
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <sys/stat.h>
+
+#include "fl/filesystem/SystemName.hpp"
+#include "output/NameForms.hpp"
+
+namespace projectctl {
+
+using fl::filesystem::SystemName;
+
+namespace {
+
+struct CloseFolder {
+    void operator()(DIR* folder) const noexcept { closedir(folder); }
+};
+
+using FolderHandle = std::unique_ptr<DIR, CloseFolder>;
+
+/// What a folder of one of these names is, no project holds.
+constexpr std::array<std::string_view, 8> foldersOfOthers{".git",   ".hg", ".svn", ".bzr",
+                                                          "_darcs", "CVS", ".jj",  ".projectdata"};
+
+/// The kind as the file system noted it beside the name; a file system that does not is asked.
+unsigned char noteOf(DIR* folder, dirent const& entry) {
+    struct stat status {};
+
+    if (entry.d_type != DT_UNKNOWN) {
+        return entry.d_type;
+    }
+    if (fstatat(dirfd(folder), &entry.d_name[0], &status, AT_SYMLINK_NOFOLLOW) != 0) {
+        return DT_UNKNOWN;
+    }
+    return static_cast<unsigned char>(IFTODT(status.st_mode));
+}
+
+/// @return empty for what a project does not hold.
+std::optional<Kind> kindOf(std::string_view name, unsigned char note) {
+    bool const ofOthers = std::ranges::find(foldersOfOthers, name) != foldersOfOthers.end();
+    switch (note) {
+    case DT_DIR:
+        return name == "." || name == ".." || ofOthers ? std::nullopt : std::optional(Kind::Folder);
+    case DT_REG: // in a linked working tree or a submodule, .git is a file
+        return name == ".git" ? std::nullopt : std::optional(Kind::File);
+    case DT_LNK:
+        return Kind::File;
+    default:
+        return std::nullopt;
+    }
+}
+
+std::u16string toText(std::string_view name) {
+    if (std::ranges::all_of(name, [](char byte) { return static_cast<unsigned char>(byte) < 0x80; })) {
+        return {name.begin(), name.end()};
+    }
+    return fl::filesystem::fromSystem(std::filesystem::path(name)).native();
+}
+
+[[noreturn]] void fail(Path const& folder, int error) {
+    throw std::system_error(error, std::generic_category(),
+                            "the folder \"" + shown(folder) + "\" cannot be read");
+}
+
+} // namespace
+
+std::vector<DiskEntry> readDiskFolder(Path const& folder) {
+    SystemName const name(folder);
+    FolderHandle const handle(name.get() != nullptr ? opendir(name.get()) : nullptr);
+    if (!handle) {
+        fail(folder, name.get() != nullptr ? errno : ENAMETOOLONG);
+    }
+    std::vector<DiskEntry> result;
+    errno = 0;
+    while (auto const* entry = readdir(handle.get())) { // NOLINT(concurrency-mt-unsafe): each its own folder
+        std::string_view const found = &entry->d_name[0];
+        if (auto const kind = kindOf(found, noteOf(handle.get(), *entry))) {
+            result.push_back({toText(found), *kind});
+        }
+        errno = 0;
+    }
+    if (errno != 0) {
+        fail(folder, errno);
+    }
+    std::ranges::sort(result, {}, &DiskEntry::name);
+    return result;
+}
+
+bool isOnDisk(Path const& path) {
+    SystemName const name(path);
+
+    struct stat status {};
+
+    return name.get() != nullptr && (lstat(name.get(), &status) == 0 ||
+                                     (errno != ENOENT && errno != ENOTDIR && errno != ENAMETOOLONG));
+}
+
+bool isOnDisk(Path const& folder, std::u16string const& name) {
+    bool const leadsElsewhere =
+        name.empty() || name == u"." || name == u".." || name.find(u'/') != std::u16string::npos;
+    return !leadsElsewhere && isOnDisk(folder / Path(name));
+}
+
+bool isFolderItself(Path const& path) {
+    SystemName const name(path);
+
+    struct stat status {};
+
+    return name.get() != nullptr && lstat(name.get(), &status) == 0 && S_ISDIR(status.st_mode);
+}
+
+} // namespace projectctl

@@ -1,0 +1,17 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "fl/filesystem/Path.hpp"
+#include "git/PipedProcess.hpp"
+
+namespace projectctl {
+
+/// Runs git in a folder, to its end.
+/// @throws std::system_error when it cannot be started; no_such_file_or_directory when it is not installed.
+ProcessResult runGit(fl::filesystem::Path const& folder, std::vector<std::string> const& arguments,
+                     std::string_view input = {});
+
+} // namespace projectctl

@@ -1,0 +1,185 @@
+#include "git/PipedProcess.hpp"
+
+#include <array>
+#include <cerrno>
+#include <csignal>
+#include <cstddef>
+#include <system_error>
+
+#include <fcntl.h>
+#include <poll.h>
+#include <spawn.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+namespace projectctl {
+
+namespace {
+
+[[noreturn]] void fail(int error, std::string const& what) {
+    throw std::system_error(error, std::generic_category(), what);
+}
+
+/// One end of a pipe, closed when the object goes.
+class Descriptor {
+public:
+    explicit Descriptor(int value = -1) : value_(value) {}
+
+    Descriptor(Descriptor&& other) noexcept : value_(other.value_) { other.value_ = -1; }
+
+    Descriptor(Descriptor const&) = delete;
+    Descriptor& operator=(Descriptor const&) = delete;
+    Descriptor& operator=(Descriptor&&) = delete;
+
+    ~Descriptor() { close(); }
+
+    int get() const noexcept { return value_; }
+
+    void close() noexcept {
+        if (value_ >= 0) {
+            ::close(value_);
+            value_ = -1;
+        }
+    }
+
+private:
+    int value_;
+};
+
+struct Pipe {
+    Descriptor readEnd;
+    Descriptor writeEnd;
+};
+
+Pipe makePipe() {
+    std::array<int, 2> ends{};
+    if (pipe2(ends.data(), O_CLOEXEC) != 0) {
+        fail(errno, "no pipe can be made");
+    }
+    return {Descriptor(ends[0]), Descriptor(ends[1])};
+}
+
+/// What the child finds: its three streams, and signals as a program expects them.
+class SpawnSettings {
+public:
+    SpawnSettings(int input, int output, int errors) {
+        posix_spawn_file_actions_init(&actions_);
+        posix_spawn_file_actions_adddup2(&actions_, input, STDIN_FILENO);
+        posix_spawn_file_actions_adddup2(&actions_, output, STDOUT_FILENO);
+        posix_spawn_file_actions_adddup2(&actions_, errors, STDERR_FILENO);
+        posix_spawnattr_init(&attributes_);
+        sigset_t signals;
+        sigemptyset(&signals);
+        posix_spawnattr_setsigmask(&attributes_, &signals);
+        sigaddset(&signals, SIGPIPE);
+        sigaddset(&signals, SIGXFSZ);
+        posix_spawnattr_setsigdefault(&attributes_, &signals);
+        posix_spawnattr_setflags(&attributes_, POSIX_SPAWN_SETSIGDEF | POSIX_SPAWN_SETSIGMASK);
+    }
+
+    ~SpawnSettings() {
+        posix_spawn_file_actions_destroy(&actions_);
+        posix_spawnattr_destroy(&attributes_);
+    }
+
+    SpawnSettings(SpawnSettings const&) = delete;
+    SpawnSettings& operator=(SpawnSettings const&) = delete;
+
+    pid_t spawn(std::vector<std::string> const& command) const {
+        std::vector<char*> arguments;
+        arguments.reserve(command.size() + 1);
+        for (auto const& argument : command) {
+            arguments.push_back(const_cast<char*>(argument.c_str()));
+        }
+        arguments.push_back(nullptr);
+        pid_t child = 0;
+        int const error =
+            posix_spawnp(&child, arguments.front(), &actions_, &attributes_, arguments.data(), environ);
+        if (error != 0) {
+            fail(error, "\"" + command.front() + "\" cannot be started");
+        }
+        return child;
+    }
+
+private:
+    posix_spawn_file_actions_t actions_{};
+    posix_spawnattr_t attributes_{};
+};
+
+/// Writes what the pipe takes now. Closes it when all is written, or when nobody reads it any more.
+void feed(Descriptor& pipe, std::string_view& input) {
+    auto const written = input.empty() ? 0 : write(pipe.get(), input.data(), input.size());
+    if (written > 0) {
+        input.remove_prefix(static_cast<std::size_t>(written));
+    }
+    bool const failed = written < 0 && errno != EAGAIN && errno != EINTR;
+    if (failed || input.empty()) {
+        pipe.close();
+    }
+}
+
+/// Reads what the pipe has now. Closes it at its end.
+void drain(Descriptor& pipe, std::string& to) {
+    std::array<char, 65536> piece; // NOLINT(cppcoreguidelines-pro-type-member-init): read fills it
+    auto const got = read(pipe.get(), piece.data(), piece.size());
+    if (got > 0) {
+        to.append(piece.data(), static_cast<std::size_t>(got));
+    } else if (got == 0 || errno != EINTR) {
+        pipe.close();
+    }
+}
+
+void exchange(Descriptor& toChild, std::string_view input, Descriptor& output, Descriptor& errors,
+              ProcessResult& result) {
+    while (output.get() >= 0 || errors.get() >= 0) {
+        // A closed one is negative, which poll passes over.
+        std::array<pollfd, 3> waiting{{{toChild.get(), POLLOUT, 0}, //
+                                       {output.get(), POLLIN, 0},
+                                       {errors.get(), POLLIN, 0}}};
+        if (poll(waiting.data(), waiting.size(), -1) < 0 && errno != EINTR) {
+            fail(errno, "a program's output cannot be waited for");
+        }
+        if (waiting[0].revents != 0) {
+            feed(toChild, input);
+        }
+        if (waiting[1].revents != 0) {
+            drain(output, result.output);
+        }
+        if (waiting[2].revents != 0) {
+            drain(errors, result.errors);
+        }
+    }
+}
+
+int waitFor(pid_t child) {
+    int status = 0;
+    while (waitpid(child, &status, 0) < 0) {
+        if (errno != EINTR) {
+            fail(errno, "a program's end cannot be waited for");
+        }
+    }
+    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+}
+
+} // namespace
+
+ProcessResult runWithInput(std::vector<std::string> const& command, std::string_view input) {
+    auto toChild = makePipe();
+    auto output = makePipe();
+    auto errors = makePipe();
+    if (fcntl(toChild.writeEnd.get(), F_SETFL, O_NONBLOCK) != 0) {
+        fail(errno, "a pipe cannot be set up");
+    }
+    auto const child =
+        SpawnSettings(toChild.readEnd.get(), output.writeEnd.get(), errors.writeEnd.get()).spawn(command);
+    toChild.readEnd.close();
+    output.writeEnd.close();
+    errors.writeEnd.close();
+    ProcessResult result{};
+    exchange(toChild.writeEnd, input, output.readEnd, errors.readEnd, result);
+    toChild.writeEnd.close();
+    result.exitCode = waitFor(child);
+    return result;
+}
+
+} // namespace projectctl

@@ -1,0 +1,75 @@
+#include "output/Output.hpp"
+
+#include <cerrno>
+#include <cstddef>
+#include <system_error>
+
+#include <unistd.h>
+
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
+
+namespace projectctl {
+
+namespace {
+
+constexpr std::size_t pieceSize = std::size_t(256) * 1024;
+
+} // namespace
+
+Output::Output(int descriptor) : descriptor_(descriptor), isTerminal_(isatty(descriptor) == 1) {
+}
+
+void Output::name(std::u16string_view name) {
+    if (isTerminal_) {
+        std::string bytes;
+        appendBytes(bytes, name);
+        appendQuoted(text_, bytes);
+    } else {
+        appendBytes(text_, name);
+    }
+}
+
+void Output::settle() {
+    if (text_.size() >= pieceSize) {
+        flush();
+    }
+}
+
+void Output::say(std::string_view line) {
+    if (isTerminal_) {
+        text_ += withoutControls(line, false) + '\n';
+    }
+}
+
+void Output::flush() {
+    std::string_view rest = text_;
+    while (!rest.empty()) {
+        auto const written = write(descriptor_, rest.data(), rest.size());
+        if (written >= 0) {
+            rest.remove_prefix(static_cast<std::size_t>(written));
+        } else if (errno == EPIPE) {
+            throw OutputClosed();
+        } else if (errno != EINTR) {
+            throw Failure("the output cannot be written: " + std::generic_category().message(errno));
+        }
+    }
+    text_.clear();
+}
+
+Output& output() {
+    static Output standardOutput(STDOUT_FILENO);
+    return standardOutput;
+}
+
+void printError(std::string_view text) noexcept {
+    try {
+        auto const line = "projectctl: " + withoutControls(text, false) + '\n';
+        [[maybe_unused]] auto const written = write(STDERR_FILENO, line.data(), line.size());
+    } catch (...) {
+        // There is no memory left for the line: the exit code tells what can be told.
+        return;
+    }
+}
+
+} // namespace projectctl

@@ -1,0 +1,86 @@
+#include "output/Progress.hpp"
+
+#include <csignal>
+#include <string_view>
+#include <utility>
+
+#include <unistd.h>
+
+namespace projectctl {
+
+namespace {
+
+constexpr std::string_view clearLine = "\r\033[K";
+
+void draw(int descriptor, std::string_view text) {
+    // What a terminal does not take now is not worth waiting for.
+    [[maybe_unused]] auto const written = write(descriptor, text.data(), text.size());
+}
+
+std::string withThousands(std::size_t number) {
+    auto text = std::to_string(number);
+    for (auto place = text.size(); place > 3;) {
+        place -= 3;
+        text.insert(place, 1, ',');
+    }
+    return text;
+}
+
+} // namespace
+
+Progress::Progress(std::string work) : Progress(std::move(work), STDERR_FILENO, Timing()) {
+}
+
+Progress::Progress(std::string work, int descriptor, Timing timing)
+    : descriptor_(descriptor), timing_(timing), work_(std::move(work)) {
+    if (isatty(descriptor) != 1) {
+        return;
+    }
+    // The thread must not be the one that a signal reaches: it would get what the main thread holds back.
+    sigset_t all;
+    sigset_t before;
+    sigfillset(&all);
+    pthread_sigmask(SIG_SETMASK, &all, &before);
+    drawing_ = std::thread([this] { drawUntilStopped(); });
+    pthread_sigmask(SIG_SETMASK, &before, nullptr);
+}
+
+Progress::~Progress() {
+    if (!drawing_.joinable()) {
+        return;
+    }
+    {
+        std::lock_guard const guard(guarding_);
+        stopped_ = true;
+    }
+    changed_.notify_one();
+    drawing_.join();
+}
+
+void Progress::begin(std::string work) {
+    std::lock_guard const guard(guarding_);
+    work_ = std::move(work);
+    reach(0);
+}
+
+void Progress::drawUntilStopped() {
+    std::unique_lock guard(guarding_);
+    if (changed_.wait_for(guard, timing_.patience, [this] { return stopped_; })) {
+        return;
+    }
+    do {
+        draw(descriptor_, line());
+    } while (!changed_.wait_for(guard, timing_.interval, [this] { return stopped_; }));
+    draw(descriptor_, clearLine);
+}
+
+std::string Progress::line() {
+    auto const count = count_.load(std::memory_order_relaxed);
+    auto result = std::string(clearLine) + work_;
+    if (count > 0) {
+        result += ": " + withThousands(count);
+    }
+    return result + " ...";
+}
+
+} // namespace projectctl

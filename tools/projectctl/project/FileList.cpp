@@ -1,0 +1,95 @@
+#include "project/FileList.hpp"
+
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "project/Schema.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+
+namespace projectctl {
+
+using project::metadata::MetadataPath;
+using project::metadata::PathElement;
+using project::stores::Child;
+
+/// A folder whose contents are being visited.
+struct FileList::Open {
+    MetadataPath address;
+    project::stores::Children files;
+    std::size_t next;
+    std::size_t pathLength; ///< of the folder, with the separator behind it
+};
+
+FileList::FileList(OpenProject& project) : project_(project), guard_(project.store().acquireReadLock()) {
+}
+
+MetadataPath FileList::addressOf(Path const& path) const {
+    auto result =
+        MetadataPath::root().child(PathElement(std::u16string(schema::files), std::u16string(schema::root)));
+    auto const relative = project::metadata::getRelativePath(project_.root(), path);
+    for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
+        auto const name = fl::filesystem::detail::extract_first_element(rest);
+        result = result.child(PathElement(std::u16string(schema::file), std::u16string(name)));
+    }
+    return result;
+}
+
+FileList::Level FileList::level(MetadataPath const& address) const {
+    Level result;
+    result.files = project_.text().load(address);
+    std::erase_if(result.files, [&result](Child const& child) {
+        if (child.element.getType() == schema::folderMarker) {
+            result.kind = Kind::Folder;
+        }
+        return child.element.getType() != schema::file;
+    });
+    return result;
+}
+
+void FileList::visit(Path const& path, Visitor const& visitor) const {
+    auto const address = addressOf(path);
+    auto here = level(address);
+    if (path == project_.root()) {
+        visitBelow(address, std::move(here), {}, 0, visitor);
+        return;
+    }
+    auto const node = project_.store().getNode(address);
+    if (!node) {
+        return; // it is not in the project
+    }
+    auto const relative = project::metadata::getRelativePath(project_.root(), path);
+    visitor({relative, 0, here.kind, *node});
+    visitBelow(address, std::move(here), relative + u'/', 1, visitor);
+}
+
+void FileList::visitBelow(MetadataPath start, Level level, std::u16string path, std::size_t depth,
+                          Visitor const& visitor) const {
+    // Not by recursion: how deep the tree is, is up to whoever wrote the text.
+    std::vector<Open> open;
+    open.push_back({std::move(start), std::move(level.files), 0, path.size()});
+    while (!open.empty()) {
+        auto& folder = open.back();
+        path.resize(folder.pathLength);
+        if (folder.next == folder.files.size()) {
+            open.pop_back();
+            continue;
+        }
+        auto const& file = folder.files[folder.next++];
+        if (!file.node) {
+            continue;
+        }
+        path += file.element.getLocation();
+        if (!file.hasChildren) {
+            visitor({path, depth + open.size() - 1, Kind::File, *file.node});
+            continue;
+        }
+        auto address = folder.address.child(file.element);
+        auto content = this->level(address);
+        visitor({path, depth + open.size() - 1, content.kind, *file.node});
+        path += u'/';
+        open.push_back({std::move(address), std::move(content.files), 0, path.size()});
+    }
+}
+
+} // namespace projectctl

@@ -1,0 +1,78 @@
+#include "project/OpenProject.hpp"
+
+#include <utility>
+
+#include "cli/Settings.hpp"
+#include "cli/WorkingFolder.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectFolder.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/ProjectException.hpp"
+
+namespace projectctl {
+
+using project::session::SourceControl;
+using project::stores::Fault;
+using project::stores::TextBackend;
+using ZEPHRA::project::management::FileNotInProject;
+
+namespace {
+
+/// A command stages what it has written once, when it is done.
+project::session::Options sessionOptions() {
+    auto const sourceControl = settings().sourceControl ? SourceControl::WhenAsked : SourceControl::Off;
+    return {sourceControl, true};
+}
+
+} // namespace
+
+OpenProject::OpenProject(Path const& root) : OpenProject(Session::open(root, sessionOptions())) {
+}
+
+OpenProject OpenProject::make(Path const& root, std::u16string const& name) {
+    return OpenProject(Session::make(root, name, sessionOptions()));
+}
+
+OpenProject::OpenProject(Session session)
+    : shield_(std::make_shared<WriteShield>()), session_(std::move(session)) {
+    session_.project().subscribe(shield_);
+}
+
+OpenProject::~OpenProject() = default;
+
+OpenProject OpenProject::ofWorkingFolder() {
+    return OpenProject(findProjectRoot(workingFolder()));
+}
+
+std::string OpenProject::textFile() const {
+    return shown(root() / TextBackend::folderName / TextBackend::textName);
+}
+
+std::string OpenProject::storeFile(std::string const& name) const {
+    return shown(root() / TextBackend::folderName) + '/' + name;
+}
+
+void OpenProject::requireInProject(Path const& path) {
+    if (!files().isFileInProject(path)) {
+        project::exception::raise(FileNotInProject(path.native()));
+    }
+}
+
+void OpenProject::warnOfDamage() {
+    std::size_t count = 0;
+    std::string first;
+    for (auto const& fault : text().check()) {
+        if (fault.kind == Fault::Kind::Damage || fault.kind == Fault::Kind::Conflict) {
+            if (count++ == 0) {
+                first = textFile() + ':' + std::to_string(fault.line) + ": " + fault.problem;
+            }
+        }
+    }
+    if (count > 0) {
+        printError("warning: " + first + (count > 1 ? ", and " + std::to_string(count - 1) + " more" : "") +
+                   ". 'projectctl check' tells more.");
+    }
+}
+
+} // namespace projectctl

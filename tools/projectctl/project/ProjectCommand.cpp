@@ -1,0 +1,12 @@
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+int ProjectCommand::run() {
+    auto project = OpenProject::ofWorkingFolder();
+    auto const result = run(project);
+    project.stage();
+    return result;
+}
+
+} // namespace projectctl

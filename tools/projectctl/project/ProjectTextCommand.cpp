@@ -1,0 +1,66 @@
+#include <optional>
+#include <string>
+
+#include "cli/TextArguments.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/Commands.hpp"
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::management::ProjectManager;
+
+/// Shows or sets one of the two texts that a project has of its own. Texts are bytes to the tool, as names of
+/// files are, and come out as they went in.
+class ProjectTextCommand : public ProjectCommand {
+public:
+    using Getter = std::u16string (ProjectManager::*)() const;
+    using Setter = void (ProjectManager::*)(std::u16string const&);
+
+    ProjectTextCommand(std::string name, Getter get, Setter set)
+        : name_(std::move(name)), get_(get), set_(set) {}
+
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand(name_, "Show or set the project's " + name_);
+        takeText(*app, "TEXT", text_, "The new " + name_ + "; without it, the present one is shown");
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        if (text_) {
+            (project.manager().*set_)(textOf(*text_));
+        } else {
+            show((project.manager().*get_)());
+        }
+        return 0;
+    }
+
+private:
+    static void show(std::u16string const& text) {
+        std::string bytes;
+        appendBytes(bytes, text);
+        output().text() += output().isTerminal() ? withoutControls(bytes, true) : bytes;
+        output().text() += '\n';
+    }
+
+    std::string name_;
+    Getter get_;
+    Setter set_;
+    std::optional<std::string> text_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeNameCommand() {
+    return std::make_unique<ProjectTextCommand>("name", &ProjectManager::getName, &ProjectManager::setName);
+}
+
+std::unique_ptr<Command> makeDescriptionCommand() {
+    return std::make_unique<ProjectTextCommand>("description", &ProjectManager::getDescription,
+                                                &ProjectManager::setDescription);
+}
+
+} // namespace projectctl

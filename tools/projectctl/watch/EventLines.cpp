@@ -1,0 +1,114 @@
+#include "watch/EventLines.hpp"
+
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// What a line is made of.
+struct Line {
+    std::string_view event;
+    std::vector<std::u16string> words;
+};
+
+void writeLine(Line const& line) {
+    auto& out = output().text();
+    out += line.event;
+    for (auto const& word : line.words) {
+        std::string bytes;
+        appendBytes(bytes, word);
+        out += '\t';
+        appendQuoted(out, bytes);
+    }
+    out += '\n';
+}
+
+JsonObject beginJson(std::string_view event) {
+    JsonObject object;
+    object.begin();
+    object.addText("event", std::u16string(event.begin(), event.end()));
+    return object;
+}
+
+void endJson(JsonObject& object) {
+    object.end();
+    output().text() += '\n';
+}
+
+template <typename Identifier>
+JsonObject::Texts named(Identifier const& identifier) {
+    return {{u"uuid", identifier.getUUID()}, {u"name", identifier.getName()}};
+}
+
+} // namespace
+
+EventLines::EventLines(OpenProject& project, bool asJson) : root_(project.root()), asJson_(asJson) {
+    using Files = std::vector<Path>;
+    auto& events = project.events();
+    events.onFileListUpdate([this](Files const& files) { writeFiles("fileListUpdate", files); });
+    events.onFileLabelsChanged([this](Files const& files) { writeFiles("fileLabelsChanged", files); });
+    events.onCategoryAdded(
+        [this](CategoryIdentifier const& category) { writeCategory("categoryAdded", category); });
+    events.onCategoryRenamed(
+        [this](CategoryIdentifier const& category) { writeCategory("categoryRenamed", category); });
+    events.onCategoryDeleted(
+        [this](CategoryIdentifier const& category) { writeCategory("categoryDeleted", category); });
+    events.onLabelModified([this](Label const& label) { writeLabel(label); });
+    events.onEntryPointsChanged([this] { write("entryPointsChanged"); });
+    events.onNameChanged([this] { write("nameChanged"); });
+    events.onPathChanged([this] { write("pathChanged"); });
+    events.onReferencesChanged([this] { write("referencesChanged"); });
+    events.onMetadataChange([this] { write("metadataChange"); });
+}
+
+void EventLines::write(std::string_view event) {
+    if (asJson_) {
+        auto object = beginJson(event);
+        endJson(object);
+    } else {
+        writeLine({event, {}});
+    }
+}
+
+void EventLines::writeFiles(std::string_view event, std::vector<Path> const& files) {
+    std::vector<std::u16string> names;
+    names.reserve(files.size());
+    for (auto const& file : files) {
+        auto name = project::metadata::getRelativePath(root_, file);
+        names.push_back(name.empty() ? u"." : std::move(name));
+    }
+    if (asJson_) {
+        auto object = beginJson(event);
+        object.addList("files", names);
+        endJson(object);
+    } else {
+        writeLine({event, std::move(names)});
+    }
+}
+
+void EventLines::writeCategory(std::string_view event, CategoryIdentifier const& category) {
+    if (asJson_) {
+        auto object = beginJson(event);
+        object.addTexts("category", named(category));
+        endJson(object);
+    } else {
+        writeLine({event, {category.getName()}});
+    }
+}
+
+void EventLines::writeLabel(Label const& label) {
+    constexpr std::string_view event = "labelModified";
+    if (asJson_) {
+        auto object = beginJson(event);
+        object.addTexts("category", named(label.getCategory()));
+        object.addTexts("label", named(label.getLabelIdentifier()));
+        endJson(object);
+    } else {
+        writeLine({event, {label.getCategory().getName(), label.getLabelIdentifier().getName()}});
+    }
+}
+
+} // namespace projectctl

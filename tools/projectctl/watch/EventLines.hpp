@@ -1,0 +1,35 @@
+#pragma once
+
+#include <string_view>
+#include <vector>
+
+#include "output/JsonObject.hpp"
+#include "project/OpenProject.hpp"
+
+namespace projectctl {
+
+/// Writes each event of a project as a line on standard output, from its construction on: the event's name,
+/// and what it carries, separated by tabs; or as a JSON object.
+///
+/// Names are quoted where they hold what could be taken for something else, so that a line is always one
+/// event. Must outlive the last event.
+class EventLines {
+public:
+    EventLines(OpenProject& project, bool asJson);
+    EventLines(EventLines const&) = delete;
+    EventLines& operator=(EventLines const&) = delete;
+
+private:
+    using CategoryIdentifier = project::management::CategoryIdentifier;
+    using Label = project::management::Label;
+
+    void write(std::string_view event);
+    void writeFiles(std::string_view event, std::vector<Path> const& files);
+    void writeCategory(std::string_view event, CategoryIdentifier const& category);
+    void writeLabel(Label const& label);
+
+    Path root_;
+    bool asJson_;
+};
+
+} // namespace projectctl
