@@ -1,19 +1,36 @@
 #include "fl/i18n/Utf8.hpp"
 
-#include <unicode/unistr.h>
+#include <algorithm>
+
+#include "fl/i18n/CodePoints.hpp"
 
 namespace fl::i18n {
 
+namespace {
+
+constexpr char32_t replacement = 0xFFFD;
+
+} // namespace
+
 std::string toUtf8(std::u16string_view text) {
     std::string utf8;
-    icu::UnicodeString(false, text.data(), static_cast<int32_t>(text.size())).toUTF8String(utf8);
+    utf8.reserve(text.size());
+    while (!text.empty()) {
+        char32_t const codePoint = takeCodePoint(text);
+        appendUtf8(utf8, isSurrogate(codePoint) ? replacement : codePoint);
+    }
     return utf8;
 }
 
 std::u16string fromUtf8(std::string_view text) {
-    auto const utf16 =
-        icu::UnicodeString::fromUTF8(icu::StringPiece(text.data(), static_cast<int32_t>(text.size())));
-    return {utf16.getBuffer(), static_cast<std::size_t>(utf16.length())};
+    std::u16string utf16;
+    utf16.reserve(text.size());
+    for (std::size_t position = 0; position < text.size();) {
+        auto const [codePoint, length] = decodeUtf8(text, position);
+        appendUtf16(utf16, length == 0 ? replacement : codePoint);
+        position += std::max<std::size_t>(length, 1);
+    }
+    return utf16;
 }
 
 } // namespace fl::i18n
