@@ -46,7 +46,7 @@ void checkLine(std::string const& line) {
         require(toAddress(*canonical) == parsed.change->address, "a canonical line shows its address");
         require(toAddress(project::stores::addressOfCanonical(line)) == parsed.change->address,
                 "the address of a canonical line is found again");
-        require(areSame(project::stores::nodeOfLine(line), parsed.change->node),
+        require(areSame(project::stores::stateOfLine(line).node, parsed.change->node),
                 "a canonical line has its node");
     }
     std::string const ended = line + '\n';

@@ -5,7 +5,7 @@
 #include "Target.hpp"
 #include "line/NodeLine.hpp"
 #include "project/stores/StoreError.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 
 namespace project::fuzz {
 
@@ -83,7 +83,6 @@ void checkText(ProjectText const& text, std::string_view bytes) {
     Contents const contents = contentsOf(text);
     require(text.hasSameBytes(bytes), "a text keeps the bytes that were read");
     require(text.damagedLines().empty() != hasFault(text, Fault::Kind::Damage), "what is damaged is kept");
-    require(text.hasTornTail() == hasFault(text, Fault::Kind::TornTail), "a torn tail is told");
 
     ProjectText const tidy = text.rewrittenWith({});
     checkTidy(tidy, contents);

@@ -1,6 +1,6 @@
 #include "Target.hpp"
 #include "TextContents.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 
 namespace {
 

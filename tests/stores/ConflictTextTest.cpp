@@ -1,7 +1,7 @@
 #include "text/ProjectText.hpp"
 
 #include "support/ProjectTextSamples.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 
 namespace project::stores {
 
@@ -75,14 +75,13 @@ TEST(ConflictText, tailsOfBothSidesCount) {
     EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"("a")", R"("b")", R"("c")", R"("d")", R"("x")"}));
 }
 
-TEST(ConflictText, aTornTailOfASideIsTold) {
+TEST(ConflictText, aTornTailOfASideIsReported) {
     std::string const conflict = "<<<<<<< ours\n\"a\"\n=======\n\"b\"\n>>>>>>> theirs\n";
 
     ProjectText const torn = readWhole(first + conflict + last + "\"half");
 
-    EXPECT_TRUE(torn.hasTornTail());
     EXPECT_EQ(told(torn.faults()), "Conflict 2, TornTail 8");
-    EXPECT_FALSE(readWhole(first + conflict + last).hasTornTail());
+    EXPECT_EQ(told(readWhole(first + conflict + last).faults()), "Conflict 2");
 }
 
 TEST(ConflictText, inTheTailOfASideLaterLinesWin) {

@@ -24,7 +24,7 @@ TEST(JsonText, everyCodeUnitComesBack) {
         std::string const content = contentOfText(text);
         ASSERT_EQ(decodeJsonContent(content), text) << unit;
         ASSERT_EQ(scanAlone(content).end, content.size()) << unit;
-        ASSERT_TRUE(scanAlone(content).canonical) << unit;
+        ASSERT_TRUE(scanAlone(content).isCanonical) << unit;
     }
 }
 
@@ -55,7 +55,7 @@ TEST(JsonText, contentOfOtherHandsIsReadAndKnownAsSuch) {
     for (auto const& [content, text] : cases) {
         JsonContentScan const scan = scanAlone(content);
         EXPECT_EQ(scan.problem, nullptr) << content;
-        EXPECT_FALSE(scan.canonical) << content;
+        EXPECT_FALSE(scan.isCanonical) << content;
         EXPECT_EQ(decodeJsonContent(content), text) << content;
     }
 }
@@ -96,7 +96,7 @@ RC_GTEST_PROP(JsonText, anyTextComesBack, ()) {
     RC_ASSERT(decodeJsonContent(content) == text);
     JsonContentScan const scan = scanAlone(content);
     RC_ASSERT(scan.problem == nullptr);
-    RC_ASSERT(scan.canonical);
+    RC_ASSERT(scan.isCanonical);
     RC_ASSERT(scan.end == content.size());
 }
 

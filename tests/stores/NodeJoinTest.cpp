@@ -15,8 +15,14 @@ Nested category(std::u16string const& uuid, Keys keys = {}, std::vector<Nested> 
     return {u"Category", keys, labels};
 }
 
+Node joinTwo(Node const& earlier, Node const& later) {
+    NodeJoin join(*earlier);
+    join.add(*later);
+    return std::move(join).take();
+}
+
 std::string joined(Node const& earlier, Node const& later) {
-    return told(joinNodes(earlier, later));
+    return told(joinTwo(earlier, later));
 }
 
 TEST(NodeJoin, theKeysOfBothAreThereAndTheLaterValueWins) {
@@ -36,7 +42,7 @@ TEST(NodeJoin, nestedNodesOfOneUuidAreJoinedDeeply) {
     EXPECT_EQ(joined(earlier, later), "Info(Category(UUID=1;k=v;Label(UUID=x;)Label(UUID=y;)))");
 }
 
-TEST(NodeJoin, theEarlierOrderStandsAndNewNestedNodesFollow) {
+TEST(NodeJoin, theEarlierOrderIsKeptAndNewNestedNodesFollow) {
     Node const earlier = makeNode(u"Info", {}, {category(u"2"), category(u"1")});
     Node const later = makeNode(u"Info", {}, {category(u"3"), category(u"1"), category(u"2")});
     EXPECT_EQ(joined(earlier, later), "Info(Category(UUID=2;)Category(UUID=1;)Category(UUID=3;))");
@@ -78,7 +84,7 @@ RC_GTEST_PROP(NodeJoin, joiningManyIsJoiningOneByOne, ()) {
     Node oneByOne = first;
     for (Node const& later : *fewOf(4, anyNode())) {
         join.add(*later);
-        oneByOne = joinNodes(oneByOne, later);
+        oneByOne = joinTwo(oneByOne, later);
     }
     RC_ASSERT(told(std::move(join).take()) == told(oneByOne));
 }

@@ -87,7 +87,7 @@ RC_GTEST_PROP(NodeLine, anyNodeComesBackFromItsLine, (Address const& address)) {
     RC_ASSERT(parsed.change->kind == Change::Kind::Set);
     RC_ASSERT(parsed.change->address == address);
     RC_ASSERT(told(parsed.change->node) == told(node));
-    RC_ASSERT(told(nodeOfLine(line)) == told(node));
+    RC_ASSERT(told(stateOfLine(line).node) == told(node));
 }
 
 RC_GTEST_PROP(NodeLine, anyWrittenLineIsCanonicalAndTellsItsAddress, (Address const& address)) {

@@ -6,7 +6,7 @@
 
 #include "line/NodeLine.hpp"
 #include "support/TextGenerators.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 
 namespace project::stores {
 

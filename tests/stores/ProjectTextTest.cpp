@@ -2,7 +2,7 @@
 
 #include "project/stores/StoreError.hpp"
 #include "support/ProjectTextSamples.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 
 namespace project::stores {
 

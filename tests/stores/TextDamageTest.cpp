@@ -7,7 +7,7 @@
 #include "line/LineParser.hpp"
 #include "project/stores/StoreError.hpp"
 #include "support/ProjectTextSamples.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 
 namespace project::stores {
 
@@ -65,7 +65,8 @@ TEST(TextDamage, everyBeginningOfATextIsIncompleteOrAStateAfterWholeBatches) {
             ASSERT_EQ(contentOf(*text), tailed.states[batches]) << length;
             bool const clean = length == tailed.sizes[batches];
             ASSERT_EQ(text->faults().empty(), clean) << length;
-            ASSERT_EQ(text->hasTornTail(), length > tailed.sizes[batches]) << length;
+            ASSERT_EQ(told(text->faults()).starts_with("TornTail "), length > tailed.sizes[batches])
+                << length;
         }
     }
 }

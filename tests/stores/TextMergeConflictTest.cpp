@@ -6,7 +6,7 @@
 
 #include "stores/MergeSamples.hpp"
 #include "support/TextStore.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 
 namespace project::stores {
 
@@ -194,7 +194,7 @@ INSTANTIATE_TEST_SUITE_P(
         BadText{"brokenLine", std::string(firstLine) + "\n\"a", 2, "ends before"},
         BadText{"noLastLine", std::string(firstLine) + "\n\"a\"\n", 2, "ends before"},
         BadText{"laterVersion", "{\"format\":\"project-definition\",\"version\":2}\n", 1, "version 2"},
-        BadText{"somethingElse", "\n\n", 1, "no project definition"}));
+        BadText{"somethingElse", "\n\n", 1, "not a project definition"}));
 
 TEST(TextMergeInput, anEmptyTextIsNoVersionOfAProject) {
     std::string const good = bodyOf({R"("a")"});

@@ -5,7 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "project/metadata/MetadataNodeSpecification.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 #include "text/TextSum.hpp"
 
 namespace project::stores::samples {

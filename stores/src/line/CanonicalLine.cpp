@@ -22,7 +22,7 @@ constexpr std::array<bool, 256> plainCharacters = [] {
     return plain;
 }();
 
-/// Passes over a line in the one form and order in which it is written.
+/// Reads a line in the one form and order in which it is written.
 class Scanner {
 public:
     explicit Scanner(std::string_view line) noexcept : line_(line) {}
@@ -37,16 +37,17 @@ public:
 
     std::optional<LineAddress> object() noexcept {
         std::optional<LineAddress> const address = line_.starts_with(pathOpening) ? file() : steps();
-        std::size_t const behindAddress = at_;
-        bool const whole = address && (pass(R"(,"node":false)") || body("Info", 0)) && pass("}") && atEnd();
-        bool const plain = behindAddress + 1 == at_;
-        if (!whole || (plain && address->form == LineAddress::Form::Names)) {
+        std::size_t const afterAddress = at_;
+        bool const isComplete =
+            address && (pass(R"(,"node":false)") || body("Info", 0)) && pass("}") && isAtEnd();
+        bool const isPlain = afterAddress + 1 == at_;
+        if (!isComplete || (isPlain && address->form == LineAddress::Form::Names)) {
             return std::nullopt;
         }
         return address;
     }
 
-    bool atEnd() const noexcept { return at_ == line_.size(); }
+    bool isAtEnd() const noexcept { return at_ == line_.size(); }
 
 private:
     bool pass(std::string_view expected) noexcept {
@@ -62,7 +63,7 @@ private:
             return false;
         }
         JsonContentScan const scan = scanJsonContent(line_, at_);
-        if (scan.problem != nullptr || !scan.canonical) {
+        if (scan.problem != nullptr || !scan.isCanonical) {
             return false;
         }
         content = line_.substr(at_, scan.end - at_);
@@ -93,10 +94,10 @@ private:
         return address;
     }
 
-    /// Type, keys and children as far as they are written. @param unwritten the type that is left out.
-    bool body(std::string_view unwritten, std::size_t nesting) noexcept {
+    /// Type, keys and children, all optional. @param omittedType the type that must not be written.
+    bool body(std::string_view omittedType, std::size_t nesting) noexcept {
         std::string_view type;
-        if (pass(R"(,"type":)") && (!string(type) || type == unwritten)) {
+        if (pass(R"(,"type":)") && (!string(type) || type == omittedType)) {
             return false;
         }
         return keysAndChildren(nesting);
@@ -151,7 +152,7 @@ std::optional<LineAddress> canonicalAddress(std::string_view line) noexcept {
         return scanner.object();
     }
     std::optional<LineAddress> const path = scanner.path();
-    return scanner.atEnd() ? path : std::nullopt;
+    return scanner.isAtEnd() ? path : std::nullopt;
 }
 
 LineAddress addressOfCanonical(std::string_view line) noexcept {

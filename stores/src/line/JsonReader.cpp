@@ -28,7 +28,7 @@ bool JsonReader::accept(char character) noexcept {
 }
 
 bool JsonReader::expect(char character) noexcept {
-    return accept(character) || fail("it is not written as JSON");
+    return accept(character) || fail("the line is not valid JSON");
 }
 
 bool JsonReader::string(std::string_view& content) noexcept {
@@ -47,7 +47,7 @@ bool JsonReader::string(std::string_view& content) noexcept {
 bool JsonReader::word(std::string_view expected) noexcept {
     peek();
     if (problem_ != nullptr || text_.substr(at_, expected.size()) != expected) {
-        return fail("it is not written as JSON");
+        return fail("the line is not valid JSON");
     }
     at_ += expected.size();
     return true;
@@ -65,13 +65,13 @@ bool JsonReader::number(unsigned long& value) noexcept {
         value = value * 10 + digit;
         ++at_;
     }
-    bool const leadingZero = first == '0' && at_ - from > 1;
-    return (problem_ == nullptr && at_ > from && !leadingZero) || fail("a whole number is missing");
+    bool const hasLeadingZero = first == '0' && at_ - from > 1;
+    return (problem_ == nullptr && at_ > from && !hasLeadingZero) || fail("a whole number is missing");
 }
 
 bool JsonReader::end() noexcept {
     peek();
-    return problem_ == nullptr && (at_ == text_.size() || fail("something follows its end"));
+    return problem_ == nullptr && (at_ == text_.size() || fail("the line continues after its end"));
 }
 
 } // namespace project::stores

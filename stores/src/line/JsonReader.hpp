@@ -7,43 +7,43 @@
 
 namespace project::stores {
 
-/// Walks through one JSON value, strictly, member by member as its caller expects them.
+/// Reads one JSON value strictly, member by member, in the order in which the caller expects them.
 ///
-/// After the first thing that is wrong every operation answers false and problem tells what it was. Works on
-/// the bytes given, which must outlive it; allocates nothing.
+/// After the first error, every operation returns false, and problem returns the reason. The text must
+/// outlive the reader. Allocates nothing.
 class JsonReader {
 public:
     explicit JsonReader(std::string_view text) noexcept : text_(text) {}
 
-    /// Passes a character that must come next, white space before it left aside.
+    /// Consumes a character that must come next, after optional white space.
     bool expect(char character) noexcept;
 
-    /// Passes a character if it comes next.
+    /// Consumes a character if it comes next.
     bool accept(char character) noexcept;
 
-    /// True when a character comes next.
+    /// True if a character comes next.
     bool isNext(char character) noexcept { return peek() == character; }
 
-    /// Passes a string. @param content is given what stands between its quotes.
+    /// Consumes a string. @param content receives the bytes between its quotes.
     bool string(std::string_view& content) noexcept;
 
-    /// Passes a word such as false.
+    /// Consumes a word such as false.
     bool word(std::string_view expected) noexcept;
 
-    /// Passes a whole number without sign, fraction and exponent.
+    /// Consumes a whole number without sign, fraction and exponent.
     bool number(unsigned long& value) noexcept;
 
-    /// True at the end of the text; anything left there is wrong.
+    /// True at the end of the text. Anything that follows is an error.
     bool end() noexcept;
 
-    /// Notes a problem of the caller's. @return false.
+    /// Records an error that the caller found. @return false.
     bool fail(char const* problem) noexcept;
 
-    /// What was wrong first, or null.
+    /// The first error, or null.
     char const* problem() const noexcept { return problem_; }
 
 private:
-    /// Leaves white space aside. @return the next character, or 0 at the end and after a problem.
+    /// Skips white space. @return the next character, or 0 at the end and after an error.
     char peek() noexcept;
 
     std::string_view text_;

@@ -20,12 +20,12 @@ bool isLowSurrogate(unsigned unit) noexcept {
     return unit >= 0xDC00 && unit < 0xE000;
 }
 
-/// Written as it is, in one byte.
+/// True for a code unit that is written as one byte, without an escape.
 bool isPlainAscii(unsigned unit) noexcept {
     return unit >= 0x20 && unit < 0x80 && unit != '"' && unit != '\\';
 }
 
-/// The letter of the two-byte escape of a character, or 0 when it has none.
+/// The letter of the two-byte escape of a character, or 0 if it has none.
 char shortEscape(unsigned unit) noexcept {
     switch (unit) {
     case '"':
@@ -47,7 +47,7 @@ char shortEscape(unsigned unit) noexcept {
     }
 }
 
-/// The character of a two-byte escape by its letter, or -1 when there is no such escape.
+/// The character of a two-byte escape by its letter, or -1 if there is no such escape.
 int unescaped(char letter) noexcept {
     switch (letter) {
     case '"':
@@ -108,7 +108,7 @@ int hexDigit(char c) noexcept {
     return c >= 'A' && c <= 'F' ? c - 'A' + 10 : -1;
 }
 
-/// The code unit of four hexadecimal digits, or -1.
+/// The code unit that four hexadecimal digits represent, or -1.
 int fourDigits(std::string_view text, std::size_t from) noexcept {
     if (text.size() - from < 4) {
         return -1;
@@ -124,7 +124,7 @@ int fourDigits(std::string_view text, std::size_t from) noexcept {
     return unit;
 }
 
-/// How many bytes the character that begins here has, or 0 when it is no well-formed UTF-8.
+/// The length in bytes of the character at a position, or 0 if it is not well-formed UTF-8.
 std::size_t utf8Length(std::string_view text, std::size_t from) noexcept {
     auto const byte = [&](std::size_t i) {
         return from + i < text.size() ? static_cast<unsigned char>(text[from + i]) : 0U;
@@ -160,7 +160,7 @@ char32_t decodeUtf8(std::string_view bytes) noexcept {
     }
 }
 
-/// Gives the code units of a well-formed content, one after the other.
+/// Iterates over the code units of a well-formed content.
 class CodeUnits {
 public:
     explicit CodeUnits(std::string_view content) noexcept : content_(content) {}
@@ -209,41 +209,41 @@ private:
 /// Checks the escape at a position of a content.
 class EscapeCheck {
 public:
-    /// @return how many bytes the escape has, or 0 when it is none.
+    /// @return the length of the escape in bytes, or 0 if it is invalid.
     std::size_t length(std::string_view text, std::size_t at) noexcept {
         if (at + 1 >= text.size()) {
             return 0;
         }
-        bool const afterHigh = at == endOfHigh_;
+        bool const isAfterHigh = at == endOfHigh_;
         if (text[at + 1] != 'u') {
-            canonical_ = canonical_ && text[at + 1] != '/';
+            isCanonical_ = isCanonical_ && text[at + 1] != '/';
             return unescaped(text[at + 1]) < 0 ? 0 : 2;
         }
         int const unit = fourDigits(text, at + 2);
         if (unit < 0) {
             return 0;
         }
-        noteUnit(static_cast<unsigned>(unit), text.substr(at + 2, 4), afterHigh);
+        noteUnit(static_cast<unsigned>(unit), text.substr(at + 2, 4), isAfterHigh);
         if (isHighSurrogate(static_cast<unsigned>(unit))) {
             endOfHigh_ = at + 6;
         }
         return 6;
     }
 
-    bool isCanonical() const noexcept { return canonical_; }
+    bool isCanonical() const noexcept { return isCanonical_; }
 
 private:
-    /// Only a control character without a letter of its own and a lone surrogate are written so; two escapes
-    /// that make a pair stand for a character that UTF-8 has.
-    void noteUnit(unsigned unit, std::string_view digits, bool afterHigh) noexcept {
-        bool const control = unit < 0x20 && shortEscape(unit) == 0;
-        bool const lone = isHighSurrogate(unit) || (isLowSurrogate(unit) && !afterHigh);
-        bool const upper =
+    /// Canonical are only escapes of control characters without a short escape and of lone surrogates. Two
+    /// escapes that form a pair represent a character that UTF-8 can encode.
+    void noteUnit(unsigned unit, std::string_view digits, bool isAfterHigh) noexcept {
+        bool const isControl = unit < 0x20 && shortEscape(unit) == 0;
+        bool const isLone = isHighSurrogate(unit) || (isLowSurrogate(unit) && !isAfterHigh);
+        bool const hasUpperCase =
             std::any_of(digits.begin(), digits.end(), [](char c) { return c >= 'A' && c <= 'F'; });
-        canonical_ = canonical_ && (control || lone) && !upper;
+        isCanonical_ = isCanonical_ && (isControl || isLone) && !hasUpperCase;
     }
 
-    bool canonical_ = true;
+    bool isCanonical_ = true;
     std::size_t endOfHigh_ = std::string_view::npos;
 };
 
@@ -282,9 +282,9 @@ void appendJsonString(std::string& out, std::u16string_view text) {
 
 std::u16string decodeJsonContent(std::string_view content) {
     std::u16string text;
-    bool const plain = std::all_of(content.begin(), content.end(),
-                                   [](char c) { return static_cast<signed char>(c) >= 0 && c != '\\'; });
-    if (plain) {
+    bool const isPlain = std::all_of(content.begin(), content.end(),
+                                     [](char c) { return static_cast<signed char>(c) >= 0 && c != '\\'; });
+    if (isPlain) {
         text.assign(content.begin(), content.end());
         return text;
     }
@@ -345,22 +345,22 @@ JsonContentScan scanJsonContent(std::string_view text, std::size_t from) noexcep
         } else if (byte == '"') {
             return {at, escapes.isCanonical(), nullptr};
         } else if (byte < 0x20) {
-            return {at, false, "a string holds a control character"};
+            return {at, false, "a string contains a control character"};
         } else if (byte == '\\') {
             std::size_t const length = escapes.length(text, at);
             if (length == 0) {
-                return {at, false, "a string holds a wrong escape"};
+                return {at, false, "a string contains an invalid escape"};
             }
             at += length;
         } else {
             std::size_t const length = utf8Length(text, at);
             if (length == 0) {
-                return {at, false, "a string is no UTF-8"};
+                return {at, false, "a string is not valid UTF-8"};
             }
             at += length;
         }
     }
-    return {at, false, "a string does not end"};
+    return {at, false, "a string has no closing quote"};
 }
 
 } // namespace project::stores

@@ -27,12 +27,12 @@ bool isPath(LineAddress const& address) noexcept {
     return address.form == LineAddress::Form::Names;
 }
 
-/// A "/" ends a name, and so comes before all that a name may go on with.
+/// A "/" ends a name and therefore comes before every character of a name.
 int pathRank(char byte) noexcept {
     return byte == '/' ? -1 : codeUnitRank(static_cast<unsigned char>(byte));
 }
 
-/// The steps of an address from the root down; they live as long as the address does.
+/// The steps of an address from the root down. They are valid as long as the address is.
 std::vector<metadata::PathElement const*> stepsOf(Address const& address) {
     std::vector<metadata::PathElement const*> steps(address.depth());
     Address above = address;
@@ -56,8 +56,8 @@ bool areWrittenAsPath(std::vector<metadata::PathElement const*> const& steps) {
     if (steps.size() < 2 || !isElement(*steps[0], filesType, filesLocation) || !isName(*steps[1])) {
         return false;
     }
-    bool const marked = isElement(*steps.back(), markerType, markerLocation);
-    return std::all_of(steps.begin() + 2, steps.end() - (marked ? 1 : 0),
+    bool const hasMarker = isElement(*steps.back(), markerType, markerLocation);
+    return std::all_of(steps.begin() + 2, steps.end() - (hasMarker ? 1 : 0),
                        [](metadata::PathElement const* step) { return isName(*step); });
 }
 
@@ -67,9 +67,9 @@ LineSteps::LineSteps(LineAddress const& address) noexcept : address_(address) {
 }
 
 bool LineSteps::next() noexcept {
-    bool const found = isPath(address_) ? nextName() : nextPair();
-    depth_ += found ? 1 : 0;
-    return found;
+    bool const isFound = isPath(address_) ? nextName() : nextPair();
+    depth_ += isFound ? 1 : 0;
+    return isFound;
 }
 
 bool LineSteps::nextName() noexcept {
@@ -136,10 +136,10 @@ std::strong_ordering compare(LineAddress const& left, LineAddress const& right) 
     LineSteps leftSteps(left);
     LineSteps rightSteps(right);
     while (true) {
-        bool const leftHas = leftSteps.next();
-        bool const rightHas = rightSteps.next();
-        if (!leftHas || !rightHas) {
-            return leftHas <=> rightHas;
+        bool const isLeftStep = leftSteps.next();
+        bool const isRightStep = rightSteps.next();
+        if (!isLeftStep || !isRightStep) {
+            return isLeftStep <=> isRightStep;
         }
         std::strong_ordering order = compareJsonContents(leftSteps.type(), rightSteps.type());
         if (std::is_eq(order)) {
@@ -154,9 +154,8 @@ std::strong_ordering compare(LineAddress const& left, LineAddress const& right) 
 bool isWithin(LineAddress const& address, LineAddress const& other) noexcept {
     if (isPath(address) && isPath(other)) {
         std::size_t const length = other.text.size();
-        bool const begins = address.text.substr(0, length) == other.text;
-        bool const same = address.text.size() == length;
-        return begins && (same || address.text[length] == '/');
+        bool const isPrefix = address.text.starts_with(other.text);
+        return isPrefix && (address.text.size() == length || address.text[length] == '/');
     }
     LineSteps steps(address);
     LineSteps otherSteps(other);
@@ -182,9 +181,9 @@ Address toAddress(LineAddress const& address) {
 }
 
 bool isPathContent(std::string_view content) noexcept {
-    bool const named = !content.empty() && content.front() != '/';
-    bool const emptyName = content.find("//") != std::string_view::npos;
-    if (!named || emptyName) {
+    bool const hasEmptyName =
+        content.empty() || content.front() == '/' || content.find("//") != std::string_view::npos;
+    if (hasEmptyName) {
         return false;
     }
     auto const slashes = std::count(content.begin(), content.end(), '/');
@@ -202,8 +201,8 @@ bool isWrittenAsPath(LineAddress const& address) noexcept {
     }
     std::size_t names = 0;
     while (steps.next()) {
-        bool const marker = steps.type() == markerTypeContent && steps.location() == markerLocationContent;
-        if (marker && names > 0) {
+        bool const isMarker = steps.type() == markerTypeContent && steps.location() == markerLocationContent;
+        if (isMarker && names > 0) {
             return !steps.next();
         }
         if (steps.type() != nameTypeContent || steps.location().empty() ||
@@ -221,8 +220,8 @@ AddressText::AddressText(Address const& address) : form_(LineAddress::Form::Step
         form_ = LineAddress::Form::Names;
         for (std::size_t i = 1; i < steps.size(); ++i) {
             text_ += i == 1 ? "" : "/";
-            bool const marker = i + 1 == steps.size() && steps[i]->getType() == markerType;
-            appendJsonContent(text_, marker ? std::u16string_view() : steps[i]->getLocation());
+            bool const isMarker = i + 1 == steps.size() && steps[i]->getType() == markerType;
+            appendJsonContent(text_, isMarker ? std::u16string_view() : steps[i]->getLocation());
         }
         return;
     }

@@ -9,21 +9,21 @@
 
 namespace project::stores {
 
-/// More steps than this no address may have: every operation that follows an address down stays bounded.
+/// The maximum number of steps of an address. It bounds every operation that walks down an address.
 inline constexpr std::size_t deepestAddress = 4096;
 
-/// An address as a line of the text writes it, canonically; a view of that line.
+/// An address in the canonical form of a line; a view of that line.
 ///
-/// A file's address, ("Files","Root") and then names, is written as Names: they are joined by "/", which
-/// makes a path. The marker of a folder below it is that path with a "/" behind it. Everything else is
-/// written as Steps: types and locations in turn, each in quotes, with commas between. Addresses are compared
-/// as they are written, without decoding them.
+/// A file's address, ("Files","Root") and then names, has the form Names: the names joined by "/", a path.
+/// The marker below a folder is the folder's path with a "/" at the end. Every other address has the form
+/// Steps: types and locations in turn, each in quotes, separated by commas. Addresses are compared in this
+/// form, without decoding them.
 struct LineAddress {
     enum class Form : unsigned char { Names, Steps };
 
     Form form;
-    /// A path's content without its quotes; or the list without its brackets, in which case anything may
-    /// follow behind the closing bracket.
+    /// Names: the path without its quotes. Steps: the list without its opening bracket; anything may follow
+    /// its closing bracket.
     std::string_view text;
 };
 
@@ -32,16 +32,16 @@ class LineSteps {
 public:
     explicit LineSteps(LineAddress const& address) noexcept;
 
-    /// Goes one step down. @return false, with type and location unchanged, below the last one.
+    /// Advances by one step. @return false, with type and location unchanged, after the last step.
     bool next() noexcept;
 
-    /// Content of the step's type.
+    /// The content of the step's type.
     std::string_view type() const noexcept { return type_; }
 
-    /// Content of the step's location.
+    /// The content of the step's location.
     std::string_view location() const noexcept { return location_; }
 
-    /// The address that ends with this step. Not always in its canonical form, but good for isWithin.
+    /// The address that ends with this step. It may not be canonical, but isWithin accepts it.
     LineAddress prefix() const noexcept;
 
 private:
@@ -56,24 +56,24 @@ private:
     std::size_t depth_ = 0;
 };
 
-/// The order of addresses, step by step from the root; an address comes before what lies below it.
+/// The order of addresses, step by step from the root. An address comes before the addresses below it.
 std::strong_ordering compare(LineAddress const& left, LineAddress const& right) noexcept;
 
-/// True when the address is the other one or lies below it.
+/// True if the address is the other one or lies below it.
 bool isWithin(LineAddress const& address, LineAddress const& other) noexcept;
 
 metadata::PathElement toElement(LineSteps const& step);
 
 Address toAddress(LineAddress const& address);
 
-/// True for the content of a path: names that are not empty, joined by "/", perhaps with one at the end.
+/// True for the content of a path: non-empty names joined by "/", possibly with a "/" at the end.
 bool isPathContent(std::string_view content) noexcept;
 
-/// True when the steps of a list are those of a path, which is then how they have to be written.
+/// True if an address must be written as a path.
 bool isWrittenAsPath(Address const& address) noexcept;
 bool isWrittenAsPath(LineAddress const& steps) noexcept;
 
-/// An address written canonically.
+/// An address in canonical form, with its text.
 class AddressText {
 public:
     explicit AddressText(Address const& address);

@@ -41,9 +41,9 @@ void fill(MetadataNode& node, WrittenNode&& written) {
 
 Node buildNode(WrittenNode&& written) {
     std::u16string type = std::move(written.type).value_or(std::u16string(plainNodeType));
-    bool const filled =
-        (written.keys && !written.keys->empty()) || (written.children && !written.children->empty());
-    if (type == plainNodeType && !filled) {
+    bool const isEmpty =
+        (!written.keys || written.keys->empty()) && (!written.children || written.children->empty());
+    if (type == plainNodeType && isEmpty) {
         return plainNode();
     }
     auto node = std::make_shared<MetadataNodeSpecification>(std::move(type));
@@ -51,15 +51,16 @@ Node buildNode(WrittenNode&& written) {
     return node;
 }
 
-/// Reads one line, in whatever order and spacing its members come.
+/// Reads one line, whatever the order of its members and its white space.
 class LineParser {
 public:
     explicit LineParser(std::string_view line) noexcept : reader_(line) {}
 
-    /// @return false when the line is malformed; problem tells why. Nothing else may then be called.
+    /// @return false if the line is unreadable. Then problem returns the reason, and no other function may be
+    /// called.
     bool parse() {
-        bool const read = reader_.isNext('"') ? path() : object() && complete();
-        return read && reader_.end();
+        bool const isRead = reader_.isNext('"') ? path() : object() && complete();
+        return isRead && reader_.end();
     }
 
     char const* problem() const noexcept { return reader_.problem(); }
@@ -77,7 +78,7 @@ public:
         return address;
     }
 
-    /// To be called once.
+    /// May be called once.
     Node node() { return kind_ == Change::Kind::Set ? buildNode(std::move(node_)) : Node(); }
 
 private:
@@ -91,7 +92,7 @@ private:
         } else {
             appendJsonContent(path_, decodeJsonContent(content));
         }
-        return isPathContent(path_) || reader_.fail("a path has an empty name or is too deep");
+        return isPathContent(path_) || reader_.fail("the path has an empty name or too many steps");
     }
 
     bool steps() {
@@ -100,13 +101,14 @@ private:
         }
         do {
             if (steps_.size() == 2 * deepestAddress) {
-                return reader_.fail("an address is too deep");
+                return reader_.fail("the address has too many steps");
             }
             if (!reader_.string(steps_.emplace_back())) {
                 return false;
             }
         } while (reader_.accept(','));
-        return reader_.expect(']') && (steps_.size() % 2 == 0 || reader_.fail("an address ends half way"));
+        return reader_.expect(']') &&
+               (steps_.size() % 2 == 0 || reader_.fail("the last step of the address has no location"));
     }
 
     bool object() {
@@ -130,12 +132,12 @@ private:
     bool lineMember(std::string_view name) {
         if (name == "file" || name == "at" || name == "remove") {
             if (!std::exchange(addressMember_, name).empty()) {
-                return reader_.fail("it has two addresses");
+                return reader_.fail("the line has two addresses");
             }
-            bool const asPath = name == "file" || (name == "remove" && reader_.isNext('"'));
-            return asPath ? path() : steps();
+            bool const isPath = name == "file" || (name == "remove" && reader_.isNext('"'));
+            return isPath ? path() : steps();
         }
-        if (name == "node" && !std::exchange(made_, true)) {
+        if (name == "node" && !std::exchange(isCreated_, true)) {
             return reader_.word("false");
         }
         return nodeMember(name, node_, 0);
@@ -144,9 +146,9 @@ private:
     bool nodeMember(std::string_view name, WrittenNode& node, std::size_t nesting) {
         if (name == "type" && !node.type) {
             std::string_view content;
-            bool const read = reader_.string(content);
-            node.type = read ? decodeJsonContent(content) : std::u16string();
-            return read;
+            bool const isRead = reader_.string(content);
+            node.type = isRead ? decodeJsonContent(content) : std::u16string();
+            return isRead;
         }
         if (name == "keys" && !node.keys) {
             return keys(node.keys.emplace());
@@ -154,7 +156,7 @@ private:
         if (name == "children" && !node.children) {
             return children(node.children.emplace(), nesting + 1);
         }
-        return reader_.fail("it has a member that is unknown or there twice");
+        return reader_.fail("the line has an unknown or a duplicate member");
     }
 
     bool keys(std::map<std::u16string, std::u16string>& keys) {
@@ -170,7 +172,7 @@ private:
             std::size_t const before = keys.size();
             keys.try_emplace(keys.end(), decodeJsonContent(key), decodeJsonContent(value));
             if (keys.size() == before) {
-                return reader_.fail("a key is there twice");
+                return reader_.fail("a key occurs twice");
             }
         } while (reader_.accept(','));
         return reader_.expect('}');
@@ -178,7 +180,7 @@ private:
 
     bool children(std::vector<WrittenNode>& children, std::size_t nesting) {
         if (nesting > deepestNesting) {
-            return reader_.fail("nodes are nested too deep");
+            return reader_.fail("nodes are nested too deeply");
         }
         if (!reader_.expect('[') || reader_.accept(']')) {
             return reader_.problem() == nullptr;
@@ -195,17 +197,17 @@ private:
         return reader_.expect(']');
     }
 
-    /// Checks that the members of an object make a line together.
+    /// Checks that the members of an object form a line.
     bool complete() {
         if (addressMember_.empty()) {
-            return reader_.fail("it has no address");
+            return reader_.fail("the line has no address");
         }
-        bool const filled = node_.type || node_.keys || node_.children;
-        bool const removal = addressMember_ == "remove";
-        if ((made_ && filled) || (removal && (made_ || filled))) {
-            return reader_.fail("its members exclude each other");
+        bool const hasNode = node_.type || node_.keys || node_.children;
+        bool const isRemoval = addressMember_ == "remove";
+        if ((isCreated_ && hasNode) || (isRemoval && (isCreated_ || hasNode))) {
+            return reader_.fail("the members of the line contradict each other");
         }
-        kind_ = removal ? Change::Kind::Remove : made_ ? Change::Kind::Make : Change::Kind::Set;
+        kind_ = isRemoval ? Change::Kind::Remove : isCreated_ ? Change::Kind::Make : Change::Kind::Set;
         return true;
     }
 
@@ -213,7 +215,7 @@ private:
     std::string_view addressMember_;
     std::string path_;
     std::vector<std::string_view> steps_;
-    bool made_ = false;
+    bool isCreated_ = false;
     WrittenNode node_;
     Change::Kind kind_ = Change::Kind::Set;
 };
@@ -231,17 +233,20 @@ ParsedLine parseLine(std::string_view line) {
 ParsedLine parseBodyLine(std::string_view line) {
     ParsedLine parsed = parseLine(line);
     if (parsed.change && parsed.change->kind == Change::Kind::Remove) {
-        return {std::nullopt, "a removal stands in the body"};
+        return {std::nullopt, "the body contains a removal"};
     }
     return parsed;
 }
 
-Node nodeOfLine(std::string_view line) {
+AddressState stateOfLine(std::string_view line) {
     if (line.starts_with('"')) {
-        return plainNode();
+        return {plainNode()};
     }
     LineParser parser(line);
-    return parser.parse() ? parser.node() : Node();
+    if (!parser.parse()) {
+        return {};
+    }
+    return {parser.node(), parser.kind() == Change::Kind::Make};
 }
 
 } // namespace project::stores

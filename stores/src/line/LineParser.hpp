@@ -3,23 +3,24 @@
 #include <optional>
 #include <string_view>
 
+#include "line/AddressState.hpp"
 #include "project/stores/Change.hpp"
 
 namespace project::stores {
 
-/// A line that was read, or why it could not be.
+/// A line that was read, or the reason why it is unreadable.
 struct ParsedLine {
     std::optional<Change> change;
-    char const* problem; ///< a clause; null when there is a change
+    char const* problem; ///< a clause; null if there is a change
 };
 
-/// Reads any line of a body or a batch, however its JSON is laid out.
+/// Reads any line of a body or a batch, whatever the order of its members and its white space.
 ParsedLine parseLine(std::string_view line);
 
-/// Reads a line of a body, where nothing is removed.
+/// Reads a line of a body, which cannot contain removals.
 ParsedLine parseBodyLine(std::string_view line);
 
-/// The node of a line that parses, null for one of an address that was made without.
-Node nodeOfLine(std::string_view line);
+/// The state that a readable line of a body gives to its address.
+AddressState stateOfLine(std::string_view line);
 
 } // namespace project::stores

@@ -45,13 +45,13 @@ void appendChildren(std::string& out, MetadataNode const& node) {
 
 /// The address as the value of a member.
 void appendAddress(std::string& out, LineAddress const& address) {
-    bool const path = address.form == LineAddress::Form::Names;
-    out += path ? '"' : '[';
+    bool const isPath = address.form == LineAddress::Form::Names;
+    out += isPath ? '"' : '[';
     out += address.text;
-    out += path ? '"' : ']';
+    out += isPath ? '"' : ']';
 }
 
-/// True when nodes are nested in a node no more than so many levels deep.
+/// True if a node has at most this many levels of nested nodes.
 bool nestsWithin(MetadataNode const& node, std::size_t levels) {
     auto const& children = node.getChildren();
     return children.empty() ||
@@ -69,12 +69,12 @@ Node const& plainNode() {
 
 void appendNodeLine(std::string& out, AddressText const& address, Node const& node) {
     LineAddress const view = address.view();
-    bool const path = view.form == LineAddress::Form::Names;
-    if (path && node && isPlain(*node)) {
+    bool const isPath = view.form == LineAddress::Form::Names;
+    if (isPath && node && isPlain(*node)) {
         appendAddress(out, view);
         return;
     }
-    out += path ? R"({"file":)" : R"({"at":)";
+    out += isPath ? R"({"file":)" : R"({"at":)";
     appendAddress(out, view);
     if (!node) {
         out += R"(,"node":false})";

@@ -8,7 +8,6 @@
 #include "line/LineParser.hpp"
 #include "line/NodeLine.hpp"
 #include "node/NodeMerge.hpp"
-#include "node/NodeReduction.hpp"
 
 namespace project::stores {
 
@@ -16,13 +15,8 @@ namespace {
 
 using Line = std::optional<std::string_view>;
 
-Standing standingOf(Line const& line) {
-    if (!line) {
-        return {};
-    }
-    Node node = nodeOfLine(*line);
-    bool const made = node == nullptr;
-    return {std::move(node), made};
+AddressState stateOf(Line const& line) {
+    return line ? stateOfLine(*line) : AddressState{};
 }
 
 void appendLine(std::string& out, std::string_view line) {
@@ -30,50 +24,50 @@ void appendLine(std::string& out, std::string_view line) {
     out += '\n';
 }
 
-std::string lineOf(Address const& address, Standing const& standing) {
+std::string lineOf(Address const& address, AddressState const& state) {
     std::string line;
-    if (standing) {
-        appendNodeLine(line, AddressText(address), standing.node);
+    if (state) {
+        appendNodeLine(line, AddressText(address), state.node);
         line += '\n';
     }
     return line;
 }
 
-/// One of the bodies, read from its first line to its last.
+/// A cursor over the lines of one of the bodies.
 class Version {
 public:
     explicit Version(TextBody const& body) : body_(body) {
-        if (!atEnd()) {
-            look();
+        if (!isAtEnd()) {
+            readLine();
         }
     }
 
-    bool atEnd() const noexcept { return next_ == body_.size(); }
+    bool isAtEnd() const noexcept { return next_ == body_.size(); }
 
-    /// The next line; nothing at the end.
+    /// The current line; nothing at the end.
     Line const& line() const noexcept { return line_; }
 
-    /// The address of the next line. Not to be called at the end.
+    /// The address of the current line. Must not be called at the end.
     LineAddress const& address() const noexcept { return address_; }
 
     bool isAt(LineAddress const& address) const noexcept {
-        return !atEnd() && std::is_eq(compare(address_, address));
+        return !isAtEnd() && std::is_eq(compare(address_, address));
     }
 
     bool hasAnythingWithin(LineAddress const& address) const noexcept {
-        return !atEnd() && isWithin(address_, address);
+        return !isAtEnd() && isWithin(address_, address);
     }
 
     void advance() {
         ++next_;
-        look();
+        readLine();
     }
 
-    /// Passes over the lines within an address. @return them.
+    /// Consumes the lines at and below an address. @return these lines.
     TextBody::Range take(LineAddress const& address) {
         TextBody::Range const taken{next_, body_.endOf({next_, body_.size()}, address)};
         next_ = taken.end;
-        look();
+        readLine();
         return taken;
     }
 
@@ -88,8 +82,8 @@ public:
     }
 
 private:
-    void look() {
-        line_ = atEnd() ? std::nullopt : Line(body_.line(next_));
+    void readLine() {
+        line_ = isAtEnd() ? std::nullopt : Line(body_.line(next_));
         address_ = line_ ? addressOfCanonical(*line_) : address_;
     }
 
@@ -99,31 +93,32 @@ private:
     LineAddress address_{LineAddress::Form::Steps, {}};
 };
 
-/// The addresses in some lines of a body at which something was added to what stands in the base, or changed.
+/// The addresses of lines that add something to the base or change it.
 std::vector<Address> changedLines(TextBody const& base, TextBody::Range before, TextBody const& body,
                                   TextBody::Range lines) {
     std::vector<Address> changed;
     for (std::size_t i = lines.begin; i < lines.end; ++i) {
         LineAddress const address = body.address(i);
         before.begin = base.lowerBound(before, address);
-        bool const stood = !before.empty() && std::is_eq(compare(base.address(before.begin), address));
-        Line const old = stood ? Line(base.line(before.begin)) : std::nullopt;
-        if (old != body.line(i) && !isReductionOf(standingOf(body.line(i)), standingOf(old))) {
+        bool const isInBase = !before.empty() && std::is_eq(compare(base.address(before.begin), address));
+        Line const old = isInBase ? Line(base.line(before.begin)) : std::nullopt;
+        if (old != body.line(i) && !isReductionOf(stateOf(body.line(i)), stateOf(old))) {
             changed.push_back(toAddress(address));
         }
     }
     return changed;
 }
 
-class Walk {
+/// Walks through the three bodies side by side.
+class BodyMerge {
 public:
-    explicit Walk(ThreeWay<TextBody> const& bodies)
+    explicit BodyMerge(ThreeWay<TextBody> const& bodies)
         : base_(bodies.base), ours_(bodies.ours), theirs_(bodies.theirs) {
         merged_.lines.reserve(std::max(bodies.ours.bytes().size(), bodies.theirs.bytes().size()));
     }
 
     MergedBody merge() {
-        while (!base_.atEnd() || !ours_.atEnd() || !theirs_.atEnd()) {
+        while (!base_.isAtEnd() || !ours_.isAtEnd() || !theirs_.isAtEnd()) {
             if (base_.line() == ours_.line() && ours_.line() == theirs_.line()) {
                 appendLine(merged_.lines, *base_.line());
                 base_.advance();
@@ -140,7 +135,7 @@ private:
     LineAddress firstAddress() const {
         std::optional<LineAddress> first;
         for (Version const* const version : {&base_, &ours_, &theirs_}) {
-            if (!version->atEnd() && (!first || std::is_lt(compare(version->address(), *first)))) {
+            if (!version->isAtEnd() && (!first || std::is_lt(compare(version->address(), *first)))) {
                 first = version->address();
             }
         }
@@ -148,21 +143,21 @@ private:
     }
 
     void mergeAt(LineAddress const& address) {
-        bool const stood = base_.isAt(address);
-        bool const oursStays = !stood || ours_.hasAnythingWithin(address);
-        bool const theirsStays = !stood || theirs_.hasAnythingWithin(address);
-        if (oursStays && theirsStays) {
+        bool const isInBase = base_.isAt(address);
+        bool const isRemovedByOurs = isInBase && !ours_.hasAnythingWithin(address);
+        bool const isRemovedByTheirs = isInBase && !theirs_.hasAnythingWithin(address);
+        if (!isRemovedByOurs && !isRemovedByTheirs) {
             mergeLine(address);
-        } else if (oursStays) {
+        } else if (!isRemovedByOurs) {
             mergeRemoved(address, MergeSide::Theirs);
-        } else if (theirsStays) {
+        } else if (!isRemovedByTheirs) {
             mergeRemoved(address, MergeSide::Ours);
         } else {
             base_.take(address);
         }
     }
 
-    /// Merges an address that one side has removed with all below it.
+    /// Merges an address that one side removed with everything below it.
     void mergeRemoved(LineAddress const& removed, MergeSide by) {
         Version& other = by == MergeSide::Ours ? theirs_ : ours_;
         TextBody::Range const before = base_.take(removed);
@@ -173,10 +168,10 @@ private:
         }
         MergeConflict conflict{
             MergeConflict::Kind::Subtree, toAddress(removed), {}, {}, by, {}, {}, std::move(changed)};
-        conflict.nodes.base = nodeOfLine(base_.body().line(before.begin));
+        conflict.nodes.base = stateOfLine(base_.body().line(before.begin)).node;
         Node& node = by == MergeSide::Ours ? conflict.nodes.theirs : conflict.nodes.ours;
         if (std::is_eq(compare(other.body().address(kept.begin), removed))) {
-            node = nodeOfLine(other.body().line(kept.begin));
+            node = stateOfLine(other.body().line(kept.begin)).node;
         }
         MergeSite site{conflict.address, merged_.lines.size(), 1, {}, std::nullopt};
         site.lines.base = base_.text(before);
@@ -212,10 +207,9 @@ private:
     }
 
     void mergeChanged(Address const& address, ThreeWay<Line> const& lines) {
-        ThreeWay<Standing> const standings{standingOf(lines.base), standingOf(lines.ours),
-                                           standingOf(lines.theirs)};
+        ThreeWay<AddressState> const states{stateOf(lines.base), stateOf(lines.ours), stateOf(lines.theirs)};
         std::size_t const before = merged_.conflicts.size();
-        Standing const ours = mergeStandings(address, standings, [this](MergeConflict&& conflict) {
+        AddressState const ours = mergeStates(address, states, [this](MergeConflict&& conflict) {
             merged_.conflicts.push_back(std::move(conflict));
             return MergeSide::Ours;
         });
@@ -224,11 +218,11 @@ private:
             merged_.lines += lineOf(address, ours);
             return;
         }
-        Standing const theirs =
-            mergeStandings(address, standings, [](MergeConflict&&) { return MergeSide::Theirs; });
-        ThreeWay<std::string> texts{lineOf(address, standings.base), lineOf(address, ours),
+        AddressState const theirs =
+            mergeStates(address, states, [](MergeConflict&&) { return MergeSide::Theirs; });
+        ThreeWay<std::string> texts{lineOf(address, states.base), lineOf(address, ours),
                                     lineOf(address, theirs)};
-        merged_.sites.push_back({address, merged_.lines.size(), conflicts, std::move(texts), standings});
+        merged_.sites.push_back({address, merged_.lines.size(), conflicts, std::move(texts), states});
     }
 
     Version base_;
@@ -240,15 +234,15 @@ private:
 } // namespace
 
 MergedBody mergeBodies(ThreeWay<TextBody> const& bodies) {
-    return Walk(bodies).merge();
+    return BodyMerge(bodies).merge();
 }
 
 std::string chosenLines(MergeSite const& site, MergeSide const* choices) {
-    if (!site.standings) {
+    if (!site.states) {
         return site.lines.of(*choices);
     }
     return lineOf(site.address,
-                  mergeStandings(site.address, *site.standings, [&](MergeConflict&&) { return *choices++; }));
+                  mergeStates(site.address, *site.states, [&](MergeConflict&&) { return *choices++; }));
 }
 
 } // namespace project::stores

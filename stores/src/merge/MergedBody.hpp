@@ -5,35 +5,35 @@
 #include <string>
 #include <vector>
 
-#include "node/Standing.hpp"
+#include "line/AddressState.hpp"
 #include "project/stores/MergeConflict.hpp"
 #include "text/TextBody.hpp"
 
 namespace project::stores {
 
-/// An address at which something is left to decide.
+/// An address in conflict.
 struct MergeSite {
     Address address;
-    std::size_t offset;        ///< where in the merged lines its own belong
-    std::size_t conflicts = 0; ///< how many of the merge's conflicts are here; they follow each other
-    ThreeWay<std::string>
-        lines; ///< with their ends; for a line with ours or theirs wherever there is a conflict
-    std::optional<ThreeWay<Standing>>
-        standings; ///< of a line; nothing when an address went with all below it
+    std::size_t offset;        ///< the position of its lines in the merged lines
+    std::size_t conflicts = 0; ///< the number of its conflicts, which are consecutive in the list
+    /// With line ends. If both sides have the address, merged except for the conflicts.
+    ThreeWay<std::string> lines;
+    /// The states of the address; nothing if one side removed it with everything below it.
+    std::optional<ThreeWay<AddressState>> states;
 };
 
-/// Three bodies merged: the lines that are decided, and what is left to decide between them.
+/// The merge of three bodies: the merged lines without a first and last line, and the conflicts.
 struct MergedBody {
     std::string lines;
     std::vector<MergeSite> sites;
     std::vector<MergeConflict> conflicts;
 };
 
-/// Walks through three bodies side by side, line by line.
+/// Merges three bodies line by line, in one pass.
 /// @param bodies canonical and gapless.
 MergedBody mergeBodies(ThreeWay<TextBody> const& bodies);
 
-/// The lines of a site. @param choices one for each of its conflicts.
+/// The lines of an address in conflict. @param choices one for each of its conflicts.
 std::string chosenLines(MergeSite const& site, MergeSide const* choices);
 
 } // namespace project::stores

@@ -7,23 +7,23 @@
 
 #include "merge/MergedBody.hpp"
 #include "project/stores/StoreError.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 #include "text/TextReader.hpp"
 
 namespace project::stores {
 
 namespace {
 
-/// Refuses what could lose something without a word. A torn tail counts for nobody, nor does it here.
+/// Refuses versions of which the merge could silently lose something. A torn tail is ignored, as everywhere.
 void requireSound(TextReading const& reading, char const* version) {
     for (Fault const& fault : reading.faults) {
         if (fault.kind == Fault::Kind::Damage) {
             throw StoreError(version, fault.line, "the text is damaged: " + fault.problem,
-                             "Mend that version before it is merged.");
+                             "Repair that version before you merge it.");
         }
         if (fault.kind == Fault::Kind::Conflict) {
-            throw StoreError(version, fault.line, "another merge left its markers",
-                             "Resolve them in that version before it is merged.");
+            throw StoreError(version, fault.line, "another merge left conflict markers",
+                             "Resolve the conflicts in that version before you merge it.");
         }
     }
 }
@@ -36,8 +36,8 @@ TextBody readBody(std::string_view text, char const* version) {
                          "the text ends before the last line of its body", "");
     }
     requireSound(*reading, version);
-    bool const tidy = reading->canonical && reading->content.overlay().empty();
-    return tidy ? std::move(reading->content.body()) : reading->content.write({});
+    bool const isTidy = reading->isCanonical && reading->content.overlay().empty();
+    return isTidy ? std::move(reading->content.body()) : reading->content.write({});
 }
 
 void appendPart(std::string& out, std::string_view marker, std::string_view lines) {

@@ -2,8 +2,7 @@
 
 #include <utility>
 
-#include "node/NestedIdentity.hpp"
-#include "node/NodeCopy.hpp"
+#include "node/NestedNodes.hpp"
 
 namespace project::stores {
 
@@ -39,7 +38,7 @@ NodeJoin::ByIdentity& NodeJoin::nestedIn(MetadataNode const& node) {
 }
 
 void NodeJoin::addTo(MetadataNode& target, MetadataNode const& later) {
-    putKeys(target, later);
+    copyKeys(target, later);
     if (later.getChildren().empty()) {
         return;
     }
@@ -52,16 +51,10 @@ void NodeJoin::addTo(MetadataNode& target, MetadataNode const& later) {
         if (earlier >= same.size()) {
             same.push_back(target.addChild(child->getType()));
             copyInto(*same.back(), *child);
-        } else if (identifyingKey(*child)) { // else it is told by all of it, and has nothing to add
+        } else if (identifyingKey(*child)) { // otherwise the two are equal
             addTo(*same[earlier], *child);
         }
     }
-}
-
-Node joinNodes(Node const& earlier, Node const& later) {
-    NodeJoin join(*earlier);
-    join.add(*later);
-    return std::move(join).take();
 }
 
 } // namespace project::stores

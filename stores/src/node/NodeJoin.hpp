@@ -11,21 +11,20 @@
 
 namespace project::stores {
 
-/// Joins nodes that stand for one address, so that nothing of any is lost: the last one's type, the keys of
-/// all with the later one's value where they differ, and the nested nodes of all. A nested node of a later
-/// one is joined with the earlier one's of the same type and "UUID", or "Name" where it has no "UUID"; one
-/// without both is kept unless an equal one is there.
+/// Joins nodes for one address so that nothing is lost. The result has the type of the last node, the keys of
+/// all nodes (the later value where they differ), and the nested nodes of all. Nested nodes with the same
+/// identity are joined in turn; nested nodes without an identifying key are kept once if they are equal.
 ///
-/// Nested nodes keep the earlier one's order; those that only the later one has follow. Adding a node costs
-/// what that node has and not what was joined before, since a text may have any number of lines for one
-/// address.
+/// Nested nodes keep the order of the earlier node; those that only the later node has follow. Adding a node
+/// costs time in proportion to that node, not to the nodes joined before: a text may have any number of lines
+/// for one address.
 class NodeJoin {
 public:
     explicit NodeJoin(metadata::MetadataNode const& first);
 
     void add(metadata::MetadataNode const& later);
 
-    /// All that was joined. To be called last.
+    /// The joined node. Must be the last call.
     Node take() &&;
 
 private:
@@ -36,11 +35,7 @@ private:
 
     std::shared_ptr<metadata::MetadataNodeSpecification> joined_;
     std::u16string type_;
-    std::map<metadata::MetadataNode const*, ByIdentity> nested_; ///< of nodes that something was added to
+    std::map<metadata::MetadataNode const*, ByIdentity> nested_; ///< of the nodes that were added to
 };
-
-/// Joins two nodes.
-/// @param earlier not null. @param later not null.
-Node joinNodes(Node const& earlier, Node const& later);
 
 } // namespace project::stores

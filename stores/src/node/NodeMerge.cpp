@@ -1,5 +1,6 @@
 #include "node/NodeMerge.hpp"
 
+#include <algorithm>
 #include <map>
 #include <memory>
 #include <optional>
@@ -7,9 +8,7 @@
 #include <utility>
 #include <vector>
 
-#include "node/NestedIdentity.hpp"
-#include "node/NodeCopy.hpp"
-#include "node/NodeReduction.hpp"
+#include "node/NestedNodes.hpp"
 #include "node/Siblings.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 
@@ -23,9 +22,10 @@ namespace {
 using Values = ThreeWay<std::optional<std::u16string>>;
 using Nodes = Siblings::Versions;
 
-/// A merged node. Made before it is known whether anything is left of it, and in which place.
+/// A merged nested node, before it is known whether the result has it and in which position.
 struct Draft {
-    MetadataNode const* unchanged = nullptr; ///< it is this node, and all else is empty
+    MetadataNode const* unchanged =
+        nullptr; ///< the merged node equals this one, and the other members are empty
     std::u16string type;
     std::map<std::u16string, std::u16string> keys;
     std::vector<Draft> children;
@@ -51,9 +51,9 @@ Node copyOf(MetadataNode const* node) {
     return node == nullptr ? nullptr : std::make_shared<MetadataNodeSpecification>(*node);
 }
 
-/// True for a nested node that says nothing but what it is: it is there for the sake of what is nested in it,
-/// as a category is on a file.
-bool isMerePlace(MetadataNode const& node) {
+/// True for a nested node whose only key is its identity. It exists for the sake of its nested nodes, like a
+/// category on a file.
+bool isContainer(MetadataNode const& node) {
     return identifyingKey(node) && node.getKeys().size() == 1;
 }
 
@@ -72,6 +72,28 @@ std::map<std::u16string, Values> keysOf(Nodes const& nodes) {
     return keys;
 }
 
+bool hasOnlyKeysOf(MetadataNode const& node, MetadataNode const& earlier) {
+    std::vector<std::u16string> const keys = node.getKeys();
+    std::vector<std::u16string> const known = earlier.getKeys();
+    return std::includes(known.begin(), known.end(), keys.begin(), keys.end()) &&
+           std::all_of(keys.begin(), keys.end(),
+                       [&](std::u16string const& key) { return node.get(key) == earlier.get(key); });
+}
+
+bool isReductionOf(MetadataNode const& node, MetadataNode const& earlier) {
+    if (node.getType() != earlier.getType() || !hasOnlyKeysOf(node, earlier)) {
+        return false;
+    }
+    Siblings const siblings({&earlier, &node, nullptr});
+    return std::all_of(siblings.byRank().begin(), siblings.byRank().end(), [](Nodes const& nested) {
+        if (nested.ours == nullptr || nested.base == nullptr) {
+            return nested.ours == nullptr;
+        }
+        return !identifyingKey(*nested.ours) || isReductionOf(*nested.ours, *nested.base);
+    });
+}
+
+/// Merges one node that both sides have, and its nested nodes.
 class NodeMerge {
 public:
     NodeMerge(Address const& address, Decide const& decide) : address_(address), decide_(decide) {}
@@ -119,15 +141,15 @@ private:
     std::vector<Draft> children(Nodes const& parents) {
         Siblings const siblings(parents);
         std::vector<std::optional<Draft>> merged;
-        std::vector<bool> stays;
+        std::vector<bool> isKept;
         merged.reserve(siblings.byRank().size());
-        stays.reserve(siblings.byRank().size());
+        isKept.reserve(siblings.byRank().size());
         for (std::size_t rank = 0; rank < siblings.byRank().size(); ++rank) {
             merged.push_back(child(siblings.byRank()[rank], siblings.earlier(rank)));
-            stays.push_back(merged.back().has_value());
+            isKept.push_back(merged.back().has_value());
         }
         std::vector<Draft> result;
-        for (std::size_t const rank : mergedOrder(siblings.order(), stays)) {
+        for (std::size_t const rank : siblings.mergedOrder(isKept)) {
             result.push_back(*std::move(merged[rank]));
         }
         return result;
@@ -139,35 +161,38 @@ private:
             return std::nullopt;
         }
         std::optional<std::u16string> const key = identifyingKey(*present);
-        bool const shared = nodes.ours != nullptr && nodes.theirs != nullptr;
-        if (!key) { // told by all of it, so that it can't have changed
-            return shared || nodes.base == nullptr ? std::optional(unchanged(*present)) : std::nullopt;
+        bool const isInBoth = nodes.ours != nullptr && nodes.theirs != nullptr;
+        if (!key) { // identified by its whole content, which therefore is the same in all versions
+            return isInBoth || nodes.base == nullptr ? std::optional(unchanged(*present)) : std::nullopt;
         }
-        way_.push_back({present->getType(), *key, present->get(*key), earlier});
-        std::optional<Draft> draft = shared                  ? kept(nodes)
+        path_.push_back({present->getType(), *key, present->get(*key), earlier});
+        std::optional<Draft> draft = isInBoth                ? kept(nodes)
                                      : nodes.base == nullptr ? std::optional(unchanged(*present))
                                                              : removed(nodes, *present);
-        way_.pop_back();
+        path_.pop_back();
         return draft;
     }
 
-    /// Merges a nested node that both sides have. Where they removed all that was nested in a mere place,
-    /// each a part of it, nothing is left.
+    /// Merges a nested node that both sides have. The result does not have a container if the two sides
+    /// together removed everything that was nested in it.
     std::optional<Draft> kept(Nodes const& nodes) {
         Draft draft = both(nodes);
-        bool const emptied = draft.children.empty() && !nodes.ours->getChildren().empty() &&
-                             !nodes.theirs->getChildren().empty();
-        if (emptied && isMerePlace(*nodes.ours) && isMerePlace(*nodes.theirs)) {
+        bool const isEmptied = draft.children.empty() && !nodes.ours->getChildren().empty() &&
+                               !nodes.theirs->getChildren().empty();
+        if (isEmptied && isContainer(*nodes.ours) && isContainer(*nodes.theirs)) {
             return std::nullopt;
         }
         return draft;
     }
 
-    /// A nested node that one side has removed. What the other side has put into a mere place stays.
+    /// Merges a nested node that one side removed. The result keeps a container with the nodes that the other
+    /// side added to it.
     std::optional<Draft> removed(Nodes const& nodes, MetadataNode const& present) {
-        if (isMerePlace(present) && isMerePlace(*nodes.base)) {
+        if (isContainer(present) && isContainer(*nodes.base)) {
             Draft draft{nullptr, present.getType(), {}, children(nodes)};
-            putKeys(draft, present);
+            for (std::u16string const& name : present.getKeys()) {
+                draft.keys.emplace(name, present.get(name));
+            }
             return draft.children.empty() ? std::nullopt : std::optional(std::move(draft));
         }
         if (isReductionOf(present, *nodes.base)) {
@@ -176,44 +201,45 @@ private:
         MergeConflict conflict = conflictOf(MergeConflict::Kind::Nested);
         conflict.removedBy = nodes.ours == nullptr ? MergeSide::Ours : MergeSide::Theirs;
         conflict.nodes = {copyOf(nodes.base), copyOf(nodes.ours), copyOf(nodes.theirs)};
-        bool const goes = nodes.of(decide_(std::move(conflict))) == nullptr;
-        return goes ? std::nullopt : std::optional(unchanged(present));
-    }
-
-    static void putKeys(Draft& draft, MetadataNode const& from) {
-        for (std::u16string const& key : from.getKeys()) {
-            draft.keys.emplace(key, from.get(key));
-        }
+        bool const isRemoved = nodes.of(decide_(std::move(conflict))) == nullptr;
+        return isRemoved ? std::nullopt : std::optional(unchanged(present));
     }
 
     MergeConflict conflictOf(MergeConflict::Kind kind) const {
-        return {kind, address_, way_, {}, std::nullopt, {}, {}, {}};
+        return {kind, address_, path_, {}, std::nullopt, {}, {}, {}};
     }
 
     Address const& address_;
     Decide const& decide_;
-    std::vector<NestedStep> way_;
+    std::vector<NestedStep> path_;
 };
 
 } // namespace
 
-Standing mergeStandings(Address const& address, ThreeWay<Standing> const& standings, Decide const& decide) {
-    auto const& [base, ours, theirs] = standings;
+bool isReductionOf(AddressState const& state, AddressState const& earlier) {
+    if (state.node) {
+        return earlier.node && isReductionOf(*state.node, *earlier.node);
+    }
+    return !state.isCreated || static_cast<bool>(earlier);
+}
+
+AddressState mergeStates(Address const& address, ThreeWay<AddressState> const& states, Decide const& decide) {
+    auto const& [base, ours, theirs] = states;
     if (ours.node && theirs.node) {
         Nodes const nodes{base.node.get(), ours.node.get(), theirs.node.get()};
         return {NodeMerge(address, decide).merge(nodes), false};
     }
-    if (!base.node && ours && theirs) { // one side made the address, the other put a node there
+    if (!base.node && ours && theirs) { // one side created the address without a node, the other with one
         return ours.node ? ours : theirs;
     }
-    bool const byOurs = !ours || (theirs && !ours.node);
-    if (isReductionOf(byOurs ? theirs : ours, base)) {
-        return byOurs ? ours : theirs;
+    bool const isRemovedByOurs = !ours || (theirs && !ours.node);
+    if (isReductionOf(isRemovedByOurs ? theirs : ours, base)) {
+        return isRemovedByOurs ? ours : theirs;
     }
     MergeConflict conflict{MergeConflict::Kind::Subtree, address, {}, {}, std::nullopt, {}, {}, {address}};
-    conflict.removedBy = byOurs ? MergeSide::Ours : MergeSide::Theirs;
+    conflict.removedBy = isRemovedByOurs ? MergeSide::Ours : MergeSide::Theirs;
     conflict.nodes = {base.node, ours.node, theirs.node};
-    return standings.of(decide(std::move(conflict)));
+    return states.of(decide(std::move(conflict)));
 }
 
 } // namespace project::stores

@@ -6,7 +6,6 @@
 #include <utility>
 
 #include "line/LineParser.hpp"
-#include "text/TextFrame.hpp"
 #include "text/TextLines.hpp"
 #include "text/TextSum.hpp"
 #include "text/TextTail.hpp"
@@ -38,26 +37,27 @@ Sides split(std::string const& bytes) {
             continue;
         }
         if (marker == MergeMarker::Ours || within == MergeMarker::None) {
-            sides.faults.push_back({Fault::Kind::Conflict, line.number, "a merge left its markers here"});
+            sides.faults.push_back(
+                {Fault::Kind::Conflict, line.number, "a merge left conflict markers here"});
         }
-        bool const closes =
+        bool const isEnd =
             marker == MergeMarker::End || (marker == MergeMarker::Theirs && within == MergeMarker::None);
-        within = closes ? MergeMarker::None : marker;
+        within = isEnd ? MergeMarker::None : marker;
     }
     return sides;
 }
 
-/// One side, read without an order of lines: nothing is searched in it.
+/// One side. Its lines need no order, because nothing is searched in them.
 class Side {
 public:
     explicit Side(std::span<TextLine const> lines) : lines_(lines) {}
 
-    /// @return false when it has no first line yet.
+    /// @return false if its first line is incomplete.
     bool hasFirstLine(std::string const& file) const {
         return !lines_.empty() && checkFirstLine(lines_.front().text, lines_.front().hasEnd(), file);
     }
 
-    /// @return false when it has no last line of a body.
+    /// @return false if it does not contain the last line of the body.
     bool read() {
         std::size_t i = 1;
         TextSum sum;
@@ -66,19 +66,18 @@ public:
             sum.add(lines_[i].text);
             bodyLine(lines_[i]);
         }
-        bool const ends = i < lines_.size();
-        if (ends) {
+        bool const hasEndLine = i < lines_.size();
+        if (hasEndLine) {
             sum.add(lines_[i].text);
             readTailOf(lines_.subspan(i + 1), sum.hex());
         }
         content.finishJoining();
-        return ends;
+        return hasEndLine;
     }
 
     TextContent content;
     std::vector<Fault> faults;
     std::map<std::size_t, std::string> damage;
-    bool torn = false;
 
 private:
     void bodyLine(TextLine const& line) {
@@ -91,25 +90,24 @@ private:
         }
     }
 
-    void readTailOf(std::span<TextLine const> lines, std::string anchor) {
-        TailReading tail = readTail({lines.begin(), lines.end()}, std::move(anchor));
-        takeIn(content, tail);
+    void readTailOf(std::span<TextLine const> lines, std::string after) {
+        TailReading tail = readTail({lines.begin(), lines.end()}, std::move(after));
+        applyTail(content, tail);
         std::move(tail.faults.begin(), tail.faults.end(), std::back_inserter(faults));
         damage.merge(tail.damage);
-        torn = tail.torn;
     }
 
     std::span<TextLine const> lines_;
 };
 
-/// Puts faults by line; those of lines that both sides have are told once.
+/// Sorts faults by line. Faults in lines of both sides are reported once.
 void sortFaults(std::vector<Fault>& faults) {
     std::stable_sort(faults.begin(), faults.end(),
                      [](Fault const& left, Fault const& right) { return left.line < right.line; });
-    auto const same = [](Fault const& left, Fault const& right) {
+    auto const isSame = [](Fault const& left, Fault const& right) {
         return left.line == right.line && left.kind == right.kind && left.problem == right.problem;
     };
-    faults.erase(std::unique(faults.begin(), faults.end(), same), faults.end());
+    faults.erase(std::unique(faults.begin(), faults.end(), isSame), faults.end());
 }
 
 } // namespace
@@ -121,27 +119,26 @@ std::optional<TextReading> readConflictedText(std::string bytes, std::string con
     if (!ours.hasFirstLine(file) || !theirs.hasFirstLine(file)) {
         return std::nullopt;
     }
-    bool const oursEnds = ours.read();
-    bool const theirsEnds = theirs.read();
-    if (!oursEnds && !theirsEnds) {
+    bool const isOursComplete = ours.read();
+    bool const isTheirsComplete = theirs.read();
+    if (!isOursComplete && !isTheirsComplete) {
         return std::nullopt;
     }
     TextReading reading;
     reading.faults = std::move(sides.faults);
     for (Side* const side : {&ours, &theirs}) {
         for (auto const& [address, entry] : side->content.overlay().entries()) {
-            if (entry.standing) {
-                auto const kind = entry.standing.node ? Change::Kind::Set : Change::Kind::Make;
-                reading.content.join({kind, address, entry.standing.node});
+            if (entry.state) {
+                auto const kind = entry.state.node ? Change::Kind::Set : Change::Kind::Make;
+                reading.content.join({kind, address, entry.state.node});
             }
         }
         std::move(side->faults.begin(), side->faults.end(), std::back_inserter(reading.faults));
         reading.damage.merge(side->damage);
-        reading.torn = reading.torn || side->torn;
     }
     reading.content.finishJoining();
     sortFaults(reading.faults);
-    reading.canonical = false;
+    reading.isCanonical = false;
     reading.content.body() = TextBody(std::move(bytes));
     return reading;
 }

@@ -7,11 +7,11 @@
 
 namespace project::stores {
 
-/// Reads a text in which a merge left markers: as two texts, each with the lines outside the markers and
-/// those of one side, and then joined. Nothing of either side is lost, so that what one side removed is
-/// there again. Lines of the common ancestor do not count.
+/// Reads a text with conflict markers: as two texts, each with the lines outside the markers and those of one
+/// side, which are then joined. Nothing of either side is lost, so content that one side removed is present
+/// again. Lines of the common ancestor are ignored.
 ///
-/// Arguments and result as of readText.
+/// Arguments and result are those of readText.
 std::optional<TextReading> readConflictedText(std::string bytes, std::string const& file);
 
 } // namespace project::stores

@@ -13,10 +13,10 @@ void Overlay::apply(Change const& change) {
     }
 }
 
-void Overlay::put(Address const& address, Standing standing) {
-    bool const last = entries_.empty() || entries_.rbegin()->first < address;
-    auto const hint = last ? entries_.end() : entries_.lower_bound(address);
-    entries_.try_emplace(hint, address)->second.standing = std::move(standing);
+void Overlay::put(Address const& address, AddressState state) {
+    bool const isLast = entries_.empty() || entries_.rbegin()->first < address;
+    auto const hint = isLast ? entries_.end() : entries_.lower_bound(address);
+    entries_.try_emplace(hint, address)->second.state = std::move(state);
 }
 
 void Overlay::remove(Address const& address) {
@@ -37,7 +37,7 @@ Overlay::Entry const* Overlay::find(Address const& address) const {
 }
 
 bool Overlay::isHidden(Address const& address) const {
-    // None of them lies below another one, so one that is above the address comes right before it.
+    // None of them lies below another one, so the one above the address comes directly before it.
     auto const next = hidden_.upper_bound(address);
     return next != hidden_.begin() && address.isWithin(*std::prev(next));
 }

@@ -3,22 +3,21 @@
 #include <map>
 #include <set>
 
-#include "node/Standing.hpp"
+#include "line/AddressState.hpp"
 #include "project/stores/Change.hpp"
 
 namespace project::stores {
 
-/// Changes that are laid over a body: what stands at an address instead of what the body has there, and
-/// which parts of the body are hidden.
+/// Changes over a body: the states that replace those of the body, and the parts of the body that are hidden.
 class Overlay {
 public:
     struct Entry {
-        Standing standing;
-        /// The body counts neither here nor below. An entry in which nothing stands always hides.
-        bool hides = false;
+        AddressState state;
+        /// The body's lines at and below the address are ignored. True for every entry without a state.
+        bool isHiding = false;
     };
 
-    /// Orders by address; finds the end of what lies within an address too.
+    /// Orders by address. Also finds the end of the addresses within an address.
     struct Order {
         struct EndOf {
             Address const& address;
@@ -35,7 +34,7 @@ public:
 
     using Entries = std::map<Address, Entry, Order>;
 
-    /// Entries one behind the other.
+    /// Consecutive entries.
     struct Range {
         Entries::const_iterator first;
         Entries::const_iterator last;
@@ -47,20 +46,20 @@ public:
         bool empty() const noexcept { return first == last; }
     };
 
-    /// Takes one step of a batch.
+    /// Applies one change of a batch.
     void apply(Change const& change);
 
-    /// Lets something stand at an address. Costs no search behind the last entry.
-    void put(Address const& address, Standing standing);
+    /// Sets the state of an address. Needs no search if the address comes after the last entry.
+    void put(Address const& address, AddressState state);
 
-    /// Removes an address with all below it.
+    /// Removes an address and everything below it.
     void remove(Address const& address);
 
     /// The entry of exactly this address, or null.
     Entry const* find(Address const& address) const;
 
-    /// True when what the body has at this address does not count: here or above something hides it. One
-    /// search, however deep the address is.
+    /// True if an entry at or above this address hides the body's line. One search, whatever the depth of the
+    /// address.
     bool isHidden(Address const& address) const;
 
     /// The entries strictly below an address.
@@ -72,7 +71,7 @@ public:
 
 private:
     Entries entries_;
-    std::set<Address> hidden_; ///< the addresses of entries that hide; of those below each other the topmost
+    std::set<Address> hidden_; ///< the addresses of hiding entries, without those below another one
 };
 
 } // namespace project::stores

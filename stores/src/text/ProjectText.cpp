@@ -23,28 +23,29 @@ public:
 
     std::string const& body() const noexcept { return reading_.content.body().bytes(); }
 
-    /// The sum that the next batch has to name. Costs a walk through the body the first time.
-    std::string const& anchor() const {
-        if (anchor_.empty()) {
-            anchor_ = reading_.anchor;
+    /// The `after` of the next batch. The first call may compute the checksum of the body.
+    std::string const& nextAfter() const {
+        if (nextAfter_.empty()) {
+            nextAfter_ = reading_.nextAfter;
         }
-        if (anchor_.empty()) {
+        if (nextAfter_.empty()) {
             TextSum sum;
             sum.addLines(body());
-            anchor_ = sum.hex();
+            nextAfter_ = sum.hex();
         }
-        return anchor_;
+        return nextAfter_;
     }
 
-    /// True when what is appended stands behind a whole text, in a line of its own.
+    /// True if appended bytes would follow a sound text and begin a new line.
     bool canBeExtended() const noexcept {
-        bool const sound =
+        bool const isSound =
             std::none_of(reading_.faults.begin(), reading_.faults.end(),
                          [](Fault const& fault) { return fault.kind != Fault::Kind::Irregular; });
-        return sound && (reading_.tail.empty() ? body() : reading_.tail).ends_with('\n');
+        return isSound && (reading_.tail.empty() ? body() : reading_.tail).ends_with('\n');
     }
 
-    /// The batches that were appended; nothing when that is anything else.
+    /// Reads appended bytes. @return nothing if they are anything but complete batches that chain to the
+    /// text.
     std::optional<TailReading> readAppended(std::string_view added) const {
         if (!canBeExtended() || !(added.empty() || added.ends_with('\n'))) {
             return std::nullopt;
@@ -54,28 +55,24 @@ public:
         while (walk.next()) {
             lines.push_back(walk.line());
         }
-        TailReading tail = readTail(lines, anchor());
+        TailReading tail = readTail(lines, nextAfter());
         return tail.faults.empty() ? std::optional(std::move(tail)) : std::nullopt;
     }
 
     void append(std::string_view added, TailReading const& tail) {
-        for (TailBatch const& batch : tail.batches) {
-            for (Change const& change : batch.changes) {
-                reading_.content.apply(change);
-            }
-        }
+        applyTail(reading_.content, tail); // all batches chain, or there would be a fault
         reading_.tail += added;
-        anchor_ = tail.anchor;
+        nextAfter_ = tail.nextAfter;
     }
 
-    /// What stands wherever some batches set or remove something.
-    std::map<Address, Standing> standingWhere(std::vector<TailBatch> const& batches) const {
-        std::map<Address, Standing> found;
+    /// The states of the addresses that some batches set or remove.
+    std::map<Address, AddressState> statesOf(std::vector<TailBatch> const& batches) const {
+        std::map<Address, AddressState> found;
         for (TailBatch const& batch : batches) {
             for (Change const& change : batch.changes) {
                 found.try_emplace(change.address, content().at(change.address));
                 if (change.kind == Change::Kind::Remove) {
-                    for (Address const& below : content().standingWithin(change.address)) {
+                    for (Address const& below : content().addressesWithin(change.address)) {
                         found.try_emplace(below, content().at(below));
                     }
                 }
@@ -86,7 +83,7 @@ public:
 
 private:
     TextReading reading_;
-    mutable std::string anchor_;
+    mutable std::string nextAfter_;
 };
 
 ProjectText::ProjectText(std::unique_ptr<State> state) noexcept : state_(std::move(state)) {
@@ -119,11 +116,11 @@ std::optional<std::vector<Difference>> ProjectText::extend(std::string_view adde
     if (!tail) {
         return std::nullopt;
     }
-    auto before = state_->standingWhere(tail->batches);
+    auto before = state_->statesOf(tail->batches);
     state_->append(added, *tail);
     std::vector<Difference> found;
-    for (auto& [address, standing] : before) {
-        addIfDifferent(found, address, standing, state_->content().at(address));
+    for (auto& [address, state] : before) {
+        addIfDifferent(found, address, state, state_->content().at(address));
     }
     return found;
 }
@@ -137,7 +134,7 @@ bool ProjectText::append(std::string_view lines) {
 }
 
 std::string ProjectText::tailFor(Batch const& batch) const {
-    return writeBatch(batch, state_->anchor());
+    return writeBatch(batch, state_->nextAfter());
 }
 
 ProjectText ProjectText::rewrittenWith(Batch const& batch) const {
@@ -176,11 +173,7 @@ std::string const& ProjectText::body() const noexcept {
 }
 
 bool ProjectText::isTidy() const noexcept {
-    return state_->reading().canonical && state_->reading().tail.empty();
-}
-
-bool ProjectText::hasTornTail() const noexcept {
-    return state_->reading().torn;
+    return state_->reading().isCanonical && state_->reading().tail.empty();
 }
 
 std::vector<Fault> const& ProjectText::faults() const noexcept {

@@ -12,66 +12,63 @@
 
 namespace project::stores {
 
-/// The text of a project as it was read: a sorted body, a tail of batches laid over it, and what is wrong
-/// with it. Works on bytes alone and knows nothing of disks; docs/store/format.md describes the format.
+/// The text of a project as it was read: a sorted body, a tail of batches, and the faults. Works on bytes and
+/// does not access the disk; docs/store/format.md describes the format.
 ///
-/// The order is checked in one pass at reading; nodes are made from lines when somebody asks for them.
-/// children may be called from several threads as long as nothing else is.
+/// Reading checks the order of the lines in one pass. Nodes are created from lines on request. Several
+/// threads may call children at the same time, but no other operation.
 class ProjectText {
 public:
     /// The text of a store without nodes.
     static ProjectText empty();
 
-    /// @param file how to name the file in errors.
-    /// @return nothing when the text is incomplete: empty, or ending before the last line of its body.
-    /// @throws StoreError when it is not a project's text at all or of a later format.
+    /// @param file the name of the file in errors.
+    /// @return nothing if the text is incomplete: empty, or without the last line of its body.
+    /// @throws StoreError if the file is not a project's text, or if it has a later format.
     static std::optional<ProjectText> read(std::string bytes, std::string const& file);
 
     ProjectText(ProjectText&&) noexcept;
     ProjectText& operator=(ProjectText&&) noexcept;
     ~ProjectText();
 
-    /// What is stored directly below an address, sorted. One search of the lines, then the children.
+    /// The children of an address, sorted. Searches the lines once.
     Children children(Address const& parent) const;
 
-    /// Takes in bytes that were appended behind what was read, if they are whole batches that chain to it.
-    /// @return what differs by them, sorted; nothing, and the text unchanged, when they are anything else.
+    /// Applies bytes that were appended to this text, if they are complete batches that chain to it.
+    /// @return the differences, sorted; nothing, with the text unchanged, if the bytes are anything else.
     std::optional<std::vector<Difference>> extend(std::string_view added);
 
-    /// The same for lines of which it is known what they change. @return false for anything else.
+    /// The same without differences, for a batch of this process. @return false if the text is unchanged.
     bool append(std::string_view lines);
 
-    /// The lines of a batch with its closing line, to be appended behind this text.
-    /// @throws StoreError when an address or a node is deeper than what the text can hold.
+    /// The lines of a batch, including its closing line, to be appended to this text.
+    /// @throws StoreError if an address or a node is too deep for the text.
     std::string tailFor(Batch const& batch) const;
 
-    /// This text with a batch in it (perhaps an empty one), as a body without a tail. Damage is left out.
+    /// This text with a batch (possibly an empty one), as a body without a tail. Damaged lines are omitted.
     /// @throws StoreError as tailFor does.
     ProjectText rewrittenWith(Batch const& batch) const;
 
-    /// What differs from this text to the other, sorted.
+    /// The differences from this text to the other one, sorted.
     std::vector<Difference> differencesTo(ProjectText const& other) const;
 
-    /// All the bytes that were read or would be written, body and tail, a torn tail included.
+    /// The bytes that were read or would be written: body and tail, including a torn tail.
     std::size_t size() const noexcept;
     std::size_t bodySize() const noexcept;
     std::size_t tailSize() const noexcept;
     bool hasSameBytes(std::string_view bytes) const noexcept;
     std::string bytes() const;
 
-    /// The body's bytes, which for a text without a tail is all of them.
+    /// The bytes of the body; for a text without a tail, these are all bytes.
     std::string const& body() const noexcept;
 
-    /// True when nothing follows the body and the body is in canonical form, so that writing the text anew
-    /// would give the same bytes.
+    /// True if the body is canonical and nothing follows it: rewriting the text would give the same bytes.
     bool isTidy() const noexcept;
-
-    bool hasTornTail() const noexcept;
 
     /// By line.
     std::vector<Fault> const& faults() const noexcept;
 
-    /// The damaged lines and batches as they stand in the text, with their line ends.
+    /// The bytes of the damaged lines and batches, with their line ends.
     std::string damagedLines() const;
 
 private:

@@ -5,14 +5,14 @@
 
 #include "line/CanonicalLine.hpp"
 #include "line/LineParser.hpp"
-#include "text/TextFrame.hpp"
+#include "text/TextLines.hpp"
 
 namespace project::stores {
 
 namespace {
 
-/// The first index of a range for which the condition no longer holds, which holds up to there and not from
-/// there on: by steps that double, then by halves.
+/// The first index in a range for which a condition does not hold. The condition must hold for all indexes
+/// before it and for none from there on. Searches in doubling steps and then by bisection.
 template <typename Condition>
 std::size_t gallop(TextBody::Range range, Condition const& holds) noexcept(noexcept(holds(0))) {
     std::size_t low = range.begin;
@@ -59,8 +59,8 @@ TextBody::Range TextBody::within(LineAddress const& wanted) const noexcept {
 
 std::optional<std::size_t> TextBody::find(LineAddress const& wanted) const noexcept {
     std::size_t const found = lowerBound(all(), wanted);
-    bool const exact = found < size() && std::is_eq(compare(address(found), wanted));
-    return exact ? std::optional(found) : std::nullopt;
+    bool const isExact = found < size() && std::is_eq(compare(address(found), wanted));
+    return isExact ? std::optional(found) : std::nullopt;
 }
 
 std::size_t TextBody::linesBefore(std::size_t offset) const noexcept {
@@ -79,8 +79,9 @@ Children TextBody::children(Range below, std::size_t depth) const {
         Child child{toElement(steps), nullptr, false, false};
         LineAddress const prefix = steps.prefix();
         if (!steps.next()) {
-            child.node = nodeOfLine(line(below.begin));
-            child.made = child.node == nullptr;
+            AddressState state = stateOfLine(line(below.begin));
+            child.node = std::move(state.node);
+            child.made = state.isCreated;
             ++below.begin;
         }
         std::size_t const end = endOf(below, prefix);
@@ -116,7 +117,8 @@ void BodyWriter::copy(TextBody::Range run) {
     std::size_t const first = old_.starts_[run.begin];
     std::size_t const last = old_.starts_[run.end - 1];
     std::size_t const end = last + old_.line(run.end - 1).size() + 1;
-    std::size_t const moved = written_.bytes_.size() - first; // wraps round where lines move forward
+    std::size_t const moved =
+        written_.bytes_.size() - first; // wraps around if lines move towards the beginning
     written_.bytes_.append(old_.bytes_, first, end - first);
     for (std::size_t i = run.begin; i < run.end; ++i) {
         written_.starts_.push_back(old_.starts_[i] + moved);
@@ -132,7 +134,7 @@ void BodyWriter::add(std::string_view line) {
 TextBody BodyWriter::finish() && {
     written_.bytes_ += endLine;
     written_.bytes_ += '\n';
-    written_.gapless_ = true;
+    written_.isGapless_ = true;
     return std::move(written_);
 }
 

@@ -11,11 +11,12 @@
 
 namespace project::stores {
 
-/// The bytes of a body, and where those of its lines begin that are canonical and in order: strictly sorted,
-/// so that an address is found by bisection. Lines are compared where they stand; nothing is kept of them.
+/// The bytes of a body, and the positions of its lines that are canonical and in order. These lines are
+/// strictly sorted, so that an address is found by bisection. Lines are compared in place; nothing else is
+/// stored of them.
 class TextBody {
 public:
-    /// Lines from one up to, and not with, another.
+    /// A half-open range of lines.
     struct Range {
         std::size_t begin;
         std::size_t end;
@@ -29,7 +30,7 @@ public:
 
     std::string const& bytes() const noexcept { return bytes_; }
 
-    /// How many lines can be found; those of the frame do not count.
+    /// The number of lines that can be found, without the first and the last line of the body.
     std::size_t size() const noexcept { return starts_.size(); }
 
     Range all() const noexcept { return {0, starts_.size()}; }
@@ -39,53 +40,54 @@ public:
 
     LineAddress address(std::size_t index) const noexcept;
 
-    /// The first line in a range that does not come before an address. Fast when it is near the beginning.
+    /// The first line in a range that does not come before an address. Fast if it is near the beginning.
     std::size_t lowerBound(Range range, LineAddress const& address) const noexcept;
 
-    /// The first line in a range that comes after all that lies within an address, when the range begins
-    /// with such a line or behind them. Fast when it is near the beginning.
+    /// The first line in a range that comes after all lines within an address. The range must begin with one
+    /// of these lines or after them. Fast if the result is near the beginning.
     std::size_t endOf(Range range, LineAddress const& address) const noexcept;
 
-    /// The lines whose addresses are an address or lie below it.
+    /// The lines at or below an address.
     Range within(LineAddress const& address) const noexcept;
 
     /// The line of exactly this address.
     std::optional<std::size_t> find(LineAddress const& address) const noexcept;
 
-    /// How many lines end, with their line ends, before a byte.
+    /// The number of lines that end, including their line ends, before a position.
     std::size_t linesBefore(std::size_t offset) const noexcept;
 
-    /// What stands directly below an address of this depth, by the lines strictly below it.
+    /// The children of an address of this depth. @param below the lines strictly below the address.
     Children children(Range below, std::size_t depth) const;
 
-    /// Notes a line that comes behind all those noted before, by the offset of its first byte.
+    /// Adds a line, which must come after all lines added before. @param start the position of its first
+    /// byte.
     void addLine(std::size_t start) { starts_.push_back(start); }
 
     void reserve(std::size_t lines) { starts_.reserve(lines); }
 
-    /// Drops what follows the body. @return what followed.
+    /// Truncates the bytes to a size. @return the rest.
     std::string cutAt(std::size_t size);
 
-    /// True when the lines stand one right behind the other.
-    bool isGapless() const noexcept { return gapless_; }
+    /// True if there is nothing between the lines.
+    bool isGapless() const noexcept { return isGapless_; }
 
-    void setGapless(bool gapless) noexcept { gapless_ = gapless; }
+    void setGapless(bool isGapless) noexcept { isGapless_ = isGapless; }
 
 private:
     friend class BodyWriter;
 
     std::string bytes_;
     std::vector<std::size_t> starts_;
-    bool gapless_ = false;
+    bool isGapless_ = false;
 };
 
-/// Puts a new canonical body together, from whole runs of lines of an old one and from new lines.
+/// Builds a new canonical body from runs of lines of an old body and from new lines.
 class BodyWriter {
 public:
-    /// @param old must outlive the writer. @param added how many bytes of new lines to expect.
+    /// @param old must outlive the writer. @param added the expected size of the new lines in bytes.
     BodyWriter(TextBody const& old, std::size_t added);
 
-    /// Takes over lines as they are.
+    /// Copies lines of the old body.
     void copy(TextBody::Range run);
 
     /// @param line without its end.

@@ -1,21 +1,123 @@
 #include "text/TextContent.hpp"
 
 #include <algorithm>
+#include <optional>
 #include <utility>
 
 #include "line/LineParser.hpp"
 #include "line/NodeLine.hpp"
-#include "text/OverlaidChildren.hpp"
 
 namespace project::stores {
 
 namespace {
 
-Standing standingOf(std::string_view line) {
-    Node node = nodeOfLine(line);
-    bool const made = node == nullptr;
-    return {std::move(node), made};
-}
+using metadata::PathElement;
+using Iterator = Overlay::Entries::const_iterator;
+
+/// Walks the lines of a body and the entries of an overlay below one address side by side, child by child.
+class ChildWalk {
+public:
+    ChildWalk(TextBody const& body, TextBody::Range lines, Overlay::Range entries, std::size_t depth)
+        : body_(body), lines_(lines), entry_(entries.begin()), end_(entries.end()), depth_(depth) {}
+
+    Children children() {
+        Children children;
+        while (!lines_.empty() || entry_ != end_) {
+            Child child = next();
+            if (child.node || child.made || child.hasChildren) {
+                children.push_back(std::move(child));
+            }
+        }
+        return children;
+    }
+
+private:
+    Child next() {
+        std::optional<PathElement> const inBody = lines_.empty() ? std::nullopt : elementOfLine();
+        std::optional<PathElement> const inOverlay = entry_ == end_ ? std::nullopt : elementOfEntry();
+        bool const isInBody = inBody && (!inOverlay || !(*inOverlay < *inBody));
+        bool const isInOverlay = inOverlay && (!inBody || !(*inBody < *inOverlay));
+        Child child{isInBody ? *inBody : *inOverlay, nullptr, false, false};
+        TextBody::Range lines{lines_.begin, lines_.begin};
+        if (isInBody) {
+            lines = takeLines(child);
+        }
+        Iterator const first = entry_;
+        if (isInOverlay) {
+            takeEntries(child, lines);
+        }
+        Iterator const below = first != entry_ && isChild(first->first) ? std::next(first) : first;
+        child.hasChildren = hasAnything(lines, below, entry_);
+        return child;
+    }
+
+    LineSteps stepsOfLine() const {
+        LineSteps steps(body_.address(lines_.begin));
+        for (std::size_t i = 0; i <= depth_; ++i) {
+            steps.next();
+        }
+        return steps;
+    }
+
+    std::optional<PathElement> elementOfLine() const { return toElement(stepsOfLine()); }
+
+    std::optional<PathElement> elementOfEntry() const { return entry_->first[depth_]; }
+
+    bool isChild(Address const& address) const { return address.depth() == depth_ + 1; }
+
+    static void setState(Child& child, AddressState state) {
+        child.node = std::move(state.node);
+        child.made = state.isCreated;
+    }
+
+    /// Takes the lines at and below the child. @return those strictly below it.
+    TextBody::Range takeLines(Child& child) {
+        LineSteps steps = stepsOfLine();
+        LineAddress const prefix = steps.prefix();
+        std::size_t const end = body_.endOf(lines_, prefix);
+        TextBody::Range below{lines_.begin, end};
+        if (!steps.next()) {
+            setState(child, stateOfLine(body_.line(lines_.begin)));
+            ++below.begin;
+        }
+        lines_.begin = end;
+        return below;
+    }
+
+    /// Takes the entries at and below the child. @param lines the lines below it; emptied if they are hidden.
+    void takeEntries(Child& child, TextBody::Range& lines) {
+        Iterator const first = entry_;
+        while (entry_ != end_ && entry_->first[depth_] == child.element) {
+            ++entry_;
+        }
+        if (!isChild(first->first)) {
+            return;
+        }
+        setState(child, first->second.state);
+        if (first->second.isHiding) {
+            lines.begin = lines.end;
+        }
+    }
+
+    /// True if an entry has a state, or a line is not hidden by the entries.
+    bool hasAnything(TextBody::Range lines, Iterator begin, Iterator end) const {
+        auto const hasState = [](auto const& entry) { return static_cast<bool>(entry.second.state); };
+        if (std::any_of(begin, end, hasState)) {
+            return true;
+        }
+        // All entries hide. Both are sorted, so the first line that is not hidden remains the first.
+        for (auto hiding = begin; hiding != end; ++hiding) {
+            lines.begin = body_.endOf(lines, AddressText(hiding->first).view());
+        }
+        return !lines.empty();
+    }
+
+    TextBody const& body_;
+    TextBody::Range lines_;
+    Iterator entry_;
+    Iterator end_;
+    std::size_t depth_;
+};
 
 } // namespace
 
@@ -24,29 +126,30 @@ Children TextContent::children(Address const& parent) const {
     TextBody::Range lines{0, 0};
     if (!overlay_.isHidden(parent)) {
         lines = body_.within(text.view());
-        bool const own = !lines.empty() && std::is_eq(compare(body_.address(lines.begin), text.view()));
-        lines.begin += own ? 1 : 0;
+        bool const hasOwnLine =
+            !lines.empty() && std::is_eq(compare(body_.address(lines.begin), text.view()));
+        lines.begin += hasOwnLine ? 1 : 0;
     }
     Overlay::Range const entries = overlay_.below(parent);
     if (entries.empty()) {
         return body_.children(lines, parent.depth());
     }
-    return overlaidChildren(body_, lines, entries, parent.depth());
+    return ChildWalk(body_, lines, entries, parent.depth()).children();
 }
 
-Standing TextContent::at(Address const& address) const {
+AddressState TextContent::at(Address const& address) const {
     Overlay::Entry const* const entry = overlay_.find(address);
     if (entry != nullptr) {
-        return entry->standing;
+        return entry->state;
     }
     if (overlay_.isHidden(address)) {
         return {};
     }
     auto const line = body_.find(AddressText(address).view());
-    return line ? standingOf(body_.line(*line)) : Standing{};
+    return line ? stateOfLine(body_.line(*line)) : AddressState{};
 }
 
-std::vector<Address> TextContent::standingWithin(Address const& address) const {
+std::vector<Address> TextContent::addressesWithin(Address const& address) const {
     std::vector<Address> found;
     TextBody::Range const lines = body_.within(AddressText(address).view());
     for (std::size_t i = lines.begin; i < lines.end; ++i) {
@@ -58,16 +161,16 @@ std::vector<Address> TextContent::standingWithin(Address const& address) const {
     std::erase_if(found, [this](Address const& candidate) {
         return overlay_.find(candidate) != nullptr || overlay_.isHidden(candidate);
     });
-    auto const addStanding = [&](Address const& candidate, Overlay::Entry const& entry) {
-        if (entry.standing) {
+    auto const addEntry = [&](Address const& candidate, Overlay::Entry const& entry) {
+        if (entry.state) {
             found.push_back(candidate);
         }
     };
     if (Overlay::Entry const* const own = overlay_.find(address)) {
-        addStanding(address, *own);
+        addEntry(address, *own);
     }
     for (auto const& [candidate, entry] : overlay_.below(address)) {
-        addStanding(candidate, entry);
+        addEntry(candidate, entry);
     }
     std::sort(found.begin(), found.end());
     return found;
@@ -77,9 +180,9 @@ void TextContent::apply(Change const& change) {
     if (!joins_.empty()) {
         auto const begin = joins_.lower_bound(change.address);
         auto end = begin;
-        bool const withAllBelow = change.kind == Change::Kind::Remove;
+        bool const isRemoval = change.kind == Change::Kind::Remove;
         while (end != joins_.end() &&
-               (withAllBelow ? end->first.isWithin(change.address) : end->first == change.address)) {
+               (isRemoval ? end->first.isWithin(change.address) : end->first == change.address)) {
             ++end;
         }
         joins_.erase(begin, end);
@@ -94,8 +197,8 @@ void TextContent::join(Change const& change) {
     }
     auto open = joins_.find(change.address);
     if (open == joins_.end()) {
-        Standing const earlier = at(change.address);
-        if (!earlier || (earlier.made && change.kind == Change::Kind::Set)) {
+        AddressState const earlier = at(change.address);
+        if (!earlier || (earlier.isCreated && change.kind == Change::Kind::Set)) {
             apply(change);
             return;
         }
@@ -130,14 +233,14 @@ TextBody TextContent::write(Batch const& batch) const {
         std::size_t const found = body_.lowerBound(rest, text.view());
         writer.copy({rest.begin, found});
         rest.begin = found;
-        if (entry.hides) {
+        if (entry.isHiding) {
             rest.begin = body_.endOf(rest, text.view());
         } else if (!rest.empty() && std::is_eq(compare(body_.address(found), text.view()))) {
             ++rest.begin;
         }
-        if (entry.standing) {
+        if (entry.state) {
             line.clear();
-            appendNodeLine(line, text, entry.standing.node);
+            appendNodeLine(line, text, entry.state.node);
             writer.add(line);
         }
     }

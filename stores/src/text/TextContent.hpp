@@ -4,6 +4,7 @@
 #include <utility>
 #include <vector>
 
+#include "line/AddressState.hpp"
 #include "node/NodeJoin.hpp"
 #include "project/stores/Change.hpp"
 #include "text/Overlay.hpp"
@@ -11,7 +12,8 @@
 
 namespace project::stores {
 
-/// What a text says: its body with everything laid over it that is not found there.
+/// The definition that a text contains: its body, and an overlay with everything that is not found in the
+/// body.
 class TextContent {
 public:
     TextContent() = default;
@@ -26,29 +28,31 @@ public:
 
     Children children(Address const& parent) const;
 
-    /// What stands at an address; nothing where it has no line.
-    Standing at(Address const& address) const;
+    /// The state of an address; empty if the address has no line.
+    AddressState at(Address const& address) const;
 
-    /// The addresses at which something stands and that are this one or lie below it, sorted.
-    std::vector<Address> standingWithin(Address const& address) const;
+    /// The addresses at or below an address that have a state, sorted.
+    std::vector<Address> addressesWithin(Address const& address) const;
 
-    /// Lays one step of a batch over what is there.
+    /// Applies one change of a batch.
     void apply(Change const& change);
 
-    /// Like apply, but what stands at an address already is joined with what is set there. What was joined
-    /// shows after finishJoining.
+    /// Like apply, but a node that is set is joined with the existing node. Joined nodes are visible after
+    /// finishJoining.
     void join(Change const& change);
 
-    /// To be called once after all that is joined.
+    /// Must be called once after the last join.
     void finishJoining();
 
-    /// A canonical body of all this, with a batch in it.
+    /// A canonical body with this content and a batch.
+    /// @throws StoreError if an address or a node of the batch is too deep for the text.
     TextBody write(Batch const& batch) const;
 
 private:
     TextBody body_;
     Overlay overlay_;
-    std::map<Address, NodeJoin> joins_; ///< what is being joined; stands instead of what is laid over there
+    std::map<Address, NodeJoin>
+        joins_; ///< the nodes that are being joined; they will replace those of the overlay
 };
 
 } // namespace project::stores

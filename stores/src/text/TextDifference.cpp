@@ -9,22 +9,22 @@ namespace project::stores {
 
 namespace {
 
-bool isSame(Standing const& left, Standing const& right) {
+bool isSame(AddressState const& left, AddressState const& right) {
     if (left.node == nullptr || right.node == nullptr) {
-        return left.node == right.node && left.made == right.made;
+        return left.node == right.node && left.isCreated == right.isCreated;
     }
     return left.node == right.node || isEqual(*left.node, *right.node);
 }
 
-/// Finds the addresses at which two contents may differ: where their bodies' lines differ, and wherever one
-/// says something else than its body does.
+/// Finds the addresses at which two contents may differ: those at which the lines of their bodies differ, and
+/// those that an overlay covers.
 class Candidates {
 public:
     Candidates(TextContent const& left, TextContent const& right) : left_(left), right_(right) {
         compareBodies();
         auto const ofBodies = found_.size();
-        lookThrough(left_);
-        lookThrough(right_);
+        addOverlay(left_);
+        addOverlay(right_);
         if (found_.size() > ofBodies) {
             std::sort(found_.begin(), found_.end());
             found_.erase(std::unique(found_.begin(), found_.end()), found_.end());
@@ -47,8 +47,8 @@ private:
                 ++r;
                 continue;
             }
-            bool const leftEnds = l == left.size();
-            auto const order = leftEnds            ? std::strong_ordering::greater
+            bool const isLeftAtEnd = l == left.size();
+            auto const order = isLeftAtEnd         ? std::strong_ordering::greater
                                : r == right.size() ? std::strong_ordering::less
                                                    : compare(left.address(l), right.address(r));
             found_.push_back(toAddress(std::is_gt(order) ? right.address(r) : left.address(l)));
@@ -57,16 +57,16 @@ private:
         }
     }
 
-    void lookThrough(TextContent const& content) {
+    void addOverlay(TextContent const& content) {
         for (auto const& [address, entry] : content.overlay().entries()) {
             found_.push_back(address);
-            if (entry.hides) {
-                lookAtHidden(content.body(), address);
+            if (entry.isHiding) {
+                addHidden(content.body(), address);
             }
         }
     }
 
-    void lookAtHidden(TextBody const& body, Address const& address) {
+    void addHidden(TextBody const& body, Address const& address) {
         TextBody::Range const hidden = body.within(AddressText(address).view());
         for (std::size_t i = hidden.begin; i < hidden.end; ++i) {
             found_.push_back(toAddress(body.address(i)));
@@ -80,8 +80,8 @@ private:
 
 } // namespace
 
-void addIfDifferent(std::vector<Difference>& found, Address const& address, Standing const& before,
-                    Standing const& after) {
+void addIfDifferent(std::vector<Difference>& found, Address const& address, AddressState const& before,
+                    AddressState const& after) {
     if (!isSame(before, after)) {
         found.push_back({address, before.node, after.node});
     }

@@ -6,13 +6,13 @@
 
 namespace project::stores {
 
-/// Where something else stands in one content than in the other, sorted.
+/// The addresses whose states differ between two contents, sorted.
 ///
-/// Compares lines as they stand; only where they differ, or something is laid over them, nodes are made.
+/// Compares lines, and creates nodes only where lines differ or an overlay covers them.
 std::vector<Difference> differences(TextContent const& before, TextContent const& after);
 
-/// Notes a difference if there is one.
-void addIfDifferent(std::vector<Difference>& found, Address const& address, Standing const& before,
-                    Standing const& after);
+/// Adds the difference between two states of an address, if there is one.
+void addIfDifferent(std::vector<Difference>& found, Address const& address, AddressState const& before,
+                    AddressState const& after);
 
 } // namespace project::stores

@@ -1,9 +1,24 @@
 #pragma once
 
 #include <cstddef>
+#include <string>
 #include <string_view>
 
 namespace project::stores {
+
+/// The first line of every text, without its line end.
+inline constexpr std::string_view firstLine = R"({"format":"project-definition","version":1})";
+
+/// The last line of every body, without its line end.
+inline constexpr std::string_view endLine = R"({"end":"project-definition"})";
+
+/// Checks the first line of a text.
+/// @param line without its end.
+/// @param hasEnd false if the text ends with this line and without a line end.
+/// @param file the name of the file in errors.
+/// @return false if the line is only the beginning of a first line.
+/// @throws StoreError if the file is not a project's text, or if it has a later format.
+bool checkFirstLine(std::string_view line, bool hasEnd, std::string const& file);
 
 /// One line of a text.
 struct TextLine {
@@ -13,19 +28,20 @@ struct TextLine {
 
     bool hasEnd() const noexcept { return whole.ends_with('\n'); }
 
-    bool endsPlainly() const noexcept { return whole.size() == text.size() + 1; }
+    /// True if the line ends with "\n" and not with "\r\n".
+    bool hasPlainEnd() const noexcept { return whole.size() == text.size() + 1; }
 };
 
-/// What a merge leaves in a text around lines that it could not merge.
+/// The conflict markers that a merge leaves in a text, around the lines that it could not merge.
 enum class MergeMarker {
     None,
     Ours,   ///< "<<<<<<<": the lines of one side follow
-    Base,   ///< "|||||||": the lines of their common ancestor follow
+    Base,   ///< "|||||||": the lines of the common ancestor follow
     Theirs, ///< "=======": the lines of the other side follow
     End,    ///< ">>>>>>>"
 };
 
-/// The marker that a line is. No line of the format begins like one.
+/// The conflict marker in a line, or None. No line of the format begins like a marker.
 inline MergeMarker mergeMarker(std::string_view line) noexcept {
     constexpr std::size_t length = 7;
     if (line.size() < length || (line.size() > length && line[length] != ' ') ||
@@ -46,10 +62,10 @@ inline MergeMarker mergeMarker(std::string_view line) noexcept {
     }
 }
 
-/// Goes through the lines of a text. A last line may lack its end.
+/// Iterates over the lines of a text. The last line may lack its end.
 class LineWalk {
 public:
-    /// @param offset where the first line begins. @param number that line's.
+    /// @param offset the position of the first line. @param number the number of that line.
     LineWalk(std::string_view text, std::size_t offset, std::size_t number) noexcept
         : text_(text), offset_(offset), number_(number) {}
 
@@ -68,7 +84,7 @@ public:
 
     TextLine const& line() const noexcept { return line_; }
 
-    /// Where the next line begins.
+    /// The position of the next line.
     std::size_t offset() const noexcept { return offset_; }
 
 private:

@@ -7,7 +7,6 @@
 #include "line/CanonicalLine.hpp"
 #include "line/LineParser.hpp"
 #include "text/ConflictReader.hpp"
-#include "text/TextFrame.hpp"
 #include "text/TextLines.hpp"
 #include "text/TextSum.hpp"
 #include "text/TextTail.hpp"
@@ -16,17 +15,17 @@ namespace project::stores {
 
 namespace {
 
-/// Goes through a text without merge markers, from its first line to its last.
+/// Reads a text without conflict markers, from its first line to its last.
 class Reader {
 public:
     explicit Reader(std::string bytes) : body_(reading_.content.body()) {
         constexpr std::size_t usualLine = 40;
         body_ = TextBody(std::move(bytes));
         body_.reserve(body_.bytes().size() / usualLine);
-        reading_.canonical = true;
+        reading_.isCanonical = true;
     }
 
-    enum class Outcome { Whole, Incomplete, Conflict };
+    enum class Outcome { Complete, Incomplete, Conflict };
 
     Outcome read(std::string const& file) {
         LineWalk first(body_.bytes(), 0, 1);
@@ -39,13 +38,13 @@ public:
         if (!checkFirstLine(first.line().text, first.line().hasEnd(), file)) {
             return Outcome::Incomplete;
         }
-        bool const plain = first.line().text == firstLine && first.line().endsPlainly();
+        bool const isFirstLinePlain = first.line().text == firstLine && first.line().hasPlainEnd();
         offset_ = first.offset();
         ++number_;
         Outcome const outcome = readBody();
-        body_.setGapless(reading_.canonical);
-        reading_.canonical = reading_.canonical && plain && endsPlainly_;
-        return outcome == Outcome::Whole ? readTailOf() : outcome;
+        body_.setGapless(reading_.isCanonical);
+        reading_.isCanonical = reading_.isCanonical && isFirstLinePlain && isEndPlain_;
+        return outcome == Outcome::Complete ? readTailOf() : outcome;
     }
 
     TextReading result() && { return std::move(reading_); }
@@ -71,16 +70,16 @@ private:
         return Outcome::Incomplete;
     }
 
-    /// Reads a line that is no path of plain characters in its place. @return the outcome if it is the last.
+    /// Reads a line that is not a plain path in order. @return the outcome if it is the last line.
     std::optional<Outcome> readLine() {
         LineWalk walk(body_.bytes(), offset_, number_);
         walk.next();
         TextLine const& line = walk.line();
         if (line.text == endLine) {
-            endsPlainly_ = line.endsPlainly();
+            isEndPlain_ = line.hasPlainEnd();
             bodySize_ = walk.offset();
             ++number_;
-            return Outcome::Whole;
+            return Outcome::Complete;
         }
         if (!line.hasEnd()) {
             return Outcome::Incomplete;
@@ -89,40 +88,40 @@ private:
             return Outcome::Conflict;
         }
         std::optional<LineAddress> const address =
-            line.endsPlainly() ? canonicalAddress(line.text) : std::nullopt;
+            line.hasPlainEnd() ? canonicalAddress(line.text) : std::nullopt;
         if (address && std::is_lt(compare(last_, *address))) {
             body_.addLine(offset_);
             last_ = *address;
         } else {
-            layOver(line);
+            addToOverlay(line);
         }
         offset_ = walk.offset();
         ++number_;
         return std::nullopt;
     }
 
-    /// Takes in what a line says that cannot be found among the others.
-    void layOver(TextLine const& line) {
-        reading_.canonical = false;
+    /// Puts a line that is not canonical or out of order into the overlay.
+    void addToOverlay(TextLine const& line) {
+        reading_.isCanonical = false;
         ParsedLine parsed = parseBodyLine(line.text);
         if (line.text.empty()) {
-            fault(Fault::Kind::Irregular, "an empty line");
+            fault(Fault::Kind::Irregular, "the line is empty");
         } else if (!parsed.change) {
             fault(Fault::Kind::Damage, parsed.problem);
             reading_.damage.emplace(line.number, line.whole);
         } else {
-            place(*parsed.change);
+            checkOrder(*parsed.change);
             reading_.content.join(*parsed.change);
         }
     }
 
-    void place(Change const& change) {
+    void checkOrder(Change const& change) {
         AddressText address(change.address);
         auto const order = compare(last_, address.view());
         if (std::is_gt(order)) {
-            fault(Fault::Kind::Irregular, "the line is not in its place");
+            fault(Fault::Kind::Irregular, "the line is out of order");
         } else if (std::is_eq(order)) {
-            fault(Fault::Kind::Irregular, "the line stands for the same address as the one before it");
+            fault(Fault::Kind::Irregular, "the line has the same address as the line before it");
         } else {
             lastText_ = std::move(address);
             last_ = lastText_.view();
@@ -139,27 +138,26 @@ private:
             }
             lines.push_back(walk.line());
         }
-        if (!lines.empty()) {
-            takeTail(lines);
-        }
+        bool const isTorn = !lines.empty() && readBatches(lines);
         reading_.content.finishJoining();
-        bool const ended = lines.empty() ? body_.bytes().ends_with('\n') : lines.back().hasEnd();
-        if (!ended && !reading_.torn) {
+        bool const hasEnd = lines.empty() ? body_.bytes().ends_with('\n') : lines.back().hasEnd();
+        if (!hasEnd && !isTorn) {
             number_ = lines.empty() ? number_ - 1 : lines.back().number;
             fault(Fault::Kind::Irregular, "the last line has no line end");
         }
-        return Outcome::Whole;
+        return Outcome::Complete;
     }
 
-    void takeTail(std::vector<TextLine> const& lines) {
+    /// @return true if the tail is torn.
+    bool readBatches(std::vector<TextLine> const& lines) {
         TextSum sum;
         sum.addLines(body_.bytes());
         TailReading tail = readTail(lines, sum.hex());
-        takeIn(reading_.content, tail);
+        applyTail(reading_.content, tail);
         std::move(tail.faults.begin(), tail.faults.end(), std::back_inserter(reading_.faults));
         reading_.damage.merge(tail.damage);
-        reading_.anchor = std::move(tail.anchor);
-        reading_.torn = tail.torn;
+        reading_.nextAfter = std::move(tail.nextAfter);
+        return tail.isTorn;
     }
 
     void fault(Fault::Kind kind, char const* problem) { reading_.faults.push_back({kind, number_, problem}); }
@@ -169,9 +167,9 @@ private:
     std::size_t offset_ = 0;
     std::size_t number_ = 1;
     std::size_t bodySize_ = 0;
-    bool endsPlainly_ = false;
+    bool isEndPlain_ = false;
     AddressText lastText_{Address::root()};
-    LineAddress last_ = lastText_.view(); ///< of the last line that is in its place
+    LineAddress last_ = lastText_.view(); ///< of the last line that is in order
 };
 
 } // namespace
@@ -179,7 +177,7 @@ private:
 std::optional<TextReading> readText(std::string bytes, std::string const& file) {
     Reader reader(std::move(bytes));
     switch (reader.read(file)) {
-    case Reader::Outcome::Whole:
+    case Reader::Outcome::Complete:
         return std::move(reader).result();
     case Reader::Outcome::Conflict:
         return readConflictedText(std::move(reader).takeBytes(), file);

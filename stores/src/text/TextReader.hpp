@@ -11,22 +11,21 @@
 
 namespace project::stores {
 
-/// Everything that is known of a text once it was read.
+/// The result of reading a text.
 struct TextReading {
     TextContent content;
-    std::string tail;                          ///< the bytes behind the body, as they are
+    std::string tail;                          ///< the bytes after the body
     std::vector<Fault> faults;                 ///< by line
     std::map<std::size_t, std::string> damage; ///< damaged lines with their ends, by number
-    std::string anchor;    ///< the sum that the next batch has to name; empty if never asked for
-    bool canonical = true; ///< the body is written as a writer would write it
-    bool torn = false;     ///< the tail ends in a batch that does not count
+    std::string nextAfter;   ///< the `after` of the next batch; empty if it was not computed
+    bool isCanonical = true; ///< of the body
 };
 
-/// Reads a text: checks its frame, notes where its lines begin while they are canonical and in order, lays
-/// everything else over them, and then the tail.
-/// @param file how to name the file in errors.
-/// @return nothing when the text is incomplete.
-/// @throws StoreError when it is not a project's text at all or of a later format.
+/// Reads a text. Checks its first and last line, stores the positions of the lines that are canonical and in
+/// order, and puts all other lines and the tail into the overlay.
+/// @param file the name of the file in errors.
+/// @return nothing if the text is incomplete.
+/// @throws StoreError if the file is not a project's text, or if it has a later format.
 std::optional<TextReading> readText(std::string bytes, std::string const& file);
 
 } // namespace project::stores

@@ -8,8 +8,8 @@ struct XXH3_state_s;
 
 namespace project::stores {
 
-/// The checksum over lines of the text: XXH3, 128 bits, in 32 lower-case hexadecimal digits. Line ends are
-/// left out, so that a tool which changes them changes no sum.
+/// The checksum of lines of a text: XXH3, 128 bits, as 32 lower-case hexadecimal digits. It does not cover
+/// line ends, so that a tool that converts them does not invalidate it.
 class TextSum {
 public:
     TextSum();

@@ -28,7 +28,7 @@ bool isSum(std::string_view text) noexcept {
     return text.size() == sumLength && text.find_first_not_of("0123456789abcdef") == std::string_view::npos;
 }
 
-std::string closingLine(std::size_t lines, std::string_view after, std::string_view sum) {
+std::string writeClosing(std::size_t lines, std::string_view after, std::string_view sum) {
     std::string line = R"({"batch":{"lines":)";
     line += std::to_string(lines);
     line += R"(,"after":")";
@@ -39,7 +39,8 @@ std::string closingLine(std::size_t lines, std::string_view after, std::string_v
     return line;
 }
 
-/// A closing line is taken only to the byte as it is written, so that no change of it goes unseen.
+/// Accepts a closing line only if it matches the written form to the byte, so that every changed byte is
+/// detected.
 std::optional<Closing> readClosing(std::string_view line) {
     constexpr std::string_view opening = R"({"batch":{"lines":)";
     constexpr std::string_view beforeAfter = R"(,"after":")";
@@ -49,16 +50,16 @@ std::optional<Closing> readClosing(std::string_view line) {
     }
     Closing closing{};
     char const* const end = line.data() + line.size();
-    char const* const behind = std::from_chars(line.data() + opening.size(), end, closing.lines).ptr;
-    std::string_view const rest(behind, static_cast<std::size_t>(end - behind));
+    char const* const afterNumber = std::from_chars(line.data() + opening.size(), end, closing.lines).ptr;
+    std::string_view const rest(afterNumber, static_cast<std::size_t>(end - afterNumber));
     if (rest.size() < beforeAfter.size() + sumLength + beforeSum.size() + sumLength) {
         return std::nullopt;
     }
     closing.after = rest.substr(beforeAfter.size(), sumLength);
     closing.sum = rest.substr(beforeAfter.size() + sumLength + beforeSum.size(), sumLength);
-    bool const whole = isSum(closing.after) && isSum(closing.sum) &&
-                       line == closingLine(closing.lines, closing.after, closing.sum);
-    return whole ? std::optional(closing) : std::nullopt;
+    bool const isValid = isSum(closing.after) && isSum(closing.sum) &&
+                         line == writeClosing(closing.lines, closing.after, closing.sum);
+    return isValid ? std::optional(closing) : std::nullopt;
 }
 
 std::string sumOf(Lines lines, std::string_view after) {
@@ -70,10 +71,10 @@ std::string sumOf(Lines lines, std::string_view after) {
     return sum.hex();
 }
 
-/// The changes of some lines, up to the first malformed one, which is then told.
+/// The changes of some lines, up to the first unreadable line.
 struct ParsedLines {
     Batch changes;
-    TextLine const* malformed = nullptr;
+    TextLine const* unreadable = nullptr;
     char const* problem = nullptr;
 };
 
@@ -82,7 +83,7 @@ ParsedLines parseLines(Lines lines) {
     for (TextLine const& line : lines) {
         ParsedLine one = parseLine(line.text);
         if (!one.change) {
-            parsed.malformed = &line;
+            parsed.unreadable = &line;
             parsed.problem = one.problem;
             break;
         }
@@ -93,127 +94,130 @@ ParsedLines parseLines(Lines lines) {
 
 class TailReader {
 public:
-    explicit TailReader(std::string anchor) { reading_.anchor = std::move(anchor); }
+    explicit TailReader(std::string after) { reading_.nextAfter = std::move(after); }
 
     TailReading read(Lines lines) {
         std::size_t begin = 0;
         for (std::size_t i = 0; i < lines.size(); ++i) {
             if (auto const closing = readClosing(lines[i].text)) {
-                batch(lines.subspan(begin, i - begin), lines[i], *closing);
+                readBatch(lines.subspan(begin, i - begin), lines[i], *closing);
                 begin = i + 1;
             }
         }
-        end(lines.subspan(begin));
+        finish(lines.subspan(begin));
         std::sort(reading_.faults.begin(), reading_.faults.end(),
                   [](Fault const& left, Fault const& right) { return left.line < right.line; });
         return std::move(reading_);
     }
 
 private:
-    /// Lines that may be damage or what a dead writer left: what follows them decides.
-    struct Open {
-        Lines lines; ///< with the closing line, if they have one
+    /// A batch with a wrong checksum. It is damage or part of a torn tail; the lines after it decide.
+    struct Suspect {
+        Lines lines; ///< including the closing line
         std::size_t line;
         std::string problem;
-        bool malformed;
+        bool isUnreadable; ///< a line of it is
     };
 
-    void batch(Lines before, TextLine const& closing, Closing const& told) {
-        std::size_t const count = std::min(told.lines, before.size());
+    /// @param before the lines since the previous closing line.
+    void readBatch(Lines before, TextLine const& closingLine, Closing const& closing) {
+        std::size_t const count = std::min(closing.lines, before.size());
         Lines const lines = before.last(count);
         ParsedLines parsed = parseLines(lines);
-        if (count < told.lines || sumOf(lines, told.after) != told.sum) {
-            suspect(before, closing);
-        } else if (parsed.malformed != nullptr) {
-            settle();
-            damage({lines.data(), count + 1}, parsed.malformed->number, parsed.problem);
+        if (count < closing.lines || sumOf(lines, closing.after) != closing.sum) {
+            addSuspect(before, closingLine);
+        } else if (parsed.unreadable != nullptr) {
+            addSuspectsAsDamage();
+            addDamage({lines.data(), count + 1}, parsed.unreadable->number, parsed.problem);
         } else {
-            rightBatch(before.first(before.size() - count), std::move(parsed.changes), closing, told);
+            addBatch(before.first(before.size() - count), std::move(parsed.changes), closingLine, closing);
         }
-        reading_.anchor = told.sum;
+        reading_.nextAfter = closing.sum;
     }
 
-    void suspect(Lines before, TextLine const& closing) {
+    void addSuspect(Lines before, TextLine const& closingLine) {
         Lines const lines{before.data(), before.size() + 1};
         ParsedLines const parsed = parseLines(before);
-        if (parsed.malformed != nullptr) {
-            open_.push_back({lines, parsed.malformed->number, parsed.problem, true});
+        if (parsed.unreadable != nullptr) {
+            suspects_.push_back({lines, parsed.unreadable->number, parsed.problem, true});
         } else {
-            open_.push_back(
-                {lines, closing.number, "the batch that ends here does not have its checksum", false});
+            suspects_.push_back(
+                {lines, closingLine.number, "the checksum of the batch that ends here is wrong", false});
         }
     }
 
-    void rightBatch(Lines leftOver, Batch changes, TextLine const& closing, Closing const& told) {
-        bool const afterDamage = !open_.empty() || !leftOver.empty();
-        settle();
-        if (!leftOver.empty()) {
-            damage(leftOver, leftOver.front().number, "a batch has no closing line");
+    /// Adds a valid batch. @param extra lines before it that belong to no batch.
+    void addBatch(Lines extra, Batch changes, TextLine const& closingLine, Closing const& closing) {
+        bool const isAfterDamage = !suspects_.empty() || !extra.empty();
+        addSuspectsAsDamage();
+        if (!extra.empty()) {
+            addDamage(extra, extra.front().number, "a batch has no closing line");
         }
-        bool const chains = afterDamage || told.after == reading_.anchor;
-        if (!chains) {
-            fault(Fault::Kind::Irregular, closing.number,
-                  "the batch that ends here was not written on top of what stands before it");
+        bool const isChained = isAfterDamage || closing.after == reading_.nextAfter;
+        if (!isChained) {
+            addFault(Fault::Kind::Irregular, closingLine.number,
+                     "the batch that ends here does not chain to the text before it");
         }
-        reading_.batches.push_back({std::move(changes), chains, std::string(told.sum)});
+        reading_.batches.push_back({std::move(changes), isChained, std::string(closing.sum)});
     }
 
-    void end(Lines leftOver) {
-        std::size_t torn = open_.size();
-        while (torn > 0 && open_[torn - 1].malformed) {
+    /// Decides on the suspects at the end of the tail and on the lines after the last closing line.
+    void finish(Lines extra) {
+        std::size_t torn = suspects_.size();
+        while (torn > 0 && suspects_[torn - 1].isUnreadable) {
             --torn;
         }
         std::optional<std::size_t> line;
-        if (torn < open_.size()) {
-            line = open_[torn].lines.front().number;
-        } else if (!leftOver.empty()) {
-            line = leftOver.front().number;
+        if (torn < suspects_.size()) {
+            line = suspects_[torn].lines.front().number;
+        } else if (!extra.empty()) {
+            line = extra.front().number;
         }
-        open_.resize(torn);
-        settle();
+        suspects_.resize(torn);
+        addSuspectsAsDamage();
         if (line) {
-            reading_.torn = true;
-            fault(Fault::Kind::TornTail, *line, "a batch was not written to its end");
+            reading_.isTorn = true;
+            addFault(Fault::Kind::TornTail, *line, "the batch that begins here is incomplete");
         }
     }
 
-    void settle() {
-        for (Open const& open : open_) {
-            damage(open.lines, open.line, open.problem);
+    void addSuspectsAsDamage() {
+        for (Suspect const& suspect : suspects_) {
+            addDamage(suspect.lines, suspect.line, suspect.problem);
         }
-        open_.clear();
+        suspects_.clear();
     }
 
-    void damage(Lines lines, std::size_t line, std::string problem) {
-        fault(Fault::Kind::Damage, line, std::move(problem));
+    void addDamage(Lines lines, std::size_t line, std::string problem) {
+        addFault(Fault::Kind::Damage, line, std::move(problem));
         for (TextLine const& damaged : lines) {
             reading_.damage.emplace(damaged.number, damaged.whole);
         }
     }
 
-    void fault(Fault::Kind kind, std::size_t line, std::string problem) {
+    void addFault(Fault::Kind kind, std::size_t line, std::string problem) {
         reading_.faults.push_back({kind, line, std::move(problem)});
     }
 
     TailReading reading_;
-    std::vector<Open> open_;
+    std::vector<Suspect> suspects_;
 };
 
 } // namespace
 
-TailReading readTail(std::vector<TextLine> const& lines, std::string anchor) {
-    return TailReader(std::move(anchor)).read(lines);
+TailReading readTail(std::vector<TextLine> const& lines, std::string after) {
+    return TailReader(std::move(after)).read(lines);
 }
 
-void takeIn(TextContent& content, TailReading const& tail) {
+void applyTail(TextContent& content, TailReading const& tail) {
     for (TailBatch const& batch : tail.batches) {
         for (Change const& change : batch.changes) {
-            batch.chains ? content.apply(change) : content.join(change);
+            batch.isChained ? content.apply(change) : content.join(change);
         }
     }
 }
 
-std::string writeBatch(Batch const& batch, std::string_view anchor) {
+std::string writeBatch(Batch const& batch, std::string_view after) {
     std::string text;
     TextSum sum;
     for (Change const& change : batch) {
@@ -223,8 +227,8 @@ std::string writeBatch(Batch const& batch, std::string_view anchor) {
         sum.add(std::string_view(text).substr(begin));
         text += '\n';
     }
-    sum.add(anchor);
-    text += closingLine(batch.size(), anchor, sum.hex());
+    sum.add(after);
+    text += writeClosing(batch.size(), after, sum.hex());
     text += '\n';
     return text;
 }

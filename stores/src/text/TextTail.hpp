@@ -13,32 +13,34 @@
 
 namespace project::stores {
 
-/// One batch of a tail that is right in itself.
+/// One valid batch of a tail.
 struct TailBatch {
     Batch changes;
-    bool chains; ///< it was written on top of what stands before it
+    bool isChained; ///< it was written on top of the text that precedes it
     std::string sum;
 };
 
-/// What the lines behind a body say.
+/// The content of the lines after a body.
 struct TailReading {
     std::vector<TailBatch> batches;
     std::vector<Fault> faults;
     std::map<std::size_t, std::string> damage; ///< damaged lines with their ends, by number
-    std::string anchor;                        ///< the sum that the next batch has to name
-    bool torn = false;
+    std::string nextAfter;                     ///< the `after` of the next batch
+    bool isTorn = false;
 };
 
-/// Reads batches: each is its lines and then a closing line, which tells how many they are, which sum was
-/// the last one before them, and the sum over all of that.
-/// @param anchor the sum of the body.
-TailReading readTail(std::vector<TextLine> const& lines, std::string anchor);
+/// Reads batches. A batch consists of its lines and a closing line with their number, the checksum that
+/// precedes the batch (`after`), and the batch's own checksum.
+/// @param after the checksum that precedes the lines: that of the body, or of the last batch before them.
+TailReading readTail(std::vector<TextLine> const& lines, std::string after);
 
-/// Applies the batches of a tail to what stands before it; those that do not chain are joined with it.
-void takeIn(TextContent& content, TailReading const& tail);
+/// Applies the batches of a tail to the content that precedes it. Batches that do not chain are joined with
+/// it.
+void applyTail(TextContent& content, TailReading const& tail);
 
-/// The lines of a batch with its closing line.
-/// @throws StoreError when a change is deeper than what the text can hold.
-std::string writeBatch(Batch const& batch, std::string_view anchor);
+/// The lines of a batch, including its closing line.
+/// @param after the checksum that precedes the batch.
+/// @throws StoreError if an address or a node of the batch is too deep for the text.
+std::string writeBatch(Batch const& batch, std::string_view after);
 
 } // namespace project::stores

@@ -9,10 +9,10 @@
 
 namespace project::stores {
 
-/// Whose version stands.
+/// One of the two sides of a merge.
 enum class MergeSide { Ours, Theirs };
 
-/// The same thing in the common version and in both that are merged.
+/// A value in the common version and in both sides of a merge.
 template <typename T>
 struct ThreeWay {
     T base;
@@ -25,41 +25,40 @@ struct ThreeWay {
 /// One step from a node down to one nested in it.
 struct NestedStep {
     std::u16string type;
-    std::u16string key;   ///< the key that tells it from its siblings, "UUID" or "Name"
-    std::u16string value; ///< and that key's value
-    std::size_t earlier;  ///< how many siblings that are told by the same come before it
+    std::u16string key;   ///< the identifying key, "UUID" or "Name"
+    std::u16string value; ///< the value of that key
+    std::size_t earlier;  ///< the number of preceding siblings with the same identity
 };
 
-/// Two changes that exclude each other, so that a person has to choose one.
+/// Two changes that the merge cannot combine, so that a person must choose one.
 struct MergeConflict {
     enum class Kind {
-        Key,     ///< a key that both set to different values, or that one changed and the other removed
-        Type,    ///< both gave the node another type
-        Nested,  ///< a nested node that one changed and the other removed
-        Subtree, ///< an address that one removed with all below it, where the other changed or added
-                 ///< something
+        Key,     ///< both sides set a key to different values, or one set and the other removed it
+        Type,    ///< both sides changed the node's type
+        Nested,  ///< one side changed a nested node and the other removed it
+        Subtree, ///< one side removed an address with everything below it, and the other changed or added
+                 ///< something there
     };
 
     Kind kind;
     Address address;
 
-    /// The way from the address's node down to the nested node that is meant; no steps for the node itself.
+    /// The path from the node of the address to the nested node; empty for the node itself.
     std::vector<NestedStep> nested;
 
-    /// Of Key: the key.
+    /// For Key: the key.
     std::u16string key;
 
-    /// Who removed it; nothing where both set or changed something.
+    /// The side that removed something; nothing if both sides set or changed something.
     std::optional<MergeSide> removedBy;
 
-    /// Of Key and Type: the values; nothing where a version does not have the key or the node.
+    /// For Key and Type: the values; nothing for a version without the key or the node.
     ThreeWay<std::optional<std::u16string>> values;
 
-    /// Of Nested and Subtree: the nodes; null where a version has none there.
+    /// For Nested and Subtree: the nodes; null for a version without the node.
     ThreeWay<Node> nodes;
 
-    /// Of Subtree: what the side that did not remove it added or changed, the address itself or what lies
-    /// below it, sorted.
+    /// For Subtree: the addresses that the other side added or changed, at or below the address, sorted.
     std::vector<Address> changed;
 };
 

@@ -19,17 +19,18 @@ public:
     TextMerge& operator=(TextMerge&&) noexcept;
     ~TextMerge();
 
-    /// What a person has to decide, by address; none when the merge is clean.
+    /// The conflicts that a person must resolve, sorted by address; none if the merge is clean.
     std::vector<MergeConflict> const& conflicts() const noexcept;
 
     /// The merged text: a canonical body without a tail.
-    /// @param choices whose version stands, one for each conflict in the order of conflicts().
-    /// @throws std::invalid_argument when they are not as many as the conflicts.
+    /// @param choices the side whose version wins, one for each conflict in the order of conflicts().
+    /// @throws std::invalid_argument if their number is not that of the conflicts.
     std::string text(std::vector<MergeSide> const& choices = {}) const;
 
-    /// The merged text with markers around the lines of each address in conflict, first ours, then those of
-    /// the common version, then theirs. Whatever is not in conflict is merged within them too. A store that
-    /// reads it counts both sides and refuses to write. Without conflicts the same as text().
+    /// The merged text with conflict markers around the lines of each address in conflict: first ours, then
+    /// those of the common version, then theirs. Everything in these lines that is not in conflict is merged.
+    /// A store that reads this text shows both sides and refuses writes. The same as text() if there are no
+    /// conflicts.
     std::string textWithMarkers() const;
 
 private:
@@ -43,17 +44,19 @@ private:
     std::unique_ptr<State const> state_;
 };
 
-/// Merges what three texts say, each with its tail laid over its body; none has to be canonical.
+/// Merges the definitions in three texts, each with its tail applied to its body. The texts need not be
+/// canonical.
 ///
-/// Nested nodes come in the order in which both sides have them; where these differ in the order of the side
-/// that moved them, and where both did in the one that comes first by identity. Those that only one side has
-/// stay behind what they follow there; where both sides put some in one place, those come first whose
-/// identity does. So exchanging ours and theirs gives the same text if there is no conflict.
+/// Nested nodes keep the order that both sides have. If the orders differ, the order of the side that moved
+/// nodes wins; if both moved them, the order that is smaller by identity. A node that only one side has stays
+/// behind the node that it follows there; if both sides added nodes in one position, those with the smaller
+/// identity come first. Exchanging ours and theirs therefore gives the same text if there is no conflict.
 ///
-/// Time and memory are in proportion to the texts. Reads and writes nothing on disk, takes no lock.
+/// Time and memory are proportional to the texts. Accesses no disk and takes no lock.
 ///
-/// @param base the version that both come from; an empty text when both made the project.
-/// @throws StoreError when one of the texts is incomplete, damaged, of a later format or holds the markers of
+/// @param base the common version; an empty text if both sides created the project.
+/// @throws StoreError if one of the texts is incomplete, damaged, of a later format, or contains conflict
+/// markers of
 ///         another merge. Its file is "base", "ours" or "theirs".
 PROJECT_STORES_EXPORT TextMerge mergeTexts(std::string_view base, std::string_view ours,
                                            std::string_view theirs);

@@ -1,4 +1,4 @@
-#include "node/NestedIdentity.hpp"
+#include "node/NestedNodes.hpp"
 
 #include "line/JsonText.hpp"
 #include "line/NodeLine.hpp"
@@ -26,6 +26,19 @@ std::string identityOf(MetadataNode const& node) {
         appendNestedNode(identity, node);
     }
     return identity;
+}
+
+void copyKeys(MetadataNode& target, MetadataNode const& from) {
+    for (std::u16string const& key : from.getKeys()) {
+        target.put(key, from.get(key));
+    }
+}
+
+void copyInto(MetadataNode& target, MetadataNode const& from) {
+    copyKeys(target, from);
+    for (auto const& child : from.getChildren()) {
+        copyInto(*target.addChild(child->getType()), *child);
+    }
 }
 
 } // namespace project::stores
