@@ -109,7 +109,8 @@ void Session::State::requireProject() const {
     std::error_code error; // what cannot be seen may be there: the store says why it cannot read it
     auto const status = std::filesystem::symlink_status(fl::filesystem::toSystem(file), error);
     if (status.type() == std::filesystem::file_type::not_found) {
-        throw stores::StoreError(fl::i18n::toUtf8(root.native()), 0, "there is no project in this folder",
+        throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(root.native()), 0,
+                                 "there is no project in this folder",
                                  "Check the path, or make a project there.");
     }
 }
@@ -171,8 +172,8 @@ Session Session::open(Path const& root, Options options) {
 Session Session::make(Path const& root, std::u16string const& name, Options options) {
     Session result(std::make_unique<State>(root, options));
     if (!result.state_->makeProject(name)) {
-        throw stores::StoreError(fl::i18n::toUtf8(result.root().native()), 0,
-                                 "there is a project in this folder already",
+        throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(result.root().native()),
+                                 0, "there is a project in this folder already",
                                  "Open it, or choose another folder.");
     }
     return result;

@@ -85,6 +85,7 @@ TEST(ProjectText, aLaterVersionAsksForANewerProgram) {
         ProjectText::read("{\"format\":\"project-definition\",\"version\":2,\"more\":[]}\n\"?\"\n", "f");
         FAIL() << "a later version was read";
     } catch (StoreError const& error) {
+        EXPECT_EQ(error.kind(), StoreError::Kind::Refused);
         EXPECT_EQ(error.getLine(), 1U);
         EXPECT_THAT(error.getProblem(), testing::HasSubstr("version 2"));
         EXPECT_THAT(error.getRemedy(), testing::HasSubstr("newer version of the program"));

@@ -11,9 +11,11 @@ namespace {
 static_assert(!std::is_base_of_v<exception::ProjectException, StoreError>);
 
 TEST(StoreError, namesTheFileTheLineTheProblemAndTheRemedy) {
-    StoreError const error("/p/project.jsonl", 12, "the line is damaged", "Restore it from source control.");
+    StoreError const error(StoreError::Kind::DiskFailed, "/p/project.jsonl", 12, "the line is damaged",
+                           "Restore it from source control.");
 
     EXPECT_STREQ(error.what(), "/p/project.jsonl:12: the line is damaged. Restore it from source control.");
+    EXPECT_EQ(error.kind(), StoreError::Kind::DiskFailed);
     EXPECT_EQ(error.getFile(), "/p/project.jsonl");
     EXPECT_EQ(error.getLine(), 12u);
     EXPECT_EQ(error.getProblem(), "the line is damaged");
@@ -21,14 +23,16 @@ TEST(StoreError, namesTheFileTheLineTheProblemAndTheRemedy) {
 }
 
 TEST(StoreError, leavesOutWhatIsNotThere) {
-    EXPECT_STREQ(StoreError("/p", 0, "no permission", "Ask the owner.").what(),
+    EXPECT_STREQ(StoreError(StoreError::Kind::DiskFailed, "/p", 0, "no permission", "Ask the owner.").what(),
                  "/p: no permission. Ask the owner.");
-    EXPECT_STREQ(StoreError("", 0, "the disk is full", "").what(), "the disk is full.");
-    EXPECT_STREQ(StoreError("", 5, "the disk is full", "").what(), "the disk is full.");
+    EXPECT_STREQ(StoreError(StoreError::Kind::DiskFailed, "", 0, "the disk is full", "").what(),
+                 "the disk is full.");
+    EXPECT_STREQ(StoreError(StoreError::Kind::DiskFailed, "", 5, "the disk is full", "").what(),
+                 "the disk is full.");
 }
 
 TEST(StoreError, recordsWhereItWasMadeAndACopyKeepsThat) {
-    StoreError const error("/p", 0, "no permission", "");
+    StoreError const error(StoreError::Kind::DiskFailed, "/p", 0, "no permission", "");
     StoreError const copy(error);
 
     EXPECT_FALSE(error.getStackTrace().getFrames().empty());
@@ -37,11 +41,11 @@ TEST(StoreError, recordsWhereItWasMadeAndACopyKeepsThat) {
 }
 
 TEST(StoreError, isCaughtAsAStandardExceptionButNotAsAnErrorOfTheProject) {
-    EXPECT_THROW(throw StoreError("", 0, "x", ""), std::exception);
+    EXPECT_THROW(throw StoreError(StoreError::Kind::DiskFailed, "", 0, "x", ""), std::exception);
     EXPECT_THROW(
         {
             try {
-                throw StoreError("", 0, "x", "");
+                throw StoreError(StoreError::Kind::DiskFailed, "", 0, "x", "");
             } catch (exception::ProjectException const&) {
                 FAIL() << "it was taken for stale data";
             }

@@ -58,11 +58,13 @@ public:
     }
 
     void make(std::vector<Address> const& addresses) {
+        auto after = content_;
         for (auto const& address : addresses) {
             if (!exists(address)) {
-                content_.emplace(address, "made");
+                after.emplace(address, "made");
             }
         }
+        content_ = std::move(after);
     }
 
     bool exists(Address const& address) const {
@@ -157,11 +159,6 @@ rc::Gen<Step> anyStep() {
 }
 
 /// True for the errors after which the batch may be in the project all the same.
-bool saysUnknown(std::string const& problem) {
-    return problem.find("nobody can tell") != std::string::npos ||
-           problem.find("could not be put back") != std::string::npos;
-}
-
 /// Two processes on one project, and what the project has to hold.
 class Processes {
 public:
@@ -183,7 +180,7 @@ public:
             isDone = true;
         } catch (StoreError const& error) {
             require(step.trouble != CrashingVolume::Trouble::None, error.what());
-            isUnknown = saysUnknown(error.getProblem());
+            isUnknown = error.kind() == StoreError::Kind::OutcomeUnknown;
         } catch (ProcessDied const&) {
             hasDied = true;
         }

@@ -233,7 +233,7 @@ TEST_F(TextBackendReading, aTextThatStaysIncompleteIsAnErrorAndNeverAnEmptyProje
         auto const error = errorOf([&] { contentOf(*open()); });
 
         EXPECT_EQ("/project/.projectdata/project.jsonl", error.getFile());
-        EXPECT_THAT(error.getProblem(), HasSubstr("ends before its last line"));
+        EXPECT_EQ(StoreError::Kind::Damaged, error.kind());
         EXPECT_THAT(error.getRemedy(), HasSubstr("git checkout"));
         EXPECT_THROW(commit(*open(), addFiles({u"c"})), StoreError);
         EXPECT_EQ(incomplete, text());
@@ -258,7 +258,7 @@ TEST_F(TextBackendReading, aTextThatVanishedIsWaitedForAndThenAnError) {
     auto const backend = open();
     contentOf(*backend);
     volume->remove("project.jsonl");
-    EXPECT_THAT(errorOf([&] { contentOf(*backend); }).getProblem(), HasSubstr("is gone"));
+    EXPECT_EQ(StoreError::Kind::Damaged, errorOf([&] { contentOf(*backend); }).kind());
     volume->beforeCall = [&](std::string const& call) {
         if (call == "pause") {
             volume->replaceFile("project.jsonl", textOf(addFiles({u"b"})));
@@ -361,6 +361,7 @@ TEST_F(TextBackendReading, aTextThatIsNoneOfOursIsAnErrorWithItsLine) {
 
     auto const error = errorOf([&] { contentOf(*open()); });
 
+    EXPECT_EQ(StoreError::Kind::Damaged, error.kind());
     EXPECT_EQ("/project/.projectdata/project.jsonl", error.getFile());
     EXPECT_EQ(1U, error.getLine());
 }

@@ -44,7 +44,7 @@ auto CrashingDisk::call(std::string const& name, Effect effect, Part part) {
     auto const trouble = volume_->nextTrouble(name);
     if (trouble == Trouble::Fails || trouble == Trouble::FailsForGood) {
         part(true);
-        throw StoreError(folder(), 0, "the disk fails at \"" + name + "\"", "");
+        throw StoreError(StoreError::Kind::DiskFailed, folder(), 0, "the disk fails at \"" + name + "\"", "");
     }
     if (trouble == Trouble::DiesBefore) {
         die();
@@ -76,7 +76,7 @@ void CrashingDisk::die() {
 
 CrashingVolume::Names& CrashingDisk::names() {
     if (!folder_) {
-        throw StoreError(folder(), 0, "is not open", "");
+        throw StoreError(StoreError::Kind::DiskFailed, folder(), 0, "is not open", "");
     }
     return folder_->names;
 }
@@ -96,7 +96,7 @@ bool CrashingDisk::isFailingForGood() const {
 std::shared_ptr<CrashingDisk::File> CrashingDisk::find(std::string const& name) {
     auto const found = volume_->find(names(), name);
     if (found == names().end()) {
-        throw StoreError(name, 0, "is not there", "");
+        throw StoreError(StoreError::Kind::DiskFailed, name, 0, "is not there", "");
     }
     return found->second;
 }
@@ -203,7 +203,7 @@ std::optional<FileContent> CrashingDisk::read(std::string const& name, std::uint
             return std::nullopt;
         }
         if (!identity->isRegular) {
-            throw StoreError(name, 0, "is no regular file", "");
+            throw StoreError(StoreError::Kind::Damaged, name, 0, "is no regular file", "");
         }
         auto const& bytes = find(name)->bytes;
         return FileContent{offset < bytes.size() ? bytes.substr(offset) : std::string(), *identity};
@@ -216,7 +216,8 @@ void CrashingDisk::writeWithinRoom(File& file, std::string_view bytes) {
     if (room && *room < bytes.size()) {
         volume_->write(file, bytes.substr(0, *room));
         volume_->room = 0;
-        throw StoreError(folder(), 0, "No space left on device", "Make room on the disk and try again.");
+        throw StoreError(StoreError::Kind::DiskFailed, folder(), 0, "No space left on device",
+                         "Make room on the disk and try again.");
     }
     if (room) {
         volume_->room = *room - bytes.size();
@@ -250,7 +251,7 @@ WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes
     auto const make = [&] {
         written_ = volume_->makeFile("");
         if (isTaken(name)) {
-            throw StoreError(name, 0, "is there already", "");
+            throw StoreError(StoreError::Kind::DiskFailed, name, 0, "is there already", "");
         }
         bind(name, written_);
         try {

@@ -111,7 +111,7 @@ void TextStore::prepareText(std::string text) const {
 void TextStore::failOnce(std::string call) const {
     volume->beforeCall = [call = std::move(call), hasFailed = false](std::string const& now) mutable {
         if (now == call && !std::exchange(hasFailed, true)) {
-            throw StoreError("", 0, "Input/output error", "");
+            throw StoreError(StoreError::Kind::DiskFailed, "", 0, "Input/output error", "");
         }
     };
 }

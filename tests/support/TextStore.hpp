@@ -86,7 +86,7 @@ StoreError errorOf(Call const& call) {
         return error;
     }
     ADD_FAILURE() << "no StoreError was thrown";
-    return StoreError("", 0, "none", "");
+    return StoreError(StoreError::Kind::DiskFailed, "", 0, "none", "");
 }
 
 /// A text store on a file system in memory.

@@ -48,7 +48,8 @@ private:
 
 void requireLength(std::uint64_t length, std::string const& name) {
     if (length > Disk::longestFile) {
-        throw StoreError(name, 0, "is longer than the 1 GiB that a project's text may have",
+        throw StoreError(StoreError::Kind::Damaged, name, 0,
+                         "is longer than the 1 GiB that a project's text may have",
                          "Move it away, and restore the project's own file.");
     }
 }
@@ -84,14 +85,16 @@ FileIdentity identifyOpenFile(int file, std::string const& name) {
         throwSystemError(name, "can't be looked at", errno);
     }
     if (!S_ISREG(status.st_mode)) {
-        throw StoreError(name, 0, "is no regular file", "Move it away, and restore the project's own file.");
+        throw StoreError(StoreError::Kind::Damaged, name, 0, "is no regular file",
+                         "Move it away, and restore the project's own file.");
     }
     return toIdentity(status);
 }
 
 void requireRoom(std::uint64_t length, std::string const& name) {
     if (length > Disk::longestFile) {
-        throw StoreError(name, 0, "would get longer than the 1 GiB that a project's text may have",
+        throw StoreError(StoreError::Kind::Refused, name, 0,
+                         "would get longer than the 1 GiB that a project's text may have",
                          "Split the project.");
     }
 }

@@ -138,7 +138,7 @@ bool SystemDisk::openFile(ForkSafeDescriptor& file, std::string const& name, int
         return false;
     }
     if (errno == ELOOP || errno == ENXIO) { // a link, or a pipe that nobody reads
-        throw StoreError(folder_.pathOf(name), 0,
+        throw StoreError(StoreError::Kind::Damaged, folder_.pathOf(name), 0,
                          errno == ELOOP ? "is a symbolic link" : "is no regular file",
                          "Move it away, and restore the project's own file.");
     }

@@ -49,8 +49,8 @@ char const* remedyFor(int error) {
 } // namespace
 
 void throwSystemError(std::string const& file, char const* action, int error) {
-    throw StoreError(file, 0, std::string(action) + ": " + std::generic_category().message(error),
-                     remedyFor(error));
+    throw StoreError(StoreError::Kind::DiskFailed, file, 0,
+                     std::string(action) + ": " + std::generic_category().message(error), remedyFor(error));
 }
 
 } // namespace project::stores

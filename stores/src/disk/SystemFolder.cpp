@@ -26,7 +26,8 @@ int SystemFolder::get() const {
 
 void SystemFolder::requireOwnProcess() const {
     if (folder_.isInForkedChild()) {
-        throw StoreError(path_, 0, "was opened by the process that this one was forked from",
+        throw StoreError(StoreError::Kind::Refused, path_, 0,
+                         "was opened by the process that this one was forked from",
                          "Open the project anew in the child.");
     }
 }
@@ -54,7 +55,8 @@ bool SystemFolder::openIn(int root) {
         throwSystemError(path_, "can't be looked at", errno);
     }
     if (!S_ISDIR(status.st_mode)) {
-        throw StoreError(path_, 0, S_ISLNK(status.st_mode) ? "is a symbolic link" : "is no folder",
+        throw StoreError(StoreError::Kind::Damaged, path_, 0,
+                         S_ISLNK(status.st_mode) ? "is a symbolic link" : "is no folder",
                          "Move it away: the store keeps a folder of its own there and follows no links.");
     }
     if (folder_.isOpen() && identity_.isSameFile(toIdentity(status))) {

@@ -114,10 +114,12 @@ void appendNestedNode(std::string& out, MetadataNode const& node) {
 
 void requireWritable(Change const& change) {
     if (change.address.depth() > deepestAddress) {
-        throw StoreError("", 0, "an address has more than 4096 steps", "Give the file a shorter path.");
+        throw StoreError(StoreError::Kind::Refused, "", 0, "an address has more than 4096 steps",
+                         "Give the file a shorter path.");
     }
     if (change.node && !nestsWithin(*change.node, deepestNesting)) {
-        throw StoreError("", 0, "a node has more than 100 levels of nested nodes", "");
+        throw StoreError(StoreError::Kind::Refused, "", 0, "a node has more than 100 levels of nested nodes",
+                         "");
     }
 }
 

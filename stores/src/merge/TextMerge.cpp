@@ -18,11 +18,13 @@ namespace {
 void requireSound(TextReading const& reading, char const* version) {
     for (Fault const& fault : reading.faults) {
         if (fault.kind == Fault::Kind::Damage) {
-            throw StoreError(version, fault.line, "the text is damaged: " + fault.problem,
+            throw StoreError(StoreError::Kind::Damaged, version, fault.line,
+                             "the text is damaged: " + fault.problem,
                              "Repair that version before you merge it.");
         }
         if (fault.kind == Fault::Kind::Conflict) {
-            throw StoreError(version, fault.line, "another merge left conflict markers",
+            throw StoreError(StoreError::Kind::Conflict, version, fault.line,
+                             "another merge left conflict markers",
                              "Resolve the conflicts in that version before you merge it.");
         }
     }
@@ -32,7 +34,8 @@ TextBody readBody(std::string_view text, char const* version) {
     std::optional<TextReading> reading = readText(std::string(text), version);
     if (!reading) {
         auto const lines = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
-        throw StoreError(version, lines + (text.empty() || text.back() != '\n' ? 1 : 0),
+        throw StoreError(StoreError::Kind::Damaged, version,
+                         lines + (text.empty() || text.back() != '\n' ? 1 : 0),
                          "the text ends before the last line of its body", "");
     }
     requireSound(*reading, version);

@@ -36,11 +36,12 @@ bool checkFirstLine(std::string_view line, bool hasEnd, std::string const& file)
     }
     FirstLine const first = readFirstLine(line);
     if (first.version > version) {
-        throw StoreError(file, 1, "the text has version " + std::to_string(first.version) + " of the format",
+        throw StoreError(StoreError::Kind::Refused, file, 1,
+                         "the text has version " + std::to_string(first.version) + " of the format",
                          "Use a newer version of the program.");
     }
     if (first.version != version || !first.isComplete) {
-        throw StoreError(file, 1, "the file is not a project definition",
+        throw StoreError(StoreError::Kind::Damaged, file, 1, "the file is not a project definition",
                          "Move the file away, or restore the right one, for example from source control.");
     }
     return hasEnd;

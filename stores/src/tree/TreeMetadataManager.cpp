@@ -1,6 +1,5 @@
 #include "project/stores/TreeMetadataManager.hpp"
 
-#include <algorithm>
 #include <set>
 #include <stdexcept>
 #include <utility>
@@ -81,7 +80,7 @@ void TreeMetadataManager::State::enter(Access access) {
 
 void TreeMetadataManager::State::requireNotWriting() const {
     if (writing) {
-        throw StoreError(fl::filesystem::toSystem(metadataRoot).string(), 0,
+        throw StoreError(StoreError::Kind::Refused, fl::filesystem::toSystem(metadataRoot).string(), 0,
                          "a listener wrote into the store while it was told of a write",
                          "Let it note what it wants to write, and write when the operation has returned.");
     }
@@ -188,13 +187,18 @@ void TreeMetadataManager::removeNodes(std::vector<Address>& paths) {
 void TreeMetadataManager::createPaths(std::vector<Address>& paths) {
     auto const guard = state_->lock.writeLock();
     state_->requireNotWriting();
-    Batch batch;
+    // Sorted, so that each address is created before those below it. Otherwise it would exist by then,
+    // because of them alone, and would be deleted with them.
+    std::set<Address> absent;
     for (auto const& path : paths) {
-        bool const comesAnyway = std::any_of(
-            batch.begin(), batch.end(), [&](Change const& change) { return change.address.isWithin(path); });
-        if (path.depth() > 0 && !comesAnyway && !state_->tree.exists(path)) {
-            batch.push_back({Change::Kind::Make, path, nullptr});
+        if (!state_->tree.exists(path)) {
+            absent.insert(path);
         }
+    }
+    absent.erase(Address::root());
+    Batch batch;
+    for (auto const& address : absent) {
+        batch.push_back({Change::Kind::Make, address, nullptr});
     }
     state_->write(*this, batch, ListenerList::Always::None);
 }

@@ -20,7 +20,7 @@ FileChanges NewStore::makeFiles() {
     auto text = ProjectText::empty();
     place(StoreFiles::text, text.body(), changes);
     if (made_.empty() || made_.back().name != StoreFiles::text) {
-        throw StoreError(disk_.folder() + "/" + StoreFiles::text, 0,
+        throw StoreError(StoreError::Kind::Busy, disk_.folder() + "/" + StoreFiles::text, 0,
                          "was made by another program at this moment, and the batch is not in the project",
                          "Try again.");
     }

@@ -43,7 +43,7 @@ Changes SeenText::look(milliseconds patience) {
     while (!lookOnce(changes, waited >= std::min(patience, longestWithoutText))) {
         if (waited >= patience) {
             throw StoreError(
-                pathOfText(disk_), 0,
+                StoreError::Kind::Damaged, pathOfText(disk_), 0,
                 seen_ ? "is gone, or ends before its last line" : "ends before its last line",
                 "If git or an editor is writing it, try again when that is done; otherwise bring "
                 "back a whole one, for instance with git checkout.");

@@ -37,7 +37,8 @@ void StoreWriter::append(std::string_view lines) {
     if (!isStillInPlace) {
         if (!disk_.isFolderInPlace()) {
             // It was moved away with the batch in it, which must not come back with it.
-            takeBack(written->identity, StoreError(pathOfText(), 0, "was moved away", ""));
+            takeBack(written->identity,
+                     StoreError(StoreError::Kind::Busy, pathOfText(), 0, "was moved away", ""));
         }
         throwReplaced();
     }
@@ -96,7 +97,7 @@ void StoreWriter::rewrite(ProjectText next) {
 
 void StoreWriter::requireKnownOutcome() const {
     if (isOutcomeUnknown_) {
-        throw StoreError(pathOfText(), 0,
+        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0,
                          "is not written any more, since an earlier write failed so that nobody can tell "
                          "whether its batch is in the project",
                          "Open the project anew, and look whether the last change is there.");
@@ -112,8 +113,8 @@ std::optional<StoreWriter::Put> StoreWriter::put(std::string_view bytes, FileIde
         disk_.sync();
         auto const swapping = StoreFiles::swapping(expected, file.identity);
         if (!disk_.renameToFree(name, swapping)) {
-            throw StoreError(disk_.folder() + "/" + swapping, 0, "stands in the way of a new text",
-                             "Move it away and try again.");
+            throw StoreError(StoreError::Kind::Damaged, disk_.folder() + "/" + swapping, 0,
+                             "stands in the way of a new text", "Move it away and try again.");
         }
         name = swapping;
         return swapIn(name, file, expected);
@@ -182,7 +183,7 @@ void StoreWriter::putBack(std::string const& name, FileIdentity const& ours) {
         disk_.syncFolder(); // or the batch could come back with a power cut
     } catch (StoreError const& failure) {
         loseTrack(ours);
-        throw StoreError(pathOfText(), 0,
+        throw StoreError(StoreError::Kind::OutcomeUnknown, pathOfText(), 0,
                          failure.getProblem() + "; the text that stood there is back, but after a power cut "
                                                 "nobody can tell whether the batch is in the project",
                          openAnewAfter(failure));
@@ -201,7 +202,7 @@ void StoreWriter::throwNotPutBack(std::string const& name, FileIdentity const& o
         // It keeps the name that it has, and the next writer puts it back or sets it aside.
     }
     throw StoreError(
-        pathOfText(), 0,
+        StoreError::Kind::OutcomeUnknown, pathOfText(), 0,
         "was perhaps replaced by another program while a batch was written, and could not be put back: "
         "it is " +
             aside + " now, and the text in its place has the batch",
@@ -238,7 +239,7 @@ void StoreWriter::takeBack(FileIdentity const& current, StoreError const& failur
         reason = second.getProblem();
     }
     loseTrack(current);
-    throw StoreError(pathOfText(), 0,
+    throw StoreError(StoreError::Kind::OutcomeUnknown, pathOfText(), 0,
                      failure.getProblem() + "; writing the text without the last batch failed too (" +
                          reason + "): nobody can tell whether the batch is in the project",
                      openAnewAfter(failure));
@@ -298,7 +299,7 @@ std::string StoreWriter::pathOfText() const {
 
 void StoreWriter::throwReplaced() const {
     throw StoreError(
-        pathOfText(), 0,
+        StoreError::Kind::Busy, pathOfText(), 0,
         "was replaced, changed or moved by another program at this moment, and the batch is not in "
         "the project",
         "Try again.");

@@ -132,7 +132,7 @@ bool TextBackend::State::lock(milliseconds patience) {
         }
         if (!disk_->lock(patience)) {
             auto const holder = disk_->lockHolder();
-            throw StoreError(disk_->folder(), 0,
+            throw StoreError(StoreError::Kind::Busy, disk_->folder(), 0,
                              "is being written by " + (holder.empty() ? "another process" : holder),
                              "Try again when that is done.");
         }
@@ -208,7 +208,9 @@ void TextBackend::State::requireNoFault(Fault::Kind kind, char const* remedy) co
     auto const found =
         std::find_if(faults.begin(), faults.end(), [kind](Fault const& fault) { return fault.kind == kind; });
     if (found != faults.end()) {
-        throw StoreError(pathOfText(), found->line, found->problem, remedy);
+        throw StoreError(kind == Fault::Kind::Conflict ? StoreError::Kind::Conflict
+                                                       : StoreError::Kind::Damaged,
+                         pathOfText(), found->line, found->problem, remedy);
     }
 }
 
@@ -223,7 +225,7 @@ FileChanges TextBackend::State::makeStore() {
         if (seen_.exists()) {
             // The batch was made for an empty project.
             throw StoreError(
-                pathOfText(), 0,
+                StoreError::Kind::Busy, pathOfText(), 0,
                 "was made by another process at this moment, and the batch is not in the project",
                 "Try again.");
         }
@@ -314,14 +316,15 @@ std::string TextBackend::State::repair() {
 void TextBackend::State::settle(std::string settled) {
     auto const next = ProjectText::read(std::move(settled), pathOfText());
     if (!next || hasFault(*next, Fault::Kind::Damage) || hasFault(*next, Fault::Kind::Conflict)) {
-        throw StoreError(pathOfText(), 0, "what should take the place of the text is no whole and sound text",
-                         "");
+        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0,
+                         "what should take the place of the text is no whole and sound text", "");
     }
     Unlocking const unlocking(*this);
     seen_.distrust();
     bool const isThere = lockAndLook(options_.patience);
     if (!isThere || !hasFault(seen_.text(), Fault::Kind::Conflict)) {
-        throw StoreError(pathOfText(), 0, "the text has no markers of a merge that could be settled", "");
+        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0,
+                         "the text has no markers of a merge that could be settled", "");
     }
     writer_.requireKnownOutcome();
     writer_.rewrite(next->rewrittenWith({}));

@@ -14,12 +14,6 @@ namespace {
 
 enum class Outcome { Done, Failed, NobodyCanTell, Died };
 
-/// True for the errors after which the batch may be in the project all the same.
-bool saysUnknown(StoreError const& error) {
-    return error.getProblem().find("nobody can tell") != std::string::npos ||
-           error.getProblem().find("could not be put back") != std::string::npos;
-}
-
 /// What a project may hold after a deed, as long as the power stays on.
 std::vector<Content> possibleAfter(Outcome outcome, Situation const& before, Deed const& deed) {
     switch (outcome) {
@@ -78,7 +72,7 @@ Outcome CrashPoints::perform(Deed& deed, CrashingVolume& volume, KindOfTrouble c
         deed.perform(deed);
         EXPECT_FALSE(deed.isRefused);
     } catch (StoreError const& error) {
-        outcome = saysUnknown(error) ? Outcome::NobodyCanTell : Outcome::Failed;
+        outcome = error.kind() == StoreError::Kind::OutcomeUnknown ? Outcome::NobodyCanTell : Outcome::Failed;
         EXPECT_TRUE(deed.isRefused || !volume.troubled().empty()) << error.what();
     } catch (ProcessDied const&) {
         // told by the trouble, since what must not throw keeps it to itself

@@ -73,7 +73,7 @@ private:
             commit(backend, batchOf(writer_, last_ + 1));
         } catch (StoreError const& error) {
             // Two may make the store at the same time, and one of them is told to try again.
-            if (error.getRemedy() != "Try again.") {
+            if (error.kind() != StoreError::Kind::Busy) {
                 throw;
             }
             parent_.say("refused " + number);

@@ -12,15 +12,6 @@ using testing::StartsWith;
 
 namespace project::test {
 
-namespace {
-
-bool saysUnknown(std::string const& problem) {
-    return problem.find("nobody can tell") != std::string::npos ||
-           problem.find("could not be put back") != std::string::npos;
-}
-
-} // namespace
-
 void SystemFaults::SetUpTestSuite() {
     if (std::filesystem::is_directory("/dev/shm")) {
         ::setenv("TMPDIR", "/dev/shm", 0);
@@ -69,7 +60,7 @@ void SystemFaults::checkAfterwards(SystemDeed const& deed, RealProject& project,
                                    std::optional<StoreError> const& error) {
     SystemCalls const withoutSyncs;
     auto const found = contentOf(*project.open(deed.options));
-    if (error && saysUnknown(error->getProblem())) {
+    if (error && error->kind() == StoreError::Kind::OutcomeUnknown) {
         EXPECT_THAT((std::vector<Content>{deed.before, deed.after}), Contains(found));
     } else {
         EXPECT_EQ(error ? deed.before : deed.after, found) << (error ? error->what() : "no error");

@@ -209,7 +209,7 @@ protected:
             ++tally->written;
         } catch (StoreError const& error) {
             // What git makes of these versions may be a conflict, but is never a text that nobody wrote.
-            if (error.getRemedy().find("damage") != std::string::npos) {
+            if (error.kind() == StoreError::Kind::Damaged) {
                 throw;
             }
             ++tally->refused;

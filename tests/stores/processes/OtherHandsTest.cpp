@@ -217,7 +217,7 @@ TEST_F(OtherHands, aTextThatGitCleansAwayIsAnErrorAndNoEmptyProject) {
     for (auto const& failing :
          {errorOf([&] { contentOf(*store); }), errorOf([&] { commit(*store, addFiles({u"new"})); })}) {
         EXPECT_EQ(textPath().string(), failing.getFile());
-        EXPECT_EQ("is gone, or ends before its last line", failing.getProblem());
+        EXPECT_EQ(StoreError::Kind::Damaged, failing.kind());
     }
     EXPECT_FALSE(filesystem::exists(textPath()));
     root.addFile("work/.projectdata/project.jsonl", saved);

@@ -8,20 +8,34 @@
 
 namespace project::stores {
 
-/// The store cannot do what it was asked: its disk fails, its text is damaged, somebody else holds it.
+/// An operation of the store failed: the disk failed, the text is damaged, or another process holds the lock.
 ///
-/// It is no project::exception::ProjectException: managers drop some of those as stale data, and a failing
-/// disk must never be taken for that.
+/// It is not a project::exception::ProjectException: managers drop some of those as stale data, and a failing
+/// disk must never be mistaken for stale data.
 class PROJECT_STORES_EXPORT StoreError : public computils::exception::StackTraceRecordingException {
 public:
-    /// @param file the file or folder that is meant, in UTF-8 as far as its name is; may be empty.
-    /// @param line the line of the file, counted from 1; 0 when no line is meant.
-    /// @param problem what is wrong, a clause without a full stop.
-    /// @param remedy what to do about it, a sentence; may be empty.
-    StoreError(std::string file, std::size_t line, std::string problem, std::string remedy);
+    /// The reason, as far as a caller can act on it. With every kind except OutcomeUnknown, the batch of the
+    /// failed operation is not in the project.
+    enum class Kind {
+        Refused,    ///< not possible with these arguments, in this process or with this version; do not retry
+        Busy,       ///< another process holds the lock, or another program changed the text just now; retry
+        Damaged,    ///< the text is unreadable or incomplete, or something else is in the place of a store's
+                    ///< file
+        Conflict,   ///< the text contains conflict markers
+        DiskFailed, ///< a system call failed: no space, no permission, an input/output error
+        OutcomeUnknown ///< the batch may be in the project or not; reopen the project and check
+    };
+
+    /// @param file the file or folder concerned, in UTF-8 as far as its name is; may be empty.
+    /// @param line the line of the file, counted from 1; 0 if the error does not concern a line.
+    /// @param problem the problem, as a clause without a full stop.
+    /// @param remedy the action that solves the problem, as a sentence; may be empty.
+    StoreError(Kind kind, std::string file, std::size_t line, std::string problem, std::string remedy);
 
     /// "file:line: problem. remedy", in UTF-8.
     char const* what() const noexcept override { return text_.c_str(); }
+
+    Kind kind() const noexcept { return kind_; }
 
     std::string const& getFile() const noexcept { return file_; }
 
@@ -32,6 +46,7 @@ public:
     std::string const& getRemedy() const noexcept { return remedy_; }
 
 private:
+    Kind kind_;
     std::string file_;
     std::size_t line_;
     std::string problem_;
