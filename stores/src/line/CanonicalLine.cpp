@@ -11,6 +11,7 @@ namespace {
 
 constexpr std::string_view pathOpening = R"({"file":")";
 constexpr std::string_view stepsOpening = R"({"at":[)";
+constexpr ConstantContent plainNodeTypeContent{plainNodeType};
 
 constexpr std::size_t longestSurelyShallowPath = deepestAddress;
 
@@ -39,7 +40,7 @@ public:
         std::optional<LineAddress> const address = line_.starts_with(pathOpening) ? file() : steps();
         std::size_t const afterAddress = at_;
         bool const isComplete =
-            address && (pass(R"(,"node":false)") || body("Info", 0)) && pass("}") && isAtEnd();
+            address && (pass(R"(,"node":false)") || body(plainNodeTypeContent, 0)) && pass("}") && isAtEnd();
         bool const isPlain = afterAddress + 1 == at_;
         if (!isComplete || (isPlain && address->form == LineAddress::Form::Names)) {
             return std::nullopt;

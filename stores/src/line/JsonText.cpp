@@ -5,46 +5,21 @@
 #include <cstdint>
 #include <cstring>
 
+#include "fl/i18n/CodePoints.hpp"
+
 namespace project::stores {
+
+using fl::i18n::decodeUtf8;
+using fl::i18n::isHighSurrogate;
+using fl::i18n::isLowSurrogate;
 
 namespace {
 
-constexpr char lowerDigits[] = "0123456789abcdef";
 constexpr int endOfContent = -1;
-
-bool isHighSurrogate(unsigned unit) noexcept {
-    return unit >= 0xD800 && unit < 0xDC00;
-}
-
-bool isLowSurrogate(unsigned unit) noexcept {
-    return unit >= 0xDC00 && unit < 0xE000;
-}
 
 /// True for a code unit that is written as one byte, without an escape.
 bool isPlainAscii(unsigned unit) noexcept {
     return unit >= 0x20 && unit < 0x80 && unit != '"' && unit != '\\';
-}
-
-/// The letter of the two-byte escape of a character, or 0 if it has none.
-char shortEscape(unsigned unit) noexcept {
-    switch (unit) {
-    case '"':
-        return '"';
-    case '\\':
-        return '\\';
-    case '\b':
-        return 'b';
-    case '\f':
-        return 'f';
-    case '\n':
-        return 'n';
-    case '\r':
-        return 'r';
-    case '\t':
-        return 't';
-    default:
-        return 0;
-    }
 }
 
 /// The character of a two-byte escape by its letter, or -1 if there is no such escape.
@@ -71,33 +46,6 @@ int unescaped(char letter) noexcept {
     }
 }
 
-void appendEscaped(std::string& out, unsigned unit) {
-    out += '\\';
-    if (char const letter = shortEscape(unit)) {
-        out += letter;
-        return;
-    }
-    out += 'u';
-    for (int shift = 12; shift >= 0; shift -= 4) {
-        out += lowerDigits[(unit >> shift) & 0xF];
-    }
-}
-
-void appendUtf8(std::string& out, char32_t point) {
-    auto const byte = [&out](char32_t value) { out += static_cast<char>(static_cast<unsigned char>(value)); };
-    if (point < 0x800) {
-        byte(0xC0 | (point >> 6));
-    } else if (point < 0x10000) {
-        byte(0xE0 | (point >> 12));
-        byte(0x80 | ((point >> 6) & 0x3F));
-    } else {
-        byte(0xF0 | (point >> 18));
-        byte(0x80 | ((point >> 12) & 0x3F));
-        byte(0x80 | ((point >> 6) & 0x3F));
-    }
-    byte(0x80 | (point & 0x3F));
-}
-
 int hexDigit(char c) noexcept {
     if (c >= '0' && c <= '9') {
         return c - '0';
@@ -122,42 +70,6 @@ int fourDigits(std::string_view text, std::size_t from) noexcept {
         unit = unit * 16 + digit;
     }
     return unit;
-}
-
-/// The length in bytes of the character at a position, or 0 if it is not well-formed UTF-8.
-std::size_t utf8Length(std::string_view text, std::size_t from) noexcept {
-    auto const byte = [&](std::size_t i) {
-        return from + i < text.size() ? static_cast<unsigned char>(text[from + i]) : 0U;
-    };
-    auto const follows = [&](std::size_t i, unsigned low = 0x80, unsigned high = 0xBF) {
-        return byte(i) >= low && byte(i) <= high;
-    };
-    unsigned const lead = byte(0);
-    if (lead >= 0xC2 && lead <= 0xDF) {
-        return follows(1) ? 2 : 0;
-    }
-    if (lead >= 0xE0 && lead <= 0xEF) {
-        bool const second = follows(1, lead == 0xE0 ? 0xA0 : 0x80, lead == 0xED ? 0x9F : 0xBF);
-        return second && follows(2) ? 3 : 0;
-    }
-    if (lead >= 0xF0 && lead <= 0xF4) {
-        bool const second = follows(1, lead == 0xF0 ? 0x90 : 0x80, lead == 0xF4 ? 0x8F : 0xBF);
-        return second && follows(2) && follows(3) ? 4 : 0;
-    }
-    return 0;
-}
-
-char32_t decodeUtf8(std::string_view bytes) noexcept {
-    auto const tail = [&](std::size_t i) { return static_cast<char32_t>(bytes[i]) & 0x3F; };
-    auto const lead = static_cast<char32_t>(static_cast<unsigned char>(bytes[0]));
-    switch (bytes.size()) {
-    case 2:
-        return ((lead & 0x1F) << 6) | tail(1);
-    case 3:
-        return ((lead & 0x0F) << 12) | (tail(1) << 6) | tail(2);
-    default:
-        return ((lead & 0x07) << 18) | (tail(1) << 12) | (tail(2) << 6) | tail(3);
-    }
 }
 
 /// Iterates over the code units of a well-formed content.
@@ -191,14 +103,13 @@ private:
     }
 
     int character() noexcept {
-        std::size_t const length = utf8Length(content_, at_);
-        char32_t const point = decodeUtf8(content_.substr(at_, length));
+        auto const [codePoint, length] = decodeUtf8(content_, at_);
         at_ += length;
-        if (point < 0x10000) {
-            return static_cast<int>(point);
+        if (codePoint < fl::i18n::firstOfFourBytes) {
+            return static_cast<int>(codePoint);
         }
-        pending_ = static_cast<int>(0xDC00 + ((point - 0x10000) & 0x3FF));
-        return static_cast<int>(0xD800 + ((point - 0x10000) >> 10));
+        pending_ = fl::i18n::lowSurrogate(codePoint);
+        return fl::i18n::highSurrogate(codePoint);
     }
 
     std::string_view content_;
@@ -223,8 +134,8 @@ public:
         if (unit < 0) {
             return 0;
         }
-        noteUnit(static_cast<unsigned>(unit), text.substr(at + 2, 4), isAfterHigh);
-        if (isHighSurrogate(static_cast<unsigned>(unit))) {
+        noteUnit(static_cast<char32_t>(unit), text.substr(at + 2, 4), isAfterHigh);
+        if (isHighSurrogate(static_cast<char32_t>(unit))) {
             endOfHigh_ = at + 6;
         }
         return 6;
@@ -235,8 +146,8 @@ public:
 private:
     /// Canonical are only escapes of control characters without a short escape and of lone surrogates. Two
     /// escapes that form a pair represent a character that UTF-8 can encode.
-    void noteUnit(unsigned unit, std::string_view digits, bool isAfterHigh) noexcept {
-        bool const isControl = unit < 0x20 && shortEscape(unit) == 0;
+    void noteUnit(char32_t unit, std::string_view digits, bool isAfterHigh) noexcept {
+        bool const isControl = unit < 0x20 && fl::i18n::jsonEscapeLetter(unit) == 0;
         bool const isLone = isHighSurrogate(unit) || (isLowSurrogate(unit) && !isAfterHigh);
         bool const hasUpperCase =
             std::any_of(digits.begin(), digits.end(), [](char c) { return c >= 'A' && c <= 'F'; });
@@ -248,37 +159,6 @@ private:
 };
 
 } // namespace
-
-void appendJsonContent(std::string& out, std::u16string_view text) {
-    std::size_t i = 0;
-    while (i < text.size()) {
-        auto const stop =
-            std::find_if_not(text.begin() + static_cast<std::ptrdiff_t>(i), text.end(), isPlainAscii);
-        auto const run = static_cast<std::size_t>(stop - text.begin()) - i;
-        if (run > 0) {
-            std::size_t const size = out.size();
-            out.resize(size + run);
-            std::transform(text.data() + i, text.data() + i + run, out.data() + size,
-                           [](char16_t unit) { return static_cast<char>(unit); });
-            i += run;
-            continue;
-        }
-        char16_t const unit = text[i++];
-        if (isHighSurrogate(unit) && i < text.size() && isLowSurrogate(text[i])) {
-            appendUtf8(out, 0x10000 + ((char32_t{unit} - 0xD800) << 10) + (char32_t{text[i++]} - 0xDC00));
-        } else if (unit < 0x80 || isHighSurrogate(unit) || isLowSurrogate(unit)) {
-            appendEscaped(out, unit);
-        } else {
-            appendUtf8(out, unit);
-        }
-    }
-}
-
-void appendJsonString(std::string& out, std::u16string_view text) {
-    out += '"';
-    appendJsonContent(out, text);
-    out += '"';
-}
 
 std::u16string decodeJsonContent(std::string_view content) {
     std::u16string text;
@@ -353,7 +233,7 @@ JsonContentScan scanJsonContent(std::string_view text, std::size_t from) noexcep
             }
             at += length;
         } else {
-            std::size_t const length = utf8Length(text, at);
+            std::size_t const length = decodeUtf8(text, at).length;
             if (length == 0) {
                 return {at, false, "a string is not valid UTF-8"};
             }

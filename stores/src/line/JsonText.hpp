@@ -1,9 +1,14 @@
 #pragma once
 
+#include <array>
 #include <compare>
 #include <cstddef>
+#include <initializer_list>
+#include <stdexcept>
 #include <string>
 #include <string_view>
+
+#include "fl/i18n/JsonString.hpp"
 
 namespace project::stores {
 
@@ -11,11 +16,30 @@ namespace project::stores {
 // control characters are escaped, and so is a surrogate without its partner, which UTF-8 cannot encode. Each
 // sequence of code units has one canonical content, and each content represents one sequence.
 
-/// Appends the canonical content for a text, without quotes.
-void appendJsonContent(std::string& out, std::u16string_view text);
+using fl::i18n::appendJsonContent;
+using fl::i18n::appendJsonString;
 
-/// Appends a text as a canonical JSON string, with its quotes.
-void appendJsonString(std::string& out, std::u16string_view text);
+/// The content of constants that are written without escapes, computed by the compiler.
+class ConstantContent {
+public:
+    /// @param parts printable ASCII; they are joined.
+    consteval ConstantContent(std::initializer_list<std::u16string_view> parts) {
+        for (std::u16string_view const part : parts) {
+            for (char16_t const unit : part) {
+                if (unit >= 0x7F) {
+                    throw std::invalid_argument("not ASCII");
+                }
+                bytes_.at(size_++) = static_cast<char>(unit);
+            }
+        }
+    }
+
+    constexpr operator std::string_view() const noexcept { return {bytes_.data(), size_}; }
+
+private:
+    std::array<char, 32> bytes_{};
+    std::size_t size_ = 0;
+};
 
 /// The text that a content represents. @param content well-formed according to scanJsonContent.
 std::u16string decodeJsonContent(std::string_view content);

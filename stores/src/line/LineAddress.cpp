@@ -5,23 +5,26 @@
 #include <vector>
 
 #include "line/JsonText.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::stores {
 
 namespace {
 
-constexpr std::u16string_view filesType = u"Files";
-constexpr std::u16string_view filesLocation = u"Root";
-constexpr std::u16string_view nameType = u"File";
-constexpr std::u16string_view markerType = u"DIR_SIGNIFIER";
-constexpr std::u16string_view markerLocation = u"1";
+namespace schema = metadata::schema::files;
 
-constexpr std::string_view filesTypeContent = "Files";
-constexpr std::string_view filesLocationContent = "Root";
-constexpr std::string_view filesContent = R"("Files","Root")";
-constexpr std::string_view nameTypeContent = "File";
-constexpr std::string_view markerTypeContent = "DIR_SIGNIFIER";
-constexpr std::string_view markerLocationContent = "1";
+constexpr std::u16string_view filesType = schema::filesType;
+constexpr std::u16string_view filesLocation = schema::fileListScope;
+constexpr std::u16string_view nameType = schema::fileType;
+constexpr std::u16string_view markerType = schema::markerType;
+constexpr std::u16string_view markerLocation = schema::markerLocation;
+
+constexpr ConstantContent filesTypeContent{filesType};
+constexpr ConstantContent filesLocationContent{filesLocation};
+constexpr ConstantContent filesSteps{u"\"", filesType, u"\",\"", filesLocation, u"\""};
+constexpr ConstantContent nameTypeContent{nameType};
+constexpr ConstantContent markerTypeContent{markerType};
+constexpr ConstantContent markerLocationContent{markerLocation};
 
 bool isPath(LineAddress const& address) noexcept {
     return address.form == LineAddress::Form::Names;
@@ -118,7 +121,7 @@ std::string_view LineSteps::quoted() noexcept {
 
 LineAddress LineSteps::prefix() const noexcept {
     if (isPath(address_) && depth_ == 1) {
-        return {LineAddress::Form::Steps, filesContent};
+        return {LineAddress::Form::Steps, filesSteps};
     }
     return {address_.form, address_.text.substr(0, at_)};
 }

@@ -5,12 +5,13 @@
 
 #include "line/LineAddress.hpp"
 #include "project/metadata/MetadataNode.hpp"
+#include "project/metadata/TreeSchema.hpp"
 #include "project/stores/Change.hpp"
 
 namespace project::stores {
 
 /// The type of most nodes. Lines omit it.
-inline constexpr std::u16string_view plainNodeType = u"Info";
+inline constexpr std::u16string_view plainNodeType = metadata::schema::nodeType;
 
 /// The maximum number of levels of nested nodes. It bounds the recursion of readers.
 inline constexpr std::size_t deepestNesting = 100;
