@@ -115,12 +115,12 @@ private:
         std::string_view previous;
         std::string_view key;
         std::string_view value;
-        for (bool first = true; first || pass(","); first = false) {
-            if (first && !pass("{")) {
+        for (bool isFirst = true; isFirst || pass(","); isFirst = false) {
+            if (isFirst && !pass("{")) {
                 return false;
             }
             if (!string(key) || !pass(":") || !string(value) ||
-                (!first && std::is_gteq(compareJsonContents(previous, key)))) {
+                (!isFirst && std::is_gteq(compareJsonContents(previous, key)))) {
                 return false;
             }
             previous = key;
