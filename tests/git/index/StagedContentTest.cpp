@@ -40,13 +40,15 @@ TEST_F(StagedContent, withoutLinksAFileInPlaceOfALinkStaysOne) {
 }
 
 TEST_F(StagedContent, contentIsConvertedAsItsAttributesSay) {
-    repository.write(".gitattributes", "*.txt text\n*.crlf text eol=crlf\n*.id ident\n*.bin binary\n"
-                                       "*.utf8 working-tree-encoding=utf-8\n*.none filter=unknown\n");
-    for (auto const* const name : {"a.txt", "a.crlf", "a.bin", "a.none", "a.utf8", "d/a.txt"}) {
+    repository.write(
+        ".gitattributes",
+        "*.txt text\n*.crlf text eol=crlf\n*.id ident\n*.bin binary\n"
+        "*.utf8 working-tree-encoding=utf-8\nd/*.txt working-tree-encoding=utf8\n*.none filter=unknown\n");
+    for (auto const* const name : {"a.txt", "a.crlf", "a.bin", "a.none", "b.none", "a.utf8", "d/a.txt"}) {
         repository.write(name, "1\r\n2\r\n");
     }
     repository.write("a.id", "$Id: old $\n");
-    expectAddedAsGitDoes({"a.txt", "a.crlf", "a.bin", "a.none", "a.utf8", "d/a.txt", "a.id"});
+    expectAddedAsGitDoes({"a.txt", "a.crlf", "a.bin", "a.none", "b.none", "a.utf8", "d/a.txt", "a.id"});
 }
 
 TEST_F(StagedContent, contentIsConvertedAsTheConfigurationSays) {

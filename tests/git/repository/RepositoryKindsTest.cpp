@@ -9,33 +9,6 @@
 namespace project::git {
 namespace {
 
-/// Sets a variable of this process until the object goes.
-class Variable {
-public:
-    Variable(char const* name, std::string const& value) : name_(name) { ::setenv(name, value.c_str(), 1); }
-
-    ~Variable() { ::unsetenv(name_); }
-
-    Variable(Variable const&) = delete;
-    Variable& operator=(Variable const&) = delete;
-
-private:
-    char const* name_;
-};
-
-class WorkingFolder {
-public:
-    explicit WorkingFolder(std::filesystem::path const& folder) { std::filesystem::current_path(folder); }
-
-    ~WorkingFolder() { std::filesystem::current_path(before_); }
-
-    WorkingFolder(WorkingFolder const&) = delete;
-    WorkingFolder& operator=(WorkingFolder const&) = delete;
-
-private:
-    std::filesystem::path before_ = std::filesystem::current_path();
-};
-
 class RepositoryKinds : public RepositoriesTest {};
 
 TEST_F(RepositoryKinds, aPlainRepository) {
@@ -121,6 +94,22 @@ TEST_F(RepositoryKinds, aSubmoduleSeenFromOutside) {
     expectStates(outer, adapter);
 }
 
+TEST_F(RepositoryKinds, aFileInPlaceOfASubmoduleIs7AndARepositoryWithoutACommit1) {
+    committed("library");
+    auto const outer = committed("work");
+    outer.run({"submodule", "--quiet", "add", (folder.onDisk() / "library").string(), "sub"});
+    outer.commitAll();
+    GitAdapter adapter(outer.root());
+    outer.remove("sub");
+    outer.write("sub");
+    expectStates(outer, adapter);
+    EXPECT_EQ(outer.adapterStates(adapter, {"sub"}).at("sub"), 7);
+    outer.remove("sub");
+    GitRepository::init(folder.addFolder("work/sub"));
+    expectStates(outer, adapter);
+    EXPECT_EQ(outer.adapterStates(adapter, {"sub"}).at("sub"), 1);
+}
+
 TEST_F(RepositoryKinds, aWorkTreeWhoseRepositoryLiesElsewhere) {
     auto const work = folder.addFolder("work");
     runGit(folder.onDisk(),
@@ -131,63 +120,6 @@ TEST_F(RepositoryKinds, aWorkTreeWhoseRepositoryLiesElsewhere) {
     GitAdapter adapter(repository.root());
     expectAgreement(repository, adapter);
     EXPECT_FALSE(std::filesystem::is_directory(work / ".git"));
-}
-
-TEST_F(RepositoryKinds, aWorkTreeThatTheRepositoryNames) {
-    auto const meta = committed("meta");
-    auto const work = folder.addFolder("work");
-    meta.run({"config", "core.worktree", work.string()});
-    std::filesystem::rename(meta.onDisk() / "kept", work / "kept");
-    Variable const gitDir("GIT_DIR", meta.onDisk() / ".git");
-    GitRepository const repository(work, {{"GIT_DIR", meta.onDisk() / ".git"}});
-    GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
-    expectAgreement(repository, adapter);
-}
-
-TEST_F(RepositoryKinds, theEnvironmentNamesRepositoryWorkTreeAndIndex) {
-    auto const meta = committed("meta");
-    auto const work = folder.addFolder("work");
-    Variable const gitDir("GIT_DIR", meta.onDisk() / ".git");
-    Variable const workTree("GIT_WORK_TREE", work);
-    Variable const index("GIT_INDEX_FILE", folder.onDisk() / "index");
-    GitRepository const repository(work, {{"GIT_DIR", meta.onDisk() / ".git"},
-                                          {"GIT_WORK_TREE", work},
-                                          {"GIT_INDEX_FILE", folder.onDisk() / "index"}});
-    repository.write("kept");
-    repository.run({"add", "-A"});
-    GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
-    auto const before = meta.index();
-    expectAgreement(repository, adapter);
-    EXPECT_EQ(meta.index(), before);
-}
-
-TEST_F(RepositoryKinds, withARepositoryInTheEnvironmentAloneTheWorkingFolderIsTheWorkTree) {
-    auto const meta = committed("meta");
-    GitRepository const repository(folder.addFolder("work"), {{"GIT_DIR", meta.onDisk() / ".git"}});
-    repository.write("kept");
-    Variable const gitDir("GIT_DIR", meta.onDisk() / ".git");
-    WorkingFolder const here(repository.onDisk());
-    GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
-    expectAgreement(repository, adapter);
-}
-
-TEST_F(RepositoryKinds, aRepositoryInTheEnvironmentThatIsNoneIsAnError) {
-    auto const repository = committed("work");
-    Variable const gitDir("GIT_DIR", folder.onDisk() / "work/d");
-    GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
-    EXPECT_THROW(repository.adapterStates(adapter, {"kept"}), GitError);
-}
-
-TEST_F(RepositoryKinds, theEnvironmentCountsOnlyForWhoeverAsksForIt) {
-    auto const meta = committed("meta");
-    auto const repository = committed("work");
-    Variable const gitDir("GIT_DIR", meta.onDisk() / ".git");
-    Variable const workTree("GIT_WORK_TREE", meta.onDisk());
-    GitAdapter ignoring(repository.root());
-    EXPECT_EQ(repository.adapterStates(ignoring, {"kept"}).at("kept"), 1);
-    GitAdapter honouring(repository.root(), GitEnvironment::Honoured);
-    EXPECT_EQ(repository.adapterStates(honouring, {"kept"}).at("kept"), 8);
-    EXPECT_EQ(meta.adapterStates(honouring, {"kept"}).at("kept"), 1);
 }
 
 TEST_F(RepositoryKinds, inABareRepositoryNothingIsDone) {

@@ -35,8 +35,8 @@ protected:
         }
     }
 
-    std::vector<std::string> const names{"a",   "b.up",  "a b",   "d/a",      "d/b.up",
-                                         "d/A", "d/e/a", "d/e/b", "e/d/b.up", "\xc3\xa4.up"};
+    std::vector<std::string> names{"a",   "b.up",  "a b",   "d/a",      "d/b.up",
+                                   "d/A", "d/e/a", "d/e/b", "e/d/b.up", "\xc3\xa4.up"};
 };
 
 TEST_F(Attributes, ofEveryFormTellTheFilterDriver) {
@@ -63,9 +63,60 @@ TEST_F(Attributes, ofEveryFormTellTheFilterDriver) {
                                     "[ab] filter=upper",
                                     "? filter=upper",
                                     "d/?/a filter=upper",
-                                    "\xc3\xa4.up filter=upper"}) {
+                                    "\xc3\xa4.up filter=upper",
+                                    "\xef\xbb\xbf* filter=upper",
+                                    "\"a\\040b\" filter=upper",
+                                    "\"\\303\\244.up\" filter=upper",
+                                    "\"\\141\" filter=upper",
+                                    "\"\\1410\" filter=upper",
+                                    "\"d\\/a\" filter=upper",
+                                    "\"a b filter=upper",
+                                    "\"a\"filter=upper",
+                                    "!a filter=upper",
+                                    "\"!a\" filter=upper",
+                                    "[attr] filter=upper",
+                                    "\"[attr]up\" filter=upper\n*.up up",
+                                    "\"[attr] up x\" filter=upper\n*.up up",
+                                    "\"\\14\" filter=upper",
+                                    "\"\\148\" filter=upper",
+                                    "\"\\441\" filter=upper",
+                                    "\"\\",
+                                    "\"\\14",
+                                    "[attr]-up filter=upper\n*.up -up",
+                                    "[attr]u/p filter=upper\n*.up u/p",
+                                    "*.up te/xt filter=upper",
+                                    "*.up filter=upper -",
+                                    "*.up a_b.c-d filter=upper",
+                                    "*.up -filter=upper",
+                                    "*.up !filter=upper",
+                                    "*.up =upper filter=upper",
+                                    "*.up",
+                                    "\t# x",
+                                    "a filter=upper\r\n*.up text\r"}) {
         repository.write(".gitattributes", rules + "\n");
         expectAgreement("\n" + rules);
+    }
+}
+
+TEST_F(Attributes, mayWriteEverySignOfANameInQuotes) {
+    for (auto const& [written, name] : std::map<std::string, std::string>{{"\\a", "\a"},
+                                                                          {"\\b", "\b"},
+                                                                          {"\\f", "\f"},
+                                                                          {"\\n", "\n"},
+                                                                          {"\\r", "\r"},
+                                                                          {"\\t", "\t"},
+                                                                          {"\\v", "\v"},
+                                                                          {"\\\"", "\""},
+                                                                          {"\\001", "\001"},
+                                                                          {"\\177", "\177"},
+                                                                          {"\\377", "\377"}}) {
+        repository.write(".gitattributes", "\"x" + written + "y\" filter=upper\n");
+        names = {"x" + name + "y", "x", "x" + written.substr(1) + "y"};
+        for (auto const& file : names) {
+            repository.write(file);
+        }
+        EXPECT_TRUE(isRefused(names[0])) << written;
+        expectAgreement("\n" + written);
     }
 }
 

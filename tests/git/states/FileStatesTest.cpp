@@ -1,3 +1,5 @@
+#include <sys/stat.h>
+
 #include "git/GitRepository.hpp"
 
 namespace project::git {
@@ -80,6 +82,25 @@ TEST_F(FileStates, aChangedExecutableBitIs3) {
     EXPECT_EQ(agreedStateOf("a"), 3);
     repository.run({"config", "core.fileMode", "false"});
     EXPECT_EQ(agreedStateOf("a"), 1);
+}
+
+TEST_F(FileStates, aStagedExecutableBitIs3) {
+    commitFile("a");
+    std::filesystem::permissions(repository.onDisk() / "a", perms::owner_all);
+    repository.run({"add", "a"});
+    EXPECT_EQ(agreedStateOf("a"), 3);
+}
+
+TEST_F(FileStates, whatIsNeitherFileNorLinkInPlaceOfATrackedFileIs3AndInPlaceOfALink7) {
+    commitFile("a");
+    folder.addLink("work/link", "a");
+    repository.commitAll();
+    for (std::string const name : {"a", "link"}) {
+        repository.remove(name);
+        ASSERT_EQ(::mkfifo((repository.onDisk() / name).c_str(), 0600), 0);
+    }
+    EXPECT_EQ(agreedStateOf("a"), 3);
+    EXPECT_EQ(agreedStateOf("link"), 7);
 }
 
 TEST_F(FileStates, aFileThatWasOnlyTouchedIsUnmodified) {

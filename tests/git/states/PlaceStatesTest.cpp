@@ -118,15 +118,46 @@ TEST_F(PlaceStates, aFolderWithAnythingElseCalledDotGitIsNoRepository) {
     EXPECT_EQ(agreedStateOf("d/a"), 0);
 }
 
+TEST_F(PlaceStates, whatLiesInARepositoryWhoseDotGitIsAFileIs8) {
+    runGit(folder.onDisk(),
+           {"init", "-q", "--separate-git-dir", (folder.onDisk() / "meta").string(), "work/inner"});
+    repository.write("inner/a");
+    EXPECT_EQ(stateOf("inner"), 0);
+    EXPECT_EQ(stateOf("inner/a"), 8);
+    adapter.addToSourceControl(repository.paths({"inner/a"}));
+    EXPECT_EQ(repository.index(), "");
+}
+
+TEST_F(PlaceStates, aFolderWithPartOfARepositoryIsNone) {
+    for (std::string const part : {"HEAD", "objects", "refs"}) {
+        GitRepository::init(folder.addFolder("work/" + part));
+        repository.write(part + "/a");
+        EXPECT_EQ(stateOf(part + "/a"), 8);
+        repository.remove(part + "/.git/" + part);
+        EXPECT_EQ(agreedStateOf(part + "/a"), 0) << "without " << part;
+    }
+}
+
 TEST_F(PlaceStates, pathsMayBeWrittenInManyWays) {
     commitFile("d/a");
-    std::vector<Path> const spellings{repository.root() / u"d/a/", repository.root() / u"d//a",
-                                      repository.root() / u"./d/./a", repository.root() / u"x/../d/a",
-                                      Path(u"//" + repository.root().native() + u"/d/a")};
+    std::vector<Path> const spellings{repository.root() / u"d/a/",
+                                      repository.root() / u"d//a",
+                                      repository.root() / u"./d/./a",
+                                      repository.root() / u"x/../d/a",
+                                      Path(u"//" + repository.root().native() + u"/d/a"),
+                                      Path(u"/.." + repository.root().native() + u"/d/a")};
     auto const states = adapter.getFileStates(spellings);
     for (auto const& path : spellings) {
         EXPECT_EQ(states.at(path).getState(), cmlink::LocalStatus::Unmodified);
     }
+}
+
+TEST_F(PlaceStates, aProjectWhoseFolderHasNoNameOnDiskIsInNoRepository) {
+    commitFile("a");
+    GitAdapter nowhere(Path(u"/lone" + std::u16string(1, char16_t{0xD800})));
+    EXPECT_EQ(repository.adapterStates(nowhere, {"a"}).at("a"), 8);
+    EXPECT_TRUE(nowhere.trackedBelow({repository.root()}).empty());
+    EXPECT_TRUE(nowhere.trackedBelow({}).empty());
 }
 
 TEST_F(PlaceStates, aProjectThatWasOpenedByWayOfALinkFindsItsFiles) {

@@ -45,7 +45,7 @@ void IndexWriter::write(IndexChanges const& changes) {
 void IndexWriter::keep(git_index_entry const& entry) {
     auto kept = entry;
     if (comparison_.hidesChanges(entry)) {
-        auto const onDisk = lookAt(repository_.workTree().onDisk(entry.path));
+        auto const onDisk = diskEntryAt(repository_.workTree().onDisk(entry.path));
         if (onDisk && isFileOrLink(*onDisk) && comparison_.isModified(entry, *onDisk)) {
             kept.file_size = 0;
         }

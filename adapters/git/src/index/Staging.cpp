@@ -69,7 +69,7 @@ Staging::Names Staging::stageable(std::vector<fl::filesystem::Path> const& files
             continue;
         }
         auto const name = repository_.workTree().onDisk(*path);
-        auto const onDisk = lookAt(name);
+        auto const onDisk = diskEntryAt(name);
         if (!onDisk || !isFileOrLink(*onDisk)) {
             continue;
         }
@@ -81,7 +81,7 @@ Staging::Names Staging::stageable(std::vector<fl::filesystem::Path> const& files
 }
 
 void Staging::stage(TreePath const& path, bool isConverted, BlobWriter& blobs, IndexChanges& changes) const {
-    auto const onDisk = lookAt(repository_.workTree().onDisk(path)); // with the times before it is read
+    auto const onDisk = diskEntryAt(repository_.workTree().onDisk(path)); // with the times before it is read
     git_index_entry entry{};
     if (!onDisk || !isFileOrLink(*onDisk) || !blobs.write(path, *onDisk, isConverted, entry.id)) {
         return; // went in the meantime

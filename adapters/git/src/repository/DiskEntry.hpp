@@ -8,7 +8,7 @@
 namespace project::git {
 
 /// What is on disk under a name, links not followed; nothing when nothing is, or nobody may look.
-inline std::optional<struct stat> lookAt(std::string const& name) {
+inline std::optional<struct stat> diskEntryAt(std::string const& name) {
     struct stat found {};
 
     return ::lstat(name.c_str(), &found) == 0 ? std::optional(found) : std::nullopt;

@@ -42,4 +42,8 @@ using TreeHandle = std::unique_ptr<git_tree, FreedBy<git_tree_free>>;
 /// The same when a call of libgit2 gave an error, and nothing otherwise.
 void require(int code, std::string const& file, char const* action);
 
+/// Whether there is a repository at a folder or above it, regardless of its owner.
+/// @param ceiling the folder above that the search does not reach; empty for a search up to the root.
+bool isRepositoryFound(std::string const& folder, std::string const& ceiling = "");
+
 } // namespace project::git

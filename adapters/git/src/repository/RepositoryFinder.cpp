@@ -20,19 +20,12 @@ namespace {
         "of its work tree.");
 }
 
-/// libgit2 1.5.1 tells a repository of somebody else like one that isn't there, unless the configuration has
-/// a `safe.directory` for another one. Looking for it alone doesn't ask for its owner.
-bool isRepositoryFound(char const* place) {
-    git_buf found = GIT_BUF_INIT;
-    bool const result = git_repository_discover(&found, place, 0, nullptr) == 0;
-    git_buf_dispose(&found);
-    return result;
-}
-
 /// @return null when there is none.
 RepositoryHandle openAround(char const* root) {
     git_repository* found = nullptr;
     auto const code = git_repository_open_ext(&found, root, 0, nullptr);
+    // libgit2 1.5.1 reports a repository of another user as missing, unless the configuration has a
+    // `safe.directory` for some other repository.
     if (code == GIT_EOWNER || (code == GIT_ENOTFOUND && isRepositoryFound(root))) {
         throwOwnerError(root);
     }

@@ -21,37 +21,58 @@ std::string_view takeWord(std::string_view& text) {
     return word;
 }
 
-/// Takes up to three octal digits.
-char takeOctal(std::string_view& text) {
+/// Takes three octal digits, the first of which is at most 3; nothing when there are fewer.
+std::optional<char> takeOctal(std::string_view& text) {
     unsigned value = 0;
-    for (int digits = 0; digits < 3 && !text.empty() && text[0] >= '0' && text[0] <= '7'; ++digits) {
-        value = value * 8 + static_cast<unsigned>(text[0] - '0');
-        text.remove_prefix(1);
+    for (auto const digit : text.substr(0, 3)) {
+        if (digit < '0' || digit > '7') {
+            return std::nullopt;
+        }
+        value = value * 8 + static_cast<unsigned>(digit - '0');
     }
+    if (text.size() < 3) {
+        return std::nullopt;
+    }
+    text.remove_prefix(3);
     return static_cast<char>(value);
 }
 
-char takeEscaped(std::string_view& text) {
-    constexpr std::string_view letters = "abfnrtv";
-    constexpr std::string_view meanings = "\a\b\f\n\r\t\v";
-    if (text[0] >= '0' && text[0] <= '3') {
+/// Takes what follows a backslash; nothing when git does not know it.
+std::optional<char> takeEscaped(std::string_view& text) {
+    constexpr std::string_view letters = "abfnrtv\\\"";
+    constexpr std::string_view meanings = "\a\b\f\n\r\t\v\\\"";
+    if (!text.empty() && text[0] >= '0' && text[0] <= '3') {
         return takeOctal(text);
     }
-    auto const known = letters.find(text[0]);
-    auto const result = known == std::string_view::npos ? text[0] : meanings[known];
+    auto const known = text.empty() ? std::string_view::npos : letters.find(text[0]);
+    if (known == std::string_view::npos) {
+        return std::nullopt;
+    }
+    text.remove_prefix(1);
+    return meanings[known];
+}
+
+char takeFirst(std::string_view& text) {
+    auto const result = text[0];
     text.remove_prefix(1);
     return result;
 }
 
-/// A pattern in quotes, written as in C; nothing when the quotes aren't closed.
+/// A pattern in quotes, written as in C; nothing when it is not well-formed, and then the quotes belong to
+/// the pattern.
 std::optional<std::string> takeQuoted(std::string_view& text) {
+    if (!text.starts_with('"')) {
+        return std::nullopt;
+    }
     auto rest = text.substr(1);
     std::string result;
     while (!rest.empty() && rest[0] != '"') {
-        bool const isEscaped = rest[0] == '\\' && rest.size() > 1;
-        rest.remove_prefix(isEscaped ? 1 : 0);
-        result += isEscaped ? takeEscaped(rest) : rest[0];
-        rest.remove_prefix(isEscaped ? 0 : 1);
+        auto const sign = takeFirst(rest);
+        auto const meant = sign == '\\' ? takeEscaped(rest) : sign;
+        if (!meant) {
+            return std::nullopt;
+        }
+        result += *meant;
     }
     if (rest.empty()) {
         return std::nullopt;
@@ -91,16 +112,16 @@ std::optional<AttributeLine> AttributeLine::read(std::string_view line) {
         return std::nullopt;
     }
     AttributeLine result;
-    auto quoted = line[0] == '"' ? takeQuoted(line) : std::nullopt;
-    if (!quoted && line.starts_with(macroSign) && line.size() > macroSign.size()) {
-        line.remove_prefix(macroSign.size());
-        skipBlanks(line);
-        result.macro = takeWord(line);
+    auto const quoted = takeQuoted(line);
+    auto const text = quoted ? *quoted : std::string(takeWord(line));
+    if (text.starts_with(macroSign) && text.size() > macroSign.size()) {
+        auto name = std::string_view(text).substr(macroSign.size());
+        skipBlanks(name);
+        result.macro = takeWord(name);
         if (!isAttributeName(result.macro)) {
             return std::nullopt;
         }
     } else {
-        auto const text = quoted ? *std::move(quoted) : std::string(takeWord(line));
         result.pattern = text.starts_with('!') ? std::nullopt : NamePattern::of(text);
     }
     for (skipBlanks(line); !line.empty(); skipBlanks(line)) {

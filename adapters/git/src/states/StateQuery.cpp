@@ -52,10 +52,11 @@ LocalStatus StateQuery::presentState(git_index_entry const& entry, struct stat c
     if (isSubmodule(entry)) {
         return submoduleState(entry, onDisk);
     }
-    if (!isFileOrLink(onDisk) || !isOfSameType(modeOf(onDisk, &entry, repository_.settings()), entry.mode)) {
+    if (!isOfSameType(modeOf(onDisk, &entry, repository_.settings()), entry.mode)) {
         return LocalStatus::Renamed;
     }
-    return comparison_.isModified(entry, onDisk) ? LocalStatus::Modified : LocalStatus::Unmodified;
+    return !isFileOrLink(onDisk) || comparison_.isModified(entry, onDisk) ? LocalStatus::Modified
+                                                                          : LocalStatus::Unmodified;
 }
 
 LocalStatus StateQuery::submoduleState(git_index_entry const& entry, struct stat const& onDisk) const {
@@ -99,7 +100,7 @@ std::optional<struct stat> StateQuery::lookBeyondNoLink(TreePath const& path) {
     if (above == FolderKind::Missing || above == FolderKind::BeyondLink) {
         return std::nullopt;
     }
-    return lookAt(repository_.workTree().onDisk(path));
+    return diskEntryAt(repository_.workTree().onDisk(path));
 }
 
 /// Whether the disk has no say: somebody told git so (git-update-index(1)), or a sparse checkout left the

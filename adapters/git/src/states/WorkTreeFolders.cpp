@@ -9,14 +9,11 @@ bool WorkTreeFolders::isFileIgnored(TreePath const& path) {
     return at(parentOf(path)).isIgnored || rules_.ignore(path, false);
 }
 
+/// As git decides it: by the files of a repository, not by its owner or its format.
 bool WorkTreeFolders::isOtherRepository(TreePath const& folder) const {
-    auto const name = repository_.workTree().onDisk(folder);
-    auto const own = lookAt(name + "/.git");
-    if (!own || S_ISDIR(own->st_mode)) {
-        return own && lookAt(name + "/.git/HEAD").has_value();
-    }
-    auto const code = git_repository_open_ext(nullptr, name.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
-    return code == 0 || code == GIT_EOWNER;
+    auto const& workTree = repository_.workTree();
+    auto const name = workTree.onDisk(folder);
+    return diskEntryAt(name + "/.git") && isRepositoryFound(name, workTree.onDisk(parentOf(folder)));
 }
 
 WorkTreeFolders::Folder const& WorkTreeFolders::at(TreePath const& folder) {
@@ -42,7 +39,7 @@ FolderKind WorkTreeFolders::look(TreePath const& folder, FolderKind above) const
     if (nameOf(folder) == ".git" || (tracked != nullptr && isSubmodule(*tracked))) {
         return FolderKind::OtherRepository;
     }
-    auto const onDisk = lookAt(repository_.workTree().onDisk(folder));
+    auto const onDisk = diskEntryAt(repository_.workTree().onDisk(folder));
     if (!onDisk) {
         return FolderKind::Missing;
     }

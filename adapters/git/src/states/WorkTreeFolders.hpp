@@ -30,9 +30,6 @@ public:
     /// The same for a folder.
     bool isFolderIgnored(TreePath const& path) { return at(path).isIgnored; }
 
-    /// Whether a folder is the top of a repository's work tree.
-    bool isOtherRepository(TreePath const& folder) const;
-
 private:
     struct Folder {
         FolderKind kind;
@@ -41,6 +38,7 @@ private:
 
     Folder const& at(TreePath const& folder);
     FolderKind look(TreePath const& folder, FolderKind above) const;
+    bool isOtherRepository(TreePath const& folder) const;
 
     Repository const& repository_;
     IgnoreRules rules_;
