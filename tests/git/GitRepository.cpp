@@ -11,7 +11,7 @@ namespace project::git {
 
 namespace {
 
-/// Keeps the configuration of the machine and of its user out of what libgit2 reads in these tests.
+/// Keeps libgit2 from reading the configuration of the machine and of its user.
 class NoOutsideConfiguration : public ::testing::Environment {
 public:
     void SetUp() override {
@@ -33,7 +33,7 @@ int stateFromLetters(char staged, char onDisk) {
         return 6;
     }
     if (staged == 'D' || onDisk == 'D') {
-        return 3; // removed and intended to be added again, or gone from the disk
+        return 3; // removed and intended to be added again, or deleted from the disk
     }
     if (staged == 'A' || onDisk == 'A') {
         return 5;
@@ -47,8 +47,8 @@ int stateFromLetters(char staged, char onDisk) {
     throw std::runtime_error(std::string("unknown letters of git status: ") + staged + onDisk);
 }
 
-/// What stands behind so many spaces.
-std::string behindSpaces(std::string const& record, int count) {
+/// The part of a record after so many spaces.
+std::string afterSpaces(std::string const& record, int count) {
     std::size_t position = 0;
     for (int i = 0; i < count; ++i) {
         position = record.find(' ', position) + 1;
@@ -56,14 +56,14 @@ std::string behindSpaces(std::string const& record, int count) {
     return record.substr(position);
 }
 
-void takeIn(std::string const& record, States& states) {
+void collect(std::string const& record, States& states) {
     if (record[0] == '1') {
-        states[behindSpaces(record, 8)] = stateFromLetters(record[2], record[3]);
+        states[afterSpaces(record, 8)] = stateFromLetters(record[2], record[3]);
     } else if (record[0] == 'u') {
-        states[behindSpaces(record, 10)] = 4;
+        states[afterSpaces(record, 10)] = 4;
     } else if (record[0] == '?' || record[0] == '!') {
         states.try_emplace(record.substr(2),
-                           record[0] == '?' ? 0 : 2); // a removal that is staged came before
+                           record[0] == '?' ? 0 : 2); // a staged removal has its own record before
     } else {
         throw std::runtime_error("unknown record of git status: " + record);
     }
@@ -154,7 +154,7 @@ States GitRepository::statusStates() const {
     States changed;
     for (auto const& record : recordsOf(run({"status", "--porcelain=v2", "-z", "--untracked-files=all",
                                              "--ignored", "--no-renames", "--ignore-submodules=dirty"}))) {
-        takeIn(record, changed);
+        collect(record, changed);
     }
     for (auto const& [name, state] : changed) {
         result[name] = state;

@@ -14,23 +14,23 @@ namespace project::git {
 using Path = fl::filesystem::Path;
 using States = std::map<std::string, int>;
 
-/// What the git command writes, run in a folder with no configuration but the repository's.
-/// @throws std::runtime_error when it fails.
+/// The output of a git command that runs in a folder, with the repository's configuration only.
+/// @throws std::runtime_error if it fails.
 std::string runGit(std::filesystem::path const& folder, std::vector<std::string> const& arguments,
                    std::map<std::string, std::string> const& environment = {});
 
-/// The records of an answer that ends each with a NUL.
+/// The records of an output that ends each with a NUL.
 std::vector<std::string> recordsOf(std::string const& text);
 
-/// A work tree that the git command works on.
+/// A work tree for the git command.
 class GitRepository {
 public:
-    /// @param workTree a folder that lies in a repository already.
+    /// @param workTree a folder in an existing repository.
     explicit GitRepository(std::filesystem::path workTree,
                            std::map<std::string, std::string> environment = {})
         : workTree_(std::move(workTree)), environment_(std::move(environment)) {}
 
-    /// Makes a plain repository in a folder.
+    /// Creates a plain repository in a folder.
     static GitRepository init(std::filesystem::path const& workTree);
 
     std::filesystem::path const& onDisk() const { return workTree_; }
@@ -43,7 +43,7 @@ public:
 
     std::string run(std::vector<std::string> const& arguments) const;
 
-    /// The same, with another index for this one time.
+    /// The same on another index.
     std::string runOnIndex(std::filesystem::path const& index,
                            std::vector<std::string> const& arguments) const;
 
@@ -54,15 +54,15 @@ public:
 
     void remove(std::string const& name) const { std::filesystem::remove_all(workTree_ / name); }
 
-    /// What the index has: modes, ids, stages, names, and flags in the form of `git ls-files -t`.
+    /// The entries of the index: modes, ids, stages, names, and flags in the form of `git ls-files -t`.
     std::string index() const { return run({"ls-files", "-z", "-s", "-t", "-v"}); }
 
     std::filesystem::path indexFile() const;
 
-    /// What `git status` says of each file, in the numbers of the adapter.
+    /// The states of all files from `git status`, in the numbers of the adapter.
     States statusStates() const;
 
-    /// What the adapter says of these.
+    /// The states of some files from the adapter.
     States adapterStates(GitAdapter& adapter, std::vector<std::string> const& names) const;
 
 private:
@@ -79,10 +79,10 @@ protected:
 
     int stateOf(std::string const& name) { return repository.adapterStates(adapter, {name}).at(name); }
 
-    /// The adapter's answer for a name, which has to be that of `git status`, too.
+    /// The state of a file from the adapter, which must agree with `git status`.
     int agreedStateOf(std::string const& name) {
         auto const expected = repository.statusStates();
-        EXPECT_TRUE(expected.contains(name)) << name << " is not in git's answer";
+        EXPECT_TRUE(expected.contains(name)) << name << " is not in git's output";
         EXPECT_EQ(stateOf(name), expected.at(name)) << name;
         return stateOf(name);
     }

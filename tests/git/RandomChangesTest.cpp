@@ -12,8 +12,8 @@ namespace {
 
 using std::filesystem::perms;
 
-/// Random work in a small work tree, by hand, by git and by the adapter. Whatever it comes to, the adapter
-/// has to agree with git about every name, and to stage as git does.
+/// Random changes in a small work tree, by hand, by git and by the adapter. After each, the adapter must
+/// agree with git about every name, and must stage as git does.
 class RandomWork {
 public:
     RandomWork(unsigned seed, GitRepository const& repository, std::filesystem::path indexCopy)
@@ -103,8 +103,7 @@ private:
         std::filesystem::remove_all(onDisk(name), notBelowAFile);
     }
 
-    /// Makes room for a file or a link: removes what is there, and what stands in the place of a folder
-    /// above.
+    /// Makes room for a file or link: removes the entry at its path, and files in place of the folders above.
     void makeRoom(std::string const& name) {
         for (auto slash = name.find('/'); slash != std::string::npos; slash = name.find('/', slash + 1)) {
             if (typeOf(name.substr(0, slash)) != std::filesystem::file_type::directory) {
@@ -198,7 +197,7 @@ private:
         try {
             repository_.runOnIndex(indexCopy_, arguments);
         } catch (std::runtime_error const&) {
-            note(" refused"); // what lies beyond a link
+            note(" refused"); // a file beyond a link
         }
     }
 
@@ -223,7 +222,8 @@ private:
                 result.push_back(line);
             }
         } catch (std::runtime_error const& error) {
-            EXPECT_TRUE(std::string(error.what()).ends_with(": ")) << error.what(); // git's way to say none
+            EXPECT_TRUE(std::string(error.what()).ends_with(": "))
+                << error.what(); // without a message of git's
         }
         return result;
     }

@@ -4,7 +4,7 @@
 
 namespace project::git {
 
-/// Repositories that git made, and everything that git says of them.
+/// Repositories that git created, and a comparison of their states with git's.
 class RepositoriesTest : public ::testing::Test {
 protected:
     /// A repository with a committed file "kept" and its folder "d" with "d/kept".
@@ -16,7 +16,7 @@ protected:
         return repository;
     }
 
-    /// The states of everything that git knows of, then the same after a file was added and one was removed.
+    /// The states of all files must agree with git's, also after a file was staged and one was removed.
     static void expectAgreement(GitRepository const& repository, GitAdapter& adapter,
                                 std::string const& removed = "kept") {
         repository.write(".gitignore", "*.o\n");

@@ -16,7 +16,7 @@ protected:
     }
 };
 
-TEST_F(SparseCheckout, whatIsLeftOutIsUnmodified) {
+TEST_F(SparseCheckout, aFileThatIsLeftOutIsUnmodified) {
     auto const repository = sparse();
     ASSERT_FALSE(std::filesystem::exists(repository.onDisk() / "out"));
     GitAdapter adapter(repository.root());
@@ -24,7 +24,7 @@ TEST_F(SparseCheckout, whatIsLeftOutIsUnmodified) {
     EXPECT_EQ(repository.adapterStates(adapter, {"out/a", "out"}), (States{{"out/a", 1}, {"out", 1}}));
 }
 
-TEST_F(SparseCheckout, whatIsThereAllTheSameIsCompared) {
+TEST_F(SparseCheckout, aFileOutsideTheConeThatExistsIsCompared) {
     auto const repository = sparse();
     GitAdapter adapter(repository.root());
     repository.write("out/a", "other\n");
@@ -43,7 +43,7 @@ TEST_F(SparseCheckout, aFileOutsideTheConeIsStagedAndCountsAsCheckedOut) {
     expectStates(repository, adapter);
 }
 
-TEST_F(SparseCheckout, whatIsLeftOutCanBeRemovedAndTheRestStaysLeftOut) {
+TEST_F(SparseCheckout, aFileThatIsLeftOutCanBeRemovedAndTheOthersStayLeftOut) {
     auto const repository = sparse();
     GitAdapter adapter(repository.root());
     adapter.removeFromSourceControl(repository.paths({"out/a"}));
@@ -52,7 +52,7 @@ TEST_F(SparseCheckout, whatIsLeftOutCanBeRemovedAndTheRestStaysLeftOut) {
     expectStates(repository, adapter);
 }
 
-TEST_F(SparseCheckout, anIndexThatIsSparseItselfGivesAnErrorThatTellsWhatToDo) {
+TEST_F(SparseCheckout, aSparseIndexIsAnErrorWithARemedy) {
     auto const repository = sparse();
     repository.run({"sparse-checkout", "reapply", "--sparse-index"});
     GitAdapter adapter(repository.root());

@@ -17,7 +17,7 @@ namespace {
 
 using std::filesystem::perms;
 
-/// Counts how often a file is put in the place of another in one folder.
+/// Counts the replacements of files in a folder.
 class ReplacementCount {
 public:
     explicit ReplacementCount(std::filesystem::path const& folder)
@@ -32,7 +32,7 @@ public:
     ReplacementCount(ReplacementCount const&) = delete;
     ReplacementCount& operator=(ReplacementCount const&) = delete;
 
-    /// How often a file of that name was moved in or written since the last question.
+    /// The number of times that a file of that name was moved in or written since the last call.
     int of(std::string const& name) const {
         alignas(inotify_event) std::array<char, 65536> buffer{};
         int result = 0;
@@ -61,7 +61,7 @@ protected:
         adapter.removeFromSourceControl(repository.paths(names));
     }
 
-    /// As git's gitformat-index(5) has it: "DIRC" and four bytes.
+    /// See gitformat-index(5): "DIRC" and four bytes.
     int indexVersion() const {
         std::ifstream file(repository.indexFile(), std::ios::binary);
         std::array<char, 8> header{};
@@ -82,12 +82,13 @@ protected:
             call();
             FAIL() << "nothing was thrown";
         } catch (GitError const& error) {
+            EXPECT_EQ(error.kind(), GitError::Kind::Busy);
             EXPECT_EQ(error.getFile(), lockFile().string());
             EXPECT_EQ(std::string(error.what()).find(lockFile().string()), 0u);
             EXPECT_NE(error.getProblem().find("locked"), std::string::npos);
             EXPECT_NE(error.getRemedy().find("delete this file"), std::string::npos);
         }
-        EXPECT_TRUE(std::filesystem::exists(lockFile())); // somebody else's
+        EXPECT_TRUE(std::filesystem::exists(lockFile())); // of another process
         EXPECT_EQ(repository.index(), before);
     }
 };
@@ -112,20 +113,21 @@ TEST_F(IndexWriting, aLockedIndexIsAnErrorThatNamesTheLockFileAndTryingAgainWork
     expectNothingLeftBehind();
 }
 
-TEST_F(IndexWriting, aLockDoesNotKeepFromAsking) {
+TEST_F(IndexWriting, aLockDoesNotBlockQueries) {
     repository.write("a");
     repository.commitAll();
     folder.addFile(u"work/.git/index.lock", "");
     EXPECT_EQ(stateOf("a"), 1);
 }
 
-TEST_F(IndexWriting, anythingThatFailsInBetweenLeavesTheIndexAsItWasAndUnlocked) {
+TEST_F(IndexWriting, aFailureLeavesTheIndexUnchangedAndUnlocked) {
     repository.write("a");
     repository.commitAll();
     repository.write("b");
     repository.write("c/.git", "not a repository\n");
     auto const before = repository.index();
-    repository.write(".git./x"); // a name that no index may have, since some systems take it for ".git"
+    repository.write(
+        ".git./x"); // a name that an index must not contain, since some systems treat it as ".git"
     EXPECT_THROW(add({"b", ".git./x"}), GitError);
     EXPECT_EQ(repository.index(), before);
     expectNothingLeftBehind();
@@ -166,7 +168,8 @@ TEST_F(IndexWriting, aRepositoryThatCannotBeWrittenIsAClearError) {
         remove({"a"});
         return std::string("nothing was thrown");
     });
-    EXPECT_NE(text.find("/.git/index.lock: the index can't be written: Permission denied"), std::string::npos)
+    EXPECT_NE(text.find("/.git/index.lock: the index cannot be written: Permission denied"),
+              std::string::npos)
         << text;
     std::filesystem::permissions(repository.onDisk() / ".git", perms::owner_all);
 }
@@ -225,7 +228,7 @@ TEST_F(IndexWriting, aChangeThatOnlyTheAgeOfTheIndexShowedIsStillSeen) {
     EXPECT_EQ(stateOf("a"), 3);
 }
 
-TEST_F(IndexWriting, whatAnotherProcessStagesMeanwhileIsNotLost) {
+TEST_F(IndexWriting, aFileThatAnotherProcessStagesMeanwhileIsNotLost) {
     for (int i = 0; i < 20; ++i) {
         auto const ours = "ours" + std::to_string(i);
         auto const theirs = "theirs" + std::to_string(i);
@@ -266,7 +269,7 @@ TEST_F(IndexWriting, twoProcessesThatStageAtTheSameTimeLoseNothing) {
     expectNothingLeftBehind();
 }
 
-TEST_F(IndexWriting, whatADeadProcessLeftOfANewIndexIsNoHindrance) {
+TEST_F(IndexWriting, aLeftoverOfADeadProcessIsReplaced) {
     folder.addFile(u"work/.git/index.lock.new", "half an index");
     repository.write("a");
     add({"a"});

@@ -73,6 +73,7 @@ TEST_F(StagedContent, aFileOfAFilterDriverIsRefusedBeforeAnythingIsStaged) {
     for (auto const* const name : {"d/x.up", "d/x.srv", "d/x.must", "d/x.wide"}) {
         repository.write(name);
         auto const error = errorOfAdding({"a", name});
+        EXPECT_EQ(error.kind(), GitError::Kind::Refused);
         EXPECT_EQ(error.getFile(), (repository.onDisk() / name).string());
         EXPECT_NE(error.getRemedy().find("git add"), std::string::npos);
     }
@@ -123,7 +124,7 @@ TEST_F(StagedContent, aFileThatCannotBeReadIsAnErrorAndNothingIsStaged) {
     });
     EXPECT_EQ(text,
               (repository.onDisk() / "secret").string() +
-                  ": the file can't be read: Permission denied. Look at its permissions, and try again.");
+                  ": the file cannot be read: Permission denied. Check its permissions, and try again.");
     EXPECT_FALSE(std::filesystem::exists(repository.onDisk() / ".git/index"));
     EXPECT_FALSE(std::filesystem::exists(repository.onDisk() / ".git/index.lock"));
 }

@@ -18,7 +18,7 @@ protected:
 
     std::vector<std::string> tracked() const { return recordsOf(repository.run({"ls-files", "-z"})); }
 
-    /// Runs git on a copy of the index. @return what git lists of the copy then.
+    /// Runs git on a copy of the index. @return the entries of the copy then.
     std::string indexAfterGit(std::vector<std::string> const& arguments) const {
         auto const copy = folder.onDisk() / "index-copy";
         std::filesystem::remove(copy);

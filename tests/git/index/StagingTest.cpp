@@ -27,7 +27,7 @@ TEST_F(Staging, newAndChangedFilesAreStagedAsGitDoes) {
     repository.run({"fsck", "--strict"});
 }
 
-TEST_F(Staging, ofAFolderNothingIsStagedButWhatIsNamed) {
+TEST_F(Staging, ofAFolderOnlyTheGivenFilesAreStaged) {
     repository.write("d/a");
     repository.write("d/b");
     add({"d", "d/a", ""});
@@ -40,7 +40,7 @@ TEST_F(Staging, aFolderAloneLeavesTheIndexUnwritten) {
     EXPECT_FALSE(std::filesystem::exists(repository.indexFile()));
 }
 
-TEST_F(Staging, whatIsTrackedBelowFoldersIsListedByTheirPaths) {
+TEST_F(Staging, trackedFilesBelowFoldersAreListedByTheirPaths) {
     for (auto const* name : {"d/a", "d/e/b", "d2/c", "f", "g/\xFF"}) {
         repository.write(name);
     }
@@ -58,7 +58,7 @@ TEST_F(Staging, whatIsTrackedBelowFoldersIsListedByTheirPaths) {
     EXPECT_TRUE(adapter.trackedBelow({folder.root(), folder.path(u"elsewhere")}).empty());
 }
 
-TEST_F(Staging, whatCannotBeStagedIsPassedOver) {
+TEST_F(Staging, everythingThatCannotBeStagedIsSkipped) {
     repository.write("a");
     repository.write("real/x");
     folder.addLink("work/link", "real");
@@ -69,7 +69,7 @@ TEST_F(Staging, whatCannotBeStagedIsPassedOver) {
     EXPECT_EQ(tracked(), std::vector<std::string>{"a"});
 }
 
-TEST_F(Staging, whatLiesOutsideTheProjectsFolderIsNeitherStagedNorTakenOut) {
+TEST_F(Staging, everythingOutsideTheProjectsFolderIsNeitherStagedNorRemoved) {
     for (auto const* name : {"outside", "project/a", "project2/b"}) {
         repository.write(name);
     }
@@ -90,7 +90,7 @@ TEST_F(Staging, whatLiesOutsideTheProjectsFolderIsNeitherStagedNorTakenOut) {
     EXPECT_TRUE(ofFolder.trackedBelow({inProject(".."), inProject("../project2")}).empty());
 }
 
-TEST_F(Staging, anIgnoredFileThatIsNamedIsStaged) {
+TEST_F(Staging, anIgnoredFileThatIsGivenIsStaged) {
     repository.write(".gitignore", "*.o\n");
     repository.write("a.o");
     expectAddedAsGitDoes({"a.o"});
@@ -110,7 +110,7 @@ TEST_F(Staging, namesOfAllKindsAreStagedAsGitDoes) {
     EXPECT_EQ(tracked().size(), names.size() - 4);
 }
 
-TEST_F(Staging, aRenameInCaseOnlyMovesTheEntryInEitherOrderWhateverTheConfigurationSays) {
+TEST_F(Staging, aRenameInCaseOnlyMovesTheEntryInEitherOrderRegardlessOfTheConfiguration) {
     for (auto const* const ignoresCase : {"false", "true"}) {
         repository.run({"config", "core.ignoreCase", ignoresCase});
         repository.write("File");
@@ -152,7 +152,7 @@ TEST_F(Staging, aFileThatGitOnlyIntendsToAddIsStagedWithItsContent) {
     expectAddedAsGitDoes({"a"});
 }
 
-TEST_F(Staging, aConflictIsResolvedByAddingAndGoneByRemoving) {
+TEST_F(Staging, addingResolvesAConflictAndRemovingDropsIt) {
     for (auto const* const name : {"a", "b"}) {
         repository.write(name, "1\n");
     }
@@ -172,7 +172,7 @@ TEST_F(Staging, aConflictIsResolvedByAddingAndGoneByRemoving) {
     expectRemovedAsGitDoes({"b"});
 }
 
-TEST_F(Staging, filesAreTakenOutOfTheIndexAndStayOnDisk) {
+TEST_F(Staging, filesAreRemovedFromTheIndexAndStayOnDisk) {
     repository.write("a");
     repository.write("b");
     repository.write("gone");
@@ -186,7 +186,7 @@ TEST_F(Staging, filesAreTakenOutOfTheIndexAndStayOnDisk) {
     EXPECT_TRUE(std::filesystem::exists(repository.onDisk() / "modified"));
 }
 
-TEST_F(Staging, allBelowAFolderIsTakenOutAndNothingBesideIt) {
+TEST_F(Staging, everythingBelowAFolderIsRemovedAndNothingBesideIt) {
     for (auto const* const name : {"d/a", "d/e/b", "d.x", "d-", "d0/a", "dd"}) {
         repository.write(name);
     }
@@ -200,7 +200,7 @@ TEST_F(Staging, allBelowAFolderIsTakenOutAndNothingBesideIt) {
     EXPECT_TRUE(tracked().empty());
 }
 
-TEST_F(Staging, removingWhatIsNotTrackedDoesNothing) {
+TEST_F(Staging, removingUntrackedFilesHasNoEffect) {
     repository.write("a");
     repository.commitAll();
     repository.write("untracked");

@@ -4,20 +4,21 @@ namespace project::git {
 namespace {
 
 TEST(GitError, namesTheFileTheProblemAndTheRemedy) {
-    GitError const error("/p/.git/index.lock", "the index is locked", "Try again.");
+    GitError const error(GitError::Kind::Busy, "/p/.git/index.lock", "the index is locked", "Try again.");
 
     EXPECT_STREQ(error.what(), "/p/.git/index.lock: the index is locked. Try again.");
+    EXPECT_EQ(error.kind(), GitError::Kind::Busy);
     EXPECT_EQ(error.getFile(), "/p/.git/index.lock");
     EXPECT_EQ(error.getProblem(), "the index is locked");
     EXPECT_EQ(error.getRemedy(), "Try again.");
 }
 
-TEST(GitError, leavesOutWhatIsNotThere) {
-    EXPECT_STREQ(GitError("", "the disk is full", "").what(), "the disk is full.");
+TEST(GitError, leavesOutEmptyParts) {
+    EXPECT_STREQ(GitError(GitError::Kind::Failed, "", "the disk is full", "").what(), "the disk is full.");
 }
 
-TEST(GitError, recordsWhereItWasMadeAndACopyKeepsThat) {
-    GitError const error("/p", "no permission", "");
+TEST(GitError, recordsTheStackAndACopyKeepsIt) {
+    GitError const error(GitError::Kind::Failed, "/p", "no permission", "");
     GitError copy(error);
 
     EXPECT_FALSE(error.getStackTrace().getFrames().empty());
@@ -26,7 +27,7 @@ TEST(GitError, recordsWhereItWasMadeAndACopyKeepsThat) {
 }
 
 TEST(GitError, isCaughtAsAStandardException) {
-    EXPECT_THROW(throw GitError("", "x", ""), std::exception);
+    EXPECT_THROW(throw GitError(GitError::Kind::Refused, "", "x", ""), std::exception);
 }
 
 } // namespace

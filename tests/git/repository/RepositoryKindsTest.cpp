@@ -110,7 +110,7 @@ TEST_F(RepositoryKinds, aFileInPlaceOfASubmoduleIs7AndARepositoryWithoutACommit1
     EXPECT_EQ(outer.adapterStates(adapter, {"sub"}).at("sub"), 1);
 }
 
-TEST_F(RepositoryKinds, aWorkTreeWhoseRepositoryLiesElsewhere) {
+TEST_F(RepositoryKinds, aWorkTreeWhoseRepositoryIsElsewhere) {
     auto const work = folder.addFolder("work");
     runGit(folder.onDisk(),
            {"init", "-q", "--separate-git-dir", (folder.onDisk() / "meta").string(), "work"});
@@ -138,7 +138,7 @@ TEST_F(RepositoryKinds, outsideAnyRepositoryNothingIsDone) {
     expectNoRepository(none, nowhere);
 }
 
-TEST_F(RepositoryKinds, aRepositoryThatIsMadeLaterIsFoundAndOneThatWentIsLeft) {
+TEST_F(RepositoryKinds, aRepositoryThatIsCreatedLaterIsFoundAndADeletedOneIsDropped) {
     GitRepository const files(folder.addFolder("work"));
     GitAdapter adapter(files.root());
     expectNoRepository(files, adapter);

@@ -7,7 +7,7 @@
 namespace project::git {
 namespace {
 
-/// Files with a filter driver have to be known for what they are: staged as they stand they would be wrong.
+/// Files with a filter driver must be recognised: without the filter, a wrong content would be staged.
 class Attributes : public GitTest {
 protected:
     void SetUp() override {
@@ -39,7 +39,7 @@ protected:
                                    "d/A", "d/e/a", "d/e/b", "e/d/b.up", "\xc3\xa4.up"};
 };
 
-TEST_F(Attributes, ofEveryFormTellTheFilterDriver) {
+TEST_F(Attributes, ofEveryFormSetTheFilterDriver) {
     for (std::string const rules : {"* filter=upper",
                                     "*.up filter=upper",
                                     "a filter=upper",
@@ -98,7 +98,7 @@ TEST_F(Attributes, ofEveryFormTellTheFilterDriver) {
     }
 }
 
-TEST_F(Attributes, mayWriteEverySignOfANameInQuotes) {
+TEST_F(Attributes, inQuotesMayContainEveryCharacter) {
     for (auto const& [written, name] : std::map<std::string, std::string>{{"\\a", "\a"},
                                                                           {"\\b", "\b"},
                                                                           {"\\f", "\f"},
@@ -120,7 +120,7 @@ TEST_F(Attributes, mayWriteEverySignOfANameInQuotes) {
     }
 }
 
-TEST_F(Attributes, ofSeveralFilesCountAsTheyDoToGit) {
+TEST_F(Attributes, ofSeveralFilesHaveThePrecedenceThatGitGivesThem) {
     std::mt19937 random(3); // NOLINT: the same each time
     auto const pick = [&](auto const& values) { return std::string(values[random() % values.size()]); };
     std::array const patterns{"*",   "*.up", "a",      "/a", "d/*",   "e/*",

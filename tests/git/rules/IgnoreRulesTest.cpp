@@ -5,8 +5,7 @@
 namespace project::git {
 namespace {
 
-/// A work tree with files of many names, in which every set of rules has to mean the same to git and the
-/// adapter.
+/// A work tree with files of many names. The adapter must agree with git on every set of rules.
 class IgnoreRules : public GitTest {
 protected:
     void SetUp() override {
@@ -31,7 +30,7 @@ protected:
     std::vector<std::string> names;
 };
 
-TEST_F(IgnoreRules, meanWhatTheyMeanToGit) {
+TEST_F(IgnoreRules, haveTheMeaningThatGitGivesThem) {
     for (std::string const rules : {"a",
                                     "/a",
                                     "d/a",
@@ -137,7 +136,7 @@ TEST_F(IgnoreRules, meanWhatTheyMeanToGit) {
     }
 }
 
-TEST_F(IgnoreRules, ignoreCaseWhenTheConfigurationSaysSo) {
+TEST_F(IgnoreRules, ignoreCaseIfConfigured) {
     repository.run({"config", "core.ignoreCase", "true"});
     for (std::string const rules :
          {"D/AB", "[B-C]", "[[:upper:]]", "[[:lower:]]", "*.B", "E/", "d/E/?", "\xc3\x84", "\xc3?"}) {
@@ -149,7 +148,7 @@ TEST_F(IgnoreRules, ignoreCaseWhenTheConfigurationSaysSo) {
     }
 }
 
-TEST_F(IgnoreRules, ofDeeperFilesCountBeforeThoseAboveAndThoseBeforeTheRepositorysOwn) {
+TEST_F(IgnoreRules, ofDeeperFilesPrecedeThoseAboveAndTheRepositorysOwn) {
     repository.write(".git/info/exclude", "a\nb\n");
     expectAgreementOn("!a\nab\n");
     repository.write("d/.gitignore", "!ab\na\n!/e/a\n");
@@ -159,7 +158,7 @@ TEST_F(IgnoreRules, ofDeeperFilesCountBeforeThoseAboveAndThoseBeforeTheRepositor
     EXPECT_EQ(stateOf("d/e/b"), 0);
 }
 
-TEST_F(IgnoreRules, ofAConfiguredFileCountLast) {
+TEST_F(IgnoreRules, ofAConfiguredFileComeLast) {
     folder.addFile(u"excludes", "a\nb\n");
     repository.run({"config", "core.excludesFile", (folder.onDisk() / "excludes").string()});
     expectAgreementOn("!a\n");
@@ -182,7 +181,7 @@ TEST_F(IgnoreRules, areNotReadThroughALink) {
     EXPECT_EQ(stateOf("d/ab"), 0);
 }
 
-TEST_F(IgnoreRules, ofRandomSignsMeanWhatTheyMeanToGit) {
+TEST_F(IgnoreRules, ofRandomCharactersHaveTheMeaningThatGitGivesThem) {
     std::mt19937 random(7); // NOLINT: the same each time
     std::string const signs = "ab*?/[]!\\-d e*/a";
     for (int i = 0; i < 150; ++i) {
@@ -194,7 +193,7 @@ TEST_F(IgnoreRules, ofRandomSignsMeanWhatTheyMeanToGit) {
     }
 }
 
-TEST_F(IgnoreRules, withManyStarsTakeNoTime) {
+TEST_F(IgnoreRules, withManyStarsAreFast) {
     repository.write(std::string(200, 'a'));
     std::string rules;
     for (int i = 0; i < 60; ++i) {
@@ -204,7 +203,7 @@ TEST_F(IgnoreRules, withManyStarsTakeNoTime) {
     EXPECT_EQ(stateOf(std::string(200, 'a')), 0);
 }
 
-TEST_F(IgnoreRules, ofAMillionSignsTakeNoMemoryToSpeakOf) {
+TEST_F(IgnoreRules, ofAMillionCharactersNeedLittleMemory) {
     repository.write("a");
     std::string rule;
     for (int i = 0; i < 400'000; ++i) {

@@ -30,7 +30,7 @@ TEST_F(FileStates, anIgnoredFileIs2ButATrackedOneIsNot) {
     EXPECT_EQ(agreedStateOf("tracked.o"), 1);
 }
 
-TEST_F(FileStates, aFileInAnIgnoredFolderStaysIgnoredWhateverLaterRulesSay) {
+TEST_F(FileStates, aFileInAnIgnoredFolderStaysIgnoredRegardlessOfLaterRules) {
     repository.write(".gitignore", "out/\n!out/keep\n");
     repository.write("out/keep");
     EXPECT_EQ(agreedStateOf("out/keep"), 2);
@@ -55,7 +55,7 @@ TEST_F(FileStates, aModifiedFileIs3StagedOrNot) {
     EXPECT_EQ(agreedStateOf("b"), 3);
 }
 
-TEST_F(FileStates, aChangeThatWasStagedAndTakenBackOnDiskIs3) {
+TEST_F(FileStates, aChangeThatWasStagedAndRevertedOnDiskIs3) {
     commitFile("a", "1\n");
     repository.write("a", "2\n");
     repository.run({"add", "a"});
@@ -63,7 +63,7 @@ TEST_F(FileStates, aChangeThatWasStagedAndTakenBackOnDiskIs3) {
     EXPECT_EQ(agreedStateOf("a"), 3);
 }
 
-TEST_F(FileStates, aTrackedFileGoneFromTheDiskIs3) {
+TEST_F(FileStates, aTrackedFileThatWasDeletedIs3) {
     commitFile("a");
     commitFile("d/b");
     repository.write("new");
@@ -91,7 +91,7 @@ TEST_F(FileStates, aStagedExecutableBitIs3) {
     EXPECT_EQ(agreedStateOf("a"), 3);
 }
 
-TEST_F(FileStates, whatIsNeitherFileNorLinkInPlaceOfATrackedFileIs3AndInPlaceOfALink7) {
+TEST_F(FileStates, aSpecialFileInPlaceOfATrackedFileIs3AndInPlaceOfALink7) {
     commitFile("a");
     folder.addLink("work/link", "a");
     repository.commitAll();
@@ -185,7 +185,7 @@ TEST_F(FileStates, aLinkThatLeadsElsewhereIs3) {
     EXPECT_EQ(agreedStateOf("link"), 3);
 }
 
-TEST_F(FileStates, whatGitWasToldToAssumeIsUnmodified) {
+TEST_F(FileStates, aFileThatGitAssumesUnchangedOrSkipsIsUnmodified) {
     commitFile("assumed", "1\n");
     commitFile("skipped", "1\n");
     repository.run({"update-index", "--assume-unchanged", "assumed"});
@@ -256,7 +256,7 @@ TEST_F(FileStates, namesOfAllKindsAreFound) {
     }
 }
 
-TEST_F(FileStates, namesThatDifferInCaseOnlyAreTwoFilesWhateverTheConfigurationSays) {
+TEST_F(FileStates, namesThatDifferInCaseOnlyAreTwoFilesRegardlessOfTheConfiguration) {
     commitFile("File");
     std::filesystem::rename(repository.onDisk() / "File", repository.onDisk() / "file");
     EXPECT_EQ(agreedStateOf("File"), 3);
@@ -266,7 +266,7 @@ TEST_F(FileStates, namesThatDifferInCaseOnlyAreTwoFilesWhateverTheConfigurationS
     EXPECT_EQ(stateOf("file"), 0);
 }
 
-TEST_F(FileStates, whatOthersDoToTheRepositoryIsSeen) {
+TEST_F(FileStates, changesByOtherProgramsAreSeen) {
     commitFile("a");
     EXPECT_EQ(agreedStateOf("a"), 1);
     repository.run({"rm", "-q", "--cached", "a"});

@@ -12,10 +12,10 @@ TEST_F(IndexReading, anEmptyListNeedsNoRepository) {
     adapter.addToSourceControl({});
     adapter.removeFromSourceControl({});
     repository.write("a");
-    EXPECT_THROW(stateOf("a"), GitError); // the damage would have shown
+    EXPECT_THROW(stateOf("a"), GitError); // shows that the index is damaged
 }
 
-TEST_F(IndexReading, aPathThatIsAskedForTwiceIsAnsweredOnce) {
+TEST_F(IndexReading, aPathThatIsGivenTwiceIsReturnedOnce) {
     repository.write("a");
     EXPECT_EQ(adapter.getFileStates({repository.path("a"), repository.path("a")}).size(), 1u);
 }
@@ -29,14 +29,14 @@ TEST_F(IndexReading, anIndexOfEveryVersionIsRead) {
     }
 }
 
-TEST_F(IndexReading, anIndexWithWhatOnlySpeedsGitUpIsRead) {
+TEST_F(IndexReading, anIndexWithExtensionsIsRead) {
     commitFile("a");
     repository.run({"update-index", "--force-untracked-cache"});
     repository.run({"status"});
     EXPECT_EQ(agreedStateOf("a"), 1);
 }
 
-TEST_F(IndexReading, aDamagedIndexIsAnErrorEachTimeUntilItIsMended) {
+TEST_F(IndexReading, aDamagedIndexIsAnErrorEachTimeUntilItIsRepaired) {
     commitFile("a");
     EXPECT_EQ(stateOf("a"), 1);
     auto const whole = folder.onDisk() / "whole";
@@ -56,7 +56,7 @@ TEST_F(IndexReading, withoutAnIndexEverythingCommittedIsRemoved) {
     EXPECT_EQ(agreedStateOf("a"), 6);
 }
 
-TEST_F(IndexReading, anIndexThatIsSplitGivesAnErrorThatTellsWhatToDo) {
+TEST_F(IndexReading, aSplitIndexIsAnErrorWithARemedy) {
     commitFile("a");
     repository.run({"update-index", "--split-index"});
     try {

@@ -5,7 +5,7 @@
 namespace project::git {
 namespace {
 
-/// Folders, what lies outside the work tree, and what is not what its name says.
+/// Folders, paths outside the work tree, and entries of an unexpected type.
 class PlaceStates : public GitTest {};
 
 TEST_F(PlaceStates, aFolderIs1WhenAnythingBelowItIsTracked) {
@@ -39,7 +39,7 @@ TEST_F(PlaceStates, aFolderWhoseOnlyFileHasASimilarNameBesideItIsNotTracked) {
     EXPECT_EQ(stateOf("d"), 0);
 }
 
-TEST_F(PlaceStates, aFileInPlaceOfATrackedFolderIs0AndWhatWasBelowIs3) {
+TEST_F(PlaceStates, aFileInPlaceOfATrackedFolderIs0AndTheFilesBelowAre3) {
     commitFile("d/a");
     repository.remove("d");
     repository.write("d");
@@ -55,7 +55,7 @@ TEST_F(PlaceStates, aFolderInPlaceOfATrackedFileLeavesThatAt3) {
     EXPECT_EQ(agreedStateOf("a/b"), 0);
 }
 
-TEST_F(PlaceStates, whatIsNotThereIs9) {
+TEST_F(PlaceStates, aPathThatDoesNotExistIs9) {
     commitFile("a");
     EXPECT_EQ(stateOf("b"), 9);
     EXPECT_EQ(stateOf("c/d/e"), 9);
@@ -63,12 +63,12 @@ TEST_F(PlaceStates, whatIsNotThereIs9) {
     EXPECT_EQ(stateOf(std::string(300, 'x')), 9);
 }
 
-TEST_F(PlaceStates, whatIsNeitherFileNorLinkNorFolderIs9) {
+TEST_F(PlaceStates, aSpecialFileIs9) {
     ASSERT_EQ(::mkfifo((repository.onDisk() / "pipe").c_str(), 0600), 0);
     EXPECT_EQ(stateOf("pipe"), 9);
 }
 
-TEST_F(PlaceStates, whatLiesOutsideTheWorkTreeIs8) {
+TEST_F(PlaceStates, everythingOutsideTheWorkTreeIs8) {
     commitFile("a");
     folder.addFile(u"beside", "");
     std::vector<Path> const outside{folder.path(u"beside"),
@@ -89,7 +89,7 @@ TEST_F(PlaceStates, whatLiesOutsideTheWorkTreeIs8) {
     }
 }
 
-TEST_F(PlaceStates, whatLiesBeyondALinkIs8) {
+TEST_F(PlaceStates, everythingBeyondALinkIs8) {
     repository.write("real/a");
     repository.run({"add", "-A"});
     folder.addLink("work/link", "real");
@@ -105,20 +105,20 @@ TEST_F(PlaceStates, aTrackedFileWhoseFolderBecameALinkIs3) {
     EXPECT_EQ(agreedStateOf("d"), 0);
 }
 
-TEST_F(PlaceStates, whatLiesInAnotherRepositoryInsideIs8) {
+TEST_F(PlaceStates, everythingInAnotherRepositoryInsideIs8) {
     GitRepository::init(folder.addFolder("work/inner")).write("deep/a");
     EXPECT_EQ(stateOf("inner"), 0);
     EXPECT_EQ(stateOf("inner/deep/a"), 8);
     EXPECT_EQ(stateOf("inner/deep"), 8);
 }
 
-TEST_F(PlaceStates, aFolderWithAnythingElseCalledDotGitIsNoRepository) {
+TEST_F(PlaceStates, aFolderWithAnythingElseCalledDotGitIsNotARepository) {
     repository.write("d/.git", "not a repository\n");
     repository.write("d/a");
     EXPECT_EQ(agreedStateOf("d/a"), 0);
 }
 
-TEST_F(PlaceStates, whatLiesInARepositoryWhoseDotGitIsAFileIs8) {
+TEST_F(PlaceStates, everythingInARepositoryWhoseDotGitIsAFileIs8) {
     runGit(folder.onDisk(),
            {"init", "-q", "--separate-git-dir", (folder.onDisk() / "meta").string(), "work/inner"});
     repository.write("inner/a");
@@ -128,7 +128,7 @@ TEST_F(PlaceStates, whatLiesInARepositoryWhoseDotGitIsAFileIs8) {
     EXPECT_EQ(repository.index(), "");
 }
 
-TEST_F(PlaceStates, aFolderWithPartOfARepositoryIsNone) {
+TEST_F(PlaceStates, aFolderWithPartOfARepositoryIsNotARepository) {
     for (std::string const part : {"HEAD", "objects", "refs"}) {
         GitRepository::init(folder.addFolder("work/" + part));
         repository.write(part + "/a");
@@ -160,7 +160,7 @@ TEST_F(PlaceStates, aProjectWhoseFolderHasNoNameOnDiskIsInNoRepository) {
     EXPECT_TRUE(nowhere.trackedBelow({}).empty());
 }
 
-TEST_F(PlaceStates, aProjectThatWasOpenedByWayOfALinkFindsItsFiles) {
+TEST_F(PlaceStates, aProjectThatWasOpenedThroughALinkFindsItsFiles) {
     commitFile("sub/a");
     folder.addLink("way", "work/sub");
     GitAdapter throughLink(folder.path(u"way"));

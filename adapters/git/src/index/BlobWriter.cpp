@@ -12,7 +12,7 @@ namespace project::git {
 
 namespace {
 
-constexpr auto action = "the file can't be staged";
+constexpr auto action = "the file cannot be staged";
 constexpr off_t tooLargeForMemory = off_t{64} << 20;
 
 using FilterHandle = std::unique_ptr<git_filter_list, FreedBy<git_filter_list_free>>;
@@ -46,8 +46,9 @@ bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isC
         return false;
     }
     if (!content) {
-        throw GitError(name, "the file can't be read: " + std::generic_category().message(errno),
-                       "Look at its permissions, and try again.");
+        throw GitError(GitError::Kind::Failed, name,
+                       "the file cannot be read: " + std::generic_category().message(errno),
+                       "Check its permissions, and try again.");
     }
     store(path, isConverted && S_ISREG(onDisk.st_mode) ? convert(path, *content) : *content, id);
     return true;

@@ -8,19 +8,18 @@
 
 namespace project::git {
 
-/// Puts the content of files of the work tree into the repository, as git would store it.
+/// Stores the content of files of the work tree in the repository, as git does.
 ///
-/// It has a way of its own to the repository's objects: libgit2's usual one lists the packs anew for each
-/// object that isn't there yet, which took most of the time when 100,000 files were staged.
+/// It opens the repository's objects itself: libgit2's usual way lists the packs again for each new object,
+/// which took most of the time when 100,000 files were staged.
 class BlobWriter {
 public:
     explicit BlobWriter(Repository const& repository);
 
-    /// Stores a file's content, with the line ends and other forms that its attributes ask for, or what a
-    /// link leads to.
-    /// @param[out] id of what was stored.
-    /// @return false when it is gone.
-    /// @throws GitError when it can't be read or stored.
+    /// Stores a file's content, converted as its attributes require, or the target of a link.
+    /// @param[out] id the identity of the stored content.
+    /// @return false if the file no longer exists.
+    /// @throws GitError if it cannot be read or stored.
     bool write(TreePath const& path, struct stat const& onDisk, bool isConverted, git_oid& id);
 
 private:

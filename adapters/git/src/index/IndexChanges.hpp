@@ -9,15 +9,15 @@
 
 namespace project::git {
 
-/// What one call does to the index.
+/// The changes of one call to the index.
 struct IndexChanges {
-    std::map<TreePath, git_index_entry, std::less<>> staged; ///< the entries' own paths are not set
+    std::map<TreePath, git_index_entry, std::less<>> staged; ///< without the paths in the entries
     std::set<TreePath, std::less<>> removed;
 
     bool empty() const { return staged.empty() && removed.empty(); }
 
-    /// Whether what the index has at a path, conflicts included, goes.
-    bool replace(char const* path) const { return removed.contains(path) || staged.contains(path); }
+    /// Whether the entries for a path, including those of a conflict, are dropped.
+    bool areDropped(char const* path) const { return removed.contains(path) || staged.contains(path); }
 };
 
 } // namespace project::git

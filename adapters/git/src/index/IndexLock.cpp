@@ -16,8 +16,9 @@ namespace project::git {
 namespace {
 
 [[noreturn]] void throwUnwritable(std::string const& file, int error) {
-    throw GitError(file, "the index can't be written: " + std::generic_category().message(error),
-                   "Look at the permissions of the repository and at the room on its disk, and try again.");
+    throw GitError(GitError::Kind::Failed, file,
+                   "the index cannot be written: " + std::generic_category().message(error),
+                   "Check the permissions of the repository and the free space on its disk, and try again.");
 }
 
 } // namespace
@@ -26,14 +27,15 @@ IndexLock::IndexLock(std::string index)
     : index_(std::move(index)), lock_(index_ + ".lock"), newIndex_(index_ + ".lock.new") {
     auto const descriptor = ::open(lock_.c_str(), O_CREAT | O_EXCL | O_WRONLY | O_CLOEXEC, 0666);
     if (descriptor < 0 && errno == EEXIST) {
-        throw GitError(lock_, "the index is locked: git is at work in this repository, or has died in it",
-                       "Try again when it has ended; if none is at work, delete this file and try again.");
+        throw GitError(GitError::Kind::Busy, lock_,
+                       "the index is locked: git is running in this repository, or was killed",
+                       "Try again when it has ended; if git is not running, delete this file and try again.");
     }
     if (descriptor < 0) {
         throwUnwritable(lock_, errno);
     }
     ::close(descriptor);
-    ::unlink(newIndex_.c_str()); // of one who died
+    ::unlink(newIndex_.c_str()); // a leftover
 }
 
 IndexLock::~IndexLock() {

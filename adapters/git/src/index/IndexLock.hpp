@@ -4,25 +4,25 @@
 
 namespace project::git {
 
-/// Keeps git and everybody else from writing an index, in git's way: whoever makes the file "index.lock" may
-/// write (git's Documentation/technical/api-lockfile). Held from before the index is read until the new one
-/// stands, so that no change of somebody else is lost in between.
+/// Excludes git and other programs from writing an index, as git does: the process that creates the file
+/// "index.lock" holds the lock (git's Documentation/technical/api-lockfile). It is held from before the index
+/// is read until the new one is in place, so that changes of other programs are not lost.
 class IndexLock {
 public:
-    /// @throws GitError when somebody else holds the lock, or nobody may write there; its file is the lock
-    /// file.
+    /// @throws GitError if another process holds the lock, or the lock file cannot be created; the error's
+    /// file is the lock file.
     explicit IndexLock(std::string index);
 
-    /// Lets the lock go.
+    /// Releases the lock.
     ~IndexLock();
     IndexLock(IndexLock const&) = delete;
     IndexLock& operator=(IndexLock const&) = delete;
 
-    /// Where the new index is prepared.
+    /// The file for the new index.
     std::string const& newIndex() const { return newIndex_; }
 
-    /// Puts the prepared index in the place of the old one, whose permissions it gets.
-    /// @throws GitError when that fails; the old one stays.
+    /// Replaces the old index by the new one, with the permissions of the old one.
+    /// @throws GitError if that fails; the old index stays.
     void replaceIndex() const;
 
 private:

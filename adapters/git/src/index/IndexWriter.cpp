@@ -6,16 +6,17 @@ namespace project::git {
 
 namespace {
 
-constexpr auto unwritable = "the index can't be written";
+constexpr auto unwritable = "the index cannot be written";
 
 } // namespace
 
 IndexWriter::IndexWriter(Repository& repository, IndexLock const& lock)
     : repository_(repository), lock_(lock), comparison_(repository) {
-    git_index* made = nullptr;
-    require(git_index_open(&made, lock.newIndex().c_str()), lock.newIndex(), unwritable);
-    result_.reset(made);
-    require(git_index_set_version(made, git_index_version(repository.index())), lock.newIndex(), unwritable);
+    git_index* created = nullptr;
+    require(git_index_open(&created, lock.newIndex().c_str()), lock.newIndex(), unwritable);
+    result_.reset(created);
+    require(git_index_set_version(created, git_index_version(repository.index())), lock.newIndex(),
+            unwritable);
 }
 
 void IndexWriter::write(IndexChanges const& changes) {
@@ -31,7 +32,7 @@ void IndexWriter::write(IndexChanges const& changes) {
     for (std::size_t position = 0; position < git_index_entrycount(old); ++position) {
         auto const& entry = *git_index_get_byindex(old, position);
         addStagedBefore(entry.path);
-        if (!changes.replace(entry.path)) {
+        if (!changes.areDropped(entry.path)) {
             keep(entry);
         }
     }
@@ -40,8 +41,8 @@ void IndexWriter::write(IndexChanges const& changes) {
     lock_.replaceIndex();
 }
 
-/// An entry as young as the old index is not as young as the new one; a size of 0 tells that its file has to
-/// be read all the same.
+/// An entry that is as young as the old index is older than the new one. If its file has changed, a size of 0
+/// marks that the file has to be read.
 void IndexWriter::keep(git_index_entry const& entry) {
     auto kept = entry;
     if (comparison_.hidesChanges(entry)) {
@@ -55,7 +56,7 @@ void IndexWriter::keep(git_index_entry const& entry) {
 
 void IndexWriter::add(git_index_entry const& entry) {
     require(git_index_add(result_.get(), &entry), repository_.workTree().onDisk(entry.path),
-            "the file can't stand in the index");
+            "the index cannot contain the file");
 }
 
 } // namespace project::git

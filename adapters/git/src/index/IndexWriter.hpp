@@ -7,17 +7,17 @@
 
 namespace project::git {
 
-/// Writes an index anew with some changes, in one pass over it, and once.
+/// Writes a new index with the changes of one call, in one pass over the old index.
 ///
-/// Every other entry stays as it is, with its flags and conflicts. What git can make again is left out: the
-/// cached trees, the list of untracked files, the memory of resolved conflicts. The repository's own object
-/// is not changed, so that nothing has to be undone when this fails.
+/// All other entries stay unchanged, with their flags and conflicts. Parts that git can create again are left
+/// out: the cached trees, the list of untracked files, the record of resolved conflicts. The repository's own
+/// object is not changed, so that a failure needs no roll back.
 class IndexWriter {
 public:
-    /// @param repository read since the lock is held.
+    /// @param repository read after the lock was taken.
     IndexWriter(Repository& repository, IndexLock const& lock);
 
-    /// @throws GitError when it can't be written; the old index stays.
+    /// @throws GitError if it cannot be written; the old index stays.
     void write(IndexChanges const& changes);
 
 private:

@@ -15,8 +15,8 @@ namespace {
 
 void requireNothingForeign(std::string const& file, Conversion const& conversion) {
     if (!conversion.foreign.empty()) {
-        throw GitError(file,
-                       "the file can't be staged here: " + conversion.foreign + " has to be applied to it",
+        throw GitError(GitError::Kind::Refused, file,
+                       "the file cannot be staged here: " + conversion.foreign + " has to be applied to it",
                        "Stage it with `git add`, then try again.");
     }
 }
@@ -58,7 +58,7 @@ void Staging::remove(std::vector<fl::filesystem::Path> const& files) {
     }
 }
 
-/// What of the list can be staged; throws before anything is when git alone could do it.
+/// The files of the list that can be staged. Throws if there is one that only git can stage.
 Staging::Names Staging::stageable(std::vector<fl::filesystem::Path> const& files) const {
     WorkTreeFolders folders(repository_);
     ContentRules rules(repository_);
@@ -81,19 +81,19 @@ Staging::Names Staging::stageable(std::vector<fl::filesystem::Path> const& files
 }
 
 void Staging::stage(TreePath const& path, bool isConverted, BlobWriter& blobs, IndexChanges& changes) const {
-    auto const onDisk = diskEntryAt(repository_.workTree().onDisk(path)); // with the times before it is read
+    auto const onDisk = diskEntryAt(repository_.workTree().onDisk(path)); // before it is read, for its times
     git_index_entry entry{};
     if (!onDisk || !isFileOrLink(*onDisk) || !blobs.write(path, *onDisk, isConverted, entry.id)) {
-        return; // went in the meantime
+        return; // deleted in the meantime
     }
     record(*onDisk, entry);
     entry.mode = modeOf(*onDisk, trackedAt(repository_.index(), path), repository_.settings());
-    removeWhatCannotStandBeside(path, changes);
+    removeReplaced(path, changes);
     changes.staged.insert_or_assign(path, entry);
 }
 
-/// The disk has a file where the index has a folder, or the other way round.
-void Staging::removeWhatCannotStandBeside(TreePath const& path, IndexChanges& changes) const {
+/// Removes entries for a folder in whose place there is a file on disk, or the reverse.
+void Staging::removeReplaced(TreePath const& path, IndexChanges& changes) const {
     for (auto folder = parentOf(path); !folder.empty(); folder = parentOf(folder)) {
         if (trackedAt(repository_.index(), folder) != nullptr) {
             changes.removed.insert(folder);

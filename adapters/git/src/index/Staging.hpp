@@ -10,7 +10,7 @@
 
 namespace project::git {
 
-/// Does what one call asks for to the index: all of it, or nothing.
+/// Applies the changes of one call to the index: all of them, or none.
 class Staging {
 public:
     explicit Staging(Repository& repository) : repository_(repository) {}
@@ -19,11 +19,11 @@ public:
     void remove(std::vector<fl::filesystem::Path> const& files);
 
 private:
-    using Names = std::map<TreePath, bool>; // whether the content is converted
+    using Names = std::map<TreePath, bool>; // and whether the content is converted
 
     Names stageable(std::vector<fl::filesystem::Path> const& files) const;
     void stage(TreePath const& path, bool isConverted, BlobWriter& blobs, IndexChanges& changes) const;
-    void removeWhatCannotStandBeside(TreePath const& path, IndexChanges& changes) const;
+    void removeReplaced(TreePath const& path, IndexChanges& changes) const;
     void removeBelow(TreePath const& folder, IndexChanges& changes) const;
 
     Repository& repository_;

@@ -7,14 +7,15 @@
 
 namespace project::git {
 
-/// What is on disk under a name, links not followed; nothing when nothing is, or nobody may look.
+/// The entry of the disk with a name, without following links; nothing if there is none or it is not
+/// accessible.
 inline std::optional<struct stat> diskEntryAt(std::string const& name) {
     struct stat found {};
 
     return ::lstat(name.c_str(), &found) == 0 ? std::optional(found) : std::nullopt;
 }
 
-/// What git can track by itself.
+/// Whether git can track an entry as such.
 inline bool isFileOrLink(struct stat const& entry) {
     return S_ISREG(entry.st_mode) || S_ISLNK(entry.st_mode);
 }

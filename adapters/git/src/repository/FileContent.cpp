@@ -14,7 +14,7 @@ std::optional<std::string> readFile(std::string const& name, Links links, std::s
     if (file < 0) {
         return std::nullopt;
     }
-    std::string result(expectedSize + 1, '\0'); // one more, to see the end
+    std::string result(expectedSize + 1, '\0'); // one more, to detect the end
     std::size_t length = 0;
     ssize_t got = 0;
     do {

@@ -6,14 +6,14 @@
 
 namespace project::git {
 
-/// Whether a symbolic link in place of a file counts as the file that it leads to.
+/// Whether to read through a symbolic link in place of a file.
 enum class Links { Followed, NotFollowed };
 
-/// All bytes of a file. Nothing, with errno, when it can't be read.
-/// @param expectedSize how many there will be, if the caller knows.
+/// All bytes of a file; nothing, with errno set, if it cannot be read.
+/// @param expectedSize the number of bytes, if the caller knows it.
 std::optional<std::string> readFile(std::string const& name, Links links, std::size_t expectedSize = 4095);
 
-/// What a symbolic link leads to. Nothing, with errno, when it can't be read.
+/// The target of a symbolic link; nothing, with errno set, if it cannot be read.
 std::optional<std::string> readLink(std::string const& name);
 
 } // namespace project::git

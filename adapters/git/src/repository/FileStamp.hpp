@@ -7,7 +7,8 @@
 
 namespace project::git {
 
-/// What tells whether a file is still the one that was read. All zero for one that is not there.
+/// The identity, size and time of a file, to detect that it has changed since it was read. All zero if the
+/// file does not exist.
 struct FileStamp {
     dev_t device = 0;
     ino_t number = 0;

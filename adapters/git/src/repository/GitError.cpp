@@ -4,8 +4,8 @@
 
 namespace project::git {
 
-GitError::GitError(std::string file, std::string problem, std::string remedy)
-    : file_(std::move(file)), problem_(std::move(problem)), remedy_(std::move(remedy)) {
+GitError::GitError(Kind kind, std::string file, std::string problem, std::string remedy)
+    : kind_(kind), file_(std::move(file)), problem_(std::move(problem)), remedy_(std::move(remedy)) {
     getStackTrace().capture(0);
     text_ = (file_.empty() ? "" : file_ + ": ") + problem_ + "." + (remedy_.empty() ? "" : " " + remedy_);
 }

@@ -4,7 +4,7 @@ namespace project::git {
 
 namespace {
 
-constexpr auto unreadable = "the last commit can't be read";
+constexpr auto unreadable = "the last commit cannot be read";
 
 } // namespace
 

@@ -8,17 +8,16 @@
 
 namespace project::git {
 
-/// The files of the last commit. Each of its folders is read when it is first asked for, and kept until there
-/// is another commit.
+/// The files of the last commit. Each folder is read on first use and kept until HEAD is another commit.
 class HeadTree {
 public:
     explicit HeadTree(git_repository* repository) : repository_(repository) {}
 
-    /// Looks which commit is the last one. Before the first commit there are no files.
-    /// @throws GitError when it can't be read.
+    /// Reads which commit is the last one. Before the first commit there are no files.
+    /// @throws GitError if it cannot be read.
     void refresh();
 
-    /// The file, link or submodule at a path; null when there is none. Valid until the next refresh.
+    /// The file, link or submodule at a path; null if there is none. Valid until the next refresh.
     git_tree_entry const* find(TreePath const& path);
 
 private:
@@ -27,7 +26,7 @@ private:
 
     git_repository* repository_;
     git_oid root_{};
-    std::unordered_map<TreePath, TreeHandle> folders_; // null where the commit has none
+    std::unordered_map<TreePath, TreeHandle> folders_; // null if the commit has no such folder
 };
 
 } // namespace project::git

@@ -10,10 +10,10 @@ namespace project::git {
 
 namespace {
 
-/// A user's configuration that this process may not read does not count for git (config.c, "access_or_die"
-/// with ACCESS_EACCES_OK), while libgit2 1.5.1 opens no repository then. It happens where somebody else's
-/// environment was taken over, as by `su` without a login.
-void passOverUnreadable(git_config_level_t level, char const* file) {
+/// git ignores a user's configuration that the process must not read (config.c, "access_or_die" with
+/// ACCESS_EACCES_OK), but libgit2 1.5.1 then opens no repository. This happens in the environment of another
+/// user, for example after `su` without a login.
+void ignoreUnreadable(git_config_level_t level, char const* file) {
     git_buf folder = GIT_BUF_INIT;
     if (git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, level, &folder) != 0) {
         return;
@@ -28,9 +28,9 @@ void passOverUnreadable(git_config_level_t level, char const* file) {
 } // namespace
 
 LibGit::LibGit() {
-    require(git_libgit2_init(), "", "libgit2 can't be used");
-    passOverUnreadable(GIT_CONFIG_LEVEL_GLOBAL, ".gitconfig");
-    passOverUnreadable(GIT_CONFIG_LEVEL_XDG, "config");
+    require(git_libgit2_init(), "", "libgit2 cannot be used");
+    ignoreUnreadable(GIT_CONFIG_LEVEL_GLOBAL, ".gitconfig");
+    ignoreUnreadable(GIT_CONFIG_LEVEL_XDG, "config");
 }
 
 LibGit::~LibGit() {
@@ -39,7 +39,8 @@ LibGit::~LibGit() {
 
 void throwLibGitError(std::string const& file, std::string const& action, std::string const& remedy) {
     auto const* const error = git_error_last();
-    throw GitError(file, action + (error == nullptr ? "" : ": " + std::string(error->message)), remedy);
+    throw GitError(GitError::Kind::Failed, file,
+                   action + (error == nullptr ? "" : ": " + std::string(error->message)), remedy);
 }
 
 void require(int code, std::string const& file, char const* action) {

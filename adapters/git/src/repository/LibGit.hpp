@@ -7,7 +7,7 @@
 
 namespace project::git {
 
-/// Keeps libgit2 ready for use as long as it lives; libgit2 counts, so there may be several.
+/// Initialises libgit2 for its lifetime. Several objects may exist: libgit2 counts them.
 class LibGit {
 public:
     LibGit();
@@ -33,13 +33,13 @@ using OdbHandle = std::unique_ptr<git_odb, FreedBy<git_odb_free>>;
 using BlobHandle = std::unique_ptr<git_blob, FreedBy<git_blob_free>>;
 using TreeHandle = std::unique_ptr<git_tree, FreedBy<git_tree_free>>;
 
-/// Throws the GitError for what libgit2 has just refused, in its own words.
-/// @param file what it is about.
-/// @param action what could not be done, as in "the index can't be read".
+/// Throws a GitError with the message of libgit2's last error.
+/// @param file the file or folder concerned.
+/// @param action the failure, for example "the index cannot be read".
 [[noreturn]] void throwLibGitError(std::string const& file, std::string const& action,
                                    std::string const& remedy = "");
 
-/// The same when a call of libgit2 gave an error, and nothing otherwise.
+/// The same if a call of libgit2 returned an error code.
 void require(int code, std::string const& file, char const* action);
 
 /// Whether there is a repository at a folder or above it, regardless of its owner.

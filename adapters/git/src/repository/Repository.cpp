@@ -11,7 +11,7 @@ namespace {
 ConfigHandle configOf(git_repository* repository) {
     git_config* config = nullptr;
     require(git_repository_config(&config, repository), git_repository_path(repository),
-            "the configuration can't be read");
+            "the configuration cannot be read");
     return ConfigHandle(config);
 }
 
@@ -33,17 +33,17 @@ std::array<FileStamp, 2> Repository::stampConfiguration() const {
             FileStamp::of(git_repository_path(get()) + std::string("config.worktree"))};
 }
 
-// git keeps the settings of a sparse checkout in a file that libgit2 reads from version 1.8 on only.
+// git stores the settings of a sparse checkout in a file that libgit2 does not read before version 1.8.
 void Repository::addWorkTreeConfiguration() {
     auto const file = git_repository_path(get()) + std::string("config.worktree");
     if (isSet("extensions.worktreeConfig", false) && FileStamp::of(file) != FileStamp()) {
         require(git_config_add_file_ondisk(config_.get(), file.c_str(), GIT_CONFIG_LEVEL_APP, get(), 1), file,
-                "the configuration can't be read");
+                "the configuration cannot be read");
     }
 }
 
-/// libgit2 1.5.1 looks at the size of the index before it opens it, so that one which git puts in its place
-/// in between reads as if it were cut off. What could not be read counts only if it is still there.
+/// libgit2 1.5.1 determines the size of the index before it opens the file. If git replaces the index in
+/// between, libgit2 reports it as truncated. An error is therefore final only if the file has not changed.
 template <typename Read>
 FileStamp Repository::readIndex(std::string const& file, Read const& read) const {
     constexpr int tries = 100;
@@ -61,7 +61,7 @@ void Repository::refresh() {
     if (index_ == nullptr) {
         openIndex();
     }
-    // One that can't be read is tried again with the next call.
+    // After a failure, the next call tries again.
     if (!isIndexRead_ || FileStamp::of(indexFile()) != indexStamp_) {
         isIndexRead_ = false;
         indexStamp_ = readIndex(indexFile(), [this] { return git_index_read(index_.get(), 1); });
@@ -75,16 +75,16 @@ void Repository::openIndex() {
     readIndex(git_repository_path(get()) + std::string("index"),
               [&] { return git_repository_index(&index, get()); });
     index_.reset(index);
-    // By default it would be sorted and searched as core.ignoreCase says.
-    require(git_index_set_caps(index, 0), indexFile(), "the index can't be used");
+    // By default, libgit2 sorts and searches the index according to core.ignoreCase.
+    require(git_index_set_caps(index, 0), indexFile(), "the index cannot be used");
 }
 
 void Repository::requireReadable(int code) const {
     if (code < 0) {
-        throwLibGitError(git_repository_path(get()) + std::string("index"), "the index can't be read",
-                         "If `git status` reads it, it is written in a way that is not known here: "
+        throwLibGitError(git_repository_path(get()) + std::string("index"), "the index cannot be read",
+                         "If `git status` reads it, it has a format that this library does not know. "
                          "`git update-index --no-split-index --index-version 2` and "
-                         "`git sparse-checkout reapply --no-sparse-index` write it plainly.");
+                         "`git sparse-checkout reapply --no-sparse-index` write it in a known format.");
     }
 }
 

@@ -10,25 +10,26 @@
 
 namespace project::git {
 
-/// What the repository is configured to believe of the disk.
+/// The settings that describe the disk and the checkout.
 struct DiskSettings {
     bool hasExecutableBit; ///< core.fileMode
     bool hasLinks;         ///< core.symlinks
     bool isSparse;         ///< core.sparseCheckout
 };
 
-/// One open repository with a work tree: its index and last commit, as they are on disk at a call's
-/// beginning.
+/// An open repository with a work tree: its index and last commit, as they are on disk when an operation
+/// begins.
 class Repository {
 public:
     /// @param handle a repository that is not bare.
     Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot);
 
-    /// False when it went, or was configured anew: libgit2 keeps what it once read of the configuration.
+    /// False if the repository was deleted or its configuration has changed: libgit2 reads the configuration
+    /// once.
     bool isAsOpened() const { return configuration_ == stampConfiguration(); }
 
-    /// Takes in what others did to the index and to the last commit.
-    /// @throws GitError when it can't be read.
+    /// Reads the index and the last commit again if other programs changed them.
+    /// @throws GitError if they cannot be read.
     void refresh();
 
     git_repository* get() const { return handle_.get(); }
@@ -38,7 +39,7 @@ public:
 
     std::string indexFile() const { return git_index_path(index_.get()); }
 
-    /// What the index file was like when it was last read.
+    /// The stamp of the index file when it was last read.
     FileStamp const& indexStamp() const { return indexStamp_; }
 
     HeadTree& head() { return head_; }
@@ -47,19 +48,19 @@ public:
 
     DiskSettings const& settings() const { return settings_; }
 
-    /// @param name as in "core.fileMode".
+    /// @param name for example "core.fileMode".
     bool isSet(std::string const& name, bool whenAbsent) const;
 
-    /// A text of the configuration, empty when it is absent.
+    /// A text of the configuration; empty if it is not set.
     std::string configured(std::string const& name) const;
 
     /// The same for the name of a file, which may begin with "~/".
     std::string configuredPath(std::string const& name) const;
 
-    /// Where git looks for a file of the user's, as in "ignore", when none is configured.
+    /// The default path of a user's file, for example "ignore"; empty if there is none.
     std::string usersFile(char const* name) const;
 
-    /// The content of a file of the work tree, or of its entry in the index where the disk has none.
+    /// The content of a file of the work tree, or of its index entry if it is not on disk.
     std::string contentOf(TreePath const& path) const;
 
 private:
@@ -71,7 +72,7 @@ private:
     void openIndex();
     void requireReadable(int code) const;
 
-    /// @return what the index file was like before it was read.
+    /// @return the stamp of the index file before it was read.
     template <typename Read>
     FileStamp readIndex(std::string const& file, Read const& read) const;
 

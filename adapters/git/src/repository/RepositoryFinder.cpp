@@ -15,12 +15,12 @@ namespace {
 
 [[noreturn]] void throwOwnerError(std::string const& place) {
     throw GitError(
-        place, "the repository can't be used: it belongs to somebody else",
+        GitError::Kind::Refused, place, "the repository cannot be used: it belongs to another user",
         "If you trust its owner, enter `git config --global --add safe.directory` with the top folder "
         "of its work tree.");
 }
 
-/// @return null when there is none.
+/// @return null if there is none.
 RepositoryHandle openAround(char const* root) {
     git_repository* found = nullptr;
     auto const code = git_repository_open_ext(&found, root, 0, nullptr);
@@ -30,7 +30,7 @@ RepositoryHandle openAround(char const* root) {
         throwOwnerError(root);
     }
     if (code != GIT_ENOTFOUND) {
-        require(code, root, "the repository can't be opened");
+        require(code, root, "the repository cannot be opened");
     }
     return RepositoryHandle(found);
 }
@@ -39,17 +39,18 @@ RepositoryHandle openNamed(char const* repository) {
     git_repository* found = nullptr;
     auto const flags = GIT_REPOSITORY_OPEN_NO_SEARCH | GIT_REPOSITORY_OPEN_NO_DOTGIT;
     require(git_repository_open_ext(&found, repository, flags, nullptr), repository,
-            "the repository that GIT_DIR names can't be opened");
+            "the repository that GIT_DIR names cannot be opened");
     return RepositoryHandle(found);
 }
 
 void setWorkTreeTo(git_repository* repository, std::filesystem::path const& folder) {
     auto const* const current = git_repository_workdir(repository);
-    std::error_code notThere;
-    if (current != nullptr && std::filesystem::equivalent(current, folder, notThere)) {
-        return; // libgit2 1.5.1 leaks memory when it is told what it knows
+    std::error_code missing;
+    if (current != nullptr && std::filesystem::equivalent(current, folder, missing)) {
+        return; // libgit2 1.5.1 leaks memory when it is given the folder that it already has
     }
-    require(git_repository_set_workdir(repository, folder.c_str(), 0), folder, "the work tree can't be used");
+    require(git_repository_set_workdir(repository, folder.c_str(), 0), folder,
+            "the work tree cannot be used");
 }
 
 /// git's own rule (git(1), "The Git Repository"): with GIT_DIR alone, the working folder is the work tree.
@@ -61,7 +62,7 @@ void setWorkTree(git_repository* repository) {
     }
     git_config* config = nullptr;
     require(git_repository_config(&config, repository), git_repository_path(repository),
-            "the configuration can't be read");
+            "the configuration cannot be read");
     ConfigHandle const owned(config);
     git_config_entry* entry = nullptr;
     int isBare = 0;
@@ -74,12 +75,12 @@ void setWorkTree(git_repository* repository) {
 
 void setIndex(git_repository* repository, char const* file) {
     git_index* index = nullptr;
-    require(git_index_open(&index, file), file, "the index can't be read");
+    require(git_index_open(&index, file), file, "the index cannot be read");
     IndexHandle const owned(index);
-    require(git_repository_set_index(repository, index), file, "the index can't be used");
+    require(git_repository_set_index(repository, index), file, "the index cannot be used");
 }
 
-/// libgit2 1.5 reads these variables when asked to, but gives up when it finds GIT_WORK_TREE.
+/// libgit2 1.5 can read these variables itself, but returns an error if GIT_WORK_TREE is set.
 RepositoryHandle openFromEnvironment(char const* root) {
     auto const* const repository = std::getenv("GIT_DIR");
     auto result = repository == nullptr ? openAround(root) : openNamed(repository);

@@ -13,9 +13,8 @@ class RepositoryFinder {
 public:
     RepositoryFinder(fl::filesystem::Path root, GitEnvironment environment);
 
-    /// The repository with what others did to it meanwhile; null when there is none, or none with a work
-    /// tree.
-    /// @throws GitError when there is one that can't be read.
+    /// The repository in its current state; null if there is none or it has no work tree.
+    /// @throws GitError if there is one that cannot be read.
     Repository* find();
 
 private:

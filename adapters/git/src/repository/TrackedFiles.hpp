@@ -7,10 +7,10 @@
 
 namespace project::git {
 
-/// What the index has at a path: its entry, or the first of those of a conflict; null when it has none.
+/// The entry of the index for a path, or the first one of a conflict; null if there is none.
 git_index_entry const* trackedAt(git_index* index, TreePath const& path);
 
-/// Where the entries begin that lie below a folder; behind the last entry when there are none.
+/// The position of the first entry below a folder; the number of entries if there is none.
 std::size_t firstBelow(git_index* index, TreePath const& folder);
 
 inline bool isBelow(char const* entry, TreePath const& folder) {

@@ -8,7 +8,8 @@ namespace project::git {
 
 namespace {
 
-/// An absolute name with single slashes and none at its end, "." and ".." taken as text. "/" gives "".
+/// An absolute name with single slashes and without one at the end; "." and ".." are resolved as text. "/"
+/// becomes "".
 std::string normalized(std::string_view name) {
     std::string result;
     result.reserve(name.size());

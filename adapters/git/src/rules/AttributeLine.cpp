@@ -129,7 +129,7 @@ std::optional<AttributeLine> AttributeLine::read(std::string_view line) {
         if (!state) {
             return std::nullopt;
         }
-        result.states.push_back(*std::move(state)); // NOLINT: their number shows only now
+        result.states.push_back(*std::move(state)); // NOLINT: their number is not known before
     }
     return result;
 }
@@ -142,7 +142,7 @@ std::vector<AttributeLine> readAttributeLines(std::string_view text) {
     while (!text.empty()) {
         auto const end = std::min(text.find('\n'), text.size());
         if (auto line = AttributeLine::read(text.substr(0, end))) {
-            result.push_back(*std::move(line)); // NOLINT: their number shows only now
+            result.push_back(*std::move(line)); // NOLINT: their number is not known before
         }
         text.remove_prefix(std::min(end + 1, text.size()));
     }

@@ -9,7 +9,7 @@
 
 namespace project::git {
 
-/// What an attribute is set to.
+/// The value of an attribute.
 struct AttributeValue {
     enum class Kind { Unspecified, Set, Unset, Text };
 
@@ -24,9 +24,9 @@ struct AttributeState {
     AttributeValue value;
 };
 
-/// One line of a `.gitattributes` (gitattributes(5)): either for names, or the definition of a macro.
+/// One line of a `.gitattributes` (gitattributes(5)): attributes for a pattern, or the definition of a macro.
 struct AttributeLine {
-    /// Nothing for a line that git passes over.
+    /// Nothing for a line that git ignores.
     static std::optional<AttributeLine> read(std::string_view line);
 
     std::optional<NamePattern> pattern{};
@@ -34,7 +34,7 @@ struct AttributeLine {
     std::vector<AttributeState> states{};
 };
 
-/// The lines of a whole file that git doesn't pass over.
+/// The lines of a file, without those that git ignores.
 std::vector<AttributeLine> readAttributeLines(std::string_view text);
 
 } // namespace project::git

@@ -7,7 +7,7 @@ namespace project::git {
 namespace {
 
 constexpr auto builtIn = "[attr]binary -diff -merge -text\n";
-constexpr auto ofSystem = "/etc/gitattributes"; // where Debian's git has it
+constexpr auto ofSystem = "/etc/gitattributes"; // the path in Debian's git
 
 std::vector<AttributeLine> readLines(std::string const& file) {
     return readAttributeLines(readFile(file, Links::Followed).value_or(""));
@@ -25,7 +25,7 @@ AttributeRules::AttributeRules(Repository const& repository)
     for (auto lines = general_.rbegin(); lines != general_.rend(); ++lines) {
         defineMacros(*lines);
     }
-    defineMacros(ofFolder(TreePath())); // no other folder may define any
+    defineMacros(ofFolder(TreePath())); // no other folder may define macros
     defineMacros(own_);
 }
 
@@ -60,7 +60,7 @@ void AttributeRules::defineMacros(Lines const& lines) {
     }
 }
 
-/// The last line that gives an attribute counts.
+/// The last line that sets an attribute decides.
 void AttributeRules::applyMatching(Lines const& lines, std::string_view path, Values& values) const {
     for (auto line = lines.rbegin(); line != lines.rend(); ++line) {
         if (line->pattern && line->pattern->matches(path, false, ignoresCase_)) {

@@ -12,19 +12,19 @@
 
 namespace project::git {
 
-/// The attributes of files, as git finds them for what is staged (gitattributes(5)): in the repository's
+/// The attributes of files, as git determines them for staging (gitattributes(5)): from the repository's
 /// `info/attributes`, the folders from the file's upwards, `core.attributesFile`, and the system's file. Each
 /// file of attributes is read once.
 ///
-/// libgit2 has them too, but passes over patterns in quotes, takes macros that are unset for set, and doesn't
-/// know those of other files: a file with a filter driver would be staged as it stands.
+/// libgit2's own implementation ignores patterns in quotes, treats unset macros as set, and does not know
+/// macros of other files. It would stage a file with a filter driver without the filter.
 class AttributeRules {
 public:
     using Values = std::map<std::string, AttributeValue, std::less<>>;
 
     explicit AttributeRules(Repository const& repository);
 
-    /// Every attribute that any line gives the file, macros included.
+    /// All attributes of a file, including macros.
     Values of(TreePath const& path);
 
 private:
@@ -39,7 +39,7 @@ private:
     Repository const& repository_;
     bool ignoresCase_;
     Lines own_;
-    std::vector<Lines> general_; // the first counts before the others
+    std::vector<Lines> general_; // in order of precedence
     std::unordered_map<TreePath, Lines> folders_;
     std::map<std::string, States, std::less<>> macros_;
 };

@@ -10,7 +10,7 @@ namespace project::git {
 
 namespace {
 
-/// What libgit2 converts by.
+/// The attributes that determine libgit2's conversions.
 constexpr std::array<char const*, 4> converting{"text", "eol", "crlf", "ident"};
 
 AttributeValue valueOf(AttributeRules::Values const& values, std::string_view name) {
@@ -18,7 +18,7 @@ AttributeValue valueOf(AttributeRules::Values const& values, std::string_view na
     return found == values.end() ? AttributeValue() : found->second;
 }
 
-/// As libgit2 tells it.
+/// From libgit2's form.
 AttributeValue valueFrom(char const* attribute) {
     switch (git_attr_value(attribute)) {
     case GIT_ATTR_VALUE_TRUE:
@@ -55,7 +55,7 @@ Conversion ContentRules::conversionOf(TreePath const& path) {
     } else if (!encoding.empty() && !isPlainUtf8(encoding)) {
         result.foreign = "the encoding \"" + encoding + '"';
     } else if (result.isNeeded && !isKnownToLibGit(path, values)) {
-        result.foreign = "an attribute of a form that is not known here";
+        result.foreign = "an attribute of an unknown form";
     }
     return result;
 }
@@ -65,14 +65,14 @@ bool ContentRules::isKnownToLibGit(TreePath const& path, AttributeRules::Values 
     std::array<char const*, converting.size()> found{};
     require(git_attr_get_many(found.data(), repository_.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX, path.c_str(),
                               names.size(), names.data()),
-            repository_.workTree().onDisk(path), "the attributes of the file can't be read");
+            repository_.workTree().onDisk(path), "the attributes of the file cannot be read");
     bool const isTextGiven = valueOf(values, "text") != AttributeValue();
-    return std::equal(
-        names.begin(), names.end(), found.begin(), [&](std::string_view name, char const* attribute) {
-            bool const isOutdone =
-                isTextGiven && name == "crlf"; // and libgit2's "binary" has it, but git's doesn't
-            return isOutdone || valueOf(values, name) == valueFrom(attribute);
-        });
+    return std::equal(names.begin(), names.end(), found.begin(),
+                      [&](std::string_view name, char const* attribute) {
+                          // libgit2's macro "binary" sets it and git's does not
+                          bool const isOverridden = isTextGiven && name == "crlf";
+                          return isOverridden || valueOf(values, name) == valueFrom(attribute);
+                      });
 }
 
 bool ContentRules::isConfigured(std::string const& driver) {

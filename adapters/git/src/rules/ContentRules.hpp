@@ -8,20 +8,20 @@
 
 namespace project::git {
 
-/// What becomes of a file's content on its way into the repository.
+/// The conversion of a file's content when it is staged.
 struct Conversion {
-    bool isNeeded; ///< whether libgit2 may have something to do: line ends, `$Id$`
-    /// What git alone does, as in "the filter driver \"lfs\"": libgit2 runs no program for `filter=`, and
-    /// knows no `working-tree-encoding=`. Empty when there is nothing.
+    bool isNeeded; ///< whether libgit2 may have to convert line ends or `$Id$`
+    /// A conversion that only git does, for example "the filter driver \"lfs\"": libgit2 does not run
+    /// programs for `filter=`, and does not know `working-tree-encoding=`. Empty if there is none.
     std::string foreign;
 };
 
-/// Tells from the attributes of files how their content is converted.
+/// Determines from the attributes of files how their content is converted.
 class ContentRules {
 public:
     explicit ContentRules(Repository const& repository);
 
-    /// @throws GitError when libgit2 can't tell the attributes that it goes by.
+    /// @throws GitError if libgit2 cannot read the attributes that it converts by.
     Conversion conversionOf(TreePath const& path);
 
 private:

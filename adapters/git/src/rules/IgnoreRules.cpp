@@ -6,7 +6,7 @@ namespace project::git {
 
 namespace {
 
-/// Spaces at the end don't count, but for one behind a backslash.
+/// Trailing spaces do not belong to a line, except for one after a backslash.
 std::string_view withoutEnd(std::string_view line) {
     if (line.ends_with('\r')) {
         line.remove_suffix(1);
@@ -32,7 +32,7 @@ std::vector<IgnoreLine> readLines(std::string const& file, Links links) {
     while (!text.empty()) {
         auto const end = std::min(text.find('\n'), text.size());
         if (auto read = IgnoreLine::read(text.substr(0, end))) {
-            result.push_back(*std::move(read)); // NOLINT: their number shows only now
+            result.push_back(*std::move(read)); // NOLINT: their number is not known before
         }
         text.remove_prefix(std::min(end + 1, text.size()));
     }
@@ -85,7 +85,7 @@ IgnoreRules::Lines const& IgnoreRules::ofFolder(TreePath const& folder) {
         .first->second;
 }
 
-/// The last line that matches counts.
+/// The last line that matches decides.
 std::optional<bool> IgnoreRules::decide(Lines const& lines, std::string_view path, bool isFolder) const {
     for (auto line = lines.rbegin(); line != lines.rend(); ++line) {
         if (line->pattern.matches(path, isFolder, ignoresCase_)) {

@@ -17,14 +17,14 @@ struct IgnoreLine {
     static std::optional<IgnoreLine> read(std::string_view line);
 
     NamePattern pattern;
-    bool isNegative; ///< whether what matches is taken in again
+    bool isNegative; ///< whether matching files are not ignored after all
 };
 
-/// The rules of a repository that tell which files are ignored (gitignore(5)): those of the folders, of
+/// The rules that determine which files a repository ignores (gitignore(5)): those of the folders, of
 /// `info/exclude` and of `core.excludesFile`. Each file of rules is read once.
 ///
-/// libgit2 has these rules too, but drops a line that takes back what another file ignores (its issue 7284),
-/// and looks at every file of rules again for each question.
+/// libgit2's own implementation drops a negative line for files that another file ignores (its issue 7284),
+/// and checks every file of rules again for each query.
 class IgnoreRules {
 public:
     explicit IgnoreRules(Repository const& repository);
@@ -40,7 +40,7 @@ private:
 
     Repository const& repository_;
     bool ignoresCase_;
-    std::vector<Lines> general_; // the first counts before the others
+    std::vector<Lines> general_; // in order of precedence
     std::unordered_map<TreePath, Lines> folders_;
 };
 

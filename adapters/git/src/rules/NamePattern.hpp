@@ -6,19 +6,19 @@
 
 namespace project::git {
 
-/// What the lines of `.gitignore` and `.gitattributes` begin with (gitignore(5)): which names they are for.
+/// The pattern at the beginning of a line of `.gitignore` or `.gitattributes` (gitignore(5)).
 class NamePattern {
 public:
-    /// Nothing for a text that no name can match.
+    /// Nothing for a text that cannot match any name.
     static std::optional<NamePattern> of(std::string_view text);
 
-    /// @param path as seen from the folder of the file that the pattern stands in.
+    /// @param path relative to the folder of the file that contains the pattern.
     bool matches(std::string_view path, bool isFolder, bool ignoresCase) const;
 
 private:
     std::string text_;
     bool isForFolders_ = false;
-    bool isPath_ = false; // else the last element is compared, in whatever folder
+    bool isPath_ = false; // else only the last element is compared
     bool hasWildcards_ = false;
 };
 

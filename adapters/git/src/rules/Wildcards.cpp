@@ -30,14 +30,14 @@ constexpr std::array<NamedClass, 12> namedClasses{{{"alnum", std::isalnum},
                                                    {"upper", std::isupper},
                                                    {"xdigit", std::isxdigit}}};
 
-/// Reads "[...]" and tells whether it holds a byte.
+/// Reads "[...]" and determines whether it contains a byte.
 class BracketReader {
 public:
     /// @param at the position behind the opening bracket.
     BracketReader(std::string_view pattern, std::size_t at, bool ignoresCase)
         : pattern_(pattern), at_(at), ignoresCase_(ignoresCase) {}
 
-    /// Nothing when the bracket isn't closed or names a class that there isn't.
+    /// Nothing if the bracket is not closed or names an unknown class.
     std::optional<bool> holds(Byte byte) {
         bool const isNegated = isAt('!') || isAt('^');
         at_ += isNegated ? 1 : 0;
@@ -70,7 +70,7 @@ private:
             return std::nullopt;
         }
         if (pattern_[close - 1] != ':' || close < at_ + 3) {
-            return holdsRange(byte); // not a name after all: the bracket is one of the signs
+            return holdsRange(byte); // not a name: the bracket is one of the characters
         }
         auto const name = pattern_.substr(at_ + 2, close - at_ - 3);
         at_ = close + 1;
@@ -96,7 +96,7 @@ private:
             return std::nullopt;
         }
         auto const isBetween = [&](int sign) { return *first <= sign && sign <= *last; };
-        return *first == byte || isBetween(byte) || // git has "[b-a]" hold its first sign
+        return *first == byte || isBetween(byte) || // in git, "[b-a]" contains its first character
                (ignoresCase_ && isBetween(std::toupper(byte)));
     }
 
@@ -113,7 +113,7 @@ private:
     bool ignoresCase_;
 };
 
-/// Remembers what failed, so that many stars don't multiply.
+/// Remembers failed positions, so that the time does not grow exponentially with the number of stars.
 class Matcher {
 public:
     Matcher(std::string_view pattern, std::string_view text, WildcardMode mode)
@@ -157,7 +157,7 @@ private:
         bool const isDouble = behind - inPattern > 1 && (inPattern == 0 || pattern_[inPattern - 1] == '/') &&
                               (behind == pattern_.size() || pattern_[behind] == '/');
         if (isDouble && behind < pattern_.size() && matches(behind + 1, inText)) {
-            return true; // no folder at all between
+            return true; // no folder in between
         }
         bool const isStopped = mode_.isPath && !isDouble;
         for (auto end = inText; end <= text_.size(); ++end) {
@@ -182,7 +182,7 @@ private:
     std::string_view pattern_;
     std::string_view text_;
     WildcardMode mode_;
-    std::vector<char> failed_; // not of bool: its bits take longer to reach
+    std::vector<char> failed_; // not of bool: single bits take longer to access
 };
 
 } // namespace

@@ -6,16 +6,16 @@ namespace project::git {
 
 /// How a pattern of a `.gitignore` is compared.
 struct WildcardMode {
-    bool isPath;      ///< "/" is matched by nothing but itself and "**"
+    bool isPath;      ///< only "/" and "**" match a slash
     bool ignoresCase; ///< of ASCII letters
 };
 
-/// Whether a whole text matches a pattern with git's wildcards (gitignore(5)): "?", "*", "**" between
-/// slashes,
-/// "[a-z]", "[!a]", "[[:digit:]]", and a backslash before what is meant as it is. All are bytes, as in git.
+/// Whether the whole of a text matches a pattern with git's wildcards (gitignore(5)): "?", "*", "**" between
+/// slashes, "[a-z]", "[!a]", "[[:digit:]]", and a backslash before a literal character. Compares bytes, as
+/// git does.
 ///
-/// A pattern much longer than any path matches nothing. Takes at most time and memory in proportion to the
-/// lengths of both, multiplied.
+/// A pattern much longer than any path matches nothing. Time and memory are at most proportional to the
+/// product of both lengths.
 bool matchesWildcards(std::string_view pattern, std::string_view text, WildcardMode mode);
 
 } // namespace project::git

@@ -16,7 +16,7 @@ git_index_time timeOf(struct timespec const& time) {
     return {static_cast<std::int32_t>(time.tv_sec), static_cast<std::uint32_t>(time.tv_nsec)};
 }
 
-/// Programs that know no nanoseconds write 0.
+/// Programs without nanoseconds write 0.
 bool isSame(git_index_time const& recorded, git_index_time const& found) {
     return recorded.seconds == found.seconds &&
            (recorded.nanoseconds == 0 || recorded.nanoseconds == found.nanoseconds);
@@ -31,7 +31,7 @@ bool isAsYoungAs(git_index_entry const& entry, FileStamp const& index) {
            std::tuple(index.seconds, index.nanoseconds);
 }
 
-/// @return false when it can't be read.
+/// @return false if it cannot be read.
 bool hashLink(git_oid& result, std::string const& name) {
     auto const target = readLink(name);
     return target && git_odb_hash(&result, target->data(), target->size(), GIT_OBJECT_BLOB) == 0;
@@ -53,7 +53,7 @@ bool EntryComparison::hidesChanges(git_index_entry const& entry) const {
     return !isSubmodule(entry) && entry.mtime.seconds >= repository_.indexStamp().seconds;
 }
 
-/// A size of 0 is what an entry has, too, that has to be compared by content.
+/// A size of 0 also marks an entry that has to be compared by content.
 bool EntryComparison::isTouched(git_index_entry const& entry, struct stat const& onDisk) const {
     git_index_entry found{};
     record(onDisk, found);
@@ -64,7 +64,7 @@ bool EntryComparison::isTouched(git_index_entry const& entry, struct stat const&
 
 bool EntryComparison::isContentModified(git_index_entry const& entry, struct stat const& onDisk) {
     if (entry.file_size != 0 && entry.file_size != static_cast<std::uint32_t>(onDisk.st_size)) {
-        return true; // without a look at what filters would make of it, as git has it
+        return true; // even if a filter would restore the size: git does not check that either
     }
     auto const name = repository_.workTree().onDisk(entry.path);
     git_oid content{};

@@ -9,20 +9,20 @@
 
 namespace project::git {
 
-/// Compares entries of the index with what is on disk, reading a file only when its times and size don't
-/// tell.
+/// Compares entries of the index with the files on disk. Reads a file only if its times and size do not
+/// decide.
 ///
-/// An entry that is as young as the index says nothing by its times: the file may have been changed after
-/// it, within one tick of the clock (git's Documentation/technical/racy-git.txt).
+/// The times of an entry that is as young as the index do not decide: the file may have been changed within
+/// the same tick of the clock (git's Documentation/technical/racy-git.txt).
 class EntryComparison {
 public:
     explicit EntryComparison(Repository const& repository) : repository_(repository), rules_(repository) {}
 
-    /// Whether a file or a link is other than its entry, which is of the same type.
+    /// Whether a file or link differs from its entry, which has the same type.
     bool isModified(git_index_entry const& entry, struct stat const& onDisk);
 
-    /// Whether an entry's file could be changed without showing once the index is written anew: that is so
-    /// for git, which looks at whole seconds.
+    /// Whether a new index with this entry would hide a change of its file from git, which compares whole
+    /// seconds.
     bool hidesChanges(git_index_entry const& entry) const;
 
 private:
@@ -33,8 +33,8 @@ private:
     ContentRules rules_;
 };
 
-/// The mode that git would record for a file or a link.
-/// @param tracked what the index has for it; may be null.
+/// The mode that git would record for a file or link.
+/// @param tracked its entry in the index; null if there is none.
 std::uint32_t modeOf(struct stat const& onDisk, git_index_entry const* tracked, DiskSettings const& settings);
 
 /// Records the times, size and identity of a file in an entry, as git does.

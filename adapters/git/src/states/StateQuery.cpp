@@ -28,10 +28,10 @@ LocalStatus StateQuery::trackedState(git_index_entry const& entry) {
     if (git_index_entry_is_conflict(&entry) != 0) {
         return LocalStatus::Conflicted;
     }
-    auto const onDisk = lookBeyondNoLink(entry.path);
+    auto const onDisk = reachableEntry(entry.path);
     bool const isThere = onDisk && (!S_ISDIR(onDisk->st_mode) || isSubmodule(entry));
-    bool const isLeft = isLeftToIndex(entry, isThere);
-    if (!isThere && !isLeft) {
+    bool const isLeftOut = isDiskIgnored(entry, isThere);
+    if (!isThere && !isLeftOut) {
         return LocalStatus::Modified;
     }
     auto const* const committed = repository_.head().find(entry.path);
@@ -42,7 +42,7 @@ LocalStatus StateQuery::trackedState(git_index_entry const& entry) {
     if (!isOfSameType(committedMode, entry.mode)) {
         return LocalStatus::Renamed;
     }
-    auto const state = isLeft ? LocalStatus::Unmodified : presentState(entry, *onDisk);
+    auto const state = isLeftOut ? LocalStatus::Unmodified : presentState(entry, *onDisk);
     bool const isStaged =
         committedMode != entry.mode || git_oid_equal(git_tree_entry_id(committed), &entry.id) == 0;
     return state == LocalStatus::Unmodified && isStaged ? LocalStatus::Modified : state;
@@ -70,14 +70,14 @@ LocalStatus StateQuery::submoduleState(git_index_entry const& entry, struct stat
     RepositoryHandle const submodule(opened);
     git_oid checkedOut{};
     if (code != 0 || git_reference_name_to_id(&checkedOut, opened, "HEAD") != 0) {
-        return LocalStatus::Unmodified; // not checked out at all
+        return LocalStatus::Unmodified; // not checked out
     }
     return git_oid_equal(&checkedOut, &entry.id) != 0 ? LocalStatus::Unmodified : LocalStatus::Modified;
 }
 
 LocalStatus StateQuery::untrackedState(TreePath const& path) {
     auto const above = folders_.kindOf(parentOf(path));
-    auto const onDisk = lookBeyondNoLink(path);
+    auto const onDisk = reachableEntry(path);
     bool const isFolder = !onDisk || S_ISDIR(onDisk->st_mode);
     if (isFolder && isAnythingTrackedBelow(repository_.index(), path)) {
         return LocalStatus::Unmodified;
@@ -95,7 +95,7 @@ LocalStatus StateQuery::untrackedState(TreePath const& path) {
     return isIgnored ? LocalStatus::Ignored : LocalStatus::NotUnderSourceControl;
 }
 
-std::optional<struct stat> StateQuery::lookBeyondNoLink(TreePath const& path) {
+std::optional<struct stat> StateQuery::reachableEntry(TreePath const& path) {
     auto const above = folders_.kindOf(parentOf(path));
     if (above == FolderKind::Missing || above == FolderKind::BeyondLink) {
         return std::nullopt;
@@ -103,9 +103,9 @@ std::optional<struct stat> StateQuery::lookBeyondNoLink(TreePath const& path) {
     return diskEntryAt(repository_.workTree().onDisk(path));
 }
 
-/// Whether the disk has no say: somebody told git so (git-update-index(1)), or a sparse checkout left the
-/// file out. One that is there in spite of that counts again (git-sparse-checkout(1)).
-bool StateQuery::isLeftToIndex(git_index_entry const& entry, bool isOnDisk) const {
+/// Whether the state does not depend on the disk: because of a flag of the entry (git-update-index(1)), or
+/// because a sparse checkout left the file out and it is not on disk (git-sparse-checkout(1)).
+bool StateQuery::isDiskIgnored(git_index_entry const& entry, bool isOnDisk) const {
     bool const isSkipped = (entry.flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0;
     return (entry.flags & GIT_INDEX_ENTRY_VALID) != 0 ||
            (isSkipped && !(isOnDisk && repository_.settings().isSparse));

@@ -7,7 +7,7 @@
 
 namespace project::git {
 
-/// Answers one call's questions for states.
+/// Determines the states for one call.
 class StateQuery {
 public:
     explicit StateQuery(Repository& repository)
@@ -20,8 +20,8 @@ private:
     cmlink::LocalStatus presentState(git_index_entry const& entry, struct stat const& onDisk);
     cmlink::LocalStatus submoduleState(git_index_entry const& entry, struct stat const& onDisk) const;
     cmlink::LocalStatus untrackedState(TreePath const& path);
-    std::optional<struct stat> lookBeyondNoLink(TreePath const& path);
-    bool isLeftToIndex(git_index_entry const& entry, bool isOnDisk) const;
+    std::optional<struct stat> reachableEntry(TreePath const& path);
+    bool isDiskIgnored(git_index_entry const& entry, bool isOnDisk) const;
 
     Repository& repository_;
     WorkTreeFolders folders_;

@@ -9,7 +9,7 @@ bool WorkTreeFolders::isFileIgnored(TreePath const& path) {
     return at(parentOf(path)).isIgnored || rules_.ignore(path, false);
 }
 
-/// As git decides it: by the files of a repository, not by its owner or its format.
+/// As in git, the files of a repository decide, not its owner or its format.
 bool WorkTreeFolders::isOtherRepository(TreePath const& folder) const {
     auto const& workTree = repository_.workTree();
     auto const name = workTree.onDisk(folder);
@@ -24,14 +24,14 @@ WorkTreeFolders::Folder const& WorkTreeFolders::at(TreePath const& folder) {
     Folder result{FolderKind::Ours, false};
     if (!folder.empty()) {
         auto const above = at(parentOf(folder));
-        result.kind = look(folder, above.kind);
+        result.kind = determineKind(folder, above.kind);
         result.isIgnored =
             above.isIgnored || (result.kind == FolderKind::Ours && rules_.ignore(folder, true));
     }
     return folders_.try_emplace(folder, result).first->second;
 }
 
-FolderKind WorkTreeFolders::look(TreePath const& folder, FolderKind above) const {
+FolderKind WorkTreeFolders::determineKind(TreePath const& folder, FolderKind above) const {
     if (above != FolderKind::Ours) {
         return above;
     }

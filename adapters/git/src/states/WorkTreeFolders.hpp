@@ -8,23 +8,23 @@
 
 namespace project::git {
 
-/// What a folder of the work tree is to the repository.
+/// The relation of a folder of the work tree to the repository.
 enum class FolderKind {
     Ours,            ///< a folder whose files the repository may track
-    Missing,         ///< not on disk, or no folder there
+    Missing,         ///< does not exist, or is not a folder
     OtherRepository, ///< the repository's own, a submodule, a repository inside this one, or below one
     BeyondLink,      ///< a symbolic link, or below one
 };
 
-/// The folders that one call comes by, each looked at once.
+/// The folders that one call visits. Reads each from disk once.
 class WorkTreeFolders {
 public:
     explicit WorkTreeFolders(Repository const& repository) : repository_(repository), rules_(repository) {}
 
     FolderKind kindOf(TreePath const& folder) { return at(folder).kind; }
 
-    /// Whether a rule of the repository ignores a file or a link. What lies in an ignored folder is ignored,
-    /// whatever more special rules say.
+    /// Whether a rule of the repository ignores a file or link. All files in an ignored folder are ignored,
+    /// regardless of more specific rules.
     bool isFileIgnored(TreePath const& path);
 
     /// The same for a folder.
@@ -37,7 +37,7 @@ private:
     };
 
     Folder const& at(TreePath const& folder);
-    FolderKind look(TreePath const& folder, FolderKind above) const;
+    FolderKind determineKind(TreePath const& folder, FolderKind above) const;
     bool isOtherRepository(TreePath const& folder) const;
 
     Repository const& repository_;

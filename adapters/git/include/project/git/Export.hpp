@@ -1,4 +1,4 @@
 #pragma once
 
-/// Marks what the shared library project::git shows to others.
+/// Exports a symbol from the shared library project::git.
 #define PROJECT_GIT_EXPORT __attribute__((visibility("default")))

@@ -15,65 +15,67 @@ class RepositoryFinder;
 
 /// Source control by git, for the project in one folder.
 ///
-/// The repository is the one that the folder lies in, found as git finds it: a plain repository, a linked
-/// worktree, a submodule, a work tree whose repository lies elsewhere, each with or without a sparse
-/// checkout. Outside any, and in a bare repository, every state is 8 and nothing is done. It is looked for
-/// with the first question and kept open; whoever makes, moves or configures one meanwhile is noticed with
-/// the next.
+/// The adapter finds the repository around the folder as git does: a plain repository, a linked worktree, a
+/// submodule, or a work tree whose repository is elsewhere, each with or without a sparse checkout. Outside
+/// every repository and in a bare one, each state is 8 and no operation has an effect. The adapter opens the
+/// repository on first use. Later operations see a repository that was created, moved or configured since.
 ///
-/// Names are compared byte by byte, whatever `core.ignoreCase` says: the disk tells `File` from `file`.
+/// Names are compared byte by byte, regardless of `core.ignoreCase`: on disk, `File` and `file` are two
+/// files.
 ///
-/// One adapter is used by one thread at a time. Each operation throws GitError when the repository can't be
-/// read, is written in a way that this library doesn't know, or belongs to somebody whom git's
-/// `safe.directory` doesn't list.
+/// An adapter must not be used by two threads at a time. Each operation throws GitError if the repository
+/// cannot be read, has a format that this library does not know, or belongs to a user that git's
+/// `safe.directory` does not list.
 class PROJECT_GIT_EXPORT GitAdapter final : public cmlink::CMAdapter {
 public:
     using Path = fl::filesystem::Path;
 
-    /// Asks nothing of the disk yet.
+    /// Does not access the disk.
     /// @param root the folder of the project.
     explicit GitAdapter(Path const& root, GitEnvironment environment = GitEnvironment::Ignored);
     ~GitAdapter() override;
 
-    /// Stages these files as `git add --force --sparse` does, and of a folder nothing, since git knows none.
+    /// Stages files as `git add --force --sparse` does. Ignored files are staged too.
     ///
-    /// What is not there, what lies outside the project's folder or the work tree, beyond a symbolic link or
-    /// in another repository inside this one, and what is neither a file nor a link is passed over. An
-    /// ignored file that is named is staged. The index is written once, or not at all when nothing is left to
-    /// do or anything fails.
-    /// @throws GitError when the index is locked (the error's file is the lock file) or can't be written,
-    ///         when a file can't be read, or when one would have to go through a filter driver or be encoded
-    ///         anew, which git alone does.
+    /// Skips folders (git does not track them), files that do not exist, special files, and everything
+    /// outside the project's folder, outside the work tree, beyond a symbolic link or in another repository
+    /// inside this one. Writes the index once; does not write it if there is nothing to stage or if
+    /// anything fails.
+    /// @throws GitError if the index is locked (the error's file is the lock file) or cannot be written, if a
+    ///         file cannot be read, or if a file needs a filter driver or another encoding, which only git
+    ///         applies.
     void addToSourceControl(std::vector<Path> const& files) override;
 
-    /// Takes these files, and all below these folders, out of the index, as `git rm --cached -r` does. What
-    /// isn't tracked, or lies outside the project's folder, is passed over. The disk is left alone, and need
-    /// not have the files any more.
-    /// @throws GitError when the index is locked (the error's file is the lock file) or can't be written.
+    /// Removes files, and all files below folders, from the index, as `git rm --cached -r` does. Skips files
+    /// that are not tracked or outside the project's folder. Changes nothing on disk; the files need not
+    /// exist there.
+    /// @throws GitError if the index is locked (the error's file is the lock file) or cannot be written.
     void removeFromSourceControl(std::vector<Path> const& files) override;
 
-    /// The state of every path, as `git status` sees it without looking for renames.
+    /// The state of every path, as `git status --no-renames` reports it.
     ///
-    /// The first of these that holds counts:
-    ///  - 8 outside the work tree
-    ///  - 4 with conflicting entries in the index
-    ///  - in the index: 3 gone from the disk, unless a sparse checkout left it out; 5 not in the last commit;
-    ///    7 of another type (file, link, submodule) than in the last commit or the index; 3 other than there;
-    ///    else 1. A submodule is 3 when another commit is checked out in it; what else is changed inside is
-    ///    its own repository's. A file that a filter driver would have to read, and that was touched, is 3.
-    ///  - a folder, on the disk or gone: 1 when anything below it is tracked
-    ///  - 6 in the last commit and no longer in the index, whether or not it is on the disk
-    ///  - 8 in a `.git` folder, beyond a symbolic link, or in another repository
-    ///  - 9 not there, or neither file, link nor folder
-    ///  - 2 ignored, else 0
+    /// The first rule that applies determines the state:
+    ///  - 8: outside the work tree
+    ///  - 4: the index has conflicting entries for the path
+    ///  - tracked: 3 if deleted from the disk, unless a sparse checkout left it out; 5 if not in the last
+    ///    commit; 7 if its type (file, link, submodule) differs from the last commit or the index; 3 if its
+    ///    content or mode differs; else 1. A submodule is 3 if another commit is checked out in it; changes
+    ///    inside it belong to its own repository. A touched file with a filter driver is 3.
+    ///  - 1: a folder, on disk or deleted, below which a file is tracked
+    ///  - 6: in the last commit and no longer in the index, whether or not it is on disk
+    ///  - 8: in a `.git` folder, beyond a symbolic link, or in another repository
+    ///  - 9: does not exist, or is neither a file, a link nor a folder
+    ///  - 2: ignored
+    ///  - 0: everything else
     ///
-    /// Files whose times and size are those in the index are not read. An empty list gives an empty map at
-    /// once, without a look at the repository.
-    /// @param files absolute paths; "." and ".." are taken as text.
+    /// A file whose times and size equal those in the index is not read. An empty list returns an empty map
+    /// without access to the repository.
+    /// @param files absolute paths; "." and ".." are resolved as text.
     std::map<Path, cmlink::FileState> getFileStates(std::vector<Path> const& files) override;
 
-    /// The files in the index below some folders, which removeFromSourceControl would take out of it.
-    /// @param folders absolute. @return each folder's path with the file's behind it, sorted.
+    /// The tracked files below folders: those that removeFromSourceControl would remove from the index.
+    /// @param folders absolute paths.
+    /// @return paths that begin with the path of their folder, sorted.
     std::set<Path> trackedBelow(std::vector<Path> const& folders);
 
 private:

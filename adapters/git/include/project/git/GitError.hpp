@@ -7,20 +7,29 @@
 
 namespace project::git {
 
-/// Source control cannot do what it was asked: the index is locked or can't be written, a file would have to
-/// go through a program first, the repository belongs to somebody else.
+/// An operation of source control failed: the index is locked or cannot be written, a file needs a filter
+/// program, the repository belongs to another user.
 ///
-/// It is no error of the project itself: managers drop some of those as stale data, and a failing repository
-/// must never be taken for that.
+/// It is not a project::exception::ProjectException: managers drop some of those as stale data, and a failing
+/// repository must never be mistaken for stale data.
 class PROJECT_GIT_EXPORT GitError : public computils::exception::StackTraceRecordingException {
 public:
-    /// @param file the file or folder that is meant, in the system's bytes; may be empty.
-    /// @param problem what is wrong, a clause without a full stop.
-    /// @param remedy what to do about it, a sentence; may be empty.
-    GitError(std::string file, std::string problem, std::string remedy);
+    /// The reason, as far as a caller can act on it. With every kind, the index is unchanged.
+    enum class Kind {
+        Refused, ///< git itself has to do it, or has to be configured first; do not retry
+        Busy,    ///< another process holds the lock of the index; retry
+        Failed   ///< the repository or a file cannot be read or written
+    };
+
+    /// @param file the file or folder concerned, in the system's bytes; may be empty.
+    /// @param problem the problem, as a clause without a full stop.
+    /// @param remedy the action that solves the problem, as a sentence; may be empty.
+    GitError(Kind kind, std::string file, std::string problem, std::string remedy);
 
     /// "file: problem. remedy".
     char const* what() const noexcept override { return text_.c_str(); }
+
+    Kind kind() const noexcept { return kind_; }
 
     std::string const& getFile() const noexcept { return file_; }
 
@@ -29,6 +38,7 @@ public:
     std::string const& getRemedy() const noexcept { return remedy_; }
 
 private:
+    Kind kind_;
     std::string file_;
     std::string problem_;
     std::string remedy_;
