@@ -23,10 +23,10 @@ void walk(ProjectText const& text, Address const& parent, Contents& contents) {
     for (std::size_t i = 0; i < children.size(); ++i) {
         Child const& child = children[i];
         require(i == 0 || children[i - 1].element < child.element, "children are sorted");
-        require(child.node || child.made || child.hasChildren, "a child has something");
-        require(!child.node || !child.made, "an address has a node or was made without");
+        require(child.node || child.isCreated || child.hasChildren, "a child has something");
+        require(!child.node || !child.isCreated, "an address has a node or was made without");
         Address const address = parent.child(child.element);
-        if (child.node || child.made) {
+        if (child.node || child.isCreated) {
             contents.emplace(address, lineOf(address, child.node));
         }
         std::size_t const before = contents.size();

@@ -72,8 +72,7 @@ Session::State::State(Path const& folder, Options options)
     if (options.sourceControl != SourceControl::Off) {
         adapter = std::make_unique<GitAdapter>(root, options.honoursEnvironment ? GitEnvironment::Honoured
                                                                                 : GitEnvironment::Ignored);
-        stager = std::make_unique<DefinitionStager>(*store, *adapter,
-                                                    root / TextBackend::folderName / TextBackend::textName);
+        stager = std::make_unique<DefinitionStager>(*store, *adapter, TextBackend::textPath(root));
     }
     project = makeProject(options);
 }
@@ -105,7 +104,7 @@ std::unique_ptr<ProjectManager> Session::State::makeProject(Options options) {
 }
 
 void Session::State::requireProject() const {
-    auto const file = root / TextBackend::folderName / TextBackend::textName;
+    auto const file = TextBackend::textPath(root);
     std::error_code error; // what cannot be seen may be there: the store says why it cannot read it
     auto const status = std::filesystem::symlink_status(fl::filesystem::toSystem(file), error);
     if (status.type() == std::filesystem::file_type::not_found) {

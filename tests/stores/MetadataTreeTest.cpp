@@ -58,7 +58,7 @@ TEST_F(MetadataTreeTest, aChangedNodeIsLoadedAgainAndItsSiblingsStay) {
     loaded.clear();
 
     levels[a] = {plain(u"a"), plain(u"c")};
-    tree.takeIn(changeAt(a.child({u"t", u"c"})));
+    tree.applyChanges(changeAt(a.child({u"t", u"c"})));
 
     EXPECT_THAT(tree.children(a), ElementsAre(aa, a.child({u"t", u"c"})));
     EXPECT_EQ(tree.children(b).size(), 1U);
@@ -72,7 +72,7 @@ TEST_F(MetadataTreeTest, anAddressThatWasThereOnlyForWhatLayBelowGoesWithIt) {
 
     levels[root] = {plain(u"b")};
     levels[a] = {};
-    tree.takeIn(changeAt(aa));
+    tree.applyChanges(changeAt(aa));
 
     EXPECT_FALSE(tree.exists(a));
     EXPECT_THAT(tree.children(root), ElementsAre(b));
@@ -84,13 +84,13 @@ TEST_F(MetadataTreeTest, whatOthersPutBelowAnAddressWithoutChildrenIsFound) {
 
     levels[root] = {plain(u"a", true)};
     levels[a] = {plain(u"a")};
-    tree.takeIn(changeAt(aa));
+    tree.applyChanges(changeAt(aa));
 
     EXPECT_THAT(tree.children(a), ElementsAre(aa));
 }
 
 TEST_F(MetadataTreeTest, levelsThatWereNeverLoadedAreNotLoadedForAChange) {
-    tree.takeIn(changeAt(aa));
+    tree.applyChanges(changeAt(aa));
     EXPECT_THAT(loaded, IsEmpty());
 }
 
@@ -98,7 +98,7 @@ TEST_F(MetadataTreeTest, whenEverythingChangedAllIsForgotten) {
     levels[root] = {plain(u"a")};
     tree.children(root);
     levels[root] = {plain(u"b")};
-    tree.takeIn({true, {}});
+    tree.applyChanges({true, {}});
     EXPECT_THAT(tree.children(root), ElementsAre(b));
 }
 
@@ -108,7 +108,7 @@ TEST_F(MetadataTreeTest, undoingBringsBackWhatWasBefore) {
     auto const deep = b.child({u"t", u"x"}).child({u"t", u"y"});
     auto undo = tree.apply({{Change::Kind::Set, deep, plainNode()},
                             {Change::Kind::Remove, a, nullptr},
-                            {Change::Kind::Make, a, nullptr},
+                            {Change::Kind::Create, a, nullptr},
                             {Change::Kind::Set, a, plainNode()}});
     EXPECT_TRUE(tree.exists(deep));
     EXPECT_FALSE(tree.exists(aa));

@@ -107,7 +107,7 @@ TEST(ProjectText, childrenAreSortedAndTellWhatLiesBelow) {
     ASSERT_EQ(top.size(), 2U);
     EXPECT_EQ(top[0].element, metadata::PathElement(u"Categories", u"Root"));
     EXPECT_EQ(top[0].node, nullptr);
-    EXPECT_FALSE(top[0].made);
+    EXPECT_FALSE(top[0].isCreated);
     EXPECT_TRUE(top[0].hasChildren);
 
     Children const below = text.children(fileAddress(u"a"));
@@ -119,7 +119,7 @@ TEST(ProjectText, childrenAreSortedAndTellWhatLiesBelow) {
     EXPECT_EQ(below[1].node, nullptr);
     EXPECT_TRUE(below[1].hasChildren);
     EXPECT_EQ(below[2].element, metadata::PathElement(u"File", u"made"));
-    EXPECT_TRUE(below[2].made);
+    EXPECT_TRUE(below[2].isCreated);
     EXPECT_EQ(below[3].element, metadata::PathElement(u"LabelData", u"Data"));
     EXPECT_EQ(told(below[3].node), "Info()");
 

@@ -111,7 +111,7 @@ TEST_F(SystemDisk, aMissingRootIsAnErrorThatNamesIt) {
     auto const error = errorOf([&] { disk->openFolder(); });
 
     EXPECT_EQ((root.onDisk() / "gone").string(), error.getFile());
-    EXPECT_THAT(error.getRemedy(), HasSubstr("moved or removed"));
+    EXPECT_THAT(error.getRemedy(), HasSubstr("moved or deleted"));
 }
 
 TEST_F(SystemDisk, whatWasWrittenIsReadBackFromAnyOffset) {
@@ -337,7 +337,7 @@ TEST_F(SystemDisk, aFullFileSystemIsAnErrorThatSaysWhatToDo) {
     });
 
     EXPECT_EQ(
-        "project.jsonl: can't be written: No space left on device. Make room on the disk and try again.",
+        "project.jsonl: cannot be written: No space left on device. Make room on the disk and try again.",
         std::string(error.what()));
 }
 

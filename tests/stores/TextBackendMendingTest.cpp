@@ -198,7 +198,7 @@ TEST_F(TextBackendMending, settlingPutsAWholeTextInThePlaceOfOneWithMarkers) {
     prepareText(conflict);
     auto const backend = open();
 
-    backend->settle(settled);
+    backend->resolve(settled);
 
     EXPECT_EQ(text(), settled);
     EXPECT_EQ(contentOf(*backend), contentAfter({addFiles({u"a", u"b"})}));
@@ -213,12 +213,12 @@ TEST_F(TextBackendMending, whenSettlingFailsTheMarkersAreThereAgain) {
     auto const backend = open();
     failOnce("syncFolder");
 
-    EXPECT_EQ("Input/output error", errorOf([&] { backend->settle(settled); }).getProblem());
+    EXPECT_EQ("Input/output error", errorOf([&] { backend->resolve(settled); }).getProblem());
 
     EXPECT_EQ(conflict, text());
     EXPECT_EQ(contentAfter({addFiles({u"a", u"b", u"c", u"d"})}), contentOf(*backend));
     EXPECT_THROW(commit(*backend, addFiles({u"e"})), StoreError) << "it is still to be settled";
-    backend->settle(settled);
+    backend->resolve(settled);
     EXPECT_EQ(settled, text());
 }
 
@@ -227,7 +227,7 @@ TEST_F(TextBackendMending, settlingChangesNothingWhereThereIsNothingToSettle) {
     prepareText(sound);
     auto const backend = open();
 
-    EXPECT_EQ(StoreError::Kind::Refused, errorOf([&] { backend->settle(textOf(addFiles({u"b"}))); }).kind());
+    EXPECT_EQ(StoreError::Kind::Refused, errorOf([&] { backend->resolve(textOf(addFiles({u"b"}))); }).kind());
     EXPECT_EQ(text(), sound);
 }
 
@@ -240,7 +240,7 @@ TEST_F(TextBackendMending, settlingTakesNoTextThatIsNotSound) {
 
     for (auto const& bad : {conflict, sound.substr(0, sound.size() / 2), std::string(),
                             std::string(sound).insert(sound.find("\"a\""), "damage\n")}) {
-        EXPECT_EQ(StoreError::Kind::Refused, errorOf([&] { backend->settle(bad); }).kind());
+        EXPECT_EQ(StoreError::Kind::Refused, errorOf([&] { backend->resolve(bad); }).kind());
         EXPECT_EQ(text(), conflict);
     }
 }

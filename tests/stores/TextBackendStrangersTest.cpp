@@ -435,7 +435,7 @@ TEST_F(TextBackendStrangers, anotherWriterIsWaitedForAndThenNamed) {
 
     EXPECT_EQ("/project/.projectdata", error.getFile());
     EXPECT_EQ(StoreError::Kind::Busy, error.kind());
-    EXPECT_EQ("is being written by process 4711 (another)", error.getProblem());
+    EXPECT_EQ("is locked by process 4711 (another)", error.getProblem());
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers wait for nobody";
 }
 

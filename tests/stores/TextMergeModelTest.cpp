@@ -93,7 +93,7 @@ Batch drawBatch(Nodes& nodes, int most) {
             std::erase_if(nodes, [&](auto const& entry) { return entry.first.isWithin(address); });
         } else {
             Node const node = drawNumber(8) == 0 ? nullptr : drawNode(nodes, address);
-            batch.push_back({node ? Change::Kind::Set : Change::Kind::Make, address, node});
+            batch.push_back({node ? Change::Kind::Set : Change::Kind::Create, address, node});
             nodes.insert_or_assign(address, node);
         }
     }

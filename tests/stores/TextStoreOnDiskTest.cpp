@@ -164,8 +164,7 @@ TEST_F(TextStoreOnDisk, aWriterThatWaitsTooLongNamesTheHolder) {
 
     EXPECT_EQ(folder().string(), error.getFile());
     EXPECT_EQ(StoreError::Kind::Busy, error.kind());
-    EXPECT_THAT(error.getProblem(),
-                StartsWith("is being written by process " + std::to_string(child.id()) + " ("));
+    EXPECT_THAT(error.getProblem(), StartsWith("is locked by process " + std::to_string(child.id()) + " ("));
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers wait for nobody";
     child.kill();
     commit(*backend, addFiles({u"b"}));
@@ -184,8 +183,8 @@ TEST_F(TextStoreOnDisk, aChildOfAForkCannotUseTheStoreOfItsParentAndLeavesItAlon
         parent.say(contentOf(*open()).size() == 51 ? "its own store works" : "its own store fails");
     });
 
-    EXPECT_EQ("Open the project anew in the child.", child.hear());
-    EXPECT_EQ("Open the project anew in the child.", child.hear());
+    EXPECT_EQ("Reopen the project in the child process.", child.hear());
+    EXPECT_EQ("Reopen the project in the child process.", child.hear());
     EXPECT_EQ("its own store works", child.hear());
     EXPECT_TRUE(child.join());
     EXPECT_EQ(tailed, text());
@@ -238,7 +237,7 @@ TEST_F(TextStoreOnDisk, aProjectThatMayNotBeWrittenOpensForReading) {
     for (auto const& answer : {rewritten, appended}) {
         EXPECT_THAT(answer,
                     AllOf(StartsWith(folder().string()), HasSubstr("Permission denied"),
-                          EndsWith("Look at the owner and the permissions of the file and of its folder.")));
+                          EndsWith("Check the owner and the permissions of the file and of its folder.")));
     }
     EXPECT_EQ(before, text());
     ::chmod(folder().c_str(), 0755);
@@ -295,7 +294,7 @@ TEST_F(TextStoreOnDisk, aPipeInThePlaceOfTheTextIsAnErrorAtOnce) {
     auto const error = errorOf([&] { contentOf(*open()); });
 
     EXPECT_EQ(textPath().string(), error.getFile());
-    EXPECT_EQ("is no regular file", error.getProblem());
+    EXPECT_EQ("is not a regular file", error.getProblem());
 }
 
 TEST_F(TextStoreOnDisk, aRewriteKeepsTheModeOfTheText) {

@@ -36,9 +36,9 @@ void walk(ProjectText const& text, Address const& parent, Content& content) {
         Child const& child = children[i];
         Address const address = parent.child(child.element);
         EXPECT_TRUE(i == 0 || children[i - 1].element < child.element) << told(plainNode()) << " at " << i;
-        EXPECT_TRUE(child.node != nullptr || child.made || child.hasChildren);
-        EXPECT_FALSE(child.node != nullptr && child.made);
-        if (child.node || child.made) {
+        EXPECT_TRUE(child.node != nullptr || child.isCreated || child.hasChildren);
+        EXPECT_FALSE(child.node != nullptr && child.isCreated);
+        if (child.node || child.isCreated) {
             content.emplace(address, told(child.node));
         }
         std::size_t const before = content.size();
@@ -158,7 +158,7 @@ Change remove(Address const& address) {
 }
 
 Change make(Address const& address) {
-    return {Change::Kind::Make, address, nullptr};
+    return {Change::Kind::Create, address, nullptr};
 }
 
 } // namespace project::stores::samples

@@ -24,7 +24,7 @@ namespace {
 void walk(Backend& backend, Address const& parent, Content& content) {
     for (auto const& child : backend.load(parent)) {
         auto const address = parent.child(child.element);
-        if (child.node || child.made) {
+        if (child.node || child.isCreated) {
             content.emplace(address, stores::samples::told(child.node));
         }
         auto const before = content.size();

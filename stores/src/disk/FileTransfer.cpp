@@ -16,7 +16,7 @@ std::int64_t nanoseconds(timespec const& time) noexcept {
     return std::int64_t{time.tv_sec} * 1'000'000'000 + time.tv_nsec;
 }
 
-/// Keeps the signal for a file beyond the limit away from this thread, and takes it when one came.
+/// Blocks the signal for a file beyond the limit in this thread, and consumes it if it is raised.
 class FileSizeSignalBlocked {
 public:
     FileSizeSignalBlocked() noexcept {
@@ -31,8 +31,7 @@ public:
     ~FileSizeSignalBlocked() {
         if (!wasPending_) {
             timespec const atOnce{};
-            while (sigtimedwait(&signal_, nullptr, &atOnce) < 0 && errno == EINTR) {
-            }
+            repeatWhenInterrupted([&] { return sigtimedwait(&signal_, nullptr, &atOnce); });
         }
         pthread_sigmask(SIG_SETMASK, &before_, nullptr);
     }
@@ -46,15 +45,15 @@ private:
     bool wasPending_;
 };
 
-void requireLength(std::uint64_t length, std::string const& name) {
+void requireReadableLength(std::uint64_t length, std::string const& name) {
     if (length > Disk::longestFile) {
         throw StoreError(StoreError::Kind::Damaged, name, 0,
-                         "is longer than the 1 GiB that a project's text may have",
+                         "is longer than 1 GiB, the limit for a project's text",
                          "Move it away, and restore the project's own file.");
     }
 }
 
-/// The fine clock's time, made different from the coarse clock's when both happen to agree.
+/// The fine clock's time, changed by a nanosecond if it is equal to the coarse clock's.
 timespec timeBetweenTicks() noexcept {
     timespec coarse{};
     timespec fine{};
@@ -82,43 +81,42 @@ FileIdentity identifyOpenFile(int file, std::string const& name) {
     struct stat status {};
 
     if (::fstat(file, &status) != 0) {
-        throwSystemError(name, "can't be looked at", errno);
+        throwSystemError(name, "cannot be examined", errno);
     }
     if (!S_ISREG(status.st_mode)) {
-        throw StoreError(StoreError::Kind::Damaged, name, 0, "is no regular file",
+        throw StoreError(StoreError::Kind::Damaged, name, 0, "is not a regular file",
                          "Move it away, and restore the project's own file.");
     }
     return toIdentity(status);
 }
 
-void requireRoom(std::uint64_t length, std::string const& name) {
+void requireWritableLength(std::uint64_t length, std::string const& name) {
     if (length > Disk::longestFile) {
         throw StoreError(StoreError::Kind::Refused, name, 0,
-                         "would get longer than the 1 GiB that a project's text may have",
+                         "would become longer than 1 GiB, the limit for a project's text",
                          "Split the project.");
     }
 }
 
 std::string readFrom(int file, std::uint64_t offset, std::uint64_t expectedSize, std::string const& name) {
-    requireLength(expectedSize, name);
+    requireReadableLength(expectedSize, name);
     std::string bytes;
-    // One byte more than expected, so that one call that finds the end is enough.
+    // One byte more than expected, so that the first call finds the end too.
     bytes.resize(expectedSize > offset ? expectedSize - offset + 1 : 1);
     std::size_t length = 0;
     for (;;) {
-        auto const count =
-            ::pread(file, bytes.data() + length, bytes.size() - length, static_cast<off_t>(offset + length));
-        if (count < 0 && errno == EINTR) {
-            continue;
-        }
+        auto const count = repeatWhenInterrupted([&] {
+            return ::pread(file, bytes.data() + length, bytes.size() - length,
+                           static_cast<off_t>(offset + length));
+        });
         if (count < 0) {
-            throwSystemError(name, "can't be read", errno);
+            throwSystemError(name, "cannot be read", errno);
         }
         if (count == 0) {
             break;
         }
         length += static_cast<std::size_t>(count);
-        requireLength(offset + length, name); // it may grow as long as it is read
+        requireReadableLength(offset + length, name); // it may grow during the read
         if (length == bytes.size()) {
             bytes.resize(bytes.size() * 2);
         }
@@ -130,12 +128,9 @@ std::string readFrom(int file, std::uint64_t offset, std::uint64_t expectedSize,
 void writeAll(int file, std::string_view bytes, std::string const& name) {
     FileSizeSignalBlocked const blocked;
     while (!bytes.empty()) {
-        auto const count = ::write(file, bytes.data(), bytes.size());
-        if (count < 0 && errno == EINTR) {
-            continue;
-        }
+        auto const count = repeatWhenInterrupted([&] { return ::write(file, bytes.data(), bytes.size()); });
         if (count < 0) {
-            throwSystemError(name, "can't be written", errno);
+            throwSystemError(name, "cannot be written", errno);
         }
         bytes.remove_prefix(static_cast<std::size_t>(count));
     }
@@ -144,7 +139,7 @@ void writeAll(int file, std::string_view bytes, std::string const& name) {
 std::optional<WrittenFile> stamp(int file) noexcept {
     auto const time = timeBetweenTicks();
     timespec const times[] = {{0, UTIME_OMIT}, time};
-    bool const set = ::futimens(file, times) == 0;
+    bool const isSet = ::futimens(file, times) == 0;
 
     struct stat status {};
 
@@ -152,7 +147,7 @@ std::optional<WrittenFile> stamp(int file) noexcept {
         return std::nullopt;
     }
     auto const identity = toIdentity(status);
-    return WrittenFile{identity, set && identity.modified == nanoseconds(time)};
+    return WrittenFile{identity, isSet && identity.modified == nanoseconds(time)};
 }
 
 } // namespace project::stores

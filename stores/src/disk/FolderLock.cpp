@@ -22,70 +22,68 @@ namespace {
 
 using std::chrono::steady_clock;
 
-/// Most batches take a fraction of a millisecond, so whoever is next looks often; others need not.
+/// Most batches take a fraction of a millisecond, so the first in the queue checks often; the others need
+/// not.
 constexpr auto firstNap = std::chrono::microseconds(50);
-constexpr auto longestNapOfNext = std::chrono::microseconds(1'000);
+constexpr auto longestNapOfFirst = std::chrono::microseconds(1'000);
 constexpr auto longestNap = std::chrono::microseconds(20'000);
 
-/// The next in line takes a free lock within a millisecond, unless the machine is very busy.
-constexpr auto longestDelayOfNext = std::chrono::milliseconds(200);
+/// The first in the queue takes a free lock within a millisecond, unless the machine is very busy.
+constexpr auto longestDelayOfFirst = std::chrono::milliseconds(200);
 
 bool tryLock(int folder, std::string const& name) {
-    int result = 0;
-    do {
-        result = ::flock(folder, LOCK_EX | LOCK_NB);
-    } while (result != 0 && errno == EINTR);
+    int const result = repeatWhenInterrupted([folder] { return ::flock(folder, LOCK_EX | LOCK_NB); });
     if (result != 0 && errno != EWOULDBLOCK) {
-        throwSystemError(name, "can't be locked", errno);
+        throwSystemError(name, "cannot be locked", errno);
     }
     return result == 0;
 }
 
-/// A writer that stands in the queue, and looks now and then whether it is its turn.
+/// A writer in the queue, which checks repeatedly whether it is first.
 class WaitingWriter {
 public:
     WaitingWriter(int folder, std::string const& name) : folder_(folder), name_(name), place_(folder) {
         place_.take();
     }
 
-    /// @return true when it has the lock.
-    bool look();
+    /// @return true if it has the lock now.
+    bool tryToLock();
 
-    /// How long to wait until the next look: longer each time as long as nobody in front moves on.
+    /// The time until the next attempt: longer each time, until the first in the queue changes.
     steady_clock::duration nap();
 
 private:
-    /// Takes the lock if the first in line lets it lie.
-    bool passFirst();
+    /// Takes the lock if the first in the queue leaves it unused.
+    bool overtakeFirst();
 
     steady_clock::duration longestNapHere() const;
 
-    /// How far from the front this one is, as far as it matters for naps.
+    /// The distance to the first in the queue, as far as it matters for the waiting time.
     off_t steps() const { return first_ ? std::min<off_t>(place_.stepsBehind(*first_), 20) : 0; }
 
     int folder_;
     std::string const& name_;
     QueuePlace place_;
-    std::optional<off_t> first_; ///< of those in front
+    std::optional<off_t> first_; ///< the place of the first in the queue; empty if it is this one
     steady_clock::duration nap_ = firstNap;
     std::optional<steady_clock::time_point> freeSince_;
 };
 
-bool WaitingWriter::look() {
+bool WaitingWriter::tryToLock() {
     auto const first = place_.firstInFront();
     if (first != first_) {
         first_ = first;
         nap_ = firstNap * (first ? 1 + place_.stepsBehind(*first) : 1);
         freeSince_.reset();
     }
-    return first ? passFirst() : tryLock(folder_, name_);
+    return first ? overtakeFirst() : tryLock(folder_, name_);
 }
 
-/// A process that was stopped while it was first, by a debugger or from a terminal, would stop all others.
-/// So one that finds the lock free for as long as this, whenever it looks, does not wait for the first.
-bool WaitingWriter::passFirst() {
+/// A process that is stopped while it is first, by a debugger or from a terminal, would stop all others. So a
+/// writer that has found the lock free at each attempt for longestDelayOfFirst overtakes it.
+bool WaitingWriter::overtakeFirst() {
     if (nap_ < longestNapHere()) {
-        return false; // it has only just come to be the first
+        return false; // it has only just become the first
     }
     if (!tryLock(folder_, name_)) {
         freeSince_.reset();
@@ -93,7 +91,7 @@ bool WaitingWriter::passFirst() {
     }
     auto const now = steady_clock::now();
     freeSince_ = freeSince_.value_or(now);
-    if (now - *freeSince_ >= longestDelayOfNext) {
+    if (now - *freeSince_ >= longestDelayOfFirst) {
         return true;
     }
     unlockFolder(folder_);
@@ -110,7 +108,7 @@ steady_clock::duration WaitingWriter::longestNapHere() const {
     if (!place_.isTaken()) {
         return longestNap;
     }
-    return std::min<steady_clock::duration>(longestNapOfNext * (1 + steps()), longestNap);
+    return std::min<steady_clock::duration>(longestNapOfFirst * (1 + steps()), longestNap);
 }
 
 std::string commandOf(std::string const& process) {
@@ -120,7 +118,8 @@ std::string commandOf(std::string const& process) {
     return command;
 }
 
-/// True when a line of /proc/locks tells of a lock on this file: its seventh word, "major:minor:inode".
+/// True if a lock in /proc/locks is on this file. @param place the sixth word of its line,
+/// "major:minor:inode".
 bool isLockOn(std::string const& place, struct stat const& file) {
     unsigned int majorNumber = 0;
     unsigned int minorNumber = 0;
@@ -132,7 +131,7 @@ bool isLockOn(std::string const& place, struct stat const& file) {
 } // namespace
 
 bool lockFolder(int folder, std::string const& name, std::chrono::milliseconds patience) {
-    if (!QueuePlace::isAnybodyIn(folder) && tryLock(folder, name)) {
+    if (!QueuePlace::isOccupied(folder) && tryLock(folder, name)) {
         return true;
     }
     if (patience <= std::chrono::milliseconds(0)) {
@@ -140,7 +139,7 @@ bool lockFolder(int folder, std::string const& name, std::chrono::milliseconds p
     }
     auto const deadline = steady_clock::now() + patience;
     WaitingWriter waiting(folder, name);
-    while (!waiting.look()) {
+    while (!waiting.tryToLock()) {
         auto const now = steady_clock::now();
         if (now >= deadline) {
             return false;

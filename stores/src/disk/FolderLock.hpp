@@ -5,21 +5,21 @@
 
 namespace project::stores {
 
-/// Keeps other writers out of a folder, waiting for them. The lock belongs to the open folder and goes with
-/// it, also when the process dies.
+/// Locks a folder against other writers; waits for the current lock holder. The lock belongs to the open
+/// folder and ends when it is closed, also when the process dies.
 ///
-/// Writers get it in the order in which they come, where the file system keeps a queue (see QueuePlace):
-/// before one that waits each other one comes at most once, unless the one that waits is kept from running.
-/// Without patience the lock is not taken either when somebody waits for it.
+/// If the file system supports a queue (see QueuePlace), writers get the lock in the order in which they
+/// arrive: each other writer overtakes a waiting one at most once, unless the waiting process is stopped.
+/// Without patience, the lock is not taken if another writer waits for it.
 /// @param folder the open folder's descriptor.
-/// @param name how to name it in errors.
-/// @return false when the time ran out.
-/// @throws StoreError when the file system has no locks.
+/// @param name the name for errors.
+/// @return false when the time has run out.
+/// @throws StoreError if the file system does not support locks.
 bool lockFolder(int folder, std::string const& name, std::chrono::milliseconds patience);
 
 void unlockFolder(int folder) noexcept;
 
-/// The process that holds the lock, as "process 1234 (its command)"; empty when it cannot be found out.
+/// The lock holder, as "process 1234 (its command)"; empty if it is unknown.
 std::string findLockHolder(int folder);
 
 } // namespace project::stores

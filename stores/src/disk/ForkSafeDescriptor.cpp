@@ -7,9 +7,11 @@
 #include <pthread.h>
 #include <unistd.h>
 
+#include "disk/SystemError.hpp"
+
 namespace project::stores {
 
-/// All the descriptors of the process. It is never destroyed: a store may live in a static object.
+/// All such descriptors of the process. Never destroyed, since a store may be a static object.
 class ForkRegistry {
 public:
     static ForkRegistry& instance() {
@@ -35,7 +37,7 @@ private:
                 ::close(descriptor->descriptor_);
                 descriptor->descriptor_ = -1;
             }
-            descriptor->inForkedChild_ = true;
+            descriptor->isInForkedChild_ = true;
         }
     }
 };
@@ -56,9 +58,7 @@ ForkSafeDescriptor::~ForkSafeDescriptor() {
 bool ForkSafeDescriptor::open(std::function<int()> const& call) {
     close();
     std::lock_guard const guard(ForkRegistry::instance().mutex);
-    do {
-        descriptor_ = call();
-    } while (descriptor_ < 0 && errno == EINTR);
+    descriptor_ = repeatWhenInterrupted(call);
     return descriptor_ >= 0;
 }
 
@@ -68,7 +68,7 @@ int ForkSafeDescriptor::close() noexcept {
     }
     std::lock_guard const guard(ForkRegistry::instance().mutex);
     int const closed = ::close(descriptor_);
-    descriptor_ = -1; // also after EINTR, where the descriptor is gone all the same
+    descriptor_ = -1; // also after EINTR, since Linux has closed the descriptor by then
     return closed == 0 || errno == EINTR ? 0 : errno;
 }
 

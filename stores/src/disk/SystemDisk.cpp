@@ -20,11 +20,11 @@ namespace project::stores {
 
 namespace {
 
-/// A file is opened without following a link, and without waiting for the other end of a pipe.
+/// Opens a file without following a link and without waiting for the other end of a pipe.
 constexpr int safely = O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC;
 
-/// The state of what a name leads to from an open folder.
-/// @param name how to name it in errors.
+/// The state of the file at a path relative to an open folder.
+/// @param name the name for errors.
 std::optional<FileIdentity> identifyIn(int folder, std::string const& path, std::string const& name) {
     struct stat status {};
 
@@ -32,14 +32,14 @@ std::optional<FileIdentity> identifyIn(int folder, std::string const& path, std:
         if (errno == ENOENT || errno == ENOTDIR) {
             return std::nullopt;
         }
-        throwSystemError(name, "can't be looked at", errno);
+        throwSystemError(name, "cannot be examined", errno);
     }
     return toIdentity(status);
 }
 
-/// Gives a new file the mode and the owner of another one, as far as that is allowed: only a privileged
-/// process may give a file to another owner.
-void takeModeAndOwner(int folder, int file, std::string const& like) noexcept {
+/// Gives a new file the mode and the owner of another one, as far as permitted: only a privileged process may
+/// change the owner of a file.
+void copyModeAndOwner(int folder, int file, std::string const& like) noexcept {
     struct stat wanted {};
 
     struct stat given {};
@@ -51,17 +51,18 @@ void takeModeAndOwner(int folder, int file, std::string const& like) noexcept {
     bool const owned = wanted.st_uid == given.st_uid && wanted.st_gid == given.st_gid;
     if (!owned && ::fchown(file, wanted.st_uid, wanted.st_gid) != 0 &&
         ::fchown(file, static_cast<uid_t>(-1), wanted.st_gid) != 0) {
-        wanted.st_mode &= ~static_cast<mode_t>(S_ISUID | S_ISGID); // not for somebody else's rights
+        wanted.st_mode &=
+            ~static_cast<mode_t>(S_ISUID | S_ISGID); // these must not apply with another owner's rights
     }
-    ::fchmod(file, wanted.st_mode & 07777); // last, since giving a file away can take mode bits
+    ::fchmod(file, wanted.st_mode & 07777); // last, since changing the owner can clear mode bits
 }
 
-/// The system can't put one name in another's place in this way.
+/// True if the file system or the kernel does not support this kind of renaming.
 bool isUnsupported(int error) noexcept {
     return error == ENOSYS || error == EINVAL || error == EOPNOTSUPP;
 }
 
-/// The folder and its files through the system's calls, each relative to the open folder.
+/// The folder and its files on the file system. Each call is relative to the open folder.
 class SystemDisk : public Disk {
 public:
     SystemDisk(std::string root, std::string const& name) : folder_(std::move(root), name) {}
@@ -97,11 +98,11 @@ public:
     void pause(std::chrono::milliseconds time) override;
 
 private:
-    /// @return false when nothing has that name.
+    /// @return false if there is no file with that name.
     bool openFile(ForkSafeDescriptor& file, std::string const& name, int flags) const;
 
     SystemFolder folder_;
-    ForkSafeDescriptor written_; ///< what sync makes durable
+    ForkSafeDescriptor written_; ///< the file that sync makes durable
     std::string writtenName_;
 };
 
@@ -137,12 +138,12 @@ bool SystemDisk::openFile(ForkSafeDescriptor& file, std::string const& name, int
     if (errno == ENOENT) {
         return false;
     }
-    if (errno == ELOOP || errno == ENXIO) { // a link, or a pipe that nobody reads
+    if (errno == ELOOP || errno == ENXIO) { // a link, or a pipe without a reader
         throw StoreError(StoreError::Kind::Damaged, folder_.pathOf(name), 0,
-                         errno == ELOOP ? "is a symbolic link" : "is no regular file",
+                         errno == ELOOP ? "is a symbolic link" : "is not a regular file",
                          "Move it away, and restore the project's own file.");
     }
-    throwSystemError(folder_.pathOf(name), "can't be opened", errno);
+    throwSystemError(folder_.pathOf(name), "cannot be opened", errno);
 }
 
 std::optional<FileContent> SystemDisk::read(std::string const& name, std::uint64_t offset) {
@@ -166,15 +167,15 @@ std::optional<WrittenFile> SystemDisk::append(std::string const& name, FileIdent
             written_.close();
             return std::nullopt;
         }
-        requireRoom(expected.size + bytes.size(), writtenName_);
+        requireWritableLength(expected.size + bytes.size(), writtenName_);
         writeAll(written_.get(), bytes, writtenName_);
     } catch (...) {
         written_.close();
         throw;
     }
-    // The batch stands there, also when nobody can tell its times: then it is read again.
-    WrittenFile const unseen{{expected.device, expected.inode, expected.size + bytes.size()}, false};
-    return stamp(written_.get()).value_or(unseen);
+    // The batch is in the file even if its times are unknown. The next check then reads it again.
+    WrittenFile const unknown{{expected.device, expected.inode, expected.size + bytes.size()}, false};
+    return stamp(written_.get()).value_or(unknown);
 }
 
 WrittenFile SystemDisk::create(std::string const& name, std::string_view bytes,
@@ -183,18 +184,18 @@ WrittenFile SystemDisk::create(std::string const& name, std::string_view bytes,
     int const flags = O_WRONLY | O_CREAT | O_EXCL | safely;
     writtenName_ = folder_.pathOf(name);
     if (!written_.open([&] { return ::openat(folder, name.c_str(), flags, 0666); })) {
-        throwSystemError(writtenName_, "can't be made", errno);
+        throwSystemError(writtenName_, "cannot be created", errno);
     }
     try {
         if (like) {
-            takeModeAndOwner(folder, written_.get(), *like);
+            copyModeAndOwner(folder, written_.get(), *like);
         }
-        requireRoom(bytes.size(), writtenName_);
+        requireWritableLength(bytes.size(), writtenName_);
         writeAll(written_.get(), bytes, writtenName_);
-        if (auto const made = stamp(written_.get())) {
-            return *made;
+        if (auto const created = stamp(written_.get())) {
+            return *created;
         }
-        throwSystemError(writtenName_, "can't be looked at", errno);
+        throwSystemError(writtenName_, "cannot be examined", errno);
     } catch (...) {
         written_.close();
         ::unlinkat(folder, name.c_str(), 0);
@@ -206,9 +207,9 @@ void SystemDisk::sync() {
     folder_.requireOwnProcess();
     int const synced = repeatWhenInterrupted([this] { return ::fdatasync(written_.get()); });
     int const syncError = synced != 0 ? errno : 0;
-    int const closeError = written_.close(); // on some file systems it is here that a full disk shows
+    int const closeError = written_.close(); // some file systems report a full disk only here
     if (syncError != 0 || closeError != 0) {
-        throwSystemError(writtenName_, "can't be made durable", syncError != 0 ? syncError : closeError);
+        throwSystemError(writtenName_, "cannot be synced", syncError != 0 ? syncError : closeError);
     }
 }
 
@@ -218,7 +219,7 @@ bool SystemDisk::exchange(std::string const& left, std::string const& right) {
         return true;
     }
     if (!isUnsupported(errno)) {
-        throwSystemError(folder_.pathOf(right), "can't be replaced", errno);
+        throwSystemError(folder_.pathOf(right), "cannot be replaced", errno);
     }
     return false;
 }
@@ -226,7 +227,7 @@ bool SystemDisk::exchange(std::string const& left, std::string const& right) {
 void SystemDisk::rename(std::string const& from, std::string const& to) {
     int const folder = folder_.get();
     if (::renameat(folder, from.c_str(), folder, to.c_str()) != 0) {
-        throwSystemError(folder_.pathOf(to), "can't be replaced", errno);
+        throwSystemError(folder_.pathOf(to), "cannot be replaced", errno);
     }
 }
 
@@ -234,7 +235,7 @@ bool SystemDisk::renameToFree(std::string const& from, std::string const& to) {
     int const folder = folder_.get();
     int result = ::renameat2(folder, from.c_str(), folder, to.c_str(), RENAME_NOREPLACE);
     if (result != 0 && isUnsupported(errno)) {
-        // Where the system can't do it in one step, somebody could come in between.
+        // Without a call that does both in one step, another program can create the name in between.
         struct stat taken {};
 
         if (::fstatat(folder, to.c_str(), &taken, AT_SYMLINK_NOFOLLOW) == 0) {
@@ -243,7 +244,7 @@ bool SystemDisk::renameToFree(std::string const& from, std::string const& to) {
         result = ::renameat(folder, from.c_str(), folder, to.c_str());
     }
     if (result != 0 && errno != EEXIST) {
-        throwSystemError(folder_.pathOf(to), "can't be made", errno);
+        throwSystemError(folder_.pathOf(to), "cannot be created", errno);
     }
     return result == 0;
 }
@@ -253,7 +254,7 @@ bool SystemDisk::remove(std::string const& name) {
         return true;
     }
     if (errno != ENOENT) {
-        throwSystemError(folder_.pathOf(name), "can't be removed", errno);
+        throwSystemError(folder_.pathOf(name), "cannot be deleted", errno);
     }
     return false;
 }
@@ -261,7 +262,7 @@ bool SystemDisk::remove(std::string const& name) {
 void SystemDisk::syncFolder() {
     int const folder = folder_.get();
     if (repeatWhenInterrupted([folder] { return ::fsync(folder); }) != 0) {
-        throwSystemError(folder_.path(), "can't be made durable", errno);
+        throwSystemError(folder_.path(), "cannot be synced", errno);
     }
 }
 
@@ -274,7 +275,7 @@ std::vector<std::string> SystemDisk::list() {
         if (opened >= 0) {
             ::close(opened);
         }
-        throwSystemError(folder_.path(), "can't be listed", error);
+        throwSystemError(folder_.path(), "cannot be listed", error);
     }
     std::unique_ptr<DIR, decltype([](DIR* folder) { ::closedir(folder); })> const closing(stream);
     std::vector<std::string> names;
@@ -287,7 +288,7 @@ std::vector<std::string> SystemDisk::list() {
         errno = 0;
     }
     if (errno != 0) {
-        throwSystemError(folder_.path(), "can't be listed", errno);
+        throwSystemError(folder_.path(), "cannot be listed", errno);
     }
     return names;
 }

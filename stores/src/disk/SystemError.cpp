@@ -17,32 +17,34 @@ char const* remedyFor(int error) {
         return "Raise the limit on the size of files (ulimit -f) and try again.";
     case EACCES:
     case EPERM:
-        return "Look at the owner and the permissions of the file and of its folder.";
+        return "Check the owner and the permissions of the file and of its folder.";
     case EROFS:
-        return "The file system takes no writes: mount it writable, or work on a copy.";
+        return "The file system is read-only: mount it writable, or work on a copy.";
     case EMFILE:
     case ENFILE:
         return "Close some files or raise the limit on open files (ulimit -n), and try again.";
     case EIO:
-        return "The disk fails: look into the system's log, and keep a copy of the project elsewhere.";
+        return "The disk is failing: check the system's log, and keep a copy of the project elsewhere.";
     case ENOENT:
     case ENOTDIR:
-        return "Look whether the project was moved or removed.";
+        return "Check whether the project was moved or deleted.";
     case ESTALE:
-        return "Open the project anew.";
+        return "Reopen the project.";
     case ENOMEM:
         return "Free some memory and try again.";
     case ENAMETOOLONG:
     case EILSEQ:
-        return "The file system refuses the name: keep the project under a shorter path, or on another file "
+        return "The file system does not accept the name: keep the project under a shorter path, or on "
+               "another file "
                "system.";
     case EINVAL:
     case ENOSYS:
     case EOPNOTSUPP:
     case ENOLCK:
-        return "The file system can't do what the store needs: keep the project on another file system.";
+        return "The file system does not support an operation that the store needs: keep the project on "
+               "another file system.";
     default:
-        return "Try again; if it stays so, look into the system's log.";
+        return "Try again; if the error persists, check the system's log.";
     }
 }
 

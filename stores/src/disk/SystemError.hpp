@@ -7,16 +7,16 @@
 
 namespace project::stores {
 
-/// Throws the StoreError for a failed system call: its reason in the system's words, and what to do about it.
-/// @param action what could not be done, as in "can't be read".
-/// @param error the system's number for the reason.
+/// Throws the StoreError for a failed system call, with the system's description of the error and a remedy.
+/// @param action the action that failed, for example "cannot be read".
+/// @param error the error number of the system.
 [[noreturn]] void throwSystemError(std::string const& file, char const* action, int error);
 
-/// Makes a call again as long as signals interrupt it.
-/// @param call gives a negative number, with errno set, when it fails.
+/// Repeats a call as long as signals interrupt it.
+/// @param call returns a negative number, with errno set, if it fails.
 template <typename Call>
-int repeatWhenInterrupted(Call const& call) {
-    int result = 0;
+auto repeatWhenInterrupted(Call const& call) {
+    decltype(call()) result = 0;
     do {
         result = call();
     } while (result < 0 && errno == EINTR);

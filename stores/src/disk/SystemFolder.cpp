@@ -19,7 +19,7 @@ SystemFolder::SystemFolder(std::string root, std::string const& name)
 int SystemFolder::get() const {
     requireOwnProcess();
     if (!folder_.isOpen()) {
-        throwSystemError(path_, "can't be used", ENOENT);
+        throwSystemError(path_, "cannot be used", ENOENT);
     }
     return folder_.get();
 }
@@ -27,15 +27,15 @@ int SystemFolder::get() const {
 void SystemFolder::requireOwnProcess() const {
     if (folder_.isInForkedChild()) {
         throw StoreError(StoreError::Kind::Refused, path_, 0,
-                         "was opened by the process that this one was forked from",
-                         "Open the project anew in the child.");
+                         "was opened by the parent process before a fork",
+                         "Reopen the project in the child process.");
     }
 }
 
 void SystemFolder::openRoot(ForkSafeDescriptor& root, int flags) const {
     requireOwnProcess();
     if (!root.open([&] { return ::open(root_.c_str(), flags | O_DIRECTORY | O_CLOEXEC); })) {
-        throwSystemError(root_, "can't be opened", errno);
+        throwSystemError(root_, "cannot be opened", errno);
     }
 }
 
@@ -52,12 +52,12 @@ bool SystemFolder::openIn(int root) {
         if (errno == ENOENT) {
             return false;
         }
-        throwSystemError(path_, "can't be looked at", errno);
+        throwSystemError(path_, "cannot be examined", errno);
     }
     if (!S_ISDIR(status.st_mode)) {
         throw StoreError(StoreError::Kind::Damaged, path_, 0,
-                         S_ISLNK(status.st_mode) ? "is a symbolic link" : "is no folder",
-                         "Move it away: the store keeps a folder of its own there and follows no links.");
+                         S_ISLNK(status.st_mode) ? "is a symbolic link" : "is not a folder",
+                         "Move it away: the store needs a folder of its own there and follows no links.");
     }
     if (folder_.isOpen() && identity_.isSameFile(toIdentity(status))) {
         return true;
@@ -65,7 +65,7 @@ bool SystemFolder::openIn(int root) {
     int const flags = O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC;
     if (!folder_.open([&] { return ::openat(root, name_.c_str(), flags); }) ||
         ::fstat(folder_.get(), &status) != 0) {
-        throwSystemError(path_, "can't be opened", errno);
+        throwSystemError(path_, "cannot be opened", errno);
     }
     identity_ = toIdentity(status);
     return true;
@@ -74,21 +74,21 @@ bool SystemFolder::openIn(int root) {
 bool SystemFolder::make() {
     ForkSafeDescriptor root;
     openRoot(root, O_RDONLY);
-    bool const made = ::mkdirat(root.get(), name_.c_str(), 0777) == 0;
-    if (!made && errno != EEXIST) {
-        throwSystemError(path_, "can't be made", errno);
+    bool const isCreated = ::mkdirat(root.get(), name_.c_str(), 0777) == 0;
+    if (!isCreated && errno != EEXIST) {
+        throwSystemError(path_, "cannot be created", errno);
     }
     if (!openIn(root.get())) {
-        throwSystemError(path_, "can't be opened", ENOENT);
+        throwSystemError(path_, "cannot be opened", ENOENT);
     }
     if (repeatWhenInterrupted([&root] { return ::fsync(root.get()); }) != 0) {
         auto const error = errno;
-        if (made) {
+        if (isCreated) {
             remove();
         }
-        throwSystemError(root_, "can't be made durable", error);
+        throwSystemError(root_, "cannot be synced", error);
     }
-    return made;
+    return isCreated;
 }
 
 void SystemFolder::remove() noexcept {
@@ -97,10 +97,10 @@ void SystemFolder::remove() noexcept {
     }
     try {
         if (isInPlace()) {
-            ::rmdir(path_.c_str()); // fails when something lies in it
+            ::rmdir(path_.c_str()); // fails if the folder is not empty
         }
     } catch (StoreError const&) {
-        // what can't be looked at stays
+        // a folder that cannot be examined stays
     }
     folder_.close();
 }
@@ -118,8 +118,8 @@ bool SystemFolder::isInPlace() const {
         if (errno == ENOENT || errno == ENOTDIR) {
             return false;
         }
-        // Whoever takes that for a folder that was moved away tells of a batch that it is not in the project.
-        throwSystemError(path_, "can't be looked at", errno);
+        // Not false: the caller would report that the batch is not in the project.
+        throwSystemError(path_, "cannot be examined", errno);
     }
     return S_ISDIR(status.st_mode) && identity_.isSameFile(toIdentity(status));
 }

@@ -8,10 +8,10 @@
 
 namespace project::stores {
 
-/// The store's folder on the file system: its path, and the folder that was open when one last looked.
+/// The store's folder on the file system: its path, and the folder that was opened there.
 ///
-/// The path can come to lead to another folder while this one stays open. What is done through the open
-/// folder then happens in the old one, and isInPlace tells of it.
+/// The path may later lead to another folder while this one stays open. Operations on the open folder then
+/// affect the old one, and isInPlace returns false.
 class SystemFolder {
 public:
     /// @param root the project's root folder, absolute.
@@ -23,7 +23,7 @@ public:
 
     bool isOpen() const noexcept { return folder_.isOpen(); }
 
-    /// The open folder, for a call relative to it. Throws StoreError when it is not open.
+    /// The descriptor of the open folder. Throws StoreError if it is not open.
     int get() const;
 
     /// See Disk for these.
@@ -32,7 +32,7 @@ public:
     void remove() noexcept;
     bool isInPlace() const;
 
-    /// Fails in the child of a fork, where nothing of the parent's is open.
+    /// @throws StoreError in the child process after a fork, where the parent's files are closed.
     void requireOwnProcess() const;
 
 private:

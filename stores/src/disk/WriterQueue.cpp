@@ -28,10 +28,10 @@ struct flock lockOf(Places places, short kind) {
     return lock;
 }
 
-/// Places of these that another open folder holds: the first ones that the system comes upon.
-/// @return empty also when the system can't tell.
+/// Places in this range that another open folder holds: the first ones that the system finds.
+/// @return empty also if the system cannot say.
 std::optional<Places> findHeld(int folder, Places places) noexcept {
-    auto asked = lockOf(places, F_WRLCK); // the kind that every other lock is in the way of
+    auto asked = lockOf(places, F_WRLCK); // the kind that conflicts with every other lock
     if (places.begin >= places.end || ::fcntl(folder, F_OFD_GETLK, &asked) != 0 || asked.l_type == F_UNLCK) {
         return std::nullopt;
     }
@@ -40,7 +40,7 @@ std::optional<Places> findHeld(int folder, Places places) noexcept {
 
 } // namespace
 
-bool QueuePlace::isAnybodyIn(int folder) noexcept {
+bool QueuePlace::isOccupied(int folder) noexcept {
     return findHeld(folder, {0, unlimited}).has_value();
 }
 
@@ -57,7 +57,7 @@ void QueuePlace::take() noexcept {
     }
 }
 
-void QueuePlace::letGo() noexcept {
+void QueuePlace::release() noexcept {
     if (place_) {
         auto own = lockOf({*place_, *place_ + 1}, F_UNLCK);
         ::fcntl(folder_, F_OFD_SETLK, &own);

@@ -207,7 +207,7 @@ private:
         if ((isCreated_ && hasNode) || (isRemoval && (isCreated_ || hasNode))) {
             return reader_.fail("the members of the line contradict each other");
         }
-        kind_ = isRemoval ? Change::Kind::Remove : isCreated_ ? Change::Kind::Make : Change::Kind::Set;
+        kind_ = isRemoval ? Change::Kind::Remove : isCreated_ ? Change::Kind::Create : Change::Kind::Set;
         return true;
     }
 
@@ -246,7 +246,7 @@ AddressState stateOfLine(std::string_view line) {
     if (!parser.parse()) {
         return {};
     }
-    return {parser.node(), parser.kind() == Change::Kind::Make};
+    return {parser.node(), parser.kind() == Change::Kind::Create};
 }
 
 } // namespace project::stores

@@ -129,7 +129,7 @@ std::optional<TextReading> readConflictedText(std::string bytes, std::string con
     for (Side* const side : {&ours, &theirs}) {
         for (auto const& [address, entry] : side->content.overlay().entries()) {
             if (entry.state) {
-                auto const kind = entry.state.node ? Change::Kind::Set : Change::Kind::Make;
+                auto const kind = entry.state.node ? Change::Kind::Set : Change::Kind::Create;
                 reading.content.join({kind, address, entry.state.node});
             }
         }

@@ -9,7 +9,7 @@ void Overlay::apply(Change const& change) {
     if (change.kind == Change::Kind::Remove) {
         remove(change.address);
     } else {
-        put(change.address, {change.node, change.kind == Change::Kind::Make});
+        put(change.address, {change.node, change.kind == Change::Kind::Create});
     }
 }
 

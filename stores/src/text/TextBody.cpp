@@ -81,7 +81,7 @@ Children TextBody::children(Range below, std::size_t depth) const {
         if (!steps.next()) {
             AddressState state = stateOfLine(line(below.begin));
             child.node = std::move(state.node);
-            child.made = state.isCreated;
+            child.isCreated = state.isCreated;
             ++below.begin;
         }
         std::size_t const end = endOf(below, prefix);

@@ -24,7 +24,7 @@ public:
         Children children;
         while (!lines_.empty() || entry_ != end_) {
             Child child = next();
-            if (child.node || child.made || child.hasChildren) {
+            if (child.node || child.isCreated || child.hasChildren) {
                 children.push_back(std::move(child));
             }
         }
@@ -67,7 +67,7 @@ private:
 
     static void setState(Child& child, AddressState state) {
         child.node = std::move(state.node);
-        child.made = state.isCreated;
+        child.isCreated = state.isCreated;
     }
 
     /// Takes the lines at and below the child. @return those strictly below it.

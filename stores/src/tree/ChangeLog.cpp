@@ -18,7 +18,7 @@ void ChangeLog::add(Changes const& changes) {
     }
     everything_ = everything_ || changes.everything;
     for (auto const& [address, before, after] : changes.differences) {
-        // Most often they come sorted, and behind what is there.
+        // They are usually sorted, and behind the ones that are already there.
         differences_.try_emplace(differences_.end(), address, Ends{before, nullptr})->second.after = after;
     }
 }

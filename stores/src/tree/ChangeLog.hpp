@@ -7,15 +7,17 @@
 
 namespace project::stores {
 
-/// Collects what others have changed, look by look, until somebody asks for it.
+/// Collects the changes of other processes until they are requested.
 ///
-/// add needs the store for itself alone; take may come from several readers at once.
+/// add must not run at the same time as any other operation of the store; several readers may call take at
+/// the same time.
 class ChangeLog {
 public:
-    /// Takes in what a look has found. The first look is the beginning, and not a change.
+    /// Adds the changes that one check has found. The result of the first check is the initial state and not
+    /// a change.
     void add(Changes const& changes);
 
-    /// All since the last time, as one change: each address once, sorted; without those that are as before.
+    /// The changes since the last call, each address once, sorted; without addresses that are as before.
     Changes take();
 
 private:

@@ -20,39 +20,39 @@ std::vector<std::shared_ptr<ListenerList::Listener>> ListenerList::accepting() {
             }
         }
     }
-    // Asked without the mutex, so that a listener may subscribe another one while it is asked.
+    // Without the mutex, so that a listener may subscribe another one during the call.
     std::erase_if(result, [](auto const& listener) { return !listener->acceptsFileChangeRequests(); });
     return result;
 }
 
-void ListenerList::Report::tell(FileChanges files, Always always) {
+void ListenerList::Notification::notify(FileChanges files, Always always) {
     current_ = listeners_.accepting();
     files_ = std::move(files);
     bool const removalFirst = always == Always::Removal;
     auto const additions = [&] {
         if (always == Always::Addition || !files_.added.empty()) {
-            tellAll(Kind::Addition, files_.added);
+            notifyAll(Kind::Addition, files_.added);
         }
     };
     if (!removalFirst) {
         additions();
     }
     if (removalFirst || !files_.removed.empty()) {
-        tellAll(Kind::Removal, files_.removed);
+        notifyAll(Kind::Removal, files_.removed);
     }
     if (removalFirst) {
         additions();
     }
 }
 
-void ListenerList::Report::tellAll(Kind kind, std::vector<Path> const& files) {
+void ListenerList::Notification::notifyAll(Kind kind, std::vector<Path> const& files) {
     for (auto const& listener : current_) {
-        tell(*listener, kind, files);
-        told_.emplace_back(listener, kind);
+        notify(*listener, kind, files);
+        notified_.emplace_back(listener, kind);
     }
 }
 
-void ListenerList::Report::tell(Listener& listener, Kind kind, std::vector<Path> const& files) {
+void ListenerList::Notification::notify(Listener& listener, Kind kind, std::vector<Path> const& files) {
     if (kind == Kind::Addition) {
         listener.fileAdditionRequested(store_, files);
     } else {
@@ -60,17 +60,17 @@ void ListenerList::Report::tell(Listener& listener, Kind kind, std::vector<Path>
     }
 }
 
-void ListenerList::Report::tellReverse() noexcept {
-    for (auto told = told_.rbegin(); told != told_.rend(); ++told) {
-        bool const wasAddition = told->second == Kind::Addition;
+void ListenerList::Notification::notifyOfReverse() noexcept {
+    for (auto entry = notified_.rbegin(); entry != notified_.rend(); ++entry) {
+        bool const wasAddition = entry->second == Kind::Addition;
         auto const& files = wasAddition ? files_.added : files_.removed;
         if (files.empty()) {
             continue;
         }
         try {
-            tell(*told->first, wasAddition ? Kind::Removal : Kind::Addition, files);
+            notify(*entry->first, wasAddition ? Kind::Removal : Kind::Addition, files);
         } catch (...) {
-            // The write has failed already, and that is the error that the caller must see.
+            // The caller must get the error of the write, not this one.
             continue;
         }
     }

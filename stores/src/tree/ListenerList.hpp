@@ -16,14 +16,14 @@ class ListenerList {
 public:
     using Listener = metadata::FileChangeRequestListener;
 
-    /// The report that is made even when it names no file; the other is made only for files.
+    /// The notification that is sent even without files; the other one is sent only if there are files.
     enum class Always { Addition, Removal, None };
 
-    class Report;
+    class Notification;
 
     void add(std::weak_ptr<Listener> listener);
 
-    /// Those that are still there and accept reports, in the order in which they came.
+    /// The listeners that still exist and accept notifications, in the order in which they were added.
     std::vector<std::shared_ptr<Listener>> accepting();
 
 private:
@@ -31,31 +31,31 @@ private:
     std::vector<std::weak_ptr<Listener>> listeners_;
 };
 
-/// Tells all listeners of the files of one write, and remembers what was told, to tell the reverse when the
-/// write is undone.
-class ListenerList::Report {
+/// Notifies all listeners of the files of one write. If the write is rolled back, notifies them of the
+/// reverse.
+class ListenerList::Notification {
 public:
-    Report(ListenerList& listeners, metadata::MetadataManager& store, Path const& metadataRoot)
+    Notification(ListenerList& listeners, metadata::MetadataManager& store, Path const& metadataRoot)
         : listeners_(listeners), store_(store), metadataRoot_(metadataRoot) {}
 
-    /// What a listener throws goes on to the caller; listeners after it are not told.
-    void tell(FileChanges files, Always always);
+    /// An exception of a listener propagates to the caller; the listeners after it are not notified.
+    void notify(FileChanges files, Always always);
 
-    /// Tells each listener that was told, the last first, that its files went or came back.
-    void tellReverse() noexcept;
+    /// Notifies each listener that was notified, the last one first, that its files were deleted or restored.
+    void notifyOfReverse() noexcept;
 
 private:
     enum class Kind { Addition, Removal };
 
-    void tell(Listener& listener, Kind kind, std::vector<Path> const& files);
-    void tellAll(Kind kind, std::vector<Path> const& files);
+    void notify(Listener& listener, Kind kind, std::vector<Path> const& files);
+    void notifyAll(Kind kind, std::vector<Path> const& files);
 
     ListenerList& listeners_;
     metadata::MetadataManager& store_;
     Path const& metadataRoot_;
     std::vector<std::shared_ptr<Listener>> current_;
     FileChanges files_;
-    std::vector<std::pair<std::shared_ptr<Listener>, Kind>> told_;
+    std::vector<std::pair<std::shared_ptr<Listener>, Kind>> notified_;
 };
 
 } // namespace project::stores

@@ -10,8 +10,8 @@ using metadata::PathElement;
 
 namespace {
 
-/// Beyond this it costs less to forget everything than to load again what each difference touches.
-constexpr std::size_t mostLoadedAgain = 4096;
+/// With more differences than this, it costs less to discard the tree than to reload each level concerned.
+constexpr std::size_t mostReloaded = 4096;
 
 } // namespace
 
@@ -32,12 +32,12 @@ struct MetadataTree::ByElement {
     }
 };
 
-/// What is known of one address.
+/// One address in the tree.
 struct MetadataTree::Place {
     Node node;
-    bool made = false;
+    bool isCreated = false;
     std::atomic<bool> loaded = false;
-    std::unique_ptr<Places> below; ///< null when nothing lies below, as far as it is loaded
+    std::unique_ptr<Places> below; ///< null if there is nothing below it, as far as it is loaded
 
     bool isEmpty() const noexcept { return !below || below->empty(); }
 
@@ -48,21 +48,21 @@ struct MetadataTree::Place {
         return *below;
     }
 
-    /// Takes out what lies at an element; empty when nothing does.
+    /// Extracts the place at an element; empty if there is none.
     Places::node_type take(PathElement const& element) {
         auto const found = makeBelow().find(element);
         return found == below->end() ? Places::node_type() : below->extract(found);
     }
 };
 
-/// One step for each change, to be taken back from the last to the first.
+/// One step for each change, to be undone from the last to the first.
 struct MetadataTree::UndoSteps {
     struct Step {
         Address address;
-        bool created;               ///< the place was not there before
-        Node node;                  ///< what was there before
-        bool made;                  ///< what was there before
-        Places::node_type detached; ///< the place that was taken out, of a removal
+        bool isNew;                 ///< the place did not exist before
+        Node node;                  ///< the earlier node
+        bool isCreated;             ///< the earlier state
+        Places::node_type detached; ///< of a removal: the place that was extracted
     };
 
     std::vector<Step> steps;
@@ -84,7 +84,7 @@ bool MetadataTree::exists(Address const& address) const {
         return false;
     }
     if (place != root_.get()) {
-        return true; // a place is kept only while its address exists
+        return true; // a place exists only as long as its address
     }
     load(*place, address);
     return !place->isEmpty();
@@ -153,10 +153,10 @@ void MetadataTree::load(Place& place, Address const& address) const {
     if (!children.empty()) {
         auto below = std::make_unique<Places>();
         for (auto& child : children) {
-            auto& made = below->try_emplace(below->end(), address.child(std::move(child.element)))->second;
-            made.node = std::move(child.node);
-            made.made = child.made;
-            made.loaded.store(!child.hasChildren, std::memory_order_relaxed);
+            auto& added = below->try_emplace(below->end(), address.child(std::move(child.element)))->second;
+            added.node = std::move(child.node);
+            added.isCreated = child.isCreated;
+            added.loaded.store(!child.hasChildren, std::memory_order_relaxed);
         }
         place.below = std::move(below);
     }
@@ -184,7 +184,7 @@ MetadataTree::Undo MetadataTree::apply(Batch const& batch) {
 void MetadataTree::set(Change const& change, UndoSteps& undo) {
     auto* place = root_.get();
     auto here = Address::root();
-    bool created = false;
+    bool isNew = false;
     for (std::size_t index = 0; index < change.address.depth(); ++index) {
         load(*place, here);
         auto const& element = change.address[index];
@@ -192,35 +192,36 @@ void MetadataTree::set(Change const& change, UndoSteps& undo) {
         auto found = below.lower_bound(element);
         if (found == below.end() || found->first.leaf() != element) {
             found = below.try_emplace(found, here.child(element));
-            found->second.loaded.store(true, std::memory_order_relaxed); // nothing is stored below it yet
-            if (!created) {
-                created = true;
+            found->second.loaded.store(true,
+                                       std::memory_order_relaxed); // it is new: nothing is stored below it
+            if (!isNew) {
+                isNew = true;
                 undo.steps.push_back({found->first, true, nullptr, false, {}});
             }
         }
         here = found->first;
         place = &found->second;
     }
-    if (!created) {
-        undo.steps.push_back({here, false, place->node, place->made, {}});
+    if (!isNew) {
+        undo.steps.push_back({here, false, place->node, place->isCreated, {}});
     }
     place->node = change.node;
-    place->made = change.kind == Change::Kind::Make;
+    place->isCreated = change.kind == Change::Kind::Create;
 }
 
 void MetadataTree::remove(Address const& address, UndoSteps& undo) {
     if (find(address) == nullptr) {
         return;
     }
-    // An address above that holds no node, was not made, and leads nowhere else goes as well.
-    auto goes = address;
-    auto* above = find(goes.parent());
-    while (above != root_.get() && !above->node && !above->made && above->below->size() == 1) {
-        goes = goes.parent();
-        above = find(goes.parent());
+    // An address above that has no node, was not created, and has no other children is deleted too.
+    auto removed = address;
+    auto* above = find(removed.parent());
+    while (above != root_.get() && !above->node && !above->isCreated && above->below->size() == 1) {
+        removed = removed.parent();
+        above = find(removed.parent());
     }
-    undo.steps.push_back({goes, false, nullptr, false, {}});
-    undo.steps.back().detached = above->take(goes.leaf());
+    undo.steps.push_back({removed, false, nullptr, false, {}});
+    undo.steps.back().detached = above->take(removed.leaf());
 }
 
 void MetadataTree::undo(Undo undo) noexcept {
@@ -231,12 +232,12 @@ void MetadataTree::undo(Undo undo) noexcept {
         auto* above = find(step->address.parent());
         if (step->detached) {
             above->makeBelow().insert(std::move(step->detached));
-        } else if (step->created) {
+        } else if (step->isNew) {
             above->below->erase(above->below->find(step->address.leaf()));
         } else {
             auto& place = above->below->find(step->address.leaf())->second;
             place.node = std::move(step->node);
-            place.made = step->made;
+            place.isCreated = step->isCreated;
         }
     }
 }
@@ -245,19 +246,19 @@ void MetadataTree::forget() {
     root_ = std::make_unique<Place>();
 }
 
-void MetadataTree::takeIn(Changes const& changes) {
-    if (changes.everything || changes.differences.size() > mostLoadedAgain) {
+void MetadataTree::applyChanges(Changes const& changes) {
+    if (changes.everything || changes.differences.size() > mostReloaded) {
         forget();
         return;
     }
-    // Whether an address exists can depend on what lies below it, so every level above a change is loaded
-    // again; each level once, from the top.
+    // Whether an address exists can depend on the addresses below it. So every level above a change is
+    // reloaded, each level once, from the top.
     std::set<Address> levels;
     for (auto const& difference : changes.differences) {
         for (auto level = difference.address; level.depth() > 0;) {
             level = level.parent();
             if (!levels.insert(level).second) {
-                break; // all above it are there already
+                break; // the levels above it are in the set already
             }
         }
     }
@@ -278,7 +279,7 @@ void MetadataTree::reload(Place& place, Address const& address) {
                                     : below->try_emplace(below->end(), address.child(child.element));
         auto& content = position->second;
         content.node = child.node;
-        content.made = child.made;
+        content.isCreated = child.isCreated;
         if (!child.hasChildren) {
             content.below.reset();
             content.loaded.store(true, std::memory_order_relaxed);

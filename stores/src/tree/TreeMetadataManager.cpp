@@ -18,13 +18,13 @@ using metadata::MetadataNodeSpecification;
 
 namespace {
 
-/// The caller's node is copied, so that nothing the caller does with it later changes the store.
+/// A copy of the caller's node, so that later changes of that node do not change the store.
 Node copyOf(MetadataNode const& node) {
     return isEqual(node, *plainNode()) ? plainNode()
                                        : std::make_shared<MetadataNodeSpecification const>(node);
 }
 
-/// True while a batch is written and not yet kept.
+/// Marks the time between the write of a batch and its commit.
 class WritingMark {
 public:
     explicit WritingMark(bool& mark) : mark_(mark) { mark_ = true; }
@@ -48,10 +48,10 @@ public:
           tree([this](Address const& address) { return backend->load(address); }),
           lock({[this](Access access) { enter(access); }, [this] { backend->leave(); }}) {}
 
-    /// Writes a batch through to the backend, tells the listeners, and makes it stand.
+    /// Writes a batch through to the backend, notifies the listeners, and commits it.
     void write(MetadataManager& store, Batch const& batch, ListenerList::Always always);
 
-    /// @throws StoreError for a listener that writes while it is told of a write.
+    /// @throws StoreError if a listener writes while it is notified of a write.
     void requireNotWriting() const;
 
     std::unique_ptr<Backend> const backend;
@@ -60,7 +60,7 @@ public:
     ChangeLog othersChanges;
     ListenerList listeners;
     bool writing = false;
-    ReentrantReadWriteLock lock; // last: it enters and leaves the backend
+    ReentrantReadWriteLock lock; // last, since it enters and leaves the backend
 
 private:
     void enter(Access access);
@@ -70,9 +70,9 @@ void TreeMetadataManager::State::enter(Access access) {
     auto const changes = backend->enter(access);
     try {
         othersChanges.add(changes);
-        tree.takeIn(changes);
+        tree.applyChanges(changes);
     } catch (...) {
-        tree.takeIn({true, {}}); // what was half taken in is forgotten, and loaded again when asked for
+        tree.applyChanges({true, {}}); // discards the half-applied changes; the levels are loaded on request
         backend->leave();
         throw;
     }
@@ -81,29 +81,29 @@ void TreeMetadataManager::State::enter(Access access) {
 void TreeMetadataManager::State::requireNotWriting() const {
     if (writing) {
         throw StoreError(StoreError::Kind::Refused, fl::filesystem::toSystem(metadataRoot).string(), 0,
-                         "a listener wrote into the store while it was told of a write",
-                         "Let it note what it wants to write, and write when the operation has returned.");
+                         "a listener wrote to the store while it was notified of a write",
+                         "The listener must write after the operation has returned.");
     }
 }
 
 void TreeMetadataManager::State::write(MetadataManager& store, Batch const& batch,
                                        ListenerList::Always always) {
     WritingMark const mark(writing);
-    ListenerList::Report report(listeners, store, metadataRoot);
+    ListenerList::Notification notification(listeners, store, metadataRoot);
     if (batch.empty()) {
-        report.tell({}, always);
+        notification.notify({}, always);
         return;
     }
     MetadataTree::Undo undo;
     try {
         auto const files = backend->write(batch);
         undo = tree.apply(batch);
-        report.tell(files, always);
+        notification.notify(files, always);
         backend->keep();
     } catch (...) {
         backend->discard();
         tree.undo(std::move(undo));
-        report.tellReverse();
+        notification.notifyOfReverse();
         throw;
     }
 }
@@ -138,7 +138,7 @@ void TreeMetadataManager::setNodes(std::map<Address, std::shared_ptr<MetadataNod
     Batch batch;
     for (auto const& [address, node] : nodes) {
         if (!node || address.depth() == 0) {
-            throw std::invalid_argument(node ? "a node can't be stored at the root of the metadata tree"
+            throw std::invalid_argument(node ? "a node cannot be stored at the root of the metadata tree"
                                              : "a null node was given to the metadata store");
         }
         auto const before = state_->tree.node(address);
@@ -177,7 +177,8 @@ void TreeMetadataManager::removeNodes(std::vector<Address>& paths) {
     }
     Batch batch;
     for (auto const& address : all) {
-        if (batch.empty() || !address.isWithin(batch.back().address)) { // else it goes with the one above
+        if (batch.empty() ||
+            !address.isWithin(batch.back().address)) { // otherwise it is deleted with the address above
             batch.push_back({Change::Kind::Remove, address, nullptr});
         }
     }
@@ -198,7 +199,7 @@ void TreeMetadataManager::createPaths(std::vector<Address>& paths) {
     absent.erase(Address::root());
     Batch batch;
     for (auto const& address : absent) {
-        batch.push_back({Change::Kind::Make, address, nullptr});
+        batch.push_back({Change::Kind::Create, address, nullptr});
     }
     state_->write(*this, batch, ListenerList::Always::None);
 }

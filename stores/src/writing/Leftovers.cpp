@@ -9,11 +9,11 @@ namespace project::stores {
 
 namespace {
 
-void settleStranger(Disk& disk, std::string const& name, StoreFiles::Swap const& swap) {
+void restoreOrSetAside(Disk& disk, std::string const& name, StoreFiles::Swap const& swap) {
     auto const text = disk.identify(StoreFiles::text);
     if (text && swap.isNew(*text) && disk.exchange(name, StoreFiles::text)) {
         disk.syncFolder();
-        disk.remove(name); // the dead writer's own text, of a batch that it never called kept
+        disk.remove(name); // the dead writer's text, whose batch it did not commit
     } else {
         setAside(disk, name);
     }
@@ -29,12 +29,11 @@ void removeLeftover(Disk& disk, std::string const& name) {
     if (isOurs) {
         disk.remove(name);
     } else if (!swap || swap->isOldFile(*file)) {
-        // Nothing that a writer of ours has made; or the old text, as a power cut left it after the new one
-        // was durable, or as an editor wrote into it. The new one may hold batches that were kept, so it
-        // stays.
+        // Not a file of the store; or the old text, changed by an editor, or by a power failure after the new
+        // text was durable. The new text may contain committed batches, so it stays.
         setAside(disk, name);
     } else {
-        settleStranger(disk, name, *swap);
+        restoreOrSetAside(disk, name, *swap);
     }
 }
 
@@ -46,13 +45,14 @@ void removeLeftovers(Disk& disk) {
     if (names.empty()) {
         return;
     }
-    // First, as long as they tell of it: batches are going to be appended to what has the text's name now.
+    // First, while these files show that it is necessary: batches will be appended to the file that has the
+    // text's name now.
     disk.syncFolder();
     for (auto const& name : names) {
         try {
             removeLeftover(disk, name);
         } catch (StoreError const&) {
-            // The next writer tries again; nothing that is left stands in the way of this one.
+            // The next writer tries again; no leftover hinders this one.
         }
     }
 }

@@ -6,16 +6,16 @@
 
 namespace project::stores {
 
-/// Removes the temporary files of dead writers, or does with them what their writer had no time for. Whoever
-/// holds the folder's lock may call this, since then the writers of all temporary files are dead.
+/// Deletes the leftovers of dead writers, and completes an exchange that a writer began. The folder must be
+/// locked, since then the writers of all temporary files are dead.
 ///
-/// A text that git or an editor put in place at the moment of a rewrite, and that the writer had not put back
-/// when it died, goes back to its place, or aside where that is taken. What cannot be removed, as in a
-/// project that is read-only, stays. Costs a listing of the folder; where there are temporary files, a writer
-/// may have died before it made the names durable, and so they are made durable here.
+/// If another program put a text in place at the moment of an exchange, and the writer died before it
+/// restored that text, the text is restored to its place, or set aside if the place is taken. A file that
+/// cannot be deleted, as in a read-only project, stays. Costs one listing of the folder. If there are
+/// temporary files, a writer may have died before it made the names durable, so they are made durable here.
 void removeLeftovers(Disk& disk);
 
-/// Gives something that is not the store's own a name where it is in nobody's way.
+/// Renames a file of another program to a name that the store does not need.
 /// @return that name.
 std::string setAside(Disk& disk, std::string const& name);
 

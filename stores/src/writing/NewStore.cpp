@@ -9,86 +9,86 @@
 
 namespace project::stores {
 
-void NewStore::makeFolder() {
-    madeFolder_ = disk_.makeFolder() || madeFolder_;
+void NewStore::createFolder() {
+    isFolderCreated_ = disk_.makeFolder() || isFolderCreated_;
 }
 
-FileChanges NewStore::makeFiles() {
+FileChanges NewStore::createFiles() {
     FileChanges changes;
-    place(StoreFiles::attributes, StoreFiles::attributesContent, changes);
-    place(StoreFiles::ignored, StoreFiles::ignoredContent, changes);
+    createFile(StoreFiles::attributes, StoreFiles::attributesContent, changes);
+    createFile(StoreFiles::ignored, StoreFiles::ignoredContent, changes);
     auto text = ProjectText::empty();
-    place(StoreFiles::text, text.body(), changes);
-    if (made_.empty() || made_.back().name != StoreFiles::text) {
-        throw StoreError(StoreError::Kind::Busy, disk_.folder() + "/" + StoreFiles::text, 0,
-                         "was made by another program at this moment, and the batch is not in the project",
+    createFile(StoreFiles::text, text.body(), changes);
+    if (created_.empty() || created_.back().name != StoreFiles::text) {
+        throw StoreError(StoreError::Kind::Busy, StoreFiles::pathOfText(disk_), 0,
+                         "was created by another program at this moment, and the batch is not in the project",
                          "Try again.");
     }
-    seen_.replaced(std::move(text), made_.back().file);
+    seen_.replaced(std::move(text), created_.back().file);
     disk_.syncFolder();
     return changes;
 }
 
-/// Makes one file, whole from the start, unless something has its name already.
-void NewStore::place(char const* name, std::string_view content, FileChanges& changes) {
+/// Creates one file, which is complete as soon as it has its name, unless the name is taken.
+void NewStore::createFile(char const* name, std::string_view content, FileChanges& changes) {
     auto const temporary = StoreFiles::newTemporary();
     auto const file = disk_.create(temporary, content, std::nullopt);
-    bool isPlaced = false;
+    bool isCreated = false;
     try {
         disk_.sync();
-        isPlaced = disk_.renameToFree(temporary, name);
+        isCreated = disk_.renameToFree(temporary, name);
     } catch (StoreError const&) {
         removeLeftovers(disk_);
         throw;
     }
-    if (!isPlaced) {
+    if (!isCreated) {
         disk_.remove(temporary);
         return;
     }
-    made_.push_back({name, file});
-    // A new name changes one of the file's times.
+    created_.push_back({name, file});
+    // Renaming changes one of the file's times.
     auto const now = disk_.identify(name);
     bool const isKnown = now && now->isSameState(file.identity);
-    made_.back().file = {isKnown ? *now : file.identity, isKnown && file.isStamped};
+    created_.back().file = {isKnown ? *now : file.identity, isKnown && file.isStamped};
     changes.added.push_back(fl::filesystem::fromSystem(disk_.folder()) /
                             fl::filesystem::fromSystem(std::string(name)));
 }
 
-bool NewStore::takeBack() noexcept {
+bool NewStore::rollBack() noexcept {
     bool isFolderGone = false;
     try {
-        isFolderGone = removeMade() && madeFolder_;
+        isFolderGone = removeCreatedFiles() && isFolderCreated_;
         if (isFolderGone) {
             disk_.removeFolder();
         }
     } catch (...) {
-        // what is left is a store without nodes
+        // a store without nodes is left
     }
-    stand();
+    commit();
     return isFolderGone;
 }
 
-/// @return false when somebody has changed the text, so that everything stays.
-bool NewStore::removeMade() {
-    if (!made_.empty() && made_.back().name == StoreFiles::text) {
-        if (!isTextAsMade()) {
+/// @return false if another program has changed the text, so that all files stay.
+bool NewStore::removeCreatedFiles() {
+    if (!created_.empty() && created_.back().name == StoreFiles::text) {
+        if (!isTextUnchanged()) {
             return false;
         }
         disk_.remove(StoreFiles::text);
         seen_.forget();
-        made_.pop_back();
+        created_.pop_back();
     }
-    for (auto const& made : made_) {
-        auto const there = disk_.identify(made.name);
-        if (there && there->isSameState(made.file.identity)) {
-            disk_.remove(made.name);
+    for (auto const& [name, file] : created_) {
+        auto const there = disk_.identify(name);
+        if (there && there->isSameState(file.identity)) {
+            disk_.remove(name);
         }
     }
     return true;
 }
 
-/// True also after a text without the batch was written to a new file.
-bool NewStore::isTextAsMade() const {
+/// True also after the text without the batch was written to a new file.
+bool NewStore::isTextUnchanged() const {
     auto const there = disk_.identify(StoreFiles::text);
     return there && seen_.exists() && there->isSameState(seen_.identity()) &&
            seen_.text().hasSameBytes(ProjectText::empty().body());

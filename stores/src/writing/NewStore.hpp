@@ -10,44 +10,45 @@
 
 namespace project::stores {
 
-/// Makes the files of a store where there is none yet, and takes them away again when its first batch fails,
-/// so that trying again makes, and reports, them again.
+/// Creates the files of a store for its first batch, and deletes them if that batch fails, so that the next
+/// attempt creates and reports them again.
 class NewStore {
 public:
     NewStore(Disk& disk, SeenText& seen) : disk_(disk), seen_(seen) {}
 
-    /// Makes the folder, which is not locked by that.
-    void makeFolder();
+    /// Creates the folder, without locking it.
+    void createFolder();
 
-    /// Makes the files that are missing, the text without nodes last, all durable.
-    /// @return those that came into being.
-    /// @throws StoreError when somebody else makes the text at the same time.
-    FileChanges makeFiles();
+    /// Creates the files that are missing, durably. The text, which has no nodes yet, comes last.
+    /// @return the files that were created.
+    /// @throws StoreError if another program creates the text at the same time.
+    FileChanges createFiles();
 
-    /// Takes away what was made, unless somebody has changed the text. Never throws: what cannot be removed
-    /// stays, and is a store without nodes. @return true when the folder went, and the lock with it.
-    bool takeBack() noexcept;
+    /// Deletes the files that were created, unless another program has changed the text. Never throws: a file
+    /// that cannot be deleted stays, and is a store without nodes. @return true if the folder was deleted,
+    /// and the lock released with it.
+    bool rollBack() noexcept;
 
-    /// What was made stays.
-    void stand() noexcept {
-        made_.clear();
-        madeFolder_ = false;
+    /// Keeps the files that were created.
+    void commit() noexcept {
+        created_.clear();
+        isFolderCreated_ = false;
     }
 
 private:
-    struct Made {
+    struct CreatedFile {
         std::string name;
         WrittenFile file;
     };
 
-    void place(char const* name, std::string_view content, FileChanges& changes);
-    bool removeMade();
-    bool isTextAsMade() const;
+    void createFile(char const* name, std::string_view content, FileChanges& changes);
+    bool removeCreatedFiles();
+    bool isTextUnchanged() const;
 
     Disk& disk_;
     SeenText& seen_;
-    bool madeFolder_ = false;
-    std::vector<Made> made_;
+    bool isFolderCreated_ = false;
+    std::vector<CreatedFile> created_;
 };
 
 } // namespace project::stores

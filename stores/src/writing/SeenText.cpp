@@ -15,18 +15,14 @@ using std::chrono::milliseconds;
 /// The coarsest clock by which a kernel stamps files ticks a hundred times a second.
 constexpr std::int64_t youngerThanATick = 20'000'000;
 
-/// For how long there may be no text where the other files of a store are: git takes the old one away before
-/// it makes the new one, and makes it last where it brings a project. Then it is taken for what a writer left
-/// that died before it had made one.
+/// How long to wait for the text of a folder that contains the other files of a store. Git deletes the old
+/// text before it creates the new one, and creates it last when it creates a project. After this time, the
+/// folder is taken for that of a writer that died before it created a text.
 constexpr milliseconds longestWithoutText(200);
 
-std::string pathOfText(Disk const& disk) {
-    return disk.folder() + "/" + StoreFiles::text;
-}
-
-/// True when a write after the given time leaves other times behind than the file has. Times that lie in the
-/// future tell nothing.
-bool isSettledAt(FileIdentity const& file, std::int64_t time) {
+/// True if a write after the given time leaves other times than those of the file. Times in the future say
+/// nothing.
+bool isOlderThanATick(FileIdentity const& file, std::int64_t time) {
     return std::max(file.modified, file.changed) + youngerThanATick < time;
 }
 
@@ -36,17 +32,17 @@ bool isWithoutNodes(ProjectText const& text) {
 
 } // namespace
 
-Changes SeenText::look(milliseconds patience) {
+Changes SeenText::checkForChanges(milliseconds patience) {
     Changes changes;
     milliseconds waited(0);
     milliseconds nap(1);
-    while (!lookOnce(changes, waited >= std::min(patience, longestWithoutText))) {
+    while (!checkOnce(changes, waited >= std::min(patience, longestWithoutText))) {
         if (waited >= patience) {
             throw StoreError(
-                StoreError::Kind::Damaged, pathOfText(disk_), 0,
-                seen_ ? "is gone, or ends before its last line" : "ends before its last line",
-                "If git or an editor is writing it, try again when that is done; otherwise bring "
-                "back a whole one, for instance with git checkout.");
+                StoreError::Kind::Damaged, StoreFiles::pathOfText(disk_), 0,
+                seen_ ? "is missing or ends before its last line" : "ends before its last line",
+                "If git or an editor is writing it, try again when that has finished; otherwise restore "
+                "a complete text, for example with git checkout.");
         }
         nap = std::min(nap, patience - waited);
         disk_.pause(nap);
@@ -56,23 +52,23 @@ Changes SeenText::look(milliseconds patience) {
     return changes;
 }
 
-bool SeenText::lookOnce(Changes& changes, bool mayBeUnmade) {
+bool SeenText::checkOnce(Changes& changes, bool acceptsNoText) {
     if (seen_) {
         auto const now = disk_.identifyByPath(StoreFiles::text);
         if (!now) {
             return acceptMissing();
         }
-        if (*now == seen_->identity && seen_->isSettled) {
+        if (*now == seen_->identity && seen_->isReliable) {
             return true;
         }
-        if (now->isSameFile(seen_->identity) && now->size > seen_->text.size() && takeInTail(changes)) {
+        if (now->isSameFile(seen_->identity) && now->size > seen_->text.size() && applyAppended(changes)) {
             return true;
         }
     }
-    return readAnew(changes, mayBeUnmade);
+    return readAll(changes, acceptsNoText);
 }
 
-bool SeenText::takeInTail(Changes& changes) {
+bool SeenText::applyAppended(Changes& changes) {
     if (!staysInFolder_ && !disk_.openFolder()) {
         return false;
     }
@@ -86,38 +82,38 @@ bool SeenText::takeInTail(Changes& changes) {
         return false;
     }
     seen_->identity = added->identity;
-    seen_->isSettled = isSettledAt(added->identity, before);
+    seen_->isReliable = isOlderThanATick(added->identity, before);
     addChanges(changes, {false, std::move(*differences)});
     return true;
 }
 
-bool SeenText::readAnew(Changes& changes, bool mayBeUnmade) {
+bool SeenText::readAll(Changes& changes, bool acceptsNoText) {
     if (!staysInFolder_ && !disk_.openFolder()) {
         return acceptMissing();
     }
     auto const before = disk_.now();
     auto content = disk_.read(StoreFiles::text, 0);
     if (!content) {
-        bool const isAwaited = !seen_ && !mayBeUnmade && disk_.identify(StoreFiles::attributes);
+        bool const isAwaited = !seen_ && !acceptsNoText && disk_.identify(StoreFiles::attributes);
         return !isAwaited && acceptMissing();
     }
-    bool const isSettled = isSettledAt(content->identity, before);
+    bool const isReliable = isOlderThanATick(content->identity, before);
     if (seen_ && seen_->text.hasSameBytes(content->bytes)) {
         seen_->identity = content->identity;
-        seen_->isSettled = isSettled;
+        seen_->isReliable = isReliable;
         return true;
     }
-    auto text = ProjectText::read(std::move(content->bytes), pathOfText(disk_));
+    auto text = ProjectText::read(std::move(content->bytes), StoreFiles::pathOfText(disk_));
     if (!text) {
         return false;
     }
     addChanges(changes, seen_ ? Changes{false, seen_->text.differencesTo(*text)} : Changes{true, {}});
-    seen_ = Seen{std::move(*text), content->identity, isSettled};
+    seen_ = Seen{std::move(*text), content->identity, isReliable};
     return true;
 }
 
-/// Where nothing was seen there is no store yet, and a text that held no nodes goes without loss: its maker
-/// took it back. Any other text that isn't there is just being written.
+/// Without an earlier text there is no store yet. An earlier text without nodes was deleted by the writer
+/// that rolled back its first batch. Any other missing text is being written by another program.
 bool SeenText::acceptMissing() {
     if (seen_ && !isWithoutNodes(seen_->text)) {
         return false;
@@ -131,15 +127,15 @@ void SeenText::replaced(ProjectText text, WrittenFile const& file) {
 }
 
 void SeenText::appended(std::string_view lines, WrittenFile const& file) {
-    // Where somebody else appended as well, the size tells, and the next look reads all of it.
+    // If another program appended too, the size differs, and the next check reads the whole text.
     bool const isWhole = seen_->text.append(lines) && seen_->text.size() == file.identity.size;
     seen_->identity = file.identity;
-    seen_->isSettled = file.isStamped && isWhole;
+    seen_->isReliable = file.isStamped && isWhole;
 }
 
 void SeenText::distrust() noexcept {
     if (seen_) {
-        seen_->isSettled = false;
+        seen_->isReliable = false;
     }
 }
 

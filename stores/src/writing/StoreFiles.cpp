@@ -29,8 +29,8 @@ std::string randomHex() {
 
 constexpr std::size_t digitsOfFile = 8; ///< of the 16 of a state
 
-/// A short text for what tells one state of a file from another, whatever name the file has: one half for the
-/// file, one for its state.
+/// A short text that identifies a state of a file, whatever its name: one half for the file, one for its
+/// state.
 std::string stateOf(FileIdentity const& file) {
     constexpr unsigned half = 32;
     std::array<std::uint64_t, 2> const state{file.size, static_cast<std::uint64_t>(file.modified)};

@@ -8,36 +8,39 @@
 
 namespace project::stores {
 
-/// The names of the files in the store's folder, and the content of those that never change.
+/// The names of the files in the store's folder, and the content of the files that never change.
 struct StoreFiles {
     static constexpr char const* text = "project.jsonl";
+
+    /// The absolute path of the text, for errors.
+    static std::string pathOfText(Disk const& disk) { return disk.folder() + "/" + text; }
 
     /// For source control: line ends stay as they are, and the text has a merge driver of its own.
     static constexpr char const* attributes = ".gitattributes";
     static constexpr std::string_view attributesContent = "project.jsonl -text merge=project-definition\n";
 
-    /// For source control: what is there only for a while, or was set aside, is not part of the project.
+    /// For source control: temporary files and files that were set aside are not part of the project.
     static constexpr char const* ignored = ".gitignore";
     static constexpr std::string_view ignoredContent = "/project.jsonl.*.tmp\n/damaged-*\n/displaced-*\n";
 
-    /// A fresh name for a file that is being written: "project.jsonl.<process>-<random>.tmp".
+    /// A new name for a file that is being written: "project.jsonl.<process>-<random>.tmp".
     static std::string newTemporary();
 
-    /// The name under which a whole new text is put in the old one's place, which the old one then has. It
-    /// tells the states of the two, so that after a crash nobody takes a third one for either:
+    /// The name under which a complete new text is exchanged with the old one. It contains the states of
+    /// both, so that after a crash a third file is not mistaken for either:
     /// "project.jsonl.<old>-<new>.swap.tmp".
     static std::string swapping(FileIdentity const& old, FileIdentity const& fresh);
 
-    /// A fresh name for something that is not the store's own and stood where it needed room.
+    /// A new name for a file of another program that is set aside.
     static std::string newDisplaced();
 
-    /// A fresh name for damaged lines that a repair takes out of the text.
+    /// A new name for the damaged lines that a repair sets aside.
     static std::string newDamaged();
 
     static bool isTemporary(std::string_view name);
     static bool isDisplaced(std::string_view name);
 
-    /// What the name of a swapping file tells.
+    /// The states in the name of a swapping file.
     struct Swap {
         std::string oldState;
         std::string newState;
@@ -45,11 +48,11 @@ struct StoreFiles {
         bool isOld(FileIdentity const& file) const;
         bool isNew(FileIdentity const& file) const;
 
-        /// The old text's file, whatever state it is in.
+        /// True for the file of the old text, whatever its state.
         bool isOldFile(FileIdentity const& file) const;
     };
 
-    /// Empty when the name is no swapping file's.
+    /// Empty if the name is not that of a swapping file.
     static std::optional<Swap> parseSwapping(std::string_view name);
 };
 

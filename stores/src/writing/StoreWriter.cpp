@@ -9,10 +9,10 @@ namespace project::stores {
 
 namespace {
 
-/// What to do when nobody can tell whether a batch is in the project.
-std::string openAnewAfter(StoreError const& failure) {
+/// The remedy after a failure with an unknown outcome.
+std::string reopenAfter(StoreError const& failure) {
     return failure.getRemedy() + (failure.getRemedy().empty() ? "" : " ") +
-           "Then open the project anew, and look whether the last change is there.";
+           "Then reopen the project, and check whether the last change is there.";
 }
 
 } // namespace
@@ -22,7 +22,7 @@ void StoreWriter::append(std::string_view lines) {
     if (!isInPlace(before)) {
         throwReplaced();
     }
-    auto const written = appendOrTakeBack(lines, before);
+    auto const written = appendOrRollBack(lines, before);
     if (!written) {
         throwReplaced();
     }
@@ -31,37 +31,37 @@ void StoreWriter::append(std::string_view lines) {
         disk_.sync();
         isStillInPlace = isInPlace(before);
     } catch (StoreError const& failure) {
-        takeBack(written->identity, failure);
+        rollBack(written->identity, failure);
         throw;
     }
     if (!isStillInPlace) {
         if (!disk_.isFolderInPlace()) {
-            // It was moved away with the batch in it, which must not come back with it.
-            takeBack(written->identity,
-                     StoreError(StoreError::Kind::Busy, pathOfText(), 0, "was moved away", ""));
+            // The folder was moved away with the batch in it. The batch must not return with the folder.
+            rollBack(written->identity, StoreError(StoreError::Kind::Busy, StoreFiles::pathOfText(disk_), 0,
+                                                   "was moved away", ""));
         }
         throwReplaced();
     }
     seen_.appended(lines, *written);
 }
 
-std::optional<WrittenFile> StoreWriter::appendOrTakeBack(std::string_view lines, FileIdentity const& before) {
+std::optional<WrittenFile> StoreWriter::appendOrRollBack(std::string_view lines, FileIdentity const& before) {
     try {
         return disk_.append(StoreFiles::text, before, lines);
     } catch (StoreError const& failure) {
         auto left = before;
-        bool mayCount = true;
+        bool mayBeComplete = true;
         try {
-            // A torn batch is counted by nobody and may stay. One that lacks just the last line's end is
-            // whole.
+            // Readers ignore a torn batch, so it may stay. A batch that lacks only the last line end is
+            // complete.
             auto const now = disk_.identify(StoreFiles::text);
-            mayCount = now && now->isSameFile(before) && now->size + 1 >= before.size + lines.size();
+            mayBeComplete = now && now->isSameFile(before) && now->size + 1 >= before.size + lines.size();
             left = now.value_or(before);
         } catch (StoreError const&) {
-            // For all that can be known it is whole.
+            // It may be complete.
         }
-        if (mayCount) {
-            takeBack(left, failure);
+        if (mayBeComplete) {
+            rollBack(left, failure);
         }
         throw;
     }
@@ -72,7 +72,7 @@ void StoreWriter::rewrite(ProjectText next) {
     if (!isInPlace(before)) {
         throwReplaced();
     }
-    auto const replacement = put(next.body(), before);
+    auto const replacement = replace(next.body(), before);
     if (!replacement) {
         throwReplaced();
     }
@@ -83,12 +83,12 @@ void StoreWriter::rewrite(ProjectText next) {
             disk_.syncFolder();
         }
     } catch (StoreError const& failure) {
-        takeBack(replacement->file.identity, failure);
+        rollBack(replacement->file.identity, failure);
         removeOwn(replacement->beside, replacement->besideIdentity);
         throw;
     }
     if (!isStillInPlace) {
-        withdraw(*replacement);
+        abandon(*replacement);
         throwReplaced();
     }
     removeOwn(replacement->beside, replacement->besideIdentity);
@@ -97,16 +97,16 @@ void StoreWriter::rewrite(ProjectText next) {
 
 void StoreWriter::requireKnownOutcome() const {
     if (isOutcomeUnknown_) {
-        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0,
-                         "is not written any more, since an earlier write failed so that nobody can tell "
-                         "whether its batch is in the project",
-                         "Open the project anew, and look whether the last change is there.");
+        throw StoreError(StoreError::Kind::Refused, StoreFiles::pathOfText(disk_), 0,
+                         "is not written any more, since an earlier write failed with an unknown outcome",
+                         "Reopen the project, and check whether the last change is there.");
     }
 }
 
-/// Writes a whole text and puts it in the place of the file that is expected there.
-/// @return nothing when another file is there, which stays there.
-std::optional<StoreWriter::Put> StoreWriter::put(std::string_view bytes, FileIdentity const& expected) {
+/// Writes a complete text and replaces the file that is expected at the text's name.
+/// @return nothing if another file is there, which stays.
+std::optional<StoreWriter::Replacement> StoreWriter::replace(std::string_view bytes,
+                                                             FileIdentity const& expected) {
     auto name = StoreFiles::newTemporary();
     auto const file = disk_.create(name, bytes, StoreFiles::text);
     try {
@@ -114,23 +114,24 @@ std::optional<StoreWriter::Put> StoreWriter::put(std::string_view bytes, FileIde
         auto const swapping = StoreFiles::swapping(expected, file.identity);
         if (!disk_.renameToFree(name, swapping)) {
             throw StoreError(StoreError::Kind::Damaged, disk_.folder() + "/" + swapping, 0,
-                             "stands in the way of a new text", "Move it away and try again.");
+                             "exists, although the store needs the name for a new text",
+                             "Move it away and try again.");
         }
         name = swapping;
-        return swapIn(name, file, expected);
+        return exchange(name, file, expected);
     } catch (StoreError const&) {
         removeOwn(name, file.identity);
         throw;
     }
 }
 
-std::optional<StoreWriter::Put> StoreWriter::swapIn(std::string const& name, WrittenFile const& file,
-                                                    FileIdentity const& expected) {
+std::optional<StoreWriter::Replacement>
+StoreWriter::exchange(std::string const& name, WrittenFile const& file, FileIdentity const& expected) {
     if (disk_.identify(StoreFiles::text) != expected) {
         removeOwn(name, file.identity);
         return std::nullopt;
     }
-    Put result{file, name, expected, disk_.exchange(name, StoreFiles::text)};
+    Replacement result{file, name, expected, disk_.exchange(name, StoreFiles::text)};
     if (!result.isExchanged) {
         result.beside = StoreFiles::newTemporary();
         result.besideIdentity = disk_.create(result.beside, {}, std::nullopt).identity;
@@ -140,114 +141,115 @@ std::optional<StoreWriter::Put> StoreWriter::swapIn(std::string const& name, Wri
             return std::nullopt;
         }
         disk_.rename(name, StoreFiles::text);
-    } else if (!hasComeOut(name, expected, file.identity)) {
+    } else if (!isExchangedWith(expected, name, file.identity)) {
         return std::nullopt;
     }
-    // A new name changes one of the file's times.
+    // Renaming changes one of the file's times.
     auto const now = identifyQuietly(StoreFiles::text);
     bool const isKnown = now && now->isSameState(file.identity);
     result.file = {isKnown ? *now : file.identity, isKnown && file.isStamped};
     return result;
 }
 
-/// Looks whether an exchange has given a name to the text that was read; anything else goes back, and also
-/// when the disk can't tell.
-bool StoreWriter::hasComeOut(std::string const& name, FileIdentity const& expected,
-                             FileIdentity const& ours) {
+/// Checks that the file which an exchange moved to a name is the text that was read. Undoes the exchange if
+/// it is another file or cannot be examined.
+bool StoreWriter::isExchangedWith(FileIdentity const& expected, std::string const& name,
+                                  FileIdentity const& ours) {
     std::optional<FileIdentity> old;
     try {
         old = disk_.identify(name);
     } catch (StoreError const&) {
-        putBack(name, ours);
+        undoExchange(name, ours);
         throw;
     }
     bool const isExpected = old && old->isSameState(expected);
     if (!isExpected) {
-        putBack(name, ours);
+        undoExchange(name, ours);
     }
     return isExpected;
 }
 
-/// What came out was not what was read: somebody put it there at the last moment, and it goes there again.
-void StoreWriter::putBack(std::string const& name, FileIdentity const& ours) {
-    bool isBack = false;
+/// Restores the file that another program put in place at the last moment.
+void StoreWriter::undoExchange(std::string const& name, FileIdentity const& ours) {
+    bool isRestored = false;
     try {
-        isBack = disk_.exchange(name, StoreFiles::text);
+        isRestored = disk_.exchange(name, StoreFiles::text);
     } catch (StoreError const&) {
-        // told below
+        // reported below
     }
-    if (!isBack) {
-        throwNotPutBack(name, ours);
+    if (!isRestored) {
+        throwNotRestored(name, ours);
     }
     try {
-        disk_.syncFolder(); // or the batch could come back with a power cut
+        disk_.syncFolder(); // otherwise a power failure could bring the batch back
     } catch (StoreError const& failure) {
-        loseTrack(ours);
-        throw StoreError(StoreError::Kind::OutcomeUnknown, pathOfText(), 0,
-                         failure.getProblem() + "; the text that stood there is back, but after a power cut "
-                                                "nobody can tell whether the batch is in the project",
-                         openAnewAfter(failure));
+        setOutcomeUnknown(ours);
+        throw StoreError(StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
+                         failure.getProblem() + "; the other program's text is restored, but after a power "
+                                                "failure the batch may be in the project",
+                         reopenAfter(failure));
     }
     if (!removeOwn(name, ours)) {
-        setAside(disk_, name); // yet another one came in between
+        setAside(disk_, name); // another program has replaced it in between
     }
 }
 
-void StoreWriter::throwNotPutBack(std::string const& name, FileIdentity const& ours) {
-    loseTrack(ours);
+void StoreWriter::throwNotRestored(std::string const& name, FileIdentity const& ours) {
+    setOutcomeUnknown(ours);
     std::string aside = name;
     try {
         aside = setAside(disk_, name);
     } catch (StoreError const&) {
-        // It keeps the name that it has, and the next writer puts it back or sets it aside.
+        // It keeps its name, and the next writer restores it or sets it aside.
     }
     throw StoreError(
-        StoreError::Kind::OutcomeUnknown, pathOfText(), 0,
-        "was perhaps replaced by another program while a batch was written, and could not be put back: "
-        "it is " +
-            aside + " now, and the text in its place has the batch",
-        "Compare the two files and keep what is right.");
+        StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
+        "was perhaps replaced by another program while a batch was written, and could not be restored: "
+        "it is now " +
+            aside + ", and the text in its place contains the batch",
+        "Compare the two files and keep the right one.");
 }
 
-/// The path leads elsewhere now. Where the folder was moved away, the batch must not come back with it.
-void StoreWriter::withdraw(Put const& put) {
-    if (put.isExchanged && !disk_.isFolderInPlace()) {
-        putBack(put.beside, put.file.identity);
+/// The path leads elsewhere now. If the folder was moved away, the batch must not return with it.
+void StoreWriter::abandon(Replacement const& replacement) {
+    if (replacement.isExchanged && !disk_.isFolderInPlace()) {
+        undoExchange(replacement.beside, replacement.file.identity);
     } else {
-        removeOwn(put.beside, put.besideIdentity);
+        removeOwn(replacement.beside, replacement.besideIdentity);
     }
 }
 
-/// The batch stands in the text and may not be durable; what the system still holds of the file can't be
-/// trusted after that. So the text without it is written to a new file, to the byte: where it has the markers
-/// of a merge or damage, those are not gone with a write that failed.
-void StoreWriter::takeBack(FileIdentity const& current, StoreError const& failure) {
+/// Removes a batch that is in the text and may not be durable. The system's cached content of the file cannot
+/// be trusted any more, so the text without the batch is written to a new file, byte for byte: conflict
+/// markers and damage survive a write that failed.
+void StoreWriter::rollBack(FileIdentity const& current, StoreError const& failure) {
     std::string reason = "another program wrote into it at the same time";
     try {
         auto before = seen_.text().bytes();
-        if (auto const replacement = put(before, current)) {
+        if (auto const replacement = replace(before, current)) {
             disk_.syncFolder();
             removeOwn(replacement->beside, replacement->besideIdentity);
-            seen_.replaced(*ProjectText::read(std::move(before), pathOfText()), replacement->file);
+            seen_.replaced(*ProjectText::read(std::move(before), StoreFiles::pathOfText(disk_)),
+                           replacement->file);
             return;
         }
         auto const there = identifyQuietly(StoreFiles::text);
         if (!there || !there->isSameFile(current)) {
-            return; // somebody else's text, without the batch, has taken its place
+            return; // another program's text, without the batch, has replaced it
         }
     } catch (StoreError const& second) {
         reason = second.getProblem();
     }
-    loseTrack(current);
-    throw StoreError(StoreError::Kind::OutcomeUnknown, pathOfText(), 0,
+    setOutcomeUnknown(current);
+    throw StoreError(StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
                      failure.getProblem() + "; writing the text without the last batch failed too (" +
-                         reason + "): nobody can tell whether the batch is in the project",
-                     openAnewAfter(failure));
+                         reason + "): it is unknown whether the batch is in the project",
+                     reopenAfter(failure));
 }
 
-/// Nothing is written any more by this object. What the system holds of the text may differ from what is on
-/// disk, and nothing may be appended to that: a torn tail makes whoever writes next write a new file.
-void StoreWriter::loseTrack(FileIdentity const& file) {
+/// Makes this object refuse further writes. The system's cached content of the text may differ from the disk,
+/// so no batch may be appended to this file: a torn tail makes the next writer create a new one.
+void StoreWriter::setOutcomeUnknown(FileIdentity const& file) {
     isOutcomeUnknown_ = true;
     seen_.distrust();
     try {
@@ -256,11 +258,11 @@ void StoreWriter::loseTrack(FileIdentity const& file) {
             disk_.append(StoreFiles::text, *there, "{");
         }
     } catch (StoreError const&) {
-        // a disk that takes nothing takes no later batch either
+        // a disk that accepts no byte accepts no later batch either
     }
 }
 
-/// True when the path from the project's root leads to this file in the open folder, whatever its state.
+/// True if the path from the project's root leads to this file in the open folder, whatever its state.
 bool StoreWriter::isInPlace(FileIdentity const& file) {
     if (!disk_.isFolderInPlace()) {
         return false;
@@ -269,7 +271,7 @@ bool StoreWriter::isInPlace(FileIdentity const& file) {
     return there && there->isSameFile(file);
 }
 
-/// Empty also when the disk can't tell.
+/// Empty also if the file cannot be examined.
 std::optional<FileIdentity> StoreWriter::identifyQuietly(std::string const& name) {
     try {
         return disk_.identify(name);
@@ -278,8 +280,8 @@ std::optional<FileIdentity> StoreWriter::identifyQuietly(std::string const& name
     }
 }
 
-/// Removes a file if it is the one that is meant. What can't be removed is left to the next writer.
-/// @return false when it is another one.
+/// Deletes a file if it is the expected one. A file that cannot be deleted is left to the next writer.
+/// @return false if it is another file.
 bool StoreWriter::removeOwn(std::string const& name, FileIdentity const& ours) {
     try {
         auto const there = disk_.identify(name);
@@ -293,13 +295,9 @@ bool StoreWriter::removeOwn(std::string const& name, FileIdentity const& ours) {
     }
 }
 
-std::string StoreWriter::pathOfText() const {
-    return disk_.folder() + "/" + StoreFiles::text;
-}
-
 void StoreWriter::throwReplaced() const {
     throw StoreError(
-        StoreError::Kind::Busy, pathOfText(), 0,
+        StoreError::Kind::Busy, StoreFiles::pathOfText(disk_), 0,
         "was replaced, changed or moved by another program at this moment, and the batch is not in "
         "the project",
         "Try again.");

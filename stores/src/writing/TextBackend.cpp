@@ -19,23 +19,27 @@ using std::chrono::milliseconds;
 char16_t const* const TextBackend::folderName = u".projectdata";
 char16_t const* const TextBackend::textName = u"project.jsonl";
 
+Path TextBackend::textPath(Path const& projectRoot) {
+    return projectRoot / folderName / textName;
+}
+
 namespace {
 
 /// No line of a batch is shorter than this: a name of one character in quotes, and the line's end.
 constexpr std::size_t shortestLine = 4;
 
-char const* const settleTheConflict =
-    "Settle the conflict with \"projectctl resolve\" or in an editor, and try again.";
+char const* const resolveTheConflict =
+    "Resolve the conflict with \"projectctl resolve\" or in an editor, and try again.";
 
 bool hasFault(ProjectText const& text, Fault::Kind kind) {
     return std::ranges::find(text.faults(), kind, &Fault::kind) != text.faults().end();
 }
 
-/// A batch that is written and not yet kept: either the lines to append, or the text to put in place.
+/// A batch between write and keep: either the lines to append, or the new text.
 struct Pending {
-    Batch batch; ///< of an appended one
+    Batch batch; ///< of a batch to append
     std::string lines;
-    std::optional<ProjectText> next; ///< of an appended one made only when somebody asks for it
+    std::optional<ProjectText> next; ///< of a batch to append: created on request
     bool isAppended;
 };
 
@@ -58,12 +62,12 @@ public:
     void discard() noexcept;
     bool tidy();
     std::string repair();
-    void settle(std::string settled);
+    void resolve(std::string resolved);
     std::vector<Fault> check();
-    void tidyAtLast() noexcept;
+    void tidyOnClose() noexcept;
 
 private:
-    /// Lets the lock go at the end of an operation that took it for itself.
+    /// Releases the lock at the end of an operation that took it.
     class Unlocking {
     public:
         explicit Unlocking(State& state) : state_(state) {}
@@ -79,17 +83,16 @@ private:
 
     bool lock(milliseconds patience);
     void clearFolder();
-    void look(milliseconds patience);
-    /// Locks the folder and looks. @return false when there is no text.
-    bool lockAndLook(milliseconds patience);
+    void checkForChanges(milliseconds patience);
+    /// Locks the folder and checks for changes. @return false if there is no text.
+    bool lockAndCheck(milliseconds patience);
     void requireWritable() const;
     void requireNoFault(Fault::Kind kind, char const* remedy) const;
-    FileChanges makeStore();
+    FileChanges createStore();
     Pending prepare(Batch const& batch) const;
     std::string linesToAppend(Batch const& batch) const;
-    std::string writeDamagedAside();
 
-    std::string pathOfText() const { return disk_->folder() + "/" + StoreFiles::text; }
+    std::string pathOfText() const { return StoreFiles::pathOfText(*disk_); }
 
     std::unique_ptr<Disk> disk_;
     Options options_;
@@ -97,8 +100,8 @@ private:
     StoreWriter writer_;
     NewStore newStore_;
     std::optional<Pending> pending_;
-    Changes unreported_;                    ///< what was seen to have changed and not yet told by enter
-    std::optional<FileIdentity> clearedAt_; ///< the text when the folder held nothing of dead writers
+    Changes unreported_;                    ///< changes that were found and not yet returned by enter
+    std::optional<FileIdentity> clearedAt_; ///< the text when the folder had no leftovers
     bool isLocked_ = false;
     bool hasWritten_ = false;
 };
@@ -108,7 +111,7 @@ Changes TextBackend::State::enter(Access access) {
         if (access == Access::Write) {
             lock(options_.patience);
         }
-        look(options_.patience);
+        checkForChanges(options_.patience);
     } catch (...) {
         leave();
         throw;
@@ -124,7 +127,7 @@ void TextBackend::State::leave() noexcept {
     seen_.stayInFolder(false);
 }
 
-/// Keeps other writers out of the folder that the path leads to. @return false when there is none.
+/// Locks the folder that the path leads to. @return false if there is none.
 bool TextBackend::State::lock(milliseconds patience) {
     for (;;) {
         if (!disk_->openFolder()) {
@@ -133,21 +136,21 @@ bool TextBackend::State::lock(milliseconds patience) {
         if (!disk_->lock(patience)) {
             auto const holder = disk_->lockHolder();
             throw StoreError(StoreError::Kind::Busy, disk_->folder(), 0,
-                             "is being written by " + (holder.empty() ? "another process" : holder),
-                             "Try again when that is done.");
+                             "is locked by " + (holder.empty() ? "another process" : holder),
+                             "Try again when it has finished.");
         }
         isLocked_ = true;
         if (disk_->isFolderInPlace()) {
             break;
         }
-        leave(); // the folder was replaced while we waited
+        leave(); // the folder was replaced during the wait
     }
     seen_.stayInFolder(true);
     clearFolder();
     return true;
 }
 
-/// Looks for what dead writers left, unless nobody else has written since this object did so.
+/// Removes the leftovers of dead writers, unless no other process has written since this object did so.
 void TextBackend::State::clearFolder() {
     auto const text = disk_->identify(StoreFiles::text);
     if (!text || text != clearedAt_) {
@@ -156,15 +159,15 @@ void TextBackend::State::clearFolder() {
     }
 }
 
-void TextBackend::State::look(milliseconds patience) {
-    addChanges(unreported_, seen_.look(patience));
+void TextBackend::State::checkForChanges(milliseconds patience) {
+    addChanges(unreported_, seen_.checkForChanges(patience));
 }
 
-bool TextBackend::State::lockAndLook(milliseconds patience) {
+bool TextBackend::State::lockAndCheck(milliseconds patience) {
     if (!lock(patience)) {
         return false;
     }
-    look(patience);
+    checkForChanges(patience);
     return seen_.exists();
 }
 
@@ -185,7 +188,7 @@ FileChanges TextBackend::State::write(Batch const& batch) {
     requireWritable();
     FileChanges files;
     if (!seen_.exists()) {
-        files = makeStore();
+        files = createStore();
     }
     pending_ = prepare(batch);
     return files;
@@ -193,11 +196,10 @@ FileChanges TextBackend::State::write(Batch const& batch) {
 
 void TextBackend::State::requireWritable() const {
     writer_.requireKnownOutcome();
-    requireNoFault(Fault::Kind::Conflict, settleTheConflict);
-    requireNoFault(
-        Fault::Kind::Damage,
-        "Nothing is written into a damaged text. Run \"projectctl check\" to see all of the damage, "
-        "and \"projectctl check --repair\" to set it aside.");
+    requireNoFault(Fault::Kind::Conflict, resolveTheConflict);
+    requireNoFault(Fault::Kind::Damage,
+                   "A damaged text is not written. Run \"projectctl check\" to see all of the damage, and "
+                   "\"projectctl check --repair\" to set it aside.");
 }
 
 void TextBackend::State::requireNoFault(Fault::Kind kind, char const* remedy) const {
@@ -214,23 +216,23 @@ void TextBackend::State::requireNoFault(Fault::Kind kind, char const* remedy) co
     }
 }
 
-FileChanges TextBackend::State::makeStore() {
+FileChanges TextBackend::State::createStore() {
     if (isLocked_ && !disk_->isFolderInPlace()) {
         leave();
     }
-    newStore_.makeFolder(); // also where it is there: whoever made it may have died before it was durable
+    newStore_.createFolder(); // also if it exists: its creator may have died before the name was durable
     if (!isLocked_) {
         lock(options_.patience);
-        look(options_.patience);
+        checkForChanges(options_.patience);
         if (seen_.exists()) {
-            // The batch was made for an empty project.
+            // The batch assumes an empty project.
             throw StoreError(
                 StoreError::Kind::Busy, pathOfText(), 0,
-                "was made by another process at this moment, and the batch is not in the project",
+                "was created by another process at this moment, and the batch is not in the project",
                 "Try again.");
         }
     }
-    return newStore_.makeFiles();
+    return newStore_.createFiles();
 }
 
 Pending TextBackend::State::prepare(Batch const& batch) const {
@@ -240,9 +242,9 @@ Pending TextBackend::State::prepare(Batch const& batch) const {
     return {{}, {}, seen_.text().rewrittenWith(batch), false};
 }
 
-/// Empty when the text is to be written anew: it is short, or what follows the body gets long against it, or
-/// there is something to put right, or the file has another name, in a copy of the project that was made of
-/// links: what is appended here would stand there too.
+/// Empty if the text must be rewritten: it is short, or the tail becomes long compared with the body, or the
+/// text has a fault to correct, or the file has another name. In a copy of the project that consists of hard
+/// links, an appended batch would be in both.
 std::string TextBackend::State::linesToAppend(Batch const& batch) const {
     auto const& text = seen_.text();
     bool const isSound = text.faults().empty() && (text.tailSize() > 0 || text.isTidy());
@@ -265,7 +267,7 @@ void TextBackend::State::keep() {
         writer_.rewrite(std::move(*pending_->next));
     }
     pending_.reset();
-    newStore_.stand();
+    newStore_.commit();
     clearedAt_ = seen_.identity();
     hasWritten_ = true;
 }
@@ -273,15 +275,15 @@ void TextBackend::State::keep() {
 void TextBackend::State::discard() noexcept {
     pending_.reset();
     if (!isLocked_) {
-        newStore_.stand(); // it is for whoever has the lock now to say what is there
-    } else if (newStore_.takeBack()) {
-        leave(); // the lock went with the folder
+        newStore_.commit(); // without the lock, the files may belong to another writer by now
+    } else if (newStore_.rollBack()) {
+        leave(); // the lock was released with the folder
     }
 }
 
 bool TextBackend::State::tidy() {
     Unlocking const unlocking(*this);
-    if (!lockAndLook(options_.patience)) {
+    if (!lockAndCheck(options_.patience)) {
         return false;
     }
     requireWritable();
@@ -295,16 +297,16 @@ bool TextBackend::State::tidy() {
 std::string TextBackend::State::repair() {
     Unlocking const unlocking(*this);
     seen_.distrust();
-    if (!lockAndLook(options_.patience)) {
+    if (!lockAndCheck(options_.patience)) {
         return {};
     }
     writer_.requireKnownOutcome();
-    requireNoFault(Fault::Kind::Conflict, settleTheConflict);
+    requireNoFault(Fault::Kind::Conflict, resolveTheConflict);
     auto const damaged = seen_.text().damagedLines();
     if (damaged.empty()) {
         return {};
     }
-    // The damaged lines are safe before the text goes on without them.
+    // The damaged lines are durable before the text is rewritten without them.
     auto name = StoreFiles::newDamaged();
     disk_->create(name, damaged, std::nullopt);
     disk_->sync();
@@ -313,18 +315,18 @@ std::string TextBackend::State::repair() {
     return name;
 }
 
-void TextBackend::State::settle(std::string settled) {
-    auto const next = ProjectText::read(std::move(settled), pathOfText());
+void TextBackend::State::resolve(std::string resolved) {
+    auto const next = ProjectText::read(std::move(resolved), pathOfText());
     if (!next || hasFault(*next, Fault::Kind::Damage) || hasFault(*next, Fault::Kind::Conflict)) {
         throw StoreError(StoreError::Kind::Refused, pathOfText(), 0,
-                         "what should take the place of the text is no whole and sound text", "");
+                         "the new text is incomplete, damaged or contains conflict markers", "");
     }
     Unlocking const unlocking(*this);
     seen_.distrust();
-    bool const isThere = lockAndLook(options_.patience);
+    bool const isThere = lockAndCheck(options_.patience);
     if (!isThere || !hasFault(seen_.text(), Fault::Kind::Conflict)) {
-        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0,
-                         "the text has no markers of a merge that could be settled", "");
+        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0, "the text contains no conflict markers",
+                         "");
     }
     writer_.requireKnownOutcome();
     writer_.rewrite(next->rewrittenWith({}));
@@ -332,7 +334,7 @@ void TextBackend::State::settle(std::string settled) {
 
 std::vector<Fault> TextBackend::State::check() {
     seen_.distrust();
-    look(options_.patience);
+    checkForChanges(options_.patience);
     std::vector<Fault> faults;
     if (seen_.exists()) {
         faults = seen_.text().faults();
@@ -340,28 +342,28 @@ std::vector<Fault> TextBackend::State::check() {
     if (disk_->openFolder()) {
         for (auto const& name : disk_->list()) {
             if (StoreFiles::isDisplaced(name)) {
-                faults.push_back({Fault::Kind::Displaced, 0,
-                                  name +
-                                      " is not the store's own: it stood in the way of a write, or was put "
-                                      "in the text's place during one"});
+                faults.push_back(
+                    {Fault::Kind::Displaced, 0,
+                     name + " is not a file of the store: another program created it at a name that "
+                            "the store needed, or in place of the text"});
             }
         }
     }
     return faults;
 }
 
-/// A closed project is left without a tail, unless that would take waiting.
-void TextBackend::State::tidyAtLast() noexcept {
-    constexpr milliseconds atOnce(0);
+/// Tidies the text when the store is closed, unless that would require waiting.
+void TextBackend::State::tidyOnClose() noexcept {
+    constexpr milliseconds withoutWaiting(0);
     try {
         Unlocking const unlocking(*this);
-        if (hasWritten_ && seen_.exists() && seen_.text().tailSize() > 0 && lockAndLook(atOnce) &&
+        if (hasWritten_ && seen_.exists() && seen_.text().tailSize() > 0 && lockAndCheck(withoutWaiting) &&
             seen_.text().tailSize() > 0) {
             requireWritable();
             writer_.rewrite(seen_.text().rewrittenWith({}));
         }
     } catch (...) {
-        // the tail is as good a text as the body
+        // a tail is no fault
     }
 }
 
@@ -373,7 +375,7 @@ TextBackend::TextBackend(std::unique_ptr<Disk> disk, Options options)
 }
 
 TextBackend::~TextBackend() {
-    state_->tidyAtLast();
+    state_->tidyOnClose();
 }
 
 Changes TextBackend::enter(Access access) {
@@ -404,8 +406,8 @@ bool TextBackend::tidy() {
     return state_->tidy();
 }
 
-void TextBackend::settle(std::string settled) {
-    state_->settle(std::move(settled));
+void TextBackend::resolve(std::string resolved) {
+    state_->resolve(std::move(resolved));
 }
 
 std::string TextBackend::repair() {

@@ -197,7 +197,7 @@ void CrashPoints::bringInOrder(Situation& now) {
     if (now.story == Story::Conflict) {
         auto const faults = backend->check();
         if (!faults.empty()) {
-            backend->settle(now.settled);
+            backend->resolve(now.settled);
         }
         now.content = stores::samples::contentOf(stores::samples::readWhole(now.settled));
     }

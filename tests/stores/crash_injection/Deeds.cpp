@@ -96,7 +96,7 @@ Deed repairDamage(Situation& situation, Choices& choices) {
 
 Deed settleAConflict(Situation& situation, Choices& choices) {
     return {openPerhapsRead(situation, choices),
-            [text = situation.settled](Deed& deed) { deed.backend->settle(text); },
+            [text = situation.settled](Deed& deed) { deed.backend->resolve(text); },
             stores::samples::contentOf(stores::samples::readWhole(situation.settled))};
 }
 

@@ -157,7 +157,7 @@ Content applied(Content content, Batch const& batch) {
         case stores::Change::Kind::Remove:
             std::erase_if(content, [&](auto const& entry) { return entry.first.isWithin(change.address); });
             break;
-        case stores::Change::Kind::Make:
+        case stores::Change::Kind::Create:
             content[change.address] = "made";
             break;
         }

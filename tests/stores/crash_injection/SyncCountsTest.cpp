@@ -166,7 +166,7 @@ TEST_F(SyncCounts, settlingIsARewrite) {
     prepareText(conflict);
     auto const backend = open();
 
-    EXPECT_THAT(callsOf([&] { backend->settle(textOf(addFiles({u"a"}))); }),
+    EXPECT_THAT(callsOf([&] { backend->resolve(textOf(addFiles({u"a"}))); }),
                 ElementsAreArray(joined({lockAndClear, readInLockedFolder, wholeRewrite})));
 }
 

@@ -164,7 +164,7 @@ std::vector<SystemDeed> systemDeeds() {
         deed("repair", damagedText(), appending, nothing,
              [](RealProject& project) { project.backend->repair(); }),
         withAfter(deed("settle", conflictedText(), appending, nothing,
-                       [](RealProject& project) { project.backend->settle(textOf(many)); }),
+                       [](RealProject& project) { project.backend->resolve(textOf(many)); }),
                   contentAfter({many})),
         deed("look", text, appending, nothing, readFirst),
         deed("check", text, appending, nothing, [](RealProject& project) { project.backend->check(); }),

@@ -80,7 +80,7 @@ void SystemFaults::checkNextWriter(SystemDeed const& deed, RealProject const& pr
             EXPECT_NE(std::string::npos, project.text().find("\"a name without its end\n"));
             writer->repair();
         } else if (fault.kind == stores::Fault::Kind::Conflict) {
-            writer->settle(textOf(addFiles(manyFiles(20))));
+            writer->resolve(textOf(addFiles(manyFiles(20))));
         }
     }
     auto const before = contentOf(*writer);

@@ -100,7 +100,7 @@ TEST_F(SystemFaults, aFolderThatCanNotBeLookedAtIsNotTakenForOneThatWasMovedAway
     auto const thrown = perform(deed, *project, failing("lstat", looksBefore));
 
     ASSERT_TRUE(thrown);
-    EXPECT_EQ("can't be looked at: Input/output error", thrown->getProblem());
+    EXPECT_EQ("cannot be examined: Input/output error", thrown->getProblem());
     checkAfterwards(deed, *project, thrown);
 }
 
@@ -113,7 +113,7 @@ TEST_F(SystemFaults, aNewTextThatCanNotBeLookedAtIsNotPutInPlace) {
 
     ASSERT_TRUE(thrown);
     EXPECT_THAT(thrown->getFile(), HasSubstr(".tmp"));
-    EXPECT_EQ("can't be looked at: Input/output error", thrown->getProblem());
+    EXPECT_EQ("cannot be examined: Input/output error", thrown->getProblem());
     checkAfterwards(deed, *project, thrown);
 }
 

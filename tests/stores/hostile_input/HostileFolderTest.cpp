@@ -123,7 +123,7 @@ protected:
         for (std::function<void()> const& call : std::vector<std::function<void()>>{
                  [&] { contentOf(*store); }, [&] { commit(*store, addFiles({u"b"})); },
                  [&] { store->tidy(); }, [&] { store->repair(); }, [&] { store->check(); },
-                 [&] { store->settle(bodyOf({"\"a\""})); }}) {
+                 [&] { store->resolve(bodyOf({"\"a\""})); }}) {
             EXPECT_THAT(errorOf(call).getFile(), HasSubstr(".projectdata"));
         }
     }
@@ -197,7 +197,7 @@ TEST_F(HostileFolder, aTextOfAnImpossibleLengthIsAnErrorAtOnce) {
     }
     Allocations const allocated;
 
-    EXPECT_THAT(errorOf([&] { contentOf(*open()); }).what(), HasSubstr("is longer than the 1 GiB"));
+    EXPECT_THAT(errorOf([&] { contentOf(*open()); }).what(), HasSubstr("is longer than 1 GiB"));
 
     EXPECT_LT(allocated.peak(), 1024U * 1024);
     expectRefused();

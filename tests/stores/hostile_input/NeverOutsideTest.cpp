@@ -121,7 +121,7 @@ TEST_F(NeverOutside, whenADamagedOneIsRepaired) {
 
 TEST_F(NeverOutside, whenAConflictIsSettled) {
     write("<<<<<<< ../../ours\n" + linesThatLeadOutside + "=======\n\"../b\"\n>>>>>>> /theirs\n");
-    expectInside([this] { open()->settle(bodyOf({"\"../a\""})); });
+    expectInside([this] { open()->resolve(bodyOf({"\"../a\""})); });
 }
 
 TEST_F(NeverOutside, whenAStoreIsMadeAndTakenBack) {

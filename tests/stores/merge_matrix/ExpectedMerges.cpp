@@ -89,7 +89,7 @@ std::string sortedTold(metadata::MetadataNode const& node) {
 void collect(ProjectText const& text, Address const& parent, std::string& content) {
     for (auto const& child : text.children(parent)) {
         Address const address = parent.child(child.element);
-        if (child.node || child.made) {
+        if (child.node || child.isCreated) {
             content += stores::AddressText(address).view().text;
             content += ": " + (child.node ? sortedTold(*child.node) : "made") + '\n';
         }

@@ -44,7 +44,7 @@ public:
         auto const merge = mergeAgain(project.root());
         auto const choices = choose(merge.conflicts());
         project.shield().raise();
-        project.text().settle(merge.text(choices));
+        project.text().resolve(merge.text(choices));
         tellGit(project.root());
         output().say("The project's text is whole again.");
         return 0;

@@ -46,7 +46,7 @@ OpenProject OpenProject::ofWorkingFolder() {
 }
 
 std::string OpenProject::textFile() const {
-    return shown(root() / TextBackend::folderName / TextBackend::textName);
+    return shown(TextBackend::textPath(root()));
 }
 
 std::string OpenProject::storeFile(std::string const& name) const {

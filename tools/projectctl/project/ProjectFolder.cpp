@@ -63,7 +63,7 @@ Path findProjectRoot(Path const& folder) {
             return here;
         }
         if (trace == ProjectTrace::TextMissing) {
-            throw Failure(shown(here / TextBackend::folderName / TextBackend::textName) +
+            throw Failure(shown(TextBackend::textPath(here)) +
                           ": the project's text is missing. Bring it back, for instance from source control; "
                           "or remove the folder it was in to start anew.");
         }

@@ -9,32 +9,33 @@ namespace project::stores {
 
 using Access = cmlink::ReentrantReadWriteLock::Access;
 
-/// Where a TreeMetadataManager keeps its tree.
+/// The storage behind a TreeMetadataManager.
 ///
 /// The order of use: enter; then load as needed, and for each batch write followed by keep or discard; then
-/// leave. enter, leave, write, keep and discard come from one thread at a time; load may come from several
-/// readers, one at a time. A batch holds only real changes and at least one.
+/// leave. enter, leave, write, keep and discard are called by one thread at a time; load may be called by
+/// several readers, one at a time. A batch contains at least one change, and only changes that have an
+/// effect.
 class PROJECT_STORES_EXPORT Backend {
 public:
     virtual ~Backend() = default;
 
-    /// At the outermost guard of the process: keeps other writers out if the access is to write, and tells
-    /// which addresses others have changed since the last time.
+    /// Called for the outermost guard of the process. Excludes other writers if the access is Write.
+    /// @return the changes of other processes since the last call.
     virtual Changes enter(Access access) = 0;
 
     virtual void leave() noexcept = 0;
 
-    /// What is stored directly below one address, with the batch that was written and not yet kept in it.
-    /// Empty for an address that does not exist.
+    /// The addresses directly below one address. A batch that was written and not yet kept is included.
+    /// @return nothing for an address that does not exist.
     virtual Children load(Address const& parent) = 0;
 
-    /// Prepares a batch. The files that it brings into being are there when this returns.
+    /// Prepares a batch. The files that it creates exist when this returns.
     virtual FileChanges write(Batch const& batch) = 0;
 
-    /// After the listeners: the batch stands, durable, seen by others.
+    /// Commits the batch after the listeners were notified: it is durable and visible to others.
     virtual void keep() = 0;
 
-    /// A listener threw, or write or keep failed: all is as it was before the batch.
+    /// Rolls the batch back after a listener threw, or after write or keep failed.
     virtual void discard() noexcept = 0;
 };
 

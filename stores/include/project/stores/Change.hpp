@@ -12,9 +12,9 @@ using fl::filesystem::Path;
 /// One step of a batch. The steps of a batch are applied in order.
 struct Change {
     enum class Kind {
-        Set,    ///< the node replaces what stands at the address
-        Remove, ///< the address goes with everything below it
-        Make,   ///< the address comes into being without a node; given only where nothing exists
+        Set,    ///< stores the node at the address, in place of an earlier one
+        Remove, ///< deletes the address and everything below it
+        Create, ///< creates the address without a node; only for an address that does not exist
     };
 
     Kind kind;
@@ -24,20 +24,21 @@ struct Change {
 
 using Batch = std::vector<Change>;
 
-/// What others have changed at one address: a node came, went or became another, or the address was made.
+/// A change of another process at one address: a node was added, deleted or replaced, or the address was
+/// created.
 struct Difference {
     Address address;
-    Node before; ///< null where none was stored
-    Node after;  ///< null where none is stored
+    Node before; ///< null if none was stored
+    Node after;  ///< null if none is stored
 };
 
-/// What others have changed since the last look.
+/// The changes of other processes since the last check for changes.
 struct Changes {
-    bool everything = false; ///< nothing is known of what was there before: forget all that was loaded
+    bool everything = false; ///< the earlier content is unknown: discard everything that was loaded
     std::vector<Difference> differences;
 };
 
-/// The files on disk that came into being or went with a batch, absolute.
+/// The files that a batch created or deleted on disk, as absolute paths.
 struct FileChanges {
     std::vector<Path> added;
     std::vector<Path> removed;

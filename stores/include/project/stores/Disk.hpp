@@ -11,15 +11,15 @@
 
 namespace project::stores {
 
-/// What tells one state of a file from another without reading it.
+/// The properties that distinguish one state of a file from another without reading the file.
 struct FileIdentity {
     std::uint64_t device = 0;
     std::uint64_t inode = 0;
     std::uint64_t size = 0;
     std::int64_t modified = 0; ///< nanoseconds since 1970
     std::int64_t changed = 0;  ///< nanoseconds since 1970
-    bool isRegular = true;     ///< false for what is never opened: links, pipes, folders
-    bool isShared = false;     ///< it has more names than one, perhaps in other projects
+    bool isRegular = true;     ///< false for links, pipes and folders, which are never opened
+    bool isShared = false;     ///< it has more than one name, perhaps in other projects
 
     friend bool operator==(FileIdentity const&, FileIdentity const&) = default;
 
@@ -27,101 +27,101 @@ struct FileIdentity {
         return device == other.device && inode == other.inode;
     }
 
-    /// True for the same state under perhaps another name: giving a file a name changes the time `changed`.
+    /// True for the same state, perhaps under another name: renaming a file changes the time `changed`.
     bool isSameState(FileIdentity const& other) const noexcept {
         return isSameFile(other) && size == other.size && modified == other.modified;
     }
 };
 
-/// What was read of a file.
+/// The bytes that were read from a file.
 struct FileContent {
     std::string bytes;
-    FileIdentity identity; ///< from before the reading, so that what changed meanwhile shows at the next look
+    FileIdentity identity; ///< from before the read, so that the next check finds a change during the read
 };
 
-/// A file as the disk left it after writing.
+/// The state of a file after the disk wrote it.
 struct WrittenFile {
     FileIdentity identity;
-    bool isStamped; ///< its time is one that no other write gives it, so that any other write shows
+    bool isStamped; ///< its time is one that no other write produces, so that any other write is detected
 };
 
-/// The store's folder on disk, and all that a text backend does there.
+/// The store's folder on disk, with the operations that a text backend needs.
 ///
-/// Names are plain file names in that folder. Nothing follows a symbolic link, opens anything but a regular
-/// file, or reaches outside the folder. No file longer than longestFile is read or written: what claims to be
-/// longer would take more memory than there is. Every operation but those on the path and the clock needs the
-/// folder open. All throw StoreError, naming the file, when the system fails them; results tell what is no
-/// failure. One thread at a time.
+/// Names are plain file names in that folder. No operation follows a symbolic link, opens anything but a
+/// regular file, or accesses anything outside the folder. No file longer than longestFile is read or written,
+/// since it would need more memory than there is. All operations except those on the path and the clock
+/// require the folder to be open. All throw StoreError, naming the file, when a system call fails. One thread
+/// at a time.
 class PROJECT_STORES_EXPORT Disk {
 public:
-    /// Some ten million files with labels. A sparse file takes no room on disk, whatever length it has.
+    /// Enough for some ten million files with labels. A limit is necessary because a sparse file of any
+    /// length takes no space on disk.
     static constexpr std::uint64_t longestFile = std::uint64_t{1} << 30;
 
     virtual ~Disk() = default;
 
-    /// The folder's path, absolute, as the system has it.
+    /// The folder's path, absolute, in the bytes of the system.
     virtual std::string folder() const = 0;
 
-    /// Opens the folder that the path from the project's root leads to now, unless it is the one already
-    /// open. Opening another one lets the lock go. @return false when nothing is there. Throws when it is no
-    /// folder or cannot be opened.
+    /// Opens the folder that the path from the project's root leads to now, unless it is already open.
+    /// Opening another folder releases the lock. @return false if there is nothing at the path. Throws if it
+    /// is not a folder or cannot be opened.
     virtual bool openFolder() = 0;
 
-    /// Makes the folder unless it is there, makes its entry in the root durable, and opens it unless it is
-    /// the one already open. @return false when it was there.
+    /// Creates the folder if it does not exist, makes its name in the root durable, and opens it unless it is
+    /// already open. @return false if it existed.
     virtual bool makeFolder() = 0;
 
-    /// Removes the folder if it is empty, and closes it, which lets the lock go. Never throws: what cannot
-    /// be removed stays.
+    /// Deletes the folder if it is empty, and closes it, which releases the lock. Never throws: a folder that
+    /// cannot be deleted stays.
     virtual void removeFolder() noexcept = 0;
 
-    /// True when the path from the project's root still leads to the open folder.
+    /// True if the path from the project's root still leads to the open folder.
     virtual bool isFolderInPlace() = 0;
 
-    /// Keeps other writers out, waiting for them. @return false when the time ran out.
+    /// Excludes other writers; waits for the current one. @return false when the time has run out.
     virtual bool lock(std::chrono::milliseconds patience) = 0;
     virtual void unlock() noexcept = 0;
 
-    /// Who holds the lock, for a message: a process number and its command as far as they can be had, or
-    /// an empty text.
+    /// The lock holder, for a message: its process number and command as far as they can be found out, or an
+    /// empty text.
     virtual std::string lockHolder() = 0;
 
-    /// The state of the file that the path from the project's root leads to now, whatever folder is open:
-    /// one system call. Empty when nothing is there.
+    /// The state of the file that the path from the project's root leads to now, whichever folder is open:
+    /// one system call. Empty if there is no file.
     virtual std::optional<FileIdentity> identifyByPath(std::string const& name) = 0;
 
-    /// The state of a file in the open folder. Empty when it is not there.
+    /// The state of a file in the open folder. Empty if there is no file.
     virtual std::optional<FileIdentity> identify(std::string const& name) = 0;
 
-    /// Everything in a file from an offset on. Empty when it is not there.
+    /// The bytes of a file from an offset to the end. Empty if there is no file.
     virtual std::optional<FileContent> read(std::string const& name, std::uint64_t offset) = 0;
 
-    /// Appends to a file that must still be in the state given, in one write, and stamps it. Not durable
-    /// before sync. When it throws, a part of the bytes may stand in the file, but never all of them.
-    /// @return the state afterwards; empty, with nothing written, when the file is in another state.
+    /// Appends to a file in one write and stamps it, if the file is still in the state given. Durable after
+    /// sync. If it throws, some of the bytes may be in the file, but never all of them.
+    /// @return the state afterwards; empty, with nothing written, if the file is in another state.
     virtual std::optional<WrittenFile> append(std::string const& name, FileIdentity const& expected,
                                               std::string_view bytes) = 0;
 
-    /// Makes a new file with this content, stamped, with mode and owner of the file named like, if any. Not
-    /// durable before sync. Throws when the name is taken; what a failure leaves of it is removed again.
+    /// Creates a file with this content and stamps it. It gets the mode and the owner of the file named like,
+    /// if that is given. Durable after sync. Throws if the name is taken; after a failure there is no file.
     virtual WrittenFile create(std::string const& name, std::string_view bytes,
                                std::optional<std::string> const& like) = 0;
 
-    /// Makes durable what append or create last wrote, through the same open file, whatever its name leads
-    /// to by now.
+    /// Makes the bytes of the last append or create durable, through the same open file, whatever its name
+    /// leads to by now.
     virtual void sync() = 0;
 
-    /// Puts the files of two names in each other's place, at once. @return false when the file system
-    /// cannot do that.
+    /// Exchanges the files of two names in one step. @return false if the file system cannot do that.
     virtual bool exchange(std::string const& left, std::string const& right) = 0;
 
-    /// Gives a file another name, replacing what has it.
+    /// Renames a file; replaces a file that has the new name.
     virtual void rename(std::string const& from, std::string const& to) = 0;
 
-    /// Gives whatever has a name another one. @return false, with nothing changed, when that one is taken.
+    /// Renames a file. @return false, with nothing changed, if the new name is taken.
     virtual bool renameToFree(std::string const& from, std::string const& to) = 0;
 
-    /// Removes a file. @return false when it is not there.
+    /// Deletes a file. @return false if there is no file.
     virtual bool remove(std::string const& name) = 0;
 
     /// Makes the names in the folder durable.
@@ -130,10 +130,10 @@ public:
     /// The names in the folder, in no order.
     virtual std::vector<std::string> list() = 0;
 
-    /// The time by which the file system stamps files, in nanoseconds since 1970.
+    /// The clock by which the file system stamps files, in nanoseconds since 1970.
     virtual std::int64_t now() = 0;
 
-    /// Waits a moment for others.
+    /// Sleeps, so that another program can finish its write.
     virtual void pause(std::chrono::milliseconds time) = 0;
 };
 

@@ -5,18 +5,18 @@
 
 namespace project::stores {
 
-/// Something in a project's text that is not as it should be.
+/// A deviation from the canonical form that was found in a project's text, or beside it.
 struct Fault {
     enum class Kind {
-        Damage,    ///< a line or a batch that cannot be read; writes are refused until it is mended
-        Conflict,  ///< markers that a merge left; writes are refused until it is resolved
-        Irregular, ///< readable all the same, and put right by the next write: order, doubled addresses
-        TornTail,  ///< what a writer that died left behind; it does not count, and the next write drops it
-        Displaced, ///< a file beside the text that somebody else put where the store needed room
+        Damage,    ///< a line or a batch is unreadable; writes are refused until it is repaired
+        Conflict,  ///< conflict markers; writes are refused until the conflict is resolved
+        Irregular, ///< readable but not canonical, for example unsorted; the next rewrite corrects it
+        TornTail,  ///< the torn write of a writer that died; it is ignored, and the next batch drops it
+        Displaced, ///< a file beside the text that another program created and the store set aside
     };
 
     Kind kind;
-    std::size_t line;    ///< counted from 1; 0 where no line is meant
+    std::size_t line;    ///< counted from 1; 0 if the fault has no line
     std::string problem; ///< a clause in UTF-8
 };
 

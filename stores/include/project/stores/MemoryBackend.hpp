@@ -4,8 +4,8 @@
 
 namespace project::stores {
 
-/// Keeps nothing beyond the process: the tree of the TreeMetadataManager is all there is. For tests and for
-/// projects that are never saved.
+/// Stores nothing: the definition exists only in the tree of the TreeMetadataManager and ends with the
+/// process. For tests and for projects that are never saved.
 class PROJECT_STORES_EXPORT MemoryBackend : public Backend {
 public:
     Changes enter(Access access) override;

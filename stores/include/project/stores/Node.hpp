@@ -21,13 +21,13 @@ PROJECT_STORES_EXPORT Node const& plainNode();
 /// One address directly below another.
 struct Child {
     metadata::PathElement element;
-    Node node;        ///< null when none is stored there
-    bool made;        ///< there is no node, and the address stays also when nothing lies below it
-    bool hasChildren; ///< something is stored below; when false, nothing is
+    Node node;        ///< null if no node is stored there
+    bool isCreated;   ///< there is no node, and the address exists even if nothing is stored below it
+    bool hasChildren; ///< something is stored below it
 };
 
-/// What lies directly below one address, sorted by element, each element once. Every child has a node, was
-/// made, or has children.
+/// The addresses directly below one address, sorted by element, each element once. Every child has a node, is
+/// created, or has children.
 using Children = std::vector<Child>;
 
 } // namespace project::stores

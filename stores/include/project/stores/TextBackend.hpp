@@ -18,14 +18,14 @@ namespace project::stores {
 class PROJECT_STORES_EXPORT TextBackend : public Backend {
 public:
     struct Options {
-        /// How long to wait for another writer, and for a text that is being written in pieces.
+        /// How long to wait for another writer, and for a text that is incomplete.
         std::chrono::milliseconds patience = std::chrono::seconds(10);
 
-        /// A text whose body is not longer than this many bytes is written anew by every batch. Rewriting
-        /// that much costs little more than appending to it.
+        /// A text whose body has at most this many bytes is rewritten by every batch. Rewriting so little
+        /// costs hardly more than appending to it.
         std::size_t alwaysRewritten = std::size_t{256} * 1024;
 
-        /// Batches are appended as long as all of them together are not longer than the body divided by this.
+        /// Batches are appended as long as the tail is at most the length of the body divided by this.
         std::size_t bodyToTail = 16;
     };
 
@@ -35,10 +35,13 @@ public:
     /// The name of the text in that folder, "project.jsonl".
     static char16_t const* const textName;
 
+    /// The path of the text of the project with this root.
+    static Path textPath(Path const& projectRoot);
+
     /// @param disk the store's folder.
     explicit TextBackend(std::unique_ptr<Disk> disk);
     TextBackend(std::unique_ptr<Disk> disk, Options options);
-    /// Tidies, if this object has written and nobody else is writing.
+    /// Tidies the text if this object has written and no other process is writing.
     ~TextBackend() override;
 
     Changes enter(Access access) override;
@@ -48,24 +51,25 @@ public:
     void keep() override;
     void discard() noexcept override;
 
-    /// Writes the body anew without a tail, in canonical form. Without effect when the text is so already.
-    /// To be called with no guard open; waits for other writers.
+    /// Rewrites the text as a canonical body without a tail, unless it is that already. To be called with no
+    /// guard open; waits for other writers.
     /// @return true if the text was written.
-    /// @throws StoreError when the text is damaged, or a merge left its markers.
+    /// @throws StoreError if the text is damaged or contains conflict markers.
     bool tidy();
 
-    /// Sets damaged lines and batches aside into a file of their own in the store's folder, and writes the
-    /// text anew from all that can be read. To be called with no guard open.
-    /// @return the name of that file; empty when nothing is damaged.
-    /// @throws StoreError when a merge left its markers: those are for a person to settle.
+    /// Sets damaged lines and batches aside in a new file in the store's folder, and rewrites the text from
+    /// everything that is readable. To be called with no guard open.
+    /// @return the name of the new file; empty if nothing is damaged.
+    /// @throws StoreError if the text contains conflict markers, since only a person can resolve them.
     std::string repair();
 
-    /// Puts a text in the place of one in which a merge left its markers, where all is settled that they
-    /// stand for. To be called with no guard open; waits for other writers.
-    /// @param settled a whole text; it is written in canonical form.
-    /// @throws StoreError when it is not whole, is damaged or has markers itself, or when the text on disk
-    ///         has none.
-    void settle(std::string settled);
+    /// Replaces a text that contains conflict markers by one in which the conflicts are resolved. To be
+    /// called with no guard open; waits for other writers.
+    /// @param resolved a complete text; it is written in canonical form.
+    /// @throws StoreError if the new text is incomplete, damaged or contains conflict markers itself, or if
+    /// the
+    ///         text on disk contains none.
+    void resolve(std::string resolved);
 
     /// All faults of the text as it is on disk now, by line. To be called with no guard open. Takes no lock.
     std::vector<Fault> check();

@@ -9,15 +9,16 @@
 
 namespace project::stores {
 
-/// The metadata store of the library: a tree in memory, loaded level by level from a backend as it is asked
-/// for, and written through to it.
+/// The metadata store of the library: a tree in memory, which is loaded level by level from a backend on
+/// request and written through to it.
 ///
-/// A write goes in this order: nodes equal to what is stored are left out; the backend writes; the tree
-/// changes; the listeners are told; the backend keeps. When anything of it throws, the backend discards, the
-/// tree is as it was, listeners already told are told of the reverse, and the exception goes on.
+/// A write has these steps: nodes that are equal to the stored ones are left out; the backend writes; the
+/// tree changes; the listeners are notified; the backend keeps. If a step throws, the backend discards, the
+/// tree returns to its previous state, listeners that were already notified are notified of the reverse, and
+/// the exception propagates to the caller.
 class PROJECT_STORES_EXPORT TreeMetadataManager : public metadata::MetadataManager {
 public:
-    /// @param metadataRoot the folder in which the backend keeps its files, absolute; nothing is read here.
+    /// @param metadataRoot the folder with the backend's files, absolute; nothing is read here.
     TreeMetadataManager(std::unique_ptr<Backend> backend, Path metadataRoot);
     ~TreeMetadataManager() override;
 
@@ -33,12 +34,12 @@ public:
     void createPaths(std::vector<metadata::MetadataPath>& paths) override;
     bool pathExists(metadata::MetadataPath path) override;
 
-    /// What others have changed in the store since the last call, or for the first call since the first
-    /// guard: one difference for each address, sorted, from before the first change of it to after the last.
-    /// What came back to what it was is left out.
+    /// The changes of other processes since the last call, or since the first guard if this is the first
+    /// call: one difference for each address, sorted, from before its first change to after its last. An
+    /// address that is as it was before is left out.
     ///
-    /// Takes the read lock, and so looks for changes unless a guard is open. Between two calls each address
-    /// that others have changed is kept, with both nodes.
+    /// Takes the read lock, and therefore checks for changes unless a guard is open. Between two calls, both
+    /// nodes of each address that others have changed stay in memory.
     Changes takeOthersChanges();
 
 private:
