@@ -5,6 +5,11 @@ add_library(project_build_options INTERFACE)
 target_compile_features(project_build_options INTERFACE cxx_std_20)
 target_compile_options(project_build_options INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
 
+# In a unity build GCC takes each included source for a header, and warns of types in its unnamed namespace.
+if(CMAKE_UNITY_BUILD AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+  target_compile_options(project_build_options INTERFACE -Wno-subobject-linkage)
+endif()
+
 find_package(Threads REQUIRED)
 
 # project_add_layer(<name> DEPENDS <targets>...)

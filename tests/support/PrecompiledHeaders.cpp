@@ -1,0 +1,1 @@
+// Carries the precompiled headers that all test programs share.
