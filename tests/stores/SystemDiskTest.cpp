@@ -321,6 +321,20 @@ TEST_F(SystemDisk, aFileBeyondTheLimitIsAnErrorAndNotTheEndOfTheProcess) {
     EXPECT_EQ(0, sigismember(&pending, SIGXFSZ));
 }
 
+TEST_F(SystemDisk, noFileIsWrittenBeyondTheLengthThatIsReadAgain) {
+    auto const disk = openDisk();
+    disk->create("a", "x", std::nullopt);
+    std::filesystem::resize_file(at("a"), stores::Disk::longestFile - 1);
+    auto const written = disk->append("a", *disk->identify("a"), "y");
+    ASSERT_TRUE(written);
+    EXPECT_EQ(stores::Disk::longestFile, written->identity.size);
+
+    auto const error = errorOf([&] { disk->append("a", written->identity, "z"); });
+
+    EXPECT_EQ(StoreError::Kind::Refused, error.kind());
+    EXPECT_EQ(stores::Disk::longestFile, disk->identify("a")->size);
+}
+
 TEST_F(SystemDisk, aFullFileSystemIsAnErrorThatSaysWhatToDo) {
     std::filesystem::path const full = "/dev/full";
     if (!std::filesystem::exists(full)) {

@@ -165,7 +165,7 @@ struct BadText {
     char const* name;
     std::string text;
     std::size_t line;
-    std::string problem;
+    StoreError::Kind kind;
 
     friend void PrintTo(BadText const& bad, std::ostream* out) { *out << bad.name; }
 };
@@ -178,7 +178,7 @@ TEST_P(TextMergeRefusal, namesTheVersionAndTheLine) {
     auto const expect = [](StoreError const& error, std::string const& version) {
         EXPECT_EQ(error.getFile(), version);
         EXPECT_EQ(error.getLine(), GetParam().line);
-        EXPECT_NE(error.getProblem().find(GetParam().problem), std::string::npos) << error.what();
+        EXPECT_EQ(error.kind(), GetParam().kind) << error.what();
     };
     expect(test::errorOf([&] { mergeTexts(bad, good, good); }), "base");
     expect(test::errorOf([&] { mergeTexts(good, bad, good); }), "ours");
@@ -188,13 +188,15 @@ TEST_P(TextMergeRefusal, namesTheVersionAndTheLine) {
 INSTANTIATE_TEST_SUITE_P(
     Texts, TextMergeRefusal,
     ::testing::Values(
-        BadText{"noJson", bodyOf({R"("a")", "nonsense"}), 3, "damaged"},
-        BadText{"unknownMember", bodyOf({R"({"file":"a","color":"red"})"}), 2, "damaged"},
-        BadText{"markers", bodyOf({R"("a")", "<<<<<<< ours", "=======", ">>>>>>> theirs"}), 3, "markers"},
-        BadText{"brokenLine", std::string(firstLine) + "\n\"a", 2, "ends before"},
-        BadText{"noLastLine", std::string(firstLine) + "\n\"a\"\n", 2, "ends before"},
-        BadText{"laterVersion", "{\"format\":\"project-definition\",\"version\":2}\n", 1, "version 2"},
-        BadText{"somethingElse", "\n\n", 1, "not a project definition"}));
+        BadText{"noJson", bodyOf({R"("a")", "nonsense"}), 3, StoreError::Kind::Damaged},
+        BadText{"unknownMember", bodyOf({R"({"file":"a","color":"red"})"}), 2, StoreError::Kind::Damaged},
+        BadText{"markers", bodyOf({R"("a")", "<<<<<<< ours", "=======", ">>>>>>> theirs"}), 3,
+                StoreError::Kind::Conflict},
+        BadText{"brokenLine", std::string(firstLine) + "\n\"a", 2, StoreError::Kind::Damaged},
+        BadText{"noLastLine", std::string(firstLine) + "\n\"a\"\n", 2, StoreError::Kind::Damaged},
+        BadText{"laterVersion", "{\"format\":\"project-definition\",\"version\":2}\n", 1,
+                StoreError::Kind::Refused},
+        BadText{"somethingElse", "\n\n", 1, StoreError::Kind::Damaged}));
 
 TEST(TextMergeInput, anEmptyTextIsNoVersionOfAProject) {
     std::string const good = bodyOf({R"("a")"});
@@ -207,6 +209,7 @@ TEST(TextMergeInput, aDamagedTailIsRefused) {
     std::string tail = text.tailFor({set(fileAddress(u"b"))}) + text.tailFor({set(fileAddress(u"c"))});
     tail[1] = 'x';
     StoreError const error = test::errorOf([&] { mergeTexts("", text.body() + tail, text.body()); });
+    EXPECT_EQ(error.kind(), StoreError::Kind::Damaged);
     EXPECT_EQ(error.getLine(), 5U);
 }
 
