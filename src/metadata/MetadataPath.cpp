@@ -10,7 +10,7 @@ namespace project::metadata {
 
 using Elements = std::vector<PathElement>;
 
-/// One step with all those above it, shared by every address that goes through it.
+/// A step and a pointer to the step above it, shared by all addresses that contain both.
 struct MetadataPath::Step {
     Step(std::shared_ptr<Step const> above, PathElement last)
         : parent(std::move(above)), element(std::move(last)), depth(parent ? parent->depth + 1 : 1) {}
@@ -18,8 +18,8 @@ struct MetadataPath::Step {
     Step(Step const&) = delete;
     Step& operator=(Step const&) = delete;
 
-    /// Releases the steps above in a loop: left to the pointers, a very long address would need as deep a
-    /// stack.
+    /// Releases the steps above in a loop. Recursion through the pointers would overflow the stack for a very
+    /// long address.
     ~Step() {
         delete list.load(std::memory_order_relaxed);
         auto above = std::move(parent);
@@ -48,9 +48,9 @@ template <typename Step>
 std::strong_ordering compareSteps(Step const* left, Step const* right) noexcept {
     std::strong_ordering order = std::strong_ordering::equal;
     while (left != right) {
-        auto const here = compareElements(left->element, right->element);
+        std::strong_ordering const here = compareElements(left->element, right->element);
         if (std::is_neq(here)) {
-            order = here; // a difference nearer to the root decides, so later ones of this loop win
+            order = here; // the difference nearest to the root decides, and this loop ends at the root
         }
         left = left->parent.get();
         right = right->parent.get();
@@ -74,7 +74,7 @@ MetadataPath::MetadataPath(std::vector<PathElement> elements) {
     }
 }
 
-MetadataPath::MetadataPath(std::shared_ptr<Step const> step) noexcept : step_(std::move(step)) {
+MetadataPath::MetadataPath(SharedSteps, std::shared_ptr<Step const> last) noexcept : step_(std::move(last)) {
 }
 
 MetadataPath::~MetadataPath() = default;
@@ -87,15 +87,15 @@ std::vector<PathElement> const& MetadataPath::getPath() const {
     if (auto const* list = step_->list.load(std::memory_order_acquire)) {
         return *list;
     }
-    auto made = std::make_unique<Elements>();
-    made->reserve(step_->depth);
+    auto created = std::make_unique<Elements>();
+    created->reserve(step_->depth);
     for (auto const* step = step_.get(); step != nullptr; step = step->parent.get()) {
-        made->push_back(step->element);
+        created->push_back(step->element);
     }
-    std::reverse(made->begin(), made->end());
+    std::reverse(created->begin(), created->end());
     Elements const* expected = nullptr;
-    if (step_->list.compare_exchange_strong(expected, made.get(), std::memory_order_acq_rel)) {
-        return *made.release();
+    if (step_->list.compare_exchange_strong(expected, created.get(), std::memory_order_acq_rel)) {
+        return *created.release();
     }
     return *expected; // another thread was first
 }
@@ -117,11 +117,11 @@ std::size_t MetadataPath::depth() const noexcept {
 }
 
 MetadataPath MetadataPath::parent() const {
-    return step_ ? MetadataPath(step_->parent) : *this;
+    return step_ ? MetadataPath(SharedSteps(), step_->parent) : *this;
 }
 
 MetadataPath MetadataPath::child(PathElement element) const {
-    return MetadataPath(std::make_shared<Step const>(step_, std::move(element)));
+    return MetadataPath(SharedSteps(), std::make_shared<Step const>(step_, std::move(element)));
 }
 
 bool MetadataPath::isWithin(MetadataPath const& other) const noexcept {
@@ -130,8 +130,9 @@ bool MetadataPath::isWithin(MetadataPath const& other) const noexcept {
 }
 
 std::strong_ordering compare(MetadataPath const& left, MetadataPath const& right) noexcept {
-    auto const depth = std::min(left.depth(), right.depth());
-    auto const order = compareSteps(ascend(left.step_.get(), depth), ascend(right.step_.get(), depth));
+    std::size_t const depth = std::min(left.depth(), right.depth());
+    std::strong_ordering const order =
+        compareSteps(ascend(left.step_.get(), depth), ascend(right.step_.get(), depth));
     return std::is_neq(order) ? order : left.depth() <=> right.depth();
 }
 

@@ -13,14 +13,15 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-TEST(MetadataPath, noElementsGiveTheRoot) {
+TEST(MetadataPath, noElementsAreTheRoot) {
     EXPECT_THAT(MetadataPath(std::vector<PathElement>()).getPath(), IsEmpty());
     EXPECT_EQ(MetadataPath(std::vector<PathElement>()), MetadataPath::root());
+    EXPECT_EQ(MetadataPath({}), MetadataPath::root());
     EXPECT_EQ(MetadataPath::root().getLeaf(), PathElement(u"", u""));
     EXPECT_EQ(MetadataPath::root().parent(), MetadataPath::root());
 }
 
-TEST(MetadataPath, elementsAreGivenFromTheRootDown) {
+TEST(MetadataPath, elementsAreListedFromTheRootDown) {
     MetadataPath const path({PathElement(u"a", u"1"), PathElement(u"b", u"2")});
     EXPECT_THAT(path.getPath(), ElementsAre(PathElement(u"a", u"1"), PathElement(u"b", u"2")));
     EXPECT_EQ(path.getLeaf(), PathElement(u"b", u"2"));
@@ -60,7 +61,7 @@ TEST(MetadataPath, anAddressOfAnyLengthIsDestroyedWithoutADeepStack) {
     EXPECT_EQ(path.depth(), 1'000'000U);
 }
 
-RC_GTEST_PROP(MetadataPath, isOrderedAsItsListOfElementsIs, ()) {
+RC_GTEST_PROP(MetadataPath, isOrderedLikeItsListOfElements, ()) {
     auto const element = rc::gen::construct<PathElement>(
         rc::gen::container<std::u16string>(rc::gen::element<char16_t>(u'a', u'b', u'\xD800')),
         rc::gen::container<std::u16string>(rc::gen::element<char16_t>(u'a', u'\xFFFF')));

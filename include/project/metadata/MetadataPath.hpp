@@ -10,18 +10,19 @@
 
 namespace project::metadata {
 
-/// An address in the metadata tree: the steps from the tree's root down to one place.
+/// An address in the metadata tree: the steps from the tree's root down to one position.
 ///
-/// An immutable value. Addresses share the steps that they have in common, so that a copy costs one counter
-/// and a child one allocation; comparing stops where two addresses share their steps. Values may be read
-/// from several threads at once.
+/// An immutable value. Addresses share common steps: a copy increments one counter, a child is one
+/// allocation, and a comparison stops at the first shared step. Several threads may read one value at the
+/// same time.
 class PROJECT_METADATA_EXPORT MetadataPath {
 public:
-    /// The address with these steps, from the root down. No steps give the address of the root.
+    /// The address with these steps, from the root down. An empty list, also as MetadataPath({}), is the
+    /// root's address.
     MetadataPath(std::vector<PathElement> elements);
 
-    /// The address of the tree's root.
-    static MetadataPath root() noexcept { return MetadataPath(std::shared_ptr<Step const>()); }
+    /// Returns the address of the tree's root.
+    static MetadataPath root() noexcept { return MetadataPath(SharedSteps(), nullptr); }
 
     MetadataPath(MetadataPath const&) = default;
     MetadataPath& operator=(MetadataPath const&) = default;
@@ -29,40 +30,43 @@ public:
     MetadataPath& operator=(MetadataPath&&) noexcept = default;
     ~MetadataPath();
 
-    /// The steps from the root down. The list is made at the first call and lives as long as any address
-    /// that shares its last step; two threads may ask at once.
+    /// Returns the steps from the root down. The list is created at the first call and is valid as long as
+    /// any address that shares its last step exists. Two threads may call this at the same time.
     std::vector<PathElement> const& getPath() const;
 
-    /// The last step; one with an empty type and location for the root.
+    /// Returns a copy of the last step; for the root, a step with an empty type and location.
     PathElement getLeaf() const;
 
-    /// The last step, without a copy. The address must not be the root's.
+    /// Returns the last step without a copy. The address must not be the root's.
     PathElement const& leaf() const noexcept;
 
-    /// The step at an index counted from the root, without a copy. The index must be below depth(); costs a
-    /// pointer for each step behind it.
+    /// Returns the step at an index, counted from the root, without a copy. The index must be less than
+    /// depth(). The cost is one pointer for each step after it.
     PathElement const& operator[](std::size_t index) const noexcept;
 
-    /// How many steps there are; 0 for the root.
+    /// Returns the number of steps; 0 for the root.
     std::size_t depth() const noexcept;
 
-    /// The address without its last step; the root's for the root.
+    /// Returns the address without its last step. The parent of the root is the root.
     MetadataPath parent() const;
 
-    /// The address one step further down.
+    /// Returns the address one step below.
     MetadataPath child(PathElement element) const;
 
-    /// True when this address is the other one or lies below it.
+    /// Returns true if this address is the other one or below it.
     bool isWithin(MetadataPath const& other) const noexcept;
 
-    /// Compares step by step from the root, so that an address comes right before all that lies below it.
+    /// Compares step by step from the root: an address directly precedes the addresses below it.
     PROJECT_METADATA_EXPORT friend std::strong_ordering compare(MetadataPath const& left,
                                                                 MetadataPath const& right) noexcept;
 
 private:
     struct Step;
 
-    explicit MetadataPath(std::shared_ptr<Step const> step) noexcept;
+    /// Selects the constructor below. With a pointer alone, MetadataPath({}) would be ambiguous.
+    struct SharedSteps {};
+
+    MetadataPath(SharedSteps, std::shared_ptr<Step const> last) noexcept;
 
     std::shared_ptr<Step const> step_;
 };
