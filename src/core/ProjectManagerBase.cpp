@@ -8,8 +8,7 @@
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/MetadataPathBuilder.hpp"
 #include "project/metadata/TreeSchema.hpp"
-#include "references/ProjectPathManagerBase.hpp"
-#include "references/ProjectReferenceManagerBase.hpp"
+#include "references/ReferenceLists.hpp"
 
 namespace project::management {
 

@@ -20,10 +20,12 @@ using ZEPHRA::project::management::FileNotInProject;
 
 namespace {
 
-/// How many elements the address of the root has.
+/// The number of steps of the address of the root folder.
 constexpr std::size_t headDepth = 1;
 
 } // namespace
+
+FileMetadataManager::~FileMetadataManager() = default;
 
 PathLocalizedFileMetadataManager::PathLocalizedFileMetadataManager(
     Path root, std::shared_ptr<metadata::MetadataManager> metadataManager, std::u16string scope)
@@ -42,13 +44,13 @@ void PathLocalizedFileMetadataManager::setFileNodes(std::map<Path, std::shared_p
 std::map<Path, std::unique_ptr<MetadataNode>> PathLocalizedFileMetadataManager::getAllFileNodes() {
     auto const guard = metadataManager_->acquireReadLock();
     std::map<Path, std::unique_ptr<MetadataNode>> result;
-    auto const head = toMetadataPath(root_);
+    MetadataPath const head = toMetadataPath(root_);
     if (!metadataManager_->pathExists(head)) {
         return result;
     }
     std::vector<MetadataPath> waiting{head};
     while (!waiting.empty()) {
-        auto const path = std::move(waiting.back());
+        MetadataPath const path = std::move(waiting.back());
         waiting.pop_back();
         for (auto& child : metadataManager_->getChildNodes(path)) {
             waiting.push_back(std::move(child));
@@ -62,7 +64,7 @@ std::map<Path, std::unique_ptr<MetadataNode>> PathLocalizedFileMetadataManager::
 
 std::unique_ptr<MetadataNode> PathLocalizedFileMetadataManager::getFileNode(Path file) {
     auto const guard = metadataManager_->acquireReadLock();
-    auto const path = toMetadataPath(file);
+    MetadataPath const path = toMetadataPath(file);
     if (!metadataManager_->hasNode(path)) {
         exception::raise(FileNotInProject(file.native()));
     }
@@ -102,27 +104,27 @@ std::vector<Path> PathLocalizedFileMetadataManager::getChildFiles(Path file) {
 }
 
 MetadataPath PathLocalizedFileMetadataManager::toMetadataPath(Path const& file) const {
-    auto result = MetadataPath::root().child(PathElement(schema::files::filesType, scope_));
+    MetadataPath result = MetadataPath::root().child(PathElement(schema::files::filesType, scope_));
     if (file == root_) {
         return result;
     }
-    auto const relative = metadata::getRelativePath(root_, file);
+    std::u16string const relative = metadata::getRelativePath(root_, file);
     for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
-        auto const element = fl::filesystem::detail::extract_first_element(rest);
+        std::u16string_view const element = fl::filesystem::detail::extract_first_element(rest);
         result = result.child(PathElement(schema::files::fileType, std::u16string(element)));
     }
     return result;
 }
 
 Path PathLocalizedFileMetadataManager::toFilePath(MetadataPath const& path) const {
-    auto length = root_.native().size();
-    for (auto index = headDepth; index < path.depth(); ++index) {
+    std::size_t length = root_.native().size();
+    for (std::size_t index = headDepth; index < path.depth(); ++index) {
         length += path[index].getLocation().size() + 1;
     }
     std::u16string text;
     text.reserve(length);
     text = root_.native();
-    for (auto index = headDepth; index < path.depth(); ++index) {
+    for (std::size_t index = headDepth; index < path.depth(); ++index) {
         text = fl::filesystem::detail::concatenate_pathname(std::move(text), path[index].getLocation());
     }
     return text;
@@ -133,7 +135,7 @@ bool PathLocalizedFileMetadataManager::isFileMetadataPath(MetadataPath const& pa
     if (!metadataManager_->hasNode(path)) {
         return false;
     }
-    auto const& type = path.leaf().getType();
+    std::u16string const& type = path.leaf().getType();
     return type == schema::files::filesType || type == schema::files::fileType;
 }
 
@@ -141,11 +143,12 @@ void PathLocalizedFileMetadataManager::addFileNode(
     Path const& file, std::shared_ptr<MetadataNode> node,
     std::map<MetadataPath, std::shared_ptr<MetadataNode>>& batch) {
     auto const guard = metadataManager_->acquireWriteLock();
-    auto const path = toMetadataPath(file);
-    // Files come in Path order, which is the order of their addresses, so the end is the place to try first.
+    MetadataPath const path = toMetadataPath(file);
+    // The files are in Path order, which is the order of their addresses, so the end is the best hint.
     batch.insert_or_assign(batch.end(), path, std::move(node));
     if (metadata::is_directory(file)) {
-        auto marker = path.child(PathElement(schema::files::markerType, schema::files::markerLocation));
+        MetadataPath marker =
+            path.child(PathElement(schema::files::markerType, schema::files::markerLocation));
         batch.insert_or_assign(batch.end(), std::move(marker),
                                std::make_shared<MetadataNodeSpecification>(schema::nodeType));
     }

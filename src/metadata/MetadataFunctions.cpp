@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <optional>
+#include <string>
 #include <string_view>
 #include <utility>
 
@@ -40,27 +41,27 @@ Text firstName(Text names) {
     return names.substr(0, names.find(separator));
 }
 
-/// Takes the first name off, and the separators behind it.
+/// Removes the first name and the separators after it, and returns the name.
 Text takeName(Text& names) {
-    auto const name = firstName(names);
+    Text const name = firstName(names);
     names.remove_prefix(name.size());
     dropSeparators(names);
     return name;
 }
 
-/// True for names with one separator between them and none before or behind; there is at least one name.
+/// True for one or more names with single separators between them and none at either end.
 bool isPlain(Text names) {
     return !names.empty() && names.front() != separator && names.back() != separator &&
            names.find(u"//") == Text::npos;
 }
 
-/// The target's text below the base as it stands there. Nothing when it is not below, or when runs of
-/// separators or trailing ones, in either text, want a closer look.
+/// The part of the target's text below the base. Nothing if the target is not below the base, or if repeated
+/// or trailing separators in either text need the general algorithm.
 std::optional<Text> plainTextBelow(Text base, Text target) {
     if (!target.starts_with(base)) {
         return std::nullopt;
     }
-    auto rest = target.substr(base.size());
+    Text rest = target.substr(base.size());
     if (base != u"/") {
         if (base.empty() || !rest.starts_with(separator)) {
             return std::nullopt;
@@ -70,19 +71,19 @@ std::optional<Text> plainTextBelow(Text base, Text target) {
     return isPlain(rest) ? std::optional(rest) : std::nullopt;
 }
 
-/// Drops what both texts begin with, up to their last common separator. That is most of the work, done at
-/// once; the next name may still be the same.
+/// Drops the common beginning of both texts up to its last separator, which is most of the work. The next
+/// name may still be the same in both.
 void dropCommonText(Text& left, Text& right) {
     auto const ends = std::mismatch(left.begin(), left.end(), right.begin(), right.end());
     auto const same = left.substr(0, static_cast<std::size_t>(ends.first - left.begin()));
     auto const slash = same.rfind(separator);
-    auto const length = slash == Text::npos ? 0 : slash + 1;
+    std::size_t const length = slash == Text::npos ? 0 : slash + 1;
     left.remove_prefix(length);
     right.remove_prefix(length);
 }
 
-/// Two paths without the names that both begin with and without their roots. Where only one has a root they
-/// have nothing in common, and keep all their names.
+/// Two paths without their common first names and without their roots. If only one is absolute, they have
+/// nothing in common and keep all their names.
 struct Parting {
     Parting(Text left, Text right)
         : base(left), target(right), isRootShared(isAbsolute(left) == isAbsolute(right)) {
@@ -117,7 +118,7 @@ void append(std::u16string& path, Text names) {
     path += names;
 }
 
-/// What the system tells of a path, by one of its calls; false when it tells nothing.
+/// Calls the system for a path. Returns false if the path has no name on disk or the call fails.
 bool ask(int (*call)(char const*, struct stat*), Path const& path, struct stat& answer) {
     fl::filesystem::SystemName const name(path);
     return name.get() != nullptr && call(name.get(), &answer) == 0;
@@ -148,9 +149,9 @@ std::u16string getRelativePath(Path const& base, Path const& target) {
         return std::u16string(*below);
     }
     Parting const parting(base.native(), target.native());
-    auto steps = countNames(parting.base);
+    std::size_t steps = countNames(parting.base);
     if (!parting.isRootShared) {
-        // No steps lead from one to the other. The text must still say that the target lies outside.
+        // There is no way from one to the other. The text must still say that the target is outside.
         steps = std::max<std::size_t>(1, steps + (isAbsolute(base.native()) ? 1 : 0));
     }
     std::u16string relative;
@@ -174,10 +175,10 @@ bool isParent(Path const& path, Path const& folder) {
 }
 
 std::u16string generateUUID() {
-    // Each one comes from the system's own source: nothing is kept that threads would have to share, or that
-    // the child of a fork would go on with as its parent does and give the same identifiers.
+    // Each UUID comes from the system's random source. A generator of our own would be shared between
+    // threads, and after a fork both processes would generate the same UUIDs.
     boost::uuids::random_generator_pure generate;
-    auto const text = boost::uuids::to_string(generate());
+    std::string const text = boost::uuids::to_string(generate());
     return {text.begin(), text.end()};
 }
 

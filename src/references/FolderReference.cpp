@@ -25,18 +25,18 @@ std::u16string FolderReference::getUUID() const {
 }
 
 FolderReference relativeFolderReference(Path const& target, Path const& root) {
-    auto const location = fl::filesystem::canonical(target, Path());
-    // Both sides without symbolic links, or ".." in the text would lead from somewhere else than it says.
-    auto stored = metadata::getRelativePath(fl::filesystem::canonical(root, Path()), location);
-    // One spelling on every system that opens the project. A name that holds a backslash itself pays for it:
-    // the reference leads elsewhere when it is read.
+    Path const location = fl::filesystem::canonical(target, Path());
+    // Both sides are canonical: with a symbolic link in them, ".." in the text would lead elsewhere.
+    std::u16string stored = metadata::getRelativePath(fl::filesystem::canonical(root, Path()), location);
+    // Every system that opens the project spells the text the same. The price: a reference to a name that
+    // contains a backslash leads elsewhere when it is read.
     std::replace(stored.begin(), stored.end(), u'\\', u'/');
     return FolderReference(location, relativeReferenceType(), stored);
 }
 
 FolderReference absoluteFolderReference(Path const& target) {
-    // Stored as it was given: an absolute reference is for a place that people name, such as a drive or a
-    // link that is moved on with each release, and not for what is there today.
+    // Stored unchanged: an absolute reference names a place, such as a drive or a link that moves with each
+    // release, and not its present content.
     return FolderReference(fl::filesystem::canonical(target, Path()), absoluteReferenceType(),
                            target.native());
 }

@@ -3,29 +3,58 @@
 #include <memory>
 #include <vector>
 
+#include "fl/filesystem/Path.hpp"
 #include "project/metadata/MetadataPath.hpp"
 #include "references/FolderReferenceReader.hpp"
 
 namespace project::management {
 
-/// What tells one list of folder references from another.
+/// The differences between the two lists of folder references.
 ///
-/// Customizations are immutable and may be used by several threads at once.
+/// Customizations are immutable. Several threads may use one at the same time.
 class FolderReferenceCustomization {
 public:
     virtual ~FolderReferenceCustomization();
 
-    /// Called for each reference that is about to be stored; what it throws ends the whole addition.
+    /// Called for each reference before any is stored. Throws if the reference must not be stored.
     virtual void validateReference(FolderReference const& reference) const = 0;
 
-    /// The address below which the list is stored.
+    /// Returns the address below which the list is stored.
     virtual metadata::MetadataPath getRootPath() const = 0;
 
-    /// Throws the error that tells that a folder is in the list already; never returns.
+    /// Throws the list's error for a folder that is in the list already.
     [[noreturn]] virtual void throwDuplicate(Path const& location) const = 0;
 
-    /// The readers to ask, in this order. They live as long as this object.
+    /// Returns the readers, in the order in which they are tried. They are valid as long as this object.
     virtual std::vector<std::unique_ptr<FolderReferenceReader>> const& getReaders() const = 0;
+};
+
+/// The list of the project path. Only relative references are read from it.
+class ProjectPathFolderReferenceCustomization : public FolderReferenceCustomization {
+public:
+    explicit ProjectPathFolderReferenceCustomization(Path const& projectRoot);
+
+    void validateReference(FolderReference const& reference) const override;
+    metadata::MetadataPath getRootPath() const override;
+    [[noreturn]] void throwDuplicate(Path const& location) const override;
+    std::vector<std::unique_ptr<FolderReferenceReader>> const& getReaders() const override;
+
+private:
+    std::vector<std::unique_ptr<FolderReferenceReader>> readers_;
+};
+
+/// The list of references to other projects, which are relative or absolute.
+class ProjectFolderReferenceCustomization : public FolderReferenceCustomization {
+public:
+    explicit ProjectFolderReferenceCustomization(Path const& projectRoot);
+
+    void validateReference(FolderReference const& reference) const override;
+    metadata::MetadataPath getRootPath() const override;
+    [[noreturn]] void throwDuplicate(Path const& location) const override;
+    std::vector<std::unique_ptr<FolderReferenceReader>> const& getReaders() const override;
+
+private:
+    std::vector<std::unique_ptr<FolderReferenceReader>> readers_;
 };
 
 } // namespace project::management

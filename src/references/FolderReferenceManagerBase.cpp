@@ -50,7 +50,7 @@ FolderReferenceManagerBase::FolderReferenceManagerBase(
 
 std::vector<FolderReference> FolderReferenceManagerBase::getReferences() const {
     auto const guard = metadataManager_->acquireReadLock();
-    auto const head = customization_->getRootPath();
+    MetadataPath const head = customization_->getRootPath();
     if (!metadataManager_->pathExists(head)) {
         return {};
     }
@@ -83,7 +83,7 @@ void FolderReferenceManagerBase::removeReferences(std::vector<FolderReference> c
     auto const guard = metadataManager_->acquireWriteLock();
     std::vector<MetadataPath> stored;
     for (auto const& reference : oldReferences) {
-        auto path = getReferencePath(reference);
+        MetadataPath path = getReferencePath(reference);
         if (metadataManager_->pathExists(path)) {
             stored.push_back(std::move(path));
         }
@@ -93,17 +93,17 @@ void FolderReferenceManagerBase::removeReferences(std::vector<FolderReference> c
 
 bool FolderReferenceManagerBase::isReference(Path const& path) const {
     auto const guard = metadataManager_->acquireReadLock();
-    auto const all = getReferences();
+    std::vector<FolderReference> const all = getReferences();
     return std::any_of(all.begin(), all.end(),
                        [&](FolderReference const& reference) { return reference.getLocation() == path; });
 }
 
 std::optional<FolderReference> FolderReferenceManagerBase::getRootReferenceFor(Path const& path) const {
     auto const guard = metadataManager_->acquireReadLock();
-    // The first one in the store's order, not the nearest: of nested references the answer is the same one
-    // for every folder below both.
+    // The first reference and not the nearest: all folders below two nested references have the same root
+    // reference.
     for (auto const& reference : getReferences()) {
-        auto const& location = reference.getLocation();
+        Path const& location = reference.getLocation();
         if (metadata::isParent(path, location) || location == path) {
             return reference;
         }
@@ -123,7 +123,7 @@ std::optional<FolderReference> FolderReferenceManagerBase::readReference(Metadat
     if (!node) {
         return std::nullopt;
     }
-    auto const& type = node->get(schema::references::typeKey);
+    std::u16string const& type = node->get(schema::references::typeKey);
     for (auto const& reader : customization_->getReaders()) {
         if (reader->canRead(type)) {
             return reader->read(node->get(schema::references::storedPathKey), path.getLeaf().getLocation());
@@ -133,9 +133,10 @@ std::optional<FolderReference> FolderReferenceManagerBase::readReference(Metadat
 }
 
 void FolderReferenceManagerBase::checkDuplicates(std::vector<FolderReference> const& newReferences) const {
-    auto const existing = sortedLocations(getReferences());
-    auto const added = sortedLocations(newReferences);
-    // Only what is stored counts: two new references to one folder are both stored, each under its own UUID.
+    std::vector<Path> const existing = sortedLocations(getReferences());
+    std::vector<Path> const added = sortedLocations(newReferences);
+    // Only stored references count: two new references to one folder are both stored, each under its own
+    // UUID.
     std::vector<Path> duplicates;
     std::set_intersection(existing.begin(), existing.end(), added.begin(), added.end(),
                           std::back_inserter(duplicates));

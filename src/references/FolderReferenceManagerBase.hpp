@@ -11,11 +11,11 @@
 
 namespace project::management {
 
-/// A list of folder references over a metadata store. Nothing is kept in memory: each query reads all
-/// references and works out anew where they lead.
+/// A list of folder references over a metadata store. It keeps nothing in memory: each query reads all
+/// references and determines their locations again.
 ///
-/// A reference is stored under its UUID. One of a type that no reader of this list knows stays stored and is
-/// left out of every result.
+/// A reference is stored under its UUID. A reference of a type that the list's readers do not read stays
+/// stored and is left out of every result.
 class FolderReferenceManagerBase : public FolderReferenceManager {
 public:
     FolderReferenceManagerBase(std::unique_ptr<FolderReferenceCustomization> customization,

@@ -14,7 +14,7 @@ Path canonicalIfPossible(Path path) {
     try {
         return fl::filesystem::canonical(path, Path());
     } catch (...) {
-        // One folder that the disk can't tell about must not keep all the other references from being read.
+        // A folder that cannot be accessed must not prevent the other references from being read.
         return path;
     }
 }
@@ -39,10 +39,9 @@ bool AbsoluteFolderReferenceReader::canRead(std::u16string const& type) const {
 
 FolderReference AbsoluteFolderReferenceReader::read(std::u16string const& storedPath,
                                                     std::u16string const& uuid) const {
-    // Only looked up, which has a folder that is mounted on demand come into being. The location stays the
-    // text that somebody chose, by which callers find an absolute reference again in isReference and on
-    // screen.
-    [[maybe_unused]] auto const found = canonicalIfPossible(Path(storedPath));
+    // The access mounts a folder that is mounted on demand. Its result is not used: the location stays the
+    // text that the user chose, by which isReference and users find the reference.
+    [[maybe_unused]] Path const found = canonicalIfPossible(Path(storedPath));
     return FolderReference(Path(storedPath), absoluteReferenceType(), storedPath, uuid);
 }
 

@@ -40,7 +40,7 @@ struct Duplicate {
     Path location;
 };
 
-/// A list of its own, which writes down the references that it is asked to validate.
+/// A list that records the references that it validates.
 class TestCustomization : public FolderReferenceCustomization {
 public:
     explicit TestCustomization(std::vector<std::u16string>& validated) : validated_(validated) {
@@ -87,7 +87,7 @@ protected:
         return std::make_unique<TestCustomization>(validated);
     }
 
-    /// Adds references and gives the location that was reported as a duplicate.
+    /// Adds references and returns the location that was reported as a duplicate.
     Path duplicateOf(std::vector<FolderReference> const& references) {
         try {
             manager.addReferences(references);
@@ -113,7 +113,7 @@ protected:
     FolderReferenceManagerBase manager{customization(), store, u"/project"};
 };
 
-/// Lists references that are stored nowhere.
+/// A manager that lists references that are not stored.
 class FixedListManager : public FolderReferenceManagerBase {
 public:
     using FolderReferenceManagerBase::FolderReferenceManagerBase;
@@ -121,11 +121,11 @@ public:
     std::vector<FolderReference> getReferences() const override { return {absolute(u"/fixed", u"f")}; }
 };
 
-TEST_F(FolderReferenceManagerBaseTest, constructionLeavesTheStoreAlone) {
+TEST_F(FolderReferenceManagerBaseTest, constructionDoesNotAccessTheStore) {
     EXPECT_THAT(store->calls(), IsEmpty());
 }
 
-TEST_F(FolderReferenceManagerBaseTest, aNewStoreHasNoReferencesAndIsNotAskedForChildren) {
+TEST_F(FolderReferenceManagerBaseTest, aNewStoreHasNoReferencesAndItsChildrenAreNotRead) {
     EXPECT_THAT(manager.getReferences(), IsEmpty());
     EXPECT_FALSE(manager.isReference(u"/a"));
     EXPECT_FALSE(manager.getRootReferenceFor(u"/a").has_value());
@@ -133,7 +133,7 @@ TEST_F(FolderReferenceManagerBaseTest, aNewStoreHasNoReferencesAndIsNotAskedForC
     EXPECT_TRUE(store->isEmpty());
 }
 
-TEST_F(FolderReferenceManagerBaseTest, aReferenceIsStoredWithItsTextAndTypeAlone) {
+TEST_F(FolderReferenceManagerBaseTest, aReferenceIsStoredWithItsTextAndTypeOnly) {
     manager.addReferences({FolderReference(u"/project/a", u"Relative", u"a", u"x")});
     auto const node = store->content().getNode(referenceAt(u"x"));
     ASSERT_NE(node, nullptr);
@@ -143,7 +143,7 @@ TEST_F(FolderReferenceManagerBaseTest, aReferenceIsStoredWithItsTextAndTypeAlone
     EXPECT_EQ(node->get(u"Type"), u"Relative");
 }
 
-TEST_F(FolderReferenceManagerBaseTest, whatWasAddedIsListedInTheOrderOfTheStore) {
+TEST_F(FolderReferenceManagerBaseTest, addedReferencesAreListedInTheOrderOfTheStore) {
     manager.addReferences({absolute(u"/a", u"z"), absolute(u"/b", u"y")});
     auto const references = manager.getReferences();
     EXPECT_THAT(uuidsOf(references), ElementsAre(u"y", u"z"));
@@ -152,7 +152,7 @@ TEST_F(FolderReferenceManagerBaseTest, whatWasAddedIsListedInTheOrderOfTheStore)
     EXPECT_EQ(references.at(0).getType(), u"Absolute");
 }
 
-TEST_F(FolderReferenceManagerBaseTest, writingBackWhatWasReadStoresTheSameNode) {
+TEST_F(FolderReferenceManagerBaseTest, writingAReadReferenceStoresTheSameNode) {
     put(u"x", u"b/../a", u"Relative");
     auto const before = store->content().getNode(referenceAt(u"x"));
     auto const references = manager.getReferences();
@@ -162,7 +162,7 @@ TEST_F(FolderReferenceManagerBaseTest, writingBackWhatWasReadStoresTheSameNode) 
     EXPECT_TRUE(isEqual(*store->content().getNode(referenceAt(u"x")), *before));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, addingChecksThenMakesTheHeadThenWritesOnce) {
+TEST_F(FolderReferenceManagerBaseTest, addingChecksThenCreatesTheHeadThenWritesOnce) {
     put(u"x", u"/x");
     manager.addReferences({absolute(u"/b", u"b"), absolute(u"/a", u"a")});
     EXPECT_THAT(store->operations(),
@@ -171,7 +171,7 @@ TEST_F(FolderReferenceManagerBaseTest, addingChecksThenMakesTheHeadThenWritesOnc
     EXPECT_THAT(store->calls("setNodes").at(0).paths, ElementsAre(referenceAt(u"a"), referenceAt(u"b")));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, addingNothingMakesTheHeadAndNoReference) {
+TEST_F(FolderReferenceManagerBaseTest, addingNothingCreatesTheHeadAndNoReference) {
     manager.addReferences({});
     EXPECT_THAT(store->writes(), ElementsAre("createPaths", "setNodes"));
     EXPECT_THAT(store->calls("setNodes").at(0).paths, IsEmpty());
@@ -184,7 +184,7 @@ TEST_F(FolderReferenceManagerBaseTest, eachReferenceIsValidatedInTheOrderGiven) 
     EXPECT_THAT(validated, ElementsAre(u"b", u"a", u"a"));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, aFailedValidationStoresNoReferenceAndLeavesTheEmptyHead) {
+TEST_F(FolderReferenceManagerBaseTest, aFailedValidationStoresNoReferenceAndKeepsTheEmptyHead) {
     EXPECT_THROW(manager.addReferences({absolute(u"/a", u"a"), absolute(u"/b", u"bad")}),
                  std::invalid_argument);
     EXPECT_THAT(store->writes(), ElementsAre("createPaths"));
@@ -194,7 +194,7 @@ TEST_F(FolderReferenceManagerBaseTest, aFailedValidationStoresNoReferenceAndLeav
     EXPECT_EQ(store->calls().at(0).guard, Guard::None);
 }
 
-TEST_F(FolderReferenceManagerBaseTest, aLocationThatIsStoredIsADuplicateAndNothingIsWritten) {
+TEST_F(FolderReferenceManagerBaseTest, aStoredLocationIsADuplicateAndNothingIsWritten) {
     put(u"x", u"/a");
     EXPECT_EQ(duplicateOf({absolute(u"/b", u"b"), absolute(u"/a", u"a")}), Path(u"/a"));
     EXPECT_THAT(store->writes(), IsEmpty());
@@ -232,7 +232,7 @@ TEST_F(FolderReferenceManagerBaseTest, theLocationCountsAndNotTheStoredText) {
     EXPECT_EQ(duplicateOf({FolderReference(u"/elsewhere", u"Relative", u"a", u"y")}), Path(u"none"));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, aUUIDThatIsStoredAlreadyIsWrittenOver) {
+TEST_F(FolderReferenceManagerBaseTest, aStoredUUIDIsReplaced) {
     put(u"x", u"/a");
     manager.addReferences({absolute(u"/b", u"x")});
     ASSERT_EQ(manager.getReferences().size(), 1U);
@@ -254,19 +254,19 @@ TEST_F(FolderReferenceManagerBaseTest, aReferenceOfAnUnknownTypeIsNeitherListedN
     EXPECT_THAT(storedUUIDs(), ElementsAre(u"a", u"x", u"y"));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, whatIsNoReferenceBelowTheHeadIsNotRead) {
+TEST_F(FolderReferenceManagerBaseTest, addressesOfOtherTypesBelowTheHeadAreNotRead) {
     store->put(HEAD.child({u"Other", u"x"}), {{u"Ref", u"/a"}, {u"Type", u"Absolute"}});
     EXPECT_THAT(manager.getReferences(), IsEmpty());
     EXPECT_THAT(store->calls("getNode"), IsEmpty());
 }
 
-TEST_F(FolderReferenceManagerBaseTest, anAddressWithoutANodeIsPassedOver) {
+TEST_F(FolderReferenceManagerBaseTest, anAddressWithoutANodeIsSkipped) {
     store->put(referenceAt(u"x").child({u"Below", u"1"}), {});
     put(u"y", u"/a");
     EXPECT_THAT(uuidsOf(manager.getReferences()), ElementsAre(u"y"));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, oneFolderThatTheDiskCannotTellAboutLeavesTheOthersListed) {
+TEST_F(FolderReferenceManagerBaseTest, anInaccessibleFolderDoesNotHideTheOthers) {
     put(u"x", u"no \xD800 name", u"Relative"); // no file on disk can have that name
     put(u"y", u"/a");
     auto const references = manager.getReferences();
@@ -274,7 +274,7 @@ TEST_F(FolderReferenceManagerBaseTest, oneFolderThatTheDiskCannotTellAboutLeaves
     EXPECT_EQ(references.at(0).getLocation(), Path(u"/project/no \xD800 name"));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, removingTakesWhatIsStoredAndPassesOverTheRest) {
+TEST_F(FolderReferenceManagerBaseTest, removingSkipsReferencesThatAreNotStored) {
     put(u"x", u"/a");
     put(u"y", u"/b");
     put(u"z", u"/c");
@@ -284,7 +284,7 @@ TEST_F(FolderReferenceManagerBaseTest, removingTakesWhatIsStoredAndPassesOverThe
     EXPECT_THAT(storedUUIDs(), ElementsAre(u"y"));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, removingGoesByTheUUIDAlone) {
+TEST_F(FolderReferenceManagerBaseTest, removingUsesTheUUIDOnly) {
     put(u"x", u"/a");
     put(u"y", u"/b", u"Elsewhere");
     manager.removeReferences({absolute(u"/other", u"x"), absolute(u"/another", u"y")});
@@ -303,7 +303,7 @@ TEST_F(FolderReferenceManagerBaseTest, removingNothingStillCallsTheStoreOnce) {
     EXPECT_THAT(store->calls("removeNodes").at(0).paths, IsEmpty());
 }
 
-TEST_F(FolderReferenceManagerBaseTest, theHeadStaysWhenTheLastReferenceGoes) {
+TEST_F(FolderReferenceManagerBaseTest, theHeadStaysWhenTheLastReferenceIsRemoved) {
     manager.addReferences({absolute(u"/a", u"a")});
     manager.removeReferences(manager.getReferences());
     EXPECT_THAT(storedUUIDs(), IsEmpty());
@@ -324,7 +324,7 @@ TEST_F(FolderReferenceManagerBaseTest, aPathIsComparedAsItIsSpelled) {
     EXPECT_FALSE(manager.isReference(u"/A"));
 }
 
-TEST_F(FolderReferenceManagerBaseTest, aFolderBelowAReferenceAndTheReferenceItselfLeadToIt) {
+TEST_F(FolderReferenceManagerBaseTest, aFolderBelowAReferenceAndTheReferenceItselfHaveItAsTheirRoot) {
     put(u"x", u"/a/b");
     ASSERT_TRUE(manager.getRootReferenceFor(u"/a/b/c/d").has_value());
     EXPECT_EQ(manager.getRootReferenceFor(u"/a/b/c/d")->getUUID(), u"x");
@@ -332,7 +332,7 @@ TEST_F(FolderReferenceManagerBaseTest, aFolderBelowAReferenceAndTheReferenceItse
     EXPECT_EQ(manager.getRootReferenceFor(u"/a/b")->getUUID(), u"x");
 }
 
-TEST_F(FolderReferenceManagerBaseTest, anUnrelatedFolderLeadsToNoReference) {
+TEST_F(FolderReferenceManagerBaseTest, anUnrelatedFolderHasNoRootReference) {
     put(u"x", u"/a/b");
     EXPECT_FALSE(manager.getRootReferenceFor(u"/a/bc").has_value());
     EXPECT_FALSE(manager.getRootReferenceFor(u"/a").has_value());
@@ -348,7 +348,7 @@ TEST_F(FolderReferenceManagerBaseTest, ofNestedReferencesTheFirstInTheStoresOrde
     EXPECT_EQ(manager.getRootReferenceFor(u"/a/b")->getUUID(), u"l");
 }
 
-TEST_F(FolderReferenceManagerBaseTest, theReferencesThatASubclassListsAreTheOnesThatCount) {
+TEST_F(FolderReferenceManagerBaseTest, theReferencesThatASubclassListsCount) {
     FixedListManager fixed(customization(), store, u"/project");
     EXPECT_TRUE(fixed.isReference(u"/fixed"));
     EXPECT_TRUE(fixed.getRootReferenceFor(u"/fixed/a").has_value());
@@ -364,7 +364,7 @@ TEST_F(FolderReferenceManagerBaseTest, guardsAreHeldFromTheFirstStoreCallToTheLa
     expectOnly(Guard::Write, [&] { manager.removeReferences({absolute(u"/b", u"b")}); });
 }
 
-TEST_F(FolderReferenceManagerBaseTest, whatTheStoreThrowsReachesTheCaller) {
+TEST_F(FolderReferenceManagerBaseTest, exceptionsOfTheStorePropagate) {
     store->failOn("setNodes", [] { throw std::runtime_error("disk full"); });
     EXPECT_THROW(manager.addReferences({absolute(u"/a", u"a")}), std::runtime_error);
     EXPECT_THAT(storedUUIDs(), IsEmpty());

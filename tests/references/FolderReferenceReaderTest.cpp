@@ -11,7 +11,7 @@ namespace {
 
 class FolderReferenceReaderTest : public testing::Test {
 protected:
-    /// Makes a link that leads to itself, so that no path through it has a canonical form.
+    /// Creates a link to itself, so that no path through it has a canonical form.
     void makeLoop(std::u16string const& name) {
         auto const loop = fl::filesystem::toSystem(folder.path(name));
         std::filesystem::create_symlink(loop, loop);
@@ -30,7 +30,7 @@ TEST_F(FolderReferenceReaderTest, eachReaderAcceptsItsOwnTypeOnly) {
     EXPECT_FALSE(absolute.canRead(u"Relative"));
 }
 
-TEST_F(FolderReferenceReaderTest, noReaderAcceptsAnotherTextThanItsName) {
+TEST_F(FolderReferenceReaderTest, readersAcceptNoOtherText) {
     for (auto const* type :
          {u"", u"relative", u"RELATIVE", u"absolute", u"ABSOLUTE", u"Relative ", u"Absolut"}) {
         EXPECT_FALSE(relative.canRead(type)) << testing::PrintToString(std::u16string(type));
@@ -38,7 +38,7 @@ TEST_F(FolderReferenceReaderTest, noReaderAcceptsAnotherTextThanItsName) {
     }
 }
 
-TEST_F(FolderReferenceReaderTest, whatIsReadHasTheTypeTheStoredPathAndTheUUID) {
+TEST_F(FolderReferenceReaderTest, aReadReferenceHasTheTypeTheStoredPathAndTheUUID) {
     auto const a = relative.read(u"b/../a", u"x");
     EXPECT_EQ(a.getType(), u"Relative");
     EXPECT_EQ(a.getStoredPath(), u"b/../a");
@@ -49,7 +49,7 @@ TEST_F(FolderReferenceReaderTest, whatIsReadHasTheTypeTheStoredPathAndTheUUID) {
     EXPECT_EQ(b.getUUID(), u"y");
 }
 
-TEST_F(FolderReferenceReaderTest, readingTwiceGivesTheSameUUID) {
+TEST_F(FolderReferenceReaderTest, readingTwiceReturnsTheSameUUID) {
     EXPECT_EQ(relative.read(u"a", u"x").getUUID(), relative.read(u"a", u"x").getUUID());
     EXPECT_EQ(absolute.read(u"/a", u"x").getUUID(), absolute.read(u"/a", u"x").getUUID());
 }
@@ -71,18 +71,18 @@ TEST_F(FolderReferenceReaderTest, theEmptyRelativePathIsTheCanonicalRoot) {
     EXPECT_EQ(RelativeFolderReferenceReader(root / u"../project/").read(u"", u"u").getLocation(), root);
 }
 
-TEST_F(FolderReferenceReaderTest, aFolderThatIsGoneIsReadAllTheSame) {
+TEST_F(FolderReferenceReaderTest, aDeletedFolderIsReadToo) {
     EXPECT_EQ(relative.read(u"../gone/x", u"u").getLocation(), folder.path(u"gone/x"));
     EXPECT_EQ(absolute.read(u"/gone/x", u"u").getLocation(), Path(u"/gone/x"));
 }
 
-TEST_F(FolderReferenceReaderTest, aRelativePathWithoutACanonicalFormStaysAsItIsBehindTheRoot) {
+TEST_F(FolderReferenceReaderTest, aRelativePathWithoutACanonicalFormIsAppendedToTheRoot) {
     makeLoop(u"loop");
     EXPECT_EQ(relative.read(u"../loop/../x", u"u").getLocation(), root / u"../loop/../x");
     EXPECT_EQ(relative.read(u"no \xD800 name", u"u").getLocation(), root / u"no \xD800 name");
 }
 
-TEST_F(FolderReferenceReaderTest, anAbsolutePathWithoutACanonicalFormIsReadAllTheSame) {
+TEST_F(FolderReferenceReaderTest, anAbsolutePathWithoutACanonicalFormIsReadToo) {
     makeLoop(u"loop");
     auto const endless = folder.path(u"loop/x");
     EXPECT_EQ(absolute.read(endless.native(), u"u").getLocation(), endless);
@@ -91,10 +91,10 @@ TEST_F(FolderReferenceReaderTest, anAbsolutePathWithoutACanonicalFormIsReadAllTh
 
 TEST_F(FolderReferenceReaderTest, anAbsoluteLocationIsTheStoredTextAndNotItsCanonicalForm) {
     auto const spelling = root / u"../libraries/";
-    auto const made = absoluteFolderReference(spelling);
-    auto const read = absolute.read(made.getStoredPath(), made.getUUID());
+    auto const created = absoluteFolderReference(spelling);
+    auto const read = absolute.read(created.getStoredPath(), created.getUUID());
     EXPECT_EQ(read.getLocation(), spelling);
-    EXPECT_EQ(made.getLocation(), folder.path(u"libraries"));
+    EXPECT_EQ(created.getLocation(), folder.path(u"libraries"));
 }
 
 TEST_F(FolderReferenceReaderTest, theEmptyAbsolutePathIsTheEmptyPath) {

@@ -12,17 +12,17 @@ namespace {
 
 class FolderReferenceTest : public testing::Test {
 protected:
-    /// Makes a symbolic link below the temporary folder.
+    /// Creates a symbolic link below the temporary folder.
     Path link(std::u16string const& relative, Path const& target) {
-        auto const made = folder.path(relative);
-        std::filesystem::create_symlink(fl::filesystem::toSystem(target), fl::filesystem::toSystem(made));
-        return made;
+        auto const link = folder.path(relative);
+        std::filesystem::create_symlink(fl::filesystem::toSystem(target), fl::filesystem::toSystem(link));
+        return link;
     }
 
     /// A path that has no canonical form.
     Path loop() { return link(u"loop", folder.path(u"loop")); }
 
-    /// Where a reference leads when it is read in a project with this root.
+    /// The location of a reference that is read in a project with this root.
     static Path readIn(Path const& root, FolderReference const& reference) {
         return RelativeFolderReferenceReader(root).read(reference.getStoredPath(), u"x").getLocation();
     }
@@ -31,7 +31,7 @@ protected:
     Path const root = folder.folder(u"project");
 };
 
-TEST_F(FolderReferenceTest, hasAllThatItIsMadeWith) {
+TEST_F(FolderReferenceTest, hasTheConstructorsArguments) {
     FolderReference const reference(u"/p/a", u"Relative", u"a", u"x");
     EXPECT_EQ(reference.getLocation(), Path(u"/p/a"));
     EXPECT_EQ(reference.getType(), u"Relative");
@@ -39,7 +39,7 @@ TEST_F(FolderReferenceTest, hasAllThatItIsMadeWith) {
     EXPECT_EQ(reference.getUUID(), u"x");
 }
 
-TEST_F(FolderReferenceTest, withoutAUUIDItGetsAFreshOne) {
+TEST_F(FolderReferenceTest, withoutAUUIDItGetsANewOne) {
     FolderReference const reference(u"/p/a", u"Relative", u"a");
     EXPECT_EQ(reference.getUUID().size(), 36U);
     EXPECT_NE(reference.getUUID(), FolderReference(u"/p/a", u"Relative", u"a").getUUID());
@@ -84,7 +84,7 @@ TEST_F(FolderReferenceTest, aFolderOutsideTheRootIsAccepted) {
     EXPECT_EQ(readIn(root, reference), target);
 }
 
-TEST_F(FolderReferenceTest, aFolderThatIsNotThereIsAccepted) {
+TEST_F(FolderReferenceTest, aMissingFolderIsAccepted) {
     auto const reference = relativeFolderReference(root / u"later", root);
     EXPECT_EQ(reference.getStoredPath(), u"later");
     EXPECT_EQ(absoluteFolderReference(root / u"later").getLocation(), root / u"later");
@@ -144,7 +144,7 @@ TEST_F(FolderReferenceTest, twoReferencesToOneFolderHaveDifferentUUIDs) {
     EXPECT_NE(absoluteFolderReference(root).getUUID(), absoluteFolderReference(root).getUUID());
 }
 
-TEST_F(FolderReferenceTest, aPathWithoutACanonicalFormIsAnErrorWhereAReferenceIsMade) {
+TEST_F(FolderReferenceTest, aPathWithoutACanonicalFormIsAnErrorWhenAReferenceIsCreated) {
     auto const endless = loop();
     EXPECT_THROW(relativeFolderReference(endless, root), std::filesystem::filesystem_error);
     EXPECT_THROW(relativeFolderReference(root, endless), std::filesystem::filesystem_error);

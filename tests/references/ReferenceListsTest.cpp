@@ -3,16 +3,14 @@
 #include <gmock/gmock.h>
 
 #include "project/references/FolderReference.hpp"
+#include "references/FolderReferenceCustomization.hpp"
 #include "references/FolderReferenceManagerBase.hpp"
-#include "references/ProjectFolderReferenceCustomization.hpp"
-#include "references/ProjectPathFolderReferenceCustomization.hpp"
-#include "references/ProjectPathManagerBase.hpp"
-#include "references/ProjectReferenceManagerBase.hpp"
+#include "references/ReferenceLists.hpp"
 #include "support/ErrorMatchers.hpp"
 #include "support/RecordingMetadataManager.hpp"
 #include "support/TemporaryFolder.hpp"
 
-// The project path and the project references, by what makes them differ.
+// The differences between the project path and the references to projects.
 
 namespace project::management {
 namespace {
@@ -58,7 +56,7 @@ protected:
     FolderReferenceManager& references = referenceManager.getFolderReferenceManager();
 };
 
-TEST_F(ReferenceListsTest, constructionLeavesTheStoreAlone) {
+TEST_F(ReferenceListsTest, constructionDoesNotAccessTheStore) {
     EXPECT_THAT(store->calls(), IsEmpty());
 }
 
@@ -67,7 +65,7 @@ TEST_F(ReferenceListsTest, theListIsTheSameObjectAtEachCall) {
     EXPECT_EQ(&referenceManager.getFolderReferenceManager(), &references);
 }
 
-TEST_F(ReferenceListsTest, eachListIsStoredInAPlaceOfItsOwn) {
+TEST_F(ReferenceListsTest, eachListIsStoredAtItsOwnAddress) {
     auto const onPath = relativeFolderReference(root / u"a", root);
     auto const referenced = relativeFolderReference(root / u"b", root);
     path.addReferences({onPath});
@@ -96,7 +94,7 @@ TEST_F(ReferenceListsTest, eachListReportsADuplicateByItsOwnError) {
     EXPECT_THAT(store->writes(), IsEmpty());
 }
 
-TEST_F(ReferenceListsTest, theReferencesHoldBothTypes) {
+TEST_F(ReferenceListsTest, theReferencesContainBothTypes) {
     auto const elsewhere = folder.folder(u"elsewhere");
     references.addReferences(
         {relativeFolderReference(root / u"a", root), absoluteFolderReference(elsewhere)});
@@ -115,7 +113,7 @@ TEST_F(ReferenceListsTest, theProjectPathStoresAbsoluteReferencesAndNeverListsTh
     auto const first = absoluteFolderReference(root / u"a");
     auto const second = absoluteFolderReference(root / u"a");
     path.addReferences({first});
-    path.addReferences({second}); // no duplicate, since the first one is not listed
+    path.addReferences({second}); // not a duplicate, because the first one is not listed
     EXPECT_THAT(path.getReferences(), IsEmpty());
     EXPECT_THAT(uuidsBelow(PROJECT_PATH), testing::UnorderedElementsAre(first.getUUID(), second.getUUID()));
 
@@ -123,8 +121,8 @@ TEST_F(ReferenceListsTest, theProjectPathStoresAbsoluteReferencesAndNeverListsTh
     EXPECT_THAT(uuidsBelow(PROJECT_PATH), ElementsAre(second.getUUID()));
 }
 
-TEST_F(ReferenceListsTest, anAbsoluteReferenceThatWasMadeThroughALinkIsNoDuplicateOfItselfOnceRead) {
-    // What is read is located at the text that was stored, what is made anew at the folder itself.
+TEST_F(ReferenceListsTest, anAbsoluteReferenceThroughALinkIsNotADuplicateOfItselfOnceRead) {
+    // The location of a read reference is the stored text, that of a new reference is the folder itself.
     auto const target = folder.folder(u"elsewhere");
     auto const linked = folder.path(u"link");
     std::filesystem::create_symlink(fl::filesystem::toSystem(target), fl::filesystem::toSystem(linked));

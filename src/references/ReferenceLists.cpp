@@ -1,8 +1,8 @@
-#include "references/ProjectPathManagerBase.hpp"
+#include "references/ReferenceLists.hpp"
 
 #include <utility>
 
-#include "references/ProjectPathFolderReferenceCustomization.hpp"
+#include "references/FolderReferenceCustomization.hpp"
 
 namespace project::management {
 
@@ -13,6 +13,16 @@ ProjectPathManagerBase::ProjectPathManagerBase(std::shared_ptr<metadata::Metadat
 }
 
 FolderReferenceManager& ProjectPathManagerBase::getFolderReferenceManager() {
+    return references_;
+}
+
+ProjectReferenceManagerBase::ProjectReferenceManagerBase(
+    std::shared_ptr<metadata::MetadataManager> metadataManager, Path projectRoot)
+    : references_(std::make_unique<ProjectFolderReferenceCustomization>(projectRoot),
+                  std::move(metadataManager), projectRoot) {
+}
+
+FolderReferenceManager& ProjectReferenceManagerBase::getFolderReferenceManager() {
     return references_;
 }
 
