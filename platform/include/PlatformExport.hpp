@@ -1,4 +1,4 @@
 #pragma once
 
-/// Marks what the shared library project::platform shows to others; everything else stays inside it.
+/// Marks the symbols that the shared library project::platform exports. All others are hidden.
 #define PROJECT_PLATFORM_EXPORT __attribute__((visibility("default")))

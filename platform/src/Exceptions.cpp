@@ -5,7 +5,7 @@
 
 namespace foundation::core::except {
 
-// The destructors stand here so that each interface has its class information in one library only.
+// The destructors are defined here so that the type information of the interfaces exists in one library only.
 IException::~IException() = default;
 IUserException::~IUserException() = default;
 IMsgIDException::~IMsgIDException() = default;

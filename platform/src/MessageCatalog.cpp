@@ -21,31 +21,31 @@ namespace fl::i18n {
 
 namespace {
 
-constexpr auto rootLocale = "root";
+constexpr char const* rootLocale = "root";
 
-/// What is set for the whole process.
+/// The settings of the process.
 struct Settings {
     std::mutex mutex;
     std::string globalLocale = "en";
     std::map<std::string, std::string> packages; // by catalog name
 };
 
-/// Never destroyed: errors are raised also while the process takes its objects down.
+/// Never destroyed: errors may be raised while static objects are destroyed.
 Settings& settings() {
-    static auto& instance = *new Settings;
+    static Settings& instance = *new Settings;
     return instance;
 }
 
-/// The package of a catalog; empty when the catalog is not known.
+/// The package of a catalog; empty if the catalog is not registered.
 std::string packageOf(std::string const& catalogName) {
-    auto& all = settings();
+    Settings& all = settings();
     std::lock_guard const guard(all.mutex);
     auto const found = all.packages.find(catalogName);
     return found == all.packages.end() ? std::string() : found->second;
 }
 
-/// A locale identifier as ICU names its bundles, without keywords. Empty for what is no identifier: a bundle
-/// is asked for by this name, and nothing that looks like a path may come that far.
+/// The name of ICU's bundle for a locale identifier, without keywords. Empty for any other text: a bundle is
+/// opened by this name, which must not be a path.
 std::string bundleName(std::string const& locale) {
     std::array<char, ULOC_FULLNAME_CAPACITY> canonical{};
     std::array<char, ULOC_FULLNAME_CAPACITY> base{};
@@ -62,10 +62,10 @@ std::string bundleName(std::string const& locale) {
     return std::all_of(name.begin(), name.end(), isAllowed) ? name : std::string();
 }
 
-/// The bundles to look in: the locale's own, those of its parents, and the root's.
+/// The bundles to search: the locale's own, those of its parents, and the root's.
 std::vector<std::string> bundlesFor(std::string const& locale) {
     std::vector<std::string> bundles;
-    auto name = bundleName(locale);
+    std::string name = bundleName(locale);
     while (!name.empty()) {
         bundles.push_back(name);
         std::array<char, ULOC_FULLNAME_CAPACITY> parent{};
@@ -77,7 +77,7 @@ std::vector<std::string> bundlesFor(std::string const& locale) {
     return bundles;
 }
 
-/// A text as the catalog holds it, and the bundle that it was found in.
+/// A text of the catalog, and the bundle that contains it.
 struct Pattern {
     icu::UnicodeString text;
     std::string bundle;
@@ -86,7 +86,7 @@ struct Pattern {
 std::optional<Pattern> findPattern(std::string const& package, std::string const& messageName,
                                    std::string const& locale) {
     for (auto const& name : bundlesFor(locale)) {
-        // Opened without ICU's own fallback, which would go by the language of the environment.
+        // Opened without ICU's own fallback, which depends on the language of the environment.
         UErrorCode status = U_ZERO_ERROR;
         icu::LocalUResourceBundlePointer const bundle(
             ures_openDirect(package.c_str(), name.c_str(), &status));
@@ -140,10 +140,10 @@ std::u16string toText(resource_core::BaseMsgID::Argument const& argument) {
     return std::get<std::u16string>(argument);
 }
 
-/// What is still worth reading when there is no text.
+/// The readable form of a message without a text.
 std::u16string nameWithArguments(resource_core::BaseMsgID const& message) {
-    auto text = fromUtf8(message.getMessageName());
-    auto separator = u": ";
+    std::u16string text = fromUtf8(message.getMessageName());
+    char16_t const* separator = u": ";
     for (auto const& argument : message.getArguments()) {
         text += separator + toText(argument);
         separator = u", ";
@@ -159,7 +159,7 @@ std::u16string MessageCatalog::get_message(resource_core::BaseMsgID const& messa
 
 std::u16string MessageCatalog::get_message(resource_core::BaseMsgID const& message,
                                            std::string const& locale) {
-    auto const package = packageOf(message.getCatalogName());
+    std::string const package = packageOf(message.getCatalogName());
     if (!package.empty()) {
         if (auto const pattern = findPattern(package, message.getMessageName(), locale)) {
             if (auto text = fill(*pattern, message)) {
@@ -171,20 +171,20 @@ std::u16string MessageCatalog::get_message(resource_core::BaseMsgID const& messa
 }
 
 std::string MessageCatalog::getGlobalLocale() {
-    auto& all = settings();
+    Settings& all = settings();
     std::lock_guard const guard(all.mutex);
     return all.globalLocale;
 }
 
 void MessageCatalog::setGlobalLocale(std::string locale) {
-    auto& all = settings();
+    Settings& all = settings();
     std::lock_guard const guard(all.mutex);
     all.globalLocale = std::move(locale);
 }
 
 void MessageCatalog::registerCatalog(std::string const& catalogName, std::string const& packageName,
                                      void const* packageData) {
-    auto& all = settings();
+    Settings& all = settings();
     std::lock_guard const guard(all.mutex);
     if (!all.packages.contains(catalogName)) {
         UErrorCode status = U_ZERO_ERROR;

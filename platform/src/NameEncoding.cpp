@@ -47,7 +47,7 @@ bool decodesTo(std::string_view bytes, std::u16string_view text) noexcept {
 
 /// Writes the ASCII characters at the beginning of the text, as far as there is room. @return their number.
 std::size_t encodeAsciiPrefix(std::u16string_view text, std::span<char> out) noexcept {
-    auto const limit = std::min(text.size(), out.size());
+    std::size_t const limit = std::min(text.size(), out.size());
     std::size_t length = 0;
     while (length < limit && text[length] != 0 && text[length] < i18n::firstBeyondAscii) {
         out[length] = static_cast<char>(text[length]);
@@ -69,10 +69,10 @@ std::u16string decodeName(std::string_view bytes) {
 }
 
 std::optional<std::size_t> encodeName(std::u16string_view text, std::span<char> out) noexcept {
-    auto length = encodeAsciiPrefix(text, out);
+    std::size_t length = encodeAsciiPrefix(text, out);
     bool hasEscapes = false;
     for (auto rest = text.substr(length); !rest.empty();) {
-        auto const codePoint = i18n::takeCodePoint(rest);
+        char32_t const codePoint = i18n::takeCodePoint(rest);
         bool const isEscaped = isEscapedByte(codePoint);
         bool const hasBytes = codePoint != 0 && (isEscaped || !i18n::isSurrogate(codePoint));
         if (!hasBytes || out.size() - length < i18n::longestUtf8) {

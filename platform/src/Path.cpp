@@ -10,13 +10,13 @@ namespace {
 
 constexpr char16_t separator = u'/';
 
-/// What is left behind the separators at the beginning.
+/// The text after the leading separators.
 std::u16string_view withoutLeadingSeparators(std::u16string_view text) noexcept {
     auto const begin = text.find_first_not_of(separator);
     return begin == std::u16string_view::npos ? std::u16string_view() : text.substr(begin);
 }
 
-/// The last element of a path, which trailing separators don't change; "/" for a root alone.
+/// The last element of a path, without regard to trailing separators; "/" for a root alone.
 std::u16string_view lastElement(std::u16string_view path) noexcept {
     auto const end = path.find_last_not_of(separator);
     if (end == std::u16string_view::npos) {
@@ -26,11 +26,11 @@ std::u16string_view lastElement(std::u16string_view path) noexcept {
     return begin == std::u16string_view::npos ? path.substr(0, end + 1) : path.substr(begin + 1, end - begin);
 }
 
-/// How many code units both texts begin with. Paths are compared in their sorted neighbourhood, where they
-/// share long folders, so this takes eight bytes at a time.
+/// The number of common code units at the beginning. Neighbours in a sorted list of paths have long common
+/// folders, so this compares eight bytes at a time.
 std::size_t commonLength(std::u16string_view left, std::u16string_view right) noexcept {
     constexpr std::size_t step = 4;
-    auto const limit = std::min(left.size(), right.size());
+    std::size_t const limit = std::min(left.size(), right.size());
     std::size_t same = 0;
     while (same + step <= limit &&
            std::memcmp(left.data() + same, right.data() + same, step * sizeof(char16_t)) == 0) {
@@ -42,7 +42,7 @@ std::size_t commonLength(std::u16string_view left, std::u16string_view right) no
     return same;
 }
 
-/// True when the element that was read up to here ends here.
+/// True if an element that was read up to here ends here.
 bool endsElement(std::u16string_view rest) noexcept {
     return rest.empty() || rest.front() == separator;
 }
@@ -69,14 +69,14 @@ std::u16string_view move_down(std::u16string_view path) noexcept {
 }
 
 std::u16string_view extract_stem(std::u16string_view path) noexcept {
-    auto const name = lastElement(path);
+    std::u16string_view const name = lastElement(path);
     auto const dot = name.rfind(u'.');
     bool const hasExtension = dot != std::u16string_view::npos && dot != 0 && name != u"..";
     return hasExtension ? name.substr(0, dot) : name;
 }
 
 std::u16string concatenate_pathname(std::u16string left, std::u16string_view right) {
-    auto const relative = withoutLeadingSeparators(right);
+    std::u16string_view const relative = withoutLeadingSeparators(right);
     if (relative.empty()) {
         return left;
     }
@@ -91,7 +91,7 @@ std::u16string concatenate_pathname(std::u16string left, std::u16string_view rig
 
 std::strong_ordering compare_elements(std::u16string_view left, std::u16string_view right) noexcept {
     for (bool isAtBeginning = true;; isAtBeginning = false) {
-        auto const same = commonLength(left, right);
+        std::size_t const same = commonLength(left, right);
         bool const isInsideName = same > 0 && left[same - 1] != separator;
         left.remove_prefix(same);
         right.remove_prefix(same);
@@ -108,7 +108,7 @@ std::strong_ordering compare_elements(std::u16string_view left, std::u16string_v
         if (left.front() != right.front()) {
             return left.front() <=> right.front();
         }
-        // One had a run of separators where the other has a single one: what follows may be the same.
+        // One has repeated separators where the other has a single one: the next elements may be the same.
     }
 }
 

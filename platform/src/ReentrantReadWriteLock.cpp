@@ -10,8 +10,8 @@
 
 namespace cmlink {
 
-/// What all threads share: who is in, and who is next. A thread comes here only with its first guard and when
-/// its last one goes.
+/// The state that all threads share: the threads that have the lock, and those that are next. A thread
+/// accesses it only with its first guard and after its last one.
 class ReentrantReadWriteLock::State {
 public:
     explicit State(Hooks hooks) : hooks_(std::move(hooks)) {}
@@ -23,7 +23,7 @@ public:
         } else {
             waitToWrite(lock);
         }
-        bool const isFirst = access == Access::Write || reading_ == 1;
+        bool const isFirst = access == Access::Write || readers_ == 1;
         if (isFirst && hooks_.first) {
             runFirst(lock, access);
         }
@@ -31,103 +31,104 @@ public:
 
     void leave(Access access) noexcept {
         std::unique_lock lock(mutex_);
-        if (dropOne(access) > 0) {
+        if (removeOne(access) > 0) {
             return;
         }
         if (hooks_.last) {
-            inHook_ = true;
+            isInHook_ = true;
             lock.unlock();
             hooks_.last();
             lock.lock();
-            inHook_ = false;
+            isInHook_ = false;
         }
-        letOthersIn(access);
+        admitNext(access);
     }
 
 private:
     void waitToRead(std::unique_lock<std::mutex>& lock) {
-        auto const turn = turn_;
+        std::uint64_t const turn = turn_;
         ++waitingReaders_;
-        readersMayGo_.wait(lock, [&] {
+        readersCanEnter_.wait(lock, [&] {
             bool const isOurTurn = waitingWriters_ == 0 || turn_ != turn;
-            return !writing_ && !inHook_ && isOurTurn;
+            return !hasWriter_ && !isInHook_ && isOurTurn;
         });
         --waitingReaders_;
         if (turn_ != turn) {
-            --readersToCome_;
+            --admittedReaders_;
         }
-        ++reading_;
+        ++readers_;
     }
 
     void waitToWrite(std::unique_lock<std::mutex>& lock) {
         ++waitingWriters_;
-        writersMayGo_.wait(lock, [&] {
-            bool const isFree = !writing_ && reading_ == 0 && !inHook_;
-            return isFree && readersToCome_ == 0;
+        writersCanEnter_.wait(lock, [&] {
+            bool const isFree = !hasWriter_ && readers_ == 0 && !isInHook_;
+            return isFree && admittedReaders_ == 0;
         });
         --waitingWriters_;
-        writing_ = true;
+        hasWriter_ = true;
     }
 
     void runFirst(std::unique_lock<std::mutex>& lock, Access access) {
-        inHook_ = true;
+        isInHook_ = true;
         lock.unlock();
         try {
             hooks_.first(access);
         } catch (...) {
             lock.lock();
-            inHook_ = false;
-            dropOne(access);
-            letOthersIn(access);
+            isInHook_ = false;
+            removeOne(access);
+            admitNext(access);
             throw;
         }
         lock.lock();
-        inHook_ = false;
+        isInHook_ = false;
         if (access == Access::Read) {
-            readersMayGo_.notify_all();
+            readersCanEnter_.notify_all();
         }
     }
 
-    /// @return how many threads hold the lock after this one let go of it.
-    std::size_t dropOne(Access access) noexcept {
+    /// Removes this thread. @return the number of threads that still have the lock.
+    std::size_t removeOne(Access access) noexcept {
         if (access == Access::Write) {
-            writing_ = false;
+            hasWriter_ = false;
             return 0;
         }
-        return --reading_;
+        return --readers_;
     }
 
-    /// Wakes those whose turn it is, after the last thread that held the lock let go of it.
-    void letOthersIn(Access before) noexcept {
+    /// Wakes the threads that are next, after the last thread has released the lock.
+    void admitNext(Access before) noexcept {
         if (before == Access::Write && waitingReaders_ > 0) {
             ++turn_;
-            readersToCome_ = waitingReaders_;
+            admittedReaders_ = waitingReaders_;
         }
-        if (readersToCome_ > 0 || waitingWriters_ == 0) {
-            readersMayGo_.notify_all();
+        if (admittedReaders_ > 0 || waitingWriters_ == 0) {
+            readersCanEnter_.notify_all();
         } else {
-            writersMayGo_.notify_one();
+            writersCanEnter_.notify_one();
         }
     }
 
     std::mutex mutex_;
-    std::condition_variable readersMayGo_;
-    std::condition_variable writersMayGo_;
+    std::condition_variable readersCanEnter_;
+    std::condition_variable writersCanEnter_;
     Hooks hooks_;
-    std::size_t reading_ = 0;
-    bool writing_ = false;
-    bool inHook_ = false; ///< a hook runs: nobody gets in meanwhile
+    std::size_t readers_ = 0;
+    bool hasWriter_ = false;
+    bool isInHook_ = false; ///< a hook is running, during which no thread can enter
     std::size_t waitingReaders_ = 0;
     std::size_t waitingWriters_ = 0;
-    std::uint64_t turn_ = 0; ///< grows when a writer lets go and the readers waiting then get their turn
-    std::size_t readersToCome_ = 0; ///< of those that got their turn; no writer gets in before they did
+    std::uint64_t turn_ =
+        0; ///< incremented when a writer leaves and the readers that are waiting then are admitted
+    std::size_t admittedReaders_ = 0; ///< admitted and not in yet; they precede every writer
 };
 
 namespace {
 
-/// That the current thread holds a lock, and how often. The list has one or two entries at almost all times.
-/// It has no destructor, so that guards work in whatever order a thread or the program tears its objects
-/// down.
+/// One lock that the current thread has, and the number of its guards. The list rarely has more than two
+/// entries. It has no destructor, so that guards work in whatever order the objects of a thread or the
+/// program are destroyed.
 struct Hold {
     ReentrantReadWriteLock const* lock;
     ReentrantReadWriteLock::Access access; ///< of the first guard
@@ -137,9 +138,9 @@ struct Hold {
 
 constinit thread_local Hold* holds = nullptr;
 
-/// The pointer that leads to the current thread's hold of a lock, or the null one at the end of the list.
+/// The pointer to the current thread's entry for a lock, or the null pointer at the end of the list.
 Hold** findHold(ReentrantReadWriteLock const* lock) noexcept {
-    auto at = &holds;
+    Hold** at = &holds;
     while (*at != nullptr && (*at)->lock != lock) {
         at = &(*at)->next;
     }
@@ -166,11 +167,11 @@ ReentrantReadWriteLock::LockGuard ReentrantReadWriteLock::writeLock() {
 }
 
 ReentrantReadWriteLock::LockGuard ReentrantReadWriteLock::acquire(Access access) {
-    if (auto* const held = *findHold(this)) {
+    if (Hold* const held = *findHold(this)) {
         if (access == Access::Write && held->access == Access::Read) {
-            // Two threads that read and wait to write would wait for each other for ever.
+            // Two threads that read and wait for the write lock would wait for each other forever.
             throw std::system_error(std::make_error_code(std::errc::resource_deadlock_would_occur),
-                                    "A thread that reads cannot wait to write");
+                                    "A thread with a read guard cannot wait for the write lock");
         }
         ++held->guards;
         return LockGuard(*this);
@@ -184,14 +185,14 @@ ReentrantReadWriteLock::LockGuard ReentrantReadWriteLock::acquire(Access access)
 
 void ReentrantReadWriteLock::release() noexcept {
     auto* const place = findHold(this);
-    auto* const held = *place;
+    Hold* const held = *place;
     if (held == nullptr) {
-        std::terminate(); // taken on another thread: going on would leave the lock held for ever
+        std::terminate(); // taken on another thread: the lock would never be released
     }
     if (--held->guards > 0) {
         return;
     }
-    auto const access = held->access;
+    Access const access = held->access;
     *place = held->next;
     delete held;
     state_->leave(access);

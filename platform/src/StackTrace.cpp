@@ -30,15 +30,15 @@ _Unwind_Reason_Code recordFrame(_Unwind_Context* context, void* argument) {
     if (address == 0 || recording.firstFree == recording.end) {
         return _URC_END_OF_STACK;
     }
-    // The unwinder tells addresses as numbers.
+    // The unwinder reports addresses as numbers.
     *recording.firstFree++ = reinterpret_cast<Frame>(address); // NOLINT(performance-no-int-to-ptr)
     return _URC_NO_REASON;
 }
 
 void describe(std::ostream& out, Frame frame) {
-    // A frame is where its call returns to. Behind a call that never returns another function may begin.
+    // A frame is a return address. After a call that never returns, another function may begin there.
     auto const call = static_cast<char const*>(frame) - 1;
-    auto const name = boost::stacktrace::frame(call).name();
+    std::string const name = boost::stacktrace::frame(call).name();
     out << (name.empty() ? "?" : name);
     Dl_info image{};
     if (dladdr(call, &image) != 0 && image.dli_fname != nullptr) {
@@ -67,7 +67,8 @@ stacktrace_base& stacktrace_base::operator=(stacktrace_base const& other) noexce
 
 // Never inlined: the innermost frame that the unwinder sees is this function's own, which is left out.
 [[gnu::noinline]] void stacktrace_base::capture(unsigned long framesToSkip) noexcept {
-    auto const withThisFrame = std::max(framesToSkip, framesToSkip + 1); // the largest number stays as it is
+    unsigned long const withThisFrame =
+        std::max(framesToSkip, framesToSkip + 1); // the largest number does not overflow
     Recording recording{withThisFrame, frames_, frames_ + capacity_};
     _Unwind_Backtrace(recordFrame, &recording);
     firstFree_ = recording.firstFree;
@@ -80,7 +81,7 @@ std::vector<Frame> stacktrace_base::getFrames() const {
 
 std::string stacktrace_base::toString() const {
     std::ostringstream out;
-    auto const frames = getFrames();
+    std::vector<Frame> const frames = getFrames();
     for (std::size_t i = 0; i < frames.size(); ++i) {
         out << '#' << i << ' ';
         describe(out, frames[i]);

@@ -1,4 +1,5 @@
 #include <climits>
+#include <optional>
 #include <string>
 #include <system_error>
 
@@ -11,12 +12,12 @@ namespace fl::filesystem {
 
 namespace {
 
-/// The working directory is asked for only when it matters: it may have gone from the disk.
+/// Reads the working directory only if it is needed: it may not exist any more.
 std::filesystem::path makeAbsolute(std::filesystem::path const& path) {
     return path.is_absolute() ? path : std::filesystem::current_path() / path;
 }
 
-/// The text without separators at its end, but for the root's.
+/// The text without trailing separators, except that of the root.
 std::u16string withoutTrailingSeparators(std::u16string text) {
     auto const last = text.find_last_not_of(u'/');
     text.resize(last == std::u16string::npos ? 1 : last + 1);
@@ -26,7 +27,7 @@ std::u16string withoutTrailingSeparators(std::u16string text) {
 } // namespace
 
 Path canonical(Path const& path, Path const& base) {
-    auto const absolute = makeAbsolute(toSystem(base) / toSystem(path));
+    std::filesystem::path const absolute = makeAbsolute(toSystem(base) / toSystem(path));
     return withoutTrailingSeparators(fromSystem(std::filesystem::weakly_canonical(absolute)).native());
 }
 
@@ -35,11 +36,12 @@ Path fromSystem(std::filesystem::path const& path) {
 }
 
 std::filesystem::path toSystem(Path const& path) {
-    auto const& text = path.native();
+    std::u16string const& text = path.native();
     std::string bytes(3 * text.size() + 3, '\0');
-    auto const length = encodeName(text, bytes);
+    std::optional<std::size_t> const length = encodeName(text, bytes);
     if (!length) {
-        throw std::filesystem::filesystem_error("This path can name nothing on disk", fl::i18n::toUtf8(text),
+        throw std::filesystem::filesystem_error("This path cannot be the name of a file",
+                                                fl::i18n::toUtf8(text),
                                                 std::make_error_code(std::errc::illegal_byte_sequence));
     }
     bytes.resize(*length);
@@ -47,7 +49,7 @@ std::filesystem::path toSystem(Path const& path) {
 }
 
 SystemName::SystemName(Path const& path) noexcept { // NOLINT(cppcoreguidelines-pro-type-member-init)
-    auto const length = encodeName(path.native(), bytes_);
+    std::optional<std::size_t> const length = encodeName(path.native(), bytes_);
     isValid_ = length && *length < PATH_MAX;
     if (isValid_) {
         bytes_[*length] = '\0';

@@ -7,8 +7,8 @@
 #include "project/core/ProjectReferenceManager.hpp"
 #include "project/core/Unique.hpp"
 
-// The interfaces' destructors stand here so that their type information has one home, by which they can be
-// cast across libraries.
+// The destructors of the interfaces are defined here so that their type information exists in one library
+// only and objects can be cast across libraries.
 
 namespace project::management {
 

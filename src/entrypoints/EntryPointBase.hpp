@@ -4,11 +4,12 @@
 
 namespace project::management {
 
-/// An entry point as it was read from the store. It cannot be edited: an EntryPointDefinition of it can.
+/// An entry point that was read from the store. It cannot be edited; an EntryPointDefinition copied from it
+/// can.
 class EntryPointBase : public EntryPoint {
 public:
     /// @param file absolute.
-    /// @param group null for an entry point without one.
+    /// @param group null for an entry point without a group.
     EntryPointBase(Path file, EntryPointType type, std::u16string name, std::u16string uuid, bool visible,
                    std::unique_ptr<EntryPointGroup> group,
                    std::map<std::u16string, std::u16string> extensionData);

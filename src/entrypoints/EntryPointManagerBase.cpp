@@ -40,8 +40,8 @@ findGroup(std::map<std::u16string, std::unique_ptr<EntryPointGroup>> const& grou
           std::u16string const& storedUUID) {
     auto const found = groups.find(storedUUID.empty() ? schema::entrypoints::defaultGroupUUID : storedUUID);
     if (found == groups.end()) {
-        // The group was deleted, or comes with another branch that is yet to be merged. The entry point goes
-        // without until then; its stored UUID stays.
+        // The group was deleted, or is on a branch that is not merged yet. The entry point has no group until
+        // then, and the UUID stays stored.
         return nullptr;
     }
     return std::make_unique<EntryPointGroupBase>(found->second->getName(), found->second->getUUID());
@@ -60,7 +60,7 @@ std::map<std::u16string, std::u16string> readExtensionData(MetadataNode const& n
 
 void addExtensionData(MetadataNode& node, EntryPoint const& entryPoint) {
     for (auto const& key : entryPoint.getExtensionKeys()) {
-        auto* const child = node.addChild(schema::entrypoints::extensionType);
+        MetadataNode* const child = node.addChild(schema::entrypoints::extensionType);
         child->put(schema::entrypoints::extensionNameKey, key);
         if (auto const value = entryPoint.getExtensionData(key)) {
             child->put(schema::entrypoints::extensionValueKey, *value);
@@ -85,7 +85,7 @@ void EntryPointManagerBase::setEntryPoint(EntryPoint& entryPoint) {
 
 std::vector<std::unique_ptr<EntryPoint>> EntryPointManagerBase::getEntryPoints() {
     auto const guard = metadataManager_->acquireReadLock();
-    auto const groups = getGroupMap();
+    GroupMap const groups = getGroupMap();
     std::vector<std::unique_ptr<EntryPoint>> result;
     for (auto const& path : getEntryPointNodes()) {
         if (auto entryPoint = readEntryPoint(path, groups)) {
@@ -97,10 +97,10 @@ std::vector<std::unique_ptr<EntryPoint>> EntryPointManagerBase::getEntryPoints()
 
 std::unique_ptr<EntryPoint> EntryPointManagerBase::getEntryPoint(Path file) {
     auto const guard = metadataManager_->acquireReadLock();
-    auto const uuid = findUUIDForFile(file);
+    std::u16string const uuid = findUUIDForFile(file);
     if (uuid.empty()) {
-        // For any file, also for one outside the project: the caller edits what it gets and sets it, and only
-        // setting it requires the file to be in the project.
+        // For any file, also for one outside the project: the caller edits the definition and stores it, and
+        // only setEntryPoint requires the file to be in the project.
         return std::make_unique<EntryPointDefinition>(file);
     }
     return readEntryPoint(entryPointPath(uuid), getGroupMap());
@@ -109,7 +109,7 @@ std::unique_ptr<EntryPoint> EntryPointManagerBase::getEntryPoint(Path file) {
 void EntryPointManagerBase::removeEntryPoint(Path file) {
     auto const guard = metadataManager_->acquireWriteLock();
     requireInProject(file);
-    auto const storedFile = getStoredFile(file);
+    std::u16string const storedFile = getStoredFile(file);
     std::vector<MetadataPath> found;
     for (auto const& path : getEntryPointNodes()) {
         auto const node = metadataManager_->getNode(path);
@@ -129,15 +129,15 @@ void EntryPointManagerBase::requireInProject(Path const& file) const {
 }
 
 std::u16string EntryPointManagerBase::getStoredFile(Path const& file) const {
-    auto result = metadata::getRelativePath(projectRoot_, file);
-    // One spelling on every system that opens the project, since entry points are found by this text. A name
-    // that holds a backslash itself pays for it: its entry point leads elsewhere when it is read.
+    std::u16string result = metadata::getRelativePath(projectRoot_, file);
+    // Entry points are found by this text, so every system that opens the project must spell it the same. The
+    // price: the entry point of a name that contains a backslash is read with another path.
     std::replace(result.begin(), result.end(), u'\\', u'/');
     return result;
 }
 
 std::vector<MetadataPath> EntryPointManagerBase::getEntryPointNodes() const {
-    auto const head = entryPointsHead();
+    MetadataPath const head = entryPointsHead();
     if (!metadataManager_->pathExists(head)) {
         return {};
     }
@@ -145,7 +145,7 @@ std::vector<MetadataPath> EntryPointManagerBase::getEntryPointNodes() const {
 }
 
 std::u16string EntryPointManagerBase::findUUIDForFile(Path const& file) const {
-    auto const storedFile = getStoredFile(file);
+    std::u16string const storedFile = getStoredFile(file);
     for (auto const& path : getEntryPointNodes()) {
         auto const node = metadataManager_->getNode(path);
         if (node && node->get(schema::entrypoints::fileKey) == storedFile) {
@@ -156,12 +156,12 @@ std::u16string EntryPointManagerBase::findUUIDForFile(Path const& file) const {
 }
 
 std::u16string EntryPointManagerBase::getUUIDToWrite(EntryPoint const& entryPoint) const {
-    // A UUID that is given is taken without a look at other nodes: an entry point that was read and edited
-    // goes back to its own node, also when it stands on another file by now.
-    if (auto uuid = entryPoint.getUUID(); !uuid.empty()) {
+    // A given UUID is used without a check of other nodes: an entry point that was read and edited replaces
+    // its own node, also if its file has changed since.
+    if (std::u16string uuid = entryPoint.getUUID(); !uuid.empty()) {
         return uuid;
     }
-    if (auto uuid = findUUIDForFile(entryPoint.getFile()); !uuid.empty()) {
+    if (std::u16string uuid = findUUIDForFile(entryPoint.getFile()); !uuid.empty()) {
         return uuid;
     }
     return EntryPointDefinition(entryPoint).generateUUIDIfNotSpecified().getUUID();
@@ -173,9 +173,9 @@ std::unique_ptr<EntryPoint> EntryPointManagerBase::readEntryPoint(MetadataPath c
     if (!node) {
         return nullptr;
     }
-    auto file = projectRoot_ / node->get(schema::entrypoints::fileKey);
-    // Asked before anything else is read, so that a damaged entry of a file that has left the project does
-    // not spoil the whole list.
+    Path file = projectRoot_ / node->get(schema::entrypoints::fileKey);
+    // Checked before anything else is read, so that an unreadable entry point of a file outside the project
+    // does not make the whole list fail.
     if (!fileManager_->isFileInProject(file)) {
         return nullptr;
     }
@@ -187,15 +187,15 @@ std::unique_ptr<EntryPoint> EntryPointManagerBase::readEntryPoint(MetadataPath c
 }
 
 void EntryPointManagerBase::writeEntryPoint(EntryPoint const& entryPoint) {
-    auto const uuid = getUUIDToWrite(entryPoint);
+    std::u16string const uuid = getUUIDToWrite(entryPoint);
     auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
     node->put(schema::entrypoints::fileKey, getStoredFile(entryPoint.getFile()));
     node->put(schema::entrypoints::nameKey, entryPoint.getName());
     node->put(schema::entrypoints::typeKey, toString(entryPoint.getType()));
     node->put(schema::entrypoints::visibleKey,
               entryPoint.isVisible() ? schema::entrypoints::visible : schema::entrypoints::hidden);
-    // Without a group nothing is stored, which reads as the default group: writing back an entry point whose
-    // group was deleted brings it there.
+    // Without a group nothing is stored, which reads as the default group: an entry point whose group was
+    // deleted moves there when it is written again.
     if (auto const group = entryPoint.getGroup()) {
         node->put(schema::entrypoints::groupUUIDKey, group->getUUID());
     }

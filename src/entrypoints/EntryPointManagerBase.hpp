@@ -12,15 +12,15 @@
 
 namespace project::management {
 
-/// The entry points and their groups over a metadata store. Nothing is kept in memory, and there is no index:
-/// looking up the entry point of a file reads one node after the other.
+/// The entry points and their groups over a metadata store. It keeps nothing in memory and has no index: the
+/// search for the entry point of a file reads one node after the other.
 ///
-/// An entry point is stored under its UUID, with its file as a key. The file list does not know of entry
-/// points, so the two can get apart: an entry point whose file is not in the project is left out of every
-/// result, and stays stored.
+/// An entry point is stored under its UUID, with its file as a key. The file list does not refer to entry
+/// points, so an entry point can exist whose file is not in the project. It stays stored and is left out of
+/// every result.
 class EntryPointManagerBase : public EntryPointManager {
 public:
-    /// @param fileManager borrowed; it must outlive this object.
+    /// @param fileManager must outlive this object.
     EntryPointManagerBase(std::shared_ptr<metadata::MetadataManager> metadataManager,
                           FileManager* fileManager, Path projectRoot);
 
@@ -29,7 +29,7 @@ public:
     std::unique_ptr<EntryPoint> getEntryPoint(Path file) override;
     void removeEntryPoint(Path file) override;
 
-    // The group operations stand in EntryPointManagerGroups.cpp.
+    // The group operations are defined in EntryPointManagerGroups.cpp.
     std::vector<std::unique_ptr<EntryPointGroup>> getEntryPointGroups() override;
     void deleteEntryPointGroup(EntryPointGroup const& group) override;
     void createEntryPointGroup(EntryPointGroup const& group) override;

@@ -37,17 +37,17 @@ std::vector<std::unique_ptr<EntryPointGroup>> EntryPointManagerBase::getEntryPoi
     auto const guard = metadataManager_->acquireReadLock();
     std::vector<std::unique_ptr<EntryPointGroup>> result;
     result.push_back(getDefaultGroup());
-    auto const head = groupsHead();
+    MetadataPath const head = groupsHead();
     if (!metadataManager_->pathExists(head)) {
         return result;
     }
     for (auto const& path : metadataManager_->getChildNodes(head)) {
-        auto const leaf = path.getLeaf();
+        metadata::PathElement const leaf = path.getLeaf();
         if (leaf.getType() != schema::entrypoints::groupType) {
             continue;
         }
         if (auto const node = metadataManager_->getNode(path)) {
-            auto const& name = node->get(schema::entrypoints::groupNameKey);
+            std::u16string const& name = node->get(schema::entrypoints::groupNameKey);
             result.push_back(std::make_unique<EntryPointGroupBase>(name, leaf.getLocation()));
         }
     }
@@ -56,10 +56,10 @@ std::vector<std::unique_ptr<EntryPointGroup>> EntryPointManagerBase::getEntryPoi
 
 void EntryPointManagerBase::deleteEntryPointGroup(EntryPointGroup const& group) {
     auto const guard = metadataManager_->acquireWriteLock();
-    auto const uuid = group.getUUID();
+    std::u16string const uuid = group.getUUID();
     std::vector<MetadataPath> found;
     for (auto const& path : metadataManager_->getChildNodes(groupsHead())) {
-        auto const leaf = path.getLeaf();
+        metadata::PathElement const leaf = path.getLeaf();
         if (leaf.getType() == schema::entrypoints::groupType && leaf.getLocation() == uuid) {
             found.push_back(path);
         }
@@ -78,7 +78,7 @@ void EntryPointManagerBase::createEntryPointGroup(EntryPointGroup const& group) 
 void EntryPointManagerBase::renameEntryPointGroup(EntryPointGroup const& group,
                                                   std::u16string const& newName) {
     auto const guard = metadataManager_->acquireWriteLock();
-    auto const uuid = group.getUUID();
+    std::u16string const uuid = group.getUUID();
     if (uuid.empty() || hasGroup(uuid, newName)) {
         return;
     }
@@ -87,17 +87,17 @@ void EntryPointManagerBase::renameEntryPointGroup(EntryPointGroup const& group,
             exception::raise(EntryPointGroupNameDefined(newName));
         }
     }
-    // Whether the group is stored is not asked: this is how the default group, which has no node, gets a name
-    // of its own.
+    // The group does not have to be stored: the default group, which has no node, gets a name of its own
+    // here.
     writeGroup(EntryPointGroupBase(newName, uuid));
 }
 
 EntryPointManagerBase::GroupMap EntryPointManagerBase::getGroupMap() {
     GroupMap result;
     for (auto& group : getEntryPointGroups()) {
-        // The later one of a UUID counts: once the default group was renamed it is listed twice, and entry
-        // points show the name that it was given.
-        auto uuid = group->getUUID();
+        // The last group with a UUID counts: after the default group was renamed it is listed twice, and
+        // entry points show its new name.
+        std::u16string uuid = group->getUUID();
         result.insert_or_assign(std::move(uuid), std::move(group));
     }
     return result;
@@ -111,10 +111,10 @@ bool EntryPointManagerBase::hasGroup(std::u16string const& uuid, std::u16string 
 }
 
 void EntryPointManagerBase::checkNewGroup(EntryPointGroup const& group) {
-    auto const name = group.getName();
-    auto const uuid = group.getUUID();
-    // Also when a subclass lists groups without it, the default group's name is taken.
-    if (auto const defaultName = getDefaultGroup()->getName(); name == defaultName) {
+    std::u16string const name = group.getName();
+    std::u16string const uuid = group.getUUID();
+    // The default group's name is in use even if a subclass lists the groups without it.
+    if (std::u16string const defaultName = getDefaultGroup()->getName(); name == defaultName) {
         exception::raise(EntryPointGroupNameDefined(defaultName));
     }
     for (auto const& listed : getEntryPointGroups()) {

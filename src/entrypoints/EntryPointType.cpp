@@ -16,7 +16,7 @@ namespace {
 using NamesByType = std::map<EntryPointType, std::u16string>;
 using TypesByName = std::map<std::u16string, EntryPointType>;
 
-// The first pair of a type is the one that counts, so that "Batch_Job" is what is stored for batch jobs.
+// The first pair of a type counts, so that "Batch_Job" is stored for batch jobs.
 NamesByType namesByType = {
     {EntryPointType::Basic, u"Basic"},        {EntryPointType::Startup, u"Startup"},
     {EntryPointType::Shutdown, u"Shutdown"},  {EntryPointType::BatchJob, u"Batch_Job"},
@@ -32,8 +32,8 @@ TypesByName invert(NamesByType const& names) {
 }
 
 TypesByName makeTypesByName() {
-    auto result = invert(namesByType);
-    // Stores hold these spellings too; they are read and never written.
+    TypesByName result = invert(namesByType);
+    // Existing projects contain these spellings too. They are read and never written.
     result[u"StartUp"] = EntryPointType::Startup;
     result[u"Batch Job"] = EntryPointType::BatchJob;
     return result;
@@ -44,8 +44,8 @@ TypesByName const typesByName = makeTypesByName();
 } // namespace
 
 std::u16string toString(EntryPointType type) {
-    // A value without a name is given the empty one and never fails: who writes an entry point of a type that
-    // is not known here must be able to write it, and only reading it again is an error.
+    // A value without a name gets the empty name and not an error: an entry point of an unknown type can be
+    // written, and only reading it is an error.
     return namesByType[type];
 }
 

@@ -53,8 +53,8 @@ void FileManagerBase::add(std::vector<Path> const& files) {
     FileNodes batch;
     for (auto& path : withParentFolders(files, projectRoot_)) {
         requireAddable(path);
-        // A new empty node also for what is in the project already: adding a file again drops its labels,
-        // and those of the folders above it. Callers count on a file that was just added being bare.
+        // A new empty node also for a file that is in the project already: adding it again drops its labels,
+        // and those of the folders above it. Callers rely on a file that was just added having no labels.
         batch.emplace_hint(batch.end(), std::move(path),
                            std::make_shared<MetadataNodeSpecification>(schema::nodeType));
     }
@@ -63,7 +63,7 @@ void FileManagerBase::add(std::vector<Path> const& files) {
 
 void FileManagerBase::requireAddable(Path const& path) const {
     if (isFileInProject(path)) {
-        return; // also when it has gone from the disk
+        return; // also if it does not exist on disk any more
     }
     if (isMetadataFile(path)) {
         exception::raise(FileIsMetadataError(path.native()));
@@ -87,7 +87,7 @@ bool FileManagerBase::isFileInProject(Path const& path) const {
 
 std::vector<Path> FileManagerBase::remove(std::vector<Path> const& files) {
     auto const guard = metadataManager_->acquireWriteLock();
-    auto result = withAllDescendants(files);
+    std::vector<Path> result = withAllDescendants(files);
     requireRemovable(result);
     removeEntryPointsOf(result);
     removeFromEveryScope(files);
@@ -119,7 +119,7 @@ void FileManagerBase::removeEntryPointsOf(std::vector<Path> const& files) {
 
 void FileManagerBase::removeFromEveryScope(std::vector<Path> const& files) {
     for (auto const& head : metadataManager_->getChildNodes(MetadataPath::root())) {
-        auto const leaf = head.getLeaf();
+        metadata::PathElement const leaf = head.getLeaf();
         if (leaf.getType() == schema::files::filesType) {
             getFileMetadataManagerFor(leaf.getLocation())->removeFileNodes(files);
         }
@@ -139,7 +139,7 @@ std::vector<Path> FileManagerBase::getProjectFiles() const {
     if (!isFileInProject(projectRoot_)) {
         return {};
     }
-    auto result = withAllDescendants({projectRoot_});
+    std::vector<Path> result = withAllDescendants({projectRoot_});
     std::erase(result, projectRoot_);
     return result;
 }

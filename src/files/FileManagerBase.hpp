@@ -10,20 +10,20 @@
 
 namespace project::management {
 
-/// The file list over a metadata store. Nothing is kept in memory: a file is in the project when the store
-/// has a node for it, or when it is the root.
+/// The file list over a metadata store. It keeps nothing in memory: a file is in the project if the store has
+/// a node for it, or if it is the root.
 ///
-/// The entry point manager and the label manager, which need the file manager themselves, are set after
-/// construction and before remove and the label operations are used.
+/// The entry point manager and the label manager need the file manager themselves. They are therefore set
+/// after construction, before the first call of remove and of the label operations.
 class FileManagerBase : public FileManager {
 public:
     FileManagerBase(Path projectRoot, std::shared_ptr<metadata::MetadataManager> metadataManager);
     ~FileManagerBase() override;
 
-    /// Borrows the manager; it is asked by remove.
+    /// Sets the manager that remove uses. It must outlive this object.
     void setEntryPointManager(EntryPointManager* entryPointManager);
 
-    /// Borrows the manager; it is asked by the label operations.
+    /// Sets the manager that the label operations use. It must outlive this object.
     void setLabelManager(LabelManager* labelManager);
 
     Path getProjectRoot() override;
@@ -34,7 +34,7 @@ public:
     std::vector<Path> getChildProjectFiles(Path const& path) const override;
     std::vector<Path> getProjectFiles() const override;
 
-    // The label operations stand in FileManagerLabels.cpp.
+    // The label operations are defined in FileManagerLabels.cpp.
     std::vector<FileLabel> addLabels(std::vector<Path> const& files,
                                      std::vector<Label> const& labels) override;
     void removeLabels(std::vector<Path> const& files, std::vector<Label> const& labels) override;

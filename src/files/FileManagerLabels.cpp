@@ -1,4 +1,4 @@
-// The label operations of FileManagerBase: which labels stand on which files.
+// The label operations of FileManagerBase.
 
 #include <algorithm>
 #include <iterator>
@@ -22,7 +22,7 @@ using metadata::PathElement;
 
 namespace {
 
-/// The children of a node as they are now, so that a loop over them may remove them.
+/// A copy of the list of nested nodes, so that a loop over it may remove them.
 std::vector<MetadataNode*> childrenOf(MetadataNode const& node) {
     std::vector<MetadataNode*> result;
     result.reserve(node.getChildren().size());
@@ -32,7 +32,7 @@ std::vector<MetadataNode*> childrenOf(MetadataNode const& node) {
     return result;
 }
 
-/// The first child of a type whose key has a value; null when there is none.
+/// The first nested node of a type whose key has a value; null if there is none.
 MetadataNode* findChild(MetadataNode const& node, std::u16string_view type, std::u16string const& key,
                         std::u16string const& value) {
     for (auto const& child : node.getChildren()) {
@@ -47,26 +47,27 @@ MetadataNode* findCategory(MetadataNode const& fileNode, std::u16string const& u
     return findChild(fileNode, schema::files::categoryType, schema::files::categoryUUIDKey, uuid);
 }
 
-/// @return whether the label had data.
+/// @return true if the label had data.
 bool removeLabelData(MetadataNode& dataNode, Label const& label) {
-    bool removed = false;
+    bool hasData = false;
     for (auto* const record : childrenOf(dataNode)) {
         if (record->get(schema::files::recordUUIDKey) == label.getUUID()) {
             dataNode.removeChild(record);
-            removed = true;
+            hasData = true;
         }
     }
-    return removed;
+    return hasData;
 }
 
-/// Takes one label off a file's node, and its data; one that is not there is passed over, data and all.
-/// @return whether the label had data.
+/// Removes a label and its data from a file's nodes. For a label that the file does not have, its data stays
+/// too.
+/// @return true if the label had data.
 bool removeLabel(MetadataNode& fileNode, MetadataNode& dataNode, Label const& label) {
-    auto* const categoryNode = findCategory(fileNode, label.getCategory().getUUID());
+    MetadataNode* const categoryNode = findCategory(fileNode, label.getCategory().getUUID());
     if (categoryNode == nullptr) {
         return false;
     }
-    auto* const labelNode =
+    MetadataNode* const labelNode =
         findChild(*categoryNode, schema::files::labelType, schema::files::labelUUIDKey, label.getUUID());
     if (labelNode == nullptr) {
         return false;
@@ -79,12 +80,12 @@ bool removeLabel(MetadataNode& fileNode, MetadataNode& dataNode, Label const& la
 }
 
 void appendLabelIDSets(MetadataNode const& categoryNode, std::vector<LabelIDSet>& result) {
-    auto const& categoryUUID = categoryNode.get(schema::files::categoryUUIDKey);
+    std::u16string const& categoryUUID = categoryNode.get(schema::files::categoryUUIDKey);
     if (categoryUUID.empty()) {
         return;
     }
     for (auto const& child : categoryNode.getChildren()) {
-        auto const& labelUUID = child->get(schema::files::labelUUIDKey);
+        std::u16string const& labelUUID = child->get(schema::files::labelUUIDKey);
         if (child->getType() == schema::files::labelType && !labelUUID.empty()) {
             result.emplace_back(categoryUUID, labelUUID);
         }
@@ -117,9 +118,10 @@ std::vector<FileLabel> FileManagerBase::addLabels(std::vector<Path> const& files
 }
 
 bool FileManagerBase::hasLabel(Path const& path, Label const& label) {
-    // The label stands first here and the category first in what it is compared with, so this is true only
-    // for a label and a category of one UUID. addLabels depends on the false answer: putting on a label that
-    // is there displaces it and tells its data, or in a multi-valued category counts it once more.
+    // The label's UUID is first here and the category's is first in the pairs of getLabelIDSets, so this is
+    // true only for a label and a category with the same UUID. addLabels depends on the result false: adding
+    // a label that the file has replaces it and returns its data, or in a multi-valued category adds it once
+    // more.
     LabelIDSet const pair(label.getUUID(), label.getCategory().getUUID());
     auto const pairs = getLabelIDSets(path);
     return std::ranges::find(pairs, pair) != pairs.end();
@@ -128,8 +130,8 @@ bool FileManagerBase::hasLabel(Path const& path, Label const& label) {
 std::vector<FileLabel> FileManagerBase::addLabelToNode(MetadataNode& node, Label const& label,
                                                        Path const& path) {
     std::vector<FileLabel> displaced;
-    auto const& category = label.getCategory();
-    auto* categoryNode = findCategory(node, category.getUUID());
+    CategoryIdentifier const& category = label.getCategory();
+    MetadataNode* categoryNode = findCategory(node, category.getUUID());
     if (categoryNode == nullptr) {
         categoryNode = node.addChild(schema::files::categoryType);
         categoryNode->put(schema::files::categoryUUIDKey, category.getUUID());
@@ -144,12 +146,12 @@ std::vector<FileLabel> FileManagerBase::takeCategoryLabels(CategoryIdentifier co
                                                            Path const& path, MetadataNode& categoryNode) {
     std::vector<FileLabel> taken;
     for (auto* const child : childrenOf(categoryNode)) {
-        auto const uuid = child->get(schema::files::labelUUIDKey);
+        std::u16string const uuid = child->get(schema::files::labelUUIDKey);
         try {
             taken.emplace_back(category, labelManager_->getLabelByUUID(category, uuid), path,
                                child->get(schema::files::labelValueKey));
         } catch (exception::ProjectException const&) {
-            // A label that was deleted meanwhile can't be told of, and must not keep others from the file.
+            // A deleted label cannot be returned, and must not prevent other labels from being added.
         }
         categoryNode.removeChild(child);
     }
@@ -160,18 +162,18 @@ void FileManagerBase::removeLabels(std::vector<Path> const& files, std::vector<L
     auto const guard = metadataManager_->acquireWriteLock();
     FileNodes batch;
     FileNodes dataBatch;
-    bool dataRemoved = false;
+    bool hasRemovedData = false;
     for (auto const& file : files) {
         std::shared_ptr<MetadataNode> node = fileStore_->getFileNode(file);
         std::shared_ptr<MetadataNode> dataNode = getLabelDataNode(file);
         for (auto const& label : labels) {
-            dataRemoved |= removeLabel(*node, *dataNode, label);
+            hasRemovedData |= removeLabel(*node, *dataNode, label);
         }
         batch.insert_or_assign(file, std::move(node));
         dataBatch.insert_or_assign(file, std::move(dataNode));
     }
     fileStore_->setFileNodes(std::move(batch));
-    if (dataRemoved) {
+    if (hasRemovedData) {
         writeLabelDataNodes(dataBatch);
     }
 }
@@ -194,16 +196,16 @@ std::vector<FileLabel> FileManagerBase::getLabels(Path const& path) {
     auto const dataNode = getLabelDataNode(path);
     auto const& records = dataNode->getChildren();
     for (auto const& pair : getLabelIDSets(path)) {
-        auto const category = labelManager_->getCategoryByUUID(pair.getCategoryUUID());
-        auto const label = labelManager_->getLabelByUUID(category, pair.getLabelUUID());
+        CategoryIdentifier const category = labelManager_->getCategoryByUUID(pair.getCategoryUUID());
+        LabelIdentifier const label = labelManager_->getLabelByUUID(category, pair.getLabelUUID());
         auto const record = std::ranges::find_if(records, [&](auto const& candidate) {
             return candidate->get(schema::files::recordUUIDKey) == pair.getLabelUUID();
         });
         if (record != records.end()) {
             result.emplace_back(category, label, path, (*record)->get(schema::files::recordValueKey));
         }
-        // Once more without data, whether or not there was a record: so every label on the file has an entry
-        // without data, by which callers count; who needs the data takes the first entry.
+        // Once more without data, with or without a record: every label of the file has an entry without
+        // data, by which callers count labels. Callers that need the data use the first entry.
         result.emplace_back(category, label, path);
     }
     return result;
@@ -211,11 +213,11 @@ std::vector<FileLabel> FileManagerBase::getLabels(Path const& path) {
 
 void FileManagerBase::removeCategory(std::vector<Path> const& files, CategoryIdentifier const& category) {
     auto const guard = metadataManager_->acquireWriteLock();
-    auto const uuid = category.getUUID();
+    std::u16string const uuid = category.getUUID();
     FileNodes batch;
     for (auto const& file : files) {
         std::shared_ptr<MetadataNode> node = fileStore_->getFileNode(file);
-        if (auto* const categoryNode = findCategory(*node, uuid)) {
+        if (MetadataNode* const categoryNode = findCategory(*node, uuid)) {
             node->removeChild(categoryNode);
         }
         batch.insert_or_assign(file, std::move(node));
@@ -229,7 +231,7 @@ MetadataPath FileManagerBase::getLabelDataPath(Path const& path) const {
 }
 
 std::unique_ptr<MetadataNode> FileManagerBase::getLabelDataNode(Path const& path) const {
-    auto const address = getLabelDataPath(path);
+    MetadataPath const address = getLabelDataPath(path);
     auto node = metadataManager_->pathExists(address) ? metadataManager_->getNode(address) : nullptr;
     return node ? std::move(node) : std::make_unique<MetadataNodeSpecification>(schema::nodeType);
 }

@@ -6,8 +6,8 @@
 
 namespace project::management {
 
-/// Lays the files of one scope out in the metadata tree as they lie in the folders below the project root:
-/// the address of a file's node is computed from its path, and nothing is looked up or cached.
+/// Stores the files of one scope in the metadata tree in the shape of the folders below the project's root.
+/// The address of a file's node is computed from its path; nothing is looked up or cached.
 ///
 /// The address is ("Files", scope), then ("File", name) for each element of the path relative to the root.
 class PathLocalizedFileMetadataManager : public FileMetadataManager {
@@ -15,7 +15,7 @@ public:
     using MetadataPath = metadata::MetadataPath;
     using MetadataNode = metadata::MetadataNode;
 
-    /// Stores copies of the three; asks neither the store nor the disk.
+    /// Accesses neither the store nor the disk.
     PathLocalizedFileMetadataManager(Path root, std::shared_ptr<metadata::MetadataManager> metadataManager,
                                      std::u16string scope);
 
@@ -27,17 +27,18 @@ public:
     std::vector<Path> getExtraEntries() override;
     std::vector<Path> getChildFiles(Path file) override;
 
-    /// The address of a file. Pure text work: no lock, no check. A path outside the root gets the address
-    /// that its relative form spells.
+    /// Returns the address of a file, from the text alone, without lock or check. The address of a path
+    /// outside the root has a step for each ".." of its relative form.
     MetadataPath toMetadataPath(Path const& file) const;
 
-    /// The file of an address, whatever the types of its elements; the root for the scope's head.
+    /// Returns the path for an address, whatever the types of its steps; the root for the scope's first step.
     Path toFilePath(MetadataPath const& path) const;
 
-    /// True when a node is stored at the address and its last element denotes a file. Takes the read lock.
+    /// Returns true if the address has a node and its last step has the type of a file or of a scope. Takes
+    /// the read lock.
     bool isFileMetadataPath(MetadataPath const& path);
 
-    /// Adds a file's node to a batch, and the marker when it is a folder on disk now. Takes the write lock.
+    /// Adds a file's node to a batch, and the marker if the path is a folder on disk. Takes the write lock.
     void addFileNode(Path const& file, std::shared_ptr<MetadataNode> node,
                      std::map<MetadataPath, std::shared_ptr<MetadataNode>>& batch);
 

@@ -12,7 +12,7 @@ namespace {
 
 using PathSet = std::set<Path>;
 
-/// Empties the set into a list.
+/// Moves the elements of the set to a list.
 std::vector<Path> toList(PathSet set) {
     std::vector<Path> result;
     result.reserve(set.size());
@@ -22,10 +22,10 @@ std::vector<Path> toList(PathSet set) {
     return result;
 }
 
-/// Lists mostly come sorted, so the end is the place to try first.
-/// @return false when the path was there.
+/// Inserts a path near the end, which is where it belongs in a sorted list.
+/// @return false if the set contained the path.
 bool insertNearEnd(Path const& path, PathSet& result) {
-    auto const before = result.size();
+    std::size_t const before = result.size();
     result.emplace_hint(result.end(), path);
     return result.size() > before;
 }
@@ -38,7 +38,7 @@ bool isWithinFolder(Path const& folder, Path const& path) {
 
 std::vector<Path> withParentFolders(std::vector<Path> const& files, Path const& root) {
     PathSet result;
-    Path known = root; // a folder that is in the set with all above it, or the root
+    Path known = root; // a folder that the set contains with all folders above it, or the root
     for (auto const& file : files) {
         if (!isWithinFolder(root, file)) {
             result.insert(file);
@@ -47,8 +47,8 @@ std::vector<Path> withParentFolders(std::vector<Path> const& files, Path const& 
         if (file == root || !insertNearEnd(file, result)) {
             continue;
         }
-        auto const folder = metadata::getParentFolder(file);
-        auto path = folder;
+        Path const folder = metadata::getParentFolder(file);
+        Path path = folder;
         while (path != known && path != root && result.insert(path).second) {
             path = metadata::getParentFolder(path);
         }
@@ -71,10 +71,10 @@ std::vector<Path> withDescendants(std::vector<Path> const& files,
         waiting.push_back({file, result.end()});
     }
     while (!waiting.empty()) {
-        auto next = std::move(waiting.back());
+        Waiting next = std::move(waiting.back());
         waiting.pop_back();
-        auto children = getChildFiles(next.path);
-        // Children are popped from the last to the first, so each belongs right behind its folder.
+        std::vector<Path> children = getChildFiles(next.path);
+        // Children are popped from the last to the first, so each belongs directly after its folder.
         auto const hint = next.folder == result.end() ? result.end() : std::next(next.folder);
         auto const inserted = result.emplace_hint(hint, std::move(next.path));
         for (auto& child : children) {

@@ -10,16 +10,16 @@ namespace project::management {
 
 using fl::filesystem::Path;
 
-/// True when the path is the folder or lies below it, by the text alone: when the path relative to the folder
-/// does not begin with "..". So a path whose first name below the folder begins with two dots counts as
-/// outside.
+/// Returns true if the path is the folder or below it, from the text alone: if the path relative to the
+/// folder does not begin with "..". A path whose first name below the folder begins with two dots therefore
+/// counts as outside.
 bool isWithinFolder(Path const& folder, Path const& path);
 
-/// The files together with all the folders between them and the root, which itself is left out. A path
-/// outside the root comes alone. In Path order, each once.
+/// Returns the files and all folders between them and the root, without the root itself and without the
+/// folders above a path outside the root. In Path order, without duplicates.
 std::vector<Path> withParentFolders(std::vector<Path> const& files, Path const& root);
 
-/// The files together with everything below them, as getChildFiles tells. In Path order, each once.
+/// Returns the files and everything below them, as getChildFiles lists it. In Path order, without duplicates.
 std::vector<Path> withDescendants(std::vector<Path> const& files,
                                   std::function<std::vector<Path>(Path const&)> const& getChildFiles);
 

@@ -51,9 +51,8 @@ std::u16string boolToFlag(bool value) {
     return value ? schema::categories::flagTrue : schema::categories::flagFalse;
 }
 
-// Both writability checks look at what the caller passed and not at the store: the caller's object is the
-// caller's word. Clients that manage read-only categories pass a writable definition of the same UUID to
-// change one after all.
+// Both checks look at the caller's object and not at the store: clients that manage read-only categories pass
+// a writable definition with the same UUID to change one.
 void requireCategoryWritable(CategoryIdentifier const& category) {
     if (category.isReadOnly()) {
         exception::raise(CanNotModifyReadOnlyCategory());
@@ -61,9 +60,9 @@ void requireCategoryWritable(CategoryIdentifier const& category) {
 }
 
 void requireLabelWritable(CategoryIdentifier const& category, LabelIdentifier const& label) {
-    auto const state = label.isReadOnly();
-    bool const inheritsWritable = state == LabelReadOnlyState::INHERITED && !category.isReadOnly();
-    if (state != LabelReadOnlyState::WRITABLE && !inheritsWritable) {
+    LabelReadOnlyState const state = label.isReadOnly();
+    bool const isInheritedWritable = state == LabelReadOnlyState::INHERITED && !category.isReadOnly();
+    if (state != LabelReadOnlyState::WRITABLE && !isInheritedWritable) {
         exception::raise(CanNotModifyReadOnlyLabel());
     }
 }
@@ -78,8 +77,8 @@ LabelManagerBase::LabelManagerBase(std::shared_ptr<metadata::MetadataManager> me
 void LabelManagerBase::createCategory(CategoryIdentifier const& category) {
     auto const guard = metadataManager_->acquireWriteLock();
     requireCategoryNameFree(category.getName());
-    // That the UUID is new is not checked: under the UUID of another category this one replaces it and keeps
-    // its labels, the only way to give a category other flags.
+    // The UUID may be stored already: the category then replaces the stored one and keeps its labels, which
+    // is the only way to change the flags of a category.
     auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
     node->put(schema::categories::categoryReadOnlyKey, boolToFlag(category.isReadOnly()));
     node->put(schema::categories::categorySingleValuedKey, boolToFlag(category.isSingleValued()));
@@ -90,7 +89,7 @@ void LabelManagerBase::createCategory(CategoryIdentifier const& category) {
 
 CategoryIdentifier LabelManagerBase::getCategoryByUUID(std::u16string const& uuid) {
     auto const guard = metadataManager_->acquireReadLock();
-    auto const path = getCategoryPath(uuid);
+    MetadataPath const path = getCategoryPath(uuid);
     if (!isCategoryPath(path)) {
         exception::raise(CategoryDoesNotExistsByUUID(uuid));
     }
@@ -101,19 +100,19 @@ void LabelManagerBase::deleteCategory(CategoryIdentifier const& category) {
     auto const guard = metadataManager_->acquireWriteLock();
     requireCategoryWritable(category);
     fileManager_->removeCategory(fileManager_->getProjectFiles(), category);
-    remove(getCategoryPath(category.getUUID())); // its labels lie below and go with it
+    remove(getCategoryPath(category.getUUID())); // with its labels, which are below it
 }
 
 void LabelManagerBase::renameCategory(CategoryIdentifier const& category, std::u16string const& newName) {
     auto const guard = metadataManager_->acquireWriteLock();
     requireCategoryWritable(category);
-    auto const path = getCategoryPath(category.getUUID());
+    MetadataPath const path = getCategoryPath(category.getUUID());
     auto const stored = metadataManager_->getNode(path);
     if (!stored) {
         return;
     }
-    // The name is not checked, unlike in createCategory: files refer to the category by UUID, and clients
-    // that exchange the names of two categories pass through a state in which both have the same one.
+    // Unlike in createCategory, another category may have the name: files refer to categories by UUID, and a
+    // client that swaps the names of two categories gives both the same name for a moment.
     auto const node = std::make_shared<MetadataNodeSpecification>(*stored);
     node->put(schema::categories::categoryNameKey, newName);
     write(path, node);
@@ -132,7 +131,7 @@ std::vector<CategoryIdentifier> LabelManagerBase::getAllCategories() {
 
 void LabelManagerBase::createLabel(CategoryIdentifier const& category, LabelIdentifier const& label) {
     auto const guard = metadataManager_->acquireWriteLock();
-    // Read-only categories take new labels too: being read-only guards what is there.
+    // A read-only category accepts new labels too: only existing labels are protected.
     requireLabelNameFree(category, label.getName());
     auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
     node->put(schema::categories::labelNameKey, label.getName());
@@ -154,7 +153,7 @@ std::vector<LabelIdentifier> LabelManagerBase::getLabels(CategoryIdentifier cons
 LabelIdentifier LabelManagerBase::getLabelByUUID(CategoryIdentifier const& category, std::u16string uuid) {
     auto const guard = metadataManager_->acquireReadLock();
     requireCategoryPath(category);
-    auto const path = getLabelPath(category, uuid);
+    MetadataPath const path = getLabelPath(category, uuid);
     if (!metadataManager_->pathExists(path)) {
         exception::raise(LabelDoesNotExistsByUUID(uuid));
     }
@@ -185,7 +184,8 @@ CategoryIdentifier LabelManagerBase::readCategory(MetadataPath const& path) {
 LabelIdentifier LabelManagerBase::readLabel(MetadataPath const& path) {
     std::unique_ptr<MetadataNode const> node = metadataManager_->getNode(path);
     if (!node) {
-        // An address may exist without a node, and getLabelByUUID asks for no more: it reads as an empty one.
+        // getLabelByUUID requires an address and not a node. An address without a node reads like an empty
+        // one.
         node = std::make_unique<MetadataNodeSpecification>(schema::nodeType);
     }
     LabelDefinition label(node->get(schema::categories::labelNameKey), path.getLeaf().getLocation());
@@ -193,10 +193,10 @@ LabelIdentifier LabelManagerBase::readLabel(MetadataPath const& path) {
     return label;
 }
 
-/// The address of a category that has one, with a node or not: labels that lie below an address without a
-/// node stay within reach, while getCategoryByUUID has nothing to read there and answers that it is gone.
+/// Returns the address of a category, with or without a node: labels below an address without a node can
+/// still be read, while getCategoryByUUID throws for it.
 MetadataPath LabelManagerBase::requireCategoryPath(CategoryIdentifier const& category) {
-    auto path = getCategoryPath(category.getUUID());
+    MetadataPath path = getCategoryPath(category.getUUID());
     if (!metadataManager_->pathExists(path)) {
         exception::raise(CategoryDoesNotExist(category.getName()));
     }

@@ -10,15 +10,15 @@
 
 namespace project::management {
 
-/// The categories and labels over a metadata store. Nothing is kept in memory: each call goes to the store.
+/// The categories and labels over a metadata store. It keeps nothing in memory: each call reads the store.
 ///
-/// Only definitions are kept here. What stands on files is cleaned through the file manager before a
-/// definition goes, so that files don't keep labels that nobody can resolve; a label that stands twice on a
-/// file is taken off once by deleteLabel, as by FileManager::removeLabels.
+/// This manager stores definitions only. Before it removes one, it removes the labels from the files through
+/// the file manager, so that files do not keep labels that cannot be resolved. A label that a file has twice
+/// is removed once by deleteLabel, as by FileManager::removeLabels.
 class LabelManagerBase : public LabelManager {
 public:
-    /// Neither store nor file manager is touched.
-    /// @param fileManager borrowed; must outlive this object.
+    /// Accesses neither the store nor the file manager.
+    /// @param fileManager must outlive this object.
     LabelManagerBase(std::shared_ptr<metadata::MetadataManager> metadataManager, FileManager* fileManager);
 
     void createCategory(CategoryIdentifier const& category) override;

@@ -4,22 +4,23 @@
 
 namespace project::test {
 
-/// Writes down in which order this thread deletes some objects, while it lives. One at a time.
+/// Records the order in which this thread deletes some objects, as long as the log exists. Only one log may
+/// exist.
 ///
-/// The program's operator delete is replaced for this, since an object that nobody can subclass tells of its
-/// end in no other way.
+/// It replaces the program's operator delete, because the end of an object of a class that cannot be derived
+/// from is not visible otherwise.
 class DeletionLog {
 public:
-    /// @param objects the addresses that operator new gave for them.
+    /// @param objects their addresses, as operator new returned them.
     explicit DeletionLog(std::vector<void const*> objects);
     ~DeletionLog();
     DeletionLog(DeletionLog const&) = delete;
     DeletionLog& operator=(DeletionLog const&) = delete;
 
-    /// Those that were deleted up to now, the first one first.
+    /// Returns the objects that were deleted so far, in order.
     std::vector<void const*> const& deleted() const { return deleted_; }
 
-    /// Called by operator delete; allocates nothing.
+    /// Called by operator delete. Does not allocate.
     void note(void const* object) noexcept;
 
 private:

@@ -18,7 +18,7 @@
 #include "support/RecordingMetadataManager.hpp"
 #include "support/TemporaryFolder.hpp"
 
-// How the five managers of a project are tied together, and how they go.
+// The connections between the five managers of a project, and their destruction.
 
 namespace project::management {
 namespace {
@@ -32,7 +32,7 @@ void const* addressOf(T& object) {
     return dynamic_cast<void const*>(&object);
 }
 
-/// Stands for what a decorator would give in place of a project's file manager: fails whatever it is asked.
+/// A file manager that a decorator could return in place of the project's own. All its operations fail.
 class UnusableFileManager : public FileManager {
 public:
     Path getProjectRoot() override { fail(); }
@@ -84,7 +84,7 @@ protected:
     ProjectManagerBase project{folder.root(), store};
 };
 
-TEST_F(ProjectAssemblyTest, buildingAProjectLeavesTheStoreAlone) {
+TEST_F(ProjectAssemblyTest, constructingAProjectDoesNotAccessTheStore) {
     EXPECT_THAT(store->calls(), IsEmpty());
     EXPECT_TRUE(store->isEmpty());
 }
@@ -147,7 +147,7 @@ TEST_F(ProjectAssemblyTest, aFilesLabelsAreResolvedThroughTheProjectsLabelManage
     EXPECT_EQ(project.getFileManager().getLabels(file).at(0).getLabelIdentifier().getName(), u"Source");
 }
 
-TEST_F(ProjectAssemblyTest, aDeletedCategoryGoesFromTheFilesPastAnyDecorator) {
+TEST_F(ProjectAssemblyTest, aDeletedCategoryIsRemovedFromTheFilesPastAnyDecorator) {
     auto const file = folder.file(u"a.txt");
     CategoryDefinition const category(u"Kind", u"c");
     LabelDefinition const label(u"Source", u"l");
@@ -169,7 +169,7 @@ TEST_F(ProjectAssemblyTest, anEntryPointIsCheckedAgainstTheFilesPastAnyDecorator
     EXPECT_EQ(decorated.getEntryPointManager().getEntryPoints().size(), 1U);
 }
 
-TEST_F(ProjectAssemblyTest, theStoreLivesOnWhenSomebodyElseHoldsIt) {
+TEST_F(ProjectAssemblyTest, theStoreOutlivesTheProjectIfItIsShared) {
     std::weak_ptr<test::RecordingMetadataManager> const watched = store;
     auto owned = std::make_shared<test::RecordingMetadataManager>();
     std::weak_ptr<test::RecordingMetadataManager> const watchedOwned = owned;
@@ -182,7 +182,7 @@ TEST_F(ProjectAssemblyTest, theStoreLivesOnWhenSomebodyElseHoldsIt) {
     EXPECT_FALSE(watched.expired());
 }
 
-TEST_F(ProjectAssemblyTest, theManagersGoInReverseOrderOfConstructionAndTheStoreLast) {
+TEST_F(ProjectAssemblyTest, theManagersAreDestroyedInReverseOrderOfConstructionAndTheStoreLast) {
     auto* const bareStore = new test::RecordingMetadataManager();
     auto owned = std::make_unique<ProjectManagerBase>(u"/project",
                                                       std::shared_ptr<metadata::MetadataManager>(bareStore));

@@ -6,8 +6,7 @@
 
 #include "support/RecordingMetadataManager.hpp"
 
-// The project's name and description, and what goes to the store; the managers stand in
-// ProjectAssemblyTest.cpp.
+// The project's name and description, and its calls of the store. ProjectAssemblyTest.cpp tests the managers.
 
 namespace project::management {
 namespace {
@@ -31,7 +30,7 @@ protected:
     ProjectManagerBase project{u"/project", store};
 };
 
-/// Hands a listener on, and keeps it to look at.
+/// Subscribes a listener, and keeps it for the test.
 class SubscribingStore : public test::RecordingMetadataManager {
 public:
     void subscribe(std::weak_ptr<FileChangeRequestListener> listener) override {
@@ -42,7 +41,7 @@ public:
     std::weak_ptr<FileChangeRequestListener> subscribed;
 };
 
-/// Says that it has every node and gives none.
+/// A store that claims to have every node and returns none.
 class ForgetfulStore : public test::RecordingMetadataManager {
 public:
     bool hasNode(MetadataPath const&) override { return true; }
@@ -70,7 +69,7 @@ public:
     std::vector<std::u16string> names;
 };
 
-TEST_F(ProjectManagerBaseTest, constructionLeavesTheStoreAlone) {
+TEST_F(ProjectManagerBaseTest, constructionDoesNotAccessTheStore) {
     EXPECT_THAT(store->calls(), IsEmpty());
     EXPECT_TRUE(store->isEmpty());
 }
@@ -82,14 +81,14 @@ TEST_F(ProjectManagerBaseTest, anEmptyStoreReadsAsEmptyTextsAndStaysEmpty) {
     EXPECT_TRUE(store->isEmpty());
 }
 
-TEST_F(ProjectManagerBaseTest, creatingAProjectGivesItItsNameAndNoDescription) {
+TEST_F(ProjectManagerBaseTest, creatingAProjectStoresItsNameAndNoDescription) {
     project.create(u"Engine");
     EXPECT_EQ(project.getName(), u"Engine");
     EXPECT_EQ(project.getDescription(), u"");
     EXPECT_THAT(store->writes(), ElementsAre("setNodes"));
 }
 
-TEST_F(ProjectManagerBaseTest, creatingAProjectGoesThroughTheNameThatASubclassSets) {
+TEST_F(ProjectManagerBaseTest, creatingAProjectUsesTheSetNameOfASubclass) {
     RenamedProject renamed(u"/project", store);
     renamed.create(u"Engine");
     EXPECT_THAT(renamed.names, ElementsAre(u"Engine"));
@@ -119,14 +118,14 @@ TEST_F(ProjectManagerBaseTest, eachNodeHasOneKeyAndNoType) {
     EXPECT_THAT(description->getKeys(), ElementsAre(u"description"));
 }
 
-TEST_F(ProjectManagerBaseTest, settingANameReadsNothingAndReplacesWhatStoodThere) {
+TEST_F(ProjectManagerBaseTest, settingANameReadsNothingAndReplacesTheNode) {
     store->put(NAME, {{u"Name", u"Old"}, {u"Other", u"1"}});
     project.setName(u"Engine");
     EXPECT_THAT(store->operations(), ElementsAre("setNodes"));
     EXPECT_THAT(store->content().getNode(NAME)->getKeys(), ElementsAre(u"Name"));
 }
 
-TEST_F(ProjectManagerBaseTest, anEmptyNameIsStoredAndReadsLikeNone) {
+TEST_F(ProjectManagerBaseTest, anEmptyNameIsStoredAndReadsLikeNoName) {
     project.setName(u"");
     EXPECT_TRUE(store->content().hasNode(NAME));
     EXPECT_THAT(store->content().getNode(NAME)->getKeys(), ElementsAre(u"Name"));
@@ -138,7 +137,7 @@ TEST_F(ProjectManagerBaseTest, aNodeWithoutTheKeyReadsAsTheEmptyText) {
     EXPECT_EQ(project.getName(), u"");
 }
 
-TEST_F(ProjectManagerBaseTest, aNodeThatIsGoneWhenItIsReadIsTheEmptyText) {
+TEST_F(ProjectManagerBaseTest, aNodeThatWasRemovedBeforeItIsReadIsTheEmptyText) {
     ProjectManagerBase const forgotten(u"/project", std::make_shared<ForgetfulStore>());
     EXPECT_EQ(forgotten.getName(), u"");
     EXPECT_EQ(forgotten.getDescription(), u"");
@@ -149,7 +148,7 @@ TEST_F(ProjectManagerBaseTest, theAddressesAreTheSameForEveryProject) {
     EXPECT_EQ(ProjectManagerBase::getDescriptionNodePath(), DESCRIPTION);
 }
 
-TEST_F(ProjectManagerBaseTest, thePublicConstantsAreWhatTheStoreHolds) {
+TEST_F(ProjectManagerBaseTest, thePublicConstantsAreTheStoredTexts) {
     EXPECT_EQ(ProjectManagerBase::NAME_FIELD, u"Name");
     EXPECT_EQ(ProjectManagerBase::DESCRIPTION_FIELD, u"description");
     EXPECT_EQ(ProjectManagerBase::ROOT_METADATA, u"ProjectData");
@@ -161,17 +160,17 @@ TEST_F(ProjectManagerBaseTest, thePublicConstantsAreWhatTheStoreHolds) {
 TEST_F(ProjectManagerBaseTest, queriesReadAndChangesWriteUnderOneGuard) {
     project.setName(u"Engine");
     project.getName();
-    std::vector<std::pair<std::string, Guard>> made;
+    std::vector<std::pair<std::string, Guard>> calls;
     for (auto const& call : store->calls()) {
-        made.emplace_back(call.operation, call.guard);
+        calls.emplace_back(call.operation, call.guard);
     }
-    EXPECT_THAT(made,
+    EXPECT_THAT(calls,
                 ElementsAre(std::pair("acquireWriteLock", Guard::None), std::pair("setNodes", Guard::Write),
                             std::pair("acquireReadLock", Guard::None), std::pair("hasNode", Guard::Read),
                             std::pair("getNode", Guard::Read)));
 }
 
-TEST_F(ProjectManagerBaseTest, whatTheStoreThrowsReachesTheCallerAndTheGuardIsReleased) {
+TEST_F(ProjectManagerBaseTest, anExceptionOfTheStorePropagatesAndTheGuardIsReleased) {
     store->failOn("setNodes", [] { throw std::runtime_error("disk full"); });
     EXPECT_THROW(project.setDescription(u"Two strokes"), std::runtime_error);
     store->clear();
@@ -179,7 +178,7 @@ TEST_F(ProjectManagerBaseTest, whatTheStoreThrowsReachesTheCallerAndTheGuardIsRe
     EXPECT_EQ(store->calls().at(0).guard, Guard::None);
 }
 
-TEST_F(ProjectManagerBaseTest, aListenerIsToldOfWritesFromThenOn) {
+TEST_F(ProjectManagerBaseTest, aListenerIsNotifiedOfLaterWrites) {
     auto const listener = std::make_shared<CountingListener>();
     project.setName(u"Engine");
     project.subscribe(listener);
@@ -188,19 +187,20 @@ TEST_F(ProjectManagerBaseTest, aListenerIsToldOfWritesFromThenOn) {
     EXPECT_EQ(listener->calls, 1);
 }
 
-TEST_F(ProjectManagerBaseTest, aListenerIsPassedOnAsItIsWithoutTakingTheLock) {
+TEST_F(ProjectManagerBaseTest, aListenerIsPassedToTheStoreWithoutTakingTheLock) {
     auto const subscribing = std::make_shared<SubscribingStore>();
     ProjectManagerBase subscribed(u"/project", subscribing);
     auto listener = std::make_shared<CountingListener>();
-    std::weak_ptr<FileChangeRequestListener> const gone = listener;
+    std::weak_ptr<FileChangeRequestListener> const expired = listener;
     listener.reset();
-    subscribed.subscribe(gone);
+    subscribed.subscribe(expired);
 
     ASSERT_EQ(subscribing->calls().size(), 1U);
     EXPECT_EQ(subscribing->calls().at(0).operation, "subscribe");
-    // The same pointer, though its object is gone.
-    EXPECT_FALSE(subscribing->subscribed.owner_before(gone) || gone.owner_before(subscribing->subscribed));
-    EXPECT_TRUE(gone.owner_before(std::weak_ptr<int>()) || std::weak_ptr<int>().owner_before(gone));
+    // The same pointer, although its object was destroyed.
+    EXPECT_FALSE(subscribing->subscribed.owner_before(expired) ||
+                 expired.owner_before(subscribing->subscribed));
+    EXPECT_TRUE(expired.owner_before(std::weak_ptr<int>()) || std::weak_ptr<int>().owner_before(expired));
 }
 
 } // namespace

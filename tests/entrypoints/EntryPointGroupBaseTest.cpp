@@ -9,13 +9,13 @@
 namespace project::management {
 namespace {
 
-TEST(EntryPointGroupBase, hasTheNameAndUUIDThatItWasReadWith) {
+TEST(EntryPointGroupBase, hasTheNameAndUUIDOfTheConstructor) {
     EntryPointGroupBase const group(u"Tools", u"u1");
     EXPECT_EQ(group.getName(), u"Tools");
     EXPECT_EQ(group.getUUID(), u"u1");
 }
 
-TEST(DefaultGroup, isNamedByTheCatalogAndKnownByAFixedUUID) {
+TEST(DefaultGroup, isNamedByTheCatalogAndIdentifiedByAFixedUUID) {
     EXPECT_EQ(getDefaultGroup()->getName(), u"Default");
     EXPECT_EQ(getDefaultGroup()->getUUID(), u"default");
 }
@@ -31,7 +31,7 @@ TEST(DefaultGroup, keepsItsNameWhenTheGlobalLocaleChanges) {
     EXPECT_EQ(getDefaultGroup()->getName(), u"Default");
 }
 
-// The name is fetched once in a process, so this one looks at it in a process of its own.
+// The name is looked up once in a process, so this test runs in a process of its own.
 TEST(DefaultGroupDeathTest, isNamedInTheGlobalLocaleOfTheFirstCall) {
     testing::FLAGS_gtest_death_test_style = "threadsafe";
     EXPECT_EXIT(

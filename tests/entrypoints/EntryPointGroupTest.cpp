@@ -31,7 +31,7 @@ TEST(EntryPointGroupDefinition, aGeneratedUUIDIsOfTheUsualForm) {
     EXPECT_EQ(group.getUUID().size(), 36U);
 }
 
-TEST(EntryPointGroupDefinition, aUUIDThatIsThereStays) {
+TEST(EntryPointGroupDefinition, anExistingUUIDStays) {
     EntryPointGroupDefinition group(u"Tools", u"u1");
     group.generateUUIDIfNotSet();
     EXPECT_EQ(group.getUUID(), u"u1");

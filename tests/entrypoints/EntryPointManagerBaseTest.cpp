@@ -3,7 +3,7 @@
 #include "entrypoints/EntryPointBase.hpp"
 #include "entrypoints/EntryPointManagerFixture.hpp"
 
-// Setting and removing entry points; what is read of them stands in EntryPointManagerReadingTest.cpp.
+// Setting and removing entry points. EntryPointManagerReadingTest.cpp tests the queries.
 
 namespace project::management {
 namespace {
@@ -24,12 +24,12 @@ protected:
     }
 };
 
-TEST_F(EntryPointManagerBaseTest, constructionLeavesTheStoreAlone) {
+TEST_F(EntryPointManagerBaseTest, constructionDoesNotAccessTheStore) {
     EntryPointManagerBase const another(store, &files, root);
     EXPECT_THAT(store->calls(), IsEmpty());
 }
 
-TEST_F(EntryPointManagerBaseTest, aNewEntryPointIsStoredInOneWriteUnderAFreshUUID) {
+TEST_F(EntryPointManagerBaseTest, aNewEntryPointIsStoredInOneWriteUnderANewUUID) {
     EntryPointDefinition entryPoint(projectFile(u"run.sh"));
     entryPoint.setName(u"Run").setType(EntryPointType::BatchJob).setVisible(false);
     entryPoints.setEntryPoint(entryPoint);
@@ -48,7 +48,7 @@ TEST_F(EntryPointManagerBaseTest, aNewEntryPointIsStoredInOneWriteUnderAFreshUUI
     EXPECT_EQ(stored(entryPointAt(uuid), u"GroupUUID"), u"default");
 }
 
-TEST_F(EntryPointManagerBaseTest, theGeneratedUUIDDoesNotReachTheCallersObject) {
+TEST_F(EntryPointManagerBaseTest, theGeneratedUUIDIsNotSetInTheCallersObject) {
     EntryPointDefinition entryPoint(projectFile(u"run.sh"));
     entryPoints.setEntryPoint(entryPoint);
     EXPECT_EQ(entryPoint.getUUID(), u"");
@@ -75,7 +75,7 @@ TEST_F(EntryPointManagerBaseTest, settingAFilesEntryPointTwiceLeavesOneNodeUnder
     EXPECT_THAT(store->content().getNode(entryPointAt(uuid))->getChildren(), IsEmpty());
 }
 
-TEST_F(EntryPointManagerBaseTest, theFirstOfSeveralEntryPointsOfAFileIsTheOneThatIsReplaced) {
+TEST_F(EntryPointManagerBaseTest, theFirstOfSeveralEntryPointsOfAFileIsReplaced) {
     auto const file = projectFile(u"run.sh");
     putEntryPoint(u"a", u"other.sh");
     putEntryPoint(u"b", u"run.sh");
@@ -89,7 +89,7 @@ TEST_F(EntryPointManagerBaseTest, theFirstOfSeveralEntryPointsOfAFileIsTheOneTha
     EXPECT_EQ(store->calls("getNode").size(), 2U);
 }
 
-TEST_F(EntryPointManagerBaseTest, anEntryPointWithAUUIDIsWrittenThereWithoutALookAtOthers) {
+TEST_F(EntryPointManagerBaseTest, anEntryPointWithAUUIDIsWrittenThereWithoutACheckOfOthers) {
     auto const file = projectFile(u"run.sh");
     putEntryPoint(u"a", u"run.sh");
     EntryPointDefinition entryPoint(file);
@@ -135,7 +135,7 @@ TEST_F(EntryPointManagerBaseTest, anEntryPointWithoutAGroupIsReadBackInTheDefaul
     EXPECT_EQ(entryPoints.getEntryPoint(root / u"run.sh")->getGroup()->getUUID(), u"default");
 }
 
-TEST_F(EntryPointManagerBaseTest, aGroupThatIsNotStoredIsWrittenAllTheSame) {
+TEST_F(EntryPointManagerBaseTest, aGroupThatIsNotStoredIsWrittenToo) {
     EntryPointDefinition entryPoint(projectFile(u"run.sh"));
     EntryPointGroupDefinition group(u"Nowhere", u"u1");
     entryPoint.setUUID(u"a").setGroup(group);
@@ -231,7 +231,7 @@ TEST_F(EntryPointManagerBaseTest, changesHoldTheWriteGuardFromTheFirstStoreCallT
     EXPECT_THAT(guardsHeldBy([&] { entryPoints.removeEntryPoint(file); }), ElementsAre(Guard::Write));
 }
 
-TEST_F(EntryPointManagerBaseTest, whatTheStoreThrowsReachesTheCaller) {
+TEST_F(EntryPointManagerBaseTest, exceptionsOfTheStorePropagate) {
     EntryPointDefinition entryPoint(projectFile(u"run.sh"));
     store->failOn("setNodes", [] { throw std::runtime_error("disk full"); });
     EXPECT_THROW(entryPoints.setEntryPoint(entryPoint), std::runtime_error);

@@ -38,7 +38,7 @@ protected:
 
     EntryPointManagerFixture() { store->clear(); }
 
-    /// Puts a file into the project without asking the disk and without being recorded.
+    /// Adds a file to the project without access to the disk. The call is not recorded.
     Path projectFile(std::u16string const& relative) {
         auto const file = root / relative;
         auto const place =
@@ -47,7 +47,7 @@ protected:
         return file;
     }
 
-    /// Stores an entry point as another program would have done.
+    /// Stores an entry point, as another program would.
     void putEntryPoint(std::u16string const& uuid, std::u16string const& file,
                        std::map<std::u16string, std::u16string> values = {}) {
         values.emplace(u"File", file);
@@ -97,8 +97,8 @@ protected:
         return result;
     }
 
-    /// Runs an operation and tells which guards were held by the store calls that it made but those that
-    /// acquire one.
+    /// Runs an operation and returns the guards that were held during its calls of the store, without the
+    /// calls that acquire a guard.
     template <class Operation>
     std::set<Guard> guardsHeldBy(Operation const& operation) {
         store->clear();

@@ -14,7 +14,7 @@ using testing::Pair;
 
 using EntryPointManagerGroupsTest = test::EntryPointManagerFixture;
 
-/// Lists one group, which is stored nowhere.
+/// A manager that lists one group, which is not stored.
 class OneGroupManager : public EntryPointManagerBase {
 public:
     using EntryPointManagerBase::EntryPointManagerBase;
@@ -26,25 +26,25 @@ public:
     }
 };
 
-TEST_F(EntryPointManagerGroupsTest, anEmptyStoreHasJustTheDefaultGroup) {
+TEST_F(EntryPointManagerGroupsTest, anEmptyStoreHasTheDefaultGroupOnly) {
     EXPECT_THAT(listedGroups(), ElementsAre(Pair(u"Default", u"default")));
     EXPECT_THAT(store->calls("getChildNodes"), IsEmpty());
     EXPECT_TRUE(store->isEmpty());
 }
 
-TEST_F(EntryPointManagerGroupsTest, theDefaultGroupComesFirstThenTheOthersInTheOrderOfTheStore) {
+TEST_F(EntryPointManagerGroupsTest, theDefaultGroupIsFirstThenTheOthersInTheOrderOfTheStore) {
     putGroup(u"b", u"A");
     putGroup(u"a", u"B");
     EXPECT_THAT(listedGroups(),
                 ElementsAre(Pair(u"Default", u"default"), Pair(u"B", u"a"), Pair(u"A", u"b")));
 }
 
-TEST_F(EntryPointManagerGroupsTest, whatIsNoGroupBelowTheHeadIsNotListed) {
+TEST_F(EntryPointManagerGroupsTest, addressesOfOtherTypesBelowTheHeadAreNotListed) {
     store->put(GROUPS.child({u"Other", u"x"}), {{u"Name", u"X"}});
     EXPECT_THAT(listedGroups(), ElementsAre(Pair(u"Default", u"default")));
 }
 
-TEST_F(EntryPointManagerGroupsTest, aNewGroupIsStoredInOneWriteWithJustItsName) {
+TEST_F(EntryPointManagerGroupsTest, aNewGroupIsStoredInOneWriteWithItsNameOnly) {
     entryPoints.createEntryPointGroup(EntryPointGroupDefinition(u"Tools", u"g"));
     EXPECT_THAT(store->writes(), ElementsAre("setNodes"));
     EXPECT_THAT(store->calls("setNodes").at(0).paths, ElementsAre(groupAt(u"g")));
@@ -53,7 +53,7 @@ TEST_F(EntryPointManagerGroupsTest, aNewGroupIsStoredInOneWriteWithJustItsName) 
     EXPECT_EQ(stored(groupAt(u"g"), u"Name"), u"Tools");
 }
 
-TEST_F(EntryPointManagerGroupsTest, aGroupWithoutAUUIDGetsOneThatOnlyTheListTells) {
+TEST_F(EntryPointManagerGroupsTest, aGroupWithoutAUUIDGetsOneThatOnlyTheListShows) {
     EntryPointGroupDefinition const group(u"Tools");
     entryPoints.createEntryPointGroup(group);
     EXPECT_EQ(group.getUUID(), u"");
@@ -62,20 +62,20 @@ TEST_F(EntryPointManagerGroupsTest, aGroupWithoutAUUIDGetsOneThatOnlyTheListTell
     EXPECT_EQ(listedGroups().at(1).second.size(), 36U);
 }
 
-TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsNameIsTakenAlsoWhenNothingIsStored) {
+TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsNameIsInUseAlsoIfNothingIsStored) {
     EXPECT_RAISES(EntryPointGroupNameDefined, (u"Default"),
                   entryPoints.createEntryPointGroup(EntryPointGroupDefinition(u"Default")));
     EXPECT_THAT(store->writes(), IsEmpty());
     EXPECT_TRUE(store->isEmpty());
 }
 
-TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsNameIsTakenAlsoWhenTheListLacksIt) {
+TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsNameIsInUseAlsoIfTheListLacksIt) {
     OneGroupManager manager(store, &files, root);
     EXPECT_RAISES(EntryPointGroupNameDefined, (u"Default"),
                   manager.createEntryPointGroup(EntryPointGroupDefinition(u"Default")));
 }
 
-TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsNameIsTakenAlsoAfterItWasRenamed) {
+TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsNameIsInUseAlsoAfterItWasRenamed) {
     putGroup(u"default", u"Mine");
     EXPECT_RAISES(EntryPointGroupNameDefined, (u"Default"),
                   entryPoints.createEntryPointGroup(EntryPointGroupDefinition(u"Default")));
@@ -83,13 +83,13 @@ TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsNameIsTakenAlsoAfterItWasRen
                   entryPoints.createEntryPointGroup(EntryPointGroupDefinition(u"Mine")));
 }
 
-TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsUUIDIsTaken) {
+TEST_F(EntryPointManagerGroupsTest, theDefaultGroupsUUIDIsInUse) {
     EXPECT_RAISES(EntryPointGroupUUIDDefined, (u"default"),
                   entryPoints.createEntryPointGroup(EntryPointGroupDefinition(u"New", u"default")));
     EXPECT_THAT(store->writes(), IsEmpty());
 }
 
-TEST_F(EntryPointManagerGroupsTest, aNameThatIsListedIsTaken) {
+TEST_F(EntryPointManagerGroupsTest, aListedNameIsInUse) {
     putGroup(u"g", u"Tools");
     EXPECT_RAISES(EntryPointGroupNameDefined, (u"Tools"),
                   entryPoints.createEntryPointGroup(EntryPointGroupDefinition(u"Tools")));
@@ -116,7 +116,7 @@ TEST_F(EntryPointManagerGroupsTest, theUUIDOfAnEarlyGroupIsReportedBeforeTheName
                   entryPoints.createEntryPointGroup(EntryPointGroupDefinition(u"Jobs", u"g")));
 }
 
-TEST_F(EntryPointManagerGroupsTest, theGroupsThatASubclassListsAreTheOnesThatCount) {
+TEST_F(EntryPointManagerGroupsTest, theGroupsThatASubclassListsCount) {
     OneGroupManager manager(store, &files, root);
     putGroup(u"g", u"Tools");
     EXPECT_RAISES(EntryPointGroupNameDefined, (u"Only"),
@@ -157,7 +157,7 @@ TEST_F(EntryPointManagerGroupsTest, renamingToTheNameOfAnotherGroupIsAnError) {
     EXPECT_THAT(store->writes(), IsEmpty());
 }
 
-TEST_F(EntryPointManagerGroupsTest, renamingWithoutAUUIDDoesNothingAlsoToANameThatIsTaken) {
+TEST_F(EntryPointManagerGroupsTest, renamingWithoutAUUIDDoesNothingAlsoForANameInUse) {
     putGroup(u"g", u"Tools");
     entryPoints.renameEntryPointGroup(EntryPointGroupDefinition(u"Jobs"), u"Tools");
     entryPoints.renameEntryPointGroup(EntryPointGroupDefinition(u"Tools"), u"New");
@@ -195,7 +195,7 @@ TEST_F(EntryPointManagerGroupsTest, deletingAGroupRemovesItsNodeInOneWrite) {
     EXPECT_THAT(listedGroups(), ElementsAre(Pair(u"Default", u"default"), Pair(u"Jobs", u"h")));
 }
 
-TEST_F(EntryPointManagerGroupsTest, deletingLeavesAloneWhatIsNoGroup) {
+TEST_F(EntryPointManagerGroupsTest, deletingKeepsAddressesOfOtherTypes) {
     store->put(GROUPS.child({u"Other", u"g"}), {});
     entryPoints.deleteEntryPointGroup(EntryPointGroupDefinition(u"", u"g"));
     EXPECT_THAT(locationsBelow(GROUPS), ElementsAre(u"g"));

@@ -19,8 +19,8 @@ using testing::IsEmpty;
 
 class EntryPointManagerReadingTest : public test::EntryPointManagerFixture {
 protected:
-    /// Stores an entry point of "run.sh" with the nested nodes given, each by type, "Name" and, where it is
-    /// not null, "Value".
+    /// Stores an entry point of "run.sh" with the given nested nodes, each with its type, "Name" and, if it
+    /// is not null, "Value".
     struct Nested {
         char16_t const* type;
         char16_t const* name;
@@ -54,14 +54,14 @@ protected:
     }
 };
 
-TEST_F(EntryPointManagerReadingTest, anEmptyStoreHasNoEntryPointsAndIsNotAskedForChildren) {
+TEST_F(EntryPointManagerReadingTest, anEmptyStoreHasNoEntryPointsAndItsChildrenAreNotRead) {
     EXPECT_THAT(entryPoints.getEntryPoints(), IsEmpty());
     EXPECT_THAT(store->calls("getChildNodes"), IsEmpty());
     EXPECT_THAT(store->writes(), IsEmpty());
     EXPECT_TRUE(store->isEmpty());
 }
 
-TEST_F(EntryPointManagerReadingTest, aFileWithoutAnEntryPointGivesADefinitionAndStoresNothing) {
+TEST_F(EntryPointManagerReadingTest, aFileWithoutAnEntryPointHasADefinitionAndStoresNothing) {
     auto const entryPoint = entryPoints.getEntryPoint(projectFile(u"a/run.sh"));
     ASSERT_NE(entryPoint, nullptr);
     EXPECT_EQ(entryPoint->getFile(), root / u"a/run.sh");
@@ -73,7 +73,7 @@ TEST_F(EntryPointManagerReadingTest, aFileWithoutAnEntryPointGivesADefinitionAnd
     EXPECT_FALSE(store->content().pathExists(ENTRY_POINTS));
 }
 
-TEST_F(EntryPointManagerReadingTest, aFileOutsideTheProjectWithoutAnEntryPointGivesADefinitionToo) {
+TEST_F(EntryPointManagerReadingTest, aFileOutsideTheProjectWithoutAnEntryPointHasADefinitionToo) {
     auto const entryPoint = entryPoints.getEntryPoint(u"/elsewhere/run.sh");
     ASSERT_NE(entryPoint, nullptr);
     EXPECT_EQ(entryPoint->getFile(), Path(u"/elsewhere/run.sh"));
@@ -81,7 +81,7 @@ TEST_F(EntryPointManagerReadingTest, aFileOutsideTheProjectWithoutAnEntryPointGi
     EXPECT_THAT(store->calls("hasNode"), IsEmpty());
 }
 
-TEST_F(EntryPointManagerReadingTest, everythingThatWasSetIsReadBack) {
+TEST_F(EntryPointManagerReadingTest, allPropertiesAreReadAsTheyWereSet) {
     auto const file = projectFile(u"a/run.sh");
     putGroup(u"g", u"Tools");
     EntryPointDefinition written(file);
@@ -112,7 +112,7 @@ TEST_F(EntryPointManagerReadingTest, theListIsInTheOrderOfTheStore) {
     EXPECT_THAT(listedUUIDs(), ElementsAre(u"a", u"b", u"c"));
 }
 
-TEST_F(EntryPointManagerReadingTest, entriesBelowTheHeadAreReadWhateverTheirElementsType) {
+TEST_F(EntryPointManagerReadingTest, addressesOfAnyTypeBelowTheHeadAreRead) {
     auto const file = projectFile(u"run.sh");
     store->put(ENTRY_POINTS.child({u"Other", u"x"}), {{u"File", u"run.sh"}, {u"Type", u"Basic"}});
     EXPECT_THAT(listedUUIDs(), ElementsAre(u"x"));
@@ -129,7 +129,7 @@ TEST_F(EntryPointManagerReadingTest, anEntryPointWhoseFileIsNotInTheProjectIsHid
     EXPECT_THAT(locationsBelow(ENTRY_POINTS), ElementsAre(u"a", u"b"));
 }
 
-TEST_F(EntryPointManagerReadingTest, anUnknownTypeOfAFileThatIsNotInTheProjectIsNoError) {
+TEST_F(EntryPointManagerReadingTest, anUnknownTypeOfAFileThatIsNotInTheProjectIsNotAnError) {
     putEntryPoint(u"a", u"gone.sh", {{u"Type", u"Other"}});
     EXPECT_THAT(listedUUIDs(), IsEmpty());
     EXPECT_EQ(entryPoints.getEntryPoint(root / u"gone.sh"), nullptr);
@@ -184,7 +184,7 @@ TEST_F(EntryPointManagerReadingTest, anEntryPointOfADeletedGroupHasNoneAndKeepsI
     EXPECT_EQ(stored(entryPointAt(u"a"), u"GroupUUID"), u"g");
 }
 
-TEST_F(EntryPointManagerReadingTest, writingBackAnEntryPointOfADeletedGroupBringsItToTheDefaultGroup) {
+TEST_F(EntryPointManagerReadingTest, writingAnEntryPointOfADeletedGroupMovesItToTheDefaultGroup) {
     auto const file = projectFile(u"run.sh");
     putEntryPoint(u"a", u"run.sh", {{u"GroupUUID", u"g"}});
     entryPoints.setEntryPoint(*entryPoints.getEntryPoint(file));
@@ -213,13 +213,13 @@ TEST_F(EntryPointManagerReadingTest, anExtensionWithoutAValueHasAnEmptyOne) {
     EXPECT_EQ(entryPoints.getEntryPoint(file)->getExtensionData(u"key"), u"");
 }
 
-TEST_F(EntryPointManagerReadingTest, nestedNodesOfAnotherTypeAreNoExtensions) {
+TEST_F(EntryPointManagerReadingTest, nestedNodesOfAnotherTypeAreNotExtensions) {
     auto const file = projectFile(u"run.sh");
     putWithNested({{u"Other", u"key", u"value"}});
     EXPECT_THAT(entryPoints.getEntryPoint(file)->getExtensionKeys(), IsEmpty());
 }
 
-TEST_F(EntryPointManagerReadingTest, anExtensionGoesUnharmedThroughReadingAndWriting) {
+TEST_F(EntryPointManagerReadingTest, anExtensionSurvivesReadingAndWriting) {
     auto const file = projectFile(u"run.sh");
     // Lone surrogates are text like any other.
     putWithNested({{u"Extension", u"key \xD800", u"value \xDC00"}});
@@ -243,7 +243,7 @@ TEST_F(EntryPointManagerReadingTest, aFileIsFoundByTheExactTextThatIsStored) {
     EXPECT_EQ(entryPoints.getEntryPoint(root / u"run.sh")->getUUID(), u"");
 }
 
-TEST_F(EntryPointManagerReadingTest, theFirstOfSeveralEntryPointsOfAFileIsTheOneThatIsGiven) {
+TEST_F(EntryPointManagerReadingTest, theFirstOfSeveralEntryPointsOfAFileIsReturned) {
     auto const file = projectFile(u"run.sh");
     putEntryPoint(u"b", u"run.sh");
     putEntryPoint(u"a", u"run.sh");
@@ -251,7 +251,7 @@ TEST_F(EntryPointManagerReadingTest, theFirstOfSeveralEntryPointsOfAFileIsTheOne
     EXPECT_THAT(listedUUIDs(), ElementsAre(u"a", u"b"));
 }
 
-TEST_F(EntryPointManagerReadingTest, anAddressWithoutANodeIsPassedOver) {
+TEST_F(EntryPointManagerReadingTest, anAddressWithoutANodeIsSkipped) {
     auto const file = projectFile(u"run.sh");
     store->put(entryPointAt(u"a").child({u"Below", u"1"}), {});
     store->put(test::groupAt(u"g").child({u"Below", u"1"}), {});

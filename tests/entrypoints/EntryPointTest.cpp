@@ -17,7 +17,7 @@ EntryPointBase makeStored(std::unique_ptr<EntryPointGroup> group) {
                           {{u"args", u"-v"}, {u"empty", u""}});
 }
 
-/// Lists a key and has no data for it.
+/// An entry point that lists a key and has no data for it.
 class EntryPointWithoutData : public EntryPointDefinition {
 public:
     using EntryPointDefinition::EntryPointDefinition;
@@ -120,7 +120,7 @@ TEST(EntryPointDefinition, editingAGroupLaterDoesNotChangeTheEntryPointsGroup) {
     EXPECT_EQ(entryPoint.getGroup()->getUUID(), u"");
 }
 
-TEST(EntryPointDefinition, theGroupIsGivenAsACopyAtEachCall) {
+TEST(EntryPointDefinition, theGroupIsReturnedAsACopyAtEachCall) {
     EntryPointDefinition const entryPoint(u"/p/b.txt");
     auto const first = entryPoint.getGroup();
     EXPECT_NE(first.get(), entryPoint.getGroup().get());
@@ -135,7 +135,7 @@ TEST(EntryPointDefinition, settingAnExtensionKeyAgainReplacesItsValue) {
 
 TEST(EntryPointDefinition, extensionKeysAreSortedByCodeUnits) {
     EntryPointDefinition entryPoint(u"/p/b.txt");
-    // U+1F600 is a surrogate pair, whose units sort before U+FF5E though the character comes after it.
+    // U+1F600 is a surrogate pair, whose units precede U+FF5E although the character follows it.
     for (auto const* key : {u"\uFF5E", u"b", u"\U0001F600", u"B", u"a"}) {
         entryPoint.setExtensionData(key, u"");
     }
@@ -151,7 +151,7 @@ TEST(EntryPointDefinition, anAbsentExtensionKeyHasNoDataAndCanBeRemoved) {
     EXPECT_EQ(entryPoint.getExtensionData(u"k"), std::nullopt);
 }
 
-TEST(EntryPointBase, hasAllThatItWasReadWith) {
+TEST(EntryPointBase, hasTheConstructorsArguments) {
     auto const entryPoint = makeStored(std::make_unique<EntryPointGroupDefinition>(u"Tools", u"u1"));
     EXPECT_EQ(entryPoint.getFile(), Path(u"/p/run.sh"));
     EXPECT_EQ(entryPoint.getType(), EntryPointType::Startup);
@@ -165,7 +165,7 @@ TEST(EntryPointBase, hasAllThatItWasReadWith) {
     EXPECT_EQ(entryPoint.getExtensionData(u"other"), std::nullopt);
 }
 
-TEST(EntryPointBase, theGroupIsGivenAsACopyAtEachCallOrNull) {
+TEST(EntryPointBase, theGroupIsReturnedAsACopyAtEachCallOrNull) {
     auto const entryPoint = makeStored(std::make_unique<EntryPointGroupDefinition>(u"Tools", u"u1"));
     auto const first = entryPoint.getGroup();
     EXPECT_NE(first.get(), entryPoint.getGroup().get());

@@ -22,7 +22,7 @@ TEST(EntryPointType, theNumbersOfTheTypesAreFixed) {
     EXPECT_EQ(static_cast<int>(EntryPointType::BatchJob), 3);
 }
 
-TEST(EntryPointType, everyNameThatIsStoredIsReadBack) {
+TEST(EntryPointType, everyStoredNameIsRead) {
     EXPECT_EQ(getFromName(u"Basic"), EntryPointType::Basic);
     EXPECT_EQ(getFromName(u"Startup"), EntryPointType::Startup);
     EXPECT_EQ(getFromName(u"Shutdown"), EntryPointType::Shutdown);
@@ -43,17 +43,17 @@ TEST(EntryPointType, theEmptyNameIsUnknown) {
     EXPECT_RAISES_NESTED(EntryPointTypeUndefined, (u""), std::out_of_range, getFromName(u""));
 }
 
-TEST(EntryPointType, aNameIsTakenWhole) {
+TEST(EntryPointType, aNameIsComparedAsAWhole) {
     EXPECT_RAISES_NESTED(EntryPointTypeUndefined, (u"Basic "), std::out_of_range, getFromName(u"Basic "));
 }
 
-TEST(EntryPointType, aValueThatIsNoTypeHasTheEmptyNameAndIsNoError) {
+TEST(EntryPointType, anInvalidValueHasTheEmptyNameAndIsNotAnError) {
     EXPECT_EQ(toString(static_cast<EntryPointType>(4)), u"");
     EXPECT_EQ(toString(static_cast<EntryPointType>(-1)), u"");
     EXPECT_EQ(toString(static_cast<EntryPointType>(4)), u"");
 }
 
-TEST(EntryPointType, askingForAValueThatIsNoTypeDoesNotMakeTheEmptyNameKnown) {
+TEST(EntryPointType, theNameOfAnInvalidValueDoesNotBecomeKnown) {
     ASSERT_EQ(toString(static_cast<EntryPointType>(5)), u"");
     EXPECT_RAISES_NESTED(EntryPointTypeUndefined, (u""), std::out_of_range, getFromName(u""));
 }

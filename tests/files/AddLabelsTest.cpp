@@ -14,7 +14,7 @@ using testing::IsEmpty;
 
 using AddLabelsTest = test::LabelledFile;
 
-TEST_F(AddLabelsTest, putsALabelUnderItsCategoryByUUIDAlone) {
+TEST_F(AddLabelsTest, addsALabelToItsCategoryByUUIDAlone) {
     files.addLabels({a}, {Label(color, red)});
 
     metadata::MetadataNodeSpecification expected(u"Info");
@@ -22,27 +22,27 @@ TEST_F(AddLabelsTest, putsALabelUnderItsCategoryByUUIDAlone) {
     EXPECT_TRUE(isEqual(*stored(at(a)), expected));
 }
 
-TEST_F(AddLabelsTest, putsFurtherLabelsUnderTheCategoryThatIsThere) {
+TEST_F(AddLabelsTest, addsFurtherLabelsToTheStoredCategory) {
     files.addLabels({a}, {Label(tags, urgent)});
     files.addLabels({a}, {Label(tags, later)});
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {u"l-urgent", u"l-later"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {u"l-urgent", u"l-later"}}}));
 }
 
-TEST_F(AddLabelsTest, doesNotTakeAChildOfAnotherTypeForTheCategory) {
+TEST_F(AddLabelsTest, ignoresANestedNodeOfAnotherTypeThanTheCategory) {
     auto const node = stored(at(a));
     append(*node, u"Other", {{u"UUID", u"c-tags"}});
     replace(at(a), node);
 
     files.addLabels({a}, {Label(tags, urgent)});
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {}}, {u"c-tags", {u"l-urgent"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {}}, {u"c-tags", {u"l-urgent"}}}));
 }
 
-TEST_F(AddLabelsTest, givesNothingBackWhenNothingIsDisplaced) {
+TEST_F(AddLabelsTest, returnsNothingIfNothingIsReplaced) {
     EXPECT_THAT(files.addLabels({a}, {Label(tags, urgent), Label(color, red)}), IsEmpty());
 }
 
-TEST_F(AddLabelsTest, passesOverAFileThatIsNotInTheProjectWithoutWriting) {
+TEST_F(AddLabelsTest, skipsAFileThatIsNotInTheProjectWithoutWriting) {
     EXPECT_THAT(files.addLabels({root / u"unknown"}, {Label(color, red)}), IsEmpty());
     EXPECT_THAT(store->writes(), IsEmpty());
 }
@@ -53,14 +53,14 @@ TEST_F(AddLabelsTest, writesOnlyTheFilesThatAreInTheProject) {
     EXPECT_THAT(store->calls("setNodes")[0].paths, ElementsAre(at(a)));
 }
 
-TEST_F(AddLabelsTest, passesOverTheStoresOwnFilesAlsoWhenTheyAreInTheProject) {
+TEST_F(AddLabelsTest, skipsTheStoresOwnFilesEvenIfTheyAreInTheProject) {
     auto const metadataFile = file(u".projectdata/project.jsonl");
     EXPECT_THAT(files.addLabels({metadataFile}, {Label(color, red)}), IsEmpty());
     EXPECT_THAT(store->writes(), IsEmpty());
 }
 
-TEST_F(AddLabelsTest, displacesTheOtherLabelOfASingleValuedCategory) {
-    bear(a, color, {red});
+TEST_F(AddLabelsTest, replacesTheOtherLabelOfASingleValuedCategory) {
+    addLabelNodes(a, color, {red});
 
     auto const displaced = files.addLabels({a}, {Label(color, blue)});
 
@@ -68,48 +68,48 @@ TEST_F(AddLabelsTest, displacesTheOtherLabelOfASingleValuedCategory) {
     EXPECT_EQ(displaced[0].getFile(), a);
     EXPECT_EQ(displaced[0].getCategory().getUUID(), u"c-color");
     EXPECT_EQ(displaced[0].getLabelIdentifier(), red);
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-blue"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-blue"}}}));
 }
 
-TEST_F(AddLabelsTest, givesADisplacedLabelBackWithTheValueItHad) {
-    bear(a, color, {red});
-    giveValue(a, u"dark");
+TEST_F(AddLabelsTest, returnsAReplacedLabelWithItsValue) {
+    addLabelNodes(a, color, {red});
+    setLabelValue(a, u"dark");
     EXPECT_THAT(shown(files.addLabels({a}, {Label(color, blue)})),
                 ElementsAre(ShownLabel(u"c-color", u"l-red", u"dark")));
 }
 
-TEST_F(AddLabelsTest, displacesTheSameLabelOfASingleValuedCategory) {
-    bear(a, color, {red});
-    giveValue(a, u"dark");
+TEST_F(AddLabelsTest, replacesTheSameLabelOfASingleValuedCategory) {
+    addLabelNodes(a, color, {red});
+    setLabelValue(a, u"dark");
 
     auto const displaced = files.addLabels({a}, {Label(color, red)});
 
     EXPECT_THAT(shown(displaced), ElementsAre(ShownLabel(u"c-color", u"l-red", u"dark")));
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-red"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-red"}}}));
 }
 
-TEST_F(AddLabelsTest, theSecondOfTwoLabelsOfASingleValuedCategoryDisplacesTheFirst) {
+TEST_F(AddLabelsTest, theSecondOfTwoLabelsOfASingleValuedCategoryReplacesTheFirst) {
     auto const displaced = files.addLabels({a}, {Label(color, red), Label(color, blue)});
     EXPECT_THAT(shown(displaced), ElementsAre(ShownLabel(u"c-color", u"l-red", u"")));
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-blue"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-blue"}}}));
 }
 
-TEST_F(AddLabelsTest, leavesTheLabelsOfOtherCategories) {
-    bear(a, tags, {urgent});
+TEST_F(AddLabelsTest, keepsTheLabelsOfOtherCategories) {
+    addLabelNodes(a, tags, {urgent});
     files.addLabels({a}, {Label(color, red)});
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {u"l-urgent"}}, {u"c-color", {u"l-red"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {u"l-urgent"}}, {u"c-color", {u"l-red"}}}));
 }
 
-TEST_F(AddLabelsTest, asksTheLabelGivenWhetherItsCategoryIsSingleValued) {
-    bear(a, color, {red});
+TEST_F(AddLabelsTest, asksTheGivenLabelWhetherItsCategoryIsSingleValued) {
+    addLabelNodes(a, color, {red});
     CategoryDefinition const multiValued(u"Color", u"c-color"); // stored as single-valued
 
     EXPECT_THAT(files.addLabels({a}, {Label(multiValued, blue)}), IsEmpty());
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-red", u"l-blue"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-red", u"l-blue"}}}));
 }
 
-TEST_F(AddLabelsTest, putsALabelOfAMultiValuedCategoryOnASecondTime) {
+TEST_F(AddLabelsTest, addsALabelOfAMultiValuedCategoryASecondTime) {
     files.addLabels({a}, {Label(tags, urgent)});
 
     EXPECT_THAT(files.addLabels({a}, {Label(tags, urgent)}), IsEmpty());
@@ -118,7 +118,7 @@ TEST_F(AddLabelsTest, putsALabelOfAMultiValuedCategoryOnASecondTime) {
     EXPECT_EQ(files.getLabelIDSets(a), (std::vector{pair, pair}));
 }
 
-TEST_F(AddLabelsTest, passesOverALabelThatIsThereOnlyWhenItAndItsCategoryHaveOneUUID) {
+TEST_F(AddLabelsTest, skipsAnExistingLabelOnlyIfItAndItsCategoryHaveTheSameUUID) {
     CategoryDefinition const category(u"Same", u"same");
     LabelDefinition const label(u"Same", u"same");
     define(category, {label});
@@ -129,7 +129,7 @@ TEST_F(AddLabelsTest, passesOverALabelThatIsThereOnlyWhenItAndItsCategoryHaveOne
     EXPECT_EQ(files.getLabelIDSets(a), (std::vector{LabelIDSet(u"same", u"same")}));
 }
 
-TEST_F(AddLabelsTest, comparesWhatIsThereWithTheLabelsUUIDFirst) {
+TEST_F(AddLabelsTest, comparesStoredPairsWithTheLabelsUUIDFirst) {
     class Bearing : public FileManagerBase {
     public:
         using FileManagerBase::FileManagerBase;
@@ -143,11 +143,11 @@ TEST_F(AddLabelsTest, comparesWhatIsThereWithTheLabelsUUIDFirst) {
 
     manager.addLabels({a}, {Label(tags, urgent), Label(tags, later)});
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {u"l-later"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {u"l-later"}}}));
 }
 
-TEST_F(AddLabelsTest, displacesEveryChildOfTheCategoryWhateverItsType) {
-    bear(a, color, {red, blue});
+TEST_F(AddLabelsTest, replacesEveryNestedNodeOfTheCategoryOfAnyType) {
+    addLabelNodes(a, color, {red, blue});
     auto const node = stored(at(a));
     append(*node->getChildren()[0], u"Other", {{u"UUID", u"l-red"}, {u"Value", u"of another type"}});
     append(*node->getChildren()[0], u"Other", {});
@@ -158,53 +158,53 @@ TEST_F(AddLabelsTest, displacesEveryChildOfTheCategoryWhateverItsType) {
     EXPECT_THAT(shown(displaced),
                 ElementsAre(ShownLabel(u"c-color", u"l-red", u""), ShownLabel(u"c-color", u"l-blue", u""),
                             ShownLabel(u"c-color", u"l-red", u"of another type")));
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-blue"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-blue"}}}));
 }
 
-TEST_F(AddLabelsTest, dropsALabelThatIsNoLongerDefinedInSilence) {
-    bear(a, color, {LabelDefinition(u"Gone", u"l-gone"), red});
+TEST_F(AddLabelsTest, removesADeletedLabelWithoutReturningIt) {
+    addLabelNodes(a, color, {LabelDefinition(u"Gone", u"l-gone"), red});
 
     auto const displaced = files.addLabels({a}, {Label(color, blue)});
 
     EXPECT_THAT(shown(displaced), ElementsAre(ShownLabel(u"c-color", u"l-red", u"")));
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-blue"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-blue"}}}));
 }
 
-TEST_F(AddLabelsTest, dropsTheLabelsOfACategoryThatIsNoLongerDefinedInSilence) {
-    bear(a, color, {red});
+TEST_F(AddLabelsTest, removesTheLabelsOfADeletedCategoryWithoutReturningThem) {
+    addLabelNodes(a, color, {red});
     erase(categoryAt(color));
 
     EXPECT_THAT(files.addLabels({a}, {Label(color, blue)}), IsEmpty());
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-blue"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-blue"}}}));
 }
 
-TEST_F(AddLabelsTest, dropsALabelWithAnUnreadableStateInSilence) {
-    bear(a, color, {red});
+TEST_F(AddLabelsTest, removesALabelWithAnUnknownStateWithoutReturningIt) {
+    addLabelNodes(a, color, {red});
     store->put(labelAt(color, red), {{u"Name", u"Red"}, {u"ReadOnly", u"perhaps"}});
 
     EXPECT_THAT(files.addLabels({a}, {Label(color, blue)}), IsEmpty());
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-blue"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-blue"}}}));
 }
 
-TEST_F(AddLabelsTest, doesNotTakeAFailureOfTheStoreForALabelThatIsGone) {
-    bear(a, color, {red});
+TEST_F(AddLabelsTest, doesNotMistakeAFailureOfTheStoreForADeletedLabel) {
+    addLabelNodes(a, color, {red});
     store->failOn("pathExists", [] { throw std::runtime_error("the disk fails"); });
     EXPECT_THROW(files.addLabels({a}, {Label(color, blue)}), std::runtime_error);
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-red"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-red"}}}));
 }
 
-TEST_F(AddLabelsTest, raisesForTheRootThatHasNoNodeAndWritesNothing) {
+TEST_F(AddLabelsTest, throwsForTheRootThatHasNoNodeAndWritesNothing) {
     EXPECT_RAISES(FileNotInProject, (root), files.addLabels({a, root}, {Label(color, red)}));
     EXPECT_THAT(store->writes(), IsEmpty());
-    EXPECT_THAT(borne(a), IsEmpty());
+    EXPECT_THAT(labelUUIDs(a), IsEmpty());
 }
 
-TEST_F(AddLabelsTest, labelsTheRootWhenItHasANode) {
+TEST_F(AddLabelsTest, labelsTheRootIfItHasANode) {
     store->put(at(root), {});
     files.addLabels({root}, {Label(color, red)});
-    EXPECT_EQ(borne(root), (Borne{{u"c-color", {u"l-red"}}}));
+    EXPECT_EQ(labelUUIDs(root), (LabelUUIDs{{u"c-color", {u"l-red"}}}));
 }
 
 TEST_F(AddLabelsTest, writesAllFilesInOneBatchUnderOneGuard) {
@@ -218,22 +218,22 @@ TEST_F(AddLabelsTest, writesAllFilesInOneBatchUnderOneGuard) {
 }
 
 TEST_F(AddLabelsTest, startsFromTheStoredNodeForAFileThatIsListedTwice) {
-    bear(a, color, {red});
+    addLabelNodes(a, color, {red});
 
     auto const displaced = files.addLabels({a, a}, {Label(color, blue), Label(tags, urgent)});
 
     EXPECT_THAT(shown(displaced),
                 ElementsAre(ShownLabel(u"c-color", u"l-red", u""), ShownLabel(u"c-color", u"l-red", u"")));
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-blue"}}, {u"c-tags", {u"l-urgent"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-blue"}}, {u"c-tags", {u"l-urgent"}}}));
 }
 
-TEST_F(AddLabelsTest, doesNotAskWhetherLabelAndCategoryAreDefined) {
+TEST_F(AddLabelsTest, doesNotCheckThatLabelAndCategoryExist) {
     CategoryDefinition const unknown(u"Unknown", u"c-unknown");
     store->clear();
 
     files.addLabels({a}, {Label(unknown, LabelDefinition(u"Unknown", u"l-unknown"))});
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-unknown", {u"l-unknown"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-unknown", {u"l-unknown"}}}));
     for (auto const& call : store->calls()) {
         for (auto const& path : call.paths) {
             EXPECT_TRUE(path.isWithin(at(root))) << call.operation;
@@ -241,18 +241,18 @@ TEST_F(AddLabelsTest, doesNotAskWhetherLabelAndCategoryAreDefined) {
     }
 }
 
-TEST_F(AddLabelsTest, putsReadOnlyLabelsOnFilesAndTakesThemOffAgain) {
+TEST_F(AddLabelsTest, addsAndRemovesReadOnlyLabels) {
     auto const category = CategoryDefinition(u"Fixed", u"c-fixed").setIsReadOnly(true);
     auto const label = LabelDefinition(u"Fixed", u"l-fixed").setIsReadOnly(LabelReadOnlyState::READ_ONLY);
 
     files.addLabels({a}, {Label(category, label)});
-    EXPECT_EQ(borne(a), (Borne{{u"c-fixed", {u"l-fixed"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-fixed", {u"l-fixed"}}}));
 
     files.removeLabels({a}, {Label(category, label)});
-    EXPECT_THAT(borne(a), IsEmpty());
+    EXPECT_THAT(labelUUIDs(a), IsEmpty());
 }
 
-TEST_F(AddLabelsTest, writesTheNodeBackAlsoWithoutLabels) {
+TEST_F(AddLabelsTest, writesTheNodeAlsoWithoutLabels) {
     files.addLabels({a}, {});
     EXPECT_THAT(store->writes(), ElementsAre("setNodes"));
 }
@@ -262,7 +262,7 @@ TEST_F(AddLabelsTest, writesNothingWithoutFiles) {
     EXPECT_THAT(store->writes(), IsEmpty());
 }
 
-TEST_F(AddLabelsTest, readsTheNodeAndThenWhatIsThereForEachLabel) {
+TEST_F(AddLabelsTest, readsTheNodeAndThenTheLabelsForEachLabel) {
     files.addLabels({a}, {Label(color, red)});
     EXPECT_THAT(store->operations(), ElementsAre("hasNode", "getMetadataRoot", "hasNode", "getNode",
                                                  "hasNode", "getNode", "setNodes"));
@@ -271,7 +271,7 @@ TEST_F(AddLabelsTest, readsTheNodeAndThenWhatIsThereForEachLabel) {
 using AddAgainTest = test::LabelledFile;
 
 TEST_F(AddAgainTest, addingAFileAgainDropsItsLabels) {
-    bear(a, color, {red});
+    addLabelNodes(a, color, {red});
 
     files.add({a});
 
@@ -283,15 +283,15 @@ TEST_F(AddAgainTest, addingSomethingBelowAFolderDropsTheLabelsOfTheFoldersAboveI
     auto const inner = file(u"folder/inner/file");
     auto const sibling = file(u"folder/sibling");
     for (auto const& path : {root / u"folder", root / u"folder/inner", inner, sibling}) {
-        bear(path, color, {red});
+        addLabelNodes(path, color, {red});
     }
 
     files.add({inner});
 
-    EXPECT_THAT(borne(root / u"folder"), IsEmpty());
-    EXPECT_THAT(borne(root / u"folder/inner"), IsEmpty());
-    EXPECT_THAT(borne(inner), IsEmpty());
-    EXPECT_EQ(borne(sibling), (Borne{{u"c-color", {u"l-red"}}}));
+    EXPECT_THAT(labelUUIDs(root / u"folder"), IsEmpty());
+    EXPECT_THAT(labelUUIDs(root / u"folder/inner"), IsEmpty());
+    EXPECT_THAT(labelUUIDs(inner), IsEmpty());
+    EXPECT_EQ(labelUUIDs(sibling), (LabelUUIDs{{u"c-color", {u"l-red"}}}));
 }
 
 } // namespace

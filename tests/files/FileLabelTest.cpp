@@ -18,7 +18,7 @@ TEST(FileLabel, hasEmptyDataUnlessGiven) {
     EXPECT_EQ(FileLabel(color, red, u"/project/a").getData(), u"");
 }
 
-TEST(FileLabel, isKnownByTheUUIDOfItsLabel) {
+TEST(FileLabel, isIdentifiedByTheUUIDOfItsLabel) {
     FileLabel const label(color, red, u"/project/a", u"dark");
     Unique const& unique = label;
     EXPECT_EQ(unique.getUUID(), u"l-red");

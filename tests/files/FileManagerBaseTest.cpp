@@ -18,6 +18,7 @@ using testing::Contains;
 using testing::ElementsAre;
 using testing::Field;
 using testing::IsEmpty;
+using ZEPHRA::project::management::EntryPointTypeUndefined;
 using ZEPHRA::project::management::FileDoesNotExistError;
 using ZEPHRA::project::management::FileIsMetadataError;
 using ZEPHRA::project::management::FileNotInProject;
@@ -37,7 +38,7 @@ protected:
             .toMetadataPath(folder.path(relative));
     }
 
-    /// Puts something on a file's node that only a new node drops.
+    /// Stores data in a file's node, which only a new node does not have.
     void mark(std::u16string const& relative) { store->put(at(relative), {{u"mark", u"here"}}); }
 
     bool isMarked(std::u16string const& relative) {
@@ -52,18 +53,18 @@ protected:
     EntryPointManagerBase entryPoints{store, &files, folder.root()};
 };
 
-TEST_F(FileManagerBaseTest, constructionLeavesTheStoreAlone) {
+TEST_F(FileManagerBaseTest, constructionDoesNotAccessTheStore) {
     FileManagerBase const another(folder.root(), store);
     EXPECT_THAT(store->calls(), IsEmpty());
 }
 
-TEST_F(FileManagerBaseTest, theRootIsInTheProjectWithoutAskingTheStore) {
+TEST_F(FileManagerBaseTest, theRootIsInTheProjectWithoutAccessToTheStore) {
     EXPECT_TRUE(files.isFileInProject(folder.root()));
     EXPECT_THAT(store->operations(), IsEmpty());
     EXPECT_THAT(files.getProjectFiles(), IsEmpty());
 }
 
-TEST_F(FileManagerBaseTest, theProjectRootIsGivenAsItCame) {
+TEST_F(FileManagerBaseTest, theProjectRootIsReturnedUnchanged) {
     EXPECT_EQ(files.getProjectRoot(), folder.root());
 }
 
@@ -93,7 +94,7 @@ TEST_F(FileManagerBaseTest, addingNothingWritesOneEmptyBatch) {
     EXPECT_THAT(store->calls("setNodes")[0].paths, IsEmpty());
 }
 
-TEST_F(FileManagerBaseTest, addingTheRootWritesNothingAndRaisesNothing) {
+TEST_F(FileManagerBaseTest, addingTheRootWritesNothingAndDoesNotThrow) {
     files.add({folder.root()});
 
     EXPECT_THAT(store->calls("setNodes").at(0).paths, IsEmpty());
@@ -106,7 +107,7 @@ TEST_F(FileManagerBaseTest, addingAFolderDoesNotAddItsContents) {
     EXPECT_THAT(files.getProjectFiles(), ElementsAre(folder.path(u"src")));
 }
 
-TEST_F(FileManagerBaseTest, addingAFileAgainGivesItANewEmptyNode) {
+TEST_F(FileManagerBaseTest, addingAFileAgainStoresANewEmptyNode) {
     files.add({folder.file(u"a")});
     mark(u"a");
 
@@ -116,7 +117,7 @@ TEST_F(FileManagerBaseTest, addingAFileAgainGivesItANewEmptyNode) {
     EXPECT_FALSE(isMarked(u"a"));
 }
 
-TEST_F(FileManagerBaseTest, addingBelowAFolderGivesThatFolderAndThoseAboveItNewEmptyNodes) {
+TEST_F(FileManagerBaseTest, addingBelowAFolderStoresNewEmptyNodesForThatFolderAndThoseAboveIt) {
     files.add({folder.file(u"a/b/c")});
     mark(u"a");
     mark(u"a/b");
@@ -147,7 +148,7 @@ TEST_F(FileManagerBaseTest, ofAMissingFileInAMissingFolderTheFolderIsReported) {
     EXPECT_RAISES(FileDoesNotExistError, (folder.path(u"no").native()), files.add({folder.path(u"no/file")}));
 }
 
-TEST_F(FileManagerBaseTest, theStoresOwnFilesCanNotBeAdded) {
+TEST_F(FileManagerBaseTest, theStoresOwnFilesCannotBeAdded) {
     auto const file = folder.file(u".projectdata/project.jsonl");
     EXPECT_RAISES(FileIsMetadataError, (folder.path(u".projectdata").native()), files.add({file}));
     EXPECT_RAISES(FileIsMetadataError, (folder.path(u".projectdata").native()),
@@ -173,7 +174,7 @@ TEST_F(FileManagerBaseTest, aNameInTheRootThatBeginsWithTwoDotsCountsAsOutside) 
     EXPECT_RAISES(FileNotInProjectRoot, (file.native(), folder.root().native()), files.add({file}));
 }
 
-TEST_F(FileManagerBaseTest, aPathInTheProjectPassesAddEvenIfItHasGoneFromTheDisk) {
+TEST_F(FileManagerBaseTest, aPathInTheProjectCanBeAddedAfterItWasDeletedFromTheDisk) {
     files.add({folder.file(u"a")});
     folder.remove(u"a");
 
@@ -206,7 +207,7 @@ TEST_F(FileManagerBaseTest, projectFilesAreReadWithoutAGuardAcrossTheWalk) {
     auto const asked = store->calls("acquireReadLock");
     auto const outermost =
         std::count_if(asked.begin(), asked.end(), [](auto const& call) { return call.guard == Guard::None; });
-    EXPECT_EQ(outermost, 4); // of the root's test, and of the children of the root, a, and a/b
+    EXPECT_EQ(outermost, 4); // for the check of the root, and for the children of the root, a, and a/b
 }
 
 TEST_F(FileManagerBaseTest, childrenAreTheDirectOnes) {
@@ -232,23 +233,23 @@ public:
     bool answer = true;
 };
 
-TEST_F(FileManagerBaseTest, aSubclassMayAnswerOtherwiseWhetherTheRootIsInTheProject) {
+TEST_F(FileManagerBaseTest, aSubclassMayOverrideWhetherTheRootIsInTheProject) {
     AnsweringOtherwise manager(folder.root(), store);
     EXPECT_THAT(manager.getProjectFiles(), ElementsAre(folder.path(u"added")));
     manager.answer = false;
     EXPECT_THAT(manager.getProjectFiles(), IsEmpty());
 }
 
-TEST_F(FileManagerBaseTest, removingAFolderGivesTheFolderAndThenItsFiles) {
+TEST_F(FileManagerBaseTest, removingAFolderReturnsTheFolderAndThenItsFiles) {
     files.add({folder.file(u"a/b"), folder.file(u"c")});
 
-    auto const gone = files.remove({folder.path(u"a")});
+    auto const removed = files.remove({folder.path(u"a")});
 
-    EXPECT_THAT(gone, ElementsAre(folder.path(u"a"), folder.path(u"a/b")));
+    EXPECT_THAT(removed, ElementsAre(folder.path(u"a"), folder.path(u"a/b")));
     EXPECT_THAT(files.getProjectFiles(), ElementsAre(folder.path(u"c")));
 }
 
-TEST_F(FileManagerBaseTest, removingNamesOnlyTheGivenPathsToTheStore) {
+TEST_F(FileManagerBaseTest, removingPassesOnlyTheGivenPathsToTheStore) {
     files.add({folder.file(u"a/b")});
     store->clear();
 
@@ -276,7 +277,20 @@ TEST_F(FileManagerBaseTest, removingAPathThatIsNotInTheProjectIsRefusedAndChange
     EXPECT_THAT(store->writes(), IsEmpty());
 }
 
-TEST_F(FileManagerBaseTest, aFileThatHasGoneFromTheDiskCanBeRemoved) {
+TEST_F(FileManagerBaseTest, anEntryPointOfAnUnknownTypeRefusesEveryRemovalAndChangesNothing) {
+    files.add({folder.file(u"a"), folder.file(u"b")});
+    store->put(address({{u"EntryPoints", u"Root"}, {u"EntryPoint", u"e"}}),
+               {{u"File", u"b"}, {u"Type", u"Unknown"}});
+    store->clear();
+
+    EXPECT_RAISES_NESTED(EntryPointTypeUndefined, (u"Unknown"), std::out_of_range,
+                         files.remove({folder.path(u"a")}));
+
+    EXPECT_TRUE(files.isFileInProject(folder.path(u"a")));
+    EXPECT_THAT(store->writes(), IsEmpty());
+}
+
+TEST_F(FileManagerBaseTest, aFileThatWasDeletedFromTheDiskCanBeRemoved) {
     files.add({folder.file(u"a")});
     folder.remove(u"a");
     EXPECT_THAT(files.remove({folder.path(u"a")}), ElementsAre(folder.path(u"a")));
@@ -288,7 +302,7 @@ TEST_F(FileManagerBaseTest, theParentsOfARemovedFileStay) {
     EXPECT_THAT(files.getProjectFiles(), ElementsAre(folder.path(u"a")));
 }
 
-TEST_F(FileManagerBaseTest, anEntryPointGoesBeforeAnyNodeOfItsFile) {
+TEST_F(FileManagerBaseTest, anEntryPointIsRemovedBeforeAnyNodeOfItsFile) {
     files.add({folder.file(u"a/start.m")});
     EntryPointDefinition start(folder.path(u"a/start.m"));
     entryPoints.setEntryPoint(start);
@@ -317,7 +331,7 @@ TEST_F(FileManagerBaseTest, aFileIsRemovedFromEveryScope) {
     EXPECT_THAT(store->writes(), ElementsAre("removeNodes", "removeNodes")); // one for each scope
 }
 
-TEST_F(FileManagerBaseTest, eachCallForAScopeGivesANewManagerAndWritesNothing) {
+TEST_F(FileManagerBaseTest, eachCallForAScopeReturnsANewManagerAndWritesNothing) {
     auto const first = files.getFileMetadataManagerFor(u"Root");
     auto const second = files.getFileMetadataManagerFor(u"Root");
     EXPECT_NE(first, second);

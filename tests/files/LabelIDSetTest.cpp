@@ -21,11 +21,11 @@ TEST(LabelIDSet, takesTheUUIDsOfIdentifiers) {
     EXPECT_EQ(pair, LabelIDSet(u"c", u"r"));
 }
 
-TEST(LabelIDSet, differsFromTheOneWithTheUUIDsExchanged) {
+TEST(LabelIDSet, differsFromTheOneWithTheUUIDsSwapped) {
     EXPECT_FALSE(LabelIDSet(u"a", u"b") == LabelIDSet(u"b", u"a"));
 }
 
-TEST(LabelIDSet, differsWhenEitherUUIDDoesAlsoInCase) {
+TEST(LabelIDSet, differsIfEitherUUIDDiffersAlsoInCase) {
     LabelIDSet const pair(u"a", u"b");
     EXPECT_FALSE(pair == LabelIDSet(u"A", u"b"));
     EXPECT_FALSE(pair == LabelIDSet(u"a", u"B"));

@@ -4,8 +4,8 @@
 
 namespace project::test {
 
-/// A project with a single-valued and a multi-valued category of two labels each, and one file, which bears
-/// none of them.
+/// A project with a single-valued and a multi-valued category of two labels each, and one file without
+/// labels.
 class LabelledFile : public LabelledProject {
 protected:
     LabelledFile() {
@@ -13,8 +13,8 @@ protected:
         define(tags, {urgent, later});
     }
 
-    /// Gives the first label of the first category on a file a value of its own.
-    void giveValue(Path const& path, std::u16string const& value) {
+    /// Sets the value of the first label of the first category on a file.
+    void setLabelValue(Path const& path, std::u16string const& value) {
         auto const node = stored(at(path));
         node->getChildren()[0]->getChildren()[0]->put(u"Value", value);
         replace(at(path), node);

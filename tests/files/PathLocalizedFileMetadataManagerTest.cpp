@@ -37,33 +37,33 @@ protected:
     MetadataPath const head = address({{u"Files", u"Root"}});
 };
 
-TEST_F(PathLocalizedFileMetadataManagerTest, constructionAsksNothingOfTheStore) {
+TEST_F(PathLocalizedFileMetadataManagerTest, constructionDoesNotAccessTheStore) {
     manager();
     EXPECT_THAT(store->calls(), IsEmpty());
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, theRootIsAddressedByTheHeadAlone) {
+TEST_F(PathLocalizedFileMetadataManagerTest, theRootHasTheAddressOfTheScope) {
     EXPECT_EQ(files.toMetadataPath(folder.root()), head);
     EXPECT_EQ(files.toFilePath(head), folder.root());
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, theRootInAnotherFormIsAddressedByTheHeadAloneToo) {
+TEST_F(PathLocalizedFileMetadataManagerTest, theRootInAnotherFormHasTheAddressOfTheScopeToo) {
     EXPECT_EQ(files.toMetadataPath(folder.root().native() + u"/"), head);
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, aFileIsAddressedByOneElementForEachNameAndBack) {
+TEST_F(PathLocalizedFileMetadataManagerTest, aFilesAddressHasOneStepForEachNameInBothDirections) {
     auto const path = folder.path(u"c1/c2");
     auto const expected = address({{u"Files", u"Root"}, {u"File", u"c1"}, {u"File", u"c2"}});
     EXPECT_EQ(files.toMetadataPath(path), expected);
     EXPECT_EQ(files.toFilePath(expected), path);
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, anAddressGivesAPathWhateverTheTypesOfItsElements) {
+TEST_F(PathLocalizedFileMetadataManagerTest, anAddressHasAPathWithStepsOfAnyType) {
     EXPECT_EQ(files.toFilePath(head.child({u"Other", u"a"}).child({u"File", u""}).child({u"File", u"b"})),
               folder.path(u"a/b"));
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, addressingAsksNothingOfTheStore) {
+TEST_F(PathLocalizedFileMetadataManagerTest, conversionDoesNotAccessTheStore) {
     files.toFilePath(files.toMetadataPath(folder.path(u"a")));
     EXPECT_THAT(store->calls(), IsEmpty());
 }
@@ -81,14 +81,14 @@ TEST_F(PathLocalizedFileMetadataManagerTest, aFolderOnDiskIsStoredWithItsMarker)
     EXPECT_THAT(marker->getChildren(), IsEmpty());
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, aPlainFileOrAFolderThatIsGoneIsStoredWithoutAMarker) {
+TEST_F(PathLocalizedFileMetadataManagerTest, aFileOrADeletedFolderIsStoredWithoutAMarker) {
     files.setFileNodes(Nodes{{folder.file(u"file"), node()}, {folder.path(u"gone"), node()}});
 
     EXPECT_THAT(store->calls("setNodes").at(0).paths,
                 ElementsAre(head.child({u"File", u"file"}), head.child({u"File", u"gone"})));
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, anEmptyBatchIsWrittenAllTheSame) {
+TEST_F(PathLocalizedFileMetadataManagerTest, anEmptyBatchIsWrittenToo) {
     files.setFileNodes({});
     files.removeFileNodes({});
 
@@ -134,7 +134,7 @@ TEST_F(PathLocalizedFileMetadataManagerTest, theRootHasANodeOnceItIsStored) {
     EXPECT_TRUE(files.hasFileNode(folder.root()));
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, aNodeOfAnotherTypeOfElementIsNoFile) {
+TEST_F(PathLocalizedFileMetadataManagerTest, aNodeWithAStepOfAnotherTypeIsNotAFile) {
     auto const other = head.child({u"LabelData", u"Data"});
     store->put(other, {});
     EXPECT_FALSE(files.isFileMetadataPath(other));
@@ -163,7 +163,7 @@ TEST_F(PathLocalizedFileMetadataManagerTest, theChildrenOfAFolderAreItsDirectFil
                 ElementsAre(folder.path(u"src/a"), folder.path(u"src/b")));
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, anythingUnknownHasNoChildren) {
+TEST_F(PathLocalizedFileMetadataManagerTest, anUnknownPathHasNoChildren) {
     EXPECT_THAT(files.getChildFiles(folder.path(u"unknown")), IsEmpty());
 }
 
@@ -197,12 +197,12 @@ TEST_F(PathLocalizedFileMetadataManagerTest, allFileNodesAreReadUnderOneReadLock
     }
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, allFileNodesOfAnEmptyScopeAreNoneAndNoChildrenAreAskedFor) {
+TEST_F(PathLocalizedFileMetadataManagerTest, anEmptyScopeHasNoFileNodesAndItsChildrenAreNotRead) {
     EXPECT_THAT(files.getAllFileNodes(), IsEmpty());
     EXPECT_THAT(store->operations(), ElementsAre("pathExists"));
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, extraEntriesAreAlwaysNoneAndAskNothing) {
+TEST_F(PathLocalizedFileMetadataManagerTest, extraEntriesAreAlwaysEmptyAndDoNotAccessTheStore) {
     EXPECT_THAT(files.getExtraEntries(), IsEmpty());
     EXPECT_THAT(store->calls(), IsEmpty());
 }
@@ -216,7 +216,7 @@ TEST_F(PathLocalizedFileMetadataManagerTest, scopesDoNotSeeEachOthersFiles) {
     EXPECT_TRUE(files.hasFileNode(folder.path(u"a")));
 }
 
-TEST_F(PathLocalizedFileMetadataManagerTest, aFailingStoreIsSeenByTheCallerAndNothingIsWritten) {
+TEST_F(PathLocalizedFileMetadataManagerTest, anExceptionOfTheStorePropagatesAndNothingIsWritten) {
     store->failOn("setNodes", [] { throw std::runtime_error("disk full"); });
     EXPECT_THROW(files.setFileNodes(Nodes{{folder.path(u"a"), node()}}), std::runtime_error);
     EXPECT_TRUE(store->isEmpty());

@@ -11,7 +11,7 @@ TEST(PathSets, aFolderIsWithinItself) {
     EXPECT_TRUE(isWithinFolder(u"/p", u"/p"));
 }
 
-TEST(PathSets, whatLiesBelowAFolderIsWithinIt) {
+TEST(PathSets, aPathBelowAFolderIsWithinIt) {
     EXPECT_TRUE(isWithinFolder(u"/p", u"/p/a/b"));
     EXPECT_FALSE(isWithinFolder(u"/p", u"/pa"));
     EXPECT_FALSE(isWithinFolder(u"/p/a", u"/p"));
@@ -22,11 +22,11 @@ TEST(PathSets, aNameThatBeginsWithTwoDotsCountsAsOutsideItsFolder) {
     EXPECT_TRUE(isWithinFolder(u"/p", u"/p/a/..hidden"));
 }
 
-TEST(PathSets, parentFoldersComeWithAFileUpToButWithoutTheRoot) {
+TEST(PathSets, parentFoldersAreAddedUpToTheRootButWithoutIt) {
     EXPECT_EQ(withParentFolders({u"/p/a/b/c.txt"}, u"/p"), (Paths{u"/p/a", u"/p/a/b", u"/p/a/b/c.txt"}));
 }
 
-TEST(PathSets, sharedParentFoldersComeOnceAndInPathOrder) {
+TEST(PathSets, sharedParentFoldersAreListedOnceAndInPathOrder) {
     EXPECT_EQ(withParentFolders({u"/p/b/y", u"/p/b/x", u"/p/a.txt", u"/p/a/z"}, u"/p"),
               (Paths{u"/p/a", u"/p/a/z", u"/p/a.txt", u"/p/b", u"/p/b/x", u"/p/b/y"}));
 }
@@ -35,7 +35,7 @@ TEST(PathSets, theRootContributesNothing) {
     EXPECT_TRUE(withParentFolders({u"/p"}, u"/p").empty());
 }
 
-TEST(PathSets, aPathOutsideTheRootComesAlone) {
+TEST(PathSets, aPathOutsideTheRootIsListedAlone) {
     EXPECT_EQ(withParentFolders({u"/q/a/b"}, u"/p"), (Paths{u"/q/a/b"}));
 }
 

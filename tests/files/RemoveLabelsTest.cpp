@@ -12,42 +12,42 @@ using testing::IsEmpty;
 
 using RemoveLabelsTest = test::LabelledFile;
 
-TEST_F(RemoveLabelsTest, takesTheCategoryAlongWithItsLastLabel) {
-    bear(a, color, {red});
+TEST_F(RemoveLabelsTest, removesTheCategoryWithItsLastLabel) {
+    addLabelNodes(a, color, {red});
     files.removeLabels({a}, {Label(color, red)});
-    EXPECT_THAT(borne(a), IsEmpty());
+    EXPECT_THAT(labelUUIDs(a), IsEmpty());
 }
 
-TEST_F(RemoveLabelsTest, leavesTheOtherLabelsOfTheCategory) {
-    bear(a, tags, {urgent, later});
-    bear(a, color, {red});
+TEST_F(RemoveLabelsTest, keepsTheOtherLabelsOfTheCategory) {
+    addLabelNodes(a, tags, {urgent, later});
+    addLabelNodes(a, color, {red});
     files.removeLabels({a}, {Label(tags, urgent)});
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {u"l-later"}}, {u"c-color", {u"l-red"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {u"l-later"}}, {u"c-color", {u"l-red"}}}));
 }
 
-TEST_F(RemoveLabelsTest, leavesACategoryThatHoldsAnythingElse) {
-    bear(a, color, {red});
+TEST_F(RemoveLabelsTest, keepsACategoryWithOtherNestedNodes) {
+    addLabelNodes(a, color, {red});
     auto const node = stored(at(a));
     append(*node->getChildren()[0], u"Other", {{u"UUID", u"foreign"}});
     replace(at(a), node);
 
     files.removeLabels({a}, {Label(color, red)});
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"foreign"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"foreign"}}}));
 }
 
-TEST_F(RemoveLabelsTest, doesNotTakeAChildOfAnotherTypeForTheLabel) {
+TEST_F(RemoveLabelsTest, ignoresANestedNodeOfAnotherTypeThanTheLabel) {
     auto const node = stored(at(a));
     append(append(*node, u"Category", {{u"UUID", u"c-color"}}), u"Other", {{u"UUID", u"l-red"}});
     replace(at(a), node);
 
     files.removeLabels({a}, {Label(color, red)});
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-red"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-red"}}}));
 }
 
-TEST_F(RemoveLabelsTest, writesTheNodeBackAndNoDataForALabelThatIsNotThere) {
-    bear(a, tags, {urgent});
+TEST_F(RemoveLabelsTest, writesTheNodeAndNoDataForALabelThatTheFileDoesNotHave) {
+    addLabelNodes(a, tags, {urgent});
     record(a, red, u"dark");
     record(a, later, u"at six");
 
@@ -55,12 +55,12 @@ TEST_F(RemoveLabelsTest, writesTheNodeBackAndNoDataForALabelThatIsNotThere) {
 
     ASSERT_THAT(store->writes(), ElementsAre("setNodes"));
     EXPECT_THAT(store->calls("setNodes")[0].paths, ElementsAre(at(a)));
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {u"l-urgent"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {u"l-urgent"}}}));
     EXPECT_THAT(records(a), ElementsAre(u"dark", u"at six"));
 }
 
-TEST_F(RemoveLabelsTest, writesNoDataForALabelWithout) {
-    bear(a, color, {red});
+TEST_F(RemoveLabelsTest, writesNoDataForALabelWithoutData) {
+    addLabelNodes(a, color, {red});
     record(a, blue, u"bright");
 
     files.removeLabels({a}, {Label(color, red)});
@@ -69,8 +69,8 @@ TEST_F(RemoveLabelsTest, writesNoDataForALabelWithout) {
     EXPECT_THAT(records(a), ElementsAre(u"bright"));
 }
 
-TEST_F(RemoveLabelsTest, takesAllRecordsOfTheLabelAlong) {
-    bear(a, color, {red});
+TEST_F(RemoveLabelsTest, removesAllRecordsOfTheLabel) {
+    addLabelNodes(a, color, {red});
     record(a, red, u"one");
     record(a, red, u"two");
     record(a, blue, u"stays");
@@ -81,10 +81,10 @@ TEST_F(RemoveLabelsTest, takesAllRecordsOfTheLabelAlong) {
     EXPECT_THAT(records(a), ElementsAre(u"stays"));
 }
 
-TEST_F(RemoveLabelsTest, writesTheDataOfAllFilesWhenOneLostSome) {
+TEST_F(RemoveLabelsTest, writesTheDataOfAllFilesIfOneLostSome) {
     auto const b = file(u"b");
-    bear(a, color, {red});
-    bear(b, color, {red});
+    addLabelNodes(a, color, {red});
+    addLabelNodes(b, color, {red});
     record(b, red, u"dark");
     store->clear();
 
@@ -97,20 +97,20 @@ TEST_F(RemoveLabelsTest, writesTheDataOfAllFilesWhenOneLostSome) {
     EXPECT_TRUE(wasHeldThroughout(Guard::Write, store->calls()));
 }
 
-TEST_F(RemoveLabelsTest, takesOneOfTwoThatAreTheSame) {
-    bear(a, tags, {urgent, later, urgent});
+TEST_F(RemoveLabelsTest, removesOneOfTwoEqualLabels) {
+    addLabelNodes(a, tags, {urgent, later, urgent});
     files.removeLabels({a}, {Label(tags, urgent)});
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {u"l-later", u"l-urgent"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {u"l-later", u"l-urgent"}}}));
 }
 
-TEST_F(RemoveLabelsTest, takesBothOfTwoThatAreTheSameWhenAskedTwice) {
-    bear(a, tags, {urgent, urgent});
+TEST_F(RemoveLabelsTest, removesBothOfTwoEqualLabelsIfListedTwice) {
+    addLabelNodes(a, tags, {urgent, urgent});
     files.removeLabels({a}, {Label(tags, urgent), Label(tags, urgent)});
-    EXPECT_THAT(borne(a), IsEmpty());
+    EXPECT_THAT(labelUUIDs(a), IsEmpty());
 }
 
-TEST_F(RemoveLabelsTest, raisesForAPathThatIsNotInTheProjectAndWritesNothing) {
-    bear(a, color, {red});
+TEST_F(RemoveLabelsTest, throwsForAPathThatIsNotInTheProjectAndWritesNothing) {
+    addLabelNodes(a, color, {red});
     auto const unknown = root / u"unknown";
     EXPECT_RAISES(FileNotInProject, (unknown), files.removeLabels({a, unknown}, {Label(color, red)}));
     EXPECT_THAT(store->writes(), IsEmpty());
@@ -118,9 +118,9 @@ TEST_F(RemoveLabelsTest, raisesForAPathThatIsNotInTheProjectAndWritesNothing) {
 
 TEST_F(RemoveLabelsTest, treatsTheStoresOwnFilesLikeAnyOther) {
     auto const metadataFile = file(u".projectdata/project.jsonl");
-    bear(metadataFile, color, {red});
+    addLabelNodes(metadataFile, color, {red});
     files.removeLabels({metadataFile}, {Label(color, red)});
-    EXPECT_THAT(borne(metadataFile), IsEmpty());
+    EXPECT_THAT(labelUUIDs(metadataFile), IsEmpty());
 }
 
 TEST_F(RemoveLabelsTest, writesAnEmptyBatchWithoutFiles) {
@@ -129,8 +129,8 @@ TEST_F(RemoveLabelsTest, writesAnEmptyBatchWithoutFiles) {
     EXPECT_THAT(store->calls("setNodes")[0].paths, IsEmpty());
 }
 
-TEST_F(RemoveLabelsTest, leavesTheFileNodesWrittenWhenTheDataCanNotBe) {
-    bear(a, color, {red});
+TEST_F(RemoveLabelsTest, keepsTheWrittenFileNodesIfTheDataCannotBeWritten) {
+    addLabelNodes(a, color, {red});
     record(a, red, u"dark");
     int writes = 0;
     store->failOn("setNodes", [&] {
@@ -141,32 +141,32 @@ TEST_F(RemoveLabelsTest, leavesTheFileNodesWrittenWhenTheDataCanNotBe) {
 
     EXPECT_THROW(files.removeLabels({a}, {Label(color, red)}), std::runtime_error);
 
-    EXPECT_THAT(borne(a), IsEmpty());
+    EXPECT_THAT(labelUUIDs(a), IsEmpty());
     EXPECT_THAT(records(a), ElementsAre(u"dark"));
 }
 
 using RemoveCategoryTest = test::LabelledFile;
 
-TEST_F(RemoveCategoryTest, takesAllLabelsOfTheCategoryAndLeavesTheOthers) {
-    bear(a, tags, {urgent, later});
-    bear(a, color, {red});
+TEST_F(RemoveCategoryTest, removesAllLabelsOfTheCategoryAndKeepsTheOthers) {
+    addLabelNodes(a, tags, {urgent, later});
+    addLabelNodes(a, color, {red});
     files.removeCategory({a}, tags);
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-red"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-red"}}}));
 }
 
-TEST_F(RemoveCategoryTest, leavesTheDataRecordsOfItsLabelsBehind) {
-    bear(a, color, {red});
+TEST_F(RemoveCategoryTest, keepsTheDataRecordsOfItsLabels) {
+    addLabelNodes(a, color, {red});
     record(a, red, u"dark");
 
     files.removeCategory({a}, color);
 
-    EXPECT_THAT(borne(a), IsEmpty());
+    EXPECT_THAT(labelUUIDs(a), IsEmpty());
     EXPECT_THAT(records(a), ElementsAre(u"dark"));
     EXPECT_THAT(store->writes(), ElementsAre("setNodes"));
 }
 
-TEST_F(RemoveCategoryTest, writesFilesThatDoNotBearItBackUnchanged) {
-    bear(a, color, {red});
+TEST_F(RemoveCategoryTest, writesFilesWithoutTheCategoryUnchanged) {
+    addLabelNodes(a, color, {red});
     auto const before = stored(at(a));
 
     files.removeCategory({a}, tags);
@@ -190,8 +190,8 @@ TEST_F(RemoveCategoryTest, writesAnEmptyBatchWithoutFiles) {
     EXPECT_THAT(store->calls("setNodes")[0].paths, IsEmpty());
 }
 
-TEST_F(RemoveCategoryTest, raisesForAPathThatIsNotInTheProjectAndWritesNothing) {
-    bear(a, color, {red});
+TEST_F(RemoveCategoryTest, throwsForAPathThatIsNotInTheProjectAndWritesNothing) {
+    addLabelNodes(a, color, {red});
     auto const unknown = root / u"unknown";
     EXPECT_RAISES(FileNotInProject, (unknown), files.removeCategory({a, unknown}, color));
     EXPECT_THAT(store->writes(), IsEmpty());

@@ -12,7 +12,7 @@ static_assert(!std::equality_comparable<CategoryIdentifier>, "two values for one
 static_assert(std::is_copy_assignable_v<CategoryIdentifier> &&
               std::is_copy_constructible_v<CategoryDefinition>);
 
-TEST(CategoryIdentifier, tellsWhatItWasMadeFrom) {
+TEST(CategoryIdentifier, returnsTheConstructorsArguments) {
     CategoryIdentifier const category(u"uuid", u"name", true, false, u"Logical");
     EXPECT_EQ(category.getUUID(), u"uuid");
     EXPECT_EQ(category.getName(), u"name");
@@ -21,13 +21,13 @@ TEST(CategoryIdentifier, tellsWhatItWasMadeFrom) {
     EXPECT_EQ(category.getDataType(), u"Logical");
 }
 
-TEST(CategoryIdentifier, takesTheReadOnlyFlagBeforeTheSingleValuedOne) {
+TEST(CategoryIdentifier, takesTheReadOnlyFlagBeforeTheSingleValuedFlag) {
     CategoryIdentifier const category(u"uuid", u"name", false, true, u"");
     EXPECT_FALSE(category.isReadOnly());
     EXPECT_TRUE(category.isSingleValued());
 }
 
-TEST(CategoryIdentifier, answersNoneForAnEmptyDataType) {
+TEST(CategoryIdentifier, returnsNoneForAnEmptyDataType) {
     EXPECT_EQ(CategoryIdentifier(u"uuid", u"name", false, false, u"").getDataType(), u"None");
 }
 
@@ -38,7 +38,7 @@ TEST(CategoryIdentifier, acceptsEveryText) {
     EXPECT_EQ(category.getDataType(), u"no validator's type");
 }
 
-TEST(CategoryIdentifier, leavesAllButTheDataTypeToSubclasses) {
+TEST(CategoryIdentifier, canBeOverriddenExceptForTheDataType) {
     class Other : public CategoryIdentifier {
     public:
         Other() : CategoryIdentifier(u"uuid", u"name", false, false, u"String") {}
@@ -72,7 +72,7 @@ TEST(CategoryDefinition, isWritableMultiValuedAndWithoutDataAtFirst) {
     }
 }
 
-TEST(CategoryDefinition, getsAFreshUUIDUnlessOneIsGiven) {
+TEST(CategoryDefinition, getsANewUUIDUnlessOneIsGiven) {
     CategoryDefinition const one(u"name");
     CategoryDefinition const other(u"name");
     EXPECT_NE(one.getUUID(), other.getUUID());
@@ -89,7 +89,7 @@ TEST(CategoryDefinition, setsItsAttributesInAChain) {
     EXPECT_EQ(category.getDataType(), u"String");
 }
 
-TEST(CategoryDefinition, answersNoneAlsoAfterTheDataTypeWasSetEmpty) {
+TEST(CategoryDefinition, returnsNoneAlsoAfterTheDataTypeWasSetEmpty) {
     EXPECT_EQ(CategoryDefinition(u"name").setDataType(u"String").setDataType(u"").getDataType(), u"None");
 }
 

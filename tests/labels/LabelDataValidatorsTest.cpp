@@ -22,11 +22,11 @@ bool is(std::shared_ptr<LabelDataValidator> const& validator) {
     return dynamic_cast<Validator*>(validator.get()) != nullptr;
 }
 
-TEST(LabelDataValidators, giveTheFirstThatMatches) {
+TEST(LabelDataValidators, returnTheFirstThatMatches) {
     EXPECT_TRUE(is<EmptyDataValidator>(validators.getValidator([](auto&) { return true; })));
 }
 
-TEST(LabelDataValidators, giveNullWhenNoneMatches) {
+TEST(LabelDataValidators, returnNullIfNoneMatches) {
     EXPECT_EQ(validators.getValidator([](auto&) { return false; }), nullptr);
 }
 
@@ -42,7 +42,7 @@ TEST(LabelDataValidators, areFoundByDataClassWhichForStringsIsChar) {
     EXPECT_TRUE(is<LogicalDataValidator>(validators.getValidator(hasDataClass(u"logical"))));
 }
 
-TEST(LabelDataValidators, areNotFoundByTheClassTakenForTheType) {
+TEST(LabelDataValidators, areNotFoundByTheClassAsTheType) {
     EXPECT_EQ(validators.getValidator(hasDataType(u"logical")), nullptr);
 }
 
@@ -71,7 +71,7 @@ TEST(LabelDataValidators, anEmptyFunctionObjectFailsAtItsFirstCall) {
     EXPECT_THROW(validators.getValidator({}), std::bad_function_call);
 }
 
-TEST(EmptyDataValidator, acceptsNothingNotEvenTheEmptyText) {
+TEST(EmptyDataValidator, rejectsEveryTextAlsoTheEmptyOne) {
     EmptyDataValidator const validator;
     EXPECT_FALSE(validator.isValid(u""));
     EXPECT_FALSE(validator.isValid(u"None"));
@@ -85,7 +85,7 @@ TEST(StringDataValidator, acceptsEveryTextTheEmptyOneIncluded) {
     EXPECT_TRUE(validator.isValid(std::u16string(1, char16_t(0xD800))));
 }
 
-TEST(LogicalDataValidator, acceptsTheTwoWordsInLowerCaseAndNothingElse) {
+TEST(LogicalDataValidator, acceptsTheTwoWordsInLowerCaseOnly) {
     LogicalDataValidator const validator;
     EXPECT_TRUE(validator.isValid(u"true"));
     EXPECT_TRUE(validator.isValid(u"false"));

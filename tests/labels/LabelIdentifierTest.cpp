@@ -10,7 +10,7 @@ using State = LabelReadOnlyState;
 static_assert(std::is_base_of_v<Unique, LabelIdentifier>);
 static_assert(!std::is_convertible_v<LabelIdentifier*, Unique*>, "Unique is a private base");
 
-TEST(LabelIdentifier, tellsWhatItWasMadeFrom) {
+TEST(LabelIdentifier, returnsTheConstructorsArguments) {
     LabelIdentifier const label(u"uuid", u"name", State::WRITABLE);
     EXPECT_EQ(label.getUUID(), u"uuid");
     EXPECT_EQ(label.getName(), u"name");
@@ -50,7 +50,7 @@ TEST(LabelDefinition, inheritsItsStateAtFirst) {
     EXPECT_EQ(LabelDefinition(u"name", u"uuid").isReadOnly(), State::INHERITED);
 }
 
-TEST(LabelDefinition, getsAFreshUUIDUnlessOneIsGiven) {
+TEST(LabelDefinition, getsANewUUIDUnlessOneIsGiven) {
     LabelDefinition const one(u"name");
     LabelDefinition const other(u"name");
     EXPECT_EQ(one.getName(), u"name");
@@ -59,7 +59,7 @@ TEST(LabelDefinition, getsAFreshUUIDUnlessOneIsGiven) {
     EXPECT_EQ(LabelDefinition(u"name", u"any form").getUUID(), u"any form");
 }
 
-TEST(LabelDefinition, setsItsStateAndGivesItselfBack) {
+TEST(LabelDefinition, setsItsStateAndReturnsItself) {
     LabelDefinition label(u"name");
     EXPECT_EQ(&label.setIsReadOnly(State::READ_ONLY), &label);
     EXPECT_EQ(label.isReadOnly(), State::READ_ONLY);

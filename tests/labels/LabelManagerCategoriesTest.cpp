@@ -29,7 +29,7 @@ protected:
 
 using CreateCategoryTest = CategoriesTest;
 
-TEST_F(CreateCategoryTest, constructionLeavesTheStoreAlone) {
+TEST_F(CreateCategoryTest, constructionDoesNotAccessTheStore) {
     LabelManagerBase const another(store, &files);
     EXPECT_THAT(store->calls(), IsEmpty());
 }
@@ -56,7 +56,7 @@ TEST_F(CreateCategoryTest, storesTheDataTypeNoneForACategoryWithDefaults) {
     EXPECT_EQ(stored(categoryAt(color))->get(u"SingleValued"), u"0");
 }
 
-TEST_F(CreateCategoryTest, givesTheCategoryBackByItsUUID) {
+TEST_F(CreateCategoryTest, returnsTheCategoryByItsUUID) {
     labels.createCategory(CategoryIdentifier(u"uuid", u"Color", true, true, u"no validator's type"));
 
     auto const found = labels.getCategoryByUUID(u"uuid");
@@ -77,13 +77,13 @@ TEST_F(CreateCategoryTest, keepsTheTwoFlagsApart) {
     EXPECT_TRUE(labels.getCategoryByUUID(u"s").isSingleValued());
 }
 
-TEST_F(CreateCategoryTest, takesANameThatDiffersInCaseOnly) {
+TEST_F(CreateCategoryTest, acceptsANameThatDiffersInCaseOnly) {
     labels.createCategory(color);
     labels.createCategory(CategoryDefinition(u"color", u"c-other"));
     EXPECT_THAT(categoryNames(), ElementsAre(u"Color", u"color"));
 }
 
-TEST_F(CreateCategoryTest, refusesANameThatIsTakenAndChangesNothing) {
+TEST_F(CreateCategoryTest, refusesANameInUseAndChangesNothing) {
     labels.createCategory(color);
     store->clear();
 
@@ -99,7 +99,7 @@ TEST_F(CreateCategoryTest, refusesTheSameCategoryASecondTime) {
     EXPECT_RAISES(CategoryExistsByName, (u"Color"), labels.createCategory(color));
 }
 
-TEST_F(CreateCategoryTest, replacesTheCategoryOfTheSameUUIDAndLeavesItsLabels) {
+TEST_F(CreateCategoryTest, replacesTheCategoryWithTheSameUUIDAndKeepsItsLabels) {
     define(readOnlyColor, {red});
 
     labels.createCategory(CategoryDefinition(u"Other", u"c-color"));
@@ -118,17 +118,17 @@ TEST_F(CreateCategoryTest, checksTheNamesAndWritesOnceUnderOneGuard) {
     EXPECT_THAT(store->calls("setNodes")[0].paths, ElementsAre(categoryAt(tags)));
     EXPECT_TRUE(wasHeldThroughout(Guard::Write, store->calls()));
     EXPECT_THAT(store->calls("acquireReadLock"),
-                testing::SizeIs(2)); // of the check, and of the listing in it
+                testing::SizeIs(2)); // for the check, and for the list in it
 }
 
-TEST_F(CreateCategoryTest, readsOneNodeForEachCategoryThatIsThere) {
+TEST_F(CreateCategoryTest, readsOneNodeForEachStoredCategory) {
     define(color, {red});
     define(tags, {});
     labels.createCategory(CategoryDefinition(u"Third", u"c-third"));
     EXPECT_THAT(store->calls("getNode"), testing::SizeIs(2));
 }
 
-TEST_F(CreateCategoryTest, asksForTheCategoriesThroughTheVirtualOperation) {
+TEST_F(CreateCategoryTest, readsTheCategoriesThroughTheVirtualOperation) {
     class Listing : public LabelManagerBase {
     public:
         using LabelManagerBase::LabelManagerBase;
@@ -139,7 +139,7 @@ TEST_F(CreateCategoryTest, asksForTheCategoriesThroughTheVirtualOperation) {
     EXPECT_RAISES(CategoryExistsByName, (u"Taken"), manager.createCategory(CategoryDefinition(u"Taken")));
 }
 
-TEST_F(CreateCategoryTest, releasesTheLockWhenItFails) {
+TEST_F(CreateCategoryTest, releasesTheLockIfItFails) {
     define(color, {});
     EXPECT_RAISES(CategoryExistsByName, (u"Color"), labels.createCategory(color));
     store->clear();
@@ -147,7 +147,7 @@ TEST_F(CreateCategoryTest, releasesTheLockWhenItFails) {
     EXPECT_TRUE(wasHeldThroughout(Guard::Read, store->calls()));
 }
 
-TEST_F(CreateCategoryTest, letsFailuresOfTheStorePass) {
+TEST_F(CreateCategoryTest, propagatesFailuresOfTheStore) {
     store->failOn("setNodes", [] { throw std::runtime_error("the disk fails"); });
     EXPECT_THROW(labels.createCategory(color), std::runtime_error);
 }
@@ -160,7 +160,7 @@ TEST_F(ReadCategoriesTest, aFreshProjectHasNone) {
     EXPECT_RAISES(CategoryDoesNotExistsByUUID, (u""), labels.getCategoryByUUID(u""));
 }
 
-TEST_F(ReadCategoriesTest, comeInTheOrderOfTheStoreAndNotByName) {
+TEST_F(ReadCategoriesTest, areInTheOrderOfTheStoreAndNotByName) {
     define(CategoryDefinition(u"A", u"3"), {});
     define(CategoryDefinition(u"B", u"2"), {});
     define(CategoryDefinition(u"C", u"1"), {});
@@ -186,14 +186,14 @@ TEST_F(ReadCategoriesTest, aNodeWithoutKeysReadsAsDefaults) {
     EXPECT_EQ(category.getDataType(), u"None");
 }
 
-TEST_F(ReadCategoriesTest, anAddressOfAnotherTypeIsNone) {
+TEST_F(ReadCategoriesTest, anAddressOfAnotherTypeIsNotACategory) {
     auto const head = categoryAt(color).parent();
     store->put(head.child({u"Other", u"c-other"}), {{u"Name", u"Other"}});
     EXPECT_THAT(labels.getAllCategories(), IsEmpty());
     EXPECT_RAISES(CategoryDoesNotExistsByUUID, (u"c-other"), labels.getCategoryByUUID(u"c-other"));
 }
 
-TEST_F(ReadCategoriesTest, anAddressWithoutANodeIsNoneHereThoughItsLabelsAreFound) {
+TEST_F(ReadCategoriesTest, anAddressWithoutANodeIsNotListedAlthoughItsLabelsAreFound) {
     store->put(labelAt(color, red), {{u"Name", u"Red"}});
 
     EXPECT_THAT(labels.getAllCategories(), IsEmpty());
@@ -251,19 +251,19 @@ TEST_F(RenameCategoryTest, leavesAnUnknownCategoryUnknownWithoutAnError) {
     EXPECT_THAT(store->writes(), IsEmpty());
 }
 
-TEST_F(RenameCategoryTest, leavesAnAddressWithoutANodeAsItIs) {
+TEST_F(RenameCategoryTest, doesNotChangeAnAddressWithoutANode) {
     store->put(labelAt(color, red), {});
     labels.renameCategory(color, u"Farbe");
     EXPECT_THAT(store->writes(), IsEmpty());
 }
 
-TEST_F(RenameCategoryTest, isRefusedWhenTheObjectGivenSaysReadOnlyWhateverTheStoreSays) {
+TEST_F(RenameCategoryTest, isRefusedForAReadOnlyObjectWhateverIsStored) {
     define(color, {});
     EXPECT_RAISES(CanNotModifyReadOnlyCategory, (), labels.renameCategory(readOnlyColor, u"Farbe"));
     EXPECT_THAT(store->operations(), IsEmpty());
 }
 
-TEST_F(RenameCategoryTest, goesThroughWhenTheObjectGivenSaysWritableWhateverTheStoreSays) {
+TEST_F(RenameCategoryTest, isAcceptedForAWritableObjectWhateverIsStored) {
     define(readOnlyColor, {});
     labels.renameCategory(color, u"Farbe");
     EXPECT_EQ(labels.getCategoryByUUID(u"c-color").getName(), u"Farbe");
@@ -282,23 +282,23 @@ TEST_F(RenameCategoryTest, readsAndWritesTheOneNodeUnderOneGuard) {
 
 using DeleteCategoryTest = CategoriesTest;
 
-TEST_F(DeleteCategoryTest, takesTheCategoryAndItsLabelsFromTheProjectAndItsFiles) {
+TEST_F(DeleteCategoryTest, removesTheCategoryAndItsLabelsFromTheProjectAndItsFiles) {
     define(color, {red});
     define(tags, {LabelDefinition(u"Urgent", u"l-urgent")});
     auto const a = file(u"folder/a");
-    bear(a, color, {red});
-    bear(a, tags, {LabelDefinition(u"Urgent", u"l-urgent")});
-    bear(root / u"folder", color, {red});
+    addLabelNodes(a, color, {red});
+    addLabelNodes(a, tags, {LabelDefinition(u"Urgent", u"l-urgent")});
+    addLabelNodes(root / u"folder", color, {red});
 
     labels.deleteCategory(color);
 
     EXPECT_RAISES(CategoryDoesNotExist, (u"Color"), labels.getLabels(color));
     EXPECT_THAT(categoryNames(), ElementsAre(u"Tags"));
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {u"l-urgent"}}}));
-    EXPECT_THAT(borne(root / u"folder"), IsEmpty());
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {u"l-urgent"}}}));
+    EXPECT_THAT(labelUUIDs(root / u"folder"), IsEmpty());
 }
 
-TEST_F(DeleteCategoryTest, cleansAllFilesBeforeTheDefinitionGoesUnderOneGuard) {
+TEST_F(DeleteCategoryTest, cleansAllFilesBeforeItRemovesTheDefinitionUnderOneGuard) {
     define(color, {red});
     auto const a = file(u"folder/a");
 
@@ -316,9 +316,9 @@ TEST_F(DeleteCategoryTest, ofAnUnknownCategoryRemovesNothingWithoutAnError) {
     EXPECT_THAT(categoryNames(), ElementsAre(u"Tags"));
 }
 
-TEST_F(DeleteCategoryTest, isRefusedWhenTheObjectGivenSaysReadOnlyWhateverTheStoreSays) {
+TEST_F(DeleteCategoryTest, isRefusedForAReadOnlyObjectWhateverIsStored) {
     define(color, {red});
-    bear(file(u"a"), color, {red});
+    addLabelNodes(file(u"a"), color, {red});
 
     EXPECT_RAISES(CanNotModifyReadOnlyCategory, (), labels.deleteCategory(readOnlyColor));
 
@@ -326,25 +326,25 @@ TEST_F(DeleteCategoryTest, isRefusedWhenTheObjectGivenSaysReadOnlyWhateverTheSto
     EXPECT_THAT(categoryNames(), ElementsAre(u"Color"));
 }
 
-TEST_F(DeleteCategoryTest, goesThroughWhenTheObjectGivenSaysWritableWhateverTheStoreSays) {
+TEST_F(DeleteCategoryTest, isAcceptedForAWritableObjectWhateverIsStored) {
     define(readOnlyColor, {red});
     labels.deleteCategory(color);
     EXPECT_THAT(categoryNames(), IsEmpty());
 }
 
-TEST_F(DeleteCategoryTest, leavesTheFilesCleanedWhenTheDefinitionCanNotBeRemoved) {
+TEST_F(DeleteCategoryTest, keepsTheFilesCleanedIfTheDefinitionCannotBeRemoved) {
     define(color, {red});
     auto const a = file(u"a");
-    bear(a, color, {red});
+    addLabelNodes(a, color, {red});
     store->failOn("removeNodes", [] { throw std::runtime_error("the disk fails"); });
 
     EXPECT_THROW(labels.deleteCategory(color), std::runtime_error);
 
-    EXPECT_THAT(borne(a), IsEmpty());
+    EXPECT_THAT(labelUUIDs(a), IsEmpty());
     EXPECT_THAT(categoryNames(), ElementsAre(u"Color"));
 }
 
-TEST_F(DeleteCategoryTest, leavesTheDefinitionWhenTheFilesCanNotBeCleaned) {
+TEST_F(DeleteCategoryTest, keepsTheDefinitionIfTheFilesCannotBeCleaned) {
     define(color, {red});
     store->failOn("setNodes", [] { throw std::runtime_error("the disk fails"); });
     EXPECT_THROW(labels.deleteCategory(color), std::runtime_error);

@@ -31,43 +31,58 @@ using CreateLabelTest = LabelsTest;
 TEST_F(CreateLabelTest, storesNameAndStateUnderTheUUIDBelowTheCategory) {
     define(color, {});
     for (auto const* state : {u"READ_ONLY", u"WRITABLE", u"INHERITED"}) {
-        auto const made = label(state, state, getLabelStateFromName(state));
+        auto const created = label(state, state, getLabelStateFromName(state));
 
-        labels.createLabel(color, made);
+        labels.createLabel(color, created);
 
         metadata::MetadataNodeSpecification expected(u"Info");
         expected.put(u"Name", state);
         expected.put(u"ReadOnly", state);
-        EXPECT_TRUE(isEqual(*stored(labelAt(color, made)), expected));
+        EXPECT_TRUE(isEqual(*stored(labelAt(color, created)), expected));
     }
 }
 
-TEST_F(CreateLabelTest, givesTheLabelBack) {
+TEST_F(CreateLabelTest, returnsTheStoredLabel) {
     define(color, {});
-    auto const made = label(u"Red", u"l-red", State::WRITABLE);
-    labels.createLabel(color, made);
-    EXPECT_THAT(labels.getLabels(color), ElementsAre(made));
-    EXPECT_EQ(labels.getLabelByUUID(color, u"l-red"), made);
+    auto const created = label(u"Red", u"l-red", State::WRITABLE);
+    labels.createLabel(color, created);
+    EXPECT_THAT(labels.getLabels(color), ElementsAre(created));
+    EXPECT_EQ(labels.getLabelByUUID(color, u"l-red"), created);
 }
 
-TEST_F(CreateLabelTest, raisesForACategoryThatWasNeverCreatedWithTheNameThatTheCallerHas) {
+TEST_F(CreateLabelTest, throwsForAnUnknownCategoryWithTheNameOfTheCallersObject) {
     EXPECT_RAISES(CategoryDoesNotExist, (u"Color"), labels.createLabel(color, red));
     EXPECT_TRUE(store->isEmpty());
 }
 
-TEST_F(CreateLabelTest, takesALabelIntoACategoryThatHasAnAddressButNoNode) {
-    make(categoryAt(color));
+TEST_F(CreateLabelTest, throwsForAStoredLabelWithAnUnknownStateAndStoresNothing) {
+    define(color, {});
+    store->put(labelAt(color, blue), {{u"Name", u"Blue"}, {u"ReadOnly", u"maybe"}});
+    EXPECT_RAISES_NESTED(LabelReadOnlyStateUndefined, (u"maybe"), std::out_of_range,
+                         labels.createLabel(color, red));
+    EXPECT_FALSE(store->content().pathExists(labelAt(color, red)));
+}
+
+TEST_F(CreateLabelTest, throwsForAnInvalidStateAndStoresNothing) {
+    define(color, {});
+    EXPECT_THROW(labels.createLabel(color, label(u"Red", u"l-red", static_cast<State>(3))),
+                 std::out_of_range);
+    EXPECT_FALSE(store->content().pathExists(labelAt(color, red)));
+}
+
+TEST_F(CreateLabelTest, acceptsALabelInACategoryThatHasAnAddressButNoNode) {
+    createAddress(categoryAt(color));
     labels.createLabel(color, red);
     EXPECT_THAT(labels.getLabels(color), ElementsAre(red));
 }
 
-TEST_F(CreateLabelTest, takesALabelIntoAReadOnlyCategory) {
+TEST_F(CreateLabelTest, acceptsALabelInAReadOnlyCategory) {
     define(readOnlyColor, {});
     labels.createLabel(readOnlyColor, label(u"Red", u"l-red", State::READ_ONLY));
     EXPECT_EQ(labels.getLabels(color).size(), 1U);
 }
 
-TEST_F(CreateLabelTest, refusesANameThatIsTakenInTheCategoryAndChangesNothing) {
+TEST_F(CreateLabelTest, refusesANameInUseInTheCategoryAndChangesNothing) {
     define(color, {red});
     CategoryDefinition const stale(u"Farbe", u"c-color");
 
@@ -78,7 +93,7 @@ TEST_F(CreateLabelTest, refusesANameThatIsTakenInTheCategoryAndChangesNothing) {
     EXPECT_THAT(labels.getLabels(color), ElementsAre(red));
 }
 
-TEST_F(CreateLabelTest, takesANameThatIsTakenInAnotherCategoryOrDiffersInCaseOnly) {
+TEST_F(CreateLabelTest, acceptsANameInUseInAnotherCategoryOrInAnotherCase) {
     define(color, {red});
     define(tags, {});
     labels.createLabel(tags, LabelDefinition(u"Red", u"l-other"));
@@ -87,7 +102,7 @@ TEST_F(CreateLabelTest, takesANameThatIsTakenInAnotherCategoryOrDiffersInCaseOnl
     EXPECT_EQ(labels.getLabels(color).size(), 2U);
 }
 
-TEST_F(CreateLabelTest, replacesTheLabelOfTheSameUUID) {
+TEST_F(CreateLabelTest, replacesTheLabelWithTheSameUUID) {
     define(color, {label(u"Red", u"l-red", State::READ_ONLY)});
     labels.createLabel(color, LabelDefinition(u"Other", u"l-red"));
     EXPECT_THAT(labels.getLabels(color), ElementsAre(LabelDefinition(u"Other", u"l-red")));
@@ -103,10 +118,10 @@ TEST_F(CreateLabelTest, checksTheNamesAndWritesOnceUnderOneGuard) {
     EXPECT_THAT(store->calls("setNodes")[0].paths, ElementsAre(labelAt(color, red)));
     EXPECT_TRUE(wasHeldThroughout(Guard::Write, store->calls()));
     EXPECT_THAT(store->calls("acquireReadLock"),
-                testing::SizeIs(2)); // of the check, and of the listing in it
+                testing::SizeIs(2)); // for the check, and for the list in it
 }
 
-TEST_F(CreateLabelTest, asksForTheLabelsThroughTheVirtualOperation) {
+TEST_F(CreateLabelTest, readsTheLabelsThroughTheVirtualOperation) {
     class Listing : public LabelManagerBase {
     public:
         using LabelManagerBase::LabelManagerBase;
@@ -122,57 +137,57 @@ TEST_F(CreateLabelTest, asksForTheLabelsThroughTheVirtualOperation) {
 
 using ReadLabelsTest = LabelsTest;
 
-TEST_F(ReadLabelsTest, raiseForACategoryWithoutAnAddressWithTheNameThatTheCallerHas) {
+TEST_F(ReadLabelsTest, throwForACategoryWithoutAnAddressWithTheNameOfTheCallersObject) {
     EXPECT_RAISES(CategoryDoesNotExist, (u"Color"), labels.getLabels(color));
     EXPECT_RAISES(CategoryDoesNotExist, (u"Color"), labels.getLabelByUUID(color, u"l-red"));
 }
 
-TEST_F(ReadLabelsTest, areNoneInACategoryThatHasNone) {
+TEST_F(ReadLabelsTest, areEmptyForACategoryWithoutLabels) {
     define(color, {});
     EXPECT_THAT(labels.getLabels(color), IsEmpty());
 }
 
-TEST_F(ReadLabelsTest, areNoneInAnAddressThatExistsWithoutANode) {
-    make(categoryAt(color));
+TEST_F(ReadLabelsTest, areEmptyForAnAddressWithoutANode) {
+    createAddress(categoryAt(color));
     EXPECT_THAT(labels.getLabels(color), IsEmpty());
     EXPECT_RAISES(LabelDoesNotExistsByUUID, (u"l-red"), labels.getLabelByUUID(color, u"l-red"));
 }
 
-TEST_F(ReadLabelsTest, comeInTheOrderOfTheStoreAndNotByName) {
+TEST_F(ReadLabelsTest, areInTheOrderOfTheStoreAndNotByName) {
     LabelDefinition const first(u"B", u"1");
     LabelDefinition const second(u"A", u"2");
     define(color, {second, first});
     EXPECT_THAT(labels.getLabels(color), ElementsAre(first, second));
 }
 
-TEST_F(ReadLabelsTest, passOverAddressesOfOtherTypesAndThoseWithoutANode) {
+TEST_F(ReadLabelsTest, skipAddressesOfOtherTypesAndWithoutANode) {
     define(color, {red});
     store->put(categoryAt(color).child({u"Other", u"other"}), {{u"Name", u"Other"}});
-    make(categoryAt(color).child({u"Label", u"without a node"}));
+    createAddress(categoryAt(color).child({u"Label", u"without a node"}));
     EXPECT_THAT(labels.getLabels(color), ElementsAre(red));
 }
 
 TEST_F(ReadLabelsTest, areFoundByUUIDAlsoAtAnAddressWithoutANode) {
     define(color, {});
-    make(labelAt(color, red));
+    createAddress(labelAt(color, red));
     EXPECT_EQ(labels.getLabelByUUID(color, u"l-red"), LabelIdentifier(u"l-red", u"", State::INHERITED));
 }
 
-TEST_F(ReadLabelsTest, raiseForAnUnknownUUIDAndForOneOfAnotherCategory) {
+TEST_F(ReadLabelsTest, throwForAnUnknownUUIDAndForOneOfAnotherCategory) {
     define(color, {});
     define(tags, {red});
     EXPECT_RAISES(LabelDoesNotExistsByUUID, (u"unknown"), labels.getLabelByUUID(color, u"unknown"));
     EXPECT_RAISES(LabelDoesNotExistsByUUID, (u"l-red"), labels.getLabelByUUID(color, u"l-red"));
 }
 
-TEST_F(ReadLabelsTest, inheritTheirStateWhenNoneIsStored) {
+TEST_F(ReadLabelsTest, inheritTheirStateIfNoneIsStored) {
     define(color, {});
     store->put(labelAt(color, red), {{u"Name", u"Red"}});
     EXPECT_EQ(labels.getLabelByUUID(color, u"l-red").isReadOnly(), State::INHERITED);
     EXPECT_EQ(labels.getLabels(color).at(0).isReadOnly(), State::INHERITED);
 }
 
-TEST_F(ReadLabelsTest, raiseForAStateThatIsNoneOfTheThree) {
+TEST_F(ReadLabelsTest, throwForAnUnknownState) {
     define(color, {blue});
     store->put(labelAt(color, red), {{u"Name", u"Red"}, {u"ReadOnly", u"1"}});
     EXPECT_RAISES_NESTED(LabelReadOnlyStateUndefined, (u"1"), std::out_of_range,
@@ -199,7 +214,7 @@ TEST_F(ReadLabelsTest, areReadUnderTheReadGuard) {
 
 using DeleteLabelTest = LabelsTest;
 
-TEST_F(DeleteLabelTest, isDecidedByTheStateOfTheLabelGivenAndForAnInheritedOneByTheCategoryGiven) {
+TEST_F(DeleteLabelTest, dependsOnTheStateOfTheGivenLabelAndForAnInheritedOneOnTheGivenCategory) {
     struct Case {
         CategoryDefinition category;
         State state;
@@ -223,7 +238,7 @@ TEST_F(DeleteLabelTest, isDecidedByTheStateOfTheLabelGivenAndForAnInheritedOneBy
     }
 }
 
-TEST_F(DeleteLabelTest, looksAtTheObjectsGivenWhateverTheStoreSays) {
+TEST_F(DeleteLabelTest, dependsOnTheGivenObjectsWhateverIsStored) {
     auto const readOnly = label(u"Red", u"l-red", State::READ_ONLY);
     define(color, {red});
     EXPECT_RAISES(CanNotModifyReadOnlyLabel, (), labels.deleteLabel(color, readOnly));
@@ -234,36 +249,36 @@ TEST_F(DeleteLabelTest, looksAtTheObjectsGivenWhateverTheStoreSays) {
     EXPECT_THAT(labels.getLabels(color), IsEmpty());
 }
 
-TEST_F(DeleteLabelTest, takesTheLabelFromAllFilesWithItsDataAndLeavesTheOthers) {
+TEST_F(DeleteLabelTest, removesTheLabelFromAllFilesWithItsDataAndKeepsTheOthers) {
     define(color, {red, blue});
     auto const a = file(u"folder/a");
-    bear(a, color, {red, blue});
+    addLabelNodes(a, color, {red, blue});
     record(a, red, u"dark");
     record(a, blue, u"bright");
-    bear(root / u"folder", color, {red});
+    addLabelNodes(root / u"folder", color, {red});
 
     labels.deleteLabel(color, red);
 
     EXPECT_THAT(labels.getLabels(color), ElementsAre(blue));
-    EXPECT_EQ(borne(a), (Borne{{u"c-color", {u"l-blue"}}}));
-    EXPECT_THAT(borne(root / u"folder"), IsEmpty());
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-color", {u"l-blue"}}}));
+    EXPECT_THAT(labelUUIDs(root / u"folder"), IsEmpty());
     EXPECT_THAT(records(a), ElementsAre(u"bright"));
 }
 
-TEST_F(DeleteLabelTest, leavesTheSecondOfTwoThatStandOnOneFile) {
+TEST_F(DeleteLabelTest, keepsTheSecondOfTwoEqualLabelsOfAFile) {
     define(tags, {red});
     auto const a = file(u"a");
-    bear(a, tags, {red, red});
+    addLabelNodes(a, tags, {red, red});
 
     labels.deleteLabel(tags, red);
 
-    EXPECT_EQ(borne(a), (Borne{{u"c-tags", {u"l-red"}}}));
+    EXPECT_EQ(labelUUIDs(a), (LabelUUIDs{{u"c-tags", {u"l-red"}}}));
 }
 
-TEST_F(DeleteLabelTest, cleansAllFilesBeforeTheDefinitionGoesUnderOneGuard) {
+TEST_F(DeleteLabelTest, cleansAllFilesBeforeItRemovesTheDefinitionUnderOneGuard) {
     define(color, {red});
     auto const a = file(u"folder/a");
-    bear(a, color, {red});
+    addLabelNodes(a, color, {red});
     record(a, red, u"dark");
 
     labels.deleteLabel(color, red);
@@ -281,15 +296,15 @@ TEST_F(DeleteLabelTest, ofAnUnknownLabelOrCategoryRemovesNothingWithoutAnError) 
     EXPECT_THAT(labels.getLabels(color), ElementsAre(red));
 }
 
-TEST_F(DeleteLabelTest, leavesTheFilesCleanedWhenTheDefinitionCanNotBeRemoved) {
+TEST_F(DeleteLabelTest, keepsTheFilesCleanedIfTheDefinitionCannotBeRemoved) {
     define(color, {red});
     auto const a = file(u"a");
-    bear(a, color, {red});
+    addLabelNodes(a, color, {red});
     store->failOn("removeNodes", [] { throw std::runtime_error("the disk fails"); });
 
     EXPECT_THROW(labels.deleteLabel(color, red), std::runtime_error);
 
-    EXPECT_THAT(borne(a), IsEmpty());
+    EXPECT_THAT(labelUUIDs(a), IsEmpty());
     EXPECT_THAT(labels.getLabels(color), ElementsAre(red));
 }
 

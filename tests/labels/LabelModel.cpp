@@ -44,7 +44,7 @@ void LabelModel::add(Paths const& paths) {
         }
     }
     for (auto const& path : all) {
-        files_[path].categories.clear(); // the records lie beside the node and stay
+        files_[path].categories.clear(); // the records are in another node and stay
     }
 }
 
@@ -104,12 +104,12 @@ void LabelModel::put(File& file, Label const& label, Path const& path,
     if (found == file.categories.end()) {
         found = file.categories.insert(found, {category.getUUID(), {}});
     } else if (category.isSingleValued()) {
-        for (auto const& borne : found->labels) {
+        for (auto const& stored : found->labels) {
             try {
-                displaced.emplace_back(category, getLabelByUUID(category, borne.labelUUID), path,
-                                       borne.value);
+                displaced.emplace_back(category, getLabelByUUID(category, stored.labelUUID), path,
+                                       stored.value);
             } catch (Refusal const&) {
-                // gone without a word
+                // removed without being returned
             }
         }
         found->labels.clear();
@@ -126,14 +126,16 @@ void LabelModel::removeLabels(Paths const& paths, std::vector<Label> const& labe
             if (category == file.categories.end()) {
                 continue;
             }
-            auto const hasUUID = [&](Borne const& borne) { return borne.labelUUID == label.getUUID(); };
-            auto const borne = std::find_if(category->labels.begin(), category->labels.end(), hasUUID);
-            if (borne == category->labels.end()) {
+            auto const hasUUID = [&](StoredLabel const& stored) {
+                return stored.labelUUID == label.getUUID();
+            };
+            auto const stored = std::find_if(category->labels.begin(), category->labels.end(), hasUUID);
+            if (stored == category->labels.end()) {
                 continue;
             }
-            category->labels.erase(borne);
+            category->labels.erase(stored);
             std::erase_if(file.records, hasUUID);
-            std::erase_if(file.categories, [](BorneCategory const& each) { return each.labels.empty(); });
+            std::erase_if(file.categories, [](StoredCategory const& each) { return each.labels.empty(); });
         }
         changed[path] = file;
     }
@@ -146,15 +148,15 @@ void LabelModel::removeCategory(Paths const& paths, CategoryIdentifier const& ca
     }
     for (auto const& path : paths) {
         std::erase_if(files_[path].categories,
-                      [&](BorneCategory const& each) { return each.uuid == category.getUUID(); });
+                      [&](StoredCategory const& each) { return each.uuid == category.getUUID(); });
     }
 }
 
 std::vector<LabelModel::LabelIDSet> LabelModel::getLabelIDSets(Path const& path) const {
     std::vector<LabelIDSet> result;
     for (auto const& category : requireFile(path).categories) {
-        for (auto const& borne : category.labels) {
-            result.emplace_back(category.uuid, borne.labelUUID);
+        for (auto const& stored : category.labels) {
+            result.emplace_back(category.uuid, stored.labelUUID);
         }
     }
     return result;
@@ -166,7 +168,7 @@ std::vector<LabelModel::FileLabel> LabelModel::getLabels(Path const& path) const
     for (auto const& pair : getLabelIDSets(path)) {
         auto const category = getCategoryByUUID(pair.getCategoryUUID());
         auto const label = getLabelByUUID(category, pair.getLabelUUID());
-        auto const record = std::find_if(records.begin(), records.end(), [&](Borne const& each) {
+        auto const record = std::find_if(records.begin(), records.end(), [&](StoredLabel const& each) {
             return each.labelUUID == pair.getLabelUUID();
         });
         if (record != records.end()) {

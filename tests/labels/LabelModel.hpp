@@ -15,7 +15,7 @@ namespace project::test {
 
 using fl::filesystem::Path;
 
-/// What an operation gave, one line for each thing, or what it raised.
+/// The result of an operation, one line for each item, or its error.
 using Lines = std::vector<std::string>;
 
 inline std::string quoted(std::u16string const& text) {
@@ -55,7 +55,7 @@ Lines lines(std::vector<Item> const& items) {
     return result;
 }
 
-/// Thrown by the model where the managers raise an error.
+/// Thrown by the model where the managers throw an error of the catalog.
 struct Refusal {
     std::string message;
     std::vector<std::u16string> arguments;
@@ -69,8 +69,8 @@ inline Lines lines(Refusal const& refusal) {
     return result;
 }
 
-/// A project's files, categories and labels in plain containers: what the managers are compared with. Its
-/// operations are named as theirs. One that throws a Refusal has changed nothing.
+/// A project's files, categories and labels in plain containers, with which the managers are compared. Its
+/// operations have the names of theirs. An operation that throws a Refusal has changed nothing.
 class LabelModel {
 public:
     using CategoryIdentifier = management::CategoryIdentifier;
@@ -80,7 +80,7 @@ public:
     using LabelIDSet = management::LabelIDSet;
     using Paths = std::vector<Path>;
 
-    /// @param onDisk all that is on disk below the root, the store's files left out.
+    /// @param onDisk all files and folders on disk below the root, except the store's.
     LabelModel(Path root, Path metadataRoot, Paths onDisk)
         : root_(std::move(root)), metadataRoot_(std::move(metadataRoot)), onDisk_(std::move(onDisk)) {}
 
@@ -104,29 +104,29 @@ public:
     std::vector<LabelIdentifier> getLabels(CategoryIdentifier const& category) const;
     LabelIdentifier getLabelByUUID(CategoryIdentifier const& category, std::u16string const& uuid) const;
 
-    /// What somebody else stored: a data record on a file.
+    /// Adds a data record to a file, as another program would.
     void putRecord(Path const& path, std::u16string const& labelUUID, std::u16string const& value);
 
-    /// The records that somebody else finds on a file, the UUID of the label and the data of each.
+    /// Returns the data records of a file, the UUID of the label and the data of each.
     Lines getRecords(Path const& path) const;
 
-    /// What somebody else stored: a value on the first label of a file.
+    /// Sets a value of the first label of a file, as another program would.
     void putValue(Path const& path, std::u16string const& value);
 
 private:
-    struct Borne {
+    struct StoredLabel {
         std::u16string labelUUID;
         std::u16string value;
     };
 
-    struct BorneCategory {
+    struct StoredCategory {
         std::u16string uuid;
-        std::vector<Borne> labels;
+        std::vector<StoredLabel> labels;
     };
 
     struct File {
-        std::vector<BorneCategory> categories;
-        std::vector<Borne> records;
+        std::vector<StoredCategory> categories;
+        std::vector<StoredLabel> records;
     };
 
     struct Category {

@@ -1,5 +1,5 @@
-// Random sequences over files, categories and labels, made on the managers over a store and on a plain model.
-// After each step both must give the same answers to every question that a caller can ask.
+// Random sequences of operations on files, categories and labels, on the managers over a store and on a plain
+// model. After each operation, all queries must have the same results in both.
 
 #include <algorithm>
 #include <functional>
@@ -26,7 +26,7 @@ using test::Lines;
 using test::lines;
 using test::Refusal;
 
-// Few values of each kind, so that steps meet. One UUID serves for a category and for a label.
+// Few values of each kind, so that operations meet. One UUID is that of a category and of a label.
 std::vector<std::u16string> const categoryUUIDs{u"c1", u"c2", u"same"};
 std::vector<std::u16string> const labelUUIDs{u"l1", u"l2", u"same"};
 std::vector<std::u16string> const names{u"A", u"B", u"a", u""};
@@ -35,7 +35,7 @@ std::vector<std::u16string> const projectFiles{u"a", u"a/b", u"a/b/c", u"a/d", u
 std::vector<std::u16string> const allPaths{u"",    u"a", u"a/b", u"a/b/c", u"a/d", u"e", u".projectdata/f",
                                            u"gone"};
 
-/// One step of a sequence: what is done, and all that it may need.
+/// An operation of a sequence, with all the arguments that it may need.
 struct Step {
     enum class Kind {
         add,
@@ -54,7 +54,7 @@ struct Step {
 
     Kind kind;
     std::vector<std::u16string> paths; ///< relative to the root
-    std::vector<Label> labels;         ///< one at least; the first one's category is the one that is meant
+    std::vector<Label> labels;         ///< at least one; the operation uses the category of the first one
     std::u16string name;
 
     CategoryIdentifier const& category() const { return labels[0].getCategory(); }
@@ -89,7 +89,7 @@ std::ostream& operator<<(std::ostream& out, Step const& step) {
     return out;
 }
 
-/// Mostly paths that can be in the project: one that can't makes a whole step fail.
+/// Mostly paths that can be in the project: any other path makes the whole operation fail.
 rc::Gen<std::u16string> anyPath() {
     return rc::gen::weightedOneOf<std::u16string>(
         {{15, rc::gen::elementOf(projectFiles)}, {1, rc::gen::elementOf(allPaths)}});
@@ -111,7 +111,7 @@ rc::Gen<Label> anyLabel() {
 rc::Gen<Step> anyStep() {
     using Kind = Step::Kind;
     return rc::gen::exec([] {
-        // What adds comes more often than what takes away, so that there is something to take.
+        // Additions are more frequent than removals, so that there is something to remove.
         auto const kind = *rc::gen::weightedElement<Kind>({{3, Kind::add},
                                                            {1, Kind::remove},
                                                            {8, Kind::addLabels},
@@ -206,7 +206,7 @@ Refusal asRefusal(foundation::core::except::IMsgIDException const& error) {
     return refusal;
 }
 
-/// What a call gives, or what it raises.
+/// The result of a call, or its error.
 Lines outcomeOf(std::function<Lines()> const& call) {
     try {
         return call();
@@ -217,9 +217,9 @@ Lines outcomeOf(std::function<Lines()> const& call) {
     }
 }
 
-/// Makes a step on the managers or on the model, whose operations are named alike.
+/// Applies an operation to the managers or to the model, whose operations have the same names.
 template <class Files, class Labels, class Others>
-Lines make(Step const& step, std::vector<Path> const& paths, Files& files, Labels& labels, Others& others) {
+Lines apply(Step const& step, std::vector<Path> const& paths, Files& files, Labels& labels, Others& others) {
     using Kind = Step::Kind;
     switch (step.kind) {
     case Kind::add:
@@ -252,7 +252,7 @@ Lines make(Step const& step, std::vector<Path> const& paths, Files& files, Label
         break;
     case Kind::putRecord:
         for (auto const& path : paths) {
-            files.getLabelIDSets(path); // raises for what is not in the project
+            files.getLabelIDSets(path); // throws for a file that is not in the project
             others.putRecord(path, step.label().getUUID(), step.name);
         }
         break;
@@ -273,7 +273,7 @@ void append(Lines& all, std::function<Lines()> const& call) {
     all.insert(all.end(), more.begin(), more.end());
 }
 
-/// The answers to all questions that can be asked.
+/// The results of all queries.
 template <class Files, class Labels, class Others>
 Lines answers(Path const& root, Files& files, Labels& labels, Others& others) {
     Lines all = lines(files.getProjectFiles());
@@ -294,7 +294,7 @@ Lines answers(Path const& root, Files& files, Labels& labels, Others& others) {
     return all;
 }
 
-/// The steps that put all files into the project and define all labels in all categories.
+/// The operations that add all files to the project and create all labels in all categories.
 std::vector<Step> everythingDefined() {
     using Kind = Step::Kind;
     std::vector<Step> steps{{Kind::add, {u"a/b/c", u"a/d", u"e"}, {}, u""}};
@@ -311,7 +311,7 @@ std::vector<Step> everythingDefined() {
     return steps;
 }
 
-/// Two projects to be kept alike.
+/// The two projects that must be equal.
 class Comparison {
 public:
     explicit Comparison(Path const& root)
@@ -319,8 +319,8 @@ public:
 
     void step(Step const& step) {
         auto const paths = below(root_, step.paths);
-        auto const expected = outcomeOf([&] { return make(step, paths, model_, model_, model_); });
-        auto const actual = outcomeOf([&] { return make(step, paths, real_.files, real_.labels, real_); });
+        auto const expected = outcomeOf([&] { return apply(step, paths, model_, model_, model_); });
+        auto const actual = outcomeOf([&] { return apply(step, paths, real_.files, real_.labels, real_); });
         RC_ASSERT(actual == expected);
         RC_ASSERT(answers(root_, real_.files, real_.labels, real_) == answers(root_, model_, model_, model_));
     }
@@ -331,7 +331,7 @@ private:
     LabelModel model_;
 };
 
-/// Compares random steps, after some that are the same each time.
+/// Compares the projects after random operations, which follow some that are the same each time.
 bool check(std::vector<Step> const& first) {
     test::TemporaryFolder const folder;
     for (auto const* file : {u"a/b/c", u"a/d", u"e"}) {
@@ -349,11 +349,11 @@ bool check(std::vector<Step> const& first) {
     });
 }
 
-TEST(LabelModel, isMatchedFromAnEmptyProjectOn) {
+TEST(LabelModel, isMatchedFromAnEmptyProject) {
     EXPECT_TRUE(check({}));
 }
 
-TEST(LabelModel, isMatchedWhenMostLabelsOnFilesAreDefined) {
+TEST(LabelModel, isMatchedWhenMostLabelsOnFilesExist) {
     EXPECT_TRUE(check(everythingDefined()));
 }
 

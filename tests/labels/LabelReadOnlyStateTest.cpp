@@ -17,13 +17,13 @@ TEST(LabelReadOnlyState, isStoredByItsName) {
     EXPECT_EQ(labelTypeToString(LabelReadOnlyState::INHERITED), u"INHERITED");
 }
 
-TEST(LabelReadOnlyState, comesBackFromItsText) {
+TEST(LabelReadOnlyState, isReadFromItsText) {
     for (auto const* text : {u"READ_ONLY", u"WRITABLE", u"INHERITED"}) {
         EXPECT_EQ(labelTypeToString(getLabelStateFromName(text)), text);
     }
 }
 
-TEST(LabelReadOnlyState, isInheritedWhenThereIsNoText) {
+TEST(LabelReadOnlyState, isInheritedWithoutAText) {
     EXPECT_EQ(getLabelStateFromName(u""), LabelReadOnlyState::INHERITED);
 }
 
@@ -36,11 +36,11 @@ TEST(LabelReadOnlyState, isNotFoundByAnyOtherText) {
     EXPECT_RAISES_NESTED(LabelReadOnlyStateUndefined, (u"1"), std::out_of_range, getLabelStateFromName(u"1"));
 }
 
-TEST(LabelReadOnlyState, hasNoTextForAValueThatIsNoState) {
+TEST(LabelReadOnlyState, hasNoTextForAnInvalidValue) {
     EXPECT_THROW(labelTypeToString(static_cast<LabelReadOnlyState>(3)), std::out_of_range);
 }
 
-TEST(LabelReadOnlyState, givesTheSameTextObjectEachTime) {
+TEST(LabelReadOnlyState, returnsTheSameTextObjectEachTime) {
     EXPECT_EQ(&labelTypeToString(LabelReadOnlyState::WRITABLE),
               &labelTypeToString(LabelReadOnlyState::WRITABLE));
 }

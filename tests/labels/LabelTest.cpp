@@ -13,7 +13,7 @@ TEST(Label, takesTheCategoryFirst) {
     EXPECT_EQ(label.getLabelIdentifier(), LabelDefinition(u"Red", u"r"));
 }
 
-TEST(Label, isKnownByTheUUIDOfTheLabelAndNotOfItsCategory) {
+TEST(Label, isIdentifiedByTheUUIDOfTheLabelAndNotOfItsCategory) {
     Label const label(CategoryDefinition(u"Color", u"c"), LabelDefinition(u"Red", u"r"));
     EXPECT_EQ(label.getUUID(), u"r");
 }

@@ -29,7 +29,7 @@ TEST(ErrorMatchers, acceptTheErrorWithItsArguments) {
     EXPECT_RAISES_NESTED(FileNotInProject, (u"/a"), std::out_of_range, raiseNested());
 }
 
-TEST(ErrorMatchers, tellOfACallThatThrowsNothing) {
+TEST(ErrorMatchers, describeACallThatDoesNotThrow) {
     auto const result = raises<FileNotInProject>(texts(u"/a"), [] {});
 
     EXPECT_FALSE(result);
@@ -37,7 +37,7 @@ TEST(ErrorMatchers, tellOfACallThatThrowsNothing) {
     EXPECT_THAT(result.message(), HasSubstr("nothing was thrown"));
 }
 
-TEST(ErrorMatchers, tellOfOtherArguments) {
+TEST(ErrorMatchers, describeOtherArguments) {
     auto const result = raises<FileNotInProjectRoot>(texts(u"/root", u"/a"), raiseOutsideRoot);
 
     EXPECT_FALSE(result);
@@ -45,14 +45,14 @@ TEST(ErrorMatchers, tellOfOtherArguments) {
     EXPECT_THAT(result.message(), HasSubstr("but FileNotInProjectRoot(u\"/a\", u\"/root\"): "));
 }
 
-TEST(ErrorMatchers, tellOfAnotherErrorWithWhereItWasRaised) {
+TEST(ErrorMatchers, describeAnotherErrorWithItsOrigin) {
     auto const result = raises<FileNotInProject>(texts(u"/a"), raiseOutsideRoot);
 
     EXPECT_FALSE(result);
     EXPECT_THAT(result.message(), HasSubstr("raised at\n#0 "));
 }
 
-TEST(ErrorMatchers, tellOfWhatIsNoErrorOfTheLibrary) {
+TEST(ErrorMatchers, describeAnExceptionThatIsNotAnErrorOfTheLibrary) {
     auto const exception = raises<FileNotInProject>(texts(u"/a"), [] { throw std::runtime_error("text"); });
     auto const number = raises<FileNotInProject>(texts(u"/a"), [] { throw 1; });
 
@@ -62,7 +62,7 @@ TEST(ErrorMatchers, tellOfWhatIsNoErrorOfTheLibrary) {
     EXPECT_THAT(number.message(), HasSubstr("no std::exception"));
 }
 
-TEST(ErrorMatchers, tellNestedErrorsFromPlainOnes) {
+TEST(ErrorMatchers, distinguishNestedErrorsFromPlainOnes) {
     auto const plainExpected = raises<FileNotInProject>(texts(u"/a"), raiseNested);
     auto const nestedExpected =
         raisesNested<FileNotInProjectRoot, std::out_of_range>(texts(u"/a", u"/root"), raiseOutsideRoot);

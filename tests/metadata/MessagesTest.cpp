@@ -112,7 +112,7 @@ TEST(Messages, theLanguageOfTheNextTextIsTheOneThatTheApplicationSets) {
               MessageCatalog::get_message(CanNotModifyReadOnlyLabel(), "de"));
 }
 
-TEST(Messages, aLanguageThatDoesNotShipGetsEnglish) {
+TEST(Messages, aLanguageWithoutTextsGetsEnglish) {
     EXPECT_EQ(MessageCatalog::get_message(FileNotInProject(first), "fr"),
               MessageCatalog::get_message(FileNotInProject(first), "en"));
 }

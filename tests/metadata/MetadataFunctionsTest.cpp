@@ -21,7 +21,8 @@ namespace {
 using test::TemporaryFolder;
 using Text = std::u16string;
 
-/// Short paths of few characters, so that two of them often share elements, and end in odd places.
+/// Short paths of few characters, so that two of them often share elements and have separators in unusual
+/// places.
 Text anyPath() {
     auto const text =
         *rc::gen::scale(0.2, rc::gen::container<std::string>(rc::gen::element('/', '/', 'a', 'a', 'b', '.')));
@@ -33,7 +34,7 @@ struct Cut {
     std::vector<Text> names;
 };
 
-/// A path as one would cut it by hand.
+/// A path in elements, by the plainest algorithm.
 Cut cut(Text const& path) {
     Cut result = {path.starts_with(u'/'), {}};
     Text name;
@@ -55,7 +56,7 @@ Text join(std::vector<Text> const& names) {
     return joined;
 }
 
-/// The relative path element by element, in the plainest way.
+/// The relative path, by the plainest algorithm.
 Text relativeByHand(Text const& base, Text const& target) {
     auto const from = cut(base);
     auto const to = cut(target);
@@ -83,7 +84,7 @@ bool isBelowByHand(Text const& folder, Text const& path) {
 
 } // namespace
 
-TEST(GetRelativePath, isTheRestBelowTheBase) {
+TEST(GetRelativePath, isTheTargetBelowTheBase) {
     EXPECT_EQ(getRelativePath(u"/a", u"/a/b"), u"b");
     EXPECT_EQ(getRelativePath(u"/a", u"/a/b/c.txt"), u"b/c.txt");
     EXPECT_EQ(getRelativePath(u"/", u"/a/b"), u"a/b");
@@ -108,7 +109,7 @@ TEST(GetRelativePath, goesUpFromTheBaseToATargetOutside) {
     EXPECT_EQ(getRelativePath(u"/ab", u"/a"), u"../a");
 }
 
-TEST(GetRelativePath, beginsWithTwoDotsWhereNoStepsLeadToTheTarget) {
+TEST(GetRelativePath, beginsWithTwoDotsIfThereIsNoWayToTheTarget) {
     EXPECT_EQ(getRelativePath(u"/a", u"b/c"), u"../../b/c");
     EXPECT_EQ(getRelativePath(u"/a/b", u"a/b"), u"../../../a/b");
     EXPECT_EQ(getRelativePath(u"a/b", u"/a/b"), u"../../a/b");
@@ -119,14 +120,14 @@ TEST(GetRelativePath, beginsWithTwoDotsWhereNoStepsLeadToTheTarget) {
     EXPECT_EQ(getRelativePath(u"", u"/"), u"..");
 }
 
-TEST(GetRelativePath, runsOfSeparatorsAndTrailingOnesGo) {
+TEST(GetRelativePath, repeatedAndTrailingSeparatorsAreRemoved) {
     EXPECT_EQ(getRelativePath(u"/a/", u"/a/b"), u"b");
     EXPECT_EQ(getRelativePath(u"/a", u"/a//b///c/"), u"b/c");
     EXPECT_EQ(getRelativePath(u"//a", u"/a/b/"), u"b");
     EXPECT_EQ(getRelativePath(u"/a", u"/c//d/"), u"../c/d");
 }
 
-TEST(GetRelativePath, takesElementsAsTheyStand) {
+TEST(GetRelativePath, usesElementsUnchanged) {
     EXPECT_EQ(getRelativePath(u"/a", u"/a/b\\c"), u"b\\c");
     EXPECT_EQ(getRelativePath(u"/a", u"/a/./b"), u"./b");
     EXPECT_EQ(getRelativePath(u"/a", u"/a/\xD800"), u"\xD800");
@@ -137,7 +138,7 @@ TEST(GetRelativePath, aNameBelowTheBaseThatBeginsWithTwoDotsKeepsThem) {
     EXPECT_EQ(getRelativePath(u"/a", u"/a/../b"), u"../b");
 }
 
-RC_GTEST_PROP(GetRelativePath, isWhatWalkingElementByElementGives, ()) {
+RC_GTEST_PROP(GetRelativePath, isTheResultOfThePlainAlgorithm, ()) {
     auto const base = anyPath();
     auto const target = anyPath();
 
@@ -188,7 +189,7 @@ TEST(GetParentFolder, endsAtTheRootOrTheEmptyPath) {
     EXPECT_EQ(getParentFolder(u""), Path(u""));
 }
 
-RC_GTEST_PROP(GetParentFolder, reachesTheTextOfTheFolderThatOneStartedBelow, ()) {
+RC_GTEST_PROP(GetParentFolder, leadsBackToTheTextOfAFolderAbove, ()) {
     Path const root = getParentFolder(u"/" + anyPath() + u"a/x");
     auto const below = cut(anyPath()).names;
     Path path = root / join(below);
@@ -210,7 +211,7 @@ TEST(IsParent, isTrueForEveryFolderAbove) {
     EXPECT_TRUE(isParent(u"/a/..b", u"/a"));
 }
 
-TEST(IsParent, isFalseForThePathItselfAndForWhatLiesElsewhere) {
+TEST(IsParent, isFalseForThePathItselfAndForPathsElsewhere) {
     EXPECT_FALSE(isParent(u"/a", u"/a"));
     EXPECT_FALSE(isParent(u"/a/", u"/a"));
     EXPECT_FALSE(isParent(u"/", u"/"));
@@ -220,14 +221,14 @@ TEST(IsParent, isFalseForThePathItselfAndForWhatLiesElsewhere) {
     EXPECT_FALSE(isParent(u"/a", u""));
 }
 
-RC_GTEST_PROP(IsParent, isTrueWhenTheElementsOfTheFolderBeginThoseOfThePath, ()) {
+RC_GTEST_PROP(IsParent, isTrueIfTheElementsOfThePathBeginWithThoseOfTheFolder, ()) {
     auto const path = anyPath();
     auto const folder = anyPath();
 
     RC_ASSERT(isParent(path, folder) == isBelowByHand(folder, path));
 }
 
-TEST(Exists, isTrueForFilesFoldersAndLinksWhereverTheyLead) {
+TEST(Exists, isTrueForFilesFoldersAndAllLinks) {
     TemporaryFolder const folder;
     folder.addFile("file");
     folder.addLink("dangling", "none");
@@ -262,7 +263,7 @@ TEST(IsDirectory, isFalseForFilesAndForLinksToThemOrToNothing) {
     EXPECT_FALSE(is_directory(folder.path() / u"loop"));
 }
 
-TEST(ExistsAndIsDirectory, areFalseForWhatCannotBeThere) {
+TEST(ExistsAndIsDirectory, areFalseForPathsThatCannotExist) {
     TemporaryFolder const folder;
     folder.addFile("file");
     auto const root = folder.path();
@@ -276,7 +277,7 @@ TEST(ExistsAndIsDirectory, areFalseForWhatCannotBeThere) {
     }
 }
 
-TEST(ExistsAndIsDirectory, findOddNames) {
+TEST(ExistsAndIsDirectory, findUnusualNames) {
     TemporaryFolder const folder;
     for (auto const* name : {u"with space", u"line\nbreak", u"\u05E9\u05DC\u05D5\u05DD", u"\u202Ertl",
                              u"\U0001F600", u"stray\xDCFF", u"\xDCC3(", u"back\\slash"}) {
@@ -300,27 +301,27 @@ TEST(GenerateUUID, isARandomUuidInLowerCase) {
     }
 }
 
-TEST(GenerateUUID, neverGivesTheSameTwiceOnAnyThread) {
+TEST(GenerateUUID, neverReturnsTheSameTwiceOnAnyThread) {
     constexpr std::size_t threadCount = 4;
     constexpr std::size_t rounds = 2000;
-    std::vector<std::vector<Text>> made(threadCount);
+    std::vector<std::vector<Text>> generated(threadCount);
     {
         std::vector<std::jthread> threads;
-        for (auto& list : made) {
+        for (auto& list : generated) {
             threads.emplace_back(
                 [&list] { std::generate_n(std::back_inserter(list), rounds, generateUUID); });
         }
     }
 
     std::set<Text> different;
-    for (auto const& list : made) {
+    for (auto const& list : generated) {
         different.insert(list.begin(), list.end());
     }
 
     EXPECT_EQ(different.size(), threadCount * rounds);
 }
 
-TEST(GenerateUUID, theChildOfAForkGivesOthersThanItsParent) {
+TEST(GenerateUUID, theChildOfAForkGeneratesOthersThanItsParent) {
     generateUUID();
     std::array<int, 2> ends{};
     ASSERT_EQ(::pipe(ends.data()), 0);

@@ -42,7 +42,7 @@ TEST(MetadataNode, removingTheOnlyChildLeavesAnEmptyListAtOnce) {
     EXPECT_THAT(node.getChildren(), IsEmpty());
 }
 
-TEST(MetadataNode, removingWhatIsNoChildChangesNothing) {
+TEST(MetadataNode, removingAPointerThatIsNotAChildChangesNothing) {
     MetadataNodeSpecification node;
     node.addChild(u"child");
     node.removeChild(&node);

@@ -23,7 +23,7 @@ void raisePlain() {
     raise(FileNotInProject(u"/a/file"));
 }
 
-/// Raises as a lookup does that turns its failure into an error of the catalog.
+/// Raises an error of the catalog after a failed lookup.
 void raiseNested() {
     try {
         throw std::out_of_range("no such key");
@@ -45,7 +45,7 @@ TEST(ProjectException, addsNothingToItsBase) {
     EXPECT_EQ(sizeof(ProjectException), sizeof(computils::exception::StackTraceRecordingException));
 }
 
-TEST(Raise, throwsThePlainErrorWhereNothingIsBeingHandled) {
+TEST(Raise, throwsThePlainErrorOutsideACatchBlock) {
     try {
         raisePlain();
         FAIL() << "nothing was thrown";
@@ -55,7 +55,7 @@ TEST(Raise, throwsThePlainErrorWhereNothingIsBeingHandled) {
     }
 }
 
-TEST(Raise, nestsTheExceptionThatIsBeingHandled) {
+TEST(Raise, nestsTheCurrentException) {
     try {
         raiseNested();
         FAIL() << "nothing was thrown";
@@ -65,7 +65,7 @@ TEST(Raise, nestsTheExceptionThatIsBeingHandled) {
     }
 }
 
-/// Raises an error while another one of the library is being handled.
+/// Raises an error in a catch block for another error of the library.
 void raiseWithinHandler() {
     try {
         raisePlain();
@@ -83,7 +83,7 @@ TEST(Raise, nestsOneErrorOfTheLibraryInAnother) {
     }
 }
 
-TEST(Raise, isPlainAgainBehindTheHandler) {
+TEST(Raise, isPlainAgainAfterTheCatchBlock) {
     EXPECT_THROW(raiseNested(), NestedTypeError);
 
     EXPECT_THROW(
@@ -97,7 +97,7 @@ TEST(Raise, isPlainAgainBehindTheHandler) {
         Raised<FileNotInProject>);
 }
 
-TEST(Raise, isPlainOnAnotherThreadThanThatOfTheHandler) {
+TEST(Raise, isPlainOnAThreadOtherThanThatOfTheCatchBlock) {
     std::exception_ptr raised;
     try {
         throw std::out_of_range("on this thread");
@@ -119,7 +119,7 @@ TEST(Raise, isPlainOnAnotherThreadThanThatOfTheHandler) {
     }
 }
 
-TEST(Raise, givesTheMessagesTextThroughEveryBase) {
+TEST(Raise, returnsTheMessagesTextThroughEveryBase) {
     auto const text = fl::i18n::MessageCatalog::get_message(FileNotInProject(u"/a/file"));
     auto const utf8 = fl::i18n::toUtf8(text);
     ASSERT_THAT(utf8, testing::HasSubstr("/a/file"));
@@ -143,7 +143,7 @@ TEST(Raise, whatOfANestedErrorIsTheMessagesTextToo) {
     }
 }
 
-TEST(Raise, carriesTheMessageAndItsId) {
+TEST(Raise, hasTheMessageAndItsId) {
     try {
         raise(LabelExistsByName(u"a category", u"a label"));
         FAIL() << "nothing was thrown";

@@ -2,13 +2,13 @@
 
 #include <typeinfo>
 
-/// A shared library with hidden visibility that raises errors, as those of the managers do.
+/// A shared library with hidden visibility that raises errors, like that of the managers.
 namespace project::test {
 
 __attribute__((visibility("default"))) void raisePlain();
 __attribute__((visibility("default"))) void raiseNested();
 
-/// The class information of both as that library has it.
+/// The type information of both in that library.
 __attribute__((visibility("default"))) std::type_info const& plainType();
 __attribute__((visibility("default"))) std::type_info const& nestedType();
 

@@ -22,14 +22,15 @@ TEST(SharedLibraryErrors, areCaughtByEveryTypeOnTheOtherSide) {
     EXPECT_THROW(test::raiseNested(), std::nested_exception);
 }
 
-// Comparing by name would find them equal too; the place shows that nothing hides them from each other.
-TEST(SharedLibraryErrors, haveTheirClassInformationOnceInTheProcess) {
+// A comparison by name would find them equal too; the same address shows that neither is hidden from the
+// other.
+TEST(SharedLibraryErrors, haveTheirTypeInformationOnceInTheProcess) {
     EXPECT_EQ(&test::plainType(), &typeid(Plain));
     EXPECT_EQ(&test::nestedType(), &typeid(std::_Nested_exception<Plain>));
     EXPECT_EQ(test::plainType().name(), typeid(Plain).name());
 }
 
-TEST(SharedLibraryErrors, carryTheirTextAndTheirStackAcross) {
+TEST(SharedLibraryErrors, keepTheirTextAndTheirStackAcrossLibraries) {
     try {
         test::raisePlain();
         FAIL() << "nothing was thrown";
@@ -39,7 +40,7 @@ TEST(SharedLibraryErrors, carryTheirTextAndTheirStackAcross) {
     }
 }
 
-TEST(SharedLibraryErrors, causesCanBeTakenOutOnTheOtherSide) {
+TEST(SharedLibraryErrors, nestedCausesCanBeReadOnTheOtherSide) {
     try {
         test::raiseNested();
         FAIL() << "nothing was thrown";

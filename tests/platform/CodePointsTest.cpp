@@ -16,8 +16,8 @@ std::string utf8Of(char32_t codePoint) {
     return bytes;
 }
 
-/// The well-formed sequences of Unicode's table of them: for each lead byte, the length and the range of the
-/// second byte. All further bytes are 80 to BF.
+/// The well-formed sequences of UTF-8, as Unicode's table lists them: for each lead byte, the length and the
+/// range of the second byte. All further bytes are 80 to BF.
 struct Sequence {
     unsigned firstLead;
     unsigned lastLead;
@@ -32,7 +32,7 @@ constexpr Sequence sequences[] = {
     {0xF1, 0xF3, 4, 0x80, 0xBF}, {0xF4, 0xF4, 4, 0x80, 0x8F},
 };
 
-/// The length of the sequence of a lead byte and a second one when all further bytes are continuations.
+/// The length of a sequence with this lead byte and second byte, if all further bytes are continuations.
 std::size_t expectedLength(unsigned lead, unsigned second) {
     if (lead < 0x80) {
         return 1;

@@ -24,14 +24,14 @@ TestError makeError() {
     return {base, TestMessage("Greeting", std::u16string(u"Ann"), std::u16string(u"late"))};
 }
 
-TEST(Exception, givesTheSameTextThroughBothItsBases) {
+TEST(Exception, returnsTheSameTextThroughBothBases) {
     auto const error = makeError();
 
     EXPECT_STREQ(static_cast<IException const&>(error).what(), "Hello Ann, it's late");
     EXPECT_STREQ(static_cast<std::exception const&>(error).what(), "Hello Ann, it's late");
 }
 
-TEST(Exception, keepsTheTextInTheLanguageOfTheThrowAndGivesItInThePresentOneWhenAsked) {
+TEST(Exception, keepsTheTextInTheLanguageOfTheThrowAndLooksUpTheCurrentOneOnRequest) {
     auto const error = makeError();
     GlobalLocale const german("de");
     std::u16string text = u"before";
@@ -53,7 +53,7 @@ TEST(Exception, hasTheCatalogAndTheNameForItsId) {
               "ZEPHRA:project:management:FileNotInProject");
 }
 
-TEST(Exception, givesTheMessageThatItWasMadeFrom) {
+TEST(Exception, returnsTheMessageThatItWasConstructedFrom) {
     auto const error = makeError();
 
     auto const& message = error.GetBaseMsgIDObj();
@@ -120,7 +120,7 @@ TEST(Exception, beginsWithTheInterface) {
               static_cast<void const*>(&error));
 }
 
-/// The slot of a virtual operation, counted from 0, as a pointer to it tells.
+/// The slot of a virtual operation, counted from 0, from a pointer to it.
 template <class Operation>
 std::intptr_t slotOf(Operation operation) {
     struct Parts {
@@ -131,13 +131,13 @@ std::intptr_t slotOf(Operation operation) {
     return (std::bit_cast<Parts>(operation).offset - 1) / static_cast<std::intptr_t>(sizeof(void*));
 }
 
-TEST(Exception, keepsItsOperationsInTheirSlotsSoThatBuiltApplicationsGoOnWorking) {
+TEST(Exception, keepsItsOperationsInTheirSlotsSoThatBuiltApplicationsKeepWorking) {
     using ToWide = void (IUserException::*)(std::u16string&) const;
     using ToNarrow = void (IUserException::*)(std::string&) const;
 
     EXPECT_EQ(slotOf(&IException::clone), 0);
     EXPECT_EQ(slotOf(&IException::rethrow), 1);
-    EXPECT_EQ(slotOf(&IException::what), 4); // behind both destructors
+    EXPECT_EQ(slotOf(&IException::what), 4); // after both destructors
     EXPECT_EQ(slotOf(static_cast<ToWide>(&IUserException::convert_str)), 5);
     EXPECT_EQ(slotOf(static_cast<ToNarrow>(&IUserException::convert_str)), 6);
     EXPECT_EQ(slotOf(&IUserException::ToUstringImpl), 7);
@@ -146,7 +146,7 @@ TEST(Exception, keepsItsOperationsInTheirSlotsSoThatBuiltApplicationsGoOnWorking
     EXPECT_EQ(slotOf(&IMsgIDException::GetBaseMsgIDObj), 10);
 }
 
-TEST(StackTraceRecordingException, leavesWhatAsStandardExceptionsHaveIt) {
+TEST(StackTraceRecordingException, hasTheStandardTextOfWhat) {
     StackTraceRecordingException const error(u"a text");
 
     EXPECT_STREQ(error.what(), std::exception().what());

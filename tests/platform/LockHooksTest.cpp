@@ -47,7 +47,7 @@ TEST(LockHooks, runOnceForReadersThatShare) {
     EXPECT_EQ(log.entries(), (std::vector<std::string>{"first reads", "other out", "last"}));
 }
 
-TEST(LockHooks, theReaderThatGoesLastRunsLastThoughItWasNotFirst) {
+TEST(LockHooks, theReaderThatLeavesLastRunsLastAlthoughItWasNotFirst) {
     Log log;
     Lock lock(hooksThatTell(log));
     auto first = std::make_optional(lock.readLock());
@@ -68,7 +68,7 @@ TEST(LockHooks, theReaderThatGoesLastRunsLastThoughItWasNotFirst) {
     EXPECT_EQ(log.entries(), (std::vector<std::string>{"first reads", "first out", "last"}));
 }
 
-TEST(LockHooks, eachHandOverBetweenThreadsThatExcludeEachOtherIsALastAndAFirst) {
+TEST(LockHooks, eachHandoverBetweenThreadsThatExcludeEachOtherIsALastAndAFirst) {
     Log log;
     Lock lock(hooksThatTell(log));
     auto writing = std::make_optional(lock.writeLock());
@@ -115,7 +115,7 @@ TEST(LockHooks, othersWaitWhileFirstRuns) {
     }
 }
 
-TEST(LockHooks, readersThatWaitedForFirstGetInBesideTheOneThatRanIt) {
+TEST(LockHooks, readersThatWaitedForFirstEnterBesideTheOneThatRanIt) {
     std::latch isInFirst(1);
     std::latch mayGoOn(1);
     Lock lock({[&](Access) {
@@ -142,7 +142,7 @@ TEST(LockHooks, readersThatWaitedForFirstGetInBesideTheOneThatRanIt) {
     EXPECT_TRUE(other.isDone());
 }
 
-TEST(LockHooks, nobodyGetsInWhileLastRuns) {
+TEST(LockHooks, noThreadEntersWhileLastRuns) {
     for (Entry const enter : {&Lock::readLock, &Lock::writeLock}) {
         Log log;
         std::latch isInLast(1);
@@ -172,7 +172,7 @@ TEST(LockHooks, nobodyGetsInWhileLastRuns) {
     }
 }
 
-TEST(LockHooks, whatFirstThrowsReachesItsThreadWhichThenHoldsNothing) {
+TEST(LockHooks, anExceptionOfFirstPropagatesToItsThreadWhichThenHoldsNoLock) {
     for (Entry const enter : {&Lock::readLock, &Lock::writeLock}) {
         int firsts = 0;
         int lasts = 0;
@@ -193,7 +193,7 @@ TEST(LockHooks, whatFirstThrowsReachesItsThreadWhichThenHoldsNothing) {
     }
 }
 
-TEST(LockHooks, aFailedFirstLetsTheOnesThatWaitIn) {
+TEST(LockHooks, aFailedFirstAdmitsTheWaitingThreads) {
     for (Entry const failing : {&Lock::readLock, &Lock::writeLock}) {
         std::latch isInFirst(1);
         std::latch mayThrow(1);
@@ -224,7 +224,7 @@ TEST(LockHooks, aFailedFirstLetsTheOnesThatWaitIn) {
     }
 }
 
-TEST(LockHooks, betweenFirstAndLastOneWritesOrReadersShare) {
+TEST(LockHooks, betweenFirstAndLastOneThreadWritesOrReadersShare) {
     constexpr int rounds = 500;
     std::atomic<int> open = 0;
     std::atomic<int> wrong = 0;

@@ -16,24 +16,25 @@
 
 namespace cmlink {
 
-/// A thread of a test, of which the test can tell whether it waits. Joins when it goes.
+/// A thread of a test. The test can find out whether it waits. The destructor joins it.
 class Worker {
 public:
     explicit Worker(std::function<void()> work)
         : thread_([this, work = std::move(work)] {
-              thread_id_ = ::gettid();
+              threadId_ = ::gettid();
               work();
-              done_ = true;
+              isDone_ = true;
           }) {}
 
-    bool isDone() const { return done_; }
+    bool isDone() const { return isDone_; }
 
-    /// Blocks until the thread sleeps or is done. The system shows a thread that waits for a lock as asleep;
-    /// many looks in a row keep a short sleep on the way there from counting.
+    /// Blocks until the thread sleeps or has ended. The system shows a thread that waits for a lock as
+    /// asleep. A short sleep before does not count, because the thread must be asleep in many checks in a
+    /// row.
     void untilItWaits() const {
         constexpr int enough = 50;
-        for (int looks = 0; looks < enough && !done_; std::this_thread::yield()) {
-            looks = isAsleep() ? looks + 1 : 0;
+        for (int checks = 0; checks < enough && !isDone_; std::this_thread::yield()) {
+            checks = isAsleep() ? checks + 1 : 0;
         }
     }
 
@@ -42,7 +43,7 @@ public:
 private:
     bool isAsleep() const {
         std::array<char, 64> name{};
-        std::snprintf(name.data(), name.size(), "/proc/self/task/%d/stat", thread_id_.load());
+        std::snprintf(name.data(), name.size(), "/proc/self/task/%d/stat", threadId_.load());
         std::array<char, 64> line{};
         int const file = ::open(name.data(), O_RDONLY | O_CLOEXEC);
         auto const length = file < 0 ? -1 : ::read(file, line.data(), line.size() - 1);
@@ -50,17 +51,17 @@ private:
         return length > 0 && std::strstr(line.data(), ") S ") != nullptr;
     }
 
-    std::atomic<pid_t> thread_id_ = 0;
-    std::atomic<bool> done_ = false;
+    std::atomic<pid_t> threadId_ = 0;
+    std::atomic<bool> isDone_ = false;
     std::jthread thread_;
 };
 
-/// What happened, in order, told by any thread.
+/// A log of events, in order, written by any thread.
 class Log {
 public:
-    void add(std::string what) {
+    void add(std::string event) {
         std::lock_guard const lock(mutex_);
-        entries_.push_back(std::move(what));
+        entries_.push_back(std::move(event));
     }
 
     std::vector<std::string> entries() const {
@@ -73,18 +74,18 @@ private:
     std::vector<std::string> entries_;
 };
 
-/// Another thread gets in to write at once: nobody holds the lock.
+/// Expects that the lock is free: another thread gets the write lock at once.
 inline void expectFree(ReentrantReadWriteLock& lock) {
     Worker other([&] { auto const guard = lock.writeLock(); });
     other.untilItWaits();
-    EXPECT_TRUE(other.isDone()) << "somebody still holds the lock";
+    EXPECT_TRUE(other.isDone()) << "another thread still holds the lock";
 }
 
-/// Another thread gets in to read at once.
+/// Expects that another thread gets the read lock at once.
 inline void expectOthersMayRead(ReentrantReadWriteLock& lock) {
     Worker other([&] { auto const guard = lock.readLock(); });
     other.untilItWaits();
-    EXPECT_TRUE(other.isDone()) << "a reader is kept out";
+    EXPECT_TRUE(other.isDone()) << "a reader is excluded";
 }
 
 } // namespace cmlink

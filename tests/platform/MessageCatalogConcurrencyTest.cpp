@@ -8,7 +8,7 @@
 namespace fl::i18n {
 namespace {
 
-TEST(MessageCatalogConcurrency, everyTextIsWholeWhileAnotherThreadChangesTheLanguage) {
+TEST(MessageCatalogConcurrency, everyTextIsCompleteWhileAnotherThreadChangesTheLanguage) {
     project::test::GlobalLocale const restored("en");
     std::atomic<int> foreign = 0;
     std::vector<std::thread> readers;

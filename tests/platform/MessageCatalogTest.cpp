@@ -15,7 +15,7 @@ TestMessage greeting() {
     return TestMessage("Greeting", std::u16string(u"Ann"), std::u16string(u"late"));
 }
 
-/// Makes German the language that ICU takes from the environment, as a German user's would be.
+/// Sets German as ICU's language of the environment, as on the machine of a German user.
 class GermanEnvironment {
 public:
     GermanEnvironment() { set(icu::Locale::getGermany()); }
@@ -35,12 +35,12 @@ private:
     icu::Locale before_ = icu::Locale::getDefault();
 };
 
-TEST(MessageCatalog, putsArgumentsWhereTheirNumbersStand) {
+TEST(MessageCatalog, insertsArgumentsAtTheirNumbers) {
     EXPECT_EQ(MessageCatalog::get_message(greeting(), "en"), u"Hello Ann, it's late");
     EXPECT_EQ(MessageCatalog::get_message(greeting(), "de"), u"late, hallo Ann");
 }
 
-TEST(MessageCatalog, insertsStringsAsTheyAre) {
+TEST(MessageCatalog, insertsStringsUnchanged) {
     std::u16string const odd = {u'{',  u'1', u'}', u'\'', char16_t{0xD800}, u'x', char16_t{0xDC80},
                                 u'\0', u'<'};
 
@@ -49,13 +49,13 @@ TEST(MessageCatalog, insertsStringsAsTheyAre) {
     EXPECT_EQ(text, u"Hello " + odd + u", it's ");
 }
 
-TEST(MessageCatalog, takesNarrowStringsForUtf8) {
+TEST(MessageCatalog, readsNarrowStringsAsUtf8) {
     TestMessage const message("Greeting", std::string("J\xc3\xb6rg"), std::string("\xff"));
 
     EXPECT_EQ(MessageCatalog::get_message(message, "en"), u"Hello J\u00f6rg, it's \ufffd");
 }
 
-TEST(MessageCatalog, writesNumbersInTheWayOfTheLanguage) {
+TEST(MessageCatalog, formatsNumbersForTheLanguage) {
     TestMessage const message("Count", 1234567L);
 
     EXPECT_EQ(MessageCatalog::get_message(message, "en"), u"1,234,567 files");
@@ -69,21 +69,21 @@ TEST(MessageCatalog, anUnsetSlotIsTheNumberZero) {
     EXPECT_EQ(MessageCatalog::get_message(message, "en"), u"0 files");
 }
 
-TEST(MessageCatalog, takesTheGlobalLocaleWhenNoneIsGiven) {
+TEST(MessageCatalog, usesTheGlobalLocaleByDefault) {
     GlobalLocale const german("de");
 
     EXPECT_EQ(MessageCatalog::getGlobalLocale(), "de");
     EXPECT_EQ(MessageCatalog::get_message(greeting()), u"late, hallo Ann");
 }
 
-TEST(MessageCatalog, isEnglishUntilALocaleIsSetWhateverTheEnvironmentSays) {
+TEST(MessageCatalog, isEnglishUntilALocaleIsSetInAnyEnvironment) {
     GermanEnvironment const environment;
 
     EXPECT_EQ(MessageCatalog::getGlobalLocale(), "en");
     EXPECT_EQ(MessageCatalog::get_message(greeting()), u"Hello Ann, it's late");
 }
 
-TEST(MessageCatalog, goesFromARegionToItsLanguage) {
+TEST(MessageCatalog, fallsBackFromARegionToItsLanguage) {
     EXPECT_EQ(MessageCatalog::get_message(greeting(), "de_AT"), u"Servus Ann, late");
     EXPECT_EQ(MessageCatalog::get_message(TestMessage("Count", 1L), "de_AT"), u"1 Dateien");
     EXPECT_EQ(MessageCatalog::get_message(greeting(), "de_CH"), u"late, hallo Ann");
@@ -95,7 +95,7 @@ TEST(MessageCatalog, understandsEverySpellingOfALocale) {
     }
 }
 
-TEST(MessageCatalog, takesFromTheRootWhatALanguageLacks) {
+TEST(MessageCatalog, fallsBackToTheRootForATextThatALanguageLacks) {
     EXPECT_EQ(MessageCatalog::get_message(TestMessage("OnlyInTheRoot"), "de"), u"found in the root");
 }
 
@@ -105,27 +105,27 @@ TEST(MessageCatalog, fallsBackToTheRootAndNotToTheLanguageOfTheEnvironment) {
     EXPECT_EQ(MessageCatalog::get_message(greeting(), "pt_BR"), u"Hello Ann, it's late");
 }
 
-TEST(MessageCatalog, fallsBackToTheRootForWhatIsNoLocale) {
+TEST(MessageCatalog, fallsBackToTheRootForAnInvalidLocale) {
     for (auto const& locale : {std::string(), std::string("../de"), std::string("x/../de"), std::string("C"),
                                std::string("\xff"), std::string(1000, 'd'), std::string("root")}) {
         EXPECT_EQ(MessageCatalog::get_message(greeting(), locale), u"Hello Ann, it's late") << locale;
     }
 }
 
-TEST(MessageCatalog, givesTheNameWithItsArgumentsWhereNoTextIs) {
+TEST(MessageCatalog, returnsTheNameWithItsArgumentsWithoutAText) {
     TestMessage const message("NoSuchMessage", std::u16string(u"one"), std::string("two"), 3L);
 
     EXPECT_EQ(MessageCatalog::get_message(message, "de"), u"NoSuchMessage: one, two, 3");
     EXPECT_EQ(MessageCatalog::get_message(TestMessage("NoSuchMessage"), "de"), u"NoSuchMessage");
 }
 
-TEST(MessageCatalog, givesTheNameWithItsArgumentsWhereNoCatalogIs) {
+TEST(MessageCatalog, returnsTheNameWithItsArgumentsWithoutACatalog) {
     resource_core::BaseMsgID const message("no:such:catalog", "Message", 1);
 
     EXPECT_EQ(MessageCatalog::get_message(message, "en"), u"Message: 0");
 }
 
-TEST(MessageCatalog, givesTheNameWithItsArgumentsWhereTheTextIsNoPattern) {
+TEST(MessageCatalog, returnsTheNameWithItsArgumentsForAnInvalidPattern) {
     EXPECT_EQ(MessageCatalog::get_message(TestMessage("NoPattern", 5L), "en"), u"NoPattern: 5");
 }
 
@@ -137,8 +137,8 @@ TEST(MessageCatalog, keepsTheFirstCatalogOfAName) {
     EXPECT_EQ(MessageCatalog::get_message(message, "en"), u"Hello Ann, it's late");
 }
 
-TEST(MessageCatalog, doesNotTakeForACatalogWhatIsNone) {
-    alignas(16) char const noPackage[64] = "this is no package";
+TEST(MessageCatalog, rejectsInvalidCatalogs) {
+    alignas(16) char const noPackage[64] = "this is not a package";
 
     MessageCatalog::registerCatalog("test:damaged", "damaged_package", noPackage);
 

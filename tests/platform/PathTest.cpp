@@ -12,7 +12,8 @@ namespace {
 
 using Text = std::u16string;
 
-/// Short paths of few characters, so that two of them often share elements, and end in odd places.
+/// Short paths of few characters, so that two of them often share elements and have separators in unusual
+/// places.
 rc::Gen<std::string> pathText() {
     return rc::gen::scale(0.2,
                           rc::gen::container<std::string>(rc::gen::element('/', '/', 'a', 'b', '.', '-')));
@@ -22,7 +23,7 @@ Text widen(std::string const& text) {
     return {text.begin(), text.end()};
 }
 
-/// The elements as one would cut them by hand.
+/// The elements, by the plainest algorithm.
 std::vector<Text> elementsOf(Text const& path) {
     std::vector<Text> elements;
     if (!path.empty() && path.front() == u'/') {
@@ -62,7 +63,7 @@ TEST(Path, keepsItsTextAsGiven) {
     }
 }
 
-TEST(Path, theFlagTravelsWithCopies) {
+TEST(Path, theFlagIsCopied) {
     Path const path(u"a");
     Path copy;
     copy = path;
@@ -80,7 +81,7 @@ TEST(Path, joinsWithOneSeparator) {
     EXPECT_EQ(Path(u"a") / u"b/c/", Path(u"a/b/c/"));
 }
 
-TEST(Path, joiningWithAnEmptyPathLeavesTheLeftOneAsItIs) {
+TEST(Path, joiningWithAnEmptyPathLeavesTheLeftSideUnchanged) {
     EXPECT_EQ(Path(u"a") / u"", Path(u"a"));
     EXPECT_EQ(Path(u"a/") / u"", Path(u"a/"));
     EXPECT_EQ(Path(u"") / u"", Path(u""));
@@ -99,14 +100,14 @@ TEST(Path, isEqualByTextAndNotByElements) {
     EXPECT_NE(Path(u"a"), Path(u"a/"));
 }
 
-TEST(Path, aFolderSortsBeforeWhatLiesBeneathItAndThatBeforeItsLongerNeighbours) {
+TEST(Path, aFolderPrecedesItsContentsAndTheseItsLongerNeighbours) {
     std::set<Path> const sorted = {u"a.b", u"a/b", u"a", u"a-", u"a/b/c", u"a/b-", u"/", u"-"};
 
     std::vector<Path> const expected = {u"-", u"/", u"a", u"a/b", u"a/b/c", u"a/b-", u"a-", u"a.b"};
     EXPECT_EQ(std::vector<Path>(sorted.begin(), sorted.end()), expected);
 }
 
-TEST(PathElements, theRootLengthIsThatOfTheLeadingSeparators) {
+TEST(PathElements, theRootLengthIsTheNumberOfLeadingSeparators) {
     EXPECT_EQ(detail::get_root_path_length(u""), 0U);
     EXPECT_EQ(detail::get_root_path_length(u"a/b"), 0U);
     EXPECT_EQ(detail::get_root_path_length(u"/a"), 1U);
@@ -123,7 +124,7 @@ TEST(PathElements, theFirstElementIsTheRootOrTheFirstName) {
     EXPECT_EQ(detail::extract_first_element(u"a\\b/c"), u"a\\b");
 }
 
-TEST(PathElements, movingDownDropsTheFirstElementAndTheSeparatorsBehindIt) {
+TEST(PathElements, movingDownRemovesTheFirstElementAndTheSeparatorsAfterIt) {
     EXPECT_EQ(detail::move_down(u""), u"");
     EXPECT_EQ(detail::move_down(u"/"), u"");
     EXPECT_EQ(detail::move_down(u"//a/b"), u"a/b");
@@ -157,7 +158,7 @@ TEST(PathElements, theRootIsAnElementThatSortsAsItsText) {
     EXPECT_EQ(order(u"/", u"/a"), std::strong_ordering::less);
 }
 
-TEST(PathElements, runsOfSeparatorsAndTrailingOnesDoNotCount) {
+TEST(PathElements, repeatedAndTrailingSeparatorsDoNotCount) {
     EXPECT_EQ(order(u"//a///b/", u"/a/b"), std::strong_ordering::equal);
     EXPECT_EQ(order(u"/", u"//"), std::strong_ordering::equal);
     EXPECT_EQ(order(u"a//b", u"a/c"), std::strong_ordering::less);
@@ -171,7 +172,7 @@ TEST(PathElements, elementsAreComparedByCodeUnits) {
     EXPECT_EQ(order(u"a\\b", u"a/b"), std::strong_ordering::greater);
 }
 
-RC_GTEST_PROP(PathElements, walkingGivesTheElementsThatCuttingByHandGives, ()) {
+RC_GTEST_PROP(PathElements, iterationReturnsTheElementsOfThePlainAlgorithm, ()) {
     auto const path = widen(*pathText());
 
     RC_ASSERT(elementsByWalking(path) == elementsOf(path));
@@ -184,7 +185,7 @@ RC_GTEST_PROP(PathElements, theOrderIsThatOfTheListsOfElements, ()) {
     RC_ASSERT(order(left, right) == (elementsOf(left) <=> elementsOf(right)));
 }
 
-RC_GTEST_PROP(PathElements, theOrderHoldsBehindLongCommonFolders, ()) {
+RC_GTEST_PROP(PathElements, theOrderHoldsAfterLongCommonFolders, ()) {
     auto const common = widen(*rc::gen::container<std::string>(rc::gen::element('/', 'a', 'b')));
     auto const left = common + widen(*pathText());
     auto const right = common + widen(*pathText());
@@ -199,7 +200,7 @@ RC_GTEST_PROP(PathElements, joiningJoinsTheElements, ()) {
     auto const joined = (Path(left) / Path(right)).native();
 
     auto expected = elementsOf(left);
-    auto const below = elementsOf(u"x/" + right); // behind a name, separators are no root
+    auto const below = elementsOf(u"x/" + right); // after a name, separators are not a root
     expected.insert(expected.end(), below.begin() + 1, below.end());
     RC_ASSERT(elementsOf(joined) == expected);
 }

@@ -30,7 +30,7 @@ std::errc errorOf(std::function<void()> const& action) {
 
 } // namespace
 
-TEST(ReentrantReadWriteLock, aReaderLetsOthersReadAndNotWrite) {
+TEST(ReentrantReadWriteLock, aReaderAdmitsReadersAndNoWriters) {
     Lock lock;
     Log log;
     auto reading = std::make_optional(lock.readLock());
@@ -48,7 +48,7 @@ TEST(ReentrantReadWriteLock, aReaderLetsOthersReadAndNotWrite) {
     EXPECT_EQ(log.entries(), (std::vector<std::string>{"reader out", "writer in"}));
 }
 
-TEST(ReentrantReadWriteLock, aWriterKeepsReadersAndWritersOut) {
+TEST(ReentrantReadWriteLock, aWriterExcludesReadersAndWriters) {
     for (Entry const enter : {&Lock::readLock, &Lock::writeLock}) {
         Lock lock;
         Log log;
@@ -67,7 +67,7 @@ TEST(ReentrantReadWriteLock, aWriterKeepsReadersAndWritersOut) {
     }
 }
 
-TEST(ReentrantReadWriteLock, isFreeOnlyAfterTheOuterGuardHasGone) {
+TEST(ReentrantReadWriteLock, isReleasedOnlyWithTheOutermostGuard) {
     std::vector<std::pair<Entry, Entry>> const nestings = {{&Lock::readLock, &Lock::readLock},
                                                            {&Lock::writeLock, &Lock::readLock},
                                                            {&Lock::writeLock, &Lock::writeLock}};
@@ -87,7 +87,7 @@ TEST(ReentrantReadWriteLock, isFreeOnlyAfterTheOuterGuardHasGone) {
     }
 }
 
-TEST(ReentrantReadWriteLock, aWriterKeepsOthersOutUntilItsLastGuardHasGoneWhicheverThatIs) {
+TEST(ReentrantReadWriteLock, aWriterExcludesOthersUntilItReleasesItsLastGuardInAnyOrder) {
     Lock lock;
     auto writing = std::make_optional(lock.writeLock());
     auto reading = std::make_optional(lock.readLock());
@@ -103,7 +103,7 @@ TEST(ReentrantReadWriteLock, aWriterKeepsOthersOutUntilItsLastGuardHasGoneWhiche
     expectFree(lock);
 }
 
-TEST(ReentrantReadWriteLock, aReaderThatAsksToWriteIsRefusedAtOnceAndReadsOn) {
+TEST(ReentrantReadWriteLock, aReaderThatRequestsTheWriteLockIsRefusedAtOnceAndContinuesToRead) {
     Lock lock;
     auto outer = std::make_optional(lock.readLock());
     auto inner = std::make_optional(lock.readLock());
@@ -121,7 +121,7 @@ TEST(ReentrantReadWriteLock, aReaderThatAsksToWriteIsRefusedAtOnceAndReadsOn) {
     EXPECT_NO_THROW(lock.writeLock());
 }
 
-TEST(ReentrantReadWriteLock, aThreadThatReadsGetsInAgainWhileAWriterWaits) {
+TEST(ReentrantReadWriteLock, aThreadThatReadsMayReadAgainWhileAWriterWaits) {
     Lock lock;
     auto outer = std::make_optional(lock.readLock());
     Worker writer([&] { auto const guard = lock.writeLock(); });
@@ -134,7 +134,7 @@ TEST(ReentrantReadWriteLock, aThreadThatReadsGetsInAgainWhileAWriterWaits) {
     outer.reset();
 }
 
-TEST(ReentrantReadWriteLock, aWaitingWriterGoesBeforeAReaderThatComesLater) {
+TEST(ReentrantReadWriteLock, aWaitingWriterPrecedesALaterReader) {
     Lock lock;
     Log log;
     auto reading = std::make_optional(lock.readLock());
@@ -157,7 +157,7 @@ TEST(ReentrantReadWriteLock, aWaitingWriterGoesBeforeAReaderThatComesLater) {
     EXPECT_EQ(log.entries(), (std::vector<std::string>{"writer", "reader"}));
 }
 
-TEST(ReentrantReadWriteLock, readersThatWaitAreNextWhenAWriterLetsGo) {
+TEST(ReentrantReadWriteLock, waitingReadersAreNextWhenAWriterReleasesTheLock) {
     Lock lock;
     Log log;
     auto writing = std::make_optional(lock.writeLock());
@@ -183,7 +183,7 @@ TEST(ReentrantReadWriteLock, readersThatWaitAreNextWhenAWriterLetsGo) {
     EXPECT_EQ(log.entries(), (std::vector<std::string>{"reader", "reader", "writer"}));
 }
 
-TEST(ReentrantReadWriteLock, aWriterThatComesAgainGoesAfterTheReadersThatWaitedForIt) {
+TEST(ReentrantReadWriteLock, aReturningWriterFollowsTheReadersThatWaitedForIt) {
     Lock lock;
     Log log;
     auto writing = std::make_optional(lock.writeLock());
@@ -241,7 +241,7 @@ TEST(ReentrantReadWriteLock, aStreamOfWritersDoesNotStarveAReader) {
     hasRead = true;
 }
 
-TEST(ReentrantReadWriteLock, manyThreadsNeverSeeAHalfDoneChange) {
+TEST(ReentrantReadWriteLock, manyThreadsNeverSeeAPartialChange) {
     constexpr int rounds = 2000;
     constexpr int writers = 3;
     Lock lock;
@@ -295,7 +295,7 @@ TEST(ReentrantReadWriteLock, oneThreadMayHoldManyLocksAndReleaseThemInAnyOrder) 
     }
 }
 
-TEST(ReentrantReadWriteLock, aLockMadeWhereAnotherOneWasKnowsNothingOfIt) {
+TEST(ReentrantReadWriteLock, aLockAtTheAddressOfADestroyedOneIsFree) {
     Lock beside;
     auto const held = beside.readLock();
     std::optional<Lock> lock;
@@ -309,7 +309,7 @@ TEST(ReentrantReadWriteLock, aLockMadeWhereAnotherOneWasKnowsNothingOfIt) {
     }
 }
 
-TEST(LockGuard, movingItHandsTheLockOn) {
+TEST(LockGuard, movingItTransfersTheLock) {
     Lock lock;
     auto writing = std::make_optional(lock.writeLock());
 
@@ -324,7 +324,7 @@ TEST(LockGuard, movingItHandsTheLockOn) {
     expectFree(lock);
 }
 
-TEST(LockGuard, assigningReleasesWhatWasHeld) {
+TEST(LockGuard, assigningReleasesTheLockThatWasHeld) {
     Lock left;
     Lock right;
     auto guard = std::make_optional(left.writeLock());
@@ -353,7 +353,7 @@ TEST(LockGuard, assigningItToItselfKeepsTheLock) {
     other.join();
 }
 
-TEST(LockGuard, oneThatWasMovedFromCanBeAssignedTo) {
+TEST(LockGuard, aMovedFromGuardCanBeAssigned) {
     Lock lock;
     auto first = lock.readLock();
     auto second = std::make_optional(std::move(first));

@@ -19,7 +19,7 @@ static_assert(sizeof(stacktrace_base) >= stacktrace_base::maximumFrames * sizeof
               "the frames are held inside the object");
 static_assert(std::is_nothrow_copy_constructible_v<stacktrace_base>, "copying a record cannot fail");
 
-// Work behind a call keeps the caller's frame on the stack: without it the call would be a jump.
+// An operation after a call keeps the caller's frame on the stack: without it the call would be a jump.
 void keepFrame() {
     asm volatile("" ::: "memory");
 }
@@ -44,7 +44,7 @@ stacktrace_base captured(unsigned long framesToSkip = 0, int depth = 0) {
     return trace;
 }
 
-/// True when the frame lies in a function as short as those above.
+/// True if the frame is in a function as short as those above.
 template <class Function>
 bool isIn(Frame frame, Function* function) {
     auto const begin = reinterpret_cast<std::uintptr_t>(function);
@@ -87,7 +87,7 @@ TEST(StackTrace, keepsTheInnermostFramesOfADeepStack) {
     EXPECT_EQ(frames.back(), frames[2]) << "all but the first two are the recursion";
 }
 
-TEST(StackTrace, aSecondCaptureTakesThePlaceOfTheFirst) {
+TEST(StackTrace, aSecondCaptureReplacesTheFirst) {
     auto trace = captured(0, 50);
     auto const before = trace.getFrames().size();
 
@@ -96,7 +96,7 @@ TEST(StackTrace, aSecondCaptureTakesThePlaceOfTheFirst) {
     EXPECT_LT(trace.getFrames().size(), before);
 }
 
-TEST(StackTrace, aCopyKeepsTheFramesWhenTheOriginalGoes) {
+TEST(StackTrace, aCopyKeepsTheFramesAfterTheOriginalIsDestroyed) {
     auto original = std::make_optional(captured());
     auto const frames = original->getFrames();
 
@@ -124,7 +124,7 @@ TEST(StackTrace, namesFunctionsThatHaveADynamicSymbol) {
     EXPECT_THAT(captured().toString(), testing::HasSubstr("__libc_start_main in /"));
 }
 
-TEST(StackTrace, givesTheFileAndTheOffsetOfACallWithoutADynamicSymbol) {
+TEST(StackTrace, showsTheFileAndTheOffsetOfACallWithoutADynamicSymbol) {
     Dl_info program{};
     ASSERT_NE(dladdr(reinterpret_cast<void*>(&captureHere), &program), 0);
 

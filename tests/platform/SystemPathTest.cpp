@@ -18,14 +18,14 @@ namespace {
 using project::test::TemporaryFolder;
 using std::filesystem::filesystem_error;
 
-/// Byte strings that are often nearly UTF-8: first and last bytes of each kind of sequence, and ASCII.
+/// Byte strings that are often almost UTF-8: first and last bytes of each kind of sequence, and ASCII.
 rc::Gen<std::vector<std::uint8_t>> nameBytes() {
     return rc::gen::container<std::vector<std::uint8_t>>(rc::gen::element<std::uint8_t>(
         'a', '/', 0x01, 0x7F, 0x80, 0x8F, 0x90, 0x9F, 0xA0, 0xBF, 0xC0, 0xC1, 0xC2, 0xDF, 0xE0, 0xE1, 0xED,
         0xEE, 0xEF, 0xF0, 0xF1, 0xF4, 0xF5, 0xFF));
 }
 
-/// Code units among which the ones that escape bytes are frequent, and there is sometimes a bad one.
+/// Code units with many escapes of bytes, and sometimes an invalid one.
 rc::Gen<std::vector<std::uint16_t>> nameUnits() {
     auto const ordinary =
         rc::gen::element<std::uint16_t>('a', '/', 0x7F, 0x80, 0xE9, 0x7FF, 0x800, 0xD7FF, 0xE000, 0xFFFF);
@@ -57,7 +57,7 @@ std::u16string escaped(std::string const& bytes) {
     return text;
 }
 
-/// What the standard library, which knows nothing of escapes, makes of a code point.
+/// The bytes of a code point according to the standard library, which has no escapes.
 std::string encodedElsewhere(char32_t codePoint) {
     return std::filesystem::path(std::u32string(1, codePoint)).native();
 }
@@ -76,7 +76,7 @@ TEST(SystemPath, aBackslashIsAnOrdinaryCharacter) {
     EXPECT_EQ(textOf("a\\b"), u"a\\b");
 }
 
-TEST(SystemPath, everyCodePointHasTheBytesThatTheStandardLibraryGivesIt) {
+TEST(SystemPath, everyCodePointHasTheBytesOfTheStandardLibrary) {
     for (char32_t codePoint = 1; codePoint <= 0x10FFFF; codePoint += codePoint < 0x3000 ? 1 : 61) {
         if (codePoint >= 0xD800 && codePoint <= 0xDFFF) {
             continue;
@@ -90,7 +90,7 @@ TEST(SystemPath, everyCodePointHasTheBytesThatTheStandardLibraryGivesIt) {
     }
 }
 
-TEST(SystemPath, eachByteThatIsNoValidUtf8BecomesOneLoneSurrogate) {
+TEST(SystemPath, eachByteThatIsNotValidUtf8BecomesOneLoneSurrogate) {
     for (auto const* bytes :
          {"\x80", "\xBF", "\xFF", "\xC3", "\xE2\x82", "\xF0\x9F\x98",        // parts of sequences
           "\xC0\x80", "\xC1\xBF", "\xE0\x9F\xBF", "\xF0\x8F\xBF\xBF",        // longer than needed
@@ -101,7 +101,7 @@ TEST(SystemPath, eachByteThatIsNoValidUtf8BecomesOneLoneSurrogate) {
     }
 }
 
-TEST(SystemPath, whatIsValidBesideAStrayByteKeepsItsMeaning) {
+TEST(SystemPath, validUtf8BesideAStrayByteIsDecoded) {
     EXPECT_EQ(textOf("a\xC3(b"), u"a\xDCC3(b");
     EXPECT_EQ(textOf("\xE2\x82\xC3\xA9"), u"\xDCE2\xDC82\u00E9");
     EXPECT_EQ(textOf("\xC3\xA9\xA9"), u"\u00E9\xDCA9");
@@ -114,7 +114,7 @@ TEST(SystemPath, otherLoneSurrogatesHaveNoNameOnDisk) {
     }
 }
 
-TEST(SystemPath, escapesThatMakeAValidSequenceTogetherHaveNoNameOnDisk) {
+TEST(SystemPath, escapesThatFormAValidSequenceTogetherHaveNoNameOnDisk) {
     EXPECT_THROW(toSystem(u"\xDCC3\xDCA9"), filesystem_error);
     EXPECT_THROW(toSystem(u"a\xDCFF\xDCF0\xDC9F\xDC98\xDC80"), filesystem_error);
 }
@@ -128,7 +128,7 @@ TEST(SystemPath, aNulHasNoNameOnDisk) {
     EXPECT_THROW(toSystem(std::u16string(u"a\0b", 3)), filesystem_error);
 }
 
-TEST(SystemPath, theErrorTellsTheKindAndTheName) {
+TEST(SystemPath, theErrorSaysItsKindAndTheName) {
     try {
         toSystem(u"folder/\xD800");
         FAIL() << "a lone surrogate was given a name";
@@ -138,7 +138,7 @@ TEST(SystemPath, theErrorTellsTheKindAndTheName) {
     }
 }
 
-TEST(SystemPath, allPairsOfBytesMakeARoundTrip) {
+TEST(SystemPath, allPairsOfBytesSurviveARoundTrip) {
     for (int first = 1; first <= 0xFF; ++first) {
         for (int second = 1; second <= 0xFF; ++second) {
             std::string const bytes = {static_cast<char>(first), static_cast<char>(second)};
@@ -147,13 +147,13 @@ TEST(SystemPath, allPairsOfBytesMakeARoundTrip) {
     }
 }
 
-RC_GTEST_PROP(SystemPath, allBytesMakeARoundTrip, ()) {
+RC_GTEST_PROP(SystemPath, allBytesSurviveARoundTrip, ()) {
     auto const bytes = toBytes(*nameBytes());
 
     RC_ASSERT(bytesOf(textOf(bytes)) == bytes);
 }
 
-RC_GTEST_PROP(SystemPath, textComesBackOrHasNoName, ()) {
+RC_GTEST_PROP(SystemPath, textSurvivesARoundTripOrHasNoName, ()) {
     auto const units = *nameUnits();
     std::u16string const text(units.begin(), units.end());
     try {
@@ -165,7 +165,7 @@ RC_GTEST_PROP(SystemPath, textComesBackOrHasNoName, ()) {
     }
 }
 
-TEST(SystemPath, oddNamesOnDiskComeBack) {
+TEST(SystemPath, unusualNamesOnDiskSurviveARoundTrip) {
     TemporaryFolder const folder;
     std::set<Path> const names = {u"with space",
                                   u"line\nbreak",
@@ -190,7 +190,7 @@ TEST(SystemPath, oddNamesOnDiskComeBack) {
     EXPECT_EQ(found, names);
 }
 
-RC_GTEST_PROP(SystemName, isWhatToSystemGives, ()) {
+RC_GTEST_PROP(SystemName, isTheResultOfToSystem, ()) {
     auto const units = *nameUnits();
     Path const path(std::u16string(units.begin(), units.end()));
     std::optional<std::string> expected;
@@ -205,7 +205,7 @@ RC_GTEST_PROP(SystemName, isWhatToSystemGives, ()) {
     RC_ASSERT(given == expected);
 }
 
-TEST(SystemName, holdsTheLongestNameThatTheSystemTakes) {
+TEST(SystemName, containsTheLongestNameThatTheSystemAccepts) {
     for (auto const* last : {u"a", u"\u00E9", u"\u20AC", u"\U0001F600", u"\xDCFF"}) {
         auto const lastLength = bytesOf(last).size();
         std::u16string const longest = std::u16string(PATH_MAX - 1 - lastLength, u'x') + last;
@@ -238,7 +238,7 @@ TEST(Canonical, resolvesLinksAsFarAsThePathExistsAndNormalisesTheRest) {
     EXPECT_EQ(canonical(root / u"real/file/below/..", {}), root / u"real/file");
 }
 
-TEST(Canonical, goesUpFromWhereALinkLeads) {
+TEST(Canonical, goesUpFromTheTargetOfALink) {
     TemporaryFolder const folder;
     folder.addFolder("far/away/target");
     folder.addLink("link", "far/away/target");
@@ -246,7 +246,7 @@ TEST(Canonical, goesUpFromWhereALinkLeads) {
     EXPECT_EQ(canonical(folder.path() / u"link/../beside", {}), folder.path() / u"far/away/beside");
 }
 
-TEST(Canonical, keepsALinkThatLeadsNowhere) {
+TEST(Canonical, keepsADanglingLink) {
     TemporaryFolder const folder;
     folder.addLink("dangling", "none");
 
@@ -271,7 +271,7 @@ TEST(Canonical, theRootStaysTheRoot) {
     EXPECT_EQ(canonical(u"//none", {}), Path(u"/none"));
 }
 
-TEST(Canonical, aRelativePathStartsFromTheBase) {
+TEST(Canonical, aRelativePathIsRelativeToTheBase) {
     TemporaryFolder const folder;
     folder.addFolder("a");
     folder.addLink("link", "a");
@@ -281,7 +281,7 @@ TEST(Canonical, aRelativePathStartsFromTheBase) {
     EXPECT_EQ(canonical(folder.path() / u"a", u"/none"), folder.path() / u"a");
 }
 
-TEST(Canonical, anEmptyOrRelativeBaseStartsFromTheWorkingFolder) {
+TEST(Canonical, anEmptyOrRelativeBaseIsRelativeToTheWorkingFolder) {
     auto const working = fromSystem(std::filesystem::canonical(std::filesystem::current_path()));
 
     EXPECT_EQ(canonical(u"", {}), working);
@@ -289,7 +289,7 @@ TEST(Canonical, anEmptyOrRelativeBaseStartsFromTheWorkingFolder) {
     EXPECT_EQ(canonical(u"none", u"base"), working / u"base/none");
 }
 
-TEST(Canonical, takesAnAbsolutePathAlsoWhenTheWorkingFolderHasGone) {
+TEST(Canonical, acceptsAnAbsolutePathAfterTheWorkingFolderWasDeleted) {
     TemporaryFolder const folder;
     auto const before = std::filesystem::current_path();
     std::filesystem::current_path(folder.addFolder("gone"));
@@ -312,7 +312,7 @@ TEST(Canonical, throwsForALoopOfLinksAndForTextThatHasNoName) {
     EXPECT_THROW(canonical(u"a", u"/\xD800"), filesystem_error);
 }
 
-TEST(Canonical, takesNamesThatAreNoUtf8) {
+TEST(Canonical, acceptsNamesThatAreNotUtf8) {
     TemporaryFolder const folder;
     folder.addFolder("stray\xFF");
     folder.addLink("link", "stray\xFF");

@@ -7,12 +7,12 @@
 #include "fl/i18n/MessageCatalog.hpp"
 #include "resource_core/BaseMsgID.hpp"
 
-/// The compiled texts of tests/platform/messages, as the build puts them into the test program.
+/// The compiled texts of tests/platform/messages, which the build embeds in the test program.
 extern "C" __attribute__((visibility("hidden"))) unsigned char const platform_test_messages[];
 
 namespace project::test {
 
-/// A message of the catalog that the tests of the platform bring along, with any arguments.
+/// A message of the test catalog, with any arguments.
 class TestMessage : public resource_core::BaseMsgID {
 public:
     template <class... Arguments>

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-// A sanitizer has its own malloc and tells of each call; without one, malloc is taken over.
+// A sanitizer has its own malloc and reports each call; without one, malloc is replaced.
 #if defined(__has_feature)
 #if __has_feature(address_sanitizer) || __has_feature(thread_sanitizer)
 #define PROJECT_HAS_SANITIZER_MALLOC
@@ -17,11 +17,11 @@ namespace {
 struct Tally {
     std::size_t count;
     std::size_t total;
-    std::ptrdiff_t held; ///< less than nothing when more was freed than allocated
+    std::ptrdiff_t held; ///< negative if more was freed than allocated
     std::ptrdiff_t peak;
 };
 
-// Of a kind that needs no allocation itself when a thread first touches it.
+// Its first use by a thread does not allocate.
 [[gnu::tls_model("initial-exec")]] thread_local Tally tally{0, 0, 0, 0};
 
 void noteAllocated(std::size_t size) {

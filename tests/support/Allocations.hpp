@@ -4,8 +4,8 @@
 
 namespace project::test {
 
-/// Notes what this thread allocates by malloc and its kin, operator new included, while it lives: how often,
-/// all of its bytes, and the most that were held at once. One at a time for each thread. The program must be
+/// Counts the allocations of this thread, by malloc and operator new, as long as it exists: their number, all
+/// their bytes, and the most bytes at one time. A thread may have one object at a time. The program must be
 /// linked with support/Allocations.cpp.
 class Allocations {
 public:

@@ -17,18 +17,18 @@
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/ProjectException.hpp"
 
-/// Expects that a call raises one error of the catalog, with these arguments, and nothing nested in it:
+/// Expects that a call throws an error of the catalog with these arguments, without a nested exception:
 ///
 ///     EXPECT_RAISES(FileNotInProjectRoot, (path, root), files.add({path}));
 ///     EXPECT_RAISES(CanNotModifyReadOnlyLabel, (), labels.deleteLabel(label));
 ///
-/// Arguments are paths or UTF-16 text. A failure tells what came instead, with its call stack. Evaluates to
-/// something that takes a further message by <<.
+/// Arguments are paths or UTF-16 text. A failure shows the actual outcome with its call stack. A further
+/// message can be appended with <<.
 #define EXPECT_RAISES(Message, arguments, ...)                                                               \
     EXPECT_TRUE(::project::test::raises<::ZEPHRA::project::management::Message>(                             \
         ::project::test::texts arguments, [&] { static_cast<void>(__VA_ARGS__); }))
 
-/// The same for an error that is raised while another exception is handled, which must be of class Cause:
+/// The same for an error with a nested exception, which must be of class Cause:
 ///
 ///     EXPECT_RAISES_NESTED(EntryPointTypeUndefined, (u"Other"), std::out_of_range, getFromName(u"Other"));
 #define EXPECT_RAISES_NESTED(Message, arguments, Cause, ...)                                                 \
@@ -55,8 +55,8 @@ std::vector<std::u16string> texts(Arguments const&... arguments) {
     return {toText(arguments)...};
 }
 
-/// How an argument is shown in a failure: with its quotes, and any other kind than UTF-16 text named, since
-/// that kind is never equal to what a test expects.
+/// The form of an argument in a failure: in quotes, and with the name of its type if that is not UTF-16 text,
+/// which never equals the expected text.
 inline std::string describe(resource_core::BaseMsgID::Argument const& argument) {
     if (auto const* text = std::get_if<std::u16string>(&argument)) {
         return ::testing::PrintToString(*text);
@@ -95,7 +95,7 @@ inline std::string describe(std::exception const& error) {
     return out.str();
 }
 
-/// What a call came to. The error is null when it returned.
+/// The outcome of a call. The error is null if the call returned.
 struct Outcome {
     std::exception_ptr error;
     std::string description = "nothing was thrown";
@@ -113,7 +113,7 @@ Outcome outcomeOf(Call const& call) {
     }
 }
 
-/// True when the cause nested in an error is of this class.
+/// True if the exception nested in an error is of this class.
 template <class Cause>
 bool isCausedBy(std::nested_exception const& error) {
     if (!error.nested_ptr()) {
@@ -128,8 +128,8 @@ bool isCausedBy(std::nested_exception const& error) {
     }
 }
 
-/// Judges the outcome of a call.
-/// @param hasRightCause told of the error, whether what is nested in it is as expected.
+/// Compares the outcome of a call with the expected error.
+/// @param hasRightCause returns whether the exception nested in the error is the expected one.
 template <class Message, class CausePredicate>
 ::testing::AssertionResult judge(Outcome const& outcome, std::vector<std::u16string> const& expected,
                                  std::string const& nesting, CausePredicate const& hasRightCause) {
@@ -142,7 +142,7 @@ template <class Message, class CausePredicate>
                 return ::testing::AssertionSuccess();
             }
         } catch (...) {
-            // told below
+            // described below
         }
     }
     auto const name = ::testing::internal::GetTypeName<Message>();

@@ -7,7 +7,7 @@
 
 namespace project::test {
 
-/// Sets the global locale and puts it back as it was when the test ends.
+/// Sets the global locale. The destructor restores the earlier one.
 class GlobalLocale {
 public:
     explicit GlobalLocale(std::string locale) {

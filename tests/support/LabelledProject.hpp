@@ -19,7 +19,7 @@
 
 namespace project::test {
 
-/// A label on a file as it compares and prints: the UUIDs of the category and the label, and the data.
+/// A label on a file in a form to compare and print: the UUIDs of the category and the label, and the data.
 using ShownLabel = std::tuple<std::u16string, std::u16string, std::u16string>;
 
 inline std::vector<ShownLabel> shown(std::vector<management::FileLabel> const& labels) {
@@ -30,7 +30,7 @@ inline std::vector<ShownLabel> shown(std::vector<management::FileLabel> const& l
     return result;
 }
 
-/// Succeeds when the first call took this guard with none held, and all that followed were made under it.
+/// Succeeds if the first call took this guard as the outermost one, and all later calls were made under it.
 inline ::testing::AssertionResult wasHeldThroughout(StoreCall::Guard guard,
                                                     std::vector<StoreCall> const& calls) {
     auto const taking = guard == StoreCall::Guard::Write ? "acquireWriteLock" : "acquireReadLock";
@@ -46,8 +46,8 @@ inline ::testing::AssertionResult wasHeldThroughout(StoreCall::Guard guard,
     return ::testing::AssertionSuccess();
 }
 
-/// A project at /project over a recording store, whose file manager and label manager know each other. No
-/// file of it is on disk. What the functions here arrange is not recorded.
+/// A project at /project over a recording store, with a connected file manager and label manager. None of its
+/// files is on disk. The functions below are not recorded.
 class LabelledProject : public ::testing::Test {
 protected:
     using Guard = StoreCall::Guard;
@@ -63,7 +63,7 @@ protected:
 
     LabelledProject() { files.setLabelManager(&labels); }
 
-    /// Puts a file and the folders above it into the project, as adding them does.
+    /// Adds a file and the folders above it to the project.
     Path file(std::u16string const& relative) {
         auto const path = root / relative;
         for (auto address = at(path); address.depth() > 1; address = address.parent()) {
@@ -100,7 +100,7 @@ protected:
         }
     }
 
-    /// The node at an address; one without a type when none is stored.
+    /// A copy of the node at an address; an empty node without a type if the address has none.
     std::shared_ptr<MetadataNode> stored(MetadataPath const& path) {
         std::shared_ptr<MetadataNode> node = store->content().getNode(path);
         return node ? node : std::make_shared<metadata::MetadataNodeSpecification>();
@@ -111,8 +111,8 @@ protected:
         store->content().setNodes(batch);
     }
 
-    /// Makes an address exist without a node.
-    void make(MetadataPath const& path) {
+    /// Creates an address without a node.
+    void createAddress(MetadataPath const& path) {
         std::vector<MetadataPath> paths{path};
         store->content().createPaths(paths);
     }
@@ -122,7 +122,7 @@ protected:
         store->content().removeNodes(paths);
     }
 
-    /// Appends a nested child with these values to a node in memory.
+    /// Appends a nested node with these values to a node in memory.
     static MetadataNode& append(MetadataNode& node, std::u16string const& type,
                                 std::map<std::u16string, std::u16string> const& values) {
         auto& child = *node.addChild(type);
@@ -132,9 +132,9 @@ protected:
         return child;
     }
 
-    /// Appends a child for a category with its labels' UUIDs to a file's stored node.
-    void bear(Path const& path, CategoryIdentifier const& category,
-              std::vector<LabelIdentifier> const& members) {
+    /// Appends a category with labels to the stored node of a file.
+    void addLabelNodes(Path const& path, CategoryIdentifier const& category,
+                       std::vector<LabelIdentifier> const& members) {
         auto const node = stored(at(path));
         auto& categoryNode = append(*node, u"Category", {{u"UUID", category.getUUID()}});
         for (auto const& label : members) {
@@ -152,7 +152,7 @@ protected:
         replace(dataAt(path), node);
     }
 
-    /// The values of the data records that a file has.
+    /// The values of the data records of a file.
     std::vector<std::u16string> records(Path const& path) {
         std::vector<std::u16string> result;
         auto const node = stored(dataAt(path));
@@ -162,11 +162,11 @@ protected:
         return result;
     }
 
-    using Borne = std::vector<std::pair<std::u16string, std::vector<std::u16string>>>;
+    using LabelUUIDs = std::vector<std::pair<std::u16string, std::vector<std::u16string>>>;
 
-    /// The UUIDs of a file's categories, each with those of its labels, as they are stored.
-    Borne borne(Path const& path) {
-        Borne result;
+    /// The stored UUIDs of a file's categories, each with those of its labels.
+    LabelUUIDs labelUUIDs(Path const& path) {
+        LabelUUIDs result;
         auto const node = stored(at(path));
         for (auto const& category : node->getChildren()) {
             auto& members = result.emplace_back(category->get(u"UUID"), std::vector<std::u16string>()).second;

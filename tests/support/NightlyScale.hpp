@@ -8,7 +8,7 @@
 
 namespace project::test {
 
-/// A number from the environment by which the nightly run makes a test larger, or the usual one.
+/// The number by which the nightly run scales a test, from the environment, or the usual one.
 inline std::uint64_t numberFromEnvironment(char const* name, std::uint64_t usual) {
     char const* const text = std::getenv(name);
     std::string_view const digits(text != nullptr ? text : "");
@@ -17,13 +17,13 @@ inline std::uint64_t numberFromEnvironment(char const* name, std::uint64_t usual
     return number;
 }
 
-/// How long a test that goes on for a time goes on.
+/// The duration of a test that runs for a time.
 inline std::uint64_t testSeconds(std::uint64_t usual) {
     return numberFromEnvironment("PROJECT_TEST_SECONDS", usual);
 }
 
-/// What random choices begin with: another one in each run, unless one is given to repeat a run. To be shown
-/// when a test fails.
+/// The seed of random choices, which differs in each run unless one is given to repeat a run. A test that
+/// fails must show it.
 inline std::uint64_t testSeed() {
     return numberFromEnvironment("PROJECT_TEST_SEED", std::random_device()());
 }

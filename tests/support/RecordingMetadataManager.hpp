@@ -24,14 +24,14 @@ struct StoreCall {
     enum class Guard { None, Read, Write };
 
     std::string operation;                     ///< "setNodes", "getNode", "acquireReadLock", ...
-    std::vector<metadata::MetadataPath> paths; ///< the addresses given, in the order given
-    Guard guard;                               ///< what the managers held when they made the call
+    std::vector<metadata::MetadataPath> paths; ///< the addresses, in the order of the arguments
+    Guard guard;                               ///< the guard that was held during the call
 };
 
-/// A store in memory that writes down every call made to it, and the guard held at that moment.
+/// A store in memory that records every call, and the guard that is held during it.
 ///
-/// What counts as held is the outermost guard taken through this object; use it from one thread. Calls to
-/// acquire a guard are written down too, with what was held before them.
+/// The guard is the outermost one that was taken through this object. Only one thread may use it. Calls that
+/// acquire a guard are recorded too, with the guard that was held before.
 class RecordingMetadataManager : public metadata::MetadataManager {
 public:
     explicit RecordingMetadataManager(metadata::Path metadataRoot = u"/project/.projectdata")
@@ -74,16 +74,16 @@ public:
 
     void clear() { calls_.clear(); }
 
-    /// From now on, the named operation throws what `error` throws, before it does anything.
+    /// From now on, the named operation calls `error`, which throws, before it does anything.
     void failOn(std::string operation, std::function<void()> error) {
         failing_ = std::move(operation);
         error_ = std::move(error);
     }
 
-    /// The store itself, to arrange or look at content without being recorded.
+    /// The store itself, for changes and checks that are not recorded.
     metadata::MetadataManager& content() { return store_; }
 
-    /// Stores one node without being recorded.
+    /// Stores one node. The call is not recorded.
     void put(metadata::MetadataPath const& path, std::map<std::u16string, std::u16string> const& values,
              std::u16string type = u"Info") {
         auto node = std::make_shared<metadata::MetadataNodeSpecification>(std::move(type));

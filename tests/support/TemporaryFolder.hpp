@@ -10,7 +10,7 @@
 
 namespace project::test {
 
-/// A fresh empty folder on disk, gone with all in it when the object goes.
+/// A new empty folder on disk. The destructor deletes it with its contents.
 class TemporaryFolder {
 public:
     TemporaryFolder() {
@@ -29,16 +29,16 @@ public:
     TemporaryFolder(TemporaryFolder const&) = delete;
     TemporaryFolder& operator=(TemporaryFolder const&) = delete;
 
-    /// The folder as the system names it, canonical.
+    /// The folder's name on disk, canonical.
     std::filesystem::path const& onDisk() const { return folder_; }
 
-    /// The folder as the library names it.
+    /// The folder as a path of the library.
     fl::filesystem::Path root() const { return fl::filesystem::fromSystem(folder_); }
 
-    /// The path of something below the folder, whether or not it is there.
+    /// A path below the folder, which may not exist.
     fl::filesystem::Path path(std::u16string const& relative) const { return root() / relative; }
 
-    /// Makes a file, and the folders above it that are missing.
+    /// Creates a file, and the missing folders above it.
     fl::filesystem::Path file(std::u16string const& relative, std::string const& content = "content") const {
         auto const made = path(relative);
         auto const onDisk = fl::filesystem::toSystem(made);
@@ -47,17 +47,17 @@ public:
         return made;
     }
 
-    /// Makes a folder, and those above it that are missing.
+    /// Creates a folder, and the missing folders above it.
     fl::filesystem::Path folder(std::u16string const& relative) const {
         auto const made = path(relative);
         std::filesystem::create_directories(fl::filesystem::toSystem(made));
         return made;
     }
 
-    /// The folder as the library names it.
+    /// The folder as a path of the library.
     fl::filesystem::Path path() const { return root(); }
 
-    /// The same for names as the system has them, which need not be UTF-8. @return the path on disk.
+    /// The same for a name on disk, which may not be UTF-8. @return the path on disk.
     std::filesystem::path addFile(std::filesystem::path const& relative,
                                   std::string const& content = {}) const {
         auto const made = folder_ / relative;
@@ -77,7 +77,7 @@ public:
         return folder_ / relative;
     }
 
-    /// Removes a file or a folder with all in it.
+    /// Deletes a file, or a folder with its contents.
     void remove(std::u16string const& relative) const {
         std::filesystem::remove_all(fl::filesystem::toSystem(path(relative)));
     }

@@ -1,4 +1,4 @@
 #pragma once
 
-/// Marks what the shared library project::management shows to others.
+/// Marks the symbols that the shared library project::management exports.
 #define PROJECT_MANAGEMENT_EXPORT __attribute__((visibility("default")))

@@ -19,67 +19,80 @@ class LabelIDSet;
 
 /// The files and folders that belong to a project, and the labels on them.
 ///
-/// Paths are absolute and in the same form as the project root. Lists of paths that come back are in Path
-/// order unless told otherwise. The project root itself is always in the project and never in a list.
+/// Paths are absolute and in the form of the project's root. Returned lists of paths are in Path order, in
+/// which a folder precedes its contents. The root itself is always in the project and never in a list.
 class PROJECT_MANAGEMENT_EXPORT FileManager {
 public:
     virtual ~FileManager();
 
-    /// The project's root folder. Takes no lock.
+    /// Returns the project's root folder, absolute. Takes no lock.
     virtual Path getProjectRoot() = 0;
 
-    /// A store of one node for each project file, for whoever has data of its own to keep by file. The scope
-    /// keeps it apart from others; "Root" is the file list itself. The caller owns the result; nothing is
-    /// written until it is used. Takes no lock.
+    /// Returns a manager that stores one node for each file, in which an application keeps data of its own.
+    /// Each scope is separate; the scope "Root" is the file list itself. The caller owns the result. Nothing
+    /// is written until it is used. Takes no lock.
     virtual std::unique_ptr<FileMetadataManager> getFileMetadataManagerFor(std::u16string const& scope) = 0;
 
-    /// Adds files and folders together with all the folders between them and the root, in one batch. The
-    /// contents of a folder are not added. What is already in the project is written anew and loses its
-    /// labels, as do the folders above it. Takes the write lock.
-    /// @throws FileIsMetadataError, FileNotInProjectRoot, FileDoesNotExistError for the first path, in Path
-    ///         order, that cannot be added; nothing is added then.
+    /// Adds files and folders, and all folders between them and the root, in one batch. The contents of a
+    /// folder are not added. A file that is already in the project is stored anew without its labels, and so
+    /// are the folders above it: this is deliberate, a file that was just added has no labels. Takes the
+    /// write lock.
+    /// @throws FileIsMetadataError, FileNotInProjectRoot or FileDoesNotExistError for the first path in Path
+    ///         order that cannot be added. Nothing is added then.
     virtual void add(std::vector<Path> const& files) = 0;
 
-    /// True for the root and for what was added. The disk is not asked. Takes the read lock.
+    /// Returns true for the root and for each file and folder that was added. Does not access the disk. Takes
+    /// the read lock.
     virtual bool isFileInProject(Path const& path) const = 0;
 
-    /// Removes files and folders with everything below them, their entry points, and what stands on them in
-    /// any scope. The disk is left alone and not asked. Takes the write lock.
-    /// @return all that went, a folder before its contents.
-    /// @throws FileNotInProject, RootFolderNotRemoveable before anything is removed.
+    /// Removes files and folders with everything below them, their entry points, and their nodes in every
+    /// scope. Does not access the disk. Takes the write lock.
+    /// @return the removed files and folders.
+    /// @throws FileNotInProject or RootFolderNotRemoveable for the first path in Path order that cannot be
+    ///         removed.
+    /// @throws EntryPointTypeUndefined if an entry point of any file in the project has an unknown type.
+    ///         After each of these errors nothing is removed.
     virtual std::vector<Path> remove(std::vector<Path> const& files) = 0;
 
-    /// What is in the project directly below a folder, in the store's order; empty for anything else. Takes
-    /// the read lock.
+    /// Returns the files and folders of the project directly below a folder, by name in code units. The list
+    /// is empty for any other path. Takes the read lock.
     virtual std::vector<Path> getChildProjectFiles(Path const& path) const = 0;
 
-    /// All files and folders of the project but the root. Holds no lock across its walk: what others write
-    /// meanwhile may be in it or not.
+    /// Returns all files and folders of the project except the root. Takes the read lock for each folder and
+    /// not for the whole operation: a concurrent write may appear in the result in part.
     virtual std::vector<Path> getProjectFiles() const = 0;
 
-    /// Puts every label on every file, in one batch. Files that are not in the project are passed over.
-    /// Takes the write lock.
-    /// @return the labels that had to go from a single-valued category, with their data.
-    /// @throws FileNotInProject for the root, which has no node to bear a label.
+    /// Puts every label on every file, in one batch. Files that are not in the project are skipped. A
+    /// label that a file already has is deliberately put on it once more: in a single-valued category it
+    /// replaces itself and is returned, in any other category the file has it twice. Takes the write lock.
+    /// @return the labels of single-valued categories that the new ones replaced, with their data.
+    /// @throws FileNotInProject for the root, which has no node. Nothing is written then.
     virtual std::vector<FileLabel> addLabels(std::vector<Path> const& files,
                                              std::vector<Label> const& labels) = 0;
 
-    /// Takes every label off every file, with its data; labels that a file does not bear are passed over.
-    /// Takes the write lock.
-    /// @throws FileNotInProject before anything is written.
+    /// Removes every label and its data from every file. Labels that a file does not have are skipped. Takes
+    /// the write lock.
+    /// @throws FileNotInProject if a file is not in the project. Nothing is written then.
     virtual void removeLabels(std::vector<Path> const& files, std::vector<Label> const& labels) = 0;
 
-    /// The labels of a file by UUID alone, in the order in which they were put on. Takes the read lock.
-    /// @throws FileNotInProject
+    /// Returns the labels of a file by UUID alone, grouped by category. The categories are in the order of
+    /// the file's node, which is the order in which the file got its first label of each; the labels of a
+    /// category are in the order in which the file got them. Takes the read lock.
+    /// @throws FileNotInProject if the file is not in the project.
     virtual std::vector<LabelIDSet> getLabelIDSets(Path const& path) = 0;
 
-    /// The labels of a file. One that has data is there twice, first with the data and right after without:
-    /// who needs the data takes the first. Takes the read lock.
-    /// @throws FileNotInProject, CategoryDoesNotExistsByUUID, CategoryDoesNotExist, LabelDoesNotExistsByUUID
+    /// Returns the labels of a file, in the order of getLabelIDSets. A label that has data is deliberately
+    /// listed twice, first with the data and then without it: every label has an entry without data, by which
+    /// callers count labels, and callers that need the data use the first entry. Takes the read lock.
+    /// @throws FileNotInProject if the file is not in the project.
+    /// @throws CategoryDoesNotExistsByUUID, CategoryDoesNotExist or LabelDoesNotExistsByUUID if the
+    ///         definition of a label or of its category was removed.
+    /// @throws LabelReadOnlyStateUndefined if the stored state of a label is unknown.
     virtual std::vector<FileLabel> getLabels(Path const& path) = 0;
 
-    /// Takes all labels of a category off the files, in one batch. Takes the write lock.
-    /// @throws FileNotInProject before anything is written.
+    /// Removes all labels of a category from the files, in one batch. The labels' data stays stored. Takes
+    /// the write lock.
+    /// @throws FileNotInProject if a file is not in the project. Nothing is written then.
     virtual void removeCategory(std::vector<Path> const& files, CategoryIdentifier const& category) = 0;
 };
 

@@ -12,28 +12,31 @@ using metadata::Path;
 
 class FolderReference;
 
-/// A list of folders that a project points to.
+/// A list of folders that a project refers to.
 ///
-/// Queries take the store's read lock, changes its write lock, each for the whole operation.
+/// A query holds the store's read lock for the whole operation, a change its write lock.
 class PROJECT_MANAGEMENT_EXPORT FolderReferenceManager {
 public:
     virtual ~FolderReferenceManager();
 
-    /// All references that can be read, in the store's order.
+    /// Returns all references of a known type, sorted by UUID.
     virtual std::vector<FolderReference> getReferences() const = 0;
 
-    /// Stores the references in one batch.
-    /// @throws DuplicatePathEntryException or DuplicateReferenceException, by the list, for the first
-    ///         location in Path order that is referenced already; nothing is stored then.
+    /// Stores the references under their UUIDs, in one batch. Two new references to the same folder are both
+    /// stored.
+    /// @throws DuplicatePathEntryException (project path) or DuplicateReferenceException (other projects) for
+    ///         the first location in Path order that a stored reference has already. Nothing is stored then.
     virtual void addReferences(std::vector<FolderReference> const& references) = 0;
 
-    /// Removes the references with these UUIDs in one batch; those that are not stored are passed over.
+    /// Removes the references with these UUIDs, in one batch. References that are not stored are skipped.
     virtual void removeReferences(std::vector<FolderReference> const& references) = 0;
 
-    /// True when a reference's location has exactly this text.
+    /// Returns true if the location of a reference has exactly this text.
     virtual bool isReference(Path const& path) const = 0;
 
-    /// The first reference whose location is the path or lies above it; empty when there is none.
+    /// Returns the first reference, in the order of getReferences, whose location is the path or a folder
+    /// above it; nothing if there is none. The first one and not the nearest, deliberately: all folders below
+    /// two nested references have the same root reference.
     virtual std::optional<FolderReference> getRootReferenceFor(Path const& path) const = 0;
 };
 

@@ -10,48 +10,60 @@ namespace project::management {
 class CategoryIdentifier;
 class LabelIdentifier;
 
-/// The categories of a project and the labels in each of them. Which file bears which label is the
-/// FileManager's.
+/// The categories of a project and the labels in each of them. The FileManager stores the labels of each
+/// file.
 ///
-/// Categories and labels are found by their UUID; names matter only where something is created. Queries take
-/// the store's read lock, changes its write lock, each for the whole operation.
+/// Categories and labels are identified by UUID; names are compared only when something is created. A query
+/// holds the store's read lock for the whole operation, a change its write lock.
 class PROJECT_MANAGEMENT_EXPORT LabelManager {
 public:
     virtual ~LabelManager();
 
-    /// Stores a category under the UUID that it carries.
-    /// @throws CategoryExistsByName
+    /// Stores a category under its UUID. If a category with this UUID is stored, the new one replaces it and
+    /// keeps its labels: this is deliberate, and the only way to change the flags of a category.
+    /// @throws CategoryExistsByName if a category has this name.
     virtual void createCategory(CategoryIdentifier const& category) = 0;
 
-    /// @throws CategoryDoesNotExistsByUUID
+    /// Returns the category with this UUID.
+    /// @throws CategoryDoesNotExistsByUUID if it is not stored.
     virtual CategoryIdentifier getCategoryByUUID(std::u16string const& uuid) = 0;
 
-    /// Takes the category's labels off all project files, then removes it with its labels. One that does not
-    /// exist is no error.
-    /// @throws CanNotModifyReadOnlyCategory when the object given says that it is read-only.
+    /// Removes the category's labels from all files of the project, then the category with its labels. A
+    /// category that is not stored is not an error.
+    /// @throws CanNotModifyReadOnlyCategory if the given object says that it is read-only. The stored
+    ///         category is deliberately not checked: a client that manages read-only categories passes a
+    ///         writable object.
     virtual void deleteCategory(CategoryIdentifier const& category) = 0;
 
-    /// Gives the category with this UUID another name, which is not checked. One that does not exist is no
-    /// error.
-    /// @throws CanNotModifyReadOnlyCategory when the object given says that it is read-only.
+    /// Stores another name for the category with this UUID. Another category may have the same name. A
+    /// category that is not stored is not an error.
+    /// @throws CanNotModifyReadOnlyCategory if the given object says that it is read-only.
     virtual void renameCategory(CategoryIdentifier const& category, std::u16string const& newName) = 0;
 
-    /// All categories, in the store's order.
+    /// Returns all categories, sorted by UUID.
     virtual std::vector<CategoryIdentifier> getAllCategories() = 0;
 
-    /// Stores a label in a category under the UUID that it carries.
-    /// @throws CategoryDoesNotExist, LabelExistsByName
+    /// Stores a label in a category under its UUID. Read-only categories accept new labels too.
+    /// @throws CategoryDoesNotExist if the category is not stored.
+    /// @throws LabelExistsByName if a label of the category has this name.
+    /// @throws LabelReadOnlyStateUndefined if a stored label of the category has an unknown state.
+    /// @throws std::out_of_range if the label's own state is not a LabelReadOnlyState.
     virtual void createLabel(CategoryIdentifier const& category, LabelIdentifier const& label) = 0;
 
-    /// The labels of a category, in the store's order.
-    /// @throws CategoryDoesNotExist, LabelReadOnlyStateUndefined
+    /// Returns the labels of a category, sorted by UUID.
+    /// @throws CategoryDoesNotExist if the category is not stored.
+    /// @throws LabelReadOnlyStateUndefined if a label has an unknown state.
     virtual std::vector<LabelIdentifier> getLabels(CategoryIdentifier const& category) = 0;
 
-    /// @throws CategoryDoesNotExist, LabelDoesNotExistsByUUID, LabelReadOnlyStateUndefined
+    /// Returns the label of a category with this UUID.
+    /// @throws CategoryDoesNotExist if the category is not stored.
+    /// @throws LabelDoesNotExistsByUUID if the category does not contain the label.
+    /// @throws LabelReadOnlyStateUndefined if the label has an unknown state.
     virtual LabelIdentifier getLabelByUUID(CategoryIdentifier const& category, std::u16string uuid) = 0;
 
-    /// Takes the label off all project files, then removes it. One that does not exist is no error.
-    /// @throws CanNotModifyReadOnlyLabel when the objects given say that it is read-only.
+    /// Removes the label from all files of the project, then the label itself. A label that is not stored is
+    /// not an error.
+    /// @throws CanNotModifyReadOnlyLabel if the given objects say that it is read-only.
     virtual void deleteLabel(CategoryIdentifier const& category, LabelIdentifier const& label) = 0;
 };
 

@@ -14,9 +14,10 @@ class LabelManager;
 class ProjectPathManager;
 class ProjectReferenceManager;
 
-/// One open project: its name and description, and the managers of all else.
+/// An open project: its name, its description, and the managers of the rest of its definition.
 ///
-/// The managers belong to the project and live as long as it. The accessors take no lock.
+/// The project owns its managers; references to them are valid as long as the project. The accessors take no
+/// lock.
 class PROJECT_MANAGEMENT_EXPORT ProjectManager {
 public:
     virtual ~ProjectManager();
@@ -27,23 +28,24 @@ public:
     virtual ProjectReferenceManager& getProjectReferenceManager() = 0;
     virtual ProjectPathManager& getProjectPathManager() = 0;
 
-    /// Takes the write lock. Any text is accepted; an empty one reads like none.
+    /// Stores the project's name. An empty name reads like no name. Takes the write lock.
     virtual void setName(std::u16string const& name) = 0;
 
-    /// The project's name; empty when it has none. Takes the read lock.
+    /// Returns the project's name; empty if it has none. Takes the read lock.
     virtual std::u16string getName() const = 0;
 
-    /// The project's description; empty when it has none. Takes the read lock.
+    /// Returns the project's description; empty if it has none. Takes the read lock.
     virtual std::u16string getDescription() const = 0;
 
-    /// Takes the write lock. Any text is accepted; an empty one reads like none.
+    /// Stores the project's description. An empty description reads like no description. Takes the write
+    /// lock.
     virtual void setDescription(std::u16string const& description) = 0;
 
-    /// Has the store tell a listener of the files that its writes bring or take away, for as long as the
+    /// Subscribes a listener to the files on disk that the store's writes create or delete, as long as the
     /// listener lives. Takes no lock.
     virtual void subscribe(std::weak_ptr<metadata::FileChangeRequestListener> listener) = 0;
 
-    /// Makes a project: gives it its name, by setName.
+    /// Creates a project by storing its name with setName. Takes the write lock.
     virtual void create(std::u16string const& name) = 0;
 };
 

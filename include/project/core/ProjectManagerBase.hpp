@@ -10,28 +10,28 @@ namespace project::management {
 
 using metadata::Path;
 
-/// The project over a metadata store: the innermost of a stack of project managers, and the only one that
-/// touches the store.
+/// The project manager over a metadata store. Other project managers wrap it; this one alone accesses the
+/// store.
 ///
-/// Construction reads and writes nothing. Call create for a new project. The name and the description are
-/// two nodes in two places, so that setting one leaves the other alone.
+/// The constructor reads and writes nothing. Call create for a new project. The name and the description are
+/// two nodes, so that a write of one does not affect the other.
 class PROJECT_MANAGEMENT_EXPORT ProjectManagerBase : public ProjectManager {
 public:
     /// Key of the project's name.
     static std::u16string const NAME_FIELD;
     /// Key of the project's description; the only key in lower case.
     static std::u16string const DESCRIPTION_FIELD;
-    /// Location of the name node.
+    /// Location of the only step of the name's address.
     static std::u16string const ROOT_METADATA;
-    /// Location of the first element of the description's address.
+    /// Location of the first step of the description's address.
     static std::u16string const ROOT_EXTENSTION;
-    /// Type of the second element of the description's address.
+    /// Type of the second step of the description's address.
     static std::u16string const TYPE_EXTENSTION;
-    /// Location of the second element of the description's address.
+    /// Location of the second step of the description's address.
     static std::u16string const INFORMATION;
 
     /// @param projectRoot the project's root folder, absolute and canonical.
-    /// @param metadataManager the project's store, shared with every manager made here.
+    /// @param metadataManager the project's store, which the managers of this project share.
     ProjectManagerBase(Path projectRoot, std::shared_ptr<metadata::MetadataManager> metadataManager);
     ~ProjectManagerBase() override;
     ProjectManagerBase(ProjectManagerBase const&) = delete;
@@ -49,10 +49,10 @@ public:
     void subscribe(std::weak_ptr<metadata::FileChangeRequestListener> listener) override;
     void create(std::u16string const& name) override;
 
-    /// The address of the name node, the same for every project.
+    /// Returns the address of the name, which is the same in every project.
     static metadata::MetadataPath getRootNodePath();
 
-    /// The address of the description node, the same for every project.
+    /// Returns the address of the description, which is the same in every project.
     static metadata::MetadataPath getDescriptionNodePath();
 
 private:
@@ -61,7 +61,7 @@ private:
 
     std::shared_ptr<metadata::MetadataManager> metadataManager_;
     Path projectRoot_;
-    // Destroyed in reverse: the later ones use the earlier ones.
+    // Destroyed in reverse order: the later managers use the earlier ones.
     std::unique_ptr<FileManager> fileManager_;
     std::unique_ptr<LabelManager> labelManager_;
     std::unique_ptr<EntryPointManager> entryPointManager_;

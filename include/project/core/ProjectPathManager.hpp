@@ -6,12 +6,15 @@ namespace project::management {
 
 class FolderReferenceManager;
 
-/// The project path: folders of the project's own, kept relative to its root.
+/// The project path: a list of folders of this project, stored relative to its root.
+///
+/// The interface has one getter and no operations of its own deliberately: decorators replace the list by
+/// replacing this object.
 class PROJECT_MANAGEMENT_EXPORT ProjectPathManager {
 public:
     virtual ~ProjectPathManager();
 
-    /// The list itself: the same object at each call, valid as long as this one.
+    /// Returns the list. It is the same object at each call, and valid as long as this object.
     virtual FolderReferenceManager& getFolderReferenceManager() = 0;
 };
 

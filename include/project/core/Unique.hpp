@@ -6,12 +6,12 @@
 
 namespace project::management {
 
-/// Something that is known by a UUID, whatever else about it changes.
+/// An object that is identified by a UUID, while everything else about it may change.
 class PROJECT_MANAGEMENT_EXPORT Unique {
 public:
     virtual ~Unique();
 
-    /// The UUID as it was given or generated; its form is not checked.
+    /// Returns the UUID as it was given or generated. Its form is not checked.
     virtual std::u16string getUUID() const = 0;
 
 protected:

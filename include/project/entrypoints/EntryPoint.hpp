@@ -16,41 +16,41 @@ namespace project::management {
 
 using fl::filesystem::Path;
 
-/// The role of one project file in the project's life: what starts with it, ends with it or runs on demand.
+/// A file of the project that users start from, with a type, a name, a group and data of applications.
 class PROJECT_MANAGEMENT_EXPORT EntryPoint : public Unique {
 public:
     ~EntryPoint() override;
 
-    /// The name that is shown to people.
+    /// Returns the name that users see.
     virtual std::u16string getName() const = 0;
 
-    /// The file, absolute.
+    /// Returns the file, absolute.
     virtual Path getFile() const = 0;
 
     virtual EntryPointType getType() const = 0;
 
     virtual bool isVisible() const = 0;
 
-    /// A copy of the group, which the caller owns; null when the entry point has none.
+    /// Returns a copy of the group, which the caller owns; null if the entry point has no group.
     virtual std::unique_ptr<EntryPointGroup> getGroup() const = 0;
 
-    /// The value that somebody has put under this key; empty when the key is absent.
+    /// Returns the value of a key of the extension data; nothing if the key is absent.
     virtual std::optional<std::u16string> getExtensionData(std::u16string const& key) const = 0;
 
-    /// The keys of the extension data, sorted by code units.
+    /// Returns the keys of the extension data, sorted by code units.
     virtual std::vector<std::u16string> getExtensionKeys() const = 0;
 };
 
-/// An entry point as a caller builds and edits it. Plain data: nothing is stored until it is given to an
-/// EntryPointManager. The file is fixed at construction.
+/// An entry point in its editable form. Nothing is stored until it is passed to an EntryPointManager. The
+/// file cannot be changed after construction.
 class PROJECT_MANAGEMENT_EXPORT EntryPointDefinition : public EntryPoint {
 public:
-    /// A visible entry point of type Basic in the default group, named after the file without its extension.
-    /// It has no UUID and no extension data.
+    /// A visible entry point of type Basic in the default group. Its name is the file's name without
+    /// extension. It has no UUID and no extension data.
     explicit EntryPointDefinition(Path const& file);
 
-    /// A copy of everything but the UUID, which stays empty: the copy is an entry point of its own until it
-    /// is stored, where it takes over the UUID of its file's entry.
+    /// Copies everything except the UUID, deliberately: the copy is an entry point of its own. When it is
+    /// stored, it takes the UUID of its file's entry point.
     EntryPointDefinition(EntryPoint const& other);
     EntryPointDefinition(EntryPointDefinition const& other);
 
@@ -73,16 +73,16 @@ public:
     EntryPointDefinition& setUUID(std::u16string const& uuid);
     EntryPointDefinition& setVisible(bool visible);
 
-    /// Puts the entry point into a copy of this group: later changes of the argument don't show here.
+    /// Sets the group to a copy of the argument. Later changes of the argument have no effect.
     EntryPointDefinition& setGroup(EntryPointGroup& group);
 
-    /// Adds the key, or replaces its value.
+    /// Sets the value of a key of the extension data, which may be absent.
     EntryPointDefinition& setExtensionData(std::u16string const& key, std::u16string const& value);
 
-    /// Removes the key; an absent one is no error.
+    /// Removes a key of the extension data, if it is present.
     EntryPointDefinition& removeExtensionData(std::u16string const& key);
 
-    /// Gives the entry point a fresh UUID, unless it has one.
+    /// Sets the UUID to a new one if it is empty.
     EntryPointDefinition& generateUUIDIfNotSpecified();
 
 private:

@@ -6,19 +6,19 @@
 
 namespace project::management {
 
-/// A named group that entry points stand in.
+/// A named group of entry points.
 class PROJECT_MANAGEMENT_EXPORT EntryPointGroup {
 public:
     virtual ~EntryPointGroup();
 
     virtual std::u16string getName() const = 0;
 
-    /// What the group is known by, whatever its name. Empty for one that was never stored and was not given
-    /// any.
+    /// Returns the UUID, which identifies the group. It is empty for a group that was not stored yet and was
+    /// constructed without one.
     virtual std::u16string getUUID() const = 0;
 };
 
-/// A group as a caller builds it. Plain data: nothing is stored until it is given to an EntryPointManager.
+/// A group that a caller builds. Nothing is stored until it is passed to an EntryPointManager.
 class PROJECT_MANAGEMENT_EXPORT EntryPointGroupDefinition : public EntryPointGroup {
 public:
     /// A group without a UUID.
@@ -26,13 +26,13 @@ public:
 
     EntryPointGroupDefinition(std::u16string const& name, std::u16string const& uuid);
 
-    /// A copy with name and UUID: the same group.
+    /// Copies the name and the UUID of a group.
     EntryPointGroupDefinition(EntryPointGroup const& group);
 
     std::u16string getName() const override;
     std::u16string getUUID() const override;
 
-    /// Gives the group a fresh UUID, unless it has one.
+    /// Sets the UUID to a new one if it is empty.
     void generateUUIDIfNotSet();
 
 private:

@@ -7,18 +7,19 @@
 
 namespace project::management {
 
-/// The role of an entry point in the project's life.
+/// The kind of an entry point: basic, start-up, shut-down or batch job.
 enum class EntryPointType : std::int32_t { Basic = 0, Startup = 1, Shutdown = 2, BatchJob = 3 };
 
-/// The name under which a type is stored: "Basic", "Startup", "Shutdown" or "Batch_Job".
+/// Returns the name under which a type is stored: "Basic", "Startup", "Shutdown" or "Batch_Job".
 ///
-/// Empty for a value that is none of the four; such a call adds the value to a map of the process, so it must
-/// not run beside any other use of these two functions. All other calls may come from any thread.
+/// Any other value gives an empty name, deliberately: an entry point of an unknown type can be written, and
+/// only reading it is an error. Such a call adds the value to a map of the process, so no other thread may
+/// use these two functions meanwhile. All other calls may come from any thread.
 PROJECT_MANAGEMENT_EXPORT std::u16string toString(EntryPointType type);
 
-/// The type of a name, compared by code units. Beside what toString gives, "StartUp" and "Batch Job" are
-/// accepted.
-/// @throws EntryPointTypeUndefined with the name, nested over the std::out_of_range of the lookup.
+/// Returns the type for a name, compared by code units. Besides the names that toString returns, "StartUp"
+/// and "Batch Job" are known.
+/// @throws EntryPointTypeUndefined with the name, nested over std::out_of_range, for any other name.
 PROJECT_MANAGEMENT_EXPORT EntryPointType getFromName(std::u16string name);
 
 } // namespace project::management

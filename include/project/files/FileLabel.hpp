@@ -10,12 +10,12 @@ namespace project::management {
 
 using fl::filesystem::Path;
 
-/// One label as it stands on one file, with its data there.
+/// A label on a file, with its data.
 class PROJECT_MANAGEMENT_EXPORT FileLabel : public Label {
 public:
     FileLabel(CategoryIdentifier category, LabelIdentifier labelIdentifier, Path file, std::u16string data);
 
-    /// The same without data.
+    /// A label without data.
     FileLabel(CategoryIdentifier category, LabelIdentifier labelIdentifier, Path file);
 
     ~FileLabel() override;
@@ -24,10 +24,10 @@ public:
     FileLabel(FileLabel&&) = default;
     FileLabel& operator=(FileLabel&&) = default;
 
-    /// The file that bears the label.
+    /// Returns the file that has the label, absolute.
     Path const& getFile() const { return file_; }
 
-    /// The label's data on this file; empty when it has none.
+    /// Returns the label's data on this file; empty if it has none.
     std::u16string const& getData() const { return data_; }
 
 private:

@@ -9,7 +9,7 @@ namespace project::management {
 class CategoryIdentifier;
 class LabelIdentifier;
 
-/// A label by UUID alone: its category's UUID and its own. It names a label also when that has been deleted.
+/// A label by UUID alone: the UUID of its category and its own. The label may have been deleted.
 class PROJECT_MANAGEMENT_EXPORT LabelIDSet {
 public:
     LabelIDSet(std::u16string categoryUUID, std::u16string labelUUID);
@@ -19,7 +19,7 @@ public:
 
     std::u16string const& getLabelUUID() const { return labelUUID_; }
 
-    /// By code units, the category's UUID with the category's and the label's with the label's.
+    /// Compares the categories' UUIDs and the labels' UUIDs, by code units.
     friend bool operator==(LabelIDSet const& left, LabelIDSet const& right) = default;
 
 private:

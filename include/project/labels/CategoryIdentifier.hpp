@@ -7,13 +7,13 @@
 
 namespace project::management {
 
-/// A category of labels: a value that names it and tells what it was like when it was read.
+/// A category of labels: its UUID, and the properties that it had when it was read. An immutable value.
 ///
-/// A category is known by its UUID. The rest goes stale silently when the category is changed. There is no
-/// comparison, since two values for one category may differ.
+/// The UUID identifies the category. The properties become stale without notice when the category is changed.
+/// Two values for the same category may differ, so there is no comparison.
 class PROJECT_MANAGEMENT_EXPORT CategoryIdentifier : private Unique {
 public:
-    /// @param dataType a LabelDataValidator's data type, or any other text; it is not checked.
+    /// @param dataType the data type of a LabelDataValidator, or any other text. It is not checked.
     CategoryIdentifier(std::u16string uuid, std::u16string name, bool readOnly, bool singleValued,
                        std::u16string dataType);
 
@@ -21,14 +21,14 @@ public:
 
     virtual std::u16string getName() const;
 
-    /// True when the category must not be renamed or deleted.
+    /// Returns true if the category must not be renamed or deleted.
     virtual bool isReadOnly() const;
 
-    /// True when a file bears at most one label of this category.
+    /// Returns true if a file can have at most one label of this category.
     virtual bool isSingleValued() const;
 
-    /// What data the category's labels may carry on a file. Never empty: a category without a data type
-    /// answers "None".
+    /// Returns the type of the data that the category's labels have on a file. It is never empty: without a
+    /// data type, the result is "None".
     std::u16string getDataType() const;
 
 private:
@@ -41,16 +41,16 @@ private:
     bool singleValued_;
 };
 
-/// A category in its editable form: what a new one is made from. Changing it changes nothing in the store.
+/// A category in its editable form, from which a new one is created. A change does not affect the store.
 class PROJECT_MANAGEMENT_EXPORT CategoryDefinition : public CategoryIdentifier {
 public:
-    /// A writable, multi-valued category of data type "None" with a fresh UUID.
+    /// A writable, multi-valued category with the data type "None" and a new UUID.
     explicit CategoryDefinition(std::u16string const& name);
 
-    /// The same with a UUID given, whose form is not checked.
+    /// The same with a given UUID, whose form is not checked.
     CategoryDefinition(std::u16string const& name, std::u16string const& uuid);
 
-    // Each setter returns this object, so that calls can be chained.
+    // Each setter returns this object.
     CategoryDefinition& setIsReadOnly(bool readOnly);
     CategoryDefinition& setIsSingleValued(bool singleValued);
     CategoryDefinition& setDataType(std::u16string dataType);

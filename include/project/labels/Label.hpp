@@ -9,12 +9,12 @@
 
 namespace project::management {
 
-/// A label together with its category, as it is put on files and as events tell of it.
+/// A label together with its category, as callers put it on files and events report it.
 class PROJECT_MANAGEMENT_EXPORT Label : public Unique {
 public:
     Label(CategoryIdentifier category, LabelIdentifier labelIdentifier);
 
-    /// The label's UUID, not that of its category.
+    /// Returns the label's UUID, not that of its category.
     std::u16string getUUID() const override;
 
     CategoryIdentifier const& getCategory() const { return category_; }

@@ -9,26 +9,27 @@
 
 namespace project::management {
 
-/// Says for one data type which texts a label may carry as its data on a file.
+/// Defines for one data type which texts are valid as the data of a label on a file.
 ///
-/// The library names data types and checks no data: clients choose a validator, by CategoryIdentifier's data
-/// type or otherwise, and ask it before they store data. Validators have no state; any thread may ask them.
+/// The library itself does not check data: a client chooses a validator, by the category's data type or
+/// otherwise, and calls it before it stores data. Validators have no state; any thread may call them.
 class PROJECT_MANAGEMENT_EXPORT LabelDataValidator {
 public:
     virtual ~LabelDataValidator();
 
-    /// True when the text is acceptable as data of this type.
+    /// Returns true if the text is valid data of this type.
     virtual bool isValid(std::u16string const& text) const = 0;
 
-    /// The type's name as the data type of a category has it, for instance "Logical".
+    /// Returns the name of the data type, as categories have it, for example "Logical".
     virtual std::u16string getDataType() const = 0;
 
-    /// The class of the values, in lower case, for instance "logical". It need not spell the data type.
+    /// Returns the class of the values in lower case, for example "logical". It may differ from the data
+    /// type.
     virtual std::u16string getDataClass() const = 0;
 };
 
-/// Data type "None", class "none". Accepts nothing, not even the empty text: a label of a category of this
-/// type carries no data.
+/// Data type "None", class "none". No text is valid, not even the empty one: a label of a category of this
+/// type has no data.
 class PROJECT_MANAGEMENT_EXPORT EmptyDataValidator : public LabelDataValidator {
 public:
     bool isValid(std::u16string const& text) const override;
@@ -36,7 +37,7 @@ public:
     std::u16string getDataClass() const override;
 };
 
-/// Data type "String", class "char": two names of the one type. Accepts every text, the empty one included.
+/// Data type "String", class "char": the two names deliberately differ. Every text is valid.
 class PROJECT_MANAGEMENT_EXPORT StringDataValidator : public LabelDataValidator {
 public:
     bool isValid(std::u16string const& text) const override;
@@ -44,7 +45,7 @@ public:
     std::u16string getDataClass() const override;
 };
 
-/// Data type "Logical", class "logical". Accepts "true" and "false" in lower case, and nothing else.
+/// Data type "Logical", class "logical". Only "true" and "false" in lower case are valid.
 class PROJECT_MANAGEMENT_EXPORT LogicalDataValidator : public LabelDataValidator {
 public:
     bool isValid(std::u16string const& text) const override;
@@ -52,14 +53,13 @@ public:
     std::u16string getDataClass() const override;
 };
 
-/// The validators that there are, in this order: EmptyDataValidator, StringDataValidator,
-/// LogicalDataValidator.
+/// All validators, in this order: EmptyDataValidator, StringDataValidator, LogicalDataValidator.
 class PROJECT_MANAGEMENT_EXPORT LabelDataValidators {
 public:
     LabelDataValidators();
 
-    /// The first validator that the predicate answers true for, shared with this object; null when there is
-    /// none.
+    /// Returns the first validator for which the predicate returns true, shared with this object; null if
+    /// there is none.
     /// @throws std::bad_function_call for an empty function object.
     std::shared_ptr<LabelDataValidator>
     getValidator(std::function<bool(LabelDataValidator&)> predicate) const;

@@ -8,9 +8,11 @@
 
 namespace project::management {
 
-/// A label without its category: a value that names it and tells what it was like when it was read.
+/// A label without its category: its UUID, and the properties that it had when it was read. An immutable
+/// value.
 ///
-/// Within its category a label is known by its UUID. The rest goes stale silently when the label is changed.
+/// The UUID identifies the label in its category. The properties become stale without notice when the label
+/// is changed.
 class PROJECT_MANAGEMENT_EXPORT LabelIdentifier : private Unique {
 public:
     LabelIdentifier(std::u16string uuid, std::u16string name, LabelReadOnlyState state);
@@ -19,11 +21,11 @@ public:
 
     virtual std::u16string getName() const;
 
-    /// Whether the label may be deleted: a state, not a flag.
+    /// Returns whether the label may be deleted. Despite the name it is a state with three values.
     virtual LabelReadOnlyState isReadOnly() const;
 
-    /// True when UUID, name and state are all the same: two values for one label differ when it was changed
-    /// in between.
+    /// Compares the UUID, the name and the state. Two values for the same label differ if it was changed
+    /// between the two reads.
     bool operator==(LabelIdentifier const& other) const;
     bool operator!=(LabelIdentifier const& other) const;
 
@@ -35,16 +37,16 @@ private:
     LabelReadOnlyState readOnlyState_;
 };
 
-/// A label in its editable form: what a new one is made from. Changing it changes nothing in the store.
+/// A label in its editable form, from which a new one is created. A change does not affect the store.
 class PROJECT_MANAGEMENT_EXPORT LabelDefinition : public LabelIdentifier {
 public:
-    /// A label that is as writable as its category, with a fresh UUID.
+    /// A label with the state INHERITED and a new UUID.
     explicit LabelDefinition(std::u16string const& name);
 
-    /// The same with a UUID given, whose form is not checked.
+    /// The same with a given UUID, whose form is not checked.
     LabelDefinition(std::u16string const& name, std::u16string const& uuid);
 
-    /// @return this object, so that calls can be chained.
+    /// @return this object.
     LabelDefinition& setIsReadOnly(LabelReadOnlyState state);
 };
 

@@ -10,15 +10,15 @@ namespace project::management {
 enum class LabelReadOnlyState {
     READ_ONLY = 0,
     WRITABLE = 1,
-    INHERITED = 2, ///< as the label's category; decided at the moment of a delete
+    INHERITED = 2, ///< as the label's category, at the time of the deletion
 };
 
-/// The text by which the store holds a state: the name of the enumerator.
-/// @throws std::out_of_range for a value that is none of the three.
+/// Returns the text that is stored for a state, which is the name of the enumerator.
+/// @throws std::out_of_range for any other value.
 PROJECT_MANAGEMENT_EXPORT std::u16string const& labelTypeToString(LabelReadOnlyState state);
 
-/// The state for a text, compared by code units; INHERITED for the empty text, which is what a label that was
-/// stored without a state reads as.
+/// Returns the state for a text, compared by code units. The empty text, which a label without a stored state
+/// has, gives INHERITED.
 /// @throws LabelReadOnlyStateUndefined, nested over std::out_of_range, for any other text.
 PROJECT_MANAGEMENT_EXPORT LabelReadOnlyState getLabelStateFromName(std::u16string const& text);
 

@@ -1,4 +1,4 @@
 #pragma once
 
-/// Marks what the shared library project::metadata shows to others.
+/// Marks the symbols that the shared library project::metadata exports.
 #define PROJECT_METADATA_EXPORT __attribute__((visibility("default")))

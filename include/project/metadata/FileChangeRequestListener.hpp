@@ -11,23 +11,26 @@ using fl::filesystem::Path;
 
 class MetadataManager;
 
-/// Told by the store of the files on disk that its own writes bring into being or take away.
+/// Receives the files on disk that the store's own writes create or delete.
 ///
-/// The calls come on the writing thread, which holds the store's write lock, before the write is final: what
-/// a listener throws undoes the write and reaches the caller. A listener must not write into the store.
+/// The store calls its listeners on the writing thread, which holds the write lock, before it commits the
+/// write. An exception thrown by a listener rolls the write back and propagates to the caller. A listener
+/// must not write to the store.
 class PROJECT_METADATA_EXPORT FileChangeRequestListener {
 public:
     virtual ~FileChangeRequestListener();
 
-    /// These files go away as part of a write; perhaps none.
-    /// @param metadataRoot the folder in which the store keeps its own files.
+    /// Called with the files, possibly none, that a write deletes.
+    /// @param metadataRoot the folder that contains the store's own files, absolute.
+    /// @param files absolute paths.
     virtual void fileRemovalRequested(MetadataManager& store, Path const& metadataRoot,
                                       std::vector<Path> const& files) = 0;
 
-    /// These files come into being as part of a write; perhaps none.
+    /// Called with the files, possibly none, that a write creates.
+    /// @param files absolute paths.
     virtual void fileAdditionRequested(MetadataManager& store, std::vector<Path> const& files) = 0;
 
-    /// A listener that answers false is passed over.
+    /// Returns whether the store calls this listener. The store asks before each call.
     virtual bool acceptsFileChangeRequests() = 0;
 };
 

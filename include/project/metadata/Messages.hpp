@@ -8,20 +8,20 @@
 
 /// The messages of the library, one class for each, in the catalog "ZEPHRA:project:management".
 ///
-/// A class is named as its text is in src/metadata/messages, spelling included: the name is what finds the
-/// text. Its constructor takes the text's arguments in order, as UTF-16 text. ::project is written in full
-/// throughout, because project alone would be this namespace's own.
+/// The name of a class is the key of its text in src/metadata/messages, spelling included. Its constructor
+/// takes the text's arguments in order, as UTF-16 text. ::project is written in full throughout, because
+/// project alone would mean this namespace.
 namespace ZEPHRA::project::management {
 
-/// What a message takes for an argument: std::u16string, or a literal that makes one.
+/// The type of a message's argument: std::u16string, or anything that converts to it, such as a literal.
 template <class T>
 concept MessageText = std::convertible_to<T const&, std::u16string>;
 
-/// The catalog's name. The first call makes the texts known to fl::i18n::MessageCatalog, so that whoever can
-/// name a message also gets its text.
+/// Returns the catalog's name. The first call registers the texts with fl::i18n::MessageCatalog, so that
+/// every message object has a text.
 PROJECT_METADATA_EXPORT std::string const& projectCatalog();
 
-/// The message whose text is the name of the default entry point group. It is no error.
+/// Returns the message whose text is the name of the default entry point group. It is not an error.
 PROJECT_METADATA_EXPORT ::resource_core::BaseMsgID entryPointGroupDefaultName();
 
 /// The file or folder is not in the project.
@@ -33,7 +33,7 @@ public:
     }
 };
 
-/// The path lies in the folder in which the store keeps its own files.
+/// The path is inside the folder that contains the store's own files.
 class PROJECT_METADATA_EXPORT FileIsMetadataError : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -42,7 +42,7 @@ public:
     }
 };
 
-/// The path lies outside the project's root.
+/// The path is outside the project's root.
 class PROJECT_METADATA_EXPORT FileNotInProjectRoot : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Path, MessageText ProjectRoot>
@@ -53,7 +53,7 @@ public:
     }
 };
 
-/// The path lies below the root, but nothing is there on disk.
+/// The path is below the project's root, but does not exist on disk.
 class PROJECT_METADATA_EXPORT FileDoesNotExistError : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -63,7 +63,7 @@ public:
     }
 };
 
-/// The project's root cannot be taken out of its own project.
+/// The project's root cannot be removed from its own project.
 class PROJECT_METADATA_EXPORT RootFolderNotRemoveable : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -73,7 +73,7 @@ public:
     }
 };
 
-/// There is an entry point group of this UUID already.
+/// An entry point group with this UUID exists already.
 class PROJECT_METADATA_EXPORT EntryPointGroupUUIDDefined : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -83,7 +83,7 @@ public:
     }
 };
 
-/// There is an entry point group of this name already.
+/// An entry point group with this name exists already.
 class PROJECT_METADATA_EXPORT EntryPointGroupNameDefined : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -93,7 +93,7 @@ public:
     }
 };
 
-/// No entry point type has this name. Always raised nested.
+/// The name is not that of an entry point type. The exception is always nested over std::out_of_range.
 class PROJECT_METADATA_EXPORT EntryPointTypeUndefined : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -115,7 +115,7 @@ public:
     CanNotModifyReadOnlyLabel() : BaseMsgID(projectCatalog(), "CanNotModifyReadOnlyLabel", 0) {}
 };
 
-/// There is no such category.
+/// The category does not exist.
 class PROJECT_METADATA_EXPORT CategoryDoesNotExist : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -125,7 +125,7 @@ public:
     }
 };
 
-/// There is no category of this UUID.
+/// A category with this UUID does not exist.
 class PROJECT_METADATA_EXPORT CategoryDoesNotExistsByUUID : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -135,7 +135,7 @@ public:
     }
 };
 
-/// There is a category of this name already.
+/// A category with this name exists already.
 class PROJECT_METADATA_EXPORT CategoryExistsByName : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -145,7 +145,7 @@ public:
     }
 };
 
-/// There is a label of this name in the category already.
+/// The category has a label with this name already.
 class PROJECT_METADATA_EXPORT LabelExistsByName : public ::resource_core::BaseMsgID {
 public:
     template <MessageText CategoryName, MessageText LabelName>
@@ -156,7 +156,7 @@ public:
     }
 };
 
-/// There is no label of this UUID.
+/// A label with this UUID does not exist.
 class PROJECT_METADATA_EXPORT LabelDoesNotExistsByUUID : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>
@@ -166,7 +166,7 @@ public:
     }
 };
 
-/// No label state has this name. Always raised nested.
+/// The name is not that of a label state. The exception is always nested over std::out_of_range.
 class PROJECT_METADATA_EXPORT LabelReadOnlyStateUndefined : public ::resource_core::BaseMsgID {
 public:
     template <MessageText Text>

@@ -9,25 +9,26 @@ namespace project::metadata {
 
 using fl::filesystem::Path;
 
-/// True when a file, a folder or a symbolic link (wherever it leads) is on disk under this path. False, and
-/// never an exception, for what cannot be there. One system call.
+/// Returns true if the path exists on disk, as a file, a folder or a symbolic link (also a dangling one). A
+/// path that cannot exist (too long, no permission) gives false and not an exception. Makes one system call.
 PROJECT_METADATA_EXPORT bool exists(Path const& path);
 
-/// True when the path is a folder on disk, or a symbolic link to one. False, and never an exception, for
-/// what cannot be there. One system call.
+/// Returns true if the path is a folder on disk, or a symbolic link to one. A path that cannot exist gives
+/// false and not an exception. Makes one system call.
 PROJECT_METADATA_EXPORT bool is_directory(Path const& path);
 
-/// The containing folder, by the text alone: "/a" for "/a/b", "/" for "/a" and for "/", empty for "a".
+/// Returns the folder that contains the path, from the text alone: "/a" for "/a/b", "/" for "/a" and for "/",
+/// and an empty path for "a".
 PROJECT_METADATA_EXPORT Path getParentFolder(Path const& path);
 
-/// The target relative to the base, by the text alone, with "/" between elements. Empty when both have the
-/// same elements; begins with ".." when the target is neither the base nor below it.
+/// Returns the target relative to the base, from the text alone, with "/" between elements. The result is
+/// empty if both have the same elements, and begins with ".." if the target is neither the base nor below it.
 PROJECT_METADATA_EXPORT std::u16string getRelativePath(Path const& base, Path const& target);
 
-/// True when the folder lies above the path, by the text alone; false when both are the same.
+/// Returns true if the path is below the folder, from the text alone. A path is not below itself.
 PROJECT_METADATA_EXPORT bool isParent(Path const& path, Path const& folder);
 
-/// A fresh random UUID (version 4) as 36 lower-case characters. Thread-safe.
+/// Returns a new random UUID (version 4), 36 lower-case characters. Any thread may call it.
 PROJECT_METADATA_EXPORT std::u16string generateUUID();
 
 } // namespace project::metadata

@@ -6,15 +6,15 @@
 
 namespace project::metadata {
 
-/// The one concrete node: what is built to be stored, and what the store gives back.
+/// The concrete node: callers build it to store it, and the store returns it.
 class PROJECT_METADATA_EXPORT MetadataNodeSpecification : public MetadataNode {
 public:
-    /// A node without type, keys and children.
+    /// Creates a node without a type, keys and nested nodes.
     MetadataNodeSpecification() = default;
 
     explicit MetadataNodeSpecification(std::u16string type);
 
-    /// A deep copy with type, keys and children.
+    /// Copies the type, the keys and the nested nodes of another node.
     MetadataNodeSpecification(MetadataNode const& other);
     MetadataNodeSpecification(MetadataNodeSpecification const& other);
     MetadataNodeSpecification& operator=(MetadataNodeSpecification const&) = delete;

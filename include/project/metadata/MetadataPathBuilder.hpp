@@ -6,7 +6,7 @@
 
 namespace project::metadata {
 
-/// An address under construction. It starts as the root; add steps, then build once.
+/// Builds an address step by step. A new builder has the root's address.
 class PROJECT_METADATA_EXPORT MetadataPathBuilder {
 public:
     /// Appends one step.

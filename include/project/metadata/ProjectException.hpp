@@ -9,8 +9,8 @@
 
 namespace project::exception {
 
-/// Everything that the library itself raises: catching this catches every error of the catalog. What the
-/// store raises is something else and passes by.
+/// The base of all errors of the catalog. The store's own errors do not derive from it: a handler for stale
+/// data must not catch a failing disk.
 class PROJECT_METADATA_EXPORT ProjectException : public computils::exception::StackTraceRecordingException {
 public:
     ProjectException();
@@ -19,16 +19,16 @@ public:
     ~ProjectException() override;
 };
 
-/// The exception that carries a message of class M, to catch it by.
+/// The exception with a message of class M, for use in catch clauses.
 template <class M>
 using Raised = foundation::core::except::Exception<M, ProjectException, void>;
 
-/// Throws the exception for a message, with the call stack of this moment.
+/// Throws the exception for a message and records the current call stack.
 ///
-/// Inside a handler the exception that is being handled goes along as its nested one: what is thrown then is
-/// both Raised<M> and std::nested_exception.
+/// Inside a catch block, the current exception is nested in the new one: the thrown object is then both a
+/// Raised<M> and a std::nested_exception.
 /// @tparam M a class of project/metadata/Messages.hpp.
-/// @throws Raised<M> always.
+/// @throws Raised<M>, always.
 template <class M>
 [[noreturn]] void raise(M const& message) {
     ProjectException base;

@@ -10,25 +10,25 @@ namespace project::management {
 
 using fl::filesystem::Path;
 
-/// A pointer from a project to a folder, in or outside of it: where the folder is on this machine, and the
-/// text that is stored for it. An immutable value.
+/// A reference from a project to a folder, inside or outside of it: the folder's location on this machine,
+/// and the text that is stored for it. An immutable value.
 class PROJECT_MANAGEMENT_EXPORT FolderReference : public Unique {
 public:
-    /// A reference that was stored under this UUID.
+    /// A reference that is stored under this UUID.
     FolderReference(Path location, std::u16string type, std::u16string storedPath, std::u16string uuid);
 
-    /// A new reference, under a fresh UUID. Callers use one of the two functions below.
+    /// A reference with a new UUID. Callers use one of the two functions below.
     FolderReference(Path location, std::u16string type, std::u16string storedPath);
 
     std::u16string getUUID() const override;
 
-    /// The folder on this machine. Lives as long as the reference, like the two below.
+    /// Returns the folder on this machine, absolute.
     Path const& getLocation() const { return location_; }
 
-    /// How the stored path is to be read: "Relative" (to the project root) or "Absolute".
+    /// Returns the type of the stored path: "Relative" (to the project's root) or "Absolute".
     std::u16string const& getType() const { return type_; }
 
-    /// The text that is stored for the folder.
+    /// Returns the text that is stored for the folder.
     std::u16string const& getStoredPath() const { return storedPath_; }
 
 private:
@@ -38,13 +38,17 @@ private:
     std::u16string uuid_;
 };
 
-/// A new reference that is stored relative to the project root, with "/" between elements, so that it goes
-/// with the project. The target may lie outside the root, and need not exist. Its location is canonical.
-/// @throws what fl::filesystem::canonical throws, for the target or the root.
+/// Returns a new reference whose stored path is relative to the project's root, with "/" between elements, so
+/// that it stays valid when the project is moved together with the target. The target may be outside the
+/// root, and may not exist. The location is canonical.
+/// @param target absolute, or relative to the working directory.
+/// @throws std::filesystem::filesystem_error as fl::filesystem::canonical does, for the target or the root.
 PROJECT_MANAGEMENT_EXPORT FolderReference relativeFolderReference(Path const& target, Path const& root);
 
-/// A new reference that is stored as the target is spelled here. Its location is canonical.
-/// @throws what fl::filesystem::canonical throws.
+/// Returns a new reference whose stored path is the target's text, deliberately unchanged: an absolute
+/// reference names a place, such as a drive or a link, and not its present content. The location is
+/// canonical.
+/// @throws std::filesystem::filesystem_error as fl::filesystem::canonical does.
 PROJECT_MANAGEMENT_EXPORT FolderReference absoluteFolderReference(Path const& target);
 
 } // namespace project::management

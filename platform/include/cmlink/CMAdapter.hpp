@@ -11,21 +11,23 @@ namespace cmlink {
 
 using fl::filesystem::Path;
 
-/// A source-control system, as the layer that keeps it in step with a project's files sees it.
+/// A source-control system that is kept in step with the files of a project.
 ///
-/// All paths are absolute. Each operation takes all that there is to do as one list, so that an adapter can
-/// do it in one pass. What an adapter throws goes on to whoever caused the change, and undoes it.
+/// All paths are absolute. Each operation gets all its files in one list, so that an adapter can process them
+/// in one pass. An exception thrown by an adapter rolls the change back and propagates to the caller that
+/// made it.
 class PROJECT_PLATFORM_EXPORT CMAdapter {
 public:
     virtual ~CMAdapter();
 
-    /// Places these files and folders under source control: of a folder nothing but what is named.
+    /// Places these files and folders under source control. The contents of a folder are not added.
     virtual void addToSourceControl(std::vector<Path> const& files) = 0;
 
-    /// Takes these files and folders, with all below them, out of source control. The disk is left alone.
+    /// Removes these files and folders, with everything below them, from source control. The files on disk
+    /// stay.
     virtual void removeFromSourceControl(std::vector<Path> const& files) = 0;
 
-    /// The state of each file that the adapter knows; one that it has no state for is absent.
+    /// Returns the states of the files. A file whose state the adapter does not know is absent.
     virtual std::map<Path, FileState> getFileStates(std::vector<Path> const& files) = 0;
 };
 

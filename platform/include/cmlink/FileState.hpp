@@ -4,7 +4,7 @@
 
 namespace cmlink {
 
-/// The state of one file, as a source-control adapter tells it.
+/// The state of one file, as a source-control adapter reports it.
 class FileState {
 public:
     explicit FileState(LocalStatus state) noexcept : state_(state) {}

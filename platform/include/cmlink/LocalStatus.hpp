@@ -2,13 +2,12 @@
 
 namespace cmlink {
 
-/// How one file on disk stands to source control. An adapter may give further numbers; whoever asks acts by
-/// the number.
+/// The state of a file on disk in source control. An adapter may return other numbers too.
 enum class LocalStatus : int {
     NotUnderSourceControl = 0,
     Unmodified = 1,
     Ignored = 2,
-    Modified = 3, ///< or gone from the disk while still tracked
+    Modified = 3, ///< or deleted from the disk while still tracked
     Conflicted = 4,
     Added = 5,
     RemovalStaged = 6,

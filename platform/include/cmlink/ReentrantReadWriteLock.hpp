@@ -7,30 +7,31 @@
 
 namespace cmlink {
 
-/// A lock that many threads may hold to read or one to write, and that a holder may take again.
+/// A lock that many threads may hold for reading, or one thread for writing. A thread that holds it may take
+/// it again.
 ///
-/// A thread that reads may read again, even while a writer waits; one that writes may take either again.
-/// One that only reads and asks to write gets std::system_error with resource_deadlock_would_occur at once.
-/// A thread that writes keeps the others out until it has released all its guards, in whatever order: a guard
-/// to read that outlives the one to write does not let them in.
+/// A thread with a read guard may take another read guard, even while a writer waits. A thread with a write
+/// guard may take guards of both kinds. A thread with read guards only that requests a write guard gets
+/// std::system_error with resource_deadlock_would_occur at once. A writer excludes other threads until it has
+/// released all its guards, in any order: also a read guard that it releases last.
 ///
-/// A waiting writer goes before readers that come later, so that readers do not starve it. The readers that
-/// wait when a writer lets go are next, all together, before the next writer, so that writers do not starve
-/// them. Between writers no order is promised.
+/// A waiting writer precedes the readers that arrive later, so that readers do not starve it. When a writer
+/// releases the lock, all readers that are waiting then precede the next writer, so that writers do not
+/// starve them. The order of writers is not specified.
 ///
-/// Taking the lock again on a thread that holds it costs a few nanoseconds and touches no shared memory.
+/// Taking the lock again costs a few nanoseconds and does not access shared memory.
 ///
 /// The lock must outlive its guards.
 class PROJECT_PLATFORM_EXPORT ReentrantReadWriteLock {
 public:
     enum class Access { Read, Write };
 
-    /// What to do as the first guard of all threads is taken and after the last one was released. `first`
-    /// runs on the thread that takes the guard, before any other thread gets one; what it throws reaches
-    /// that thread, which then holds nothing, and the next one that comes is first again. `last` runs while
-    /// nobody can take a guard, on the thread that released, and must not throw. Neither may take this lock.
-    /// Between a `first` to write and its `last` one thread alone holds guards; between a `first` to read and
-    /// its `last` only readers do.
+    /// Functions that run when the process takes its first guard and when it releases its last one. `first`
+    /// runs on the thread that takes the guard, before any other thread gets one. If it throws, the exception
+    /// propagates to that thread, which then has no guard, and the next guard is the first one again. `last`
+    /// runs on the thread that releases the guard, while no thread can take one, and must not throw. Neither
+    /// may take this lock. Between a `first` for writing and its `last`, only one thread has guards; between
+    /// a `first` for reading and its `last`, all guards are read guards.
     struct Hooks {
         std::function<void(Access)> first;
         std::function<void()> last;
@@ -44,11 +45,11 @@ public:
     ReentrantReadWriteLock(ReentrantReadWriteLock const&) = delete;
     ReentrantReadWriteLock& operator=(ReentrantReadWriteLock const&) = delete;
 
-    /// Blocks until this thread may read.
+    /// Blocks until this thread may read, and returns the guard.
     LockGuard readLock();
 
-    /// Blocks until this thread alone holds the lock.
-    /// @throws std::system_error (resource_deadlock_would_occur) when this thread holds it only to read.
+    /// Blocks until this thread alone has the lock, and returns the guard.
+    /// @throws std::system_error (resource_deadlock_would_occur) if this thread has read guards only.
     LockGuard writeLock();
 
 private:
@@ -60,9 +61,9 @@ private:
     std::unique_ptr<State> state_;
 };
 
-/// Holds the lock for as long as it lives. It can be moved, but not to another thread: the thread that took
-/// the lock must release it, or the program ends (std::terminate). A guard that was moved from holds nothing;
-/// one that is assigned to releases what it held.
+/// Holds the lock as long as it exists. It can be moved, but not to another thread: the thread that took the
+/// lock must release it, or the program ends (std::terminate). A guard that was moved from does not hold the
+/// lock. An assignment to a guard first releases the lock that it holds.
 class PROJECT_PLATFORM_EXPORT ReentrantReadWriteLock::LockGuard {
 public:
     LockGuard(LockGuard&& other) noexcept;

@@ -8,18 +8,18 @@
 
 namespace computils::exception {
 
-/// An exception that carries the call stack of the place that raised it. A copy keeps the stack of the first
-/// throw. what() stays that of std::exception; derived classes give their own.
+/// An exception with the call stack of the place that threw it. A copy has the same call stack. what() is
+/// that of std::exception; derived classes override it.
 class PROJECT_PLATFORM_EXPORT StackTraceRecordingException : public std::exception {
 public:
-    /// The stack is not recorded yet: whoever raises the exception calls getStackTrace().capture().
+    /// Does not record the call stack: the code that throws calls getStackTrace().capture().
     explicit StackTraceRecordingException(std::u16string text = {});
 
     StackTraceRecordingException(StackTraceRecordingException const&) = default;
     StackTraceRecordingException& operator=(StackTraceRecordingException const&) = default;
     ~StackTraceRecordingException() override;
 
-    /// A text besides what(); mostly empty.
+    /// Returns a text besides what(), which is usually empty.
     std::u16string const& getText() const noexcept { return text_; }
 
     foundation::core::diag::stacktrace_base& getStackTrace() noexcept { return stackTrace_; }

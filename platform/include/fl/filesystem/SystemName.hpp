@@ -9,24 +9,24 @@
 
 namespace fl::filesystem {
 
-/// The zero-terminated name that a call of the system takes for a path.
+/// The zero-terminated name of a path for a system call.
 ///
-/// The same bytes as toSystem gives, for loops that ask the disk about very many paths: made without
-/// allocating and without throwing. The object is some 4 KiB and lives on the stack.
+/// It contains the same bytes as the result of toSystem, but construction does not allocate and does not
+/// throw: it is for loops over very many paths. The object has some 4 KiB and belongs on the stack.
 class PROJECT_PLATFORM_EXPORT SystemName {
 public:
     explicit SystemName(Path const& path) noexcept;
     SystemName(SystemName const&) = delete;
     SystemName& operator=(SystemName const&) = delete;
 
-    /// The name, valid as long as this object; null when nothing on disk can have it, because the text has
-    /// no bytes there or is longer than the system takes.
+    /// Returns the name, which is valid as long as this object; null if no file on disk can have it, because
+    /// the text has no bytes or is longer than the system accepts.
     char const* get() const noexcept { return isValid_ ? bytes_.data() : nullptr; }
 
 private:
-    static constexpr std::size_t spare = 3; // what the conversion wants behind the longest name
+    static constexpr std::size_t spare = 3; // the room that the conversion needs after the longest name
 
-    std::array<char, PATH_MAX + spare> bytes_; // not cleared: that would cost more than the conversion
+    std::array<char, PATH_MAX + spare> bytes_; // not cleared, which would cost more than the conversion
     bool isValid_;
 };
 

@@ -9,32 +9,33 @@ namespace fl::i18n {
 
 /// The texts of messages, by catalog, message name and language.
 ///
-/// A catalog is ICU package data with one resource bundle for each language and "root" for the fallback. A
-/// text is a pattern in which {0}, {1}, ... stand for the arguments. Strings are put in just as they are;
-/// numbers in the way of the language. The language of the environment has no say.
+/// A catalog is ICU package data with one resource bundle for each language, and the bundle "root" as the
+/// fallback. A text is a pattern with the placeholders {0}, {1}, ... for the arguments. Strings are inserted
+/// unchanged, numbers in the format of the language. The environment has no effect.
 ///
-/// All operations may be called from any thread, and none throws anything but std::bad_alloc.
+/// Any thread may call all operations. They throw std::bad_alloc only.
 class PROJECT_PLATFORM_EXPORT MessageCatalog {
 public:
-    /// The message's text in the global locale.
+    /// Returns the message's text in the global locale.
     static std::u16string get_message(resource_core::BaseMsgID const& message);
 
-    /// The message's text in the language that is nearest to the locale: the locale's own, else that of its
-    /// parents ("de" for "de_AT"), else the root's. When no text is found or it is no valid pattern, the
-    /// message's name with its arguments: "name" or "name: first, second". Some microseconds.
+    /// Returns the message's text in the language that is nearest to the locale: the locale's own, else that
+    /// of a parent ("de" for "de_AT"), else the root's. If there is no text or it is not a valid pattern, the
+    /// result is the message's name with its arguments: "name" or "name: first, second". Takes some
+    /// microseconds.
     /// @param locale an identifier such as "de", "de_AT" or "de-AT".
     static std::u16string get_message(resource_core::BaseMsgID const& message, std::string const& locale);
 
-    /// The locale that is used where none is given; "en" until it is set.
+    /// Returns the locale that is used where no other is given; "en" until it is set.
     static std::string getGlobalLocale();
 
     static void setGlobalLocale(std::string locale);
 
-    /// Makes a catalog known. The first catalog of a name stays: a later one is ignored.
-    /// @param catalogName the name that messages give.
-    /// @param packageName the name that the package was made with; one catalog each.
-    /// @param packageData the whole package (a .dat file), aligned to 16 bytes, readable until the process
-    ///        ends. It is used in place.
+    /// Registers a catalog. A second catalog with the same name is ignored.
+    /// @param catalogName the name by which messages refer to the catalog.
+    /// @param packageName the name with which the package was built. Each package contains one catalog.
+    /// @param packageData the whole package (a .dat file), aligned to 16 bytes. It is not copied and must be
+    ///        readable until the process ends.
     static void registerCatalog(std::string const& catalogName, std::string const& packageName,
                                 void const* packageData);
 };

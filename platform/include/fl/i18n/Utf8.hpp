@@ -7,11 +7,11 @@
 
 namespace fl::i18n {
 
-/// Text for people to read, as UTF-8. What is no valid text, a lone surrogate, becomes U+FFFD; so names of
-/// files go another way, fl::filesystem::toSystem, when a file is to be found by them.
+/// Returns text in UTF-8, for users to read. A lone surrogate becomes U+FFFD, so the result is not the name
+/// of a file on disk; fl::filesystem::toSystem returns that.
 PROJECT_PLATFORM_EXPORT std::string toUtf8(std::u16string_view text);
 
-/// The reverse; each stray byte becomes U+FFFD.
+/// Returns the text of UTF-8. Each byte that is not part of valid UTF-8 becomes U+FFFD.
 PROJECT_PLATFORM_EXPORT std::u16string fromUtf8(std::string_view text);
 
 } // namespace fl::i18n

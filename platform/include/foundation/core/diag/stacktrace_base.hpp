@@ -8,38 +8,38 @@
 
 namespace foundation::core::diag {
 
-/// A record of the call stack at one moment, held inside the object: capturing allocates nothing, so that it
-/// works while an error is raised for want of memory. Symbols are looked up only when somebody reads the
-/// record. A call stack deeper than the record keeps its innermost frames.
+/// A record of the call stack at one moment. The object contains the record, so that capture does not
+/// allocate and works when memory is exhausted. Symbols are looked up only when the record is read. If the
+/// call stack is deeper than the record, the innermost frames are recorded.
 class PROJECT_PLATFORM_EXPORT stacktrace_base {
 public:
-    /// A code address to return to, as the unwinder gives it.
+    /// A return address, as the unwinder reports it.
     using Frame = void const*;
 
     static constexpr std::size_t maximumFrames = 128;
 
     stacktrace_base() noexcept;
 
-    /// Copies only the frames in use.
+    /// Copies only the recorded frames.
     stacktrace_base(stacktrace_base const& other) noexcept;
     stacktrace_base& operator=(stacktrace_base const& other) noexcept;
 
-    /// Records the calling thread's stack in place of what was recorded before. Allocates nothing.
-    /// @param framesToSkip how many of the innermost frames to leave out; 0 begins with the caller.
+    /// Replaces the record by the calling thread's stack. Does not allocate.
+    /// @param framesToSkip the number of innermost frames to leave out; 0 begins with the caller.
     void capture(unsigned long framesToSkip) noexcept;
 
-    /// The recorded frames, the innermost first; empty when nothing was captured.
+    /// Returns the recorded frames, the innermost first; empty before the first capture.
     std::vector<Frame> getFrames() const;
 
-    /// The frames for a log or a debugger, the innermost first, one a line: its number, the function as far
-    /// as the dynamic symbols tell it, and the file with the offset that addr2line takes. Looks symbols up
-    /// anew at each call: milliseconds.
+    /// Returns the frames for a log or a debugger, the innermost first, one in each line: its number, the
+    /// function if it has a dynamic symbol, and the file with the offset that addr2line expects. Looks up
+    /// symbols at each call, which takes milliseconds.
     std::string toString() const;
 
 private:
     std::size_t capacity_ = maximumFrames;
     Frame* firstFree_;
-    Frame frames_[maximumFrames]; // a plain array, since its address is taken before it is filled
+    Frame frames_[maximumFrames]; // a plain array, because its address is taken before it is filled
 };
 
 } // namespace foundation::core::diag

@@ -10,18 +10,19 @@
 
 namespace foundation::core::except {
 
-/// The exception for one class of messages: joins the message with a base that derives from std::exception.
+/// The exception for one class of messages: combines the message with a base that derives from
+/// std::exception.
 ///
-/// It can be caught as itself, as Base, as std::exception and through the interfaces. Its class information
-/// is visible everywhere as long as that of M and of Base is, so that it can be caught across libraries.
+/// It can be caught as itself, as Base, as std::exception and through the interfaces. Its type information is
+/// visible if that of M and Base is, so that it can be caught across libraries.
 ///
-/// @tparam M the message's class, derived from resource_core::BaseMsgID, copyable.
-/// @tparam Base copyable; has a virtual what().
-/// @tparam Enable void; leaves room for specialisations.
+/// @tparam M the message's class, which derives from resource_core::BaseMsgID and is copyable.
+/// @tparam Base a copyable class with a virtual what().
+/// @tparam Enable void; for specialisations.
 template <class M, class Base, class Enable = void>
 class PROJECT_PLATFORM_EXPORT Exception : public IMsgIDException, public Base {
 public:
-    /// Takes copies of both. The text of what() is looked up here, since what() must not fail later.
+    /// Copies both. The text of what() is created here, because what() must not fail later.
     Exception(Base const& base, M const& message)
         : Base(base),
           message_(message),

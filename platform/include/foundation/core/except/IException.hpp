@@ -4,21 +4,21 @@
 
 namespace foundation::core::except {
 
-/// What every exception of the framework can do, whatever else it derives from.
+/// The interface of every exception of the framework.
 ///
-/// It does not derive from std::exception: the exceptions reach that by another base, and with two of them a
-/// handler for std::exception would not catch.
+/// It deliberately does not derive from std::exception: the exceptions derive from it through another base,
+/// and a handler for std::exception would not catch an exception with two of them.
 class PROJECT_PLATFORM_EXPORT IException {
 public:
-    /// A copy on the heap, which the caller owns. Of a nested exception the copy is the plain form.
+    /// Returns a copy, which the caller owns. The copy of a nested exception is its plain form.
     virtual IException* clone() const = 0;
 
-    /// Throws a copy of this object, in the plain form.
+    /// Throws a copy of this object in its plain form.
     [[noreturn]] virtual void rethrow() const = 0;
 
     virtual ~IException();
 
-    /// The text in UTF-8, in the language that was set when the exception was made.
+    /// Returns the text in UTF-8, in the language that was set when the exception was created.
     virtual char const* what() const noexcept = 0;
 };
 

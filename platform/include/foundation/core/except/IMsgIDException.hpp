@@ -12,16 +12,16 @@ class PROJECT_PLATFORM_EXPORT IMsgIDException : public IUserException {
 public:
     ~IMsgIDException() override;
 
-    /// The error id, which is the same in every language: "catalog:message".
+    /// Returns the error id, "catalog:message", which is the same in every language.
     virtual std::string GetID() const = 0;
 
-    /// The message's text from the catalog, in the language that is set now.
+    /// Returns the message's text from the catalog, in the language that is set now.
     virtual std::u16string GetUnicodeMessageTxt() const = 0;
 
-    /// The message with its arguments; lives as long as the exception.
+    /// Returns the message with its arguments, which is valid as long as the exception.
     virtual resource_core::BaseMsgID const& GetBaseMsgIDObj() const = 0;
 
-    /// The error id of a message, for instance "ZEPHRA:project:management:FileNotInProject".
+    /// Returns the error id of a message, for example "ZEPHRA:project:management:FileNotInProject".
     static std::string get_error_id(resource_core::BaseMsgID const& message);
 };
 

@@ -11,13 +11,13 @@ class PROJECT_PLATFORM_EXPORT IUserException : public IException {
 public:
     ~IUserException() override;
 
-    /// Puts the text, in the language that is set now, in place of what the string holds.
+    /// Replaces the string by the text in the language that is set now.
     virtual void convert_str(std::u16string& text) const = 0;
 
-    /// The same in UTF-8; a lone surrogate becomes U+FFFD.
+    /// Replaces the string by the same text in UTF-8. A lone surrogate becomes U+FFFD.
     virtual void convert_str(std::string& text) const = 0;
 
-    /// The text in the language that is set now.
+    /// Returns the text in the language that is set now.
     virtual std::u16string ToUstringImpl() const = 0;
 };
 
