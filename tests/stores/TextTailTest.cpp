@@ -134,6 +134,47 @@ TEST(TextTail, damageBeforeATornEndStaysDamage) {
     EXPECT_EQ(text.damagedLines(), wrong);
 }
 
+TEST(TextTail, severalUnreadableBatchesAtTheEndAreOneTornTail) {
+    std::string one = batchOf({R"("d")"}, sumOf(body));
+    std::string two = batchOf({R"("e")"}, sumIn(one));
+    for (std::string* const batch : {&one, &two}) {
+        batch->replace(1, 1, 1, '\0');
+    }
+    ProjectText const text = readWhole(body + one + two);
+    EXPECT_EQ(told(text.faults()), "TornTail 6");
+    EXPECT_EQ(text.damagedLines(), "");
+}
+
+TEST(TextTail, anUnreadableBatchBeforeAReadableOneWithAWrongSumIsDamage) {
+    std::string one = batchOf({R"("d")"}, sumOf(body));
+    std::string two = batchOf({R"("e")"}, sumIn(one));
+    one.replace(1, 1, 1, '\0');
+    two.replace(1, 1, "x");
+    ProjectText const text = readWhole(body + one + two);
+    EXPECT_EQ(told(text.faults()), "Damage 6, Damage 9");
+    EXPECT_EQ(text.damagedLines(), one + two);
+}
+
+TEST(TextTail, aValidBatchAfterDamageReplacesWhateverItChainsTo) {
+    std::string const key = R"({"file":"a","keys":{"k":"1"}})";
+    std::string const next = R"({"file":"a","keys":{"l":"2"}})";
+    std::string const one = batchOf({key}, sumOf(body));
+    std::string const two = batchOf({next}, std::string(32, '0'));
+    ProjectText const text = readWhole(body + one + "\"lost\"\n" + two);
+    EXPECT_EQ(told(text.faults()), "Damage 8");
+    EXPECT_EQ(contentOf(text).at(fileAddress(u"a")), "Info(l=2;)");
+}
+
+TEST(TextTail, aRemovalDiscardsNodesThatAreBeingJoinedBelowIt) {
+    std::string const key = R"({"file":"folder/b","keys":{"k":"1"}})";
+    std::string const other = R"({"file":"folder/c","keys":{"l":"2"}})";
+    std::string const unchained = batchOf({key, R"({"remove":"folder"})", other}, std::string(32, '0'));
+    ProjectText const text = readWhole(body + unchained);
+    EXPECT_EQ(told(text.faults()), "Irregular 9");
+    EXPECT_EQ(contentOf(text),
+              (Content{{fileAddress(u"a"), "Info()"}, {fileAddress(u"folder/c"), "Info(l=2;)"}}));
+}
+
 TEST(TextTail, aRightBatchThatDoesNotChainIsJoined) {
     std::string const key1 = R"({"file":"a","keys":{"k":"1","l":"1"}})";
     std::string const key2 = R"({"file":"a","keys":{"k":"2"}})";
