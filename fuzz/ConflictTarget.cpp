@@ -3,6 +3,7 @@
 
 #include "Target.hpp"
 #include "TextContents.hpp"
+#include "TextInput.hpp"
 #include "text/TextLines.hpp"
 
 namespace {
@@ -16,68 +17,63 @@ struct Sides {
     std::string theirs;
 };
 
-/// The texts of both sides; nothing when the markers are not those of one merge behind the other, or there
-/// are none.
+/// The texts of both sides; nothing when there are no markers, or when they are not those of consecutive
+/// conflicts.
 std::optional<Sides> sidesOf(std::string_view text) {
     Sides sides;
     bool hasMarkers = false;
-    MergeMarker within = MergeMarker::None;
+    MergeMarker region = MergeMarker::None;
     LineWalk walk(text, 0, 1);
     while (walk.next()) {
         MergeMarker const marker = project::stores::mergeMarker(walk.line().text);
         if (marker == MergeMarker::None) {
-            bool const outside = within == MergeMarker::None;
-            sides.ours += outside || within == MergeMarker::Ours ? walk.line().whole : "";
-            sides.theirs += outside || within == MergeMarker::Theirs ? walk.line().whole : "";
+            bool const isOutside = region == MergeMarker::None;
+            sides.ours += isOutside || region == MergeMarker::Ours ? walk.line().whole : "";
+            sides.theirs += isOutside || region == MergeMarker::Theirs ? walk.line().whole : "";
             continue;
         }
-        bool const follows = (marker == MergeMarker::Ours && within == MergeMarker::None) ||
-                             (marker == MergeMarker::Base && within == MergeMarker::Ours) ||
-                             (marker == MergeMarker::Theirs && within == MergeMarker::Ours) ||
-                             (marker == MergeMarker::Theirs && within == MergeMarker::Base) ||
-                             (marker == MergeMarker::End && within == MergeMarker::Theirs);
+        bool const follows = (marker == MergeMarker::Ours && region == MergeMarker::None) ||
+                             (marker == MergeMarker::Base && region == MergeMarker::Ours) ||
+                             (marker == MergeMarker::Theirs && region == MergeMarker::Ours) ||
+                             (marker == MergeMarker::Theirs && region == MergeMarker::Base) ||
+                             (marker == MergeMarker::End && region == MergeMarker::Theirs);
         if (!follows) {
             return std::nullopt;
         }
         hasMarkers = true;
-        within = marker == MergeMarker::End ? MergeMarker::None : marker;
+        region = marker == MergeMarker::End ? MergeMarker::None : marker;
     }
-    return hasMarkers && within == MergeMarker::None ? std::optional(sides) : std::nullopt;
+    return hasMarkers && region == MergeMarker::None ? std::optional(sides) : std::nullopt;
 }
 
 void checkContains(Contents const& joined, Contents const& side, Contents const& other) {
     for (auto const& [address, line] : side) {
-        auto const there = joined.find(address);
-        require(there != joined.end(), "what a side has is there");
-        auto const beside = other.find(address);
-        bool const agreed = beside == other.end() || beside->second == line;
-        require(!agreed || there->second == line, "what one side has, or both have alike, stands as it is");
+        auto const inJoined = joined.find(address);
+        require(inJoined != joined.end(), "the content of each side is kept");
+        auto const inOther = other.find(address);
+        bool const isAgreed = inOther == other.end() || inOther->second == line;
+        require(!isAgreed || inJoined->second == line, "a node of one side, or equal on both, is unchanged");
     }
 }
 
-/// A text in which a merge left markers: nothing of either side is lost, and nothing else comes in.
+/// A text in which a merge left markers: it has the content of both sides and nothing else.
 void run(std::string_view input) {
-    bool const whole = input.starts_with(R"({"format)") || input.starts_with("<<<<<<<");
-    std::string const bytes = whole ? std::string(input) : framed(input);
-    auto const text = readText(bytes);
-    if (!text) {
-        return;
-    }
-    checkText(*text, bytes);
+    std::string const bytes = textOf(input);
     auto const sides = sidesOf(bytes);
-    auto const ours = sides ? readText(sides->ours) : std::nullopt;
-    auto const theirs = sides ? readText(sides->theirs) : std::nullopt;
-    if (!ours || !theirs) {
+    auto const text = sides ? readText(bytes) : std::nullopt;
+    auto const ours = text ? readText(sides->ours) : std::nullopt;
+    auto const theirs = ours ? readText(sides->theirs) : std::nullopt;
+    if (!theirs) {
         return;
     }
     Contents const joined = contentsOf(*text);
-    Contents both = contentsOf(*ours);
-    Contents const oursHas = both;
+    Contents const oursHas = contentsOf(*ours);
     Contents const theirsHas = contentsOf(*theirs);
+    Contents both = oursHas;
     both.insert(theirsHas.begin(), theirsHas.end());
     checkContains(joined, oursHas, theirsHas);
     checkContains(joined, theirsHas, oursHas);
-    require(joined.size() == both.size(), "nothing is there that no side has");
+    require(joined.size() == both.size(), "no content comes from elsewhere");
 }
 
 Registration const registration("conflict", run);

@@ -16,56 +16,31 @@ std::string contentOf(std::filesystem::path const& file) {
     return {std::istreambuf_iterator<char>(stream), {}};
 }
 
-void runAll(std::string const& name) {
-    auto const& all = targets();
-    auto const target =
-        std::find_if(all.begin(), all.end(), [&](Target const& candidate) { return candidate.name == name; });
-    ASSERT_NE(target, all.end());
+class Corpus : public testing::TestWithParam<Target> {};
+
+TEST_P(Corpus, holds) {
     std::size_t count = 0;
-    for (auto const& entry : std::filesystem::directory_iterator(PROJECT_CORPORA "/" + name)) {
+    for (auto const& entry :
+         std::filesystem::directory_iterator(PROJECT_CORPORA "/" + std::string(GetParam().name))) {
         SCOPED_TRACE(entry.path().filename());
-        EXPECT_NO_THROW(target->run(contentOf(entry.path())));
+        EXPECT_NO_THROW(GetParam().run(contentOf(entry.path())));
         ++count;
     }
     EXPECT_GT(count, 0U);
 }
 
-TEST(Corpus, ofTextsHolds) {
-    runAll("text");
-}
+INSTANTIATE_TEST_SUITE_P(Of, Corpus, testing::ValuesIn(targets()),
+                         [](auto const& target) { return std::string(target.param.name); });
 
-TEST(Corpus, ofTailsHolds) {
-    runAll("tail");
-}
-
-TEST(Corpus, ofTextsWithMarkersHolds) {
-    runAll("conflict");
-}
-
-TEST(Corpus, ofLinesHolds) {
-    runAll("line");
-}
-
-TEST(Corpus, ofMergesHolds) {
-    runAll("merge");
-}
-
-TEST(Corpus, ofPathsHolds) {
-    runAll("path");
-}
-
-TEST(Corpus, ofGitsPatternsHolds) {
-    runAll("pattern");
-}
-
-TEST(Corpus, isThereForEveryTarget) {
-    for (Target const& target : targets()) {
-        EXPECT_TRUE(std::filesystem::is_directory(PROJECT_CORPORA "/" + std::string(target.name)))
-            << target.name;
+TEST(Corpora, belongToTargets) {
+    for (auto const& entry : std::filesystem::directory_iterator(PROJECT_CORPORA)) {
+        EXPECT_TRUE(std::ranges::any_of(targets(), [&](Target const& target) {
+            return entry.path().filename() == target.name;
+        })) << entry.path();
     }
 }
 
-TEST(Corpus, aLawThatDoesNotHoldIsTold) {
+TEST(Corpora, areCheckedByLawsThatCanBreak) {
     EXPECT_NO_THROW(require(true, "this holds"));
     EXPECT_THROW(require(false, "this holds"), BrokenLaw);
 }

@@ -23,15 +23,14 @@ std::string written(Change const& change) {
     return line;
 }
 
-/// A line that says something says the same once it is written; that is written in one form, which is told
-/// from every other without building anything.
+/// A readable line has the same change once it is written. There is one written form, which is recognised
+/// without building a node.
 void checkLine(std::string const& line) {
     auto const parsed = project::stores::parseLine(line);
     auto const canonical = project::stores::canonicalAddress(line);
-    require(parsed.change.has_value() != (parsed.problem != nullptr),
-            "a line says something or has a problem");
+    require(parsed.change.has_value() != (parsed.problem != nullptr), "a line has a change or a problem");
     if (!parsed.change) {
-        require(!canonical, "a line that says nothing is not canonical");
+        require(!canonical, "an unreadable line is not canonical");
         return;
     }
     std::string const again = written(*parsed.change);
@@ -39,24 +38,25 @@ void checkLine(std::string const& line) {
     require(reread.change && reread.change->kind == parsed.change->kind &&
                 reread.change->address == parsed.change->address &&
                 areSame(reread.change->node, parsed.change->node),
-            "a line says the same once it is written");
+            "a written line has the same change");
     bool const removal = parsed.change->kind == Change::Kind::Remove;
-    require(removal || canonical.has_value() == (again == line), "a line is canonical if it is written so");
+    require(removal || canonical.has_value() == (again == line),
+            "a line is canonical if it is written in this form");
     if (canonical) {
         require(toAddress(*canonical) == parsed.change->address, "a canonical line shows its address");
         require(toAddress(project::stores::addressOfCanonical(line)) == parsed.change->address,
-                "the address of a canonical line is found again");
+                "the address of a canonical line is found");
         require(areSame(project::stores::stateOfLine(line).node, parsed.change->node),
                 "a canonical line has its node");
     }
     std::string const ended = line + '\n';
     if (std::size_t const length = project::stores::plainPathLength(ended.data());
         length + 2 == line.size()) {
-        require(canonical && canonical->text.size() == length, "the fast road takes canonical lines only");
+        require(canonical && canonical->text.size() == length, "the fast path accepts only canonical lines");
     }
 }
 
-/// Addresses compare as they are written as they do when they are built.
+/// Written addresses compare like the addresses themselves.
 void checkOrder(std::string const& left, std::string const& right) {
     auto const one = project::stores::parseLine(left).change;
     auto const other = project::stores::parseLine(right).change;
@@ -66,9 +66,9 @@ void checkOrder(std::string const& left, std::string const& right) {
     AddressText const oneText(one->address);
     AddressText const otherText(other->address);
     require(compare(oneText.view(), otherText.view()) == compare(one->address, other->address),
-            "addresses are ordered as written");
+            "written addresses have the order of the addresses");
     require(isWithin(oneText.view(), otherText.view()) == one->address.isWithin(other->address),
-            "addresses lie below each other as written");
+            "written addresses lie within each other like the addresses");
 }
 
 /// Two lines.

@@ -44,32 +44,34 @@ std::optional<std::string> bytesOf(Path const& path) {
     }
 }
 
-/// Any bytes but NUL are a name on disk and come back.
+/// Any bytes except NUL are a name on disk, and a path preserves them.
 void checkName(std::string const& bytes) {
     Path const path = fl::filesystem::fromSystem(bytes);
     auto const back = bytesOf(path);
-    bool const holdsNul = bytes.find('\0') != std::string::npos;
-    require(back.has_value() != holdsNul, "whatever the disk has for a name has a text");
-    require(!back || *back == bytes, "a name on disk comes back");
+    bool const hasNul = bytes.find('\0') != std::string::npos;
+    require(back.has_value() != hasNul, "every name on disk has a path");
+    require(!back || *back == bytes, "a path preserves the name on disk");
     fl::filesystem::SystemName const name(path);
     bool const fits = back && back->size() < PATH_MAX;
-    require((name.get() != nullptr) == fits, "both ways to the disk take the same names");
-    require(!fits || *back == name.get(), "both ways to the disk give the same name");
+    require((name.get() != nullptr) == fits, "both conversions accept the same names");
+    require(!fits || *back == name.get(), "both conversions give the same name");
     std::u16string const text = fl::i18n::fromUtf8(bytes);
-    require(fl::i18n::fromUtf8(fl::i18n::toUtf8(text)) == text, "UTF-8 that was read comes back");
+    require(fl::i18n::fromUtf8(fl::i18n::toUtf8(text)) == text,
+            "text read from UTF-8 is written back unchanged");
 }
 
-/// Any text has a name on disk that comes back, or none.
+/// Any text has a name on disk from which the same text is read, or none.
 void checkText(std::u16string const& text) {
     auto const bytes = bytesOf(Path(text));
-    require(!bytes || fl::filesystem::fromSystem(*bytes).native() == text, "the text of a name comes back");
+    require(!bytes || fl::filesystem::fromSystem(*bytes).native() == text, "the text of a name is preserved");
     fl::i18n::toUtf8(text);
 }
 
-/// Where a way leads: ".." leads up, as long as one is not yet above the target, whose own names may be "..".
-Elements walked(Elements place, Path const& way, Elements const& target) {
+/// The place that a relative path leads to: ".." leads up, unless the place is already above the target,
+/// whose own names may be "..".
+Elements walked(Elements place, Path const& relative, Elements const& target) {
     std::size_t const root = !place.empty() && place.front() == u"/" ? 1 : 0;
-    for (auto const& element : elementsOf(way)) {
+    for (auto const& element : elementsOf(relative)) {
         bool const isAboveTarget =
             place.size() <= target.size() && std::equal(place.begin(), place.end(), target.begin());
         if (element == u".." && place.size() > root && !isAboveTarget) {
@@ -89,15 +91,15 @@ void checkRelative(Path const& base, Path const& target) {
     Path const relative(getRelativePath(base, target));
     require(isParent(target, base) == (sameRoot && within && from.size() < to.size()),
             "a folder is above what begins with its elements and has more");
-    require(relative.empty() == (from == to), "only the same place is no way off");
-    require(!isAbsolute(relative), "a way from one place to another is relative");
+    require(relative.empty() == (from == to), "only the path to the same place is empty");
+    require(!isAbsolute(relative), "a path from one place to another is relative");
     if (within && sameRoot) {
-        require(elementsOf(base / relative) == to, "the way down leads there");
+        require(elementsOf(base / relative) == to, "the path down leads to the target");
     } else {
-        require(elementsOf(relative).front() == u"..", "the way to what is not below leads up");
+        require(elementsOf(relative).front() == u"..", "a path to a place that is not below leads up");
     }
     if (sameRoot) {
-        require(walked(from, relative, to) == to, "the way from one place leads to the other");
+        require(walked(from, relative, to) == to, "the relative path leads to the target");
     }
 }
 
@@ -131,8 +133,8 @@ std::u16string widened(std::string_view bytes) {
     return text;
 }
 
-/// A name on disk; the code units of the same bytes; and two paths, one behind the other with a line end
-/// between.
+/// Three readings of the input: a name on disk, the code units of a text, and two paths with a line end
+/// between them.
 void run(std::string_view input) {
     checkName(std::string(input));
     std::u16string units(input.size() / sizeof(char16_t), u'\0');

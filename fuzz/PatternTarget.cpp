@@ -12,18 +12,17 @@ using project::git::AttributeLine;
 using project::git::IgnoreLine;
 using project::git::NamePattern;
 
-/// Where letters have the same case, or it counts for nothing, a pattern matches what it matches otherwise.
+/// A pattern that matches a file also matches a folder of that name, and its answer is always the same.
 void checkPattern(NamePattern const& pattern, std::string_view path) {
     for (bool const ignoresCase : {false, true}) {
         bool const asFile = pattern.matches(path, false, ignoresCase);
         bool const asFolder = pattern.matches(path, true, ignoresCase);
-        require(!asFile || asFolder, "what is for files is for folders too");
-        require(asFile == pattern.matches(path, false, ignoresCase),
-                "a pattern is asked twice with one answer");
+        require(!asFile || asFolder, "a pattern that matches a file matches a folder");
+        require(asFile == pattern.matches(path, false, ignoresCase), "a pattern gives the same answer again");
     }
 }
 
-/// A line of git's files and a path.
+/// A line of an ignore or attributes file, and a path.
 void run(std::string_view input) {
     std::size_t const end = std::min(input.find('\n'), input.size());
     std::string_view const line = input.substr(0, end);

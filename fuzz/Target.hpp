@@ -7,15 +7,15 @@
 
 namespace project::fuzz {
 
-/// Something that must hold for every input, and the code that looks whether it does.
+/// A law that must hold for every input, and the code that checks it.
 struct Target {
     char const* name;
 
-    /// Throws BrokenLaw, or lets a sanitizer speak, when the input shows that it does not hold.
+    /// @throws BrokenLaw when the input shows that the law does not hold.
     void (*run)(std::string_view input);
 };
 
-/// All targets of this program, in no order.
+/// All targets of this program, in any order.
 std::vector<Target>& targets();
 
 /// Adds a target to those of the program, before main.
@@ -24,16 +24,16 @@ public:
     Registration(char const* name, void (*run)(std::string_view input));
 };
 
-/// An input for which something does not hold.
+/// An input for which a law does not hold.
 class BrokenLaw : public std::logic_error {
 public:
     using logic_error::logic_error;
 };
 
-/// @param law what must hold, a clause. @throws BrokenLaw when it does not.
+/// @param law the condition as a clause. @throws BrokenLaw when it does not hold.
 inline void require(bool holds, char const* law) {
     if (!holds) {
-        throw BrokenLaw(std::string("it does not hold that ") + law);
+        throw BrokenLaw(std::string("this law does not hold: ") + law);
     }
 }
 

@@ -1,18 +1,15 @@
 #pragma once
 
-#include <array>
 #include <atomic>
-#include <cstdio>
-#include <cstring>
 #include <functional>
 #include <mutex>
 #include <thread>
 #include <utility>
 
-#include <fcntl.h>
 #include <unistd.h>
 
 #include "cmlink/ReentrantReadWriteLock.hpp"
+#include "support/Waiting.hpp"
 
 namespace cmlink {
 
@@ -34,23 +31,13 @@ public:
     void untilItWaits() const {
         constexpr int enough = 50;
         for (int checks = 0; checks < enough && !isDone_; std::this_thread::yield()) {
-            checks = isAsleep() ? checks + 1 : 0;
+            checks = project::test::isThreadAsleep(threadId_) ? checks + 1 : 0;
         }
     }
 
     void join() { thread_.join(); }
 
 private:
-    bool isAsleep() const {
-        std::array<char, 64> name{};
-        std::snprintf(name.data(), name.size(), "/proc/self/task/%d/stat", threadId_.load());
-        std::array<char, 64> line{};
-        int const file = ::open(name.data(), O_RDONLY | O_CLOEXEC);
-        auto const length = file < 0 ? -1 : ::read(file, line.data(), line.size() - 1);
-        ::close(file);
-        return length > 0 && std::strstr(line.data(), ") S ") != nullptr;
-    }
-
     std::atomic<pid_t> threadId_ = 0;
     std::atomic<bool> isDone_ = false;
     std::jthread thread_;

@@ -10,7 +10,7 @@ using stores::FileContent;
 using stores::FileIdentity;
 using stores::StoreError;
 using stores::WrittenFile;
-using Trouble = CrashingVolume::Trouble;
+using InjectedFault = CrashingVolume::InjectedFault;
 
 namespace {
 
@@ -30,8 +30,9 @@ CrashingDisk::~CrashingDisk() {
     unlock();
 }
 
-/// @param part what a call that fails, or in which the process dies, may have done. Told whether the process
-///             goes on.
+/// @param part the partial effect of a call that fails or at which the process dies. Its argument says
+/// whether the
+///             process continues.
 template <typename Effect, typename Part>
 auto CrashingDisk::call(std::string const& name, Effect effect, Part part) {
     if (isDead_) {
@@ -41,20 +42,20 @@ auto CrashingDisk::call(std::string const& name, Effect effect, Part part) {
     if (volume_->beforeCall) {
         volume_->beforeCall(name);
     }
-    auto const trouble = volume_->nextTrouble(name);
-    if (trouble == Trouble::Fails || trouble == Trouble::FailsForGood) {
+    auto const fault = volume_->nextFault(name);
+    if (fault == InjectedFault::Fails || fault == InjectedFault::FailsForGood) {
         part(true);
         throw StoreError(StoreError::Kind::DiskFailed, folder(), 0, "the disk fails at \"" + name + "\"", "");
     }
-    if (trouble == Trouble::DiesBefore) {
+    if (fault == InjectedFault::DiesBefore) {
         die();
     }
-    if (trouble == Trouble::DiesAmid) {
+    if (fault == InjectedFault::DiesAmid) {
         part(false);
         die();
     }
     auto const result = effect();
-    if (trouble == Trouble::DiesAfter) {
+    if (fault == InjectedFault::DiesAfter) {
         die();
     }
     if (volume_->afterCall) {
@@ -90,7 +91,7 @@ bool CrashingDisk::isTaken(std::string const& name) {
 }
 
 bool CrashingDisk::isFailingForGood() const {
-    return volume_->planned_ == Trouble::FailsForGood;
+    return volume_->planned_ == InjectedFault::FailsForGood;
 }
 
 std::shared_ptr<CrashingDisk::File> CrashingDisk::find(std::string const& name) {
@@ -125,7 +126,7 @@ bool CrashingDisk::makeFolder() {
         return isMade;
     };
     return call("makeFolder", make, [this](bool goesOn) {
-        // A disk that fails for good does not let it be removed again either.
+        // After a permanent fault it cannot be removed again.
         if (!volume_->folder_ && (!goesOn || isFailingForGood())) {
             volume_->makeFolderUnsynced();
         }
@@ -210,7 +211,7 @@ std::optional<FileContent> CrashingDisk::read(std::string const& name, std::uint
     });
 }
 
-/// Writes what there is room for, and fails when that is not all.
+/// Writes as much as there is room for, and fails when that is not everything.
 void CrashingDisk::writeWithinRoom(File& file, std::string_view bytes) {
     auto const& room = volume_->room;
     if (room && *room < bytes.size()) {
@@ -264,7 +265,7 @@ WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes
         return WrittenFile{CrashingVolume::identify(*written_), isStamped};
     };
     return call("create " + kindOf(name) + (like ? " like " + *like : ""), make, [&](bool goesOn) {
-        // A disk that fails for good does not let the half be removed again either.
+        // After a permanent fault the partial file cannot be removed.
         if (!goesOn || isFailingForGood()) {
             auto const half = volume_->makeFile("");
             volume_->write(*half, bytes.substr(0, volume_->pick(bytes.size())));

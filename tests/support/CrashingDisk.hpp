@@ -14,70 +14,69 @@
 
 namespace project::test {
 
-/// Thrown where a process dies. The disk that it used fails every later call in the same way.
+/// Thrown at the call at which a process dies. Every later call of its disk throws it, too.
 struct ProcessDied {};
 
-/// A file system in memory that knows what of it would outlive a power cut: what was synced.
+/// A file system in memory that distinguishes synced from unsynced content.
 ///
-/// It keeps, for each file, the writes since its last sync, and for the folder the names since its last sync.
-/// powerCut drops any of them, each by itself, so that what is left is what any order of writing can leave,
-/// and tears the writes. Calls of disks on it are recorded and can be made to fail or to be the last thing
-/// that a process does. The rest of the interface is for the stranger: git, an editor, or another program
-/// that takes no lock, whose changes are durable at once.
+/// It keeps the writes to each file since the file's last sync, and the names since the folder's last sync.
+/// powerCut drops or tears any of them independently, so that every possible order of writing is covered. The
+/// calls of disks on it are recorded. Any call can be made to fail or to be the last one of a process. The
+/// rest of the interface is for other programs, such as git or an editor, which take no lock and whose
+/// changes are durable at once.
 class CrashingVolume {
 public:
-    enum class Trouble {
+    enum class InjectedFault {
         None,
-        Fails,        ///< this call fails, and what it was to do is done in part at most
+        Fails,        ///< this call fails, and has at most a part of its effect
         FailsForGood, ///< this call and all later ones fail
         Dies,         ///< the process dies before, in the middle of, or after this call
         DiesBefore,   ///< the same at one of these moments
-        DiesAmid,     ///< what the call was to do is done in part at most
+        DiesAmid,     ///< the call has at most a part of its effect
         DiesAfter,
     };
 
     explicit CrashingVolume(unsigned seed = 1) : random_(seed) {}
 
-    /// Which calls were made, in order: "append project.jsonl", "exchange swapping project.jsonl", "sync".
-    /// Names that are made up are told by their kind: temporary, swapping, displaced, damaged.
+    /// The calls so far, in order: "append project.jsonl", "exchange swapping project.jsonl", "sync".
+    /// Generated names are replaced by their kind: temporary, swapping, displaced, damaged.
     std::vector<std::string> calls;
 
-    /// Called before and after each call, to act as a stranger or to throw.
+    /// Called before and after each call, to act as another program or to throw.
     std::function<void(std::string const& call)> beforeCall;
     std::function<void(std::string const& call)> afterCall;
 
-    /// Called within append, after it has found the file in the state expected.
+    /// Called within append, after it found the file in the expected state.
     std::function<void()> amidAppend;
 
-    /// Whether files can be exchanged, and whether they keep the times they are given.
+    /// Whether files can be exchanged, and whether they keep the times that a process sets.
     bool canExchange = true;
     bool keepsStamps = true;
 
-    /// Whether names that differ in capitals alone lead to the same file.
+    /// Whether names that differ only in case lead to the same file.
     bool foldsNames = false;
 
-    /// Bytes that can still be written before the disk is full.
+    /// The bytes that can be written before the disk is full.
     std::optional<std::uint64_t> room;
 
-    /// Brings trouble to the call that comes after so many others.
-    void plan(Trouble trouble, std::size_t callsBefore);
+    /// Plans a fault for one call, after a number of others.
+    void plan(InjectedFault fault, std::size_t callsBefore);
 
-    /// Forgets what was planned. @return true when it has not happened yet.
+    /// Cancels the planned fault. @return true when it has not happened yet.
     bool cancelPlan();
 
-    /// The first call that what was planned last has come to; empty before.
-    std::string const& troubled() const { return troubled_; }
+    /// The first call with the planned fault; empty before.
+    std::string const& faulted() const { return faulted_; }
 
-    /// A volume in the same state that goes its own way from here, by other random choices. Nobody holds a
-    /// lock on it.
+    /// An independent volume in the same state, with other random choices and no lock.
     std::shared_ptr<CrashingVolume> copy(unsigned seed) const;
 
     std::size_t count(std::string const& call) const;
 
-    /// Loses what was not synced, some of it or all. Disks that were open must not be used any more.
+    /// Loses some or all of the unsynced content. Open disks must not be used afterwards.
     void powerCut();
 
-    /// Lets the file system's clock go on. It stands still otherwise, so that writes share one tick.
+    /// Advances the file system's clock, which otherwise stands still, so that writes share one tick.
     void advance(std::int64_t nanoseconds) { clock_ += nanoseconds; }
 
     void advanceBeyondTick() { advance(100'000'000); }
@@ -88,17 +87,17 @@ public:
     bool has(std::string const& name) const;
     std::string content(std::string const& name) const;
 
-    /// The names that start so.
+    /// The names with this beginning.
     std::vector<std::string> namesLike(std::string const& start) const;
 
-    // The stranger.
+    // Other programs.
     void makeFolder();
 
     void removeFolder() { putFolder(nullptr); }
 
-    /// Puts an empty folder in the place of the store's. @return what brings the old one back.
+    /// Replaces the store's folder by an empty one. @return a function that restores the old one.
     std::function<void()> moveFolderAway();
-    void replaceFile(std::string const& name, std::string bytes); ///< by a new file of that name
+    void replaceFile(std::string const& name, std::string bytes); ///< by a new file
     void overwrite(std::string const& name, std::string bytes);   ///< in place
     void append(std::string const& name, std::string_view bytes);
     void touch(std::string const& name);
@@ -111,7 +110,7 @@ private:
     struct Write {
         std::uint64_t offset;
         std::string bytes;
-        bool isGivenUp = false; ///< a sync failed, after which the system doesn't try again
+        bool isGivenUp = false; ///< a sync failed, and the system does not try again
     };
 
     struct File {
@@ -130,14 +129,14 @@ private:
     struct Folder {
         Names names;
         Names durable;
-        std::map<std::string, std::vector<std::shared_ptr<File>>> unsynced; ///< what names have led to since
+        std::map<std::string, std::vector<std::shared_ptr<File>>> unsynced; ///< the files of names since
         void const* lockedBy = nullptr;
     };
 
-    /// Lets a name lead to a file, or to nothing.
+    /// Binds a name to a file, or removes it.
     void bind(Folder& folder, std::string const& name, std::shared_ptr<File> file) const;
 
-    /// Where a name stands among others, which may be in other capitals.
+    /// The position of a name, which may be in another case.
     Names::const_iterator find(Names const& names, std::string const& name) const;
 
     void putFolder(std::shared_ptr<Folder> folder);
@@ -153,7 +152,7 @@ private:
     static void sync(File& file);
     bool stamp(File& file);
     void setTimes(File& file) const;
-    Trouble nextTrouble(std::string const& call);
+    InjectedFault nextFault(std::string const& call);
     std::size_t pick(std::size_t bound);
     void tear(File& file);
     static stores::FileIdentity identify(File const& file);
@@ -162,12 +161,12 @@ private:
     std::int64_t clock_ = 1'000'000'000'000'000'000;
     std::int64_t stamps_ = 0;
     std::uint64_t inodes_ = 0;
-    std::shared_ptr<Folder> folder_;                       ///< what the path from the project's root leads to
+    std::shared_ptr<Folder> folder_;                       ///< the folder at the path from the project's root
     std::shared_ptr<Folder> durableFolder_;                ///< the same at the last sync of the root
     std::vector<std::shared_ptr<Folder>> unsyncedFolders_; ///< and since
-    Trouble planned_ = Trouble::None;
+    InjectedFault planned_ = InjectedFault::None;
     std::size_t callsBefore_ = 0;
-    std::string troubled_;
+    std::string faulted_;
 };
 
 /// The disk of one process on a CrashingVolume.

@@ -8,29 +8,31 @@ namespace project::test {
 
 using stores::FileIdentity;
 
-void CrashingVolume::plan(Trouble trouble, std::size_t callsBefore) {
-    planned_ = trouble;
+void CrashingVolume::plan(InjectedFault fault, std::size_t callsBefore) {
+    planned_ = fault;
     callsBefore_ = callsBefore;
-    troubled_.clear();
+    faulted_.clear();
 }
 
 bool CrashingVolume::cancelPlan() {
-    return std::exchange(planned_, Trouble::None) != Trouble::None;
+    return std::exchange(planned_, InjectedFault::None) != InjectedFault::None;
 }
 
-CrashingVolume::Trouble CrashingVolume::nextTrouble(std::string const& call) {
-    if (planned_ == Trouble::None || callsBefore_ > 0) {
+CrashingVolume::InjectedFault CrashingVolume::nextFault(std::string const& call) {
+    if (planned_ == InjectedFault::None || callsBefore_ > 0) {
         callsBefore_ -= callsBefore_ > 0 ? 1 : 0;
-        return Trouble::None;
+        return InjectedFault::None;
     }
-    if (troubled_.empty()) {
-        troubled_ = call;
+    if (faulted_.empty()) {
+        faulted_ = call;
     }
-    if (planned_ == Trouble::FailsForGood) {
+    if (planned_ == InjectedFault::FailsForGood) {
         return planned_;
     }
-    auto const trouble = std::exchange(planned_, Trouble::None);
-    return trouble != Trouble::Dies ? trouble : pick(1) == 0 ? Trouble::DiesAmid : Trouble::DiesAfter;
+    auto const fault = std::exchange(planned_, InjectedFault::None);
+    return fault != InjectedFault::Dies ? fault
+           : pick(1) == 0               ? InjectedFault::DiesAmid
+                                        : InjectedFault::DiesAfter;
 }
 
 std::size_t CrashingVolume::count(std::string const& call) const {
@@ -64,11 +66,11 @@ void CrashingVolume::powerCut() {
     auto after = std::make_shared<Folder>();
     after->names = left;
     after->durable = std::move(left);
-    putFolder(std::move(after)); // nobody holds a lock any more
+    putFolder(std::move(after)); // all locks are released
 }
 
-/// Leaves of the writes that were not synced any or none, and of the last of those that are left a part: the
-/// beginning, or the whole length with zeros where the data did not come.
+/// Keeps any of the unsynced writes, and a part of the last one kept: its beginning, or its whole length with
+/// zeros for lost data.
 void CrashingVolume::tear(File& file) {
     auto bytes = file.durable;
     for (auto write : file.unsynced) {
@@ -96,7 +98,7 @@ void CrashingVolume::apply(Write const& write, std::string& bytes) {
 
 void CrashingVolume::bind(Folder& folder, std::string const& name, std::shared_ptr<File> file) const {
     auto const there = find(folder.names, name);
-    auto const entry = there != folder.names.end() ? there->first : name; // which keeps its capitals
+    auto const entry = there != folder.names.end() ? there->first : name; // which keeps its case
     folder.unsynced[entry].push_back(file);
     folder.names.erase(entry);
     if (file) {
@@ -133,7 +135,7 @@ std::shared_ptr<CrashingVolume> CrashingVolume::copy(unsigned seed) const {
     return result;
 }
 
-/// Copies the files too, each once, whichever names lead to it.
+/// Also copies the files, each once for all its names.
 std::shared_ptr<CrashingVolume::Folder> CrashingVolume::copyOf(Folder const& folder) {
     std::map<File const*, std::shared_ptr<File>> copies;
     auto const copied = [&copies](std::shared_ptr<File> const& file) {
@@ -269,7 +271,7 @@ void CrashingVolume::write(File& file, std::string_view bytes) {
 }
 
 void CrashingVolume::sync(File& file) {
-    file.unstamped = file.modified; // a new length takes the rest of what is known of the file with it
+    file.unstamped = file.modified; // syncing a new length also syncs the times
     std::erase_if(file.unsynced, [&file](Write const& write) {
         if (!write.isGivenUp) {
             apply(write, file.durable);
@@ -278,7 +280,7 @@ void CrashingVolume::sync(File& file) {
     });
 }
 
-/// Gives a file a time between two ticks of the clock.
+/// Sets a file's time between two ticks of the clock.
 bool CrashingVolume::stamp(File& file) {
     if (keepsStamps) {
         file.modified = clock_ + ++stamps_;

@@ -35,11 +35,11 @@ void walk(ProjectText const& text, Address const& parent, Content& content) {
     for (std::size_t i = 0; i < children.size(); ++i) {
         Child const& child = children[i];
         Address const address = parent.child(child.element);
-        EXPECT_TRUE(i == 0 || children[i - 1].element < child.element) << told(plainNode()) << " at " << i;
+        EXPECT_TRUE(i == 0 || children[i - 1].element < child.element) << described(plainNode()) << " at " << i;
         EXPECT_TRUE(child.node != nullptr || child.isCreated || child.hasChildren);
         EXPECT_FALSE(child.node != nullptr && child.isCreated);
         if (child.node || child.isCreated) {
-            content.emplace(address, told(child.node));
+            content.emplace(address, described(child.node));
         }
         std::size_t const before = content.size();
         walk(text, address, content);
@@ -49,19 +49,19 @@ void walk(ProjectText const& text, Address const& parent, Content& content) {
 
 } // namespace
 
-std::string told(metadata::MetadataNode const& node) {
+std::string described(metadata::MetadataNode const& node) {
     std::string result = toldText(node.getType()) + "(";
     for (std::u16string const& key : node.getKeys()) {
         result += toldText(key) + "=" + toldText(node.get(key)) + ";";
     }
     for (auto const& child : node.getChildren()) {
-        result += told(*child);
+        result += described(*child);
     }
     return result + ")";
 }
 
-std::string told(Node const& node) {
-    return node ? told(*node) : "made";
+std::string described(Node const& node) {
+    return node ? described(*node) : "made";
 }
 
 Node makeNode(std::u16string const& type, Keys const& keys, std::vector<Nested> const& nested) {
@@ -129,7 +129,7 @@ Content contentOf(ProjectText const& text) {
     return content;
 }
 
-std::string told(std::vector<Fault> const& faults) {
+std::string described(std::vector<Fault> const& faults) {
     constexpr char const* kinds[] = {"Damage", "Conflict", "Irregular", "TornTail", "Displaced"};
     std::string result;
     for (Fault const& fault : faults) {

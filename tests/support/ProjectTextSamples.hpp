@@ -11,14 +11,14 @@
 
 namespace project::stores::samples {
 
-/// What stands at each address: a node told in full, or "made".
+/// The node at each address, described in full, or "made".
 using Content = std::map<Address, std::string>;
 
-/// A node told by its type, keys and nested nodes, in a form of its own that no line of a text has.
-std::string told(metadata::MetadataNode const& node);
+/// Describes a node by its type, keys and nested nodes, in a form that differs from every line of a text.
+std::string described(metadata::MetadataNode const& node);
 
-/// A node as told tells it, or "made" for none.
-std::string told(Node const& node);
+/// The same, or "made" for no node.
+std::string described(Node const& node);
 
 using Keys = std::map<std::u16string, std::u16string>;
 
@@ -39,23 +39,23 @@ Address addressOf(std::initializer_list<char16_t const*> steps);
 /// A body of these lines, between the first and the last one.
 std::string bodyOf(std::initializer_list<std::string_view> lines);
 
-/// The closing line of a batch, its sum taken over the lines and the sum before.
+/// The closing line of a batch, with the checksum over the lines and the preceding checksum.
 std::string closingOf(std::vector<std::string> const& lines, std::string const& after);
 
-/// The sum over the lines of a text.
+/// The checksum over the lines of a text.
 std::string sumOf(std::string_view text);
 
-/// Reads a text that is expected to be whole.
+/// Reads a complete text.
 ProjectText readWhole(std::string bytes);
 
-/// Walks through the whole content, and fails the test where children are not sorted, empty, or have more or
-/// less below them than they say.
+/// Walks through the whole content. The test fails when children are not sorted or empty, or when one has
+/// children and does not say so, or the reverse.
 Content contentOf(ProjectText const& text);
 
 /// Kinds and lines, as "Damage 3, Conflict 5".
-std::string told(std::vector<Fault> const& faults);
+std::string described(std::vector<Fault> const& faults);
 
-/// Where a difference is, in their order.
+/// The addresses of differences, in order.
 std::vector<Address> addressesOf(std::vector<Difference> const& differences);
 
 Change set(Address const& address, Node const& node = plainNode());

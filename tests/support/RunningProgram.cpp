@@ -9,16 +9,17 @@
 #include <system_error>
 
 #include <fcntl.h>
+#include <linux/capability.h>
 #include <poll.h>
 #include <pty.h>
+#include <sys/prctl.h>
+#include <sys/syscall.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 namespace project::test {
 
 namespace {
-
-constexpr uid_t nobody = 65534;
 
 void require(bool condition, char const* what) {
     if (!condition) {
@@ -91,6 +92,20 @@ std::vector<char*> pointersTo(std::vector<std::string>& texts) {
     return result;
 }
 
+/// Drops every capability for good, so that a program started as root has only the permissions of a file's
+/// owner. The user stays the same: the program and its libraries can lie in a folder that only root can
+/// enter.
+bool dropCapabilities() {
+    for (int capability = 0; prctl(PR_CAPBSET_READ, capability, 0, 0, 0) >= 0; ++capability) {
+        if (prctl(PR_CAPBSET_DROP, capability, 0, 0, 0) != 0) {
+            return false;
+        }
+    }
+    __user_cap_header_struct header{_LINUX_CAPABILITY_VERSION_3, 0};
+    std::array<__user_cap_data_struct, _LINUX_CAPABILITY_U32S_3> const none{};
+    return syscall(SYS_capset, &header, none.data()) == 0;
+}
+
 /// In the child: becomes the program, or ends with 126.
 [[noreturn]] void become(char** arguments, char** environment, ProgramSettings const& settings, int input,
                          Streams const& streams) {
@@ -98,8 +113,8 @@ std::vector<char*> pointersTo(std::vector<std::string>& texts) {
     bool ready = dup2(input, STDIN_FILENO) >= 0 && dup2(streams.output.writeEnd, STDOUT_FILENO) >= 0 &&
                  dup2(streams.errors.writeEnd, STDERR_FILENO) >= 0 && setrlimit(RLIMIT_FSIZE, &limit) == 0 &&
                  chdir(settings.folder.c_str()) == 0;
-    if (settings.asNobody && geteuid() == 0) {
-        ready = ready && setgid(nobody) == 0 && setuid(nobody) == 0;
+    if (settings.withoutPrivileges && geteuid() == 0) {
+        ready = ready && dropCapabilities();
     }
     if (ready) {
         execvpe(arguments[0], arguments, environment);

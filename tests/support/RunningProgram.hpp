@@ -25,11 +25,11 @@ struct ProgramSettings {
     /// Set over what the tests run with. Languages and git's own settings are taken out of that before.
     std::map<std::string, std::string> environment;
     rlim_t fileSize =
-        RLIM_INFINITY;            ///< how large a file may become: a full disk to whoever ignores the signal
-    bool asNobody = false;        ///< without the rights of root, if the tests have them
-    bool onTerminal = false;      ///< standard output and error are one pseudo terminal
-    bool inputOnTerminal = false; ///< with onTerminal: standard input is the same one, which shows it, too
-    bool inputStaysOpen = false;  ///< until the object goes; else standard input ends at once
+        RLIM_INFINITY; ///< how large a file may become: a full disk to whoever ignores the signal
+    bool withoutPrivileges = false; ///< without root's capabilities: permissions apply to root, too
+    bool onTerminal = false;        ///< standard output and error are one pseudo terminal
+    bool inputOnTerminal = false;   ///< with onTerminal: standard input is the same one, which shows it, too
+    bool inputStaysOpen = false;    ///< until the object goes; else standard input ends at once
 };
 
 /// A program that runs as a process of its own, and is ended with the object if it has not ended before.

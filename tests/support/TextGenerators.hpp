@@ -10,8 +10,8 @@
 
 namespace project::stores::samples {
 
-/// Code units that are written in different ways or sort differently as bytes: letters, what is escaped,
-/// both halves of pairs, and characters above and below them.
+/// Code units that are written in different ways or sort differently as bytes: letters, escaped characters,
+/// both halves of surrogate pairs, and characters above and below them.
 inline rc::Gen<char16_t> codeUnit() {
     return rc::gen::oneOf(
         rc::gen::element(u'a', u'b', u'/', u'.', u' ', u'"', u'\\', u'\n', u'\x01', u'\x7F'),
@@ -24,12 +24,12 @@ inline rc::Gen<std::u16string> anyText() {
     return rc::gen::scale(0.1, rc::gen::container<std::u16string>(codeUnit()));
 }
 
-/// A text that often is one of a few, so that addresses meet.
+/// A text that is often one of a few, so that addresses coincide.
 inline rc::Gen<std::u16string> textNear(std::vector<std::u16string> const& usual) {
     return rc::gen::weightedOneOf<std::u16string>({{6, rc::gen::elementOf(usual)}, {1, anyText()}});
 }
 
-/// A few of what another generator gives, in a number that does not grow with the size of the case.
+/// A few values of another generator. Their number does not grow with the size of the case.
 template <typename T>
 rc::Gen<std::vector<T>> fewOf(std::size_t most, rc::Gen<T> const& gen) {
     return rc::gen::mapcat(rc::gen::inRange<std::size_t>(0, most + 1), [gen](std::size_t count) {
@@ -48,7 +48,7 @@ inline rc::Gen<metadata::PathElement> anyName() {
                                                      textNear({u"a", u"b", u"a b", u"a.c", u"c"}));
 }
 
-/// What may follow the names of a file: mostly nothing, else a marker, its data, or anything.
+/// The steps after the names of a file: mostly none, else a marker, its data, or any steps.
 inline rc::Gen<std::vector<metadata::PathElement>> anyEnd() {
     using Steps = std::vector<metadata::PathElement>;
     return rc::gen::weightedOneOf<Steps>({{6, rc::gen::just(Steps{})},

@@ -25,7 +25,7 @@ void walk(Backend& backend, Address const& parent, Content& content) {
     for (auto const& child : backend.load(parent)) {
         auto const address = parent.child(child.element);
         if (child.node || child.isCreated) {
-            content.emplace(address, stores::samples::told(child.node));
+            content.emplace(address, stores::samples::described(child.node));
         }
         auto const before = content.size();
         walk(backend, address, content);

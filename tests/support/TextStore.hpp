@@ -13,7 +13,7 @@
 
 namespace project::metadata {
 
-/// How a failed test shows an address.
+/// Prints an address in the message of a failed test.
 void PrintTo(MetadataPath const& address, std::ostream* out);
 
 } // namespace project::metadata
@@ -37,7 +37,7 @@ using stores::samples::makeNode;
 using stores::samples::remove;
 using stores::samples::set;
 
-/// A guard of the tree: enters, and leaves when it goes.
+/// An outermost guard of the tree, held by a scope.
 class Entered {
 public:
     explicit Entered(Backend& backend, Access access = Access::Read)
@@ -48,7 +48,7 @@ public:
     Entered(Entered const&) = delete;
     Entered& operator=(Entered const&) = delete;
 
-    /// What others had changed.
+    /// The changes of other processes that the guard found.
     stores::Changes const& changes() const { return changes_; }
 
 private:
@@ -56,7 +56,7 @@ private:
     stores::Changes changes_;
 };
 
-/// Writes a batch and keeps it, as the tree does.
+/// Writes and commits a batch, like the tree.
 FileChanges commit(Backend& backend, Batch const& batch);
 
 /// A batch that adds the files of these paths.
@@ -65,19 +65,19 @@ Batch addFiles(std::vector<std::u16string> const& paths);
 /// Paths of files "<folder>/0000", "<folder>/0001" and so on.
 std::vector<std::u16string> manyFiles(std::size_t count, std::u16string const& folder = u"many");
 
-/// All that a backend has, under one read guard.
+/// The whole content of a backend, under one read guard.
 Content contentOf(Backend& backend);
 
-/// The same as loaded under the guard that is open.
+/// The same under the guard that is already open.
 Content loadAll(Backend& backend);
 
-/// What a store holds after these batches.
+/// The content of a store after these batches.
 Content contentAfter(std::vector<Batch> const& batches);
 
-/// A text of these batches, the first one in the body and the others behind it.
+/// A text of these batches, the first one in the body and the others in the tail.
 std::string textOf(Batch const& body, std::vector<Batch> const& tail = {});
 
-/// The error that a call throws; the test fails when it throws none.
+/// The error of a call; the test fails when there is none.
 template <typename Call>
 StoreError errorOf(Call const& call) {
     try {
@@ -94,29 +94,33 @@ class TextStore : public ::testing::Test {
 protected:
     using Options = TextBackend::Options;
 
-    /// Every batch writes the text anew.
-    static Options rewriting() { return {std::chrono::milliseconds(100), 1'000'000, 16}; }
+    /// Every batch rewrites the text.
+    static Options rewriting() {
+        return {.patience = std::chrono::milliseconds(100), .alwaysRewritten = 1'000'000, .bodyToTail = 16};
+    }
 
     /// Batches are appended to bodies of any length, until they are as long as the body.
-    static Options appending() { return {std::chrono::milliseconds(100), 0, 1}; }
+    static Options appending() {
+        return {.patience = std::chrono::milliseconds(100), .alwaysRewritten = 0, .bodyToTail = 1};
+    }
 
     std::unique_ptr<TextBackend> open(Options options = rewriting()) const {
         return std::make_unique<TextBackend>(std::make_unique<CrashingDisk>(volume), options);
     }
 
-    /// Makes a store with just these files, closed and settled.
+    /// Creates a store with exactly these files, closed and durable.
     void prepare(std::vector<std::u16string> const& files) const;
 
-    /// Makes a store with this text, as git brings it.
+    /// Creates a store with this text, like a checkout.
     void prepareText(std::string text) const;
 
-    /// Lets the first call of this name fail.
+    /// Injects a fault into the first call of this name.
     void failOnce(std::string call) const;
 
-    /// What another process reads in the project now.
+    /// The content that another process reads now.
     Content stored(Options options = rewriting()) const { return contentOf(*open(options)); }
 
-    /// The calls since the last time that change something on disk.
+    /// The calls since the last time that change the disk.
     std::vector<std::string> writes() const;
 
     std::string text() const { return volume->content("project.jsonl"); }

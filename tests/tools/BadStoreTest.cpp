@@ -166,9 +166,7 @@ TEST_F(BadStore, thatIsGoneIsAnError) {
 
 TEST_F(BadStore, inAFolderThatCannotBeWrittenIsReadAllTheSame) {
     std::filesystem::permissions(inFolder(".projectdata"), std::filesystem::perms(0555));
-    if (!giveUpRights()) {
-        GTEST_SKIP() << "other users than root cannot reach " PROJECTCTL;
-    }
+    dropPrivileges();
 
     EXPECT_THAT(tool({"list"}), Prints("a\nb\n"));
     EXPECT_THAT(tool({"add", "c"}), FailsWith(1, inFolder(".projectdata")));
@@ -177,9 +175,7 @@ TEST_F(BadStore, inAFolderThatCannotBeWrittenIsReadAllTheSame) {
 
 TEST_F(BadStore, thatCannotBeReadIsAnError) {
     std::filesystem::permissions(inFolder(".projectdata"), std::filesystem::perms::none);
-    if (!giveUpRights()) {
-        GTEST_SKIP() << "other users than root cannot reach " PROJECTCTL;
-    }
+    dropPrivileges();
 
     EXPECT_THAT(tool({"list"}), FailsWith(1, inFolder(".projectdata")));
 }

@@ -102,14 +102,7 @@ TEST_F(GitIgnore, doesNotMindAFolderThatCannotBeReadWhenGitIgnoresIt) {
     folder_.file(u".gitignore", "/closed/\n");
     folder_.file(u"closed/file");
     std::filesystem::permissions(inFolder("closed"), std::filesystem::perms::none);
-    std::filesystem::permissions(inFolder(".projectdata"), std::filesystem::perms::all);
-    std::filesystem::permissions(text(), std::filesystem::perms::all);
-    settings_.environment["GIT_CONFIG_COUNT"] = "1";
-    settings_.environment["GIT_CONFIG_KEY_0"] = "safe.directory";
-    settings_.environment["GIT_CONFIG_VALUE_0"] = "*";
-    if (!giveUpRights()) {
-        GTEST_SKIP() << "other users than root cannot reach " PROJECTCTL;
-    }
+    dropPrivileges();
 
     EXPECT_THAT(tool({"add", "-r", "--gitignore", "--no-source-control", "."}), SucceedsSilently());
 

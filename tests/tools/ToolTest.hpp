@@ -80,12 +80,8 @@ protected:
         writeText(content.insert(place + 1, line + '\n'));
     }
 
-    /// From now on projectctl runs without the rights of root. @return false when it cannot be run so here.
-    bool giveUpRights() {
-        std::filesystem::permissions(folder_.onDisk(), std::filesystem::perms::all);
-        settings_.asNobody = true;
-        return tool({"--version"}).exitCode == 0;
-    }
+    /// From now on projectctl runs without root's privileges, so that the permissions of files apply to it.
+    void dropPrivileges() { settings_.withoutPrivileges = true; }
 
     std::string inFolder(std::string const& relative) const { return (folder_.onDisk() / relative).string(); }
 

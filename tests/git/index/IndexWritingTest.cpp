@@ -11,6 +11,7 @@
 #include "git/GitRepository.hpp"
 #include "project/git/GitError.hpp"
 #include "support/ChildProcess.hpp"
+#include "support/Waiting.hpp"
 
 namespace project::git {
 namespace {
@@ -54,6 +55,22 @@ private:
 class IndexWriting : public GitTest {
 protected:
     std::filesystem::path lockFile() const { return repository.indexFile().string() + ".lock"; }
+
+    /// Until the index is of an earlier second than now: git compares whole seconds.
+    void waitForTheNextSecond() const {
+        auto const second = secondOf(repository.indexFile());
+        ASSERT_TRUE(test::comesTrue([second] {
+            timespec now{};
+            return ::clock_gettime(CLOCK_REALTIME_COARSE, &now) == 0 && now.tv_sec > second;
+        }));
+    }
+
+    static std::time_t secondOf(std::filesystem::path const& file) {
+        struct stat status {};
+
+        EXPECT_EQ(0, ::stat(file.c_str(), &status));
+        return status.st_mtim.tv_sec;
+    }
 
     void add(std::vector<std::string> const& names) { adapter.addToSourceControl(repository.paths(names)); }
 
@@ -207,7 +224,7 @@ TEST_F(IndexWriting, theTimesOfOtherEntriesStay) {
     repository.write("a");
     repository.commitAll();
     auto const before = repository.run({"ls-files", "--debug", "a"});
-    std::this_thread::sleep_for(std::chrono::milliseconds(1100)); // git looks at whole seconds
+    waitForTheNextSecond();
     repository.write("b");
     add({"b"});
     EXPECT_EQ(repository.run({"ls-files", "--debug", "a"}), before);
@@ -222,7 +239,7 @@ TEST_F(IndexWriting, aChangeThatOnlyTheAgeOfTheIndexShowedIsStillSeen) {
     auto const time = std::filesystem::last_write_time(repository.onDisk() / "a");
     repository.write("a", "2\n");
     std::filesystem::last_write_time(repository.onDisk() / "a", time);
-    std::this_thread::sleep_for(std::chrono::milliseconds(1100));
+    waitForTheNextSecond();
     remove({"b"});
     EXPECT_EQ(repository.statusStates().at("a"), 3);
     EXPECT_EQ(stateOf("a"), 3);

@@ -7,10 +7,11 @@ namespace project::test {
 
 namespace {
 
-using Trouble = CrashingVolume::Trouble;
+using InjectedFault = CrashingVolume::InjectedFault;
 
-/// Not in it are the clock, a wait, and letting the lock go: they don't fail, and whoever dies there has died
-/// before the next call.
+/// Not included are the clock, a wait, and unlocking: they do not fail, and dying there is the same as dying
+/// Not included are the clock, a wait, and unlocking: they do not fail, and dying there is the same as dying before the
+/// next call.
 constexpr char const* callsOfADisk[] = {
     "openFolder", "makeFolder",     "removeFolder", "isFolderInPlace", "lock",       "lockHolder",
     "identify",   "identifyByPath", "read",         "append",          "create",     "sync",
@@ -18,27 +19,27 @@ constexpr char const* callsOfADisk[] = {
 
 } // namespace
 
-bool KindOfTrouble::kills() const {
-    return trouble != Trouble::Fails && trouble != Trouble::FailsForGood;
+bool FaultKind::kills() const {
+    return fault != InjectedFault::Fails && fault != InjectedFault::FailsForGood;
 }
 
-std::vector<KindOfTrouble> const& kindsOfTrouble() {
-    static std::vector<KindOfTrouble> const kinds{
-        {"fails", Trouble::Fails, false},
-        {"fails, cut", Trouble::Fails, true},
-        {"for good", Trouble::FailsForGood, false},
-        {"for good, cut", Trouble::FailsForGood, true},
-        {"dies before", Trouble::DiesBefore, false},
-        {"dies amid", Trouble::DiesAmid, false},
-        {"dies after", Trouble::DiesAfter, false},
-        {"cut before", Trouble::DiesBefore, true},
-        {"cut amid", Trouble::DiesAmid, true},
-        {"cut after", Trouble::DiesAfter, true},
+std::vector<FaultKind> const& faultKinds() {
+    static std::vector<FaultKind> const kinds{
+        {"fails", InjectedFault::Fails, false},
+        {"fails, cut", InjectedFault::Fails, true},
+        {"for good", InjectedFault::FailsForGood, false},
+        {"for good, cut", InjectedFault::FailsForGood, true},
+        {"dies before", InjectedFault::DiesBefore, false},
+        {"dies amid", InjectedFault::DiesAmid, false},
+        {"dies after", InjectedFault::DiesAfter, false},
+        {"cut before", InjectedFault::DiesBefore, true},
+        {"cut amid", InjectedFault::DiesAmid, true},
+        {"cut after", InjectedFault::DiesAfter, true},
     };
     return kinds;
 }
 
-void CrashPointCounts::add(KindOfTrouble const& kind, std::string const& call, bool isInRecovery) {
+void CrashPointCounts::add(FaultKind const& kind, std::string const& call, bool isInRecovery) {
     ++rows_[call.substr(0, call.find(' '))][kind.name];
     inRecovery_ += isInRecovery ? 1 : 0;
 }
@@ -57,7 +58,7 @@ std::vector<std::string> CrashPointCounts::missing() const {
     std::vector<std::string> result;
     for (std::string const call : callsOfADisk) {
         auto const row = rows_.find(call);
-        for (auto const& kind : kindsOfTrouble()) {
+        for (auto const& kind : faultKinds()) {
             if (row == rows_.end() || !row->second.contains(kind.name)) {
                 result.push_back(call + " " + kind.name);
             }
@@ -70,19 +71,19 @@ void CrashPointCounts::print(std::ostream& out) const {
     constexpr int nameWidth = 16;
     constexpr int numberWidth = 14;
     out << std::setw(nameWidth) << std::left << "call" << std::right;
-    for (auto const& kind : kindsOfTrouble()) {
+    for (auto const& kind : faultKinds()) {
         out << std::setw(numberWidth) << kind.name;
     }
     out << '\n';
     for (auto const& [call, row] : rows_) {
         out << std::setw(nameWidth) << std::left << call << std::right;
-        for (auto const& kind : kindsOfTrouble()) {
+        for (auto const& kind : faultKinds()) {
             auto const found = row.find(kind.name);
             out << std::setw(numberWidth) << (found == row.end() ? 0 : found->second);
         }
         out << '\n';
     }
-    out << "power cut after an operation without trouble: " << quietPowerCuts_ << "\ntogether: " << total()
+    out << "power cut after an operation without fault: " << quietPowerCuts_ << "\ntogether: " << total()
         << ", of them " << inRecovery_ << " in recoveries\n";
 }
 

@@ -10,37 +10,36 @@
 
 namespace project::test {
 
-/// A trouble, and whether the power is cut right after the operation that it came to has ended.
-struct KindOfTrouble {
+/// A fault, and whether the power is cut right after the operation.
+struct FaultKind {
     char const* name;
-    CrashingVolume::Trouble trouble;
+    CrashingVolume::InjectedFault fault;
     bool cutsPower;
 
     bool kills() const;
 };
 
-std::vector<KindOfTrouble> const& kindsOfTrouble();
+std::vector<FaultKind> const& faultKinds();
 
-/// How many calls of each name had each kind of trouble.
+/// The number of calls of each name with each kind of fault.
 class CrashPointCounts {
 public:
     /// @param call as the volume records it, with the names of files.
-    /// @param isInRecovery when somebody had died in the project before.
-    void add(KindOfTrouble const& kind, std::string const& call, bool isInRecovery);
+    /// @param isInRecovery whether a process had died before.
+    void add(FaultKind const& kind, std::string const& call, bool isInRecovery);
 
-    /// A power cut after an operation that had no trouble.
+    /// A power cut after an operation without a fault.
     void addQuietPowerCut() { ++quietPowerCuts_; }
 
     std::size_t total() const;
 
-    /// Every call that a disk makes and that can have trouble, with every kind of it, that never came
-    /// together.
+    /// Every combination of a call and a fault that was never reached.
     std::vector<std::string> missing() const;
 
     void print(std::ostream& out) const;
 
 private:
-    using Row = std::map<std::string, std::size_t>; ///< by the name of the trouble
+    using Row = std::map<std::string, std::size_t>; ///< by the name of the fault
 
     std::map<std::string, Row> rows_; ///< by the name of the call
     std::size_t inRecovery_ = 0;

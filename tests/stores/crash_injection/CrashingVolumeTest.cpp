@@ -15,10 +15,10 @@ namespace {
 
 using stores::StoreError;
 
-/// What a disk in memory forgets: one that forgot nothing would prove nothing.
+/// The writes that a disk in memory forgets: a disk that forgot nothing would prove nothing.
 class CrashingVolumeForgetting : public testing::Test {
 protected:
-    /// All that the given question finds after the power was cut in one or another way.
+    /// All answers to the given question after every possible power cut.
     template <typename Question>
     std::set<std::string> afterPowerCuts(Question const& question) const {
         std::set<std::string> found;
@@ -36,8 +36,8 @@ protected:
 
     void append(std::string const& bytes) { disk.append("a", *disk.identify("a"), bytes); }
 
-    /// Names and what they lead to, "a=first b=second".
-    static std::string told(CrashingVolume const& cut) {
+    /// Names and the contents of their files, "a=first b=second".
+    static std::string described(CrashingVolume const& cut) {
         std::string result;
         for (auto const& name : cut.names()) {
             result += (result.empty() ? "" : " ") + name + "=" + cut.content(name);
@@ -86,32 +86,32 @@ TEST_F(CrashingVolumeForgetting, writesOfTwoFilesAreLostByThemselves) {
     append("x");
     disk.append("b", *disk.identify("b"), "y");
 
-    EXPECT_THAT(afterPowerCuts(told), IsSupersetOf({"a= b=", "a=x b=", "a= b=y", "a=x b=y"}));
+    EXPECT_THAT(afterPowerCuts(described), IsSupersetOf({"a= b=", "a=x b=", "a= b=y", "a=x b=y"}));
 }
 
 TEST_F(CrashingVolumeForgetting, aNewNameIsLostUntilTheFolderIsSynced) {
     disk.create("a", "x", std::nullopt);
     disk.sync();
-    EXPECT_THAT(afterPowerCuts(told), UnorderedElementsAre("", "a=x"));
+    EXPECT_THAT(afterPowerCuts(described), UnorderedElementsAre("", "a=x"));
 
     disk.syncFolder();
-    EXPECT_THAT(afterPowerCuts(told), ElementsAre("a=x"));
+    EXPECT_THAT(afterPowerCuts(described), ElementsAre("a=x"));
 }
 
 TEST_F(CrashingVolumeForgetting, aRemovedNameComesBackUntilTheFolderIsSynced) {
     makeDurable("a", "x");
     disk.remove("a");
-    EXPECT_THAT(afterPowerCuts(told), UnorderedElementsAre("", "a=x"));
+    EXPECT_THAT(afterPowerCuts(described), UnorderedElementsAre("", "a=x"));
 
     disk.syncFolder();
-    EXPECT_THAT(afterPowerCuts(told), ElementsAre(""));
+    EXPECT_THAT(afterPowerCuts(described), ElementsAre(""));
 }
 
 TEST_F(CrashingVolumeForgetting, eachNameOfARenamedFileIsThereOrNotByItself) {
     makeDurable("a", "x");
     disk.rename("a", "b");
 
-    EXPECT_THAT(afterPowerCuts(told), UnorderedElementsAre("", "a=x", "b=x", "a=x b=x"));
+    EXPECT_THAT(afterPowerCuts(described), UnorderedElementsAre("", "a=x", "b=x", "a=x b=x"));
 }
 
 TEST_F(CrashingVolumeForgetting, eachOfTwoExchangedNamesLeadsToEitherFile) {
@@ -119,7 +119,7 @@ TEST_F(CrashingVolumeForgetting, eachOfTwoExchangedNamesLeadsToEitherFile) {
     makeDurable("b", "y");
     disk.exchange("a", "b");
 
-    EXPECT_THAT(afterPowerCuts(told), UnorderedElementsAre("a=x b=x", "a=x b=y", "a=y b=x", "a=y b=y"));
+    EXPECT_THAT(afterPowerCuts(described), UnorderedElementsAre("a=x b=x", "a=x b=y", "a=y b=x", "a=y b=y"));
 }
 
 TEST_F(CrashingVolumeForgetting, aNameLeadsToAnyFileThatItLedToSinceTheLastSync) {
@@ -135,7 +135,7 @@ TEST_F(CrashingVolumeForgetting, aNameLeadsToAnyFileThatItLedToSinceTheLastSync)
 TEST_F(CrashingVolumeForgetting, whatASyncFailedToWriteIsNotMadeDurableByALaterOne) {
     makeDurable("a", "");
     append("1");
-    volume->plan(CrashingVolume::Trouble::Fails, 0);
+    volume->plan(CrashingVolume::InjectedFault::Fails, 0);
     EXPECT_THROW(disk.sync(), StoreError);
     append("2");
     disk.sync();
@@ -164,7 +164,7 @@ TEST_F(CrashingVolumeForgetting, aFolderWhoseMakerDiedAtItMayGoAndOneThatWasMade
                 ElementsAre("there"));
 
     volume->removeFolder();
-    volume->plan(CrashingVolume::Trouble::DiesAmid, 0);
+    volume->plan(CrashingVolume::InjectedFault::DiesAmid, 0);
     EXPECT_THROW(CrashingDisk(volume).makeFolder(), ProcessDied);
 
     ASSERT_TRUE(volume->hasFolder());
@@ -192,30 +192,30 @@ TEST_F(CrashingVolumeForgetting, aCopyGoesItsOwnWay) {
     other.sync();
     other.syncFolder();
 
-    EXPECT_EQ("b=12", told(*volume));
-    EXPECT_EQ("b=123", told(*copy));
+    EXPECT_EQ("b=12", described(*volume));
+    EXPECT_EQ("b=123", described(*copy));
     copy->powerCut();
-    EXPECT_EQ("b=123", told(*copy));
-    EXPECT_THAT(afterPowerCuts(told), IsSupersetOf({"", "a=1", "b=1", "a=12 b=12"}))
+    EXPECT_EQ("b=123", described(*copy));
+    EXPECT_THAT(afterPowerCuts(described), IsSupersetOf({"", "a=1", "b=1", "a=12 b=12"}))
         << "what the copy made durable is not so in the first";
 }
 
 /// The moments at which a process dies at a call.
 class CrashingVolumeDying : public CrashingVolumeForgetting {
 protected:
-    using Trouble = CrashingVolume::Trouble;
+    using InjectedFault = CrashingVolume::InjectedFault;
 
-    /// What stands in a file to which "12345678" was to be appended, over all ways to die so.
-    std::set<std::string> left(Trouble trouble) const {
+    /// The contents of a file to which "12345678" was to be appended, over all ways to die.
+    std::set<std::string> left(InjectedFault fault) const {
         std::set<std::string> found;
         for (unsigned seed = 0; seed < 100; ++seed) {
             auto const copy = volume->copy(seed);
             CrashingDisk dying(copy);
             dying.openFolder();
             auto const before = *dying.identify("a");
-            copy->plan(trouble, 0);
+            copy->plan(fault, 0);
             EXPECT_THROW(dying.append("a", before, "12345678"), ProcessDied);
-            EXPECT_EQ("append a", copy->troubled());
+            EXPECT_EQ("append a", copy->faulted());
             EXPECT_THROW(dying.identify("a"), ProcessDied) << "it does nothing more";
             found.insert(copy->content("a"));
         }
@@ -229,17 +229,17 @@ protected:
 };
 
 TEST_F(CrashingVolumeDying, beforeAmidAndAfterACallLeaveNothingAPartAndAll) {
-    EXPECT_THAT(left(Trouble::DiesBefore), ElementsAre(""));
-    EXPECT_THAT(left(Trouble::DiesAfter), ElementsAre("12345678"));
-    EXPECT_THAT(left(Trouble::DiesAmid),
+    EXPECT_THAT(left(InjectedFault::DiesBefore), ElementsAre(""));
+    EXPECT_THAT(left(InjectedFault::DiesAfter), ElementsAre("12345678"));
+    EXPECT_THAT(left(InjectedFault::DiesAmid),
                 ElementsAre("", "1", "12", "123", "1234", "12345", "123456", "1234567"));
-    EXPECT_THAT(left(Trouble::Dies), IsSupersetOf({"12345678", "1234"}));
+    EXPECT_THAT(left(InjectedFault::Dies), IsSupersetOf({"12345678", "1234"}));
 }
 
 TEST_F(CrashingVolumeDying, theLockGoesWithTheProcess) {
     disk.openFolder();
     disk.lock(std::chrono::milliseconds(1));
-    volume->plan(Trouble::DiesBefore, 0);
+    volume->plan(InjectedFault::DiesBefore, 0);
     EXPECT_THROW(disk.identify("a"), ProcessDied);
 
     CrashingDisk next(volume);
@@ -247,15 +247,15 @@ TEST_F(CrashingVolumeDying, theLockGoesWithTheProcess) {
     EXPECT_TRUE(next.lock(std::chrono::milliseconds(1)));
 }
 
-TEST_F(CrashingVolumeDying, aTroubleComesToTheCallThatIsMeantAndForGoodOrOnce) {
-    volume->plan(Trouble::Fails, 1);
+TEST_F(CrashingVolumeDying, aFaultComesToTheCallThatIsMeantAndForGoodOrOnce) {
+    volume->plan(InjectedFault::Fails, 1);
     disk.identify("a");
-    EXPECT_EQ("", volume->troubled());
+    EXPECT_EQ("", volume->faulted());
     EXPECT_THROW(disk.list(), StoreError);
-    EXPECT_EQ("list", volume->troubled());
+    EXPECT_EQ("list", volume->faulted());
     EXPECT_THAT(disk.list(), ElementsAre("a"));
 
-    volume->plan(Trouble::FailsForGood, 0);
+    volume->plan(InjectedFault::FailsForGood, 0);
     EXPECT_THROW(disk.list(), StoreError);
     EXPECT_THROW(disk.identify("a"), StoreError);
     volume->cancelPlan();

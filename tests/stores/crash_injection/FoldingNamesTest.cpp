@@ -7,8 +7,7 @@ namespace project::test {
 
 namespace {
 
-/// File systems on which names that differ in capitals alone lead to the same file, and clones in which they
-/// stand otherwise than the store writes them.
+/// File systems that ignore case in names, and clones in which the case of a name differs from the store's.
 class FoldingNames : public TextStore {
 protected:
     void SetUp() override {
@@ -49,16 +48,16 @@ TEST_F(FoldingNames, aFirstBatchTakesNoNameThatIsTaken) {
     EXPECT_EQ("* text\n", volume->content(".gitattributes"));
 }
 
-TEST_F(FoldingNames, atEveryCallEveryTroubleLeavesTheBatchInOrOut) {
-    using Trouble = CrashingVolume::Trouble;
+TEST_F(FoldingNames, atEveryCallEveryFaultLeavesTheBatchInOrOut) {
+    using InjectedFault = CrashingVolume::InjectedFault;
     auto const with = contentAfter({files, addFiles({u"b"})});
-    for (auto const trouble : {Trouble::Fails, Trouble::FailsForGood, Trouble::DiesBefore, Trouble::DiesAmid,
-                               Trouble::DiesAfter}) {
+    for (auto const fault : {InjectedFault::Fails, InjectedFault::FailsForGood, InjectedFault::DiesBefore,
+                             InjectedFault::DiesAmid, InjectedFault::DiesAfter}) {
         bool wasReached = true;
         for (std::size_t call = 0; wasReached; ++call) {
             auto const now = volume->copy(static_cast<unsigned>(call));
             auto const disk = [&now] { return std::make_unique<CrashingDisk>(now); };
-            now->plan(trouble, call);
+            now->plan(fault, call);
             bool isKept = false;
             try {
                 TextBackend backend(disk(), rewriting());
@@ -67,7 +66,7 @@ TEST_F(FoldingNames, atEveryCallEveryTroubleLeavesTheBatchInOrOut) {
             } catch (StoreError const&) {
             } catch (ProcessDied const&) {
             }
-            wasReached = !now->troubled().empty();
+            wasReached = !now->faulted().empty();
             now->cancelPlan();
             TextBackend next(disk(), rewriting());
             auto const found = contentOf(next);

@@ -35,7 +35,7 @@ Batch batchOf(std::size_t writer, std::size_t number) {
     return batch;
 }
 
-/// What the process does.
+/// The work of the process.
 class Writing {
 public:
     Writing(ChildProcess::Parent const& parent, Path root, std::size_t writer, std::uint64_t seed)
@@ -58,9 +58,13 @@ public:
     }
 
 private:
-    static TextBackend::Options appending() { return {std::chrono::seconds(60), 200, 1}; }
+    static TextBackend::Options appending() {
+        return {.patience = std::chrono::seconds(60), .alwaysRewritten = 200, .bodyToTail = 1};
+    }
 
-    static TextBackend::Options rewriting() { return {std::chrono::seconds(60), 1'000'000, 16}; }
+    static TextBackend::Options rewriting() {
+        return {.patience = std::chrono::seconds(60), .alwaysRewritten = 1'000'000, .bodyToTail = 16};
+    }
 
     std::size_t upTo(std::size_t bound) {
         return std::uniform_int_distribution<std::size_t>(0, bound)(random_);
@@ -72,7 +76,7 @@ private:
         try {
             commit(backend, batchOf(writer_, last_ + 1));
         } catch (StoreError const& error) {
-            // Two may make the store at the same time, and one of them is told to try again.
+            // Two writers may create the store at the same time, and one of them is asked to try again.
             if (error.kind() != StoreError::Kind::Busy) {
                 throw;
             }
@@ -135,8 +139,8 @@ std::size_t KilledWriter::notedIn(Content const& content) const {
         return 0;
     }
     std::size_t number = 0;
-    auto const& told = note->second;
-    std::from_chars(told.data() + told.find('=') + 1, told.data() + told.size(), number);
+    auto const& value = note->second;
+    std::from_chars(value.data() + value.find('=') + 1, value.data() + value.size(), number);
     return number;
 }
 

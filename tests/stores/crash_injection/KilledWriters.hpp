@@ -10,39 +10,39 @@
 
 namespace project::test {
 
-/// A process that writes batch after batch into a project until it is killed, and says before each one that
-/// it begins and after it that it is kept.
+/// A process that commits one batch after another until it is killed. It reports the begin and the commit of
+/// each batch.
 ///
-/// Batch n adds two files, notes its number on a third one, and removes what batch n - 5 added: so the whole
-/// of what a writer has in the project is told by one number, and a part of a batch shows.
+/// Batch n adds two files, stores its number on a third one, and removes the files of batch n - 5. One number
+/// therefore describes everything that a writer has in the project, and a partial batch is detected.
 class KilledWriter {
 public:
-    /// @param number tells this writer's files from those of others.
+    /// @param number distinguishes this writer's files from those of others.
     KilledWriter(Path const& root, std::size_t number, std::uint64_t seed);
 
-    /// Hears what it has said by now.
+    /// Reads its reports up to now.
     void listen();
 
-    /// Kills it in whatever it is doing, and hears the rest.
+    /// Kills it at any point, and reads the rest of its reports.
     void kill();
 
-    /// The last batch that surely is in the project, and the last that may be.
+    /// The last batch that is certainly in the project, and the last one that may be.
     std::size_t kept() const { return kept_; }
 
     std::size_t begun() const { return begun_; }
 
     bool isAmidABatch() const { return begun_ > kept_; }
 
-    /// What it says when the store fails it; empty as long as it does not.
+    /// The error of the store that it reported; empty when there was none.
     std::string const& complaint() const { return complaint_; }
 
-    /// The number that it has noted in a project; 0 for none.
+    /// The number that it has stored in a project; 0 for none.
     std::size_t notedIn(Content const& content) const;
 
-    /// What it has in the project with a batch in it, and those before.
+    /// Its content of the project after a batch and the batches before.
     Content contentWith(std::size_t batch) const;
 
-    /// It was found dead with this batch in the project, and that stays so.
+    /// It died, and this is its last batch in the project.
     void settle(std::size_t batch) { kept_ = begun_ = batch; }
 
 private:

@@ -18,16 +18,16 @@ namespace {
 
 using std::chrono::steady_clock;
 
-/// What happened, so that a test in which nothing did shows.
+/// The counts of a run, so that a run without kills is detected.
 struct Counts {
     std::size_t kills = 0;
     std::size_t amidABatch = 0;     ///< of them
-    std::size_t keptAllTheSame = 0; ///< of those, the batch was in the project nevertheless
+    std::size_t keptAllTheSame = 0; ///< of those, the batch was committed nevertheless
     std::size_t batches = 0;
     std::size_t projects = 0;
 };
 
-/// Kills writers of one project at random, and knows what the project has to hold.
+/// Kills writers of one project at random, and knows the expected content.
 class Killer {
 public:
     Killer(Counts& counts, std::mt19937_64& random) : counts_(counts), random_(random) {}
@@ -42,7 +42,7 @@ public:
             killOne();
             check();
             if (upTo(2) == 0) {
-                writeOne(); // beside the others, as another process
+                writeOne(); // like another process, at the same time
                 check();
             }
             start();
@@ -55,7 +55,7 @@ private:
         return std::uniform_int_distribution<std::size_t>(0, bound)(random_);
     }
 
-    /// Mostly short, so that many die while they make the store or open it, and some go on for a while.
+    /// Mostly short, so that many die while they create or open the store, and some run for a while.
     void wait() {
         constexpr std::size_t longest[] = {1'000, 5'000, 30'000};
         std::this_thread::sleep_for(std::chrono::microseconds(upTo(longest[upTo(2)])));
@@ -77,8 +77,8 @@ private:
             stores::makeSystemDisk(root_.path(), stores::TextBackend::folderName));
     }
 
-    /// Every batch that was said to be kept is there, of each writer at most the one that it had just begun
-    /// besides, and nothing else.
+    /// Every batch that was reported as committed exists, for each writer at most the one that it had just
+    /// begun in addition, and nothing else.
     void check();
     void writeOne();
     void finish();
@@ -128,11 +128,11 @@ void Killer::writeOne() {
         own_.merge(contentAfter({file}));
     } catch (StoreError const& error) {
         EXPECT_EQ(StoreError::Kind::Busy, error.kind())
-            << error.what(); // another one has just made the store
+            << error.what(); // another writer has just created the store
     }
 }
 
-/// With all of them dead the project is there for the next one, at once and tidy.
+/// When all writers are dead, the project is usable at once, and tidy after the next writer.
 void Killer::finish() {
     while (!alive_.empty()) {
         killOne();
@@ -153,7 +153,7 @@ void Killer::finish() {
     EXPECT_THAT(names, IsSubsetOf({".gitattributes", ".gitignore", "project.jsonl"}));
 }
 
-/// On disk, where most of the time goes by in syncs, and in memory, where it does not.
+/// On disk, where syncs take most of the time, and in memory, where they do not.
 void useFolder(bool inMemory, std::string const& usual) {
     bool const isThere = inMemory && std::filesystem::is_directory("/dev/shm");
     ::setenv("TMPDIR", isThere ? "/dev/shm" : usual.c_str(), 1);

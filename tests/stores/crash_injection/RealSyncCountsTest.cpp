@@ -1,8 +1,8 @@
 #include <ostream>
-#include <thread>
 
 #include "SystemCalls.hpp"
-#include "SystemDeeds.hpp"
+#include "SystemOperations.hpp"
+#include "support/Waiting.hpp"
 
 namespace project::test {
 
@@ -20,11 +20,11 @@ struct Syncs {
     }
 };
 
-Syncs syncsOf(SystemDeed const& deed) {
-    auto const project = projectFor(deed);
+Syncs syncsOf(SystemOperation const& operation) {
+    auto const project = projectFor(operation);
     SystemCalls calls;
     calls.syncs = true;
-    deed.perform(*project);
+    operation.perform(*project);
     return {calls.counts["fdatasync"], calls.counts["fsync"]};
 }
 
@@ -33,7 +33,7 @@ TEST(RealSyncCounts, eachOperationSyncsAsOftenAsItMustAndNotMore) {
         {"append", {1, 0}},
         {"rewrite", {1, 1}},
         {"create", {4, 3}},  // the root for the folder, the folder for the new store, and for the first batch
-        {"recover", {1, 2}}, // the folder before a dead writer's files go
+        {"recover", {1, 2}}, // the folder before a dead writer's files are deleted
         {"rewrite somebody else's text", {1, 1}},
         {"append after others", {1, 0}},
         {"look after others", {0, 0}},
@@ -46,16 +46,17 @@ TEST(RealSyncCounts, eachOperationSyncsAsOftenAsItMustAndNotMore) {
         {"look", {0, 0}},
         {"check", {0, 0}},
     };
-    for (auto const& deed : systemDeeds()) {
-        ASSERT_TRUE(expected.contains(deed.name));
-        EXPECT_EQ(expected.at(deed.name), syncsOf(deed)) << deed.name;
+    for (auto const& operation : systemOperations()) {
+        ASSERT_TRUE(expected.contains(operation.name));
+        EXPECT_EQ(expected.at(operation.name), syncsOf(operation)) << operation.name;
     }
 }
 
 TEST(RealSyncCounts, aSecondLookAsksTheSystemOnceAndOpensNothing) {
-    auto const project = projectFor(rewritingDeed()); // which has read
-    contentOf(*project->backend);                     // and once more while the text was young
-    std::this_thread::sleep_for(std::chrono::milliseconds(50));
+    auto const project = projectFor(rewritingOperation()); // which has read
+    contentOf(*project->backend);                          // again, because the text was younger than a tick
+    auto const text = project->root.onDisk() / ".projectdata/project.jsonl";
+    ASSERT_TRUE(comesTrue([&] { return isOlderThan(std::chrono::milliseconds(20), text.c_str()); }));
     contentOf(*project->backend);
     SystemCalls const calls;
 

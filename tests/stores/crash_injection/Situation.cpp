@@ -17,7 +17,7 @@ TextBackend::Options appending() {
     return {milliseconds(20), 0, 1};
 }
 
-/// So that some writes share a tick of the clock and some don't.
+/// So that some writes share a tick of the clock and some do not.
 void passTime(CrashingVolume& volume, Choices& choices) {
     constexpr std::int64_t times[] = {0, 3'000'000, 100'000'000};
     volume.advance(times[choices.upTo(2)]);
@@ -34,7 +34,7 @@ void makeStore(Situation& situation, std::size_t files, Choices& choices) {
     }
 }
 
-/// Puts another text in place, as git does.
+/// Replaces the text, like git.
 void replaceText(Situation& situation, std::string bytes) {
     situation.volume->replaceFile("project.jsonl", bytes);
     situation.content = stores::samples::contentOf(stores::samples::readWhole(std::move(bytes)));
@@ -65,7 +65,7 @@ void letAWriterDie(Situation& situation, Choices& choices) {
     auto backend = open(situation, choices.oneIn(2) ? appending() : rewriting());
     auto const batch = choices.batch(situation.content);
     auto const after = applied(situation.content, batch);
-    volume.plan(CrashingVolume::Trouble::Dies, choices.upTo(20));
+    volume.plan(CrashingVolume::InjectedFault::Dies, choices.upTo(20));
     try {
         commit(*backend, batch);
     } catch (ProcessDied const&) {
@@ -94,30 +94,30 @@ void letAWriterDie(Situation& situation, Choices& choices) {
 
 void goOn(Situation& situation, Choices& choices) {
     auto& volume = *situation.volume;
-    switch (situation.story) {
-    case Story::LongBody:
+    switch (situation.history) {
+    case History::LongBody:
         situation.options = appending();
         break;
-    case Story::LongBodyWithTail:
+    case History::LongBodyWithTail:
         situation.options = appending();
         letAnotherWrite(situation, appending(), choices);
         break;
-    case Story::TornTail:
+    case History::TornTail:
         volume.append("project.jsonl", "\"torn\"\n{\"bat");
         break;
-    case Story::Irregular:
+    case History::Irregular:
         replaceText(situation, afterFirstLine(volume.content("project.jsonl"), "\n"));
         break;
-    case Story::MergeJoined:
+    case History::MergeJoined:
         joinTwoBatches(situation, choices);
         break;
-    case Story::Damaged:
+    case History::Damaged:
         replaceText(situation, afterFirstLine(volume.content("project.jsonl"), damagedLine));
         break;
-    case Story::Conflict:
+    case History::Conflict:
         bringConflict(situation);
         break;
-    case Story::DeadWriters:
+    case History::DeadWriters:
         for (auto count = choices.upTo(2) + 1; count > 0; --count) {
             letAWriterDie(situation, choices);
         }
@@ -141,18 +141,18 @@ std::u16string toText(std::size_t number) {
 
 char const* const damagedLine = "\"a name without its end\n";
 
-char const* toString(Story story) {
+char const* toString(History history) {
     constexpr char const* names[] = {"NoStore",     "EmptyFolder",      "HalfMadeStore", "ShortBody",
                                      "LongBody",    "LongBodyWithTail", "TornTail",      "Irregular",
                                      "MergeJoined", "DeadWriters",      "Damaged",       "Conflict"};
-    return names[static_cast<int>(story)];
+    return names[static_cast<int>(history)];
 }
 
 Content applied(Content content, Batch const& batch) {
     for (auto const& change : batch) {
         switch (change.kind) {
         case stores::Change::Kind::Set:
-            content[change.address] = stores::samples::told(change.node);
+            content[change.address] = stores::samples::described(change.node);
             break;
         case stores::Change::Kind::Remove:
             std::erase_if(content, [&](auto const& entry) { return entry.first.isWithin(change.address); });
@@ -214,20 +214,21 @@ TextBackend::Options Choices::options() {
     return {milliseconds(20), alwaysRewritten[upTo(3)], bodyToTail[upTo(2)]};
 }
 
-Situation tell(Story story, Choices& choices, bool canExchange, bool keepsStamps) {
-    Situation situation{story, std::make_shared<CrashingVolume>(choices.seed()), choices.options(), {}, {}};
+Situation projectWith(History history, Choices& choices, bool canExchange, bool keepsStamps) {
+    Situation situation{history, std::make_shared<CrashingVolume>(choices.seed()), choices.options(), {}, {}};
     auto& volume = *situation.volume;
     volume.canExchange = canExchange;
     volume.keepsStamps = keepsStamps;
-    if (story == Story::HalfMadeStore) {
+    if (history == History::HalfMadeStore) {
         letAWriterDie(situation, choices);
-    } else if (story == Story::EmptyFolder) {
+    } else if (history == History::EmptyFolder) {
         volume.makeFolder();
         if (choices.oneIn(2)) {
             volume.replaceFile(".gitattributes", "* text\n");
         }
-    } else if (story != Story::NoStore) {
-        bool const isLong = story == Story::LongBody || story == Story::LongBodyWithTail || choices.oneIn(2);
+    } else if (history != History::NoStore) {
+        bool const isLong =
+            history == History::LongBody || history == History::LongBodyWithTail || choices.oneIn(2);
         makeStore(situation, isLong ? 30 : 3, choices);
         goOn(situation, choices);
     }
@@ -244,7 +245,7 @@ std::unique_ptr<TextBackend> open(Situation const& situation) {
 }
 
 void abandon(CrashingVolume& volume, std::unique_ptr<TextBackend>& backend) {
-    volume.plan(CrashingVolume::Trouble::DiesBefore, 0);
+    volume.plan(CrashingVolume::InjectedFault::DiesBefore, 0);
     backend.reset();
     volume.cancelPlan();
 }
@@ -255,7 +256,7 @@ void letAnotherWrite(Situation& situation, TextBackend::Options options, Choices
     commit(*backend, batch);
     situation.content = applied(situation.content, batch);
     situation.notDurable.clear();
-    if (situation.story == Story::LongBodyWithTail || choices.oneIn(2)) {
+    if (situation.history == History::LongBodyWithTail || choices.oneIn(2)) {
         abandon(*situation.volume, backend);
     }
     passTime(*situation.volume, choices);

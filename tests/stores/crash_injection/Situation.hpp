@@ -10,37 +10,37 @@
 
 namespace project::test {
 
-/// How a project came to be as it is.
-enum class Story {
+/// The operations on a project before the one under test.
+enum class History {
     NoStore,
     EmptyFolder,
-    HalfMadeStore, ///< whoever made it died
+    HalfMadeStore, ///< its creator died
     ShortBody,
     LongBody,
     LongBodyWithTail,
     TornTail,
     Irregular,
-    MergeJoined, ///< git has put two batches behind one text
-    DeadWriters, ///< with what they left behind
+    MergeJoined, ///< git has merged two batches into one tail
+    DeadWriters, ///< with their leftovers
     Damaged,
-    Conflict, ///< with the markers of a merge
+    Conflict, ///< with conflict markers
 };
 
-char const* toString(Story story);
+char const* toString(History history);
 
-/// A project at the moment before something is done with it.
+/// A project at the moment before an operation.
 struct Situation {
-    Story story;
+    History history;
     std::shared_ptr<CrashingVolume> volume;
-    TextBackend::Options options; ///< of whoever does it
+    TextBackend::Options options; ///< of the process that runs the operation
 
-    Content content;                 ///< what everybody reads
-    std::vector<Content> notDurable; ///< what a power cut may bring back instead
+    Content content;                 ///< the content that every process reads
+    std::vector<Content> notDurable; ///< contents that a power cut may restore
     bool hadPowerCut = false;
-    std::string settled{}; ///< of Conflict: the text that takes the place
+    std::string settled{}; ///< of Conflict: the text that resolves it
 };
 
-/// What a batch makes of a content, as plainly as it can be said.
+/// The content after a batch, in the simplest form.
 Content applied(Content content, Batch const& batch);
 
 /// Random choices, among them random batches.
@@ -53,37 +53,37 @@ public:
 
     bool oneIn(std::size_t count) { return upTo(count - 1) == 0; }
 
-    /// What is new differs from what another one has made by now, too.
+    /// New names and values also differ from those of another object.
     void goOnAfter(Choices const& other) { count_ = std::max(count_, other.count_); }
 
     unsigned seed() { return static_cast<unsigned>(random_()); }
 
-    /// Some files and other addresses added, changed and removed: real changes of this content.
+    /// Adds, changes and removes some files and other addresses: real changes of this content.
     Batch batch(Content const& content);
 
-    /// On both sides of each limit: texts here have some hundred to some thousand bytes.
+    /// On both sides of each limit: texts here have some hundreds to some thousands of bytes.
     TextBackend::Options options();
 
 private:
     stores::Change change(Content const& content);
 
     std::mt19937_64 random_;
-    std::size_t count_ = 0; ///< so that what is new differs from all before
+    std::size_t count_ = 0; ///< makes new names and values unique
 };
 
 /// A project with a random history of this kind.
-Situation tell(Story story, Choices& choices, bool canExchange, bool keepsStamps);
+Situation projectWith(History history, Choices& choices, bool canExchange, bool keepsStamps);
 
 std::unique_ptr<TextBackend> open(Situation const& situation, TextBackend::Options options);
 std::unique_ptr<TextBackend> open(Situation const& situation);
 
-/// A process ends without coming to close its project.
+/// A process ends without closing its project.
 void abandon(CrashingVolume& volume, std::unique_ptr<TextBackend>& backend);
 
-/// Another process writes a random batch and is gone, with or without closing the project.
+/// Another process writes a random batch and ends, with or without closing the project.
 void letAnotherWrite(Situation& situation, TextBackend::Options options, Choices& choices);
 
-/// A line in the text of Story::Damaged that says nothing, and must not get lost.
+/// The unreadable line in the text of History::Damaged, which must not be lost.
 extern char const* const damagedLine;
 
 } // namespace project::test

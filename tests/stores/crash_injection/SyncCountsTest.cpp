@@ -9,7 +9,7 @@ namespace {
 
 using Calls = std::vector<std::string>;
 
-/// The first lock of a process, and any after others have written: what dead writers left is looked for.
+/// The first lock of a process, and any lock after another program's write: leftovers are searched.
 Calls const lockAndClear{
     "openFolder", "lock", "isFolderInPlace", "identify project.jsonl", "list", "identify project.jsonl"};
 Calls const lockAgain{"openFolder", "lock", "isFolderInPlace", "identify project.jsonl"};
@@ -44,8 +44,7 @@ Calls const creation =
             {"create temporary", "sync", "renameToFree temporary project.jsonl", "identify project.jsonl"},
             {"syncFolder"}});
 
-/// What each operation asks of the disk, to the call: a sync too many, or another reading of the text, would
-/// be a loss that nobody notices.
+/// The exact calls of each operation to the disk: otherwise an unnecessary sync or read would go unnoticed.
 class SyncCounts : public TextStore {
 protected:
     template <typename Operation>

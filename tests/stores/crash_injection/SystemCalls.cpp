@@ -25,7 +25,7 @@ std::size_t cut(std::size_t length) {
     return living != nullptr ? std::min(length, living->mostBytes) : length;
 }
 
-/// True when a sync is to be done without.
+/// True when a sync is skipped.
 bool isSyncSpared() {
     return living != nullptr && !living->syncs;
 }
@@ -109,7 +109,7 @@ int __wrap_openat(int folder, char const* path, int flags, ...) {
     return fails("openat", path, flags) ? -1 : __real_openat(folder, path, flags, mode);
 }
 
-/// The descriptor is gone all the same.
+/// The descriptor is closed even when the call fails.
 int __wrap_close(int file) {
     bool const isFailing = fails("close");
     int const error = errno;
@@ -187,7 +187,7 @@ int __wrap_flock(int file, int operation) {
 int __wrap_fcntl(int file, int command, ...) {
     va_list rest;
     va_start(rest, command);
-    auto* const argument = va_arg(rest, void*); // what locks are asked for by
+    auto* const argument = va_arg(rest, void*); // of the commands for locks
     va_end(rest);
     return fails("fcntl") ? -1 : __real_fcntl(file, command, argument);
 }

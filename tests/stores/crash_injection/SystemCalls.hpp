@@ -15,15 +15,15 @@ struct SystemCall {
     std::string_view file; ///< the name of the file, where one is given
     int flags = 0;         ///< of open, openat, renameat2
 
-    /// True when it changes something on disk, or opens a file to do so.
+    /// True when it changes the disk, or opens a file for writing.
     bool isChange() const;
 };
 
-/// Stands between this program and the system as long as it lives. The program must be linked with --wrap for
-/// each of the calls; what libraries call goes past it.
+/// Intercepts the system calls of this program while the object lives. The program must be linked with --wrap
+/// for each call; calls of libraries are not intercepted.
 class SystemCalls {
 public:
-    /// @return the error that a call gets instead of being made, or 0.
+    /// @return the error with which a call fails instead of being executed, or 0.
     using Answer = std::function<int(SystemCall const&)>;
 
     explicit SystemCalls(Answer answer = nullptr);
@@ -31,19 +31,19 @@ public:
     SystemCalls(SystemCalls const&) = delete;
     SystemCalls& operator=(SystemCalls const&) = delete;
 
-    /// How often each call was made, those that got an error included.
+    /// The number of calls of each name, including those that failed.
     std::map<std::string, std::size_t, std::less<>> counts;
 
-    /// What one write and one read transfer at most.
+    /// The most bytes that one write or read transfers.
     std::size_t mostBytes = std::numeric_limits<std::size_t>::max();
 
-    /// When false, syncs are counted and done without: that is what takes the time.
+    /// When false, syncs are counted but not executed, to save time.
     bool syncs = false;
 
     /// @return true when the call fails, with errno set.
     bool fails(SystemCall const& call);
 
-    /// The one that lives, or null.
+    /// The current object, or null.
     static SystemCalls* current();
 
 private:

@@ -18,23 +18,23 @@ void SystemFaults::SetUpTestSuite() {
     }
 }
 
-std::optional<StoreError> SystemFaults::perform(SystemDeed const& deed, RealProject& project,
+std::optional<StoreError> SystemFaults::perform(SystemOperation const& operation, RealProject& project,
                                                 SystemCalls::Answer const& answer) {
     SystemCalls const calls(answer);
     try {
-        deed.perform(project);
+        operation.perform(project);
     } catch (StoreError const& error) {
         return error;
     }
     return std::nullopt;
 }
 
-bool SystemFaults::failAt(SystemDeed const& deed, std::size_t callsBefore, int error, bool isForGood,
-                          SystemCalls::Answer const& system) {
-    auto const project = projectFor(deed);
+bool SystemFaults::failAt(SystemOperation const& operation, std::size_t callsBefore, int error,
+                          bool isForGood, SystemCalls::Answer const& system) {
+    auto const project = projectFor(operation);
     std::size_t count = 0;
     std::string failed;
-    auto const thrown = perform(deed, *project, [&](SystemCall const& call) {
+    auto const thrown = perform(operation, *project, [&](SystemCall const& call) {
         bool const isHit = count == callsBefore || (isForGood && count > callsBefore);
         ++count;
         if (isHit && failed.empty()) {
@@ -42,38 +42,39 @@ bool SystemFaults::failAt(SystemDeed const& deed, std::size_t callsBefore, int e
         }
         return isHit ? error : system ? system(call) : 0;
     });
-    SCOPED_TRACE(std::string(deed.name) + ": " + std::generic_category().message(error) +
+    SCOPED_TRACE(std::string(operation.name) + ": " + std::generic_category().message(error) +
                  (isForGood ? " from call " : " at call ") + std::to_string(callsBefore) + ", " + failed);
     if (thrown) {
         EXPECT_FALSE(failed.empty()) << thrown->what();
         EXPECT_THAT(thrown->getFile(), StartsWith(project->root.onDisk().string())) << thrown->what();
         EXPECT_THAT(thrown->getRemedy(), Not(IsEmpty())) << thrown->what();
     }
-    checkAfterwards(deed, *project, thrown);
+    checkAfterwards(operation, *project, thrown);
     if (!failed.empty()) {
         ++hits[failed];
     }
     return !failed.empty();
 }
 
-void SystemFaults::checkAfterwards(SystemDeed const& deed, RealProject& project,
+void SystemFaults::checkAfterwards(SystemOperation const& operation, RealProject& project,
                                    std::optional<StoreError> const& error) {
     SystemCalls const withoutSyncs;
-    auto const found = contentOf(*project.open(deed.options));
+    auto const found = contentOf(*project.open(operation.options));
     if (error && error->kind() == StoreError::Kind::OutcomeUnknown) {
-        EXPECT_THAT((std::vector<Content>{deed.before, deed.after}), Contains(found));
+        EXPECT_THAT((std::vector<Content>{operation.before, operation.after}), Contains(found));
     } else {
-        EXPECT_EQ(error ? deed.before : deed.after, found) << (error ? error->what() : "no error");
+        EXPECT_EQ(error ? operation.before : operation.after, found) << (error ? error->what() : "no error");
     }
     if (project.backend) {
         EXPECT_EQ(found, contentOf(*project.backend));
     }
     project.backend.reset();
-    checkNextWriter(deed, project, found);
+    checkNextWriter(operation, project, found);
 }
 
-void SystemFaults::checkNextWriter(SystemDeed const& deed, RealProject const& project, Content const& found) {
-    auto const writer = project.open(deed.options);
+void SystemFaults::checkNextWriter(SystemOperation const& operation, RealProject const& project,
+                                   Content const& found) {
+    auto const writer = project.open(operation.options);
     std::set<std::string> allowed{".gitattributes", ".gitignore", "project.jsonl"};
     for (auto const& fault : writer->check()) {
         if (fault.kind == stores::Fault::Kind::Damage) {
@@ -87,8 +88,8 @@ void SystemFaults::checkNextWriter(SystemDeed const& deed, RealProject const& pr
     commit(*writer, addFiles({u"z"}));
     auto after = before;
     after.insert(*contentAfter({addFiles({u"z"})}).begin());
-    EXPECT_EQ(after, contentOf(*project.open(deed.options)));
-    EXPECT_TRUE(before == found || deed.name == std::string("settle"));
+    EXPECT_EQ(after, contentOf(*project.open(operation.options)));
+    EXPECT_TRUE(before == found || operation.name == std::string("settle"));
     for (auto const& name : project.names()) {
         EXPECT_TRUE(allowed.contains(name) || name.starts_with("damaged-")) << name << " was left";
     }

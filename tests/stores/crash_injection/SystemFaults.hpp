@@ -6,27 +6,29 @@
 #include <string>
 
 #include "SystemCalls.hpp"
-#include "SystemDeeds.hpp"
+#include "SystemOperations.hpp"
 
 namespace project::test {
 
-/// Projects in real folders, over a system that fails or that can do less than others.
+/// Projects in real folders, on a system with faults or with fewer features than others.
 class SystemFaults : public testing::Test {
 protected:
-    /// In memory where there is such a folder: nothing is synced here, and disks are slow at making folders.
+    /// In memory if there is such a folder: nothing is synced here, and creating folders on disk is slow.
     static void SetUpTestSuite();
 
-    /// Lets the call after so many others fail. @return false when the deed makes fewer.
-    /// @param system what the system does otherwise.
-    bool failAt(SystemDeed const& deed, std::size_t callsBefore, int error, bool isForGood,
+    /// Injects a fault into one call, after a number of others. @return false when the operation makes fewer
+    /// calls.
+    /// @param system the results of the other calls.
+    bool failAt(SystemOperation const& operation, std::size_t callsBefore, int error, bool isForGood,
                 SystemCalls::Answer const& system = nullptr);
 
-    /// Lets a deed meet a system of a certain kind. @return what the error said, or nothing.
-    static std::optional<StoreError> perform(SystemDeed const& deed, RealProject& project,
+    /// Runs an operation on a system of a certain kind. @return the error, or nothing.
+    static std::optional<StoreError> perform(SystemOperation const& operation, RealProject& project,
                                              SystemCalls::Answer const& answer);
-    static void checkAfterwards(SystemDeed const& deed, RealProject& project,
+    static void checkAfterwards(SystemOperation const& operation, RealProject& project,
                                 std::optional<StoreError> const& error);
-    static void checkNextWriter(SystemDeed const& deed, RealProject const& project, Content const& found);
+    static void checkNextWriter(SystemOperation const& operation, RealProject const& project,
+                                Content const& found);
 
     std::map<std::string, std::size_t, std::less<>> hits; ///< by call
 };

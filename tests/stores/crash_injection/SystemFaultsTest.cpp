@@ -15,7 +15,7 @@ namespace project::test {
 
 namespace {
 
-/// What a call can fail with.
+/// The errors of each call.
 constexpr std::array faults{ENOSPC, EDQUOT, EACCES, EIO, EROFS, ENOMEM};
 
 /// The calls that a signal can interrupt.
@@ -27,12 +27,12 @@ bool isInterruptible(SystemCall const& call) {
 
 TEST_F(SystemFaults, whateverCallFailsTheErrorTellsWhatToDoAndNothingIsLost) {
     bool const isLarge = numberFromEnvironment("PROJECT_TEST_CRASH_POINTS", 0) > 0;
-    for (auto const& deed : systemDeeds()) {
+    for (auto const& operation : systemOperations()) {
         for (bool const isForGood : {false, true}) {
             bool isReached = true;
             for (std::size_t call = 0; isReached && !HasFailure(); ++call) {
                 for (std::size_t kind = 0; kind < (isLarge ? faults.size() : 1); ++kind) {
-                    isReached = failAt(deed, call, faults[(call + kind) % faults.size()], isForGood);
+                    isReached = failAt(operation, call, faults[(call + kind) % faults.size()], isForGood);
                 }
             }
         }
@@ -43,7 +43,7 @@ TEST_F(SystemFaults, whateverCallFailsTheErrorTellsWhatToDoAndNothingIsLost) {
           "mkdirat", "rmdir",   "flock", "fcntl",    "fdopendir", "readdir"}) {
         EXPECT_GT(hits[name], 0U) << name;
     }
-    if (::geteuid() == 0) { // nobody else may give a file away
+    if (::geteuid() == 0) { // only root can change a file's owner
         EXPECT_GT(hits["fchown"], 0U);
     }
     if (isLarge) {
@@ -54,93 +54,93 @@ TEST_F(SystemFaults, whateverCallFailsTheErrorTellsWhatToDoAndNothingIsLost) {
 }
 
 TEST_F(SystemFaults, aSignalAtAnyCallThatItCanInterruptChangesNothing) {
-    for (auto const& deed : systemDeeds()) {
+    for (auto const& operation : systemOperations()) {
         bool isReached = true;
         for (std::size_t callsBefore = 0; isReached && !HasFailure(); ++callsBefore) {
-            auto const project = projectFor(deed);
+            auto const project = projectFor(operation);
             std::size_t count = 0;
             std::string interrupted;
-            auto const thrown = perform(deed, *project, [&](SystemCall const& call) {
+            auto const thrown = perform(operation, *project, [&](SystemCall const& call) {
                 bool const isHit = isInterruptible(call) && count++ == callsBefore;
                 interrupted = isHit ? call.name : interrupted;
                 return isHit ? EINTR : 0;
             });
             isReached = !interrupted.empty();
-            ASSERT_FALSE(thrown) << deed.name << ", " << interrupted << ": " << thrown->what();
-            checkAfterwards(deed, *project, thrown);
+            ASSERT_FALSE(thrown) << operation.name << ", " << interrupted << ": " << thrown->what();
+            checkAfterwards(operation, *project, thrown);
         }
     }
 }
 
 TEST_F(SystemFaults, whatComesInPiecesIsPutTogether) {
-    for (auto const& deed : systemDeeds()) {
-        auto const project = projectFor(deed);
+    for (auto const& operation : systemOperations()) {
+        auto const project = projectFor(operation);
         {
             SystemCalls calls;
             calls.mostBytes = 7;
-            deed.perform(*project);
+            operation.perform(*project);
         }
-        checkAfterwards(deed, *project, std::nullopt);
+        checkAfterwards(operation, *project, std::nullopt);
     }
 }
 
-/// Lets the call of a name after so many others of that name fail.
+/// Injects a fault into one call of a name, after a number of others of that name.
 SystemCalls::Answer failing(std::string_view name, std::size_t callsBefore) {
     return [=, left = callsBefore](SystemCall const& call) mutable {
         return call.name == name && left-- == 0 ? EIO : 0;
     };
 }
 
-/// The last look before an append is called kept.
+/// The last check before an append is committed.
 TEST_F(SystemFaults, aFolderThatCanNotBeLookedAtIsNotTakenForOneThatWasMovedAway) {
-    auto const deed = appendingDeed();
-    auto const project = projectFor(deed);
+    auto const operation = appendingOperation();
+    auto const project = projectFor(operation);
     constexpr std::size_t looksBefore = 2; // when it is locked, and before the append
 
-    auto const thrown = perform(deed, *project, failing("lstat", looksBefore));
+    auto const thrown = perform(operation, *project, failing("lstat", looksBefore));
 
     ASSERT_TRUE(thrown);
     EXPECT_EQ("cannot be examined: Input/output error", thrown->getProblem());
-    checkAfterwards(deed, *project, thrown);
+    checkAfterwards(operation, *project, thrown);
 }
 
 TEST_F(SystemFaults, aNewTextThatCanNotBeLookedAtIsNotPutInPlace) {
-    auto const deed = rewritingDeed();
-    auto const project = projectFor(deed);
+    auto const operation = rewritingOperation();
+    auto const project = projectFor(operation);
     constexpr std::size_t looksBefore = 2; // at the folder, and at the new file's mode
 
-    auto const thrown = perform(deed, *project, failing("fstat", looksBefore));
+    auto const thrown = perform(operation, *project, failing("fstat", looksBefore));
 
     ASSERT_TRUE(thrown);
     EXPECT_THAT(thrown->getFile(), HasSubstr(".tmp"));
     EXPECT_EQ("cannot be examined: Input/output error", thrown->getProblem());
-    checkAfterwards(deed, *project, thrown);
+    checkAfterwards(operation, *project, thrown);
 }
 
 TEST_F(SystemFaults, whenANewTextCanNotBeWrittenNothingOfItIsLeft) {
-    auto const deed = rewritingDeed();
-    auto const project = projectFor(deed);
+    auto const operation = rewritingOperation();
+    auto const project = projectFor(operation);
 
-    auto const thrown = perform(deed, *project, failing("write", 0));
+    auto const thrown = perform(operation, *project, failing("write", 0));
 
     ASSERT_TRUE(thrown);
     EXPECT_THAT(project->names(), UnorderedElementsAre(".gitattributes", ".gitignore", "project.jsonl"));
 }
 
-/// On some file systems it is at closing that a full disk shows.
+/// On some file systems, a full disk is reported when a file is closed.
 TEST_F(SystemFaults, aFileThatCanNotBeClosedAfterASyncIsNotDurable) {
-    for (auto const& deed : {appendingDeed(), rewritingDeed(), creatingDeed()}) {
-        auto const project = projectFor(deed);
+    for (auto const& operation : {appendingOperation(), rewritingOperation(), creatingOperation()}) {
+        auto const project = projectFor(operation);
 
-        auto const thrown = perform(deed, *project, [wasSynced = false](SystemCall const& call) mutable {
+        auto const thrown = perform(operation, *project, [wasSynced = false](SystemCall const& call) mutable {
             bool const isHit = wasSynced && call.name == "close";
             wasSynced = call.name == "fdatasync";
             return isHit ? ENOSPC : 0;
         });
 
-        ASSERT_TRUE(thrown) << deed.name;
+        ASSERT_TRUE(thrown) << operation.name;
         EXPECT_EQ("Make room on the disk and try again.", thrown->getRemedy().substr(0, 36));
-        checkAfterwards(deed, *project, thrown);
+        checkAfterwards(operation, *project, thrown);
     }
 }
 

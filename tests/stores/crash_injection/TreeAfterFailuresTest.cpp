@@ -16,13 +16,13 @@ using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
 using stores::TreeMetadataManager;
 
-/// Knows which files it was told to be there.
+/// Keeps the set of files that exist according to the notifications.
 class Listener : public metadata::FileChangeRequestListener {
 public:
     void fileRemovalRequested(metadata::MetadataManager& /*store*/, Path const& /*root*/,
                               std::vector<Path> const& files) override {
         for (auto const& file : files) {
-            EXPECT_EQ(1U, there.erase(file)) << "it was not told of the file that is said to go";
+            EXPECT_EQ(1U, there.erase(file)) << "the deleted file was never reported as created";
             ++removals;
         }
     }
@@ -30,7 +30,7 @@ public:
     void fileAdditionRequested(metadata::MetadataManager& /*store*/,
                                std::vector<Path> const& files) override {
         for (auto const& file : files) {
-            EXPECT_TRUE(there.insert(file).second) << "it was told of the file before";
+            EXPECT_TRUE(there.insert(file).second) << "the file was reported before";
         }
     }
 
@@ -67,13 +67,13 @@ void makeSome(TreeMetadataManager& tree) {
     tree.createPaths(addresses);
 }
 
-/// All that a tree answers.
+/// All answers of a tree.
 void collect(TreeMetadataManager& tree, Address const& parent, Content& content) {
     for (auto const& child : tree.getChildNodes(parent)) {
         EXPECT_TRUE(tree.pathExists(child));
         auto const node = tree.getNode(child);
         EXPECT_EQ(node != nullptr, tree.hasNode(child));
-        content.emplace(child, node ? stores::samples::told(*node) : "no node");
+        content.emplace(child, node ? stores::samples::described(*node) : "no node");
         collect(tree, child, content);
     }
 }
@@ -92,17 +92,17 @@ std::unique_ptr<TreeMetadataManager> openTree(std::shared_ptr<CrashingVolume> co
         u"/project/.projectdata");
 }
 
-/// A tree whose writes fail at one call after another.
+/// A tree with a fault in one call after another.
 class TreeAfterFailures : public TextStore {
 protected:
-    using Trouble = CrashingVolume::Trouble;
+    using InjectedFault = CrashingVolume::InjectedFault;
 
     /// @return false when the write makes fewer calls.
-    bool writeWithTrouble(Write write, Options options, Trouble trouble, std::size_t call);
+    bool writeWithFault(Write write, Options options, InjectedFault fault, std::size_t call);
 
     void failEverywhere(Write write, Options options) {
-        for (auto const trouble : {Trouble::Fails, Trouble::FailsForGood}) {
-            for (std::size_t call = 0; writeWithTrouble(write, options, trouble, call); ++call) {
+        for (auto const fault : {InjectedFault::Fails, InjectedFault::FailsForGood}) {
+            for (std::size_t call = 0; writeWithFault(write, options, fault, call); ++call) {
             }
         }
     }
@@ -111,7 +111,7 @@ protected:
     std::size_t reversals = 0;
 };
 
-bool TreeAfterFailures::writeWithTrouble(Write write, Options options, Trouble trouble, std::size_t call) {
+bool TreeAfterFailures::writeWithFault(Write write, Options options, InjectedFault fault, std::size_t call) {
     auto const twin = openTree(volume->copy(1), options);
     write(*twin);
     auto const after = contentOfTree(*twin);
@@ -120,9 +120,9 @@ bool TreeAfterFailures::writeWithTrouble(Write write, Options options, Trouble t
     auto const listener = std::make_shared<Listener>();
     tree->subscribe(listener);
     auto const before = contentOfTree(*tree);
-    SCOPED_TRACE("trouble at call " + std::to_string(call));
+    SCOPED_TRACE("fault at call " + std::to_string(call));
 
-    now->plan(trouble, call);
+    now->plan(fault, call);
     std::optional<StoreError> failure;
     try {
         write(*tree);
@@ -135,7 +135,7 @@ bool TreeAfterFailures::writeWithTrouble(Write write, Options options, Trouble t
     EXPECT_EQ(found, contentOfTree(*tree));
     if (!failure) {
         EXPECT_EQ(after, found);
-        return !now->troubled().empty();
+        return !now->faulted().empty();
     }
     ++failures;
     reversals += listener->removals;

@@ -61,7 +61,7 @@ Costs costsOf(std::string const& text, Work const& work) {
     return {allocated.peak(), allocated.total(), cpuSeconds() - before};
 }
 
-/// What is done with a text that somebody else made.
+/// The operations on a text from an untrusted clone.
 struct Work {
     char const* name;
     void (*run)(std::string const& text);
@@ -87,20 +87,20 @@ void merge(std::string const& text) {
         stores::mergeTexts("", text, text);
         stores::mergeTexts(text, ProjectText::empty().body(), text);
     } catch (stores::StoreError const&) {
-        // damaged ones are refused, and that may not cost more either
+        // damaged texts are refused, which must not cost more either
     }
 }
 
 constexpr Work allWork[] = {{"readAndList", readAndList}, {"writeAnew", writeAnew}, {"merge", merge}};
 
-/// How many of what makes it hostile a text has. The night takes more.
+/// The number of hostile elements in a text. The nightly run uses more.
 std::size_t usualCount() {
     constexpr std::size_t forEachSecond = 50;
     return forEachSecond * testSeconds(3);
 }
 
-/// Four times as much may take ten times as long at most: far more than what is linear does, and far less
-/// than the sixteen times of what is quadratic. A noisy machine gets several attempts.
+/// Four times the input may take at most ten times as long: far more than linear code needs, and far less
+/// than the sixteen times of quadratic code. A noisy machine gets several attempts.
 void expectNoMoreTime(Work const& work, std::string const& small, std::string const& large) {
     constexpr double tooShortToTell = 2e-3;
     double growth = 0;

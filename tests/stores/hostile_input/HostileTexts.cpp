@@ -36,7 +36,7 @@ std::string body(std::string_view lines) {
     return bodyOf({lines.substr(0, lines.size() - 1)});
 }
 
-/// Some lines in the same body, with these batches of one line each behind it.
+/// A body of some lines, with a tail of these batches of one line each.
 std::string withBatches(std::size_t count, std::string const& start, std::string const& line, bool chain) {
     std::string text = body(start);
     std::string anchor = sumOf(text);

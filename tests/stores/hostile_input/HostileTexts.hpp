@@ -7,11 +7,11 @@
 
 namespace project::test {
 
-/// A kind of text that somebody could make to wear a reader out: valid, half valid or nonsense.
+/// A kind of text that an attacker could use to exhaust a reader: valid, partly valid or nonsense.
 struct HostileText {
     char const* name;
 
-    /// A text with so many of what makes it hostile.
+    /// A text with this number of hostile elements.
     std::string (*make)(std::size_t count);
 
     friend void PrintTo(HostileText const& text, std::ostream* out) { *out << text.name; }

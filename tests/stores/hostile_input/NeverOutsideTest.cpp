@@ -32,7 +32,7 @@ std::string const linesThatLeadOutside = R"("../../outside.jsonl"
 {"at":["","..","..",""],"keys":{"..":"../.."}}
 )";
 
-/// A project from an untrusted clone, whose text and folder try to lead outside.
+/// A project from an untrusted clone, with a text and a folder that try to lead outside.
 class NeverOutside : public ::testing::Test {
 protected:
     NeverOutside() {
@@ -62,14 +62,15 @@ protected:
     }
 
     std::unique_ptr<TextBackend> open() const {
-        TextBackend::Options const options{std::chrono::milliseconds(20), 0, 1};
+        TextBackend::Options const options{
+            .patience = std::chrono::milliseconds(20), .alwaysRewritten = 0, .bodyToTail = 1};
         return std::make_unique<TextBackend>(
             stores::makeSystemDisk(fl::filesystem::fromSystem(root()), stores::TextBackend::folderName),
             options);
     }
 
-    /// What was called for a place that is not the store's. The root is opened to find the folder in it, and
-    /// the kernel is asked who holds a lock.
+    /// The calls for places outside the store. Allowed are opening the root, to find the folder in it, and
+    /// asking the kernel for a lock holder.
     std::set<std::string> strays(RecordedCalls const& recorded) const {
         std::set<std::string> found;
         std::string const inside = store().string() + "/";
@@ -84,7 +85,7 @@ protected:
         return found;
     }
 
-    /// Runs a call, and looks that it has called the system, and for nothing outside.
+    /// Runs a call and checks that it called the system, and only for places in the store.
     template <typename Call>
     void expectInside(Call const& call) const {
         RecordedCalls const recorded;

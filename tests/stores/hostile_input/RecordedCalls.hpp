@@ -5,9 +5,9 @@
 
 namespace project::test {
 
-/// Notes all that the code of this program opens, makes, changes the name of or removes while it lives, as
-/// the kernel names it: the folder that is really open, and what was asked for in it. The program must be
-/// linked with the options that lead these calls here.
+/// Records every file and folder that the code of this program opens, creates, renames or deletes while the
+/// object lives, by the kernel's name of the open folder and the name in it. The program must be linked with
+/// the options that redirect these calls.
 class RecordedCalls {
 public:
     RecordedCalls();

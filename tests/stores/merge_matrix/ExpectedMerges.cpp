@@ -4,7 +4,7 @@
 
 #include <gtest/gtest.h>
 
-#include "stores/MergeSamples.hpp"
+#include "stores/merge/MergeSamples.hpp"
 
 namespace project::test {
 
@@ -17,12 +17,12 @@ namespace {
 struct Conflict {
     char const* ours;
     char const* theirs;
-    char const* told;
+    char const* description;
 };
 
 constexpr char const* kindAddress = R"("Categories","Root","Category","c-kind")";
 
-/// The pairs that exclude each other. All others merge clean.
+/// The pairs that conflict. All others merge without conflicts.
 std::vector<Conflict> const& conflicts() {
     static std::string const deleted =
         std::string("Subtree at ") + kindAddress + ", removed by ours, changed ";
@@ -97,11 +97,12 @@ void collect(ProjectText const& text, Address const& parent, std::string& conten
     }
 }
 
-std::string exchanged(std::string told) {
-    for (auto at = told.find("removed by ours"); at != told.npos; at = told.find("removed by ours", at)) {
-        told.replace(at, std::string("removed by ours").size(), "removed by theirs");
+std::string exchanged(std::string description) {
+    for (auto at = description.find("removed by ours"); at != description.npos;
+         at = description.find("removed by ours", at)) {
+        description.replace(at, std::string("removed by ours").size(), "removed by theirs");
     }
-    return told;
+    return description;
 }
 
 } // namespace
@@ -118,10 +119,10 @@ ExpectedMerges::ExpectedMerges() : common_(project_.after({}, makeCommonProject)
 std::string ExpectedMerges::conflict(std::string const& ours, std::string const& theirs) {
     for (auto const& conflict : conflicts()) {
         if (conflict.ours == ours && conflict.theirs == theirs) {
-            return conflict.told;
+            return conflict.description;
         }
         if (conflict.ours == theirs && conflict.theirs == ours) {
-            return exchanged(conflict.told);
+            return exchanged(conflict.description);
         }
     }
     return {};

@@ -16,7 +16,7 @@ class ExpectedMerges {
 public:
     ExpectedMerges();
 
-    /// The conflict of two changes, told as tests of merging tell it; empty when they merge clean.
+    /// The description of the conflict of two changes; empty when they merge without a conflict.
     static std::string conflict(std::string const& ours, std::string const& theirs);
 
     /// The pairs of names that these tables make exceptions of.

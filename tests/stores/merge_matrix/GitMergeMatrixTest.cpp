@@ -32,7 +32,7 @@ public:
     MergingRepository() {
         ProgramSettings settings;
         settings.folder = folder_.onDisk();
-        auto const result = runProgram({PROJECTCTL, "init"}, settings); // which tells git of the driver
+        auto const result = runProgram({PROJECTCTL, "init"}, settings); // which sets up the merge driver
         EXPECT_EQ(result.exitCode, 0) << result.errors;
     }
 

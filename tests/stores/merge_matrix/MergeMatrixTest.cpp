@@ -14,7 +14,7 @@
 #include "project/files/LabelIDSet.hpp"
 #include "project/labels/Label.hpp"
 #include "project/stores/TextMerge.hpp"
-#include "stores/MergeSamples.hpp"
+#include "stores/merge/MergeSamples.hpp"
 #include "stores/merge_matrix/ExpectedMerges.hpp"
 
 namespace project::test {
@@ -31,7 +31,7 @@ protected:
     void expectMerged(std::string const& ours, std::string const& theirs, NamedChange const& other) const {
         auto const merge = mergeTexts(common, ours, theirs);
         auto const expected = ExpectedMerges::conflict(GetParam().name, other.name);
-        ASSERT_EQ(told(merge.conflicts()), expected);
+        ASSERT_EQ(described(merge.conflicts()), expected);
         if (expected.empty()) {
             merges.expectBoth(merge.text(), GetParam(), other);
         }
@@ -66,7 +66,7 @@ TEST_P(MergeMatrix, mergesTheSameFromVersionsWithTails) {
         auto const merge = mergeTexts(common, ours, theirs);
         auto const withTail = mergeTexts(common, oursWithTail, theirs);
         EXPECT_EQ(merge.textWithMarkers(), withTail.textWithMarkers());
-        EXPECT_EQ(told(merge.conflicts()), told(withTail.conflicts()));
+        EXPECT_EQ(described(merge.conflicts()), described(withTail.conflicts()));
         EXPECT_TRUE(readWhole(withTail.text({merge.conflicts().size(), MergeSide::Ours})).isTidy());
     }
 }
@@ -105,7 +105,7 @@ protected:
 
 TEST_F(MergeOfNewProjects, hasTheFilesOfBoth) {
     auto const merge = mergeTexts({}, make(u"Pumps", u"src/one.cpp"), make(u"Pumps", u"src/two.cpp"));
-    ASSERT_EQ(told(merge.conflicts()), "");
+    ASSERT_EQ(described(merge.conflicts()), "");
     auto const both = project.after({}, [](ProjectManager& it, TemporaryFolder const& folder) {
         it.create(u"Pumps");
         it.getFileManager().add({folder.path(u"src/one.cpp"), folder.path(u"src/two.cpp")});
@@ -115,7 +115,7 @@ TEST_F(MergeOfNewProjects, hasTheFilesOfBoth) {
 
 TEST_F(MergeOfNewProjects, leavesTwoNamesToAPerson) {
     auto const merge = mergeTexts({}, make(u"Pumps", u"new.txt"), make(u"Station", u"new.txt"));
-    ASSERT_EQ(told(merge.conflicts()), R"(Key Name at "Info","ProjectData")");
+    ASSERT_EQ(described(merge.conflicts()), R"(Key Name at "Info","ProjectData")");
     EXPECT_EQ(merge.text({MergeSide::Theirs}), make(u"Station", u"new.txt"));
 }
 
@@ -143,7 +143,7 @@ TEST(MergeOfLabels, leavesTwoLabelsOfASingleValuedCategoryOnTheFile) {
         });
     };
     auto const merge = mergeTexts(common, labelled(u"l-draft"), labelled(u"l-final"));
-    ASSERT_EQ(told(merge.conflicts()), "");
+    ASSERT_EQ(described(merge.conflicts()), "");
     project.after(merge.text(), [](ProjectManager& it, TemporaryFolder const& folder) {
         EXPECT_EQ(it.getFileManager().getLabelIDSets(folder.path(u"main.cpp")).size(), 2U);
     });

@@ -77,7 +77,7 @@ Action unlabelling(std::u16string const& path, Label const& label) {
     };
 }
 
-/// What is done with one of the managers alone.
+/// Changes through one of the managers.
 template <typename Manager, typename Call>
 Action with(Manager& (ProjectManager::*manager)(), Call const& call) {
     return [manager, call](ProjectManager& project, TemporaryFolder const&) { call((project.*manager)()); };

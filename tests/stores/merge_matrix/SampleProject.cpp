@@ -48,7 +48,7 @@ std::string SampleProject::after(std::string const& text, Action const& action, 
                                                                      folder_.path(TextBackend::folderName));
     management::ProjectManagerBase project(folder_.root(), store);
     action(project, folder_);
-    return volume->content(textFile); // before the store is closed, which takes in the tail
+    return volume->content(textFile); // before the store is closed, which tidies it
 }
 
 std::optional<std::string> SampleProject::afterIfAllowed(std::string const& text,

@@ -16,6 +16,7 @@
 #include "support/NightlyScale.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/TextStore.hpp"
+#include "support/Waiting.hpp"
 
 namespace project::test {
 
@@ -30,8 +31,8 @@ constexpr std::size_t filesInFolder = 16;
 constexpr std::size_t groups = 4;
 constexpr std::size_t inGroup = folders / groups;
 
-/// Three files at the beginning, in the middle and at the end of the text. Every batch of a writer gives all
-/// of them one value.
+/// Three files at the beginning, in the middle and at the end of the text. Every batch of a writer sets all
+/// of them to the same value.
 std::vector<std::u16string> const marked{u"a", u"folder100/marked", u"z"};
 
 std::u16string folderName(std::size_t number) {
@@ -39,7 +40,8 @@ std::u16string folderName(std::size_t number) {
     return u"folder" + std::u16string(digits.begin(), digits.end());
 }
 
-/// One of the files that are in a project all together or not at all, spread over the whole text.
+/// A file of a group. The files of a group are all in a project or none is; they are spread over the whole
+/// text.
 Address inGroupOf(std::size_t group, std::size_t index) {
     return fileAddress(folderName(index * groups + group) + u"/of a group");
 }
@@ -60,23 +62,23 @@ Batch valueOfMarked(std::u16string const& value) {
     return batch;
 }
 
-/// What the processes tell.
+/// The counts of all processes.
 struct Tally {
     std::atomic<bool> stop;
     std::atomic<unsigned> looks;     ///< guards of readers
-    std::atomic<unsigned> others;    ///< of them, those that showed something else than the one before
+    std::atomic<unsigned> others;    ///< of them, those that differed from the one before
     std::atomic<unsigned> written;   ///< batches
     std::atomic<unsigned> refused;   ///< batches, with an error
     std::atomic<unsigned> gitDid;    ///< commands
-    std::atomic<unsigned> gitFailed; ///< commands, because of what writers had changed, or in conflicts
-    std::array<char, 400> wrong;     ///< what a process found that must not be
+    std::atomic<unsigned> gitFailed; ///< commands, because of changes of the writers or conflicts
+    std::array<char, 400> wrong;     ///< the first violation that a process found
 };
 
-/// What one look at a project shows of it.
+/// The state of a project that one guard shows.
 struct Sight {
-    std::array<std::size_t, groups> groupFiles; ///< how many are there
+    std::array<std::size_t, groups> groupFiles; ///< how many exist
     std::array<std::u16string, 3> values;
-    std::size_t others; ///< files that are in every version, of a sample
+    std::size_t others; ///< of a sample of files that are in every version
 
     friend bool operator==(Sight const&, Sight const&) = default;
 };
@@ -98,7 +100,7 @@ Sight lookAt(TreeMetadataManager& store) {
     return sight;
 }
 
-/// What of it belongs to no version that was ever whole; empty when all of it does.
+/// The part that no complete version contained; empty when there is none.
 std::string wrongWith(Sight const& sight) {
     if (sight.others != folders / 20) {
         return "files are missing that are in every version: " + std::to_string(sight.others);
@@ -115,8 +117,8 @@ std::string wrongWith(Sight const& sight) {
     return {};
 }
 
-/// A repository with a project in several versions: main has group 0, each other branch one more, two of them
-/// in batches behind the text. Git, readers and writers work on it at the same time.
+/// A repository with a project in several versions: main has group 0, and each other branch has one more
+/// group, two of them in the tail. Git, readers and writers work on it at the same time.
 class Checkouts : public testing::Test {
 protected:
     void SetUp() override {
@@ -183,11 +185,14 @@ protected:
         }
     }
 
+    unsigned othersSteps() const { return tally->written + tally->gitDid; }
+
     Sight readTwice(TreeMetadataManager& store) const {
         auto const guard = store.acquireReadLock();
         auto const sight = lookAt(store);
         require(sight);
-        std::this_thread::sleep_for(1ms);
+        auto const before = othersSteps();
+        comesTrue([&] { return othersSteps() != before; }, 5ms); // best after a change by another process
         if (lookAt(store) != sight) {
             throw std::runtime_error("what a guard shows has changed under it");
         }
@@ -195,7 +200,8 @@ protected:
         return sight;
     }
 
-    /// Gives the three marked files another value. That may be refused, but it is never done by half.
+    /// Sets the three marked files to another value. The write may be refused, but it is never applied
+    /// partially.
     void write(TreeMetadataManager& store, std::mt19937& ownRandom) const {
         auto const digits = std::to_string(ownRandom());
         std::map<Address, std::shared_ptr<metadata::MetadataNode>> nodes;
@@ -208,7 +214,7 @@ protected:
             store.setNodes(nodes);
             ++tally->written;
         } catch (StoreError const& error) {
-            // What git makes of these versions may be a conflict, but is never a text that nobody wrote.
+            // Git may leave a conflict, but never a damaged text.
             if (error.kind() == StoreError::Kind::Damaged) {
                 throw;
             }

@@ -6,7 +6,7 @@
 #include <random>
 #include <thread>
 
-#include "OneOrder.hpp"
+#include "Linearizability.hpp"
 #include "SharedMemory.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/SystemDisk.hpp"
@@ -29,25 +29,25 @@ using Kind = Operation::Kind;
 struct Record {
     std::uint64_t begin;
     std::uint64_t end;  ///< 0 as long as it goes on
-    std::uint64_t died; ///< when its process was known to be dead; 0 when it ended
+    std::uint64_t died; ///< when its process was known to be dead; 0 when the operation ended
     Operation operation;
 };
 
-/// What one process after another does. The last record stands when its process is killed.
+/// The operations of consecutive processes. The last record stays when its process is killed.
 struct Lane {
     static constexpr std::uint32_t most = 1U << 16U;
 
     std::atomic<std::uint32_t> count;
     std::array<Record, most> records;
-    std::array<char, 400> error; ///< why its process ended before its time
+    std::array<char, 400> error; ///< why its process ended early
 };
 
-/// What all processes share.
+/// The memory that all processes share.
 struct History {
     std::atomic<bool> stop;
     std::atomic<std::uint64_t> clock;
     std::atomic<std::uint32_t> values;
-    std::array<Lane, OneOrder::lanes> lanes;
+    std::array<Lane, Linearizability::lanes> lanes;
 };
 
 Address addressOfSlot(std::size_t slot) {
@@ -68,7 +68,7 @@ std::uint32_t valueAt(TreeMetadataManager& store, std::size_t slot) {
     return static_cast<std::uint32_t>(std::stoul(std::string(text.begin(), text.end())));
 }
 
-/// What one guard shows.
+/// The values that one guard shows.
 Slots readSlots(TreeMetadataManager& store, std::mt19937& random) {
     auto const guard = store.acquireReadLock();
     std::array<std::size_t, Slots::count> order{0, 1, 2, 3, 4, 5, 6, 7, 8};
@@ -85,7 +85,7 @@ Slots readSlots(TreeMetadataManager& store, std::mt19937& random) {
     return seen;
 }
 
-/// A process that does random operations with a store of its own.
+/// A process that runs random operations on its own store object.
 class RandomProcess {
 public:
     RandomProcess(Path root, History& history, Lane& lane, std::mt19937::result_type seed)
@@ -108,9 +108,11 @@ private:
     std::uint32_t below(std::uint32_t limit) { return static_cast<std::uint32_t>(random_() % limit); }
 
     void open() {
-        // Some write each batch behind the text, some all of it anew.
+        // Some append each batch, some rewrite the text.
         auto const options =
-            below(3) > 0 ? TextBackend::Options{60s, 0, 1} : TextBackend::Options{60s, 1U << 20U, 16};
+            below(3) > 0
+                ? TextBackend::Options{.patience = 60s, .alwaysRewritten = 0, .bodyToTail = 1}
+                : TextBackend::Options{.patience = 60s, .alwaysRewritten = 1U << 20U, .bodyToTail = 16};
         auto backend =
             std::make_unique<TextBackend>(stores::makeSystemDisk(root_, TextBackend::folderName), options);
         backend_ = backend.get();
@@ -140,7 +142,7 @@ private:
             (1U << below(Slots::count)) | (1U << below(Slots::count)) | (1U << below(Slots::count)));
         auto const kind = choice < 7 ? Kind::Set : choice < 9 ? Kind::Remove : Kind::Make;
         bool const readsFirst = below(4) > 0;
-        // Whether it has seen anything is told when it has, or a death in between would tell of nothing seen.
+        // Set only after the read: a process that dies during the read has seen nothing.
         auto& record = begin({kind, false, mask, ++history_.values, {}});
         auto const guard = store_->acquireWriteLock();
         if (readsFirst) {
@@ -191,7 +193,7 @@ private:
     std::unique_ptr<TreeMetadataManager> store_;
 };
 
-/// A begin or an end of a record.
+/// The begin or the end of a record.
 struct Moment {
     std::uint64_t time;
     std::size_t lane;
@@ -200,11 +202,11 @@ struct Moment {
 
 std::vector<Moment> momentsOf(History const& history) {
     std::vector<Moment> moments;
-    for (std::size_t lane = 0; lane < OneOrder::lanes; ++lane) {
+    for (std::size_t lane = 0; lane < Linearizability::lanes; ++lane) {
         for (std::uint32_t index = 0; index < history.lanes[lane].count; ++index) {
             auto const& record = history.lanes[lane].records[index];
             if (record.operation.kind == Kind::Read && record.end == 0) {
-                continue; // nobody knows what it would have seen
+                continue; // the values that it saw are unknown
             }
             moments.push_back({record.begin, lane, &record});
             moments.push_back({record.end != 0 ? record.end : record.died, lane, &record});
@@ -215,10 +217,10 @@ std::vector<Moment> momentsOf(History const& history) {
     return moments;
 }
 
-/// The first operation, by its lane and its moments, at whose end there is no order of all that has happened.
-/// Empty when there is one of all.
-std::string findWithoutOrder(History const& history) {
-    OneOrder order(Slots{});
+/// The first operation, by its lane and its moments, after which the history is not linearizable. Empty when
+/// the whole history is.
+std::string findNonLinearizable(History const& history) {
+    Linearizability order(Slots{});
     for (auto const& moment : momentsOf(history)) {
         auto const& record = *moment.record;
         if (moment.time == record.begin) {
@@ -240,8 +242,8 @@ protected:
         commit(backend, addFiles(manyFiles(100)));
     }
 
-    /// What can be read does not tell an address that was made from one that only has something below it, so
-    /// each round begins with nothing in the slots.
+    /// A reader cannot distinguish a created address from one that only has children, so each round begins
+    /// with empty slots.
     void emptySlots() {
         TreeMetadataManager store(
             std::make_unique<TextBackend>(stores::makeSystemDisk(root.path(), TextBackend::folderName)),
@@ -260,7 +262,7 @@ protected:
         });
     }
 
-    /// Ends a process where it happens to be, and starts another one in its place.
+    /// Kills a process at a random moment, and starts another one.
     void killOne(History& history, std::vector<std::unique_ptr<ChildProcess>>& processes) {
         auto const lane = random() % processes.size();
         processes[lane]->kill();
@@ -276,7 +278,7 @@ protected:
         history->values = lastValue;
         emptySlots();
         std::vector<std::unique_ptr<ChildProcess>> processes;
-        for (std::size_t lane = 0; lane < OneOrder::lanes; ++lane) {
+        for (std::size_t lane = 0; lane < Linearizability::lanes; ++lane) {
             processes.push_back(start(*history, lane));
         }
         auto const end = std::chrono::steady_clock::now() + time;
@@ -288,11 +290,11 @@ protected:
             }
         }
         history->stop = true;
-        for (std::size_t lane = 0; lane < OneOrder::lanes; ++lane) {
+        for (std::size_t lane = 0; lane < Linearizability::lanes; ++lane) {
             EXPECT_TRUE(processes[lane]->join()) << history->lanes[lane].error.data();
             operations += history->lanes[lane].count;
         }
-        EXPECT_EQ("", findWithoutOrder(*history));
+        EXPECT_EQ("", findNonLinearizable(*history));
         lastValue = history->values;
     }
 
@@ -302,7 +304,7 @@ protected:
         while (std::chrono::steady_clock::now() < end && !HasFailure()) {
             runRound(std::min<std::chrono::milliseconds>(usual, 2s), withDeaths);
         }
-        std::cout << operations << " operations of " << OneOrder::lanes << " processes, " << deaths
+        std::cout << operations << " operations of " << Linearizability::lanes << " processes, " << deaths
                   << " deaths\n";
         EXPECT_GT(operations, 100U);
         if (HasFailure()) {
@@ -318,11 +320,11 @@ protected:
     std::uint64_t deaths = 0;
 };
 
-TEST_F(RandomOperations, ofManyProcessesHaveOneOrder) {
+TEST_F(RandomOperations, ofManyProcessesAreLinearizable) {
     runFor(1000ms, false);
 }
 
-TEST_F(RandomOperations, ofProcessesThatDieHaveOneOrder) {
+TEST_F(RandomOperations, ofProcessesThatDieAreLinearizable) {
     runFor(1000ms, true);
     EXPECT_GT(deaths, 0U);
 }

@@ -7,8 +7,8 @@
 
 namespace project::test {
 
-/// A value that the processes forked from this one share with it, all zeros at first. What one of them has
-/// written is there also when that one has been killed. Its constructor and destructor must have no effects.
+/// A value that this process shares with its forked children, initially all zeros. A value that a child has
+/// written stays after the child is killed. The type's constructor and destructor must have no effects.
 template <typename T>
 class SharedMemory {
 public:

@@ -13,10 +13,10 @@
 namespace project::session {
 namespace {
 
-/// Files that the slots of a session's events were given, on whatever threads.
-class ToldFiles {
+/// The files that a session's events reported, on any thread.
+class ReportedFiles {
 public:
-    explicit ToldFiles(Session& session) {
+    explicit ReportedFiles(Session& session) {
         session.events()->onFileListUpdate([this](std::vector<Path> const& files) {
             std::lock_guard const guard(mutex_);
             files_.insert(files.begin(), files.end());
@@ -53,7 +53,7 @@ protected:
         return u"own " + std::u16string(1, static_cast<char16_t>(u'0' + owner));
     }
 
-    /// Two values that one thread gives the project in one step.
+    /// Two values that one thread sets in one step.
     static void nameInOneStep(Session& session) {
         for (int number = 0; number < filesOfEach; ++number) {
             auto const guard = session.store().acquireWriteLock();
@@ -84,7 +84,7 @@ TEST_F(ThreadsOnOneProject, loseNothingAndAreToldOfEverything) {
         }
     }
     session_.project().setDescription(u"Pump");
-    ToldFiles const told(session_);
+    ReportedFiles const reported(session_);
     std::atomic<int> names = 0;
     session_.events()->onNameChanged([&names] { ++names; });
 
@@ -94,7 +94,7 @@ TEST_F(ThreadsOnOneProject, loseNothingAndAreToldOfEverything) {
     for (int owner = 0; owner < sessionsOfTheirOwn; ++owner) {
         threads.push_back(start([this, owner] {
             auto own = Session::open(folder_.root(), withoutGit_);
-            ToldFiles const ownTold(own);
+            ReportedFiles const ownTold(own);
             addFiles(own, nameOf(owner));
             own.refresh();
             EXPECT_TRUE(ownTold.contains(fileOf(nameOf(owner), 0)));
@@ -122,7 +122,7 @@ TEST_F(ThreadsOnOneProject, loseNothingAndAreToldOfEverything) {
         for (int number = 0; number < filesOfEach; ++number) {
             auto const file = fileOf(who, number);
             EXPECT_TRUE(fresh.project().getFileManager().isFileInProject(file));
-            EXPECT_TRUE(told.contains(file));
+            EXPECT_TRUE(reported.contains(file));
         }
     }
     EXPECT_GE(names, filesOfEach);

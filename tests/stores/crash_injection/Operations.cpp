@@ -1,0 +1,182 @@
+#include "Operations.hpp"
+
+#include <algorithm>
+
+namespace project::test {
+
+namespace {
+
+std::vector<History> const withoutStore{History::NoStore, History::EmptyFolder, History::HalfMadeStore};
+std::vector<History> const withTail{History::LongBodyWithTail, History::LongBody};
+std::vector<History> const withStore{History::LongBody,   History::ShortBody,   History::LongBodyWithTail,
+                                     History::TornTail,   History::DeadWriters, History::Irregular,
+                                     History::MergeJoined};
+
+/// A process that has read the project, or has not.
+std::unique_ptr<TextBackend> openPerhapsRead(Situation const& situation, Choices& choices) {
+    auto backend = open(situation);
+    if (choices.oneIn(2)) {
+        contentOf(*backend);
+    }
+    return backend;
+}
+
+StoreOperation committing(Situation const& situation, std::unique_ptr<TextBackend> backend,
+                          Choices& choices) {
+    auto const batch = choices.batch(situation.content);
+    return {std::move(backend), [batch](StoreOperation& operation) { commit(*operation.backend, batch); },
+            applied(situation.content, batch)};
+}
+
+StoreOperation commitABatch(Situation& situation, Choices& choices) {
+    return committing(situation, openPerhapsRead(situation, choices), choices);
+}
+
+/// A batch that is small enough to be appended to a long body.
+StoreOperation appendABatch(Situation& situation, Choices& choices) {
+    Batch const batch{set(fileAddress(u"appended"))};
+    return {openPerhapsRead(situation, choices),
+            [batch](StoreOperation& operation) { commit(*operation.backend, batch); },
+            applied(situation.content, batch)};
+}
+
+StoreOperation commitAfterOthers(Situation& situation, Choices& choices) {
+    auto backend = open(situation);
+    contentOf(*backend);
+    letAnotherWrite(situation, choices.options(), choices);
+    return committing(situation, std::move(backend), choices);
+}
+
+StoreOperation commitAgain(Situation& situation, Choices& choices) {
+    auto operation = commitABatch(situation, choices);
+    operation.perform(operation);
+    situation.content = operation.after;
+    situation.notDurable.clear();
+    return committing(situation, std::move(operation.backend), choices);
+}
+
+/// A writer that finds the folder locked.
+StoreOperation commitWhileLocked(Situation& situation, Choices& choices) {
+    auto operation = commitABatch(situation, choices);
+    operation.other = std::make_unique<CrashingDisk>(situation.volume);
+    operation.other->openFolder();
+    operation.other->lock(std::chrono::milliseconds(1));
+    operation.isRefused = true;
+    return operation;
+}
+
+StoreOperation discardABatch(Situation& situation, Choices& choices) {
+    auto const batch = choices.batch(situation.content);
+    auto const perform = [batch](StoreOperation& operation) {
+        Entered const entered(*operation.backend, Access::Write);
+        try {
+            operation.backend->write(batch);
+        } catch (...) {
+            operation.backend->discard();
+            throw;
+        }
+        operation.backend->discard(); // as when a listener throws
+    };
+    return {openPerhapsRead(situation, choices), perform, situation.content};
+}
+
+StoreOperation tidyUp(Situation& situation, Choices& choices) {
+    return {openPerhapsRead(situation, choices), [](StoreOperation& operation) { operation.backend->tidy(); },
+            situation.content};
+}
+
+StoreOperation closeWithATail(Situation& situation, Choices& choices) {
+    auto operation = commitAgain(situation, choices);
+    operation.perform = [](StoreOperation& closed) { closed.backend.reset(); };
+    operation.after = situation.content;
+    return operation;
+}
+
+StoreOperation repairDamage(Situation& situation, Choices& choices) {
+    return {openPerhapsRead(situation, choices),
+            [](StoreOperation& operation) { operation.backend->repair(); }, situation.content};
+}
+
+StoreOperation settleAConflict(Situation& situation, Choices& choices) {
+    return {openPerhapsRead(situation, choices),
+            [text = situation.settled](StoreOperation& operation) { operation.backend->resolve(text); },
+            stores::samples::contentOf(stores::samples::readWhole(situation.settled))};
+}
+
+StoreOperation looking(Situation const& situation, std::unique_ptr<TextBackend> backend) {
+    return {std::move(backend),
+            [](StoreOperation& operation) { operation.seen = contentOf(*operation.backend); },
+            situation.content};
+}
+
+StoreOperation lookForTheFirstTime(Situation& situation, Choices& /*choices*/) {
+    return looking(situation, open(situation));
+}
+
+StoreOperation lookAgain(Situation& situation, Choices& /*choices*/) {
+    auto backend = open(situation);
+    contentOf(*backend);
+    return looking(situation, std::move(backend));
+}
+
+StoreOperation lookAfterOthers(Situation& situation, Choices& choices) {
+    auto backend = open(situation);
+    contentOf(*backend);
+    letAnotherWrite(situation, choices.options(), choices);
+    return looking(situation, std::move(backend));
+}
+
+StoreOperation checkForFaults(Situation& situation, Choices& choices) {
+    return {openPerhapsRead(situation, choices),
+            [](StoreOperation& operation) { operation.backend->check(); }, situation.content};
+}
+
+std::vector<History> everywhere() {
+    auto histories = withStore;
+    histories.insert(histories.end(), withoutStore.begin(), withoutStore.end());
+    histories.insert(histories.end(), {History::Damaged, History::Conflict});
+    return histories;
+}
+
+} // namespace
+
+std::vector<OperationKind> const& operationKinds() {
+    static std::vector<OperationKind> const kinds{
+        {"append", {History::LongBody}, true, appendABatch},
+        {"commit", withStore, true, commitABatch},
+        {"create", withoutStore, true, commitABatch},
+        {"commit after others", withStore, true, commitAfterOthers},
+        {"commit again", withStore, true, commitAgain},
+        {"commit while locked", withStore, false, commitWhileLocked},
+        {"discard", withStore, false, discardABatch},
+        {"discard creation", {History::NoStore}, false, discardABatch},
+        {"discard in a folder", {History::EmptyFolder, History::HalfMadeStore}, false, discardABatch},
+        {"tidy", withStore, false, tidyUp},
+        {"close", withTail, false, closeWithATail},
+        {"repair", {History::Damaged}, true, repairDamage},
+        {"settle", {History::Conflict}, true, settleAConflict},
+        {"first look", everywhere(), false, lookForTheFirstTime},
+        {"look again", everywhere(), false, lookAgain},
+        {"look after others", withStore, false, lookAfterOthers},
+        {"check", everywhere(), false, checkForFaults},
+    };
+    return kinds;
+}
+
+std::vector<OperationKind> recoveriesOf(History history) {
+    OperationKind const look{"first look", {}, false, lookForTheFirstTime};
+    switch (history) {
+    case History::Damaged:
+        return {{"repair", {}, true, repairDamage}, look};
+    case History::Conflict:
+        return {look}; // the conflict is already resolved, or the process that died was to resolve it
+    default:
+        return {{"commit", {}, true, commitABatch},
+                {"commit", {}, true, commitABatch},
+                {"discard", {}, false, discardABatch},
+                {"tidy", {}, false, tidyUp},
+                look};
+    }
+}
+
+} // namespace project::test

@@ -1,0 +1,418 @@
+#include <algorithm>
+#include <array>
+#include <ostream>
+#include <stdexcept>
+#include <tuple>
+#include <utility>
+
+#include <rapidcheck.h>
+
+#include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
+#include "support/TextGenerators.hpp"
+#include "support/TextStore.hpp"
+
+namespace project::test {
+
+namespace {
+
+using metadata::MetadataNode;
+using metadata::MetadataNodeSpecification;
+using stores::Node;
+using stores::TreeMetadataManager;
+using stores::samples::described;
+
+/// Fails the case, inside of rapidcheck and outside.
+void require(bool holds, char const* what) {
+    if (!holds) {
+        throw std::logic_error(what);
+    }
+}
+
+std::string firstDifference(Content const& wanted, Content const& found) {
+    for (auto const& [from, other, meaning] :
+         {std::tuple(&wanted, &found, "it lacks "), std::tuple(&found, &wanted, "it has ")}) {
+        for (auto const& entry : *from) {
+            if (auto const same = other->find(entry.first); same == other->end() || *same != entry) {
+                return meaning + testing::PrintToString(entry);
+            }
+        }
+    }
+    return "nothing differs";
+}
+
+/// What a store has to hold, as plainly as it can be said.
+class Model {
+public:
+    void set(std::map<Address, Node> const& nodes) {
+        for (auto const& [address, node] : nodes) {
+            content_[address] = described(node);
+        }
+    }
+
+    void remove(std::vector<Address> const& addresses) {
+        std::erase_if(content_, [&](auto const& entry) {
+            return std::any_of(addresses.begin(), addresses.end(),
+                               [&](Address const& address) { return entry.first.isWithin(address); });
+        });
+    }
+
+    void make(std::vector<Address> const& addresses) {
+        auto after = content_;
+        for (auto const& address : addresses) {
+            if (!exists(address)) {
+                after.emplace(address, "made");
+            }
+        }
+        content_ = std::move(after);
+    }
+
+    bool exists(Address const& address) const {
+        return std::any_of(content_.begin(), content_.end(),
+                           [&](auto const& entry) { return entry.first.isWithin(address); });
+    }
+
+    Content const& content() const { return content_; }
+
+private:
+    Content content_;
+};
+
+/// Everything that a tree answers, by the questions that managers ask.
+void ask(TreeMetadataManager& tree, Address const& address, Content& content) {
+    for (auto const& child : tree.getChildNodes(address)) {
+        require(tree.pathExists(child), "a child does not exist");
+        auto const node = tree.getNode(child);
+        require((node != nullptr) == tree.hasNode(child), "hasNode and getNode differ");
+        auto const before = content.size();
+        ask(tree, child, content);
+        if (node) {
+            content.emplace(child, described(*node));
+        } else if (content.size() == before) {
+            content.emplace(child, "made"); // nothing but having been made keeps it
+        }
+    }
+}
+
+/// What ask gives for a content: of addresses that were made, those below which there is something don't
+/// show.
+Content visible(Content const& content) {
+    Content result;
+    for (auto entry = content.begin(); entry != content.end(); ++entry) {
+        auto const next = std::next(entry);
+        bool const isAbove = next != content.end() && next->first.isWithin(entry->first);
+        if (entry->second != "made" || !isAbove) {
+            result.insert(*entry);
+        }
+    }
+    return result;
+}
+
+struct Step {
+    enum class Kind { Set, Remove, Make, Reopen, Tidy, Look, PowerCut };
+
+    Kind kind;
+    std::size_t process; ///< which of the processes does it
+    std::map<Address, Node> nodes;
+    std::vector<Address> addresses;
+    CrashingVolume::InjectedFault fault;
+    std::size_t callsBefore; ///< the fault
+};
+
+void showValue(Step const& step, std::ostream& out) {
+    constexpr char const* kinds[] = {"Set", "Remove", "Make", "Reopen", "Tidy", "Look", "PowerCut"};
+    constexpr char const* faults[] = {"", "fails", "fails for good", "dies"};
+    out << kinds[static_cast<int>(step.kind)] << " by " << step.process;
+    if (step.fault != CrashingVolume::InjectedFault::None) {
+        out << ", " << faults[static_cast<int>(step.fault)] << " after " << step.callsBefore << " calls";
+    }
+    for (auto const& [address, node] : step.nodes) {
+        out << "\n    " << testing::PrintToString(address) << " = " << described(node);
+    }
+    for (auto const& address : step.addresses) {
+        out << "\n    " << testing::PrintToString(address);
+    }
+    out << "\n";
+}
+
+rc::Gen<Step> anyStep() {
+    using Kind = Step::Kind;
+    using InjectedFault = CrashingVolume::InjectedFault;
+    auto const nodes = rc::gen::map(
+        stores::samples::fewOf(6, rc::gen::pair(stores::samples::anyAddress(), stores::samples::anyNode())),
+        [](auto const& pairs) { return std::map<Address, Node>(pairs.begin(), pairs.end()); });
+    return rc::gen::build<Step>(
+        rc::gen::set(&Step::kind, rc::gen::weightedElement<Kind>({{10, Kind::Set},
+                                                                  {4, Kind::Remove},
+                                                                  {2, Kind::Make},
+                                                                  {1, Kind::Reopen},
+                                                                  {1, Kind::Tidy},
+                                                                  {2, Kind::Look},
+                                                                  {1, Kind::PowerCut}})),
+        rc::gen::set(&Step::process, rc::gen::inRange<std::size_t>(0, 2)), rc::gen::set(&Step::nodes, nodes),
+        rc::gen::set(&Step::addresses, stores::samples::fewOf(3, stores::samples::anyAddress())),
+        rc::gen::set(&Step::fault, rc::gen::weightedElement<InjectedFault>({{12, InjectedFault::None},
+                                                                            {2, InjectedFault::Fails},
+                                                                            {1, InjectedFault::FailsForGood},
+                                                                            {3, InjectedFault::Dies}})),
+        rc::gen::set(&Step::callsBefore, rc::gen::inRange<std::size_t>(0, 25)));
+}
+
+/// True for the errors after which the outcome is unknown.
+/// Two processes on one project, and what the project has to hold.
+class Processes {
+public:
+    Processes(TextBackend::Options options, unsigned seed)
+        : options_(options), volume_(std::make_shared<CrashingVolume>(seed)) {
+        reopen(0);
+        reopen(1);
+    }
+
+    void take(Step const& step) {
+        volume_->advance(3'000'000); // so that some steps share a tick and some don't
+        volume_->plan(step.fault, step.callsBefore);
+        Model after = model_;
+        bool isDone = false;
+        bool hasDied = false;
+        bool isUnknown = false;
+        try {
+            perform(step, after);
+            isDone = true;
+        } catch (StoreError const& error) {
+            require(step.fault != CrashingVolume::InjectedFault::None, error.what());
+            isUnknown = error.kind() == StoreError::Kind::OutcomeUnknown;
+        } catch (ProcessDied const&) {
+            hasDied = true;
+        }
+        volume_->cancelPlan();
+        if (isDone && after.content() != model_.content()) {
+            model_ = after;
+            notDurable_.clear();
+        }
+        if (step.kind == Step::Kind::PowerCut || (hasDied && step.callsBefore % 2 == 0)) {
+            cutPower(after);
+        } else if (hasDied || isUnknown) {
+            reopenDead(step.process);
+            settle(after);
+        }
+        check(step.process);
+        // A power cut can take the torn tail off an old text that lies beside the new one, and nobody knows
+        // it then.
+        require(hadPowerCut_ || volume_->namesLike("displaced-").empty(), "something was set aside");
+    }
+
+    /// Both processes close, and what is left is read and written by a third.
+    void finish() {
+        check(0);
+        check(1);
+        trees_[0].reset();
+        trees_[1].reset();
+        reopen(0);
+        check(0);
+        backends_[0]->tidy(); // a writer, so that what dead ones left goes
+        check(0);
+        for (auto const& name : volume_->names()) {
+            require(name == ".gitattributes" || name == ".gitignore" || name == "project.jsonl" ||
+                        (hadPowerCut_ && name.starts_with("displaced-")),
+                    "something was left in the folder");
+        }
+    }
+
+    CrashingVolume& disk() { return *volume_; }
+
+    /// How often it went each way, so that a test of nothing shows.
+    std::size_t appends() const { return volume_->count("append project.jsonl"); }
+
+    std::size_t rewrites() const { return volume_->count("exchange swapping project.jsonl"); }
+
+private:
+    void reopen(std::size_t process) {
+        trees_.at(process).reset();
+        auto backend = std::make_unique<TextBackend>(std::make_unique<CrashingDisk>(volume_), options_);
+        backends_.at(process) = backend.get();
+        trees_.at(process) =
+            std::make_unique<TreeMetadataManager>(std::move(backend), u"/project/.projectdata");
+    }
+
+    void perform(Step const& step, Model& after) {
+        auto& tree = *trees_.at(step.process);
+        auto addresses = step.addresses;
+        switch (step.kind) {
+        case Step::Kind::Set: {
+            std::map<Address, std::shared_ptr<MetadataNode>> nodes;
+            for (auto const& [address, node] : step.nodes) {
+                nodes.emplace(address, std::make_shared<MetadataNodeSpecification>(*node));
+            }
+            after.set(step.nodes);
+            tree.setNodes(nodes);
+            break;
+        }
+        case Step::Kind::Remove:
+            after.remove(step.addresses);
+            tree.removeNodes(addresses);
+            break;
+        case Step::Kind::Make:
+            after.make(step.addresses);
+            tree.createPaths(addresses);
+            break;
+        case Step::Kind::Reopen:
+            reopen(step.process);
+            break;
+        case Step::Kind::Tidy:
+            backends_.at(step.process)->tidy();
+            break;
+        case Step::Kind::Look:
+            static_cast<void>(tree.pathExists(fileAddress(u"a")));
+            break;
+        case Step::Kind::PowerCut:
+            break;
+        }
+    }
+
+    /// The process is gone: nothing that it does while its objects are destroyed may reach the disk.
+    void reopenDead(std::size_t process) {
+        volume_->plan(CrashingVolume::InjectedFault::Dies, 0);
+        trees_.at(process).reset();
+        volume_->cancelPlan();
+        reopen(process);
+    }
+
+    /// After the death of a process its batch is in the project or not, for all to see. It is certain only
+    /// with the next batch that is kept: until then a power cut may bring back the other.
+    void settle(Model const& after) {
+        auto const found = visibleTo(0);
+        bool const isBefore = found == visible(model_.content());
+        require(isBefore || found == visible(after.content()),
+                "the project is neither as before the step nor as after it");
+        notDurable_.push_back(isBefore ? after : model_);
+        if (!isBefore) {
+            model_ = after;
+        }
+    }
+
+    void cutPower(Model const& after) {
+        volume_->powerCut();
+        hadPowerCut_ = true;
+        reopenDead(0);
+        reopenDead(1);
+        auto possible = std::exchange(notDurable_, {});
+        possible.push_back(after);
+        possible.push_back(model_);
+        auto const found = visibleTo(0);
+        auto const match = std::find_if(possible.begin(), possible.end(), [&](Model const& model) {
+            return found == visible(model.content());
+        });
+        require(match != possible.end(), "the power cut took what was kept, or left a part of something");
+        model_ = *match;
+    }
+
+    Content visibleTo(std::size_t process) {
+        auto& tree = *trees_.at(process);
+        auto const guard = tree.acquireReadLock(); // one look for all the questions
+        Content content;
+        ask(tree, Address::root(), content);
+        return content;
+    }
+
+    void check(std::size_t process) {
+        auto const content = visibleTo(process);
+        auto const wanted = visible(model_.content());
+        if (content != wanted) {
+            throw std::logic_error("the project is not as the model: " + firstDifference(wanted, content));
+        }
+    }
+
+    TextBackend::Options const options_;
+    std::shared_ptr<CrashingVolume> const volume_;
+    std::array<TextBackend*, 2> backends_{};
+    std::array<std::unique_ptr<TreeMetadataManager>, 2> trees_;
+    Model model_;
+    bool hadPowerCut_ = false;
+    std::vector<Model> notDurable_; ///< contents that a power cut may restore
+};
+
+TEST(TextBackendModel, afterAnyHistoryOfTwoProcessesAProjectHoldsWhatAPlainMapHolds) {
+    std::size_t appends = 0;
+    std::size_t rewrites = 0;
+
+    auto const holds = [&] {
+        // On both sides of each limit: texts here have some hundred to some thousand bytes.
+        auto const alwaysRewritten = *rc::gen::element<std::size_t>(0, 400, 1'500, 1'000'000);
+        auto const bodyToTail = *rc::gen::element<std::size_t>(1, 2, 16);
+        Processes processes({std::chrono::milliseconds(20), alwaysRewritten, bodyToTail},
+                            *rc::gen::arbitrary<unsigned>());
+        processes.disk().canExchange = *rc::gen::arbitrary<bool>();
+        processes.disk().keepsStamps = *rc::gen::arbitrary<bool>();
+        auto const count = *rc::gen::inRange<std::size_t>(1, 50);
+        auto const steps = *rc::gen::container<std::vector<Step>>(count, anyStep());
+        for (auto const& step : steps) {
+            processes.take(step);
+        }
+        processes.finish();
+        appends += processes.appends();
+        rewrites += processes.rewrites();
+    };
+
+    for (int hundred = 0; hundred < 3; ++hundred) {
+        EXPECT_TRUE(rc::check(holds));
+    }
+    EXPECT_GT(appends, 100U);
+    EXPECT_GT(rewrites, 100U);
+}
+
+/// An append whose sync fails for good, a rewrite over it, and a power cut that brings the old text back
+/// without the append: it must not be taken for a text that somebody else put in place.
+TEST(TextBackendModel, anOldTextThatAPowerCutToreDoesNotComeBackOverTheNewOne) {
+    using Kind = Step::Kind;
+    using InjectedFault = CrashingVolume::InjectedFault;
+    auto const head = Address::root().child(metadata::PathElement(u"Files", u"Root"));
+    auto const below = head.child(metadata::PathElement(u"DIR_SIGNIFIER", u"1"));
+    auto const other = Address::root().child(metadata::PathElement(u"LabelData", u""));
+    for (unsigned seed = 0; seed < 100; ++seed) {
+        Processes processes({std::chrono::milliseconds(20), 0, 1}, seed);
+        processes.take({Kind::Set,
+                        1,
+                        {{below, stores::plainNode()}, {other, stores::plainNode()}},
+                        {},
+                        InjectedFault::None,
+                        0});
+        processes.take({Kind::Remove, 0, {}, {head}, InjectedFault::FailsForGood, 10});
+        processes.take({Kind::Set, 0, {{head, stores::plainNode()}}, {}, InjectedFault::None, 0});
+        processes.take({Kind::PowerCut, 0, {}, {}, InjectedFault::None, 0});
+        processes.finish();
+    }
+}
+
+TEST(TextBackendModel, theSameHoldsForTextsOfTheRealLimits) {
+    std::size_t appends = 0;
+    std::size_t rewrites = 0;
+    for (unsigned seed = 1; seed <= 2; ++seed) {
+        Processes processes({}, seed);
+        Step many{Step::Kind::Set, 0, {}, {}, CrashingVolume::InjectedFault::None, 0};
+        auto const folder = std::u16string(200, u'x'); // long, so that few nodes make a long text
+        for (auto const& path : manyFiles(1'400, folder)) {
+            many.nodes.emplace(fileAddress(path), stores::plainNode());
+        }
+        processes.take(many);
+        auto const start = processes.rewrites();
+        auto step = many;
+        for (unsigned turn = 0; turn < 6; ++turn) {
+            step = anyStep()(rc::Random(seed * 100 + turn), 50).value();
+            auto const size = std::size_t{1} << (turn * 2); // from one file to more than the tail may hold
+            for (auto const& path : manyFiles(size, folder + char16_t(u'a' + turn))) {
+                step.nodes.emplace(fileAddress(path), stores::plainNode());
+            }
+            step.kind = Step::Kind::Set;
+            processes.take(step);
+        }
+        processes.finish();
+        appends += processes.appends();
+        rewrites += processes.rewrites() - start;
+    }
+    EXPECT_GT(appends, 3U);
+    EXPECT_GT(rewrites, 3U);
+}
+
+} // namespace
+
+} // namespace project::test
