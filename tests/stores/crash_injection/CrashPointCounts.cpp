@@ -10,8 +10,8 @@ namespace {
 using InjectedFault = CrashingVolume::InjectedFault;
 
 /// Not included are the clock, a wait, and unlocking: they do not fail, and dying there is the same as dying
-/// Not included are the clock, a wait, and unlocking: they do not fail, and dying there is the same as dying before the
-/// next call.
+/// Not included are the clock, a wait, and unlocking: they do not fail, and dying there is the same as dying
+/// before the next call.
 constexpr char const* callsOfADisk[] = {
     "openFolder", "makeFolder",     "removeFolder", "isFolderInPlace", "lock",       "lockHolder",
     "identify",   "identifyByPath", "read",         "append",          "create",     "sync",

@@ -15,7 +15,8 @@ namespace {
 enum class Outcome { Done, Failed, NobodyCanTell, Died };
 
 /// The possible contents of a project after an operation without a power cut.
-std::vector<Content> possibleAfter(Outcome outcome, Situation const& before, StoreOperation const& operation) {
+std::vector<Content> possibleAfter(Outcome outcome, Situation const& before,
+                                   StoreOperation const& operation) {
     switch (outcome) {
     case Outcome::Done:
         return {operation.after};
