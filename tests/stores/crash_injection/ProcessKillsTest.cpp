@@ -159,7 +159,7 @@ void useFolder(bool inMemory, std::string const& usual) {
     ::setenv("TMPDIR", isThere ? "/dev/shm" : usual.c_str(), 1);
 }
 
-TEST(ProcessKills, whatWasKeptIsThereWhateverMomentAWriterIsKilledAt) {
+TEST(ProcessKills, aCommittedBatchSurvivesAKillAtAnyMoment) {
     auto const seed = testSeed();
     SCOPED_TRACE("to repeat it, as far as the machine does: PROJECT_TEST_SEED=" + std::to_string(seed));
     std::mt19937_64 random(seed);

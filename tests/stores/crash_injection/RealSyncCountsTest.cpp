@@ -52,7 +52,7 @@ TEST(RealSyncCounts, eachOperationSyncsAsOftenAsItMustAndNotMore) {
     }
 }
 
-TEST(RealSyncCounts, aSecondLookAsksTheSystemOnceAndOpensNothing) {
+TEST(RealSyncCounts, aSecondCheckForChangesMakesOneSystemCall) {
     auto const project = projectFor(rewritingOperation()); // which has read
     contentOf(*project->backend);                          // again, because the text was younger than a tick
     auto const text = project->root.onDisk() / ".projectdata/project.jsonl";

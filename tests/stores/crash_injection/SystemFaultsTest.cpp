@@ -25,7 +25,7 @@ bool isInterruptible(SystemCall const& call) {
     return std::find(calls.begin(), calls.end(), call.name) != calls.end();
 }
 
-TEST_F(SystemFaults, whateverCallFailsTheErrorTellsWhatToDoAndNothingIsLost) {
+TEST_F(SystemFaults, anyFailedCallIsAnErrorWithARemedyAndLosesNothing) {
     bool const isLarge = numberFromEnvironment("PROJECT_TEST_CRASH_POINTS", 0) > 0;
     for (auto const& operation : systemOperations()) {
         for (bool const isForGood : {false, true}) {
@@ -72,7 +72,7 @@ TEST_F(SystemFaults, aSignalAtAnyCallThatItCanInterruptChangesNothing) {
     }
 }
 
-TEST_F(SystemFaults, whatComesInPiecesIsPutTogether) {
+TEST_F(SystemFaults, partialReadsAndWritesAreContinued) {
     for (auto const& operation : systemOperations()) {
         auto const project = projectFor(operation);
         {

@@ -261,7 +261,7 @@ TEST_F(HostileFolder, aTextLinkedToAFileOutsideLeavesThatFileAlone) {
     EXPECT_EQ(contentOf(*open()), contentAfter({addFiles({longName(), u"b", u"secret"})}));
 }
 
-TEST_F(HostileFolder, thousandsOfLeftoversAndStrangeNamesStandInNobodysWay) {
+TEST_F(HostileFolder, thousandsOfLeftoversAndStrangeNamesDoNoHarm) {
     prepareText(bodyOf({"\"a\""}));
     std::size_t const count = 100 * testSeconds(3);
     for (std::size_t i = 0; i < count; ++i) {

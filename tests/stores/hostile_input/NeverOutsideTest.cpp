@@ -120,12 +120,12 @@ TEST_F(NeverOutside, whenADamagedOneIsRepaired) {
     expectInside([this] { EXPECT_FALSE(open()->repair().empty()); });
 }
 
-TEST_F(NeverOutside, whenAConflictIsSettled) {
+TEST_F(NeverOutside, whenAConflictIsResolved) {
     write("<<<<<<< ../../ours\n" + linesThatLeadOutside + "=======\n\"../b\"\n>>>>>>> /theirs\n");
     expectInside([this] { open()->resolve(bodyOf({"\"../a\""})); });
 }
 
-TEST_F(NeverOutside, whenAStoreIsMadeAndTakenBack) {
+TEST_F(NeverOutside, whenAStoreIsCreatedAndRolledBack) {
     fs::remove(store() / "project.jsonl");
     expectInside([this] {
         auto const store = open();

@@ -42,7 +42,7 @@ TEST(JsonText, pairsOfSurrogatesAreUtf8AndLoneOnesAreEscaped) {
     EXPECT_EQ(contentOfText(u"\xD83D\xD83D\xDE00"), "\\ud83d\xF0\x9F\x98\x80");
 }
 
-TEST(JsonText, contentOfOtherHandsIsReadAndKnownAsSuch) {
+TEST(JsonText, contentOfOtherProgramsIsReadAndRecognised) {
     struct {
         char const* content;
         char16_t const* text;

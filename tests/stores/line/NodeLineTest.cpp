@@ -121,7 +121,7 @@ RC_GTEST_PROP(NodeLine, theFastRoadTakesOnlyCanonicalPaths, ()) {
     RC_ASSERT(!plain || length == content.size());
 }
 
-TEST(NodeLine, linesOfOtherHandsAreReadAlthoughTheyAreNotCanonical) {
+TEST(NodeLine, linesOfOtherProgramsAreReadAlthoughTheyAreNotCanonical) {
     struct {
         char const* line;
         char const* canonical;
@@ -258,7 +258,7 @@ Address deepFile(std::size_t depth) {
     return address;
 }
 
-TEST(NodeLine, whatCouldNotBeReadAgainIsNotWritten) {
+TEST(NodeLine, nodesThatCouldNotBeReadAgainAreNotWritten) {
     EXPECT_NO_THROW(requireWritable(set(fileAddress(u"a"), nestedNode(deepestNesting))));
     EXPECT_NO_THROW(requireWritable(set(deepFile(deepestAddress))));
     for (auto const& change : {set(fileAddress(u"a"), nestedNode(deepestNesting + 1)),

@@ -71,14 +71,14 @@ std::set<std::pair<std::string, std::string>> const reaching{
     {"set entry point src/two.cpp", "remove src"},
 };
 
-std::string sortedTold(metadata::MetadataNode const& node) {
+std::string sortedDescription(metadata::MetadataNode const& node) {
     std::string result = toldAscii(node.getType());
     for (std::u16string const& key : node.getKeys()) {
         result += ' ' + toldAscii(key) + '=' + toldAscii(node.get(key));
     }
     std::multiset<std::string> children;
     for (auto const& child : node.getChildren()) {
-        children.insert(sortedTold(*child));
+        children.insert(sortedDescription(*child));
     }
     for (auto const& child : children) {
         result += '(' + child + ')';
@@ -91,7 +91,7 @@ void collect(ProjectText const& text, Address const& parent, std::string& conten
         Address const address = parent.child(child.element);
         if (child.node || child.isCreated) {
             content += stores::AddressText(address).view().text;
-            content += ": " + (child.node ? sortedTold(*child.node) : "made") + '\n';
+            content += ": " + (child.node ? sortedDescription(*child.node) : "made") + '\n';
         }
         collect(text, address, content);
     }

@@ -41,7 +41,7 @@ protected:
     Linearizability order{Slots{}};
 };
 
-TEST_F(LinearizabilityCheck, whatOneProcessDoesIsWhatItDid) {
+TEST_F(LinearizabilityCheck, oneProcessIsLinearizable) {
     EXPECT_TRUE(does(0, read(0, 0, 0)));
     EXPECT_TRUE(does(0, set(a | b, 7)));
     EXPECT_TRUE(does(0, read(7, 0, 7)));
@@ -127,7 +127,7 @@ TEST_F(LinearizabilityCheck, aRemovalThatLeavesWhatIsBelowIsNone) {
     EXPECT_FALSE(does(1, read(0, 7, 0)));
 }
 
-TEST_F(LinearizabilityCheck, whatADeadProcessWroteIsThereOrNot) {
+TEST_F(LinearizabilityCheck, theWriteOfADeadProcessTookEffectOrNot) {
     for (std::uint32_t const seen : {0U, 7U}) {
         order = Linearizability(Slots{});
         order.begin(0, set(a | b, 7));
@@ -138,7 +138,7 @@ TEST_F(LinearizabilityCheck, whatADeadProcessWroteIsThereOrNot) {
     }
 }
 
-TEST_F(LinearizabilityCheck, whatADeadProcessWroteIsNeverThereByHalf) {
+TEST_F(LinearizabilityCheck, theWriteOfADeadProcessNeverTakesEffectPartially) {
     order.begin(0, set(a | b, 7));
     order.die(0);
     EXPECT_FALSE(does(1, read(0, 0, 7)));

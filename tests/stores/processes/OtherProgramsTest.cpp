@@ -213,7 +213,7 @@ TEST_F(GitAsOtherProgram, aStashAndItsReturnAreReportedByAddress) {
     EXPECT_TRUE(contentOf(*store).contains(fileAddress(u"new")));
 }
 
-TEST_F(OtherPrograms, aTextThatGitCleansAwayIsAnErrorAndNoEmptyProject) {
+TEST_F(OtherPrograms, aTextThatGitDeletesIsAnErrorAndNotAnEmptyProject) {
     GitFolder const git(work);
     auto const store = open({.patience = 100ms, .alwaysRewritten = 1U << 20U, .bodyToTail = 16});
     auto const before = contentOf(*store);

@@ -77,7 +77,7 @@ protected:
     }
 };
 
-TEST_F(ThreadsOnOneProject, loseNothingAndAreToldOfEverything) {
+TEST_F(ThreadsOnOneProject, loseNothingAndSeeEveryEvent) {
     for (auto const& who : {std::u16string(u"shared "), nameOf(0), nameOf(1), nameOf(2)}) {
         for (int number = 0; number < filesOfEach; ++number) {
             folder_.file(who + static_cast<char16_t>(u'a' + number));
@@ -94,10 +94,10 @@ TEST_F(ThreadsOnOneProject, loseNothingAndAreToldOfEverything) {
     for (int owner = 0; owner < sessionsOfTheirOwn; ++owner) {
         threads.push_back(start([this, owner] {
             auto own = Session::open(folder_.root(), withoutGit_);
-            ReportedFiles const ownTold(own);
+            ReportedFiles const ownReported(own);
             addFiles(own, nameOf(owner));
             own.refresh();
-            EXPECT_TRUE(ownTold.contains(fileOf(nameOf(owner), 0)));
+            EXPECT_TRUE(ownReported.contains(fileOf(nameOf(owner), 0)));
         }));
     }
     std::vector<std::thread> lookers;

@@ -216,7 +216,7 @@ TEST_F(WriterQueue, aWriterThatWasStoppedWhileItIsNextStopsNobody) {
     EXPECT_EQ("mine", stopped->hear()) << "it kept its place";
 }
 
-TEST_F(WriterQueue, whoeverDoesNotWaitDoesNotComeBeforeThoseWhoDo) {
+TEST_F(WriterQueue, aWriterThatDoesNotWaitDoesNotOvertakeThoseThatDo) {
     auto const holder = openDisk();
     ASSERT_TRUE(holder->lock(0ms));
     auto const waiting = startWaiting();
@@ -258,7 +258,7 @@ TEST_F(WriterQueue, aForkedChildKeepsNoPlaceOfAParentThatDies) {
     ::close(life[0]);
 }
 
-TEST_F(WriterQueue, whereTheFileSystemHasNoQueueWritersWaitAllTheSame) {
+TEST_F(WriterQueue, withoutAQueueInTheFileSystemWritersWaitToo) {
     auto const holder = openDisk();
     ASSERT_TRUE(holder->lock(0ms));
     ChildProcess waiting([this](ChildProcess::Parent const& parent) {
@@ -362,7 +362,8 @@ TEST_F(WriterQueue, inACrowdAWaitIsAsLongAsTheQueue) {
         writer->goOn();
     }
     auto const end = std::chrono::steady_clock::now() + std::chrono::seconds(seconds);
-    comesTrue([&] { return std::chrono::steady_clock::now() > end && crowd->haveAllWritten(); });
+    EXPECT_TRUE(comesTrue([&] { return std::chrono::steady_clock::now() > end && crowd->haveAllWritten(); },
+                          std::chrono::seconds(seconds) + 60s));
     crowd->stop = true;
 
     std::vector<unsigned> all;

@@ -40,7 +40,7 @@ TEST(ConflictText, linesOfBothSidesCountAndThoseOfTheBaseDoNot) {
               bodyOf({R"("a")", R"({"file":"b","keys":{"k":"2","l":"1"}})", R"("c")", R"("d")", R"("e")"}));
 }
 
-TEST(ConflictText, everyConflictIsToldAndSoIsAStrayMarker) {
+TEST(ConflictText, everyConflictIsReportedAndSoIsAStrayMarker) {
     ProjectText const text = readWhole(bodyOf({
         "<<<<<<< ours",
         "=======",
@@ -131,7 +131,7 @@ TEST(ConflictText, eachSideMayHaveItsOwnFirstLine) {
     EXPECT_EQ(contentOf(text).size(), 2U);
 }
 
-TEST(ConflictText, nothingIsTakenInBehindAConflict) {
+TEST(ConflictText, nothingIsAcceptedAfterAConflict) {
     std::string const bytes = bodyOf({"<<<<<<< ours", R"("a")", "=======", ">>>>>>> theirs"});
     ProjectText text = readWhole(bytes);
     EXPECT_FALSE(text.extend(text.tailFor({set(fileAddress(u"b"))})).has_value());

@@ -193,7 +193,7 @@ TEST(GoldenText, aProjectWithATail) {
     EXPECT_EQ(read.rewrittenWith({}).body(), golden("tail-tidied.jsonl"));
 }
 
-TEST(GoldenText, aProjectThatAMergeCouldNotSettle) {
+TEST(GoldenText, aProjectWithAConflict) {
     ProjectText const text = readWhole(golden("conflict.jsonl"));
     EXPECT_EQ(described(text.faults()), "Conflict 6");
     EXPECT_TRUE(text.hasSameBytes(golden("conflict.jsonl")));

@@ -120,7 +120,7 @@ RC_GTEST_PROP(ProjectTextModel, rewritingGivesTheBytesOfTheContent, ()) {
     RC_ASSERT(contentOf(text) == model.content());
 }
 
-RC_GTEST_PROP(ProjectTextModel, whatWasWrittenIsReadAsItWas, ()) {
+RC_GTEST_PROP(ProjectTextModel, aWrittenTextIsReadUnchanged, ()) {
     Model model;
     std::string const body = ProjectText::empty().rewrittenWith(model.drawBatch()).body();
     ProjectText const read = readWhole(body);
@@ -130,7 +130,7 @@ RC_GTEST_PROP(ProjectTextModel, whatWasWrittenIsReadAsItWas, ()) {
     RC_ASSERT(read.rewrittenWith({}).body() == body);
 }
 
-RC_GTEST_PROP(ProjectTextModel, aTailSaysWhatARewriteSays, ()) {
+RC_GTEST_PROP(ProjectTextModel, aTailHasTheContentOfARewrite, ()) {
     Model model;
     ProjectText rewritten = ProjectText::empty().rewrittenWith(model.drawBatch());
     ProjectText extended = readWhole(rewritten.body());
@@ -215,7 +215,7 @@ std::string disordered(std::string const& body) {
     return text + std::string(endLine) + "\n";
 }
 
-RC_GTEST_PROP(ProjectTextModel, whateverCanBeReadIsTheSameOnceItIsTidied, ()) {
+RC_GTEST_PROP(ProjectTextModel, aReadableTextHasTheSameContentAfterTidying, ()) {
     Model model;
     Batch const first = model.drawBatch();
     ProjectText const whole = ProjectText::empty().rewrittenWith(first);

@@ -62,7 +62,7 @@ TEST(ProjectText, aLastLineWithoutLineEndIsWholeYetIrregular) {
     EXPECT_EQ(text.rewrittenWith({}).body(), whole);
 }
 
-TEST(ProjectText, whatIsNoProjectsTextIsRefused) {
+TEST(ProjectText, bytesOtherThanAProjectsTextAreRefused) {
     char const* const others[] = {"hello\n",
                                   "\n",
                                   "hello",
@@ -92,7 +92,7 @@ TEST(ProjectText, aLaterVersionAsksForANewerProgram) {
     }
 }
 
-TEST(ProjectText, childrenAreSortedAndTellWhatLiesBelow) {
+TEST(ProjectText, childrenAreSortedAndSayWhetherTheyHaveChildren) {
     ProjectText const text = readWhole(bodyOf({
         R"({"at":["Categories","Root","Category","1"],"keys":{"Name":"n"}})",
         R"("a")",
@@ -148,7 +148,7 @@ TEST(ProjectText, carriageReturnsAreToleratedAndGoWithTheNextWrite) {
     EXPECT_EQ(text.body(), carriage);
 }
 
-TEST(ProjectText, linesOfOtherHandsAreNoFaultYetNotTidy) {
+TEST(ProjectText, linesOfOtherProgramsAreNoFaultButNotTidy) {
     ProjectText const text = readWhole(bodyOf({R"({ "file": "a", "type": "Info" })", R"("b")"}));
     EXPECT_EQ(described(text.faults()), "");
     EXPECT_FALSE(text.isTidy());
@@ -192,7 +192,7 @@ TEST(ProjectText, linesForOneAddressAreJoinedInTheirOrder) {
               (Content{{fileAddress(u"a"), "Info(k=3;l=1;m=3;)"}, {fileAddress(u"b"), "Info()"}}));
 }
 
-TEST(ProjectText, aLineOfOtherHandsHasItsPlaceAmongTheOthers) {
+TEST(ProjectText, aLineOfAnotherProgramHasItsPlaceAmongTheOthers) {
     ProjectText const text = readWhole(bodyOf({
         R"("a")",
         R"({ "file":"c", "keys":{"k":"1"} })",
@@ -242,7 +242,7 @@ TEST(ProjectText, anAddressWithNothingLeftBelowItIsGone) {
     EXPECT_TRUE(text.children(fileAddress(u"a/b")).empty());
 }
 
-TEST(ProjectText, differencesAreTheAddressesWhereNodesCameWentOrChanged) {
+TEST(ProjectText, differencesAreTheAddressesWhereNodesWereAddedRemovedOrChanged) {
     ProjectText const before =
         readWhole(bodyOf({R"("a")", R"("b")", R"({"file":"c","keys":{"k":"1"}})", R"("d")"}));
     ProjectText const after = readWhole(
@@ -253,7 +253,7 @@ TEST(ProjectText, differencesAreTheAddressesWhereNodesCameWentOrChanged) {
     EXPECT_TRUE(before.differencesTo(before).empty());
 }
 
-TEST(ProjectText, textsThatSayTheSameDoNotDiffer) {
+TEST(ProjectText, textsWithTheSameContentDoNotDiffer) {
     ProjectText const tidy = readWhole(bodyOf({R"("a")", R"("b")"}));
     ProjectText const odd = readWhole(bodyOf({R"("b")", R"({"file":"a"})"}));
     EXPECT_TRUE(tidy.differencesTo(odd).empty());
@@ -272,7 +272,7 @@ TEST(ProjectText, aDifferenceBehindATailIsSeen) {
     EXPECT_EQ(addressesOf(tailed.differencesTo(text)), (std::vector{fileAddress(u"x/y")}));
 }
 
-TEST(ProjectText, differencesTellWhatStoodThereAndWhatStandsThere) {
+TEST(ProjectText, differencesHaveTheEarlierAndTheLaterNode) {
     ProjectText text = readWhole(bodyOf({R"("b")", R"({"file":"c","keys":{"k":"1"}})"}));
     ProjectText const other = readWhole(bodyOf({R"("a")", R"({"file":"c","keys":{"k":"2"}})"}));
     std::string const tail =

@@ -96,7 +96,7 @@ std::string_view lineAt(std::string_view text, std::size_t at) {
     return text.substr(begin, text.find('\n', at) - begin);
 }
 
-TEST(TextDamage, noAlteredByteOfATextWithATailGoesUnseen) {
+TEST(TextDamage, everyAlteredByteOfATextWithATailIsDetected) {
     Tailed const tailed = tailedText();
     for (std::size_t at = 0; at < tailed.bytes.size(); ++at) {
         for (char const other : replacementsFor(tailed.bytes[at])) {

@@ -120,7 +120,7 @@ TEST(TextTail, linesThatNoBatchCountsAreDamageBeforeARightOne) {
     EXPECT_EQ(text.damagedLines(), "\"lost\"\n");
 }
 
-TEST(TextTail, aRightBatchWithALineThatSaysNothingIsDamage) {
+TEST(TextTail, aValidBatchWithAnUnreadableLineIsDamage) {
     ProjectText const text = readWhole(body + batchOf({R"("d")", R"({"more":1})"}, sumOf(body)));
     EXPECT_EQ(described(text.faults()), "Damage 7");
     EXPECT_EQ(files(text), "a folder ");
@@ -203,7 +203,7 @@ TEST(TextTail, aClosingLineWithoutLineEndCountsAndIsIrregular) {
     EXPECT_FALSE(text.extend("\n").has_value());
 }
 
-TEST(TextTail, whatWasAppendedIsTakenIn) {
+TEST(TextTail, appendedBatchesAreAccepted) {
     ProjectText text = readWhole(body);
     std::string const one = text.tailFor({set(fileAddress(u"d")), set(fileAddress(u"a"))});
     std::string const two = readWhole(body + one).tailFor({remove(fileAddress(u"folder"))});
@@ -217,7 +217,7 @@ TEST(TextTail, whatWasAppendedIsTakenIn) {
               readWhole(body + one + two).tailFor({set(fileAddress(u"e"))}));
 }
 
-TEST(TextTail, nothingElseIsTakenInAndTheTextStaysAsItWas) {
+TEST(TextTail, nothingElseIsAcceptedAndTheTextIsUnchanged) {
     std::string const one = batchOf({R"("d")"}, sumOf(body));
     std::string const wrongs[] = {
         "x",
@@ -241,14 +241,14 @@ TEST(TextTail, nothingElseIsTakenInAndTheTextStaysAsItWas) {
     EXPECT_TRUE(text.extend("").value().empty());
 }
 
-TEST(TextTail, nothingIsTakenInBehindATornOrDamagedText) {
+TEST(TextTail, nothingIsAcceptedAfterATornOrDamagedText) {
     std::string const one = batchOf({R"("d")"}, sumOf(body));
     EXPECT_FALSE(readWhole(body + "\"torn\"\n").extend(one).has_value());
     EXPECT_FALSE(readWhole(bodyOf({"damaged"})).extend(one).has_value());
     EXPECT_FALSE(readWhole(body.substr(0, body.size() - 1)).extend(one).has_value());
 }
 
-TEST(TextTail, whatCouldNotBeReadAgainIsNotWritten) {
+TEST(TextTail, nodesThatCouldNotBeReadAgainAreNotWritten) {
     Address deep = addressOf({u"Files", u"Root"});
     while (deep.depth() <= 4096) {
         deep = deep.child({u"File", u"a"});

@@ -64,7 +64,7 @@ TEST_P(MetadataManagerContract, anEmptyStoreHasNothingAtItsTop) {
     EXPECT_FALSE(store.pathExists(a));
 }
 
-TEST_P(MetadataManagerContract, anAddressThatDoesNotExistHasNoChildrenAndIsNoFailure) {
+TEST_P(MetadataManagerContract, anAddressThatDoesNotExistHasNoChildrenAndIsNotAnError) {
     EXPECT_THAT(store.getChildNodes(ab), IsEmpty());
     EXPECT_EQ(store.getNode(ab), nullptr);
 }
@@ -115,7 +115,7 @@ TEST_P(MetadataManagerContract, aNodeIsReplacedWhole) {
     EXPECT_THAT(store.getNode(a)->getChildren(), IsEmpty());
 }
 
-TEST_P(MetadataManagerContract, whatLiesBelowSurvivesAWriteAbove) {
+TEST_P(MetadataManagerContract, theNodesBelowSurviveAWriteAbove) {
     set({{a, node(u"1")}, {ab, node(u"2")}});
     set({{a, node(u"3")}});
     EXPECT_EQ(store.getNode(ab)->get(u"Value"), u"2");
@@ -148,7 +148,7 @@ TEST_P(MetadataManagerContract, removingAnAddressTakesAllBelowItAlong) {
     EXPECT_TRUE(store.hasNode(at({{u"Top", u"z"}})));
 }
 
-TEST_P(MetadataManagerContract, removingWhatIsNotThereIsNoError) {
+TEST_P(MetadataManagerContract, removingAMissingAddressIsNotAnError) {
     set({{a, node()}});
     remove({abc, at({{u"Top", u"unknown"}})});
     EXPECT_TRUE(store.hasNode(a));
@@ -160,7 +160,7 @@ TEST_P(MetadataManagerContract, removingAnAddressAndWhatLiesBelowItInOneBatchIsO
     EXPECT_FALSE(store.pathExists(a));
 }
 
-TEST_P(MetadataManagerContract, anAddressThatLeadsNowhereAnyMoreIsGone) {
+TEST_P(MetadataManagerContract, anAddressWithNothingLeftBelowItDoesNotExist) {
     set({{abc, node()}});
     remove({abc});
     EXPECT_FALSE(store.pathExists(ab));
@@ -309,7 +309,7 @@ TEST_P(MetadataManagerContract, aListenerThatHasGoneOrDoesNotAcceptIsPassedOver)
     EXPECT_TRUE(store.hasNode(a));
 }
 
-TEST_P(MetadataManagerContract, aListenerSeesTheWriteThatItIsToldOf) {
+TEST_P(MetadataManagerContract, aListenerSeesTheWriteThatItIsNotifiedOf) {
     auto const listener = std::make_shared<Listener>();
     bool seen = false;
     listener->act = [&] { seen = store.hasNode(a) && store.getChildNodes(MetadataPath::root()).size() == 1; };
@@ -331,7 +331,7 @@ TEST_P(MetadataManagerContract, aListenerThatWritesGetsAnErrorAndTheWriteIsUndon
     EXPECT_FALSE(store.pathExists(a));
 }
 
-TEST_P(MetadataManagerContract, whatAListenerThrowsUndoesTheWriteAndReachesTheCaller) {
+TEST_P(MetadataManagerContract, anExceptionOfAListenerRollsBackTheWriteAndPropagates) {
     set({{a, node(u"old")}, {abc, node(u"deep")}, {at({{u"Top", u"z"}}), node()}});
     auto const listener = std::make_shared<Listener>();
     listener->act = [] { throw std::runtime_error("source control is locked"); };
@@ -350,7 +350,7 @@ TEST_P(MetadataManagerContract, whatAListenerThrowsUndoesTheWriteAndReachesTheCa
     EXPECT_EQ(store.getNode(a)->get(u"Value"), u"new");
 }
 
-TEST_P(MetadataManagerContract, listenersAlreadyToldOfFilesAreToldOfTheReverse) {
+TEST_P(MetadataManagerContract, listenersThatWereAlreadyNotifiedAreNotifiedOfTheReverse) {
     auto const first = std::make_shared<Listener>();
     auto const second = std::make_shared<Listener>();
     second->act = [] { throw std::runtime_error("no"); };

@@ -102,7 +102,7 @@ TEST_F(MetadataTreeTest, whenEverythingChangedAllIsForgotten) {
     EXPECT_THAT(tree.children(root), ElementsAre(b));
 }
 
-TEST_F(MetadataTreeTest, undoingBringsBackWhatWasBefore) {
+TEST_F(MetadataTreeTest, rollingBackRestoresTheEarlierTree) {
     levels[root] = {plain(u"a", true)};
     levels[a] = {plain(u"a")};
     auto const deep = b.child({u"t", u"x"}).child({u"t", u"y"});

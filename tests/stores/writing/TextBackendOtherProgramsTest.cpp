@@ -278,7 +278,7 @@ TEST_F(TextBackendOtherPrograms, whatSomebodyAppendsAfterOurBatchIsSeenAtTheNext
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20)), addFiles({u"b", u"c"})}), stored());
 }
 
-TEST_F(TextBackendOtherPrograms, aProcessThatDiesWithAStrangersTextInItsHandsNeverLosesIt) {
+TEST_F(TextBackendOtherPrograms, aProcessThatDiesWhileItHoldsTheTextOfAnotherProgramNeverLosesIt) {
     for (unsigned seed = 0; seed < 10; ++seed) {
         bool wasReached = true;
         for (std::size_t call = 0; wasReached; ++call) {

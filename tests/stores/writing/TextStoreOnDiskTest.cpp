@@ -74,7 +74,7 @@ TEST_F(TextStoreOnDisk, aBodyBeyondTheLimitIsAppendedToAndTidiedOnClosing) {
     EXPECT_EQ(contentAfter({addFiles(many), addFiles({u"b", u"c"})}), contentOf(*open()));
 }
 
-TEST_F(TextStoreOnDisk, aStrangersChangeOfTheSameLengthRightAfterOurBatchIsNoticed) {
+TEST_F(TextStoreOnDisk, aChangeByAnotherProgramOfTheSameLengthRightAfterOurBatchIsNoticed) {
     commit(*open(), addFiles({u"a"}));
     auto const backend = open();
     for (int round = 0; round < 25; ++round) {
