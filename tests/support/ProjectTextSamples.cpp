@@ -35,7 +35,8 @@ void walk(ProjectText const& text, Address const& parent, Content& content) {
     for (std::size_t i = 0; i < children.size(); ++i) {
         Child const& child = children[i];
         Address const address = parent.child(child.element);
-        EXPECT_TRUE(i == 0 || children[i - 1].element < child.element) << described(plainNode()) << " at " << i;
+        EXPECT_TRUE(i == 0 || children[i - 1].element < child.element)
+            << described(plainNode()) << " at " << i;
         EXPECT_TRUE(child.node != nullptr || child.isCreated || child.hasChildren);
         EXPECT_FALSE(child.node != nullptr && child.isCreated);
         if (child.node || child.isCreated) {
