@@ -8,7 +8,8 @@ using cmlink::LocalStatus;
 
 namespace {
 
-/// What the first pass of each operation does: its query is all that it is there for.
+/// The action of the first pass of each operation. The pass is only there for its query, which adapters
+/// rely on.
 void doNothing(std::vector<Path> const& /*files*/) {
 }
 
@@ -24,7 +25,7 @@ bool isToBeAdded(LocalStatus status) {
     return status == LocalStatus::NotUnderSourceControl;
 }
 
-/// True also for numbers that only the adapter knows.
+/// Also true for numbers that only the adapter defines.
 bool isToBeRemoved(LocalStatus status) {
     switch (status) {
     case LocalStatus::NotUnderSourceControl:

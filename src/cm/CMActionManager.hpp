@@ -10,29 +10,31 @@ namespace project::management {
 
 using fl::filesystem::Path;
 
-/// Has a source-control adapter do what files that came into a project or left it call for, by their states.
+/// Lets a source-control adapter add or remove files that were added to or removed from a project,
+/// depending on their states.
 ///
-/// An adapter sees two queries for each operation, also of an empty list: one ahead, and the one whose answer
-/// is acted on. All that is to be done goes to it in one call. What it throws goes on to the caller, and
-/// nothing further is done.
+/// The adapter gets two queries for each operation, even for an empty list. Only the answer to the second
+/// one counts. All files to add or remove are passed in one call. An exception of the adapter propagates to
+/// the caller and ends the operation.
 class CMActionManager {
 public:
     /// @param adapter borrowed; must outlive this object.
     explicit CMActionManager(cmlink::CMAdapter& adapter);
 
-    /// Places files that are not yet under source control there, with the folders between them and the root.
+    /// Adds the files that are not yet under source control, with the folders between them and the root.
     /// @param root the project's root folder; not changed.
     void add(std::vector<Path> const& files, Path& root);
 
-    /// Takes files out of source control that are in it. Their folders stay, also when they are left empty.
+    /// Removes the files that are under source control from it. Their folders stay, even if they are now
+    /// empty.
     void remove(std::vector<Path> const& files);
 
 private:
     using Filter = std::function<bool(cmlink::LocalStatus)>;
     using Action = std::function<void(std::vector<Path> const&)>;
 
-    /// Asks for the states of the files, and does something with all those that pass the filter, unless there
-    /// are none. A file without a state passes no filter.
+    /// Queries the states of the files and runs the action on those that pass the filter, if there are any.
+    /// A file without a state passes no filter.
     void actOnFilesWithStatus(std::vector<Path> const& files, Filter const& filter, Action const& action);
 
     cmlink::CMAdapter& adapter_;

@@ -5,11 +5,10 @@
 
 namespace project::management {
 
-/// Notes the files that are to be added or removed before they are, since the store reports its own files
-/// from within the change.
+/// Notes files before they are added or removed, because the store notifies its listener during the change.
 class CMAwareFileManager : public FileManagerDecorator {
 public:
-    /// @param inner borrowed, as is the handler; both must outlive this object.
+    /// @param inner borrowed, as the handler is; both must outlive this object.
     CMAwareFileManager(FileManager& inner, CMProjectFileEventHandler& handler);
 
     void add(std::vector<Path> const& files) override;

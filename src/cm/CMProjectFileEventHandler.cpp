@@ -17,8 +17,8 @@ CMProjectFileEventHandler::CMProjectFileEventHandler(cmlink::CMAdapter& adapter,
     : adapter_(adapter), actionManager_(adapter_), root_(root) {
 }
 
-// In both reports the set is empty before the adapter is called: a batch that it throws at must not come back
-// with the next report, which may belong to a change that has nothing to do with it.
+// Both functions empty the set before they call the adapter: if it throws, the files must not be passed
+// again with the next notification, which may belong to an unrelated change.
 
 void CMProjectFileEventHandler::fileRemovalRequested(metadata::MetadataManager& /*store*/,
                                                      Path const& /*metadataRoot*/,

@@ -9,14 +9,16 @@
 
 namespace project::management {
 
-/// Joins what a caller adds or removes with what the store reports to write or delete for it, and has source
-/// control follow in one batch.
+/// Combines the files that a caller adds or removes with the files that the store creates or deletes for
+/// it, and passes them to source control in one call.
 ///
-/// First what the caller named is noted; then the store, from within its write, reports. What is noted waits
-/// for the next report of its kind, however it comes about: it is not forgotten when the change is refused.
-/// What source control throws goes on to the store, and the batch is not tried again.
+/// The caller's files are noted first. Then the store, during its write, notifies this listener. Noted
+/// files wait for the next notification of their kind, whatever write it belongs to: they are kept even if
+/// the change is refused. An exception of source control propagates to the store, and these files are not
+/// tried again.
 ///
-/// There is no lock: notes and reports of one project must not overlap.
+/// It has no lock of its own. If several threads use the project, hold the store's write guard from the
+/// note until the operation has returned: the store notifies of every write, also those of other threads.
 class CMProjectFileEventHandler : public metadata::FileChangeRequestListener {
 public:
     /// @param adapter borrowed; must outlive this object.
@@ -28,10 +30,10 @@ public:
     void fileAdditionRequested(metadata::MetadataManager& store, std::vector<Path> const& files) override;
     bool acceptsFileChangeRequests() override;
 
-    /// These files are about to be added.
+    /// Call it before these files are added.
     void noteAddition(std::vector<Path> const& files);
 
-    /// These files are about to be removed.
+    /// Call it before these files are removed.
     void noteRemoval(std::vector<Path> const& files);
 
 private:

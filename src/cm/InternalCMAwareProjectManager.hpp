@@ -9,10 +9,11 @@
 
 namespace project::management {
 
-/// What CMAwareProjectManager wraps: the project together with what keeps source control in step with it.
+/// The state of CMAwareProjectManager: the project, its file manager's decorator and the listener on the
+/// store.
 ///
-/// Apart from the public class, so that what that one is made of can change without its users noticing. The
-/// base must own the project before the decorator is made on its file manager.
+/// Deliberately a class of its own: it can change without changing the public class. The base class must
+/// own the project before the decorator of its file manager is created.
 class InternalCMAwareProjectManager : public ProjectManagerDecorator {
 public:
     InternalCMAwareProjectManager(std::unique_ptr<ProjectManager> inner, cmlink::CMAdapter& adapter);
@@ -21,7 +22,7 @@ public:
 
 private:
     cmlink::CMAdapter& adapter_;
-    std::shared_ptr<CMProjectFileEventHandler> handler_; // the store holds it weakly
+    std::shared_ptr<CMProjectFileEventHandler> handler_; // the store holds only a weak pointer
     CMAwareFileManager fileManager_;
 };
 

@@ -8,7 +8,7 @@
 namespace project::management {
 
 /// A list of folder references that calls a function after each change.
-/// @tparam Dispatch a function object without arguments, which raises the event of this list.
+/// @tparam Dispatch a function object without arguments that raises the event of this list.
 template <typename Dispatch>
 class DispatchingFolderReferencManager : public FolderReferenceManagerDecorator {
 public:

@@ -5,7 +5,7 @@
 
 namespace project::management {
 
-/// Raises one and the same event after each change of an entry point or a group.
+/// Raises the same event after each change of an entry point or a group.
 class EventBroadcastingEntryPointManager : public EntryPointManagerDecorator {
 public:
     /// @param inner borrowed, as is the broadcaster; both must outlive this object.

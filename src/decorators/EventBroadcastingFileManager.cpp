@@ -16,7 +16,8 @@ void EventBroadcastingFileManager::add(std::vector<Path> const& files) {
 
 std::vector<Path> EventBroadcastingFileManager::remove(std::vector<Path> const& files) {
     auto removed = FileManagerDecorator::remove(files);
-    // The event names what the caller named, as that of add does; observers look at the project for the rest.
+    // As after add, the event contains the list that the caller passed. Observers find the rest in the
+    // project.
     broadcaster_.dispatchOnFileListUpdate(files);
     return removed;
 }

@@ -7,8 +7,7 @@ namespace project::management {
 
 /// Raises an event after each change of the file list and of the labels on files.
 ///
-/// Taking a whole category off files raises none, and what is written through the stores of
-/// getFileMetadataManagerFor is not seen here.
+/// removeCategory raises no event, and writes through getFileMetadataManagerFor are not seen here.
 class EventBroadcastingFileManager : public FileManagerDecorator {
 public:
     /// @param inner borrowed, as is the broadcaster; both must outlive this object.

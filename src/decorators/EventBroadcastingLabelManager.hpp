@@ -14,12 +14,12 @@ public:
     void createCategory(CategoryIdentifier const& category) override;
     void deleteCategory(CategoryIdentifier const& category) override;
 
-    /// The event's category is the one given here, which has the old name.
+    /// The event contains the category that the caller passed, with the old name.
     void renameCategory(CategoryIdentifier const& category, std::u16string const& newName) override;
 
     void createLabel(CategoryIdentifier const& category, LabelIdentifier const& label) override;
 
-    /// The event's label names something that the store no longer holds.
+    /// The event contains a label that is no longer in the store.
     void deleteLabel(CategoryIdentifier const& category, LabelIdentifier const& label) override;
 
 private:

@@ -8,10 +8,11 @@
 
 namespace project::management {
 
-/// Gives the project path as a list that raises an event after each change.
+/// Returns the project path as a list that raises an event after each change. Deliberately a class with one
+/// getter: the interface that it wraps has one operation.
 class EventBroadcastingProjectPathManager : public ProjectPathManagerDecorator {
 public:
-    /// Asks the inner manager for its list at once.
+    /// Gets the list of the inner manager immediately.
     /// @param inner borrowed, as is the broadcaster; both must outlive this object.
     EventBroadcastingProjectPathManager(ProjectPathManager& inner,
                                         DispatchableProjectEventBroadcaster& broadcaster);

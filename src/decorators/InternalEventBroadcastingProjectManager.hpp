@@ -12,10 +12,10 @@
 
 namespace project::management {
 
-/// What EventBroadcastingProjectManager wraps: the project together with the decorators of its managers.
+/// The state of EventBroadcastingProjectManager: the project and the decorators of its managers.
 ///
-/// Apart from the public class, so that what that one is made of can change without its users noticing. The
-/// base must own the project before the decorators are made on its managers.
+/// Deliberately a class of its own: it can change without changing the public class. The base class must
+/// own the project before the decorators of its managers are created.
 class InternalEventBroadcastingProjectManager : public ProjectManagerDecorator {
 public:
     InternalEventBroadcastingProjectManager(std::unique_ptr<ProjectManager> inner,

@@ -25,12 +25,12 @@ protected:
         return adapter.take();
     }
 
-    /// What an operation comes to when it acts on nothing.
+    /// The calls of an operation that does not act on any file.
     static Lines queries(Paths const& files) {
         return {line(u"getFileStates", files), line(u"getFileStates", files)};
     }
 
-    /// What an operation comes to when it queries some files and acts on some of them.
+    /// The calls of an operation that queries some files and acts on some of them.
     static Lines queriesAnd(std::u16string const& action, Paths const& queried, Paths const& acted) {
         auto result = queries(queried);
         result.push_back(line(action, acted));
@@ -57,7 +57,7 @@ TEST_F(CMActionManagerTest, aFileIsAddedWithItsFoldersButWithoutTheRootAfterTwoQ
     EXPECT_EQ(root, Path(u"/p"));
 }
 
-TEST_F(CMActionManagerTest, filesOfOneFolderBringItOnceAndInPathOrder) {
+TEST_F(CMActionManagerTest, aFolderOfSeveralFilesIsAddedOnceAndInPathOrder) {
     adapter.setStateOfOthers(0);
     Paths const expected{u"/p/a", u"/p/a/x", u"/p/a/y", u"/p/a.txt"};
     EXPECT_EQ(add({u"/p/a.txt", u"/p/a/y", u"/p/a/x", u"/p/a/y"}), added(expected, expected));
@@ -75,19 +75,19 @@ TEST_F(CMActionManagerTest, aNameThatBeginsWithTwoDotsRightBelowTheRootCountsAsO
     EXPECT_EQ(add({u"/p/a/..b/c"}), added(deeper, deeper));
 }
 
-TEST_F(CMActionManagerTest, theRootItselfIsNothingToAdd) {
+TEST_F(CMActionManagerTest, theRootItselfIsNotAdded) {
     adapter.setStateOfOthers(0);
     EXPECT_EQ(add({u"/p"}), queries({}));
 }
 
-TEST_F(CMActionManagerTest, anEmptyListIsAskedAboutTwiceAndNotActedOn) {
+TEST_F(CMActionManagerTest, anEmptyListIsQueriedTwiceAndNotActedOn) {
     adapter.setStateOfOthers(0);
     EXPECT_EQ(add({}), queries({}));
     adapter.setStateOfOthers(5);
     EXPECT_EQ(remove({}), queries({}));
 }
 
-TEST_F(CMActionManagerTest, aFileWithoutAStateIsPassedOver) {
+TEST_F(CMActionManagerTest, aFileWithoutAStateIsSkipped) {
     adapter.setStateOfOthers(0);
     adapter.setState(u"/p/b", std::nullopt);
     EXPECT_EQ(add({u"/p/a", u"/p/b", u"/p/c"}), added({u"/p/a", u"/p/b", u"/p/c"}, {u"/p/a", u"/p/c"}));
@@ -95,12 +95,12 @@ TEST_F(CMActionManagerTest, aFileWithoutAStateIsPassedOver) {
     EXPECT_EQ(remove({u"/p/a", u"/p/b", u"/p/c"}), removed({u"/p/a", u"/p/b", u"/p/c"}, {u"/p/a", u"/p/c"}));
 }
 
-TEST_F(CMActionManagerTest, anAdapterThatKnowsNoFileIsNotToldToAct) {
+TEST_F(CMActionManagerTest, anAdapterThatKnowsNoFileIsOnlyQueried) {
     EXPECT_EQ(add({u"/p/a"}), queries({u"/p/a"}));
     EXPECT_EQ(remove({u"/p/a"}), queries({u"/p/a"}));
 }
 
-TEST_F(CMActionManagerTest, aFolderThatIsUnderSourceControlStaysOutWhileItsFileIsAdded) {
+TEST_F(CMActionManagerTest, aFolderUnderSourceControlIsNotAddedWithItsFile) {
     adapter.setStateOfOthers(0);
     adapter.setState(u"/p/a", 1);
     EXPECT_EQ(add({u"/p/a/x"}), added({u"/p/a", u"/p/a/x"}, {u"/p/a/x"}));
@@ -158,7 +158,7 @@ TEST_F(CMActionManagerTest, aQueryThatFailsEndsTheOperation) {
     EXPECT_THAT(adapter.take(), ElementsAre(u"getFileStates /p/a"));
 }
 
-TEST_F(CMActionManagerTest, aSecondQueryThatFailsLeavesNothingDone) {
+TEST_F(CMActionManagerTest, aSecondQueryThatFailsPreventsTheAction) {
     adapter.setStateOfOthers(0);
     int query = 0;
     adapter.onCall = [&](auto const&) {
@@ -170,7 +170,7 @@ TEST_F(CMActionManagerTest, aSecondQueryThatFailsLeavesNothingDone) {
     EXPECT_EQ(adapter.take(), queries({u"/p/a"}));
 }
 
-TEST_F(CMActionManagerTest, anActionThatFailsReachesTheCaller) {
+TEST_F(CMActionManagerTest, anErrorOfTheActionPropagatesToTheCaller) {
     adapter.setStateOfOthers(0);
     adapter.failOnce(u"addToSourceControl");
     EXPECT_THROW(manager.add({u"/p/a"}, root), AdapterFailure);

@@ -22,7 +22,7 @@ class CMAwareFileManagerTest : public testing::Test {
 protected:
     CMAwareFileManagerTest() { adapter.setStateOfOthers(0); }
 
-    /// What the store does for a manager that adds: it reports a file of its own.
+    /// The store notifies its listener of a file of its own, as it does when a manager adds files.
     std::u16string reportAddition() {
         handler.fileAdditionRequested(store, {u"/p/.t"});
         return adapter.take().back();
@@ -42,7 +42,7 @@ protected:
     Paths const given{u"/p/b", u"/p/a"};
 };
 
-TEST_F(CMAwareFileManagerTest, addedFilesAreNotedWhenTheInnerManagerIsCalledAndGoWithTheStoresReport) {
+TEST_F(CMAwareFileManagerTest, addedFilesAreNotedBeforeTheInnerManagerIsCalledAndPassedWithTheStoresReport) {
     std::u16string action;
     EXPECT_CALL(inner, add(Ref(given))).WillOnce([&](Paths const&) {
         EXPECT_THAT(adapter.take(), IsEmpty());
@@ -53,7 +53,8 @@ TEST_F(CMAwareFileManagerTest, addedFilesAreNotedWhenTheInnerManagerIsCalledAndG
     EXPECT_THAT(adapter.take(), IsEmpty());
 }
 
-TEST_F(CMAwareFileManagerTest, removedFilesAreNotedWhenTheInnerManagerIsCalledAndGoWithTheStoresReport) {
+TEST_F(CMAwareFileManagerTest,
+       removedFilesAreNotedBeforeTheInnerManagerIsCalledAndPassedWithTheStoresReport) {
     std::u16string action;
     Paths removed{u"/p/a", u"/p/a/x", u"/p/b"};
     EXPECT_CALL(inner, remove(Ref(given))).WillOnce([&](Paths const&) {
@@ -66,7 +67,7 @@ TEST_F(CMAwareFileManagerTest, removedFilesAreNotedWhenTheInnerManagerIsCalledAn
     EXPECT_THAT(adapter.take(), IsEmpty());
 }
 
-TEST_F(CMAwareFileManagerTest, twoChangesWithoutAReportGoTogetherWithTheNextOne) {
+TEST_F(CMAwareFileManagerTest, filesOfTwoChangesWithoutAReportArePassedWithTheNextOne) {
     EXPECT_CALL(inner, add).Times(2);
     files.add({u"/p/c"});
     files.add(given);
@@ -74,7 +75,7 @@ TEST_F(CMAwareFileManagerTest, twoChangesWithoutAReportGoTogetherWithTheNextOne)
     EXPECT_EQ(reportAddition(), u"addToSourceControl /p/.t /p/a /p/b /p/c");
 }
 
-TEST_F(CMAwareFileManagerTest, whatTheInnerManagerRefusesGoesWithTheNextReport) {
+TEST_F(CMAwareFileManagerTest, filesThatTheInnerManagerRefusesArePassedWithTheNextReport) {
     EXPECT_CALL(inner, add).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_CALL(inner, remove).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_THROW(files.add(given), std::out_of_range);
@@ -84,7 +85,7 @@ TEST_F(CMAwareFileManagerTest, whatTheInnerManagerRefusesGoesWithTheNextReport) 
     EXPECT_EQ(reportRemoval(), u"removeFromSourceControl /p/.t /p/a /p/b");
 }
 
-TEST_F(CMAwareFileManagerTest, allElseIsForwardedAndNotNoted) {
+TEST_F(CMAwareFileManagerTest, allOtherOperationsAreForwardedAndNoteNothing) {
     CategoryDefinition const category(u"Kind", u"c");
     std::vector<Label> const labels{Label(category, LabelDefinition(u"Source", u"l"))};
     EXPECT_CALL(inner, getProjectRoot()).WillOnce(Return(u"/p"));

@@ -32,7 +32,7 @@ using testing::StrictMock;
 using Paths = std::vector<Path>;
 using Lines = std::vector<std::u16string>;
 
-/// Keeps all that the store reports.
+/// Remembers all files that the store reports.
 class ReportLog : public FileChangeRequestListener {
 public:
     void fileRemovalRequested(MetadataManager&, Path const&, Paths const& files) override {
@@ -55,7 +55,7 @@ protected:
 
     FileManager& files() { return project->getFileManager(); }
 
-    /// Puts a file on disk and into the project, and forgets what the adapter was told.
+    /// Creates a file, adds it to the project, and forgets the calls of the adapter.
     Path projectFile(std::u16string const& relative) {
         auto file = folder.file(relative);
         files().add({file});
@@ -63,7 +63,7 @@ protected:
         return file;
     }
 
-    /// What the adapter is asked when there is nothing to do.
+    /// The adapter's calls if there is nothing to do.
     static Lines emptyQueries() { return {u"getFileStates", u"getFileStates"}; }
 
     static Lines twoQueriesAnd(std::u16string const& action, Paths const& paths) {
@@ -80,7 +80,7 @@ protected:
         std::make_unique<ProjectManagerBase>(folder.root(), store), adapter);
 };
 
-TEST_F(CMAwareProjectManagerTest, makingAndReadingAProjectCallsNoAdapter) {
+TEST_F(CMAwareProjectManagerTest, creatingAndReadingAProjectDoesNotCallTheAdapter) {
     project->getName();
     files().getProjectFiles();
     files().isFileInProject(folder.path(u"a"));
@@ -89,7 +89,7 @@ TEST_F(CMAwareProjectManagerTest, makingAndReadingAProjectCallsNoAdapter) {
     EXPECT_THAT(adapter.take(), IsEmpty());
 }
 
-TEST_F(CMAwareProjectManagerTest, anAddedFileGoesInOneBatchWithItsFoldersAndTheFilesThatTheStoreWrites) {
+TEST_F(CMAwareProjectManagerTest, anAddedFileIsPassedInOneCallWithItsFoldersAndTheStoresNewFiles) {
     auto const reports = std::make_shared<ReportLog>();
     project->subscribe(reports);
     auto const file = folder.file(u"x/y/a");
@@ -101,7 +101,7 @@ TEST_F(CMAwareProjectManagerTest, anAddedFileGoesInOneBatchWithItsFoldersAndTheF
     EXPECT_EQ(adapter.take(), twoQueriesAnd(u"addToSourceControl", Paths(expected.begin(), expected.end())));
 }
 
-TEST_F(CMAwareProjectManagerTest, onceTheStoresFilesAreThereABatchIsWhatWasAdded) {
+TEST_F(CMAwareProjectManagerTest, onceTheStoresFilesExistACallContainsOnlyTheAddedFiles) {
     projectFile(u"first");
     auto const b = folder.file(u"x/b");
     auto const a = folder.file(u"x/a");
@@ -109,7 +109,7 @@ TEST_F(CMAwareProjectManagerTest, onceTheStoresFilesAreThereABatchIsWhatWasAdded
     EXPECT_EQ(adapter.take(), twoQueriesAnd(u"addToSourceControl", {folder.path(u"x"), a, b}));
 }
 
-TEST_F(CMAwareProjectManagerTest, aRemovedFolderGoesAsItWasGiven) {
+TEST_F(CMAwareProjectManagerTest, aRemovedFolderIsPassedAsTheCallerPassedIt) {
     projectFile(u"x/a");
     adapter.setStateOfOthers(1);
     auto const x = folder.path(u"x");
@@ -117,7 +117,7 @@ TEST_F(CMAwareProjectManagerTest, aRemovedFolderGoesAsItWasGiven) {
     EXPECT_EQ(adapter.take(), twoQueriesAnd(u"removeFromSourceControl", {x}));
 }
 
-TEST_F(CMAwareProjectManagerTest, theFirstReportOfARemovalTakesAllAndTheOthersOfItNothing) {
+TEST_F(CMAwareProjectManagerTest, theFirstReportOfARemovalPassesAllFilesAndTheOthersNone) {
     auto const file = projectFile(u"a");
     auto const nodes = files().getFileMetadataManagerFor(u"Another");
     nodes->setFileNodes({{file, std::make_shared<metadata::MetadataNodeSpecification>(u"Info")}});
@@ -130,7 +130,7 @@ TEST_F(CMAwareProjectManagerTest, theFirstReportOfARemovalTakesAllAndTheOthersOf
     EXPECT_EQ(adapter.take(), expected);
 }
 
-TEST_F(CMAwareProjectManagerTest, anyWriteOfTheStoreIsAReport) {
+TEST_F(CMAwareProjectManagerTest, anyWriteOfTheStoreCallsTheAdapter) {
     projectFile(u"a");
     project->setDescription(u"Two strokes");
     EXPECT_EQ(adapter.take(), emptyQueries());
@@ -138,7 +138,7 @@ TEST_F(CMAwareProjectManagerTest, anyWriteOfTheStoreIsAReport) {
     EXPECT_EQ(adapter.take(), emptyQueries());
 }
 
-TEST_F(CMAwareProjectManagerTest, aFileThatTheProjectRefusesGoesWithTheNextWriteWhicheverItIs) {
+TEST_F(CMAwareProjectManagerTest, aFileThatTheProjectRefusesIsPassedWithTheNextWriteWhicheverItIs) {
     projectFile(u"a");
     auto const missing = folder.path(u"x/missing");
     folder.folder(u"x");
@@ -153,7 +153,7 @@ TEST_F(CMAwareProjectManagerTest, aFileThatTheProjectRefusesGoesWithTheNextWrite
     EXPECT_EQ(adapter.take(), emptyQueries());
 }
 
-TEST_F(CMAwareProjectManagerTest, aRefusedRemovalWaitsForTheNextRemovalWhateverIsAddedMeanwhile) {
+TEST_F(CMAwareProjectManagerTest, aRefusedRemovalWaitsForTheNextRemovalEvenIfFilesAreAddedMeanwhile) {
     auto const file = projectFile(u"a");
     auto const other = folder.file(u"b");
     adapter.setStateOfOthers(1);
@@ -165,7 +165,7 @@ TEST_F(CMAwareProjectManagerTest, aRefusedRemovalWaitsForTheNextRemovalWhateverI
     EXPECT_EQ(adapter.take(), twoQueriesAnd(u"removeFromSourceControl", {file, other}));
 }
 
-TEST_F(CMAwareProjectManagerTest, aRefusedAdditionWaitsWhateverIsRemovedMeanwhile) {
+TEST_F(CMAwareProjectManagerTest, aRefusedAdditionWaitsEvenIfFilesAreRemovedMeanwhile) {
     auto const file = projectFile(u"a");
     auto const missing = folder.path(u"missing");
     EXPECT_RAISES(FileDoesNotExistError, (missing), files().add({missing}));
@@ -177,18 +177,18 @@ TEST_F(CMAwareProjectManagerTest, aRefusedAdditionWaitsWhateverIsRemovedMeanwhil
     EXPECT_EQ(adapter.take(), twoQueriesAnd(u"addToSourceControl", {missing}));
 }
 
-TEST_F(CMAwareProjectManagerTest, whatTheAdapterThrowsAtAnAdditionReachesTheCallerAndIsNotTriedAgain) {
+TEST_F(CMAwareProjectManagerTest, anErrorOfTheAdapterInAnAdditionPropagatesAndTheFilesAreNotTriedAgain) {
     projectFile(u"a");
     auto const file = folder.file(u"b");
     adapter.failOnce(u"addToSourceControl");
     EXPECT_THROW(files().add({file}), AdapterFailure);
-    EXPECT_FALSE(files().isFileInProject(file)); // this store undoes what a listener throws at
+    EXPECT_FALSE(files().isFileInProject(file)); // this store rolls a write back if a listener throws
     adapter.take();
     project->setName(u"Engine");
     EXPECT_EQ(adapter.take(), emptyQueries());
 }
 
-TEST_F(CMAwareProjectManagerTest, whatTheAdapterThrowsAtARemovalReachesTheCallerAndIsNotTriedAgain) {
+TEST_F(CMAwareProjectManagerTest, anErrorOfTheAdapterInARemovalPropagatesAndTheFilesAreNotTriedAgain) {
     auto const file = projectFile(u"a");
     auto const other = projectFile(u"b");
     adapter.setStateOfOthers(1);
@@ -200,14 +200,14 @@ TEST_F(CMAwareProjectManagerTest, whatTheAdapterThrowsAtARemovalReachesTheCaller
     EXPECT_EQ(adapter.take(), twoQueriesAnd(u"removeFromSourceControl", {other}));
 }
 
-TEST_F(CMAwareProjectManagerTest, whatTheAdapterThrowsReachesTheCallerOfAnyWrite) {
+TEST_F(CMAwareProjectManagerTest, anErrorOfTheAdapterPropagatesToTheCallerOfAnyWrite) {
     projectFile(u"a");
     adapter.failOnce(u"getFileStates");
     EXPECT_THROW(project->setName(u"Engine"), AdapterFailure);
     EXPECT_EQ(project->getName(), u"");
 }
 
-TEST_F(CMAwareProjectManagerTest, itsEndCallsNoAdapterForWhatIsPendingNorLater) {
+TEST_F(CMAwareProjectManagerTest, itsDestructionDropsPendingFilesWithoutACallOfTheAdapter) {
     projectFile(u"a");
     auto const missing = folder.path(u"missing");
     EXPECT_RAISES(FileDoesNotExistError, (missing), files().add({missing}));
@@ -225,7 +225,7 @@ TEST_F(CMAwareProjectManagerTest, aListenerReachesTheStore) {
     EXPECT_THAT(reports->added, Contains(folder.path(u".projectdata/project.jsonl")));
 }
 
-/// Looks, when it goes, whether the listener that it was given is still there.
+/// Records, when it is destroyed, whether the listener that it was given still exists.
 class EndingProject : public StrictMock<test::MockProjectManager> {
 public:
     explicit EndingProject(std::vector<bool>& listenerWasThere) : listenerWasThere_(listenerWasThere) {}
@@ -254,7 +254,7 @@ protected:
     std::unique_ptr<ProjectManager> project;
 };
 
-TEST_F(CMAwareProjectManagerOverMocksTest, theListenerAcceptsReportsAndWorksOnTheRootOfTheInnerFiles) {
+TEST_F(CMAwareProjectManagerOverMocksTest, theListenerAcceptsReportsAndUsesTheRootOfTheInnerFiles) {
     auto const listener = inner->listener.lock();
     ASSERT_TRUE(listener);
     EXPECT_TRUE(listener->acceptsFileChangeRequests());
@@ -265,7 +265,7 @@ TEST_F(CMAwareProjectManagerOverMocksTest, theListenerAcceptsReportsAndWorksOnTh
     EXPECT_EQ(adapter.take().back(), u"addToSourceControl /p/x/a /p/x/a/b");
 }
 
-TEST_F(CMAwareProjectManagerOverMocksTest, itsFileManagerIsItsOwnTheSameAtEachCall) {
+TEST_F(CMAwareProjectManagerOverMocksTest, itsFileManagerIsItsOwnAndAlwaysTheSame) {
     auto& own = project->getFileManager();
     EXPECT_NE(&own, &files);
     EXPECT_EQ(&project->getFileManager(), &own);
@@ -291,7 +291,7 @@ TEST_F(CMAwareProjectManagerOverMocksTest, allOtherManagersAreThoseOfTheInnerPro
     EXPECT_EQ(&project->getProjectReferenceManager(), &references);
 }
 
-TEST_F(CMAwareProjectManagerOverMocksTest, theListenerGoesBeforeTheInnerProject) {
+TEST_F(CMAwareProjectManagerOverMocksTest, theListenerIsDestroyedBeforeTheInnerProject) {
     EXPECT_FALSE(inner->listener.expired());
     project.reset();
     EXPECT_THAT(listenerWasThere, ElementsAre(false));

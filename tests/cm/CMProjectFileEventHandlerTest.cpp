@@ -23,7 +23,7 @@ protected:
         return adapter.take();
     }
 
-    /// Files that are under source control when they are to go.
+    /// Files that are under source control when they are removed.
     std::vector<std::u16string> reportRemoval(std::vector<Path> const& files) {
         adapter.setStateOfOthers(1);
         handler->fileRemovalRequested(store, u"/p/.projectdata", files);
@@ -36,23 +36,23 @@ protected:
     std::optional<CMProjectFileEventHandler> handler{std::in_place, adapter, u"/p"};
 };
 
-TEST_F(CMProjectFileEventHandlerTest, acceptsReportsAndDoesNothingElseForThat) {
+TEST_F(CMProjectFileEventHandlerTest, acceptsReportsWithoutACallOfTheAdapter) {
     EXPECT_TRUE(handler->acceptsFileChangeRequests());
     EXPECT_THAT(adapter.take(), IsEmpty());
 }
 
-TEST_F(CMProjectFileEventHandlerTest, notesAloneCallNoAdapter) {
+TEST_F(CMProjectFileEventHandlerTest, notesAloneDoNotCallTheAdapter) {
     handler->noteAddition({u"/p/a"});
     handler->noteRemoval({u"/p/b"});
     EXPECT_THAT(adapter.take(), IsEmpty());
 }
 
-TEST_F(CMProjectFileEventHandlerTest, anEmptyReportWithNothingPendingAsksAboutTheEmptyListAlone) {
+TEST_F(CMProjectFileEventHandlerTest, anEmptyReportWithNothingPendingOnlyQueriesTheEmptyList) {
     EXPECT_THAT(reportAddition({}), ElementsAre(u"getFileStates", u"getFileStates"));
     EXPECT_THAT(reportRemoval({}), ElementsAre(u"getFileStates", u"getFileStates"));
 }
 
-TEST_F(CMProjectFileEventHandlerTest, aReportOfAdditionsBringsItsFilesAndAllThatWasNotedWithTheirFolders) {
+TEST_F(CMProjectFileEventHandlerTest, aReportOfAdditionsPassesItsFilesAndTheNotedOnesWithTheirFolders) {
     handler->noteAddition({u"/p/x/b", u"/p/x/a"});
     EXPECT_THAT(reportAddition({u"/p/.projectdata/t"}),
                 ElementsAre(u"getFileStates /p/.projectdata /p/.projectdata/t /p/x /p/x/a /p/x/b",
@@ -60,7 +60,7 @@ TEST_F(CMProjectFileEventHandlerTest, aReportOfAdditionsBringsItsFilesAndAllThat
                             u"addToSourceControl /p/.projectdata /p/.projectdata/t /p/x /p/x/a /p/x/b"));
 }
 
-TEST_F(CMProjectFileEventHandlerTest, aReportOfRemovalsBringsItsFilesAndAllThatWasNotedWithoutFolders) {
+TEST_F(CMProjectFileEventHandlerTest, aReportOfRemovalsPassesItsFilesAndTheNotedOnesWithoutFolders) {
     handler->noteRemoval({u"/p/x/b", u"/p/x/a"});
     EXPECT_THAT(reportRemoval({u"/p/.projectdata/t"}),
                 ElementsAre(u"getFileStates /p/.projectdata/t /p/x/a /p/x/b",
@@ -68,7 +68,7 @@ TEST_F(CMProjectFileEventHandlerTest, aReportOfRemovalsBringsItsFilesAndAllThatW
                             u"removeFromSourceControl /p/.projectdata/t /p/x/a /p/x/b"));
 }
 
-TEST_F(CMProjectFileEventHandlerTest, notesBetweenReportsMakeOneBatchWithEachPathOnceInPathOrder) {
+TEST_F(CMProjectFileEventHandlerTest, notesBetweenReportsArePassedInOneCallOnceEachAndInPathOrder) {
     handler->noteAddition({u"/p/c", u"/p/a"});
     handler->noteAddition({u"/p/b", u"/p/a"});
     EXPECT_EQ(reportAddition({u"/p/c"}).back(), u"addToSourceControl /p/a /p/b /p/c");
@@ -87,7 +87,7 @@ TEST_F(CMProjectFileEventHandlerTest, aReportLeavesNothingOfItsKindPending) {
     EXPECT_THAT(reportRemoval({}), ElementsAre(u"getFileStates", u"getFileStates"));
 }
 
-TEST_F(CMProjectFileEventHandlerTest, aReportLeavesWhatIsPendingOfTheOtherKind) {
+TEST_F(CMProjectFileEventHandlerTest, aReportKeepsPendingFilesOfTheOtherKind) {
     handler->noteAddition({u"/p/a"});
     EXPECT_EQ(reportRemoval({u"/p/x"}).back(), u"removeFromSourceControl /p/x");
     EXPECT_EQ(reportAddition({}).back(), u"addToSourceControl /p/a");
@@ -97,7 +97,7 @@ TEST_F(CMProjectFileEventHandlerTest, aReportLeavesWhatIsPendingOfTheOtherKind) 
     EXPECT_EQ(reportRemoval({}).back(), u"removeFromSourceControl /p/b");
 }
 
-TEST_F(CMProjectFileEventHandlerTest, additionsAtWhichTheAdapterThrowsAreGone) {
+TEST_F(CMProjectFileEventHandlerTest, additionsAreDroppedIfTheAdapterThrows) {
     handler->noteAddition({u"/p/a"});
     adapter.failOnce(u"addToSourceControl");
     EXPECT_THROW(reportAddition({u"/p/b"}), AdapterFailure);
@@ -105,7 +105,7 @@ TEST_F(CMProjectFileEventHandlerTest, additionsAtWhichTheAdapterThrowsAreGone) {
     EXPECT_THAT(reportAddition({}), ElementsAre(u"getFileStates", u"getFileStates"));
 }
 
-TEST_F(CMProjectFileEventHandlerTest, removalsAtWhichTheAdapterThrowsAreGone) {
+TEST_F(CMProjectFileEventHandlerTest, removalsAreDroppedIfTheAdapterThrows) {
     handler->noteRemoval({u"/p/a"});
     adapter.failOnce(u"getFileStates");
     EXPECT_THROW(reportRemoval({u"/p/b"}), AdapterFailure);
@@ -113,14 +113,14 @@ TEST_F(CMProjectFileEventHandlerTest, removalsAtWhichTheAdapterThrowsAreGone) {
     EXPECT_THAT(reportRemoval({}), ElementsAre(u"getFileStates", u"getFileStates"));
 }
 
-TEST_F(CMProjectFileEventHandlerTest, itsEndCallsNoAdapterForWhatIsPending) {
+TEST_F(CMProjectFileEventHandlerTest, itsDestructionDropsPendingFilesWithoutACallOfTheAdapter) {
     handler->noteAddition({u"/p/a"});
     handler->noteRemoval({u"/p/b"});
     handler.reset();
     EXPECT_THAT(adapter.take(), IsEmpty());
 }
 
-TEST_F(CMProjectFileEventHandlerTest, theRootIsTheOneThatItWasMadeWith) {
+TEST_F(CMProjectFileEventHandlerTest, theRootIsTheOneOfItsConstructor) {
     Path root = u"/p/x";
     CMProjectFileEventHandler other(adapter, root);
     root = u"/p";
@@ -128,7 +128,7 @@ TEST_F(CMProjectFileEventHandlerTest, theRootIsTheOneThatItWasMadeWith) {
     EXPECT_EQ(adapter.take().back(), u"addToSourceControl /p/x/a /p/x/a/b");
 }
 
-TEST_F(CMProjectFileEventHandlerTest, theStoreIsLeftAlone) {
+TEST_F(CMProjectFileEventHandlerTest, theStoreIsNotUsed) {
     reportAddition({u"/p/a"});
     reportRemoval({u"/p/a"});
     EXPECT_THAT(store.calls(), IsEmpty());

@@ -64,7 +64,7 @@ protected:
 
     FileManager& files() { return project->getFileManager(); }
 
-    /// Puts a file on disk and into the project, and forgets what came of it.
+    /// Creates a file, adds it to the project, and forgets all events and calls.
     Path projectFile(std::u16string const& relative) {
         auto file = folder.file(relative);
         files().add({file});
@@ -90,7 +90,7 @@ protected:
 INSTANTIATE_TEST_SUITE_P(EitherOrder, ProjectStackTest,
                          testing::Values(Outermost::Events, Outermost::SourceControl), nameOf);
 
-TEST_P(ProjectStackTest, anAddedFileGoesToTheAdapterAndIsToldOfLast) {
+TEST_P(ProjectStackTest, anAddedFileIsPassedToTheAdapterBeforeItsEvent) {
     projectFile(u"first");
     auto const file = folder.file(u"x/a");
     files().add({file});
@@ -100,7 +100,7 @@ TEST_P(ProjectStackTest, anAddedFileGoesToTheAdapterAndIsToldOfLast) {
     EXPECT_TRUE(base->getFileManager().isFileInProject(file));
 }
 
-TEST_P(ProjectStackTest, aRemovedFileGoesToTheAdapterAndIsToldOfLast) {
+TEST_P(ProjectStackTest, aRemovedFileIsPassedToTheAdapterBeforeItsEvent) {
     auto const file = projectFile(u"a");
     adapter.setStateOfOthers(1);
     EXPECT_THAT(files().remove({file}), ElementsAre(file));
@@ -109,7 +109,7 @@ TEST_P(ProjectStackTest, aRemovedFileGoesToTheAdapterAndIsToldOfLast) {
     EXPECT_EQ(adapter.take().back(), line(u"removeFromSourceControl", {file}));
 }
 
-TEST_P(ProjectStackTest, aRefusedFileIsNeitherToldOfNorGivenToTheAdapterYet) {
+TEST_P(ProjectStackTest, aRefusedFileRaisesNoEventAndIsNotPassedToTheAdapterYet) {
     projectFile(u"a");
     auto const missing = folder.path(u"missing");
     EXPECT_RAISES(FileDoesNotExistError, (missing), files().add({missing}));
@@ -118,14 +118,14 @@ TEST_P(ProjectStackTest, aRefusedFileIsNeitherToldOfNorGivenToTheAdapterYet) {
     EXPECT_EQ(adapter.take().back(), line(u"addToSourceControl", {missing}));
 }
 
-TEST_P(ProjectStackTest, aChangeThatTheAdapterThrowsAtIsNotToldOf) {
+TEST_P(ProjectStackTest, aChangeThatTheAdapterRefusesRaisesNoEvent) {
     projectFile(u"a");
     adapter.failOnce(u"addToSourceControl");
     EXPECT_THROW(files().add({folder.file(u"b")}), AdapterFailure);
     EXPECT_THAT(log.take(), ElementsAre(u"getFileStates", u"getFileStates", u"addToSourceControl"));
 }
 
-TEST_P(ProjectStackTest, aSlotThatThrowsLeavesTheFileAddedAndUnderSourceControl) {
+TEST_P(ProjectStackTest, anExceptionOfASlotLeavesTheFileAddedAndUnderSourceControl) {
     projectFile(u"a");
     broadcaster->onFileListUpdate([](Paths const&) { throw std::out_of_range("no"); });
     auto const file = folder.file(u"b");
@@ -134,7 +134,7 @@ TEST_P(ProjectStackTest, aSlotThatThrowsLeavesTheFileAddedAndUnderSourceControl)
     EXPECT_EQ(adapter.take().back(), line(u"addToSourceControl", {file}));
 }
 
-TEST_P(ProjectStackTest, aSlotMayAddFilesInItsTurn) {
+TEST_P(ProjectStackTest, aSlotMayAddFilesItself) {
     auto const first = projectFile(u"a");
     auto const second = folder.file(u"b");
     broadcaster->onFileListUpdate([&](Paths const&) {
@@ -160,7 +160,7 @@ TEST_P(ProjectStackTest, everyOperationPassesThroughTheWholeStack) {
     EXPECT_EQ(project->getDescription(), u"Two strokes");
 }
 
-TEST_P(ProjectStackTest, allManagersTellOfTheirChanges) {
+TEST_P(ProjectStackTest, allManagersRaiseEvents) {
     EntryPointDefinition entryPoint(projectFile(u"run.sh"));
     auto const reference = relativeFolderReference(folder.path(u"lib"), folder.root());
     project->getLabelManager().createCategory(CategoryDefinition(u"Kind", u"c"));
@@ -173,7 +173,7 @@ TEST_P(ProjectStackTest, allManagersTellOfTheirChanges) {
     EXPECT_EQ(log.take().back(), u"referencesChanged");
 }
 
-TEST_P(ProjectStackTest, itsManagersAreTheSameObjectsAtEachCallAndNotTheBases) {
+TEST_P(ProjectStackTest, itsManagersAreAlwaysTheSameObjectsAndNotTheBases) {
     EXPECT_EQ(&project->getFileManager(), &project->getFileManager());
     EXPECT_NE(&project->getFileManager(), &base->getFileManager());
     EXPECT_EQ(&project->getLabelManager(), &project->getLabelManager());
@@ -197,21 +197,21 @@ public:
     int reports = 0;
 };
 
-TEST_P(ProjectStackTest, aListenerGivenToTheOutermostReachesTheStore) {
+TEST_P(ProjectStackTest, aListenerSubscribedToTheOutermostProjectReachesTheStore) {
     auto const listener = std::make_shared<CountingListener>();
     project->subscribe(listener);
     base->setName(u"Engine");
     EXPECT_EQ(listener->reports, 1);
 }
 
-TEST_P(ProjectStackTest, itGoesFromTheOutermostInwardsAndTheStoreLast) {
+TEST_P(ProjectStackTest, itIsDestroyedFromTheOutermostInwardsAndTheStoreLast) {
     std::vector<void const*> expected{
         dynamic_cast<void const*>(&project->getProjectReferenceManager().getFolderReferenceManager()),
         dynamic_cast<void const*>(&project->getProjectPathManager().getFolderReferenceManager()),
         dynamic_cast<void const*>(&base->getFileManager()),
         store.get(),
     };
-    // Each layer's own memory goes when all that it owns has gone, so the outermost comes last.
+    // The memory of each layer is freed after everything that it owns, so the outermost is last.
     expected.insert(expected.end(), layers.begin(), layers.end());
     store.reset();
 

@@ -46,7 +46,7 @@ protected:
     Lines noted;
 };
 
-TEST_F(BroadcasterTest, anEventThatNobodyObservesIsNothing) {
+TEST_F(BroadcasterTest, anEventWithoutSlotsDoesNothing) {
     EXPECT_NO_THROW(dispatchAll());
 }
 
@@ -76,7 +76,7 @@ TEST_F(BroadcasterTest, eachEventReachesItsOwnSlotsAndNoOthers) {
     EXPECT_THAT(log.take(), ElementsAre(u"referencesChanged"));
 }
 
-TEST_F(BroadcasterTest, slotsGetTheVeryObjectsThatWereDispatched) {
+TEST_F(BroadcasterTest, slotsGetTheSameObjectsThatWereDispatched) {
     std::vector<void const*> received;
     auto const receive = [&](auto const& object) { received.push_back(&object); };
     broadcaster.onFileListUpdate(receive);
@@ -135,7 +135,7 @@ TEST_F(BroadcasterTest, aSlotThatDisconnectsItselfIsNotCalledAgainAndTheOthersRu
     EXPECT_THAT(noted, ElementsAre(u"before", u"behind"));
 }
 
-TEST_F(BroadcasterTest, aSlotThatThrowsLeavesTheOnesBehindUncalledAndReachesTheDispatcher) {
+TEST_F(BroadcasterTest, anExceptionOfASlotPropagatesAndTheRemainingSlotsAreNotCalled) {
     broadcaster.onNameChanged(noting(u"before"));
     broadcaster.onNameChanged([] { throw std::out_of_range("no"); });
     broadcaster.onNameChanged(noting(u"behind"));
@@ -156,7 +156,7 @@ TEST_F(BroadcasterTest, aSlotMayConnectAndDispatchTheSameEvent) {
     EXPECT_THAT(Lines(noted.begin(), noted.begin() + 2), ElementsAre(u"new", u"nested dispatch returned"));
 }
 
-TEST(DispatchableProjectEventBroadcaster, itsEndDisconnectsAllSlots) {
+TEST(DispatchableProjectEventBroadcaster, itsDestructionDisconnectsAllSlots) {
     auto owned = std::make_unique<DispatchableProjectEventBroadcaster>();
     auto const name = owned->onNameChanged([] {});
     auto const files = owned->onFileListUpdate([](Paths const&) {});
@@ -167,7 +167,7 @@ TEST(DispatchableProjectEventBroadcaster, itsEndDisconnectsAllSlots) {
     EXPECT_FALSE(files.connected());
 }
 
-/// Notes its name when the last copy of a slot that holds it goes.
+/// Notes its name when the last copy of a slot that holds it is destroyed.
 std::shared_ptr<int> endMark(std::u16string const& name, Lines& ends) {
     return {new int(0), [name, &ends](int const* mark) {
                 ends.push_back(name);
@@ -175,7 +175,7 @@ std::shared_ptr<int> endMark(std::u16string const& name, Lines& ends) {
             }};
 }
 
-TEST(DispatchableProjectEventBroadcaster, theEventsGoInReverseOrder) {
+TEST(DispatchableProjectEventBroadcaster, theEventsAreDestroyedInReverseOrder) {
     Lines ends;
     auto owned = std::make_unique<DispatchableProjectEventBroadcaster>();
     auto const slot = [&ends](std::u16string const& name) {
@@ -198,7 +198,7 @@ TEST(DispatchableProjectEventBroadcaster, theEventsGoInReverseOrder) {
                                   u"renamed", u"added", u"deleted", u"label", u"metadata", u"file list"));
 }
 
-TEST(DispatchableProjectEventBroadcaster, keepsRoomForASpareEvent) {
+TEST(DispatchableProjectEventBroadcaster, keepsRoomForAnUnusedEvent) {
     // Eleven kinds of event can be observed.
     EXPECT_EQ(sizeof(DispatchableProjectEventBroadcaster),
               sizeof(ProjectEventBroadcaster) + 12 * sizeof(boost::signals2::signal<void()>));

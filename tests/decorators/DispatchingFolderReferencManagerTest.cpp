@@ -9,7 +9,7 @@
 #include "support/EventLog.hpp"
 #include "support/ManagerMocks.hpp"
 
-// The lists of folder references that raise events, each of them in the manager that gives it out.
+// The lists of folder references that raise events, each in the manager that returns it.
 
 namespace project::management {
 namespace {
@@ -22,7 +22,7 @@ using testing::ReturnRef;
 using testing::StrictMock;
 using testing::Throw;
 
-/// One of the two managers that give out a list, with all that it stands on.
+/// One of the two managers that return a list, with everything that it needs.
 template <class Decorator, class MockManager>
 struct ListOfReferences {
     ListOfReferences() {
@@ -33,7 +33,7 @@ struct ListOfReferences {
     FolderReferenceManager& list() { return decorator->getFolderReferenceManager(); }
 
     StrictMock<test::MockFolderReferenceManager> inner;
-    StrictMock<MockManager> manager; // asked for its list once, when the decorator is made
+    StrictMock<MockManager> manager; // its list is requested once, when the decorator is created
     DispatchableProjectEventBroadcaster broadcaster;
     test::EventLog log{broadcaster};
     std::unique_ptr<Decorator> decorator;

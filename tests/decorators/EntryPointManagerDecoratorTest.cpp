@@ -34,19 +34,19 @@ TEST_F(EntryPointManagerDecoratorTest, entryPointsAreChangedByTheInnerOne) {
     entryPoints.removeEntryPoint(file);
 }
 
-TEST_F(EntryPointManagerDecoratorTest, anEntryPointIsTheObjectThatTheInnerOneGives) {
+TEST_F(EntryPointManagerDecoratorTest, anEntryPointIsTheObjectThatTheInnerOneReturns) {
     auto made = std::make_unique<EntryPointDefinition>(file);
     auto const* const expected = made.get();
     EXPECT_CALL(inner, getEntryPoint(Eq(file))).WillOnce(Return(ByMove(std::move(made))));
     EXPECT_EQ(entryPoints.getEntryPoint(file).get(), expected);
 }
 
-TEST_F(EntryPointManagerDecoratorTest, thatAFileHasNoEntryPointIsTheInnerOnesAnswer) {
+TEST_F(EntryPointManagerDecoratorTest, noEntryPointIsReturnedIfTheInnerOneReturnsNone) {
     EXPECT_CALL(inner, getEntryPoint(Eq(file))).WillOnce(Return(ByMove(nullptr)));
     EXPECT_EQ(entryPoints.getEntryPoint(file), nullptr);
 }
 
-TEST_F(EntryPointManagerDecoratorTest, allEntryPointsAreTheObjectsThatTheInnerOneGives) {
+TEST_F(EntryPointManagerDecoratorTest, allEntryPointsAreTheObjectsThatTheInnerOneReturns) {
     std::vector<std::unique_ptr<EntryPoint>> made;
     made.push_back(std::make_unique<EntryPointDefinition>(file));
     auto const* const expected = made[0].get();
@@ -56,7 +56,7 @@ TEST_F(EntryPointManagerDecoratorTest, allEntryPointsAreTheObjectsThatTheInnerOn
     EXPECT_EQ(all[0].get(), expected);
 }
 
-TEST_F(EntryPointManagerDecoratorTest, groupsAreTheObjectsThatTheInnerOneGives) {
+TEST_F(EntryPointManagerDecoratorTest, groupsAreTheObjectsThatTheInnerOneReturns) {
     std::vector<std::unique_ptr<EntryPointGroup>> made;
     made.push_back(std::make_unique<EntryPointGroupDefinition>(group));
     auto const* const expected = made[0].get();
@@ -76,7 +76,7 @@ TEST_F(EntryPointManagerDecoratorTest, groupsAreChangedByTheInnerOne) {
     entryPoints.deleteEntryPointGroup(group);
 }
 
-TEST_F(EntryPointManagerDecoratorTest, whatTheInnerOneThrowsReachesTheCaller) {
+TEST_F(EntryPointManagerDecoratorTest, anExceptionOfTheInnerOnePropagatesToTheCaller) {
     EXPECT_CALL(inner, getEntryPoint).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_CALL(inner, removeEntryPoint).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_THROW(entryPoints.getEntryPoint(file), std::out_of_range);

@@ -32,7 +32,7 @@ protected:
     std::u16string const name = u"Others";
 };
 
-TEST_F(EventBroadcastingEntryPointManagerTest, changesOfEntryPointsAreToldOf) {
+TEST_F(EventBroadcastingEntryPointManagerTest, changesOfEntryPointsRaiseTheEvent) {
     EXPECT_CALL(inner, setEntryPoint(Ref(entryPoint))).WillOnce(log.noting(u"set"));
     EXPECT_CALL(inner, removeEntryPoint(Eq(file))).WillOnce(log.noting(u"removed"));
     entryPoints.setEntryPoint(entryPoint);
@@ -41,7 +41,7 @@ TEST_F(EventBroadcastingEntryPointManagerTest, changesOfEntryPointsAreToldOf) {
     EXPECT_THAT(log.take(), ElementsAre(u"removed", u"entryPointsChanged"));
 }
 
-TEST_F(EventBroadcastingEntryPointManagerTest, changesOfGroupsAreToldOfByTheSameEvent) {
+TEST_F(EventBroadcastingEntryPointManagerTest, changesOfGroupsRaiseTheSameEvent) {
     EXPECT_CALL(inner, createEntryPointGroup(Ref(group))).WillOnce(log.noting(u"created"));
     EXPECT_CALL(inner, renameEntryPointGroup(Ref(group), Ref(name))).WillOnce(log.noting(u"renamed"));
     EXPECT_CALL(inner, deleteEntryPointGroup(Ref(group))).WillOnce(log.noting(u"deleted"));

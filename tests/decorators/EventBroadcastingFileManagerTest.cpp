@@ -32,13 +32,13 @@ protected:
     std::vector<FileLabel> const fileLabels{FileLabel(category, LabelDefinition(u"Old", u"m"), u"/p/b")};
 };
 
-TEST_F(EventBroadcastingFileManagerTest, addingTellsOfTheFilesGivenWhenTheyAreAdded) {
+TEST_F(EventBroadcastingFileManagerTest, addingRaisesTheEventWithTheCallersFilesAfterTheChange) {
     EXPECT_CALL(inner, add(Ref(given))).WillOnce(log.noting(u"added"));
     files.add(given);
     EXPECT_THAT(log.take(), ElementsAre(u"added", u"fileListUpdate /p/b /p/a"));
 }
 
-TEST_F(EventBroadcastingFileManagerTest, removingTellsOfTheFilesGivenAndReturnsTheFilesThatWent) {
+TEST_F(EventBroadcastingFileManagerTest, removingRaisesTheEventWithTheCallersFilesAndReturnsTheRemovedOnes) {
     Paths removed{u"/p/a", u"/p/a/x", u"/p/b"};
     EXPECT_CALL(inner, remove(Ref(given))).WillOnce([&](Paths const&) {
         log.note(u"removed");
@@ -48,7 +48,8 @@ TEST_F(EventBroadcastingFileManagerTest, removingTellsOfTheFilesGivenAndReturnsT
     EXPECT_THAT(log.take(), ElementsAre(u"removed", u"fileListUpdate /p/b /p/a"));
 }
 
-TEST_F(EventBroadcastingFileManagerTest, puttingLabelsOnTellsOfTheFilesGivenAndReturnsWhatHadToGo) {
+TEST_F(EventBroadcastingFileManagerTest,
+       puttingLabelsOnRaisesTheEventWithTheCallersFilesAndReturnsDisplacedLabels) {
     EXPECT_CALL(inner, addLabels(Ref(given), Ref(labels))).WillOnce([&](Paths const&, auto const&) {
         log.note(u"put on");
         return fileLabels;
@@ -59,7 +60,7 @@ TEST_F(EventBroadcastingFileManagerTest, puttingLabelsOnTellsOfTheFilesGivenAndR
     EXPECT_THAT(log.take(), ElementsAre(u"put on", u"fileLabelsChanged /p/b /p/a"));
 }
 
-TEST_F(EventBroadcastingFileManagerTest, takingLabelsOffTellsOfTheFilesGiven) {
+TEST_F(EventBroadcastingFileManagerTest, takingLabelsOffRaisesTheEventWithTheCallersFiles) {
     EXPECT_CALL(inner, removeLabels(Ref(given), Ref(labels))).WillOnce(log.noting(u"taken off"));
     files.removeLabels(given, labels);
     EXPECT_THAT(log.take(), ElementsAre(u"taken off", u"fileLabelsChanged /p/b /p/a"));
@@ -101,7 +102,7 @@ TEST_F(EventBroadcastingFileManagerTest, aChangeThatFailsRaisesNothing) {
     EXPECT_THAT(log.take(), IsEmpty());
 }
 
-TEST_F(EventBroadcastingFileManagerTest, whatASlotThrowsReachesTheCallerAfterTheChange) {
+TEST_F(EventBroadcastingFileManagerTest, anExceptionOfASlotPropagatesToTheCallerAfterTheChange) {
     broadcaster.onFileListUpdate([](Paths const&) { throw std::out_of_range("no"); });
     EXPECT_CALL(inner, remove(Ref(given))).WillOnce(Return(given));
     EXPECT_THROW(files.remove(given), std::out_of_range);

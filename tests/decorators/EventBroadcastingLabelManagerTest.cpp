@@ -29,27 +29,27 @@ protected:
     std::u16string const text = u"State";
 };
 
-TEST_F(EventBroadcastingLabelManagerTest, aNewCategoryIsToldOf) {
+TEST_F(EventBroadcastingLabelManagerTest, aNewCategoryRaisesItsEvent) {
     EXPECT_CALL(inner, createCategory(Ref(category))).WillOnce(log.noting(u"created"));
     labels.createCategory(category);
     EXPECT_THAT(log.take(), ElementsAre(u"created", u"categoryAdded c Kind"));
 }
 
-TEST_F(EventBroadcastingLabelManagerTest, aDeletedCategoryIsToldOf) {
+TEST_F(EventBroadcastingLabelManagerTest, aDeletedCategoryRaisesItsEvent) {
     EXPECT_CALL(inner, deleteCategory(Ref(category))).WillOnce(log.noting(u"deleted"));
     labels.deleteCategory(category);
     EXPECT_THAT(log.take(), ElementsAre(u"deleted", u"categoryDeleted c Kind"));
 }
 
-TEST_F(EventBroadcastingLabelManagerTest, aRenamedCategoryIsToldOfByItsOldName) {
+TEST_F(EventBroadcastingLabelManagerTest, aRenamedCategoryRaisesItsEventWithTheOldName) {
     EXPECT_CALL(inner, renameCategory(Ref(category), Ref(text))).WillOnce(log.noting(u"renamed"));
     labels.renameCategory(category, text);
     EXPECT_THAT(log.take(), ElementsAre(u"renamed", u"categoryRenamed c Kind"));
 }
 
-TEST_F(EventBroadcastingLabelManagerTest, theCategoryOfAnEventIsTheOneGiven) {
+TEST_F(EventBroadcastingLabelManagerTest, theCategoryOfAnEventIsTheCallersObject) {
     std::vector<CategoryIdentifier const*> received;
-    auto const receive = [&](CategoryIdentifier const& told) { received.push_back(&told); };
+    auto const receive = [&](CategoryIdentifier const& raised) { received.push_back(&raised); };
     broadcaster.onCategoryAdded(receive);
     broadcaster.onCategoryRenamed(receive);
     broadcaster.onCategoryDeleted(receive);
@@ -62,7 +62,7 @@ TEST_F(EventBroadcastingLabelManagerTest, theCategoryOfAnEventIsTheOneGiven) {
     EXPECT_THAT(received, ElementsAre(&category, &category, &category));
 }
 
-TEST_F(EventBroadcastingLabelManagerTest, newAndDeletedLabelsAreToldOfByOneEvent) {
+TEST_F(EventBroadcastingLabelManagerTest, newAndDeletedLabelsRaiseTheSameEvent) {
     EXPECT_CALL(inner, createLabel(Ref(category), Ref(label))).WillOnce(log.noting(u"created"));
     EXPECT_CALL(inner, deleteLabel(Ref(category), Ref(label))).WillOnce(log.noting(u"deleted"));
     labels.createLabel(category, label);
@@ -70,21 +70,21 @@ TEST_F(EventBroadcastingLabelManagerTest, newAndDeletedLabelsAreToldOfByOneEvent
     EXPECT_THAT(log.take(), ElementsAre(u"created", u"labelModified c l", u"deleted", u"labelModified c l"));
 }
 
-TEST_F(EventBroadcastingLabelManagerTest, theLabelOfAnEventIsMadeOfBothArguments) {
+TEST_F(EventBroadcastingLabelManagerTest, theLabelOfAnEventConsistsOfBothArguments) {
     CategoryDefinition single(u"Kind", u"c");
     single.setIsSingleValued(true);
     EXPECT_CALL(inner, createLabel);
     EXPECT_CALL(inner, deleteLabel);
-    int told = 0;
+    int events = 0;
     broadcaster.onLabelModified([&](Label const& made) {
-        ++told;
+        ++events;
         EXPECT_EQ(made.getLabelIdentifier(), label);
         EXPECT_EQ(made.getCategory().getName(), u"Kind");
         EXPECT_TRUE(made.getCategory().isSingleValued());
     });
     labels.createLabel(single, label);
     labels.deleteLabel(single, label);
-    EXPECT_EQ(told, 2);
+    EXPECT_EQ(events, 2);
 }
 
 TEST_F(EventBroadcastingLabelManagerTest, queriesRaiseNothing) {

@@ -12,7 +12,7 @@
 #include "support/RecordingMetadataManager.hpp"
 #include "support/TemporaryFolder.hpp"
 
-// The events of a real project; what each manager's decorator does by itself stands in its own test.
+// The events of a real project. Each manager's decorator has a test of its own.
 
 namespace project::management {
 namespace {
@@ -27,7 +27,7 @@ using Paths = std::vector<Path>;
 
 class EventBroadcastingProjectManagerTest : public testing::Test {
 protected:
-    /// Puts a file on disk and into the project, and forgets the events.
+    /// Creates a file, adds it to the project, and forgets the events.
     Path projectFile(std::u16string const& relative) {
         auto file = folder.file(relative);
         project.getFileManager().add({file});
@@ -47,12 +47,12 @@ protected:
     LabelDefinition const label{u"Source", u"l"};
 };
 
-TEST_F(EventBroadcastingProjectManagerTest, constructionRaisesNothingAndLeavesTheStoreAlone) {
+TEST_F(EventBroadcastingProjectManagerTest, constructionRaisesNothingAndDoesNotUseTheStore) {
     EXPECT_THAT(log.take(), IsEmpty());
     EXPECT_THAT(store->calls(), IsEmpty());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, eachManagerIsTheSameObjectAtEachCall) {
+TEST_F(EventBroadcastingProjectManagerTest, eachManagerIsAlwaysTheSameObject) {
     EXPECT_EQ(&project.getFileManager(), &project.getFileManager());
     EXPECT_EQ(&project.getLabelManager(), &project.getLabelManager());
     EXPECT_EQ(&project.getEntryPointManager(), &project.getEntryPointManager());
@@ -60,7 +60,7 @@ TEST_F(EventBroadcastingProjectManagerTest, eachManagerIsTheSameObjectAtEachCall
     EXPECT_EQ(&project.getProjectPathManager(), &project.getProjectPathManager());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, settingTheNameIsToldOfOnce) {
+TEST_F(EventBroadcastingProjectManagerTest, settingTheNameRaisesOneEvent) {
     project.setName(u"Engine");
     EXPECT_THAT(log.take(), ElementsAre(u"nameChanged"));
     EXPECT_EQ(project.getName(), u"Engine");
@@ -84,7 +84,7 @@ TEST_F(EventBroadcastingProjectManagerTest, aNameThatTheStoreRefusesRaisesNothin
     EXPECT_THAT(log.take(), IsEmpty());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, addedFilesAreToldOfAsTheyWereGivenWithoutTheirFolders) {
+TEST_F(EventBroadcastingProjectManagerTest, theEventOfAnAddContainsTheCallersFilesWithoutTheirFolders) {
     auto const b = folder.file(u"x/b");
     auto const a = folder.file(u"x/a");
     project.getFileManager().add({b, a});
@@ -98,12 +98,12 @@ TEST_F(EventBroadcastingProjectManagerTest, anAddThatIsRefusedRaisesNothing) {
     EXPECT_THAT(log.take(), IsEmpty());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, addingNothingIsToldOfWithTheEmptyList) {
+TEST_F(EventBroadcastingProjectManagerTest, addingNothingRaisesTheEventWithTheEmptyList) {
     project.getFileManager().add({});
     EXPECT_THAT(log.take(), ElementsAre(u"fileListUpdate"));
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, removedFilesAreToldOfAsTheyWereGivenNotAsTheyWent) {
+TEST_F(EventBroadcastingProjectManagerTest, theEventOfARemoveContainsTheCallersFilesNotAllRemovedOnes) {
     auto const inside = projectFile(u"x/a");
     auto const x = folder.path(u"x");
     EXPECT_THAT(project.getFileManager().remove({x}), ElementsAre(x, inside));
@@ -116,7 +116,7 @@ TEST_F(EventBroadcastingProjectManagerTest, aRemovalThatIsRefusedRaisesNothing) 
     EXPECT_THAT(log.take(), IsEmpty());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, changesOfLabelsOnFilesAreToldOf) {
+TEST_F(EventBroadcastingProjectManagerTest, changesOfLabelsOnFilesRaiseTheEvent) {
     auto const file = projectFile(u"a");
     project.getLabelManager().createCategory(category);
     project.getLabelManager().createLabel(category, label);
@@ -154,7 +154,7 @@ TEST_F(EventBroadcastingProjectManagerTest, writingThroughTheStoreOfTheFileListI
     EXPECT_THAT(log.take(), IsEmpty());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, aDeletedCategoryIsToldOfButNotTheFilesThatLoseItsLabels) {
+TEST_F(EventBroadcastingProjectManagerTest, aDeletedCategoryRaisesItsEventButNoneForFilesThatLoseItsLabels) {
     auto const file = projectFile(u"a");
     project.getLabelManager().createCategory(category);
     project.getLabelManager().createLabel(category, label);
@@ -165,7 +165,7 @@ TEST_F(EventBroadcastingProjectManagerTest, aDeletedCategoryIsToldOfButNotTheFil
     EXPECT_THAT(log.take(), ElementsAre(u"categoryDeleted c Kind"));
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, aDeletedLabelIsToldOfButNotTheFilesThatLoseIt) {
+TEST_F(EventBroadcastingProjectManagerTest, aDeletedLabelRaisesItsEventButNoneForFilesThatLoseIt) {
     auto const file = projectFile(u"a");
     project.getLabelManager().createCategory(category);
     project.getLabelManager().createLabel(category, label);
@@ -176,12 +176,12 @@ TEST_F(EventBroadcastingProjectManagerTest, aDeletedLabelIsToldOfButNotTheFilesT
     EXPECT_THAT(log.take(), ElementsAre(u"labelModified c l"));
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, aRenamedCategoryIsToldOfByItsOldNameWhenItHasTheNewOne) {
+TEST_F(EventBroadcastingProjectManagerTest, theEventOfARenameContainsTheOldNameWhenTheStoreHasTheNewOne) {
     project.getLabelManager().createCategory(category);
     log.take();
     std::u16string stored;
-    broadcaster->onCategoryRenamed([&](CategoryIdentifier const& told) {
-        stored = project.getLabelManager().getCategoryByUUID(told.getUUID()).getName();
+    broadcaster->onCategoryRenamed([&](CategoryIdentifier const& raised) {
+        stored = project.getLabelManager().getCategoryByUUID(raised.getUUID()).getName();
     });
     project.getLabelManager().renameCategory(category, u"State");
     EXPECT_THAT(log.take(), ElementsAre(u"categoryRenamed c Kind"));
@@ -196,7 +196,7 @@ TEST_F(EventBroadcastingProjectManagerTest, aRefusedCategoryRaisesNothing) {
     EXPECT_THAT(log.take(), IsEmpty());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, changesOfEntryPointsAreToldOf) {
+TEST_F(EventBroadcastingProjectManagerTest, changesOfEntryPointsRaiseTheEvent) {
     EntryPointDefinition entryPoint(projectFile(u"run.sh"));
     auto& entryPoints = project.getEntryPointManager();
     entryPoints.setEntryPoint(entryPoint);
@@ -206,7 +206,7 @@ TEST_F(EventBroadcastingProjectManagerTest, changesOfEntryPointsAreToldOf) {
     EXPECT_THAT(log.take(), ElementsAre(u"entryPointsChanged"));
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, anEntryPointThatGoesWithItsFileIsNotToldOf) {
+TEST_F(EventBroadcastingProjectManagerTest, anEntryPointThatIsRemovedWithItsFileRaisesNoEvent) {
     EntryPointDefinition entryPoint(projectFile(u"run.sh"));
     project.getEntryPointManager().setEntryPoint(entryPoint);
     log.take();
@@ -215,7 +215,7 @@ TEST_F(EventBroadcastingProjectManagerTest, anEntryPointThatGoesWithItsFileIsNot
     EXPECT_THAT(log.take(), ElementsAre(line(u"fileListUpdate", {entryPoint.getFile()})));
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, thePathAndTheReferencesAreToldOfApart) {
+TEST_F(EventBroadcastingProjectManagerTest, thePathAndTheReferencesHaveDifferentEvents) {
     auto const reference = absoluteFolderReference(folder.root());
     auto& path = project.getProjectPathManager().getFolderReferenceManager();
     auto& references = project.getProjectReferenceManager().getFolderReferenceManager();
@@ -245,13 +245,13 @@ TEST_F(EventBroadcastingProjectManagerTest, aSlotSeesTheProjectAfterTheChange) {
     EXPECT_THAT(seen, IsEmpty());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, aSlotMayChangeTheProjectInItsTurn) {
+TEST_F(EventBroadcastingProjectManagerTest, aSlotMayChangeTheProjectItself) {
     broadcaster->onFileListUpdate([&](Paths const&) { project.setName(u"Engine"); });
     project.getFileManager().add({folder.file(u"a")});
     EXPECT_EQ(project.getName(), u"Engine");
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, aSlotRunsUnderNoGuardOfTheStore) {
+TEST_F(EventBroadcastingProjectManagerTest, aSlotRunsWithoutAGuardOfTheStore) {
     broadcaster->onNameChanged([&] {
         store->clear();
         project.getDescription();
@@ -262,7 +262,7 @@ TEST_F(EventBroadcastingProjectManagerTest, aSlotRunsUnderNoGuardOfTheStore) {
     EXPECT_EQ(store->calls().front().guard, test::StoreCall::Guard::None);
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, aSlotThatThrowsLeavesTheChangeMadeAndLaterSlotsUncalled) {
+TEST_F(EventBroadcastingProjectManagerTest, anExceptionOfASlotKeepsTheChangeAndLaterSlotsAreNotCalled) {
     bool isLaterCalled = false;
     broadcaster->onFileListUpdate([](Paths const&) { throw std::out_of_range("no"); });
     broadcaster->onFileListUpdate([&](Paths const&) { isLaterCalled = true; });
@@ -305,7 +305,7 @@ TEST_F(EventBroadcastingProjectManagerTest, theBroadcasterLivesAsLongAsTheProjec
     EXPECT_TRUE(watched.expired());
 }
 
-TEST_F(EventBroadcastingProjectManagerTest, aBroadcasterThatOutlivesItsProjectIsOnlyNoLongerCalled) {
+TEST_F(EventBroadcastingProjectManagerTest, aBroadcasterMayOutliveItsProject) {
     {
         EventBroadcastingProjectManager other(std::make_unique<ProjectManagerBase>(folder.root(), store),
                                               broadcaster);
@@ -316,7 +316,7 @@ TEST_F(EventBroadcastingProjectManagerTest, aBroadcasterThatOutlivesItsProjectIs
     EXPECT_THAT(log.take(), ElementsAre(u"metadataChange"));
 }
 
-TEST(EventBroadcastingProjectManager, theManagersAreAskedForOnceAndInOrder) {
+TEST(EventBroadcastingProjectManager, theManagersAreRequestedOnceAndInOrder) {
     test::MockFileManager files;
     test::MockLabelManager labels;
     test::MockEntryPointManager entryPoints;
@@ -335,7 +335,7 @@ TEST(EventBroadcastingProjectManager, theManagersAreAskedForOnceAndInOrder) {
 
     EventBroadcastingProjectManager project(std::move(inner),
                                             std::make_shared<DispatchableProjectEventBroadcaster>());
-    // All further calls are answered by the decorators that were made.
+    // All further calls return the decorators.
     EXPECT_NE(&project.getFileManager(), &files);
     EXPECT_NE(&project.getLabelManager(), &labels);
     EXPECT_NE(&project.getEntryPointManager(), &entryPoints);
@@ -345,7 +345,8 @@ TEST(EventBroadcastingProjectManager, theManagersAreAskedForOnceAndInOrder) {
     EXPECT_NE(&project.getProjectReferenceManager().getFolderReferenceManager(), &list);
 }
 
-TEST(EventBroadcastingProjectManager, theDecoratorsGoFirstThenTheBroadcasterThenTheProjectAndItsStore) {
+TEST(EventBroadcastingProjectManager,
+     theDecoratorsAreDestroyedFirstThenTheBroadcasterThenTheProjectAndItsStore) {
     auto* const store = new test::RecordingMetadataManager();
     auto* const broadcaster = new DispatchableProjectEventBroadcaster();
     auto inner =
@@ -360,7 +361,7 @@ TEST(EventBroadcastingProjectManager, theDecoratorsGoFirstThenTheBroadcasterThen
         broadcaster,
         innerFiles,
         store,
-        innerProject, // its memory, when all in it has gone
+        innerProject, // its memory, after its members are destroyed
     };
 
     test::DeletionLog const log(expected);

@@ -9,7 +9,7 @@
 #include "project/stores/MemoryBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 
-// Events and several threads: what a slot may count on, and what may be called at once.
+// Events and several threads: the guarantees for slots, and the operations that may run at the same time.
 
 namespace project::management {
 namespace {
@@ -17,7 +17,7 @@ namespace {
 using namespace std::chrono_literals;
 using testing::Each;
 
-/// Long enough for any machine, for what must come at once.
+/// A limit that only a deadlock reaches.
 constexpr auto patience = 30s;
 
 class EventConcurrencyTest : public testing::Test {
@@ -80,7 +80,7 @@ TEST_F(EventConcurrencyTest, anotherThreadCanConnectAndDispatchWhileASlotRuns) {
     EXPECT_EQ(outcome, std::future_status::ready);
 }
 
-TEST_F(EventConcurrencyTest, threadsConnectDispatchAndDisconnectAtOnce) {
+TEST_F(EventConcurrencyTest, threadsConnectDispatchAndDisconnectAtTheSameTime) {
     constexpr int threads = 4;
     constexpr int rounds = 200;
     std::atomic<int> heard = 0;
@@ -107,7 +107,7 @@ TEST_F(EventConcurrencyTest, threadsConnectDispatchAndDisconnectAtOnce) {
     EXPECT_EQ(heard, threads * rounds);
 }
 
-TEST_F(EventConcurrencyTest, everyChangeOfEveryThreadIsToldOfOnce) {
+TEST_F(EventConcurrencyTest, everyChangeOfEveryThreadRaisesOneEvent) {
     constexpr int threads = 4;
     constexpr int rounds = 50;
     std::atomic<int> heard = 0;

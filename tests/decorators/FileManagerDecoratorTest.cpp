@@ -31,7 +31,7 @@ protected:
         FileLabel(category, LabelDefinition(u"Source", u"m"), u"/p/e", u"data")};
 };
 
-/// Is told apart by its address alone.
+/// Objects of it differ only by their address.
 class SomeFileMetadataManager : public FileMetadataManager {
 public:
     void setFileNodes(std::map<Path, std::shared_ptr<metadata::MetadataNode>>) override {}
@@ -78,7 +78,7 @@ TEST_F(FileManagerDecoratorTest, whetherAFileIsInTheProjectIsTheInnerOnesAnswer)
     EXPECT_FALSE(files.isFileInProject(path));
 }
 
-TEST_F(FileManagerDecoratorTest, filesAreRemovedFromTheInnerOneAndItsResultComesBack) {
+TEST_F(FileManagerDecoratorTest, filesAreRemovedFromTheInnerOneAndItsResultIsReturned) {
     EXPECT_CALL(inner, remove(Ref(given))).WillOnce(Return(answered));
     EXPECT_EQ(files.remove(given), answered);
 }
@@ -111,7 +111,7 @@ TEST_F(FileManagerDecoratorTest, aCategoryIsTakenOffByTheInnerOne) {
     files.removeCategory(given, category);
 }
 
-TEST_F(FileManagerDecoratorTest, whatTheInnerOneThrowsReachesTheCaller) {
+TEST_F(FileManagerDecoratorTest, anExceptionOfTheInnerOnePropagatesToTheCaller) {
     EXPECT_CALL(inner, add).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_CALL(inner, remove).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_CALL(inner, getProjectFiles).WillOnce(Throw(std::out_of_range("no")));

@@ -53,7 +53,7 @@ TEST_F(FolderReferenceManagerDecoratorTest, referencesAreReadFromTheInnerOne) {
     EXPECT_FALSE(references.getRootReferenceFor(path));
 }
 
-TEST_F(FolderReferenceManagerDecoratorTest, whatTheInnerOneThrowsReachesTheCaller) {
+TEST_F(FolderReferenceManagerDecoratorTest, anExceptionOfTheInnerOnePropagatesToTheCaller) {
     EXPECT_CALL(inner, addReferences).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_CALL(inner, getReferences).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_THROW(references.addReferences(given), std::out_of_range);

@@ -62,7 +62,7 @@ TEST_F(LabelManagerDecoratorTest, labelsAreReadFromTheInnerOne) {
     EXPECT_EQ(labels.getLabelByUUID(category, text), answeredLabel);
 }
 
-TEST_F(LabelManagerDecoratorTest, whatTheInnerOneThrowsReachesTheCaller) {
+TEST_F(LabelManagerDecoratorTest, anExceptionOfTheInnerOnePropagatesToTheCaller) {
     EXPECT_CALL(inner, createCategory).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_CALL(inner, getCategoryByUUID).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_THROW(labels.createCategory(category), std::out_of_range);

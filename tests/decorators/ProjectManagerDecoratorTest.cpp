@@ -57,13 +57,13 @@ TEST_F(ProjectManagerDecoratorTest, theDescriptionIsTheWrappedProjects) {
     EXPECT_EQ(project.getDescription(), u"Four strokes");
 }
 
-TEST_F(ProjectManagerDecoratorTest, creatingIsTheWrappedProjectsCreating) {
+TEST_F(ProjectManagerDecoratorTest, createIsForwarded) {
     std::u16string const name = u"Engine";
     EXPECT_CALL(*inner, create(Ref(name)));
     project.create(name);
 }
 
-TEST_F(ProjectManagerDecoratorTest, aListenerIsPassedOnAsItIs) {
+TEST_F(ProjectManagerDecoratorTest, aListenerIsForwardedUnchanged) {
     std::weak_ptr<metadata::FileChangeRequestListener> passedOn;
     EXPECT_CALL(*inner, subscribe).WillOnce([&](auto listener) { passedOn = listener; });
     auto const owner = std::make_shared<int>();
@@ -74,7 +74,7 @@ TEST_F(ProjectManagerDecoratorTest, aListenerIsPassedOnAsItIs) {
     EXPECT_EQ(passedOn.use_count(), 1);
 }
 
-TEST_F(ProjectManagerDecoratorTest, whatTheWrappedProjectThrowsReachesTheCaller) {
+TEST_F(ProjectManagerDecoratorTest, anExceptionOfTheWrappedProjectPropagatesToTheCaller) {
     EXPECT_CALL(*inner, setName).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_CALL(*inner, getName).WillOnce(Throw(std::out_of_range("no")));
     EXPECT_CALL(*inner, getFileManager).WillOnce(Throw(std::out_of_range("no")));
@@ -83,7 +83,7 @@ TEST_F(ProjectManagerDecoratorTest, whatTheWrappedProjectThrowsReachesTheCaller)
     EXPECT_THROW(static_cast<void>(project.getFileManager()), std::out_of_range);
 }
 
-/// Tells when it goes.
+/// Records its destruction.
 class EndingProject : public test::MockProjectManager {
 public:
     explicit EndingProject(bool& hasEnded) : hasEnded_(hasEnded) {}
@@ -94,7 +94,7 @@ private:
     bool& hasEnded_;
 };
 
-TEST(ProjectManagerDecorator, theWrappedProjectGoesWithIt) {
+TEST(ProjectManagerDecorator, theWrappedProjectIsDestroyedWithIt) {
     bool hasEnded = false;
     auto project = std::make_unique<ProjectManagerDecorator>(std::make_unique<EndingProject>(hasEnded));
     EXPECT_FALSE(hasEnded);

@@ -7,21 +7,26 @@
 
 namespace project::management {
 
-/// Wraps a project so that source control follows it: what is added through it is placed under source
-/// control together with its folders and the files that the store writes for it, and what is removed is taken
-/// out.
+/// Wraps a project so that source control follows it. Files that are added through it are put under source
+/// control, together with their folders and the files that the store creates for them. Files that are
+/// removed are removed from source control.
 ///
-/// The adapter is called from within the store's write, once for each report of the store, on the thread that
-/// writes and under the store's write lock. It gets what the store reports together with what add and remove
-/// of the file manager were given since the last report of that kind; so what an operation was given that the
-/// project then refused goes to the adapter with the next write, whichever that is. What the adapter throws
-/// goes on to the store, which may undo the write; those files are not given to the adapter again.
+/// The adapter is called during the store's write, once for each notification of the store, on the writing
+/// thread and under the store's write lock. It gets the store's files together with the files that were
+/// passed to the file manager's add or remove since the last notification of that kind. Files of an
+/// operation that the project refused therefore reach the adapter with the next write, whichever that is.
+/// An exception of the adapter propagates to the store, which may roll the write back; these files are not
+/// passed to the adapter again.
 ///
-/// Calls of add and remove on one project must not overlap.
+/// If several threads use the project, hold the store's write guard around each add and remove, because a
+/// write of another thread would pass the files to the adapter too early. A session does this itself.
+///
+/// Deliberately two-level: the wrapped project is an InternalCMAwareProjectManager, which has all the
+/// state, so that this public class stays the same when the state changes.
 class PROJECT_MANAGEMENT_EXPORT CMAwareProjectManager : public ProjectManagerDecorator {
 public:
-    /// Subscribes to the store's reports; otherwise neither store nor adapter is touched.
-    /// @param inner the project to wrap, which goes with this object; not null.
+    /// Subscribes to the store's reports; does not use the store or the adapter otherwise.
+    /// @param inner the project to wrap, owned by this object; not null.
     /// @param adapter borrowed; must outlive this object.
     CMAwareProjectManager(std::unique_ptr<ProjectManager> inner, cmlink::CMAdapter& adapter);
     ~CMAwareProjectManager() override;

@@ -8,14 +8,15 @@
 
 namespace project::management {
 
-/// The broadcaster that an application makes and shares with its project; observers need to know only the
-/// base.
+/// The broadcaster that an application creates and shares with its project. Observers only need the base
+/// class.
 ///
-/// Each dispatching operation raises one event: it calls the connected slots on this thread and returns when
-/// the last has returned. What a slot throws leaves it, and the slots behind are not called. All operations
-/// may be called from any thread, also from within a slot. The store's lock is never touched.
+/// Each dispatching operation raises one event: it calls the connected slots on this thread and returns
+/// after the last one has returned. An exception thrown by a slot propagates to the caller, and the
+/// remaining slots are not called. All operations may be called from any thread, also from a slot. They
+/// never take the store's lock.
 ///
-/// It knows no project: one that outlives its project is no longer called. Its end disconnects all slots.
+/// A broadcaster does not refer to a project and may outlive it. Its destruction disconnects all slots.
 class PROJECT_MANAGEMENT_EXPORT DispatchableProjectEventBroadcaster : public ProjectEventBroadcaster {
 public:
     ~DispatchableProjectEventBroadcaster() override;
@@ -35,7 +36,7 @@ public:
     void dispatchOnFileListUpdate(std::vector<Path> const& files);
     void dispatchFileLabelsChanged(std::vector<Path> const& files);
 
-    /// For the application, to tell of changes that it makes to data of its own.
+    /// Also for applications, to report changes of their own data.
     void dispatchMetadataChange();
 
     void dispatchEntryPointsChanged();
@@ -60,8 +61,7 @@ private:
     CategorySignal categoryAdded_;
     CategorySignal categoryRenamed_;
     FilesSignal fileLabelsChanged_;
-    Signal
-        reservedChange_; // spare: connected to nothing, so that a new kind of event leaves the layout alone
+    Signal reservedChange_; // unused: a new kind of event can take its place without changing the layout
     Signal entryPointsChanged_;
     Signal nameChanged_;
     Signal pathChanged_;

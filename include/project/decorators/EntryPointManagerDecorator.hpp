@@ -8,7 +8,8 @@
 
 namespace project::management {
 
-/// An entry point manager that passes everything on to another one, with its results, errors and locks.
+/// An entry point manager that forwards every operation to another one. Results, errors and locks are those
+/// of the other one.
 class PROJECT_MANAGEMENT_EXPORT EntryPointManagerDecorator : public EntryPointManager {
 public:
     /// @param inner borrowed; must outlive this object.

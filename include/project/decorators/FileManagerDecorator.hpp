@@ -8,7 +8,8 @@
 
 namespace project::management {
 
-/// A file manager that passes everything on to another one, with its results, errors and locks.
+/// A file manager that forwards every operation to another one. Results, errors and locks are those of the
+/// other one.
 class PROJECT_MANAGEMENT_EXPORT FileManagerDecorator : public FileManager {
 public:
     /// @param inner borrowed; must outlive this object.

@@ -7,7 +7,8 @@
 
 namespace project::management {
 
-/// A list of folder references that passes everything on to another one, with its results, errors and locks.
+/// A list of folder references that forwards every operation to another one. Results, errors and locks are
+/// those of the other one.
 class PROJECT_MANAGEMENT_EXPORT FolderReferenceManagerDecorator : public FolderReferenceManager {
 public:
     /// @param inner borrowed; must outlive this object.

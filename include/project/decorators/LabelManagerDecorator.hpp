@@ -7,7 +7,8 @@
 
 namespace project::management {
 
-/// A label manager that passes everything on to another one, with its results, errors and locks.
+/// A label manager that forwards every operation to another one. Results, errors and locks are those of the
+/// other one.
 class PROJECT_MANAGEMENT_EXPORT LabelManagerDecorator : public LabelManager {
 public:
     /// @param inner borrowed; must outlive this object.

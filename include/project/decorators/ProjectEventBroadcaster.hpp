@@ -15,15 +15,19 @@ using fl::filesystem::Path;
 class CategoryIdentifier;
 class Label;
 
-/// Tells observers what has changed in a project: one kind of event for each kind of change.
+/// Reports changes of a project to observers, with one kind of event for each kind of change.
 ///
-/// Slots of one event are called in the order in which they were connected, on the thread that made the
-/// change, after the change and with no lock held, so that a slot may call any operation of the project. What
-/// a slot throws reaches whoever made the change; the change stays, and the slots behind are not called.
+/// Events have two sources. A change made through EventBroadcastingProjectManager raises an event on the
+/// thread that made the change, after it. Changes made by other programs are reported by project::session's
+/// Session::refresh, on the thread that calls it, some time after they were made.
 ///
-/// Each operation here connects one slot and returns its connection, by which alone it can be disconnected.
-/// All of them may be called from any thread, also while a slot runs; a slot that another thread is about to
-/// call may still run once after it was disconnected.
+/// The slots of one event are called in the order in which they were connected, with no lock held, so a
+/// slot may call any operation of the project. An exception thrown by a slot propagates to the caller that
+/// made the change or called refresh. The change is kept, and the remaining slots are not called.
+///
+/// Each operation here connects one slot and returns its connection, which is the only means to disconnect
+/// it. All operations may be called from any thread, also while a slot runs. A slot that another thread is
+/// about to call may run once more after it was disconnected.
 class PROJECT_MANAGEMENT_EXPORT ProjectEventBroadcaster {
 public:
     using Connection = boost::signals2::connection;
@@ -34,31 +38,37 @@ public:
 
     virtual ~ProjectEventBroadcaster();
 
-    /// Files were added or removed. The slot gets the list that was given to FileManager::add or remove,
-    /// which is not all that came or went with it.
+    /// Files were added or removed. After FileManager::add or remove, the slot gets the list that the
+    /// caller passed, without the folders and files that were added or removed with it. After a refresh, it
+    /// gets every file and folder that was added or removed.
     virtual Connection onFileListUpdate(FilesSlot const& slot) = 0;
 
-    /// The application says that other data of the project changed: no operation of the library raises this.
+    /// Other data of the project changed. No manager raises this event. A refresh raises it for changes
+    /// that have no event of their own, for instance of the description; an application may raise it for
+    /// its own data.
     virtual Connection onMetadataChange(Slot const& slot) = 0;
 
-    /// A label was created or deleted; the event does not tell which.
+    /// A label was created or deleted; the event does not say which.
     virtual Connection onLabelModified(LabelSlot const& slot) = 0;
 
     virtual Connection onCategoryDeleted(CategorySlot const& slot) = 0;
+
+    /// A category was created, or created again with other flags.
     virtual Connection onCategoryAdded(CategorySlot const& slot) = 0;
 
-    /// A category was renamed. The slot gets the category as it was given to LabelManager::renameCategory,
-    /// with the old name.
+    /// A category was renamed. The slot gets the category with the old name: as the caller passed it to
+    /// LabelManager::renameCategory, or as it was before the changes that a refresh reports.
     virtual Connection onCategoryRenamed(CategorySlot const& slot) = 0;
 
-    /// Labels were put on these files or taken off them. A category or label that is deleted goes from its
-    /// files without this event.
+    /// Labels were put on these files or taken off them. When a manager deletes a category or label, the
+    /// files lose it without this event; a refresh reports these files too.
     virtual Connection onFileLabelsChanged(FilesSlot const& slot) = 0;
 
     /// Entry points or their groups changed.
     virtual Connection onEntryPointsChanged(Slot const& slot) = 0;
 
-    /// The project was renamed by ProjectManager::setName; creating it raises nothing.
+    /// The project was renamed. ProjectManager::create does not raise this event; a refresh does if the
+    /// name differs.
     virtual Connection onNameChanged(Slot const& slot) = 0;
 
     /// The project path changed.

@@ -7,15 +7,15 @@
 
 namespace project::management {
 
-/// A project that passes everything on to another one, which it owns. What wraps a project derives from this
-/// and overrides what it cares about.
+/// A project that forwards every operation to another one, which it owns. Wrappers derive from this class
+/// and override the operations that they change.
 ///
 /// Projects are stacked from the inside out: ProjectManagerBase over the store, then any wrappers, each of
-/// which takes over the one before. The application holds the outermost and calls that one alone. Results,
-/// errors and locks of every operation are those of the wrapped project.
+/// which owns the previous one. The application holds the outermost project and calls only that one.
+/// Results, errors and locks of every operation are those of the wrapped project.
 class PROJECT_MANAGEMENT_EXPORT ProjectManagerDecorator : public ProjectManager {
 public:
-    /// @param inner the project to wrap, which goes with this object; not null.
+    /// @param inner the project to wrap; owned by this object; not null.
     explicit ProjectManagerDecorator(std::unique_ptr<ProjectManager> inner);
     ~ProjectManagerDecorator() override;
 
