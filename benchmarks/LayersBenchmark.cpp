@@ -34,7 +34,7 @@ void addAllInSession(benchmark::State& state) {
         state.PauseTiming();
         tree.removeProject();
         makeEmptyRepository(tree);
-        auto session = Session::make(tree.root(), u"benchmark");
+        auto session = Session::create(tree.root(), u"benchmark");
         state.ResumeTiming();
         session.project().getFileManager().add(tree.files());
     }

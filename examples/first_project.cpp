@@ -1,4 +1,4 @@
-// Makes a project in a folder, watches what happens to it, labels a file and lists the entry points.
+// Creates a project in a folder, observes its events, labels a file and lists the entry points.
 #include <fstream>
 #include <iostream>
 
@@ -8,7 +8,7 @@ using namespace project::management;
 
 int main(int argc, char** argv) {
     auto const folder = fl::filesystem::fromSystem(argc > 1 ? argv[1] : ".");
-    auto session = project::session::Session::openOrMake(folder, u"First project");
+    auto session = project::session::Session::openOrCreate(folder, u"First project");
     session.events()->onFileListUpdate([](auto const&) { std::cout << "files changed\n"; });
     session.events()->onFileLabelsChanged([](auto const&) { std::cout << "labels changed\n"; });
 

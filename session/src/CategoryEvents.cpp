@@ -24,7 +24,7 @@ using Broadcaster = management::DispatchableProjectEventBroadcaster;
 constexpr std::size_t categoryDepth = 2;
 constexpr std::size_t labelDepth = 3;
 
-/// What stood at the differences before, and the unchanged categories of labels that differ.
+/// The nodes at the differences before the changes, and the unchanged categories of labels that differ.
 std::map<MetadataPath, std::shared_ptr<MetadataNode>> nodesBefore(std::vector<Difference> const& differences,
                                                                   MetadataManager& now) {
     std::map<MetadataPath, std::shared_ptr<MetadataNode>> nodes;
@@ -66,7 +66,7 @@ CategoryEvents::CategoryEvents(std::vector<Difference> const& differences,
         try {
             add(difference);
         } catch (exception::ProjectException const&) {
-            leaveSomething_ = true;
+            hasUnreported_ = true;
         }
     }
 }
@@ -80,7 +80,7 @@ void CategoryEvents::add(Difference const& difference) {
     } else if (depth == labelDepth) {
         addLabel(difference);
     } else {
-        leaveSomething_ = true;
+        hasUnreported_ = true;
     }
 }
 
@@ -94,16 +94,17 @@ void CategoryEvents::addCategory(Difference const& difference) {
     } else if (!difference.before) {
         events_.emplace_back([is = in(now_)](Broadcaster& to) { to.dispatchCategoryAdded(is); });
     } else if (auto const was = in(before_), is = in(now_); !isSameButForTheName(was, is)) {
-        // Creating it anew under its UUID is how a category gets other flags.
+        // A category gets other flags by being created again under the same UUID.
         events_.emplace_back([is](Broadcaster& to) { to.dispatchCategoryAdded(is); });
     } else if (was.getName() != is.getName()) {
         events_.emplace_back([was](Broadcaster& to) { to.dispatchCategoryRenamed(was); });
     } else {
-        leaveSomething_ = true;
+        hasUnreported_ = true;
     }
 }
 
-/// Labels that went with their category go without an event, as when the category is deleted here.
+/// Labels that were deleted together with their category raise no event, as when the category is deleted
+/// here.
 void CategoryEvents::addLabel(Difference const& difference) {
     auto const category = difference.address.parent();
     if (!difference.after && !store_->hasNode(category)) {

@@ -8,8 +8,10 @@
 
 namespace project::session {
 
-/// The events of categories and labels that others have changed. What these are, and were, the label manager
-/// reads: in the project, and in one in memory that has what was there before.
+/// The events for categories and labels that others have changed.
+///
+/// Label managers read them as they are and as they were: from the project, and from a store in memory that
+/// contains the nodes from before the changes.
 class CategoryEvents {
 public:
     /// @param differences at and below the head of the categories, sorted.
@@ -19,12 +21,12 @@ public:
     CategoryEvents(CategoryEvents const&) = delete;
     CategoryEvents& operator=(CategoryEvents const&) = delete;
 
-    /// By UUID, each category's followed by those of its labels.
+    /// Ordered by UUID; the event of a category precedes those of its labels.
     std::vector<Event> take() { return std::move(events_); }
 
-    /// True when there are differences that none of these events tells, also those that the label manager
-    /// can't read: people edit texts by hand.
-    bool leaveSomething() const noexcept { return leaveSomething_; }
+    /// True if none of these events reports some of the differences, for instance because the label manager
+    /// cannot read them: texts may be edited by hand.
+    bool hasUnreported() const noexcept { return hasUnreported_; }
 
 private:
     void add(stores::Difference const& difference);
@@ -35,7 +37,7 @@ private:
     management::ProjectManagerBase before_;
     management::ProjectManagerBase now_;
     std::vector<Event> events_;
-    bool leaveSomething_ = false;
+    bool hasUnreported_ = false;
 };
 
 } // namespace project::session

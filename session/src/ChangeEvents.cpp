@@ -4,9 +4,11 @@
 #include <utility>
 
 #include "CategoryEvents.hpp"
-#include "Schema.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace project::session {
+
+namespace schema = metadata::schema;
 
 using management::DispatchableProjectEventBroadcaster;
 using management::Path;
@@ -18,19 +20,19 @@ namespace {
 
 using Broadcaster = DispatchableProjectEventBroadcaster;
 
-/// Sorts differences by the event that tells of them.
+/// Sorts differences by the event that reports them.
 class Sorting {
 public:
     explicit Sorting(Path const& root) : root_(root) {}
 
     void take(Difference const& difference);
 
-    /// Has everything counted that may have changed unseen.
-    void takeTheRest() { rest_ = true; }
+    /// Counts everything that has no event of its own as changed.
+    void takeRest() { rest_ = true; }
 
     std::vector<Difference> const& categories() const noexcept { return categories_; }
 
-    /// @param ofCategories stand behind the name's.
+    /// @param ofCategories are placed after the event of the name.
     std::vector<Event> events(std::vector<Event> ofCategories) const;
 
 private:
@@ -53,15 +55,15 @@ void Sorting::take(Difference const& difference) {
     auto const& type = head.getType();
     if (difference.address == ProjectManagerBase::getRootNodePath()) {
         takeName(difference);
-    } else if (type == schema::FILES && head.getLocation() == schema::FILE_LIST_SCOPE) {
+    } else if (type == schema::files::filesType && head.getLocation() == schema::files::fileListScope) {
         takeFile(difference);
-    } else if (type == schema::CATEGORIES) {
+    } else if (type == schema::categories::categoriesType) {
         categories_.push_back(difference);
-    } else if (type == schema::ENTRY_POINTS || type == schema::ENTRY_POINT_GROUPS) {
+    } else if (type == schema::entrypoints::entryPointsType || type == schema::entrypoints::groupsType) {
         entryPoints_ = true;
-    } else if (type == schema::PROJECT_PATH) {
+    } else if (type == schema::references::projectPathType) {
         path_ = true;
-    } else if (type == schema::REFERENCES) {
+    } else if (type == schema::references::referencesType) {
         references_ = true;
     } else {
         rest_ = true;
@@ -76,21 +78,23 @@ void Sorting::takeName(Difference const& difference) {
     (isName ? name_ : rest_) = true;
 }
 
-/// A file stands at its own address, a folder at its marker; further down lies what belongs to their labels.
+/// A file is stored at its own address, a folder at its marker. Addresses below these belong to their
+/// labels.
 void Sorting::takeFile(Difference const& difference) {
     auto const& address = difference.address;
     auto path = root_;
     std::size_t index = 1;
-    for (; index < address.depth() && address[index].getType() == schema::FILE; ++index) {
+    for (; index < address.depth() && address[index].getType() == schema::files::fileType; ++index) {
         path = path / Path(address[index].getLocation());
     }
-    bool const isMarker = index + 1 == address.depth() && address[index].getType() == schema::DIR_SIGNIFIER;
+    bool const isMarker =
+        index + 1 == address.depth() && address[index].getType() == schema::files::markerType;
     bool const isItself = index == address.depth() || isMarker;
-    bool const cameOrWent = isItself && (difference.before == nullptr) != (difference.after == nullptr);
-    if (cameOrWent) {
-        files_.insert(files_.end(), path); // they come sorted, but for odd names
+    bool const isAddedOrRemoved = isItself && (difference.before == nullptr) != (difference.after == nullptr);
+    if (isAddedOrRemoved) {
+        files_.insert(files_.end(), path); // the differences are sorted, except for unusual names
     }
-    if (!cameOrWent || (difference.after && !difference.after->getChildren().empty())) {
+    if (!isAddedOrRemoved || (difference.after && !difference.after->getChildren().empty())) {
         labelled_.insert(path);
     }
 }
@@ -126,8 +130,8 @@ std::vector<Event> eventsOf(Changes const& changes, std::shared_ptr<metadata::Me
         sorting.take(difference);
     }
     CategoryEvents categories(sorting.categories(), store, root);
-    if (changes.everything || categories.leaveSomething()) {
-        sorting.takeTheRest();
+    if (changes.everything || categories.hasUnreported()) {
+        sorting.takeRest();
     }
     return sorting.events(categories.take());
 }

@@ -9,7 +9,7 @@ namespace project::session {
 
 using cmlink::LocalStatus;
 
-/// Notices every write of the store; which files came or went with it is of no interest here.
+/// Remembers that the store was written. The files that the write created or deleted do not matter here.
 class DefinitionStager::WriteWatch : public metadata::FileChangeRequestListener {
 public:
     void fileRemovalRequested(metadata::MetadataManager& /*store*/, Path const& /*metadataRoot*/,
@@ -51,7 +51,7 @@ void DefinitionStager::stageIfWritten() {
     if (found != states.end() && isTracked(found->second.getState())) {
         adapter_.addToSourceControl({text_});
     }
-    watch_->hasWritten = false; // not before: what failed is to be tried again
+    watch_->hasWritten = false; // only now: after an error, the text remains due
 }
 
 void DefinitionStager::stageReturned(std::vector<Path> const& files) {

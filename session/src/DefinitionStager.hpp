@@ -1,7 +1,6 @@
 #pragma once
 
 #include <memory>
-#include <type_traits>
 #include <vector>
 
 #include "cmlink/CMAdapter.hpp"
@@ -11,40 +10,30 @@ namespace project::session {
 
 using fl::filesystem::Path;
 
-/// Keeps git's copy of the project's text in step: the layer below stages files that come and go, and the
-/// text merely changes. A commit must not hold a file without its entry in the text.
+/// Keeps the project's text in git's index up to date. CMAwareProjectManager stages files that are added or
+/// removed; the text merely changes. A commit must not contain a file without its entry in the text.
 class DefinitionStager {
 public:
-    /// @param store whose writes count. @param adapter borrowed, as the store is.
+    /// @param store the store whose writes make staging necessary. @param adapter borrowed, as the store
+    /// is.
     /// @param text the file to stage.
     DefinitionStager(metadata::MetadataManager& store, cmlink::CMAdapter& adapter, Path text);
 
-    /// Stages the text if the store was written since the last time, and source control tracks it. Takes the
-    /// write lock, since an adapter is used by one thread at a time.
+    /// Stages the text if the store was written since the text was last staged, and source control tracks
+    /// it. If that fails, the text remains due. Takes the write lock: only one thread at a time may use an
+    /// adapter.
     void stageIfWritten();
 
-    /// Stages those of some files whose removal is staged. They came back into the project; the layer below
-    /// acts on what git does not know, and these it knows. Takes the write lock.
+    /// Stages those of these files whose removal is staged: files that were removed from the project and
+    /// are now added again. CMActionManager adds only files that git does not know, and git knows these.
+    /// Takes the write lock.
     void stageReturned(std::vector<Path> const& files);
 
     /// Counts as a write of the store.
     void noteWritten() noexcept;
 
-    /// Whether the store was written and the text was not staged since.
+    /// Whether the store was written since the text was last staged.
     bool isDue() const noexcept;
-
-    /// Does something to the project, and stages the text. @return what the operation gave.
-    template <typename Operation>
-    auto after(Operation const& operation) {
-        if constexpr (std::is_void_v<decltype(operation())>) {
-            operation();
-            stageIfWritten();
-        } else {
-            auto result = operation();
-            stageIfWritten();
-            return result;
-        }
-    }
 
 private:
     class WriteWatch;
@@ -52,7 +41,7 @@ private:
     metadata::MetadataManager& store_;
     cmlink::CMAdapter& adapter_;
     Path text_;
-    std::shared_ptr<WriteWatch> watch_; ///< the store holds it weakly
+    std::shared_ptr<WriteWatch> watch_; ///< the store holds only a weak pointer
 };
 
 } // namespace project::session

@@ -14,7 +14,7 @@ int main() {
     }
     auto const folder = fl::filesystem::fromSystem(pattern);
     try {
-        project::session::Session::make(folder, u"consumer");
+        project::session::Session::create(folder, u"consumer");
         bool const isThere = project::session::Session::open(folder).project().getName() == u"consumer";
         std::filesystem::remove_all(pattern);
         return isThere ? 0 : 1;

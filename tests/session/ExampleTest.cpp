@@ -6,7 +6,7 @@
 namespace project::session {
 namespace {
 
-TEST(Example, makesAProjectAndTellsWhatHappensToIt) {
+TEST(Example, createsAProjectAndReportsItsChanges) {
     test::TemporaryFolder const folder;
 
     auto const result = test::runProgram({EXAMPLE, folder.onDisk().string()}, {});

@@ -22,7 +22,7 @@ using management::ProjectManager;
 
 using Lines = std::multiset<std::u16string>;
 
-/// All that events tell of, as plain values.
+/// Everything that events report, as plain values.
 struct Picture {
     std::u16string name;
     std::u16string description;
@@ -54,26 +54,26 @@ Picture pictureOf(ProjectManager& project) {
 }
 
 void addFileEvents(Picture const& before, Picture const& after, Lines& lines) {
-    std::set<Path> cameOrWent;
+    std::set<Path> addedOrRemoved;
     std::set<Path> labelled;
     for (auto const& [file, labels] : before.labelsOfFiles) {
         auto const now = after.labelsOfFiles.find(file);
         if (now == after.labelsOfFiles.end()) {
-            cameOrWent.insert(file);
+            addedOrRemoved.insert(file);
         } else if (now->second != labels) {
             labelled.insert(file);
         }
     }
     for (auto const& [file, labels] : after.labelsOfFiles) {
         if (!before.labelsOfFiles.contains(file)) {
-            cameOrWent.insert(file);
+            addedOrRemoved.insert(file);
             if (!labels.empty()) {
                 labelled.insert(file);
             }
         }
     }
     for (auto const& [name, files] :
-         {std::pair(u"fileListUpdate", cameOrWent), {u"fileLabelsChanged", labelled}}) {
+         {std::pair(u"fileListUpdate", addedOrRemoved), {u"fileLabelsChanged", labelled}}) {
         std::u16string line = name;
         for (auto const& file : files) {
             line += u' ' + file.native();
@@ -109,7 +109,7 @@ void addCategoryEvents(Picture const& before, Picture const& after, Lines& lines
     }
 }
 
-/// What observers have to be told of the way from one picture to another.
+/// The events that a refresh must dispatch if the project changed from one picture to the other.
 Lines eventsBetween(Picture const& before, Picture const& after) {
     Lines lines;
     addFileEvents(before, after, lines);
@@ -126,10 +126,10 @@ Lines eventsBetween(Picture const& before, Picture const& after) {
     return lines;
 }
 
-/// Somebody who does anything at all in a project.
-class RandomPerson {
+/// Makes random changes in a project.
+class RandomChanges {
 public:
-    RandomPerson(ProjectManager& project, test::TemporaryFolder const& folder, std::uint64_t seed)
+    RandomChanges(ProjectManager& project, test::TemporaryFolder const& folder, std::uint64_t seed)
         : project_(project), random_(seed) {
         for (auto const* name : {u"a", u"b", u"src/a", u"src/b", u"src/io/a", u"src/io/b"}) {
             files_.push_back(folder.file(name));
@@ -138,8 +138,8 @@ public:
         files_.push_back(folder.path(u"src/io"));
     }
 
-    /// @return false when the managers refuse what was tried.
-    bool actOnce() {
+    /// @return false if the managers refuse the change.
+    bool makeOne() {
         try {
             act(pick(13));
             return true;
@@ -233,28 +233,28 @@ private:
     std::vector<Path> files_;
 };
 
-TEST(RefreshModel, tellsJustWhatDiffersWhateverOthersHaveDone) {
-    constexpr Options withoutGit{SourceControl::Off, false};
+TEST(RefreshModel, reportsExactlyTheDifferencesWhateverOthersHaveDone) {
+    constexpr Options withoutGit{.sourceControl = SourceControl::Off};
     auto const seed = test::testSeed();
     SCOPED_TRACE("PROJECT_TEST_SEED=" + std::to_string(seed));
     std::mt19937_64 random(seed);
     std::size_t done = 0;
     for (int history = 0; history < 8; ++history) {
         test::TemporaryFolder const folder;
-        auto other = Session::make(folder.root(), u"Engine", withoutGit);
+        auto other = Session::create(folder.root(), u"Engine", withoutGit);
         auto session = Session::open(folder.root(), withoutGit);
         test::EventLog log(*session.events());
-        RandomPerson person(other.project(), folder, random());
+        RandomChanges changes(other.project(), folder, random());
         session.refresh();
         auto seen = pictureOf(session.project());
         for (int round = 0; round < 25; ++round) {
-            for (auto acts = random() % 4; acts > 0; --acts) {
-                done += person.actOnce() ? 1 : 0;
+            for (auto count = random() % 4; count > 0; --count) {
+                done += changes.makeOne() ? 1 : 0;
             }
             session.refresh();
-            auto const told = log.take();
+            auto const reported = log.take();
             auto const now = pictureOf(other.project());
-            ASSERT_EQ(Lines(told.begin(), told.end()), eventsBetween(seen, now)) << "round " << round;
+            ASSERT_EQ(Lines(reported.begin(), reported.end()), eventsBetween(seen, now)) << "round " << round;
             seen = now;
         }
     }

@@ -25,7 +25,7 @@ using ::testing::IsEmpty;
 
 using Lines = std::vector<std::u16string>;
 
-/// A session that looks on, and another one in which things are changed.
+/// A session that observes a project, and another one that changes it.
 class Refresh : public ::testing::Test {
 protected:
     Refresh() {
@@ -40,14 +40,14 @@ protected:
 
     LabelManager& labels() { return other_.project().getLabelManager(); }
 
-    /// The events of the session that looks on.
+    /// Refreshes the observing session. @return its events.
     Lines refresh() {
         session_.refresh();
         return log_.take();
     }
 
-    /// What the session that looks on is told of something that is done in the other one.
-    Lines told(std::function<void()> const& action) {
+    /// Runs an action in the other session and refreshes the observing one. @return its events.
+    Lines eventsOf(std::function<void()> const& action) {
         action();
         return refresh();
     }
@@ -57,7 +57,7 @@ protected:
     Label label() const { return Label(status_, done_); }
 
     test::TemporaryFolder folder_;
-    Session other_ = Session::make(folder_.root(), u"Engine");
+    Session other_ = Session::create(folder_.root(), u"Engine");
     Session session_ = Session::open(folder_.root());
     test::EventLog log_{*session_.events()};
     Path const engine_ = folder_.file(u"src/engine.cpp");
@@ -67,12 +67,12 @@ protected:
     LabelDefinition done_ = LabelDefinition(u"Done", u"done");
 };
 
-TEST_F(Refresh, tellsNothingWhenNothingHasChanged) {
+TEST_F(Refresh, reportsNothingIfNothingHasChanged) {
     EXPECT_FALSE(session_.refresh());
     EXPECT_THAT(log_.take(), IsEmpty());
 }
 
-TEST_F(Refresh, tellsNothingOfWhatWasThereBeforeTheFirstLook) {
+TEST_F(Refresh, doesNotReportTheStateBeforeTheFirstRead) {
     auto fresh = Session::open(folder_.root());
     test::EventLog log(*fresh.events());
 
@@ -80,7 +80,7 @@ TEST_F(Refresh, tellsNothingOfWhatWasThereBeforeTheFirstLook) {
     EXPECT_THAT(log.take(), IsEmpty());
 }
 
-TEST_F(Refresh, tellsNothingOfWhatTheSessionHasChangedItself) {
+TEST_F(Refresh, doesNotReportChangesOfTheSessionItself) {
     session_.project().setName(u"Pump");
     session_.project().getFileManager().remove({engine_});
     log_.take();
@@ -88,7 +88,7 @@ TEST_F(Refresh, tellsNothingOfWhatTheSessionHasChangedItself) {
     EXPECT_THAT(refresh(), IsEmpty());
 }
 
-TEST_F(Refresh, tellsTheFilesThatCameAndWent) {
+TEST_F(Refresh, reportsFilesThatWereAddedAndRemoved) {
     auto const tank = folder_.file(u"src/tank.cpp");
     files().add({tank});
     files().remove({valve_});
@@ -96,25 +96,25 @@ TEST_F(Refresh, tellsTheFilesThatCameAndWent) {
     EXPECT_THAT(refresh(), ElementsAre(u"fileListUpdate " + at(u"src/tank.cpp") + u" " + at(u"valve.cpp")));
 }
 
-TEST_F(Refresh, tellsFoldersAsFiles) {
-    EXPECT_THAT(told([&] { files().remove({folder_.path(u"src/io")}); }),
+TEST_F(Refresh, reportsFoldersLikeFiles) {
+    EXPECT_THAT(eventsOf([&] { files().remove({folder_.path(u"src/io")}); }),
                 ElementsAre(u"fileListUpdate " + at(u"src/io") + u" " + at(u"src/io/pump.cpp")));
 }
 
-TEST_F(Refresh, tellsTheFilesWhoseLabelsChanged) {
+TEST_F(Refresh, reportsFilesWhoseLabelsChanged) {
     auto const changed = u"fileLabelsChanged " + at(u"src/engine.cpp") + u" " + at(u"src/io");
 
-    EXPECT_THAT(told([&] {
+    EXPECT_THAT(eventsOf([&] {
                     files().addLabels({engine_, folder_.path(u"src/io")}, {label()});
                 }),
                 ElementsAre(changed));
-    EXPECT_THAT(told([&] {
+    EXPECT_THAT(eventsOf([&] {
                     files().removeLabels({engine_, folder_.path(u"src/io")}, {label()});
                 }),
                 ElementsAre(changed));
 }
 
-TEST_F(Refresh, tellsAFileThatCameWithLabelsTwice) {
+TEST_F(Refresh, reportsAFileThatWasAddedWithLabelsTwice) {
     auto const tank = folder_.file(u"tank.cpp");
     files().add({tank});
     files().addLabels({tank}, {label()});
@@ -123,57 +123,60 @@ TEST_F(Refresh, tellsAFileThatCameWithLabelsTwice) {
                 ElementsAre(u"fileListUpdate " + at(u"tank.cpp"), u"fileLabelsChanged " + at(u"tank.cpp")));
 }
 
-TEST_F(Refresh, tellsALabelledFileThatWentOnce) {
+TEST_F(Refresh, reportsALabelledFileThatWasRemovedOnce) {
     files().addLabels({valve_}, {label()});
     refresh();
 
-    EXPECT_THAT(told([&] { files().remove({valve_}); }), ElementsAre(u"fileListUpdate " + at(u"valve.cpp")));
+    EXPECT_THAT(eventsOf([&] { files().remove({valve_}); }),
+                ElementsAre(u"fileListUpdate " + at(u"valve.cpp")));
 }
 
-TEST_F(Refresh, tellsCategoriesThatCameWereRenamedAndWent) {
+TEST_F(Refresh, reportsCategoriesThatWereCreatedRenamedAndDeleted) {
     auto const owner = CategoryDefinition(u"Owner", u"owner");
 
-    EXPECT_THAT(told([&] { labels().createCategory(owner); }), ElementsAre(u"categoryAdded owner Owner"));
-    EXPECT_THAT(told([&] { labels().renameCategory(owner, u"Keeper"); }),
+    EXPECT_THAT(eventsOf([&] { labels().createCategory(owner); }), ElementsAre(u"categoryAdded owner Owner"));
+    EXPECT_THAT(eventsOf([&] { labels().renameCategory(owner, u"Keeper"); }),
                 ElementsAre(u"categoryRenamed owner Owner"));
-    EXPECT_THAT(told([&] { labels().deleteCategory(owner); }), ElementsAre(u"categoryDeleted owner Keeper"));
+    EXPECT_THAT(eventsOf([&] { labels().deleteCategory(owner); }),
+                ElementsAre(u"categoryDeleted owner Keeper"));
 }
 
-TEST_F(Refresh, tellsACategoryThatWasGivenOtherFlagsAsAdded) {
+TEST_F(Refresh, reportsACategoryWithOtherFlagsAsAdded) {
     auto single = CategoryDefinition(u"State", u"status");
     single.setIsSingleValued(true);
 
-    EXPECT_THAT(told([&] { labels().createCategory(single); }), ElementsAre(u"categoryAdded status State"));
+    EXPECT_THAT(eventsOf([&] { labels().createCategory(single); }),
+                ElementsAre(u"categoryAdded status State"));
 }
 
-TEST_F(Refresh, tellsLabelsThatCameAndWent) {
+TEST_F(Refresh, reportsLabelsThatWereCreatedAndDeleted) {
     auto const open = LabelDefinition(u"Open", u"open");
 
-    EXPECT_THAT(told([&] { labels().createLabel(status_, open); }),
+    EXPECT_THAT(eventsOf([&] { labels().createLabel(status_, open); }),
                 ElementsAre(u"labelModified status open"));
-    EXPECT_THAT(told([&] { labels().deleteLabel(status_, open); }),
+    EXPECT_THAT(eventsOf([&] { labels().deleteLabel(status_, open); }),
                 ElementsAre(u"labelModified status open"));
 }
 
-TEST_F(Refresh, tellsWhatALabelThatWentWasCalled) {
+TEST_F(Refresh, reportsTheNameOfADeletedLabel) {
     std::u16string name;
     session_.events()->onLabelModified(
         [&](Label const& label) { name = label.getLabelIdentifier().getName(); });
 
-    told([&] { labels().deleteLabel(status_, done_); });
+    eventsOf([&] { labels().deleteLabel(status_, done_); });
 
     EXPECT_EQ(name, u"Done");
 }
 
-TEST_F(Refresh, tellsACategoryThatWentWithItsLabelsAndTheFilesThatBoreThem) {
+TEST_F(Refresh, reportsADeletedCategoryAndTheFilesThatHadItsLabels) {
     files().addLabels({valve_}, {label()});
     refresh();
 
-    EXPECT_THAT(told([&] { labels().deleteCategory(status_); }),
+    EXPECT_THAT(eventsOf([&] { labels().deleteCategory(status_); }),
                 ElementsAre(u"categoryDeleted status Status", u"fileLabelsChanged " + at(u"valve.cpp")));
 }
 
-TEST_F(Refresh, tellsACategoryThatCameWithItsLabels) {
+TEST_F(Refresh, reportsANewCategoryWithItsLabels) {
     auto const owner = CategoryDefinition(u"Owner", u"owner");
     labels().createCategory(owner);
     labels().createLabel(owner, LabelDefinition(u"Ada", u"ada"));
@@ -181,41 +184,41 @@ TEST_F(Refresh, tellsACategoryThatCameWithItsLabels) {
     EXPECT_THAT(refresh(), ElementsAre(u"categoryAdded owner Owner", u"labelModified owner ada"));
 }
 
-TEST_F(Refresh, tellsWhatHasOneEventForAllOfIt) {
+TEST_F(Refresh, reportsPartsThatHaveASingleEvent) {
     auto& project = other_.project();
     auto point = EntryPointDefinition(engine_);
     auto const target = folder_.folder(u"lib");
 
-    EXPECT_THAT(told([&] { project.setName(u"Pump"); }), ElementsAre(u"nameChanged"));
-    EXPECT_THAT(told([&] { project.getEntryPointManager().setEntryPoint(point); }),
+    EXPECT_THAT(eventsOf([&] { project.setName(u"Pump"); }), ElementsAre(u"nameChanged"));
+    EXPECT_THAT(eventsOf([&] { project.getEntryPointManager().setEntryPoint(point); }),
                 ElementsAre(u"entryPointsChanged"));
-    EXPECT_THAT(told([&] {
+    EXPECT_THAT(eventsOf([&] {
                     project.getEntryPointManager().createEntryPointGroup(EntryPointGroupDefinition(u"Tests"));
                 }),
                 ElementsAre(u"entryPointsChanged"));
-    EXPECT_THAT(told([&] {
+    EXPECT_THAT(eventsOf([&] {
                     project.getProjectPathManager().getFolderReferenceManager().addReferences(
                         {management::relativeFolderReference(target, folder_.root())});
                 }),
                 ElementsAre(u"pathChanged"));
-    EXPECT_THAT(told([&] {
+    EXPECT_THAT(eventsOf([&] {
                     project.getProjectReferenceManager().getFolderReferenceManager().addReferences(
                         {management::absoluteFolderReference(target)});
                 }),
                 ElementsAre(u"referencesChanged"));
 }
 
-TEST_F(Refresh, tellsOfAnythingElseThatMetadataChanged) {
-    EXPECT_THAT(told([&] { other_.project().setDescription(u"Pumps water"); }),
+TEST_F(Refresh, reportsAnyOtherChangeAsMetadataChange) {
+    EXPECT_THAT(eventsOf([&] { other_.project().setDescription(u"Pumps water"); }),
                 ElementsAre(u"metadataChange"));
-    EXPECT_THAT(told([&] {
+    EXPECT_THAT(eventsOf([&] {
                     files().getFileMetadataManagerFor(u"Notes")->setFileNodes(
                         {{engine_, std::make_shared<metadata::MetadataNodeSpecification>(u"Info")}});
                 }),
                 ElementsAre(u"metadataChange"));
 }
 
-TEST_F(Refresh, tellsOfALabelThatNobodyCanReadThatMetadataChanged) {
+TEST_F(Refresh, reportsAnUnreadableLabelAsMetadataChange) {
     auto const address = metadata::MetadataPathBuilder()
                              .add(u"Categories", u"Root")
                              .add(u"Category", u"status")
@@ -225,20 +228,20 @@ TEST_F(Refresh, tellsOfALabelThatNobodyCanReadThatMetadataChanged) {
     node->put(u"ReadOnly", u"perhaps");
     std::map<metadata::MetadataPath, std::shared_ptr<metadata::MetadataNode>> nodes{{address, node}};
 
-    EXPECT_THAT(told([&] { other_.store().setNodes(nodes); }), ElementsAre(u"metadataChange"));
+    EXPECT_THAT(eventsOf([&] { other_.store().setNodes(nodes); }), ElementsAre(u"metadataChange"));
 }
 
-TEST_F(Refresh, tellsAllThatHappenedSinceTheLastTimeAsOneChange) {
+TEST_F(Refresh, reportsEverythingSinceThePreviousCallAsOneChange) {
     auto const tank = folder_.file(u"tank.cpp");
     files().add({tank});
-    EXPECT_TRUE(session_.project().getFileManager().isFileInProject(tank)); // seen, and not told
+    EXPECT_TRUE(session_.project().getFileManager().isFileInProject(tank)); // seen, but not reported
     other_.project().setName(u"Pump");
     files().remove({tank});
 
     EXPECT_THAT(refresh(), ElementsAre(u"nameChanged"));
 }
 
-TEST_F(Refresh, tellsWhatAProgramThatKnowsNoLocksHasWritten) {
+TEST_F(Refresh, reportsChangesOfAProgramThatTakesNoLock) {
     auto const text = folder_.onDisk() / ".projectdata" / "project.jsonl";
     auto const before = std::filesystem::file_size(text);
     std::ifstream file(text, std::ios::binary);
@@ -265,7 +268,7 @@ TEST_F(Refresh, letsASlotUseTheProjectAndRefreshItAgain) {
     EXPECT_THAT(lines, ElementsAre(u"nameChanged", u"fileListUpdate " + at(u"valve.cpp")));
 }
 
-TEST_F(Refresh, dispatchesWithTheNextCallWhatASlotThatThrewKeptBack) {
+TEST_F(Refresh, dispatchesTheRemainingEventsWithTheNextCallAfterASlotHasThrown) {
     bool isBroken = true;
     session_.events()->onNameChanged([&] {
         if (isBroken) {
@@ -291,7 +294,7 @@ TEST_F(Refresh, seesNothingNewWhileAGuardIsOpen) {
     EXPECT_THAT(refresh(), ElementsAre(u"nameChanged"));
 }
 
-TEST_F(Refresh, throwsForATextThatIsNoneAndTellsLaterWhatChangedMeanwhile) {
+TEST_F(Refresh, throwsForAnUnreadableTextAndReportsTheChangesLater) {
     auto const text = folder_.onDisk() / ".projectdata" / "project.jsonl";
     auto const aside = folder_.onDisk() / "aside";
     other_.project().setName(u"Pump");

@@ -1,3 +1,7 @@
+#include <filesystem>
+#include <functional>
+#include <optional>
+
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -8,16 +12,17 @@
 namespace project::session {
 namespace {
 
+using stores::StoreError;
 using ::testing::ElementsAre;
-using ::testing::HasSubstr;
 
-std::string messageOf(std::function<void()> const& action) {
+/// Runs an action that must fail. @return the kind of its StoreError.
+std::optional<StoreError::Kind> kindOfErrorIn(std::function<void()> const& action) {
     try {
         action();
-    } catch (stores::StoreError const& error) {
-        return error.what();
+    } catch (StoreError const& error) {
+        return error.kind();
     }
-    return "nothing was thrown";
+    return std::nullopt;
 }
 
 class Sessions : public ::testing::Test {
@@ -25,10 +30,10 @@ protected:
     test::TemporaryFolder folder_;
 };
 
-TEST_F(Sessions, makeAProjectThatIsThereWhenItIsOpenedAgain) {
+TEST_F(Sessions, createAProjectThatCanBeOpenedAgain) {
     auto const file = folder_.file(u"a");
     {
-        auto session = Session::make(folder_.root(), u"Engine");
+        auto session = Session::create(folder_.root(), u"Engine");
         session.project().getFileManager().add({file});
     }
 
@@ -38,36 +43,34 @@ TEST_F(Sessions, makeAProjectThatIsThereWhenItIsOpenedAgain) {
     EXPECT_THAT(session.project().getFileManager().getProjectFiles(), ElementsAre(file));
 }
 
-TEST_F(Sessions, openNothingWhereThereIsNoProject) {
-    EXPECT_THAT(messageOf([&] { Session::open(folder_.root()); }),
-                HasSubstr("there is no project in this folder"));
+TEST_F(Sessions, cannotBeOpenedWithoutAProject) {
+    EXPECT_EQ(kindOfErrorIn([&] { Session::open(folder_.root()); }), StoreError::Kind::Refused);
     EXPECT_FALSE(std::filesystem::exists(folder_.onDisk() / ".projectdata"));
 }
 
-TEST_F(Sessions, makeNoSecondProjectInAFolder) {
-    Session::make(folder_.root(), u"Engine");
+TEST_F(Sessions, doNotCreateASecondProjectInAFolder) {
+    Session::create(folder_.root(), u"Engine");
 
-    EXPECT_THAT(messageOf([&] { Session::make(folder_.root(), u"Pump"); }),
-                HasSubstr("there is a project in this folder already"));
+    EXPECT_EQ(kindOfErrorIn([&] { Session::create(folder_.root(), u"Pump"); }), StoreError::Kind::Refused);
     EXPECT_EQ(Session::open(folder_.root()).project().getName(), u"Engine");
 }
 
-TEST_F(Sessions, openWhatIsThereAndMakeWhatIsNot) {
-    EXPECT_EQ(Session::openOrMake(folder_.root(), u"Engine").project().getName(), u"Engine");
-    EXPECT_EQ(Session::openOrMake(folder_.root(), u"Pump").project().getName(), u"Engine");
+TEST_F(Sessions, openAnExistingProjectOrCreateOne) {
+    EXPECT_EQ(Session::openOrCreate(folder_.root(), u"Engine").project().getName(), u"Engine");
+    EXPECT_EQ(Session::openOrCreate(folder_.root(), u"Pump").project().getName(), u"Engine");
 }
 
-TEST_F(Sessions, bringTheRootIntoItsCanonicalForm) {
+TEST_F(Sessions, convertTheRootToCanonicalForm) {
     folder_.addFolder("engine");
     auto const link = folder_.addLink("link", "engine");
 
-    auto const session = Session::openOrMake(fl::filesystem::fromSystem(link / "."), u"Engine");
+    auto const session = Session::openOrCreate(fl::filesystem::fromSystem(link / "."), u"Engine");
 
     EXPECT_EQ(session.root(), folder_.root() / u"engine");
 }
 
-TEST_F(Sessions, tellObserversOfChangesAfterTheyAreMade) {
-    auto session = Session::make(folder_.root(), u"Engine");
+TEST_F(Sessions, reportChangesAfterTheyAreMade) {
+    auto session = Session::create(folder_.root(), u"Engine");
     auto const file = folder_.file(u"a");
     std::vector<std::vector<Path>> seen;
     session.events()->onFileListUpdate([&](std::vector<Path> const&) {
@@ -79,10 +82,10 @@ TEST_F(Sessions, tellObserversOfChangesAfterTheyAreMade) {
     EXPECT_THAT(seen, ElementsAre(ElementsAre(file)));
 }
 
-TEST_F(Sessions, leaveTheBroadcasterToWhoeverHoldsIt) {
+TEST_F(Sessions, leaveABroadcasterThatOutlivesThem) {
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> events;
     {
-        auto session = Session::make(folder_.root(), u"Engine");
+        auto session = Session::create(folder_.root(), u"Engine");
         events = session.events();
     }
     int calls = 0;
@@ -93,8 +96,8 @@ TEST_F(Sessions, leaveTheBroadcasterToWhoeverHoldsIt) {
     EXPECT_EQ(calls, 1);
 }
 
-TEST_F(Sessions, holdOneStateOfTheProjectForAsLongAsAGuardIsOpen) {
-    auto session = Session::make(folder_.root(), u"Engine");
+TEST_F(Sessions, showOneStateOfTheProjectWhileAGuardIsOpen) {
+    auto session = Session::create(folder_.root(), u"Engine");
     auto other = Session::open(folder_.root());
     {
         auto const guard = session.store().acquireReadLock();
@@ -106,8 +109,8 @@ TEST_F(Sessions, holdOneStateOfTheProjectForAsLongAsAGuardIsOpen) {
     EXPECT_EQ(session.project().getName(), u"Pump");
 }
 
-TEST_F(Sessions, canBeMovedWithAllThatWasHandedOut) {
-    auto session = Session::make(folder_.root(), u"Engine");
+TEST_F(Sessions, canBeMovedWhileReferencesStayValid) {
+    auto session = Session::create(folder_.root(), u"Engine");
     auto& project = session.project();
 
     Session const moved = std::move(session);

@@ -65,7 +65,7 @@ protected:
 
     test::TemporaryFolder folder_;
     Options const withoutGit_{SourceControl::Off, false};
-    Session session_ = Session::make(folder_.root(), u"Pump", withoutGit_);
+    Session session_ = Session::create(folder_.root(), u"Pump", withoutGit_);
     std::atomic<int> running_ = 0;
 
     std::thread start(std::function<void()> const& act) {

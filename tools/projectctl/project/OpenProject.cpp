@@ -31,7 +31,7 @@ OpenProject::OpenProject(Path const& root) : OpenProject(Session::open(root, ses
 }
 
 OpenProject OpenProject::make(Path const& root, std::u16string const& name) {
-    return OpenProject(Session::make(root, name, sessionOptions()));
+    return OpenProject(Session::create(root, name, sessionOptions()));
 }
 
 OpenProject::OpenProject(Session session)

@@ -6,6 +6,7 @@
 
 #include "project/WriteShield.hpp"
 #include "project/session.hpp"
+#include "project/session/ToolAccess.hpp"
 #include "project/stores/TextBackend.hpp"
 
 namespace projectctl {
@@ -45,7 +46,7 @@ public:
     project::metadata::MetadataManager& store() noexcept { return session_.store(); }
 
     /// What the store keeps its tree in. While a guard of the store is open, this may be loaded from.
-    project::stores::TextBackend& text() noexcept { return session_.text(); }
+    project::stores::TextBackend& text() noexcept { return access_.text(); }
 
     WriteShield& shield() noexcept { return *shield_; }
 
@@ -69,14 +70,14 @@ public:
     void stage() { session_.stage(); }
 
     /// Stages those of some files that were just added whose removal git has staged.
-    void stageReturned(std::vector<Path> const& files) { session_.stageReturned(files); }
+    void stageReturned(std::vector<Path> const& files) { access_.stageReturned(files); }
 
     /// Has stage count what was changed through text().
-    void stageLater() noexcept { session_.stageLater(); }
+    void stageLater() noexcept { access_.markTextForStaging(); }
 
     /// What git tracks below some folders and the project does not have. @param folders absolute.
     std::vector<Path> trackedOutsideProject(std::vector<Path> const& folders) {
-        return session_.trackedOutsideProject(folders);
+        return access_.trackedOutsideProject(folders);
     }
 
 private:
@@ -86,6 +87,7 @@ private:
 
     std::shared_ptr<WriteShield> shield_; ///< before the session: it goes last, when all is written
     Session session_;
+    project::session::ToolAccess access_{session_};
 };
 
 } // namespace projectctl

@@ -1,0 +1,42 @@
+#pragma once
+
+#include <vector>
+
+#include "project/session.hpp"
+
+namespace project::stores {
+class TextBackend;
+}
+
+namespace project::session {
+
+/// The parts of a session that only projectctl needs: it checks, repairs and merges the text itself.
+/// Applications do not need this header.
+class PROJECT_SESSION_EXPORT ToolAccess {
+public:
+    /// @param session must outlive this object. It may be moved meanwhile.
+    explicit ToolAccess(Session& session) noexcept;
+
+    /// The store's text. A change made through it is not staged; see markTextForStaging.
+    stores::TextBackend& text() noexcept;
+
+    /// Lets the next call of Session::stage stage the text, although the store did not write it: for
+    /// changes made through text().
+    void markTextForStaging() noexcept;
+
+    /// Stages those of these files whose removal is staged. For files that were removed and are now added
+    /// again: adding stages only files that git does not know. A session with EachChange does this itself.
+    /// Takes the write lock.
+    void stageReturned(std::vector<Path> const& files);
+
+    /// The files in some folders that git tracks and that are not in the project. If such a folder is
+    /// removed from the project, these files are removed from git's index too. Takes the write lock.
+    /// @param folders absolute.
+    /// @return in Path order; empty if source control is off.
+    std::vector<Path> trackedOutsideProject(std::vector<Path> const& folders);
+
+private:
+    Session::State& state_;
+};
+
+} // namespace project::session

@@ -1,0 +1,36 @@
+#pragma once
+
+#include <functional>
+#include <memory>
+#include <vector>
+
+#include "project/decorators/DispatchableProjectEventBroadcaster.hpp"
+
+namespace project::session {
+
+/// An event that is still to be dispatched.
+using Event = std::function<void(management::DispatchableProjectEventBroadcaster&)>;
+
+/// Collects the events that the managers raise, so that they can be dispatched when no lock is held.
+///
+/// It has no lock of its own: events are raised and taken under the store's write guard.
+class EventQueue {
+public:
+    EventQueue();
+    EventQueue(EventQueue const&) = delete;
+    EventQueue& operator=(EventQueue const&) = delete;
+
+    /// The broadcaster on which the managers raise their events. This object must outlive the last event.
+    std::shared_ptr<management::DispatchableProjectEventBroadcaster> const& input() const noexcept {
+        return input_;
+    }
+
+    /// Removes and returns all events, in the order in which they were raised.
+    std::vector<Event> take();
+
+private:
+    std::shared_ptr<management::DispatchableProjectEventBroadcaster> input_;
+    std::vector<Event> events_;
+};
+
+} // namespace project::session

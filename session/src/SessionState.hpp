@@ -1,0 +1,54 @@
+#pragma once
+
+#include <deque>
+#include <memory>
+#include <mutex>
+#include <optional>
+
+#include "ChangeExecutor.hpp"
+#include "DefinitionStager.hpp"
+#include "EventQueue.hpp"
+#include "project/git/GitAdapter.hpp"
+#include "project/session.hpp"
+#include "project/stores/TextBackend.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
+
+namespace project::session {
+
+/// The stack of a session. Members are destroyed in reverse order: the outermost manager first, the store
+/// last.
+class Session::State {
+public:
+    State(Path const& folder, Options options);
+
+    /// @throws StoreError if the folder does not contain a text.
+    void requireProject() const;
+
+    /// Creates the project if the store is empty. @return whether it was empty.
+    bool createProject(std::u16string const& name);
+
+    void stage();
+    bool refresh();
+
+    Path const root;
+    stores::TextBackend* text;                ///< owned by the store
+    std::unique_ptr<git::GitAdapter> adapter; ///< null if source control is off
+    std::shared_ptr<stores::TreeMetadataManager> store;
+    std::unique_ptr<DefinitionStager> stager; ///< null if source control is off
+    std::shared_ptr<management::DispatchableProjectEventBroadcaster> events;
+    EventQueue raised; ///< by the managers
+    ChangeExecutor executor;
+    std::unique_ptr<management::ProjectManager> project;
+
+private:
+    std::shared_ptr<stores::TreeMetadataManager> makeStore(Options options);
+    std::unique_ptr<DefinitionStager> makeStager();
+    std::unique_ptr<management::ProjectManager> makeManagers();
+    void queueEventsOfOthers();
+    std::optional<Event> nextEventOfOthers();
+
+    std::mutex eventsOfOthersMutex_;
+    std::deque<Event> eventsOfOthers_; ///< to be dispatched by refresh
+};
+
+} // namespace project::session
