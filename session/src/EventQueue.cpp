@@ -7,10 +7,6 @@
 
 namespace project::session {
 
-using management::CategoryIdentifier;
-using management::Label;
-using management::Path;
-
 namespace {
 
 using Broadcaster = management::DispatchableProjectEventBroadcaster;

@@ -149,6 +149,19 @@ TEST_F(Refresh, reportsACategoryWithOtherFlagsAsAdded) {
                 ElementsAre(u"categoryAdded status State"));
 }
 
+TEST_F(Refresh, reportsEachOtherFlagOfACategoryAsAdded) {
+    auto readOnly = CategoryDefinition(u"State", u"status");
+    readOnly.setIsReadOnly(true);
+    auto dated = CategoryDefinition(u"Due", u"due");
+    labels().createCategory(CategoryDefinition(u"Owner", u"due"));
+    refresh();
+
+    EXPECT_THAT(eventsOf([&] { labels().createCategory(readOnly); }),
+                ElementsAre(u"categoryAdded status State"));
+    EXPECT_THAT(eventsOf([&] { labels().createCategory(dated.setDataType(u"Date")); }),
+                ElementsAre(u"categoryAdded due Due"));
+}
+
 TEST_F(Refresh, reportsLabelsThatWereCreatedAndDeleted) {
     auto const open = LabelDefinition(u"Open", u"open");
 
@@ -229,6 +242,39 @@ TEST_F(Refresh, reportsAnUnreadableLabelAsMetadataChange) {
     std::map<metadata::MetadataPath, std::shared_ptr<metadata::MetadataNode>> nodes{{address, node}};
 
     EXPECT_THAT(eventsOf([&] { other_.store().setNodes(nodes); }), ElementsAre(u"metadataChange"));
+}
+
+TEST_F(Refresh, reportsNodesThatBelongToNoManagerAsMetadataChange) {
+    auto const category = metadata::MetadataPathBuilder().add(u"Categories", u"Root").build();
+    auto const label = metadata::MetadataPathBuilder()
+                           .add(category)
+                           .add(u"Category", u"status")
+                           .add(u"Label", u"done")
+                           .build();
+    auto const belowLabel = metadata::MetadataPathBuilder().add(label).add(u"Note", u"1").build();
+    auto const otherType = metadata::MetadataPathBuilder().add(u"Notes", u"Root").build();
+    auto const otherScope = metadata::MetadataPathBuilder().add(u"Files", u"Notes").build();
+    for (auto const& address : {category, belowLabel, otherType, otherScope}) {
+        std::map<metadata::MetadataPath, std::shared_ptr<metadata::MetadataNode>> nodes{
+            {address, std::make_shared<metadata::MetadataNodeSpecification>(u"Info")}};
+        EXPECT_THAT(eventsOf([&] { other_.store().setNodes(nodes); }), ElementsAre(u"metadataChange"));
+    }
+}
+
+TEST_F(Refresh, reportsAKeyOfACategoryThatNoManagerReadsAsMetadataChange) {
+    auto const address =
+        metadata::MetadataPathBuilder().add(u"Categories", u"Root").add(u"Category", u"status").build();
+    std::shared_ptr<metadata::MetadataNode> const node = other_.store().getNode(address);
+    node->put(u"Colour", u"red");
+    std::map<metadata::MetadataPath, std::shared_ptr<metadata::MetadataNode>> nodes{{address, node}};
+
+    EXPECT_THAT(eventsOf([&] { other_.store().setNodes(nodes); }), ElementsAre(u"metadataChange"));
+}
+
+TEST_F(Refresh, reportsANameThatIsRemoved) {
+    std::vector<metadata::MetadataPath> name{management::ProjectManagerBase::getRootNodePath()};
+
+    EXPECT_THAT(eventsOf([&] { other_.store().removeNodes(name); }), ElementsAre(u"nameChanged"));
 }
 
 TEST_F(Refresh, reportsEverythingSinceThePreviousCallAsOneChange) {

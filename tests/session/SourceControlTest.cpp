@@ -207,8 +207,7 @@ TEST_F(EveryKindOfChange, stagesAndReportsNothingIfItIsRefused) {
     test::EventLog log(*session_.events());
 
     EXPECT_THROW(project_.getFileManager().remove({folder_.path(u"missing")}), exception::ProjectException);
-    EXPECT_THROW(project_.getFileManager().addLabels({folder_.path(u"missing")}, {}),
-                 exception::ProjectException);
+    EXPECT_THROW(project_.getFileManager().add({folder_.path(u"missing")}), exception::ProjectException);
 
     EXPECT_THAT(log.take(), IsEmpty());
     EXPECT_EQ(status(), "");
@@ -378,6 +377,45 @@ TEST_F(SessionInRepository, findsTrackedFilesThatAreNotInTheProject) {
 
     EXPECT_THAT(ToolAccess(session).trackedOutsideProject({folder_.path(u"src")}), ElementsAre(tracked));
     EXPECT_THAT(ToolAccess(session).trackedOutsideProject({inProject, elsewhere}), IsEmpty());
+}
+
+TEST_F(SessionInRepository, stagesATextThatIsMarkedForStaging) {
+    auto session = Session::create(folder_.root(), u"Engine", {.sourceControl = SourceControl::WhenAsked});
+    session.stage();
+    auto unaware = Session::open(folder_.root(), {.sourceControl = SourceControl::Off});
+    unaware.project().setName(u"Pump");
+    session.stage();
+    ASSERT_THAT(staged(), Not(HasSubstr("Pump")));
+
+    ToolAccess(session).markTextForStaging();
+    session.stage();
+
+    EXPECT_THAT(staged(), HasSubstr("Pump"));
+}
+
+TEST_F(SessionInRepository, stagesFilesThatAreAddedAgainWhenAsked) {
+    auto session = Session::create(folder_.root(), u"Engine", {.sourceControl = SourceControl::WhenAsked});
+    auto const file = folder_.file(u"a");
+    session.project().getFileManager().add({file});
+    session.stage();
+    git_.commitAll();
+    session.project().getFileManager().remove({file});
+    session.project().getFileManager().add({file});
+    ASSERT_THAT(status(), HasSubstr("D  a\n"));
+
+    ToolAccess(session).stageReturned({file});
+
+    EXPECT_EQ(status(), "");
+}
+
+TEST_F(SessionInRepository, marksAndStagesNothingIfSourceControlIsOff) {
+    auto session = Session::create(folder_.root(), u"Engine", {.sourceControl = SourceControl::Off});
+
+    ToolAccess(session).markTextForStaging();
+    ToolAccess(session).stageReturned({folder_.file(u"a")});
+    session.stage();
+
+    EXPECT_EQ(git_.run({"ls-files"}), "");
 }
 
 TEST_F(SessionInRepository, worksInAFolderBelowTheTopOfTheRepository) {
