@@ -98,6 +98,19 @@ TEST_F(Attributes, ofEveryFormSetTheFilterDriver) {
     }
 }
 
+TEST_F(Attributes, ofTheRepositorysOwnFileMayDefineMacros) {
+    repository.write(".git/info/attributes", "[attr]up filter=upper\n");
+    repository.write(".gitattributes", "*.up up\n");
+    expectAgreement(" a macro in info/attributes");
+    EXPECT_TRUE(isRefused("b.up"));
+}
+
+TEST_F(Attributes, ofAFolderBelowTheTopCannotDefineMacros) {
+    repository.write("d/.gitattributes", "[attr]up filter=upper\n*.up up\n");
+    expectAgreement(" a macro in d/.gitattributes");
+    EXPECT_FALSE(isRefused("d/b.up"));
+}
+
 TEST_F(Attributes, inQuotesMayContainEveryCharacter) {
     for (auto const& [written, name] : std::map<std::string, std::string>{{"\\a", "\a"},
                                                                           {"\\b", "\b"},

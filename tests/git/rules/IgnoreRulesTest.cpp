@@ -174,6 +174,15 @@ TEST_F(IgnoreRules, ofAConfiguredFileMayBeReadThroughALink) {
     EXPECT_EQ(stateOf("b"), 2);
 }
 
+TEST_F(IgnoreRules, ofALongFileAreReadToTheEnd) {
+    std::string rules;
+    while (rules.size() < 20'000) {
+        rules += "# a comment\n";
+    }
+    expectAgreementOn(rules + "b\n");
+    EXPECT_EQ(stateOf("b"), 2);
+}
+
 TEST_F(IgnoreRules, areNotReadThroughALink) {
     folder.addFile(u"rules", "*\n");
     folder.addLink("work/d/.gitignore", folder.onDisk() / "rules");
