@@ -25,9 +25,11 @@ int __wrap_kill(pid_t process, int number);
 namespace {
 
 constexpr auto requestToEnd = SIGUSR1;
+volatile std::sig_atomic_t isEnding = 0;
 
-/// A test may have set a limit on the size of files; one below the hard limit can be taken back.
-void allowLargeFiles() {
+/// Lets the counters be written without interruption, and regardless of a limit on the size of files.
+void prepareEnd() {
+    isEnding = 1;
     rlimit limit{};
     getrlimit(RLIMIT_FSIZE, &limit);
     limit.rlim_cur = limit.rlim_max;
@@ -35,12 +37,15 @@ void allowLargeFiles() {
 }
 
 void writeCounters() {
-    allowLargeFiles();
+    prepareEnd();
     __gcov_dump();
     __gcov_reset(); // they may be written again at the end
 }
 
 void endBy(int number) {
+    if (isEnding != 0) {
+        return; // it is writing its counters
+    }
     writeCounters();
     std::signal(number, SIG_DFL);
     __real_kill(getpid(), number == requestToEnd ? SIGKILL : number);
@@ -48,7 +53,7 @@ void endBy(int number) {
 
 /// Gives a process that is about to be killed the time to write its counters.
 void requestEnd(pid_t process) {
-    constexpr int tries = 200;
+    constexpr int tries = 2000;
     __real_kill(process, requestToEnd);
     for (int count = 0; count < tries; ++count) {
         siginfo_t ended{};
@@ -61,7 +66,7 @@ void requestEnd(pid_t process) {
 }
 
 [[gnu::constructor]] void handleSignals() {
-    std::atexit(allowLargeFiles);
+    std::atexit(prepareEnd);
     for (auto const number : std::array{SIGINT, SIGTERM, requestToEnd}) {
         struct sigaction current {};
 
@@ -81,6 +86,7 @@ void __wrap__exit(int status) {
 
 int __wrap_raise(int number) {
     writeCounters();
+    isEnding = 0; // the signal may be handled or ignored
     return __real_raise(number);
 }
 
