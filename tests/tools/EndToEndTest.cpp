@@ -69,20 +69,41 @@ protected:
 
     void addNewFiles() {
         std::string input;
+        std::vector<std::string> files;
         for (std::size_t count = 1 + below(30); count > 0; --count) {
             auto const file = folderName(static_cast<int>(below(folders))) + "/new" + std::to_string(++made_);
             makeFile(file);
-            model_.add(file);
+            files.push_back(file);
             input += file + '\n';
         }
-        succeed({"add", "-"}, input);
+        expectLoss(tool({"add", "-"}, input), model_.add(files));
+    }
+
+    /// Adds files that are in the project already: nothing changes.
+    void addFilesAgain() { succeed({"add", "-0"}, withZeros(someFiles(20))); }
+
+    void addAFileAnew() {
+        auto const file = oneOf(model_.files());
+        expectLoss(tool({"add", "--anew", file}), model_.addAnew(file));
+    }
+
+    /// Expects that a call succeeded, and warned of exactly these folders, which lost their labels.
+    static void expectLoss(ProgramResult const& result, std::set<std::string> const& folders) {
+        EXPECT_EQ(result.exitCode, 0);
+        EXPECT_EQ(result.output, "");
+        Lines expected;
+        for (auto const& folder : folders) {
+            expected.insert("projectctl: warning: the folder \"" + folder +
+                            "\" has lost its labels, because a path below it was added");
+        }
+        auto const lines = linesOf(result.errors);
+        EXPECT_EQ(Lines(lines.begin(), lines.end()), expected);
     }
 
     void addAFolderAgain() {
         auto const folder = folderName(static_cast<int>(below(folders)));
         makeFile(folder + "/more" + std::to_string(++made_));
-        succeed({"add", "-r", folder});
-        model_.addContents(folder);
+        expectLoss(tool({"add", "-r", folder}), model_.addContents(folder));
     }
 
     void removeFiles() {
@@ -285,6 +306,8 @@ TEST_F(EndToEnd, everyCommandAnswersAsTheModelDoes) {
     std::vector<std::function<void()>> const changes{
         [this] { addNewFiles(); },
         [this] { addAFolderAgain(); },
+        [this] { addFilesAgain(); },
+        [this] { addAFileAnew(); },
         [this] { removeFiles(); },
         [this] { removeAFolder(); },
         [this] { deleteFromDisk(); },

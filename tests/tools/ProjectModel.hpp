@@ -30,26 +30,37 @@ public:
 
     void removeFromDisk(std::string const& file) { disk_.erase(file); }
 
-    void add(std::string const& file) {
-        for (auto path = file; !path.empty(); path = parentOf(path)) {
-            files_[path] = {}; // named again, and everything above it: the labels go
-        }
-    }
-
-    /// As `add --recursive`: what is in the project already is not touched, but for the folder that is named.
-    void addContents(std::string const& folder) {
-        std::vector<std::string> fresh;
-        for (auto const& [path, isFolder] : disk_) {
-            if (isWithin(path, folder) && !files_.contains(path)) {
-                fresh.push_back(path);
+    /// Adds files that are not in the project. The folders above them lose their labels.
+    /// @return the folders that had labels.
+    std::set<std::string> add(std::vector<std::string> const& files) {
+        std::set<std::string> losing;
+        for (auto const& file : files) {
+            for (auto path = file; !path.empty(); path = parentOf(path)) {
+                if (!files_[path].empty()) {
+                    losing.insert(path);
+                }
+                files_[path] = {};
             }
         }
-        if (!folder.empty()) {
-            add(folder);
+        return losing;
+    }
+
+    /// As `add --recursive`. @return as add.
+    std::set<std::string> addContents(std::string const& folder) {
+        std::vector<std::string> added;
+        for (auto const& [path, isFolder] : disk_) {
+            if (isWithin(path, folder) && !files_.contains(path)) {
+                added.push_back(path);
+            }
         }
-        for (auto const& path : fresh) {
-            add(path);
-        }
+        return add(added);
+    }
+
+    /// As `add --anew` of one path. @return as add, without the path itself.
+    std::set<std::string> addAnew(std::string const& file) {
+        auto losing = add({file});
+        losing.erase(file);
+        return losing;
     }
 
     void remove(std::string const& file) {

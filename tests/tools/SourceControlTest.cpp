@@ -62,6 +62,18 @@ TEST_F(InRepository, addBringsBackWhatWasRemovedAndNotYetCommitted) {
     EXPECT_EQ(status(), "");
 }
 
+TEST_F(InRepository, addStagesAgainAFileThatIsInTheProjectAndWasRemovedFromTheIndex) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
+    git_.commitAll();
+    git_.run({"rm", "--cached", "-q", "src/main.cpp"});
+    ASSERT_EQ(status(), "D  src/main.cpp\n?? src/main.cpp\n");
+
+    ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
+
+    EXPECT_EQ(status(), "");
+}
+
 TEST_F(InRepository, removeNamesWhatGitTrackedAndTheProjectNeverHad) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
@@ -70,10 +82,9 @@ TEST_F(InRepository, removeNamesWhatGitTrackedAndTheProjectNeverHad) {
     auto const removed = tool({"remove", "src"});
 
     EXPECT_EQ(removed.exitCode, 0);
-    EXPECT_EQ(removed.errors,
-              "projectctl: warning: \"" + inFolder("src/io/pump.cpp") +
-                  "\" is below a removed folder and not in the project; git will not track it any "
-                  "more\n");
+    EXPECT_EQ(removed.errors, "projectctl: warning: \"src/io/pump.cpp\" is below a removed folder but not in "
+                              "the project; git will no "
+                              "longer track it\n");
     EXPECT_THAT(status(), HasSubstr("D  src/io/pump.cpp\n"));
 }
 

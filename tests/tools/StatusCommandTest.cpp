@@ -32,10 +32,10 @@ TEST_F(StatusCommand, tellsWhatIsNewAndWhatIsGone) {
     EXPECT_THAT(tool({"status"}), Prints("new  a\nnew  src/new.cpp\ngone src/main.cpp\n"));
 }
 
-TEST_F(StatusCommand, tellsTheSameFromAnyFolder) {
+TEST_F(StatusCommand, comparesTheWholeProjectFromAnyFolder) {
     folder_.file(u"src/new.cpp");
 
-    EXPECT_THAT(toolFrom("src/io", {"status"}), Prints("new  src/new.cpp\n"));
+    EXPECT_THAT(toolFrom("src/io", {"status"}), Prints("new  ../new.cpp\n"));
 }
 
 TEST_F(StatusCommand, showsANewFolderInsteadOfItsContents) {

@@ -23,11 +23,12 @@ std::vector<std::unique_ptr<projectctl::Command>> makeCommands() {
     using namespace projectctl;
     std::vector<std::unique_ptr<Command>> result;
     for (auto* const make :
-         {makeInitCommand,      makeNameCommand,       makeDescriptionCommand, makeAddCommand,
-          makeRemoveCommand,    makeListCommand,       makeStatusCommand,      makeCategoryCommand,
-          makeLabelCommand,     makeEntryCommand,      makeGroupCommand,       makePathCommand,
-          makeReferenceCommand, makeReferencesCommand, makeCheckCommand,       makeWatchCommand,
-          makeTidyCommand,      makeSetupCommand,      makeMergeCommand,       makeResolveCommand}) {
+         {makeInitCommand,     makeRootCommand,      makeNameCommand,       makeDescriptionCommand,
+          makeAddCommand,      makeRemoveCommand,    makeListCommand,       makeStatusCommand,
+          makeCategoryCommand, makeLabelCommand,     makeEntryCommand,      makeGroupCommand,
+          makePathCommand,     makeReferenceCommand, makeReferencesCommand, makeCheckCommand,
+          makeWatchCommand,    makeTidyCommand,      makeSetupCommand,      makeMergeCommand,
+          makeResolveCommand}) {
         result.push_back(make());
     }
     return result;

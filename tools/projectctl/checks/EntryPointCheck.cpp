@@ -27,7 +27,7 @@ Findings EntryPointCheck::run() {
     for (auto const& [file, count] : files_) {
         if (count > 1) {
             findings_.push_back(
-                Finding::fault("the file " + inQuotes(file) + " has " + std::to_string(count) +
+                Finding::fault("the file " + inQuotes(shown_.of(file)) + " has " + std::to_string(count) +
                                " entry points, and only the first is ever found by its file"));
         }
     }
@@ -36,7 +36,7 @@ Findings EntryPointCheck::run() {
 
 void EntryPointCheck::check(std::u16string const& uuid, Node const& node) {
     auto const& file = node.get(schema::fileKey);
-    auto const entry = "the entry point " + inQuotes(uuid) + " of the file " + inQuotes(file);
+    auto const entry = "the entry point " + inQuotes(uuid) + " of the file " + inQuotes(shown_.of(file));
     ++files_[file];
     checkFile(entry, file);
     auto const& group = node.get(schema::groupKey);

@@ -5,6 +5,7 @@
 #include <string>
 
 #include "checks/Finding.hpp"
+#include "cli/ShownPaths.hpp"
 #include "project/OpenProject.hpp"
 
 namespace projectctl {
@@ -15,7 +16,8 @@ namespace projectctl {
 /// It reads the store, since the manager's own list leaves out some of these and ends at others.
 class EntryPointCheck {
 public:
-    explicit EntryPointCheck(OpenProject& project) : project_(project) {}
+    /// @param shown for the paths in findings, borrowed.
+    EntryPointCheck(OpenProject& project, ShownPaths& shown) : project_(project), shown_(shown) {}
 
     /// The caller holds a guard of the store.
     Findings run();
@@ -27,6 +29,7 @@ private:
     void checkFile(std::string const& entry, std::u16string const& file);
 
     OpenProject& project_;
+    ShownPaths& shown_;
     std::set<std::u16string> groups_;             ///< UUIDs
     std::map<std::u16string, std::size_t> files_; ///< how many entry points each file has
     Findings findings_;

@@ -45,11 +45,12 @@ LabelCheck::LabelCheck(project::metadata::MetadataManager& store) {
     }
 }
 
-void LabelCheck::check(std::u16string const& path, Node const& node, Findings& findings) const {
+void LabelCheck::check(std::u16string_view path, Node const& node, ShownPaths& shown,
+                       Findings& findings) const {
     if (node.getChildren().empty()) {
         return;
     }
-    auto const file = "the file " + inQuotes(path);
+    auto const file = "the file " + inQuotes(shown.of(path));
     for (auto const& [category, labels] : labelsOn(node)) {
         checkCategory(file, category, labels, findings);
     }

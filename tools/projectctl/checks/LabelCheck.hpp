@@ -5,6 +5,7 @@
 #include <string>
 
 #include "checks/Finding.hpp"
+#include "cli/ShownPaths.hpp"
 #include "project/metadata/MetadataManager.hpp"
 
 namespace projectctl {
@@ -17,8 +18,8 @@ public:
     explicit LabelCheck(project::metadata::MetadataManager& store);
 
     /// What is wrong with the labels on one file. Cheap for a file without labels.
-    /// @param path how the file is to be named. @param node what stands on the file.
-    void check(std::u16string const& path, project::metadata::MetadataNode const& node,
+    /// @param path relative to the root. @param node of the file.
+    void check(std::u16string_view path, project::metadata::MetadataNode const& node, ShownPaths& shown,
                Findings& findings) const;
 
 private:

@@ -4,11 +4,12 @@
 
 namespace projectctl {
 
-void checkName(std::u16string const& path, Findings& findings) {
+void checkName(std::u16string_view path, ShownPaths& shown, Findings& findings) {
     auto const backslash = path.rfind(u'\\');
     auto const separator = path.rfind(u'/');
-    if (backslash != std::u16string::npos && (separator == std::u16string::npos || separator < backslash)) {
-        findings.push_back(Finding::note(inQuotes(path) +
+    if (backslash != std::u16string_view::npos &&
+        (separator == std::u16string_view::npos || separator < backslash)) {
+        findings.push_back(Finding::note(inQuotes(shown.of(path)) +
                                          " has a backslash in its name: entry points of it, and "
                                          "of what is below it, and references to it cannot be found again"));
     }

@@ -8,16 +8,16 @@
 
 namespace projectctl {
 
-Findings findProblems(OpenProject& project) {
+Findings findProblems(OpenProject& project, ShownPaths shown) {
     Findings result;
     FileList const list(project);
     LabelCheck const labels(project.store());
     list.visit(project.root(), [&](FileList::File const& file) {
-        checkName(file.path, result);
-        labels.check(file.path, file.node, result);
+        checkName(file.path, shown, result);
+        labels.check(file.path, file.node, shown, result);
     });
-    append(result, EntryPointCheck(project).run());
-    append(result, ReferenceCheck(project).run());
+    append(result, EntryPointCheck(project, shown).run());
+    append(result, ReferenceCheck(project, shown).run());
     return result;
 }
 

@@ -45,7 +45,8 @@ void ReferenceCheck::checkForms(ReferenceList const& list, References const& ref
 void ReferenceCheck::checkTargets(ReferenceList const& list, References const& references) {
     for (auto const& reference : references) {
         auto const& folder = reference.getLocation();
-        auto const what = "the reference " + inQuotes(reference.getStoredPath()) + " in " + list.name;
+        auto const what =
+            "the reference " + inQuotes(shown_.of(reference.getStoredPath())) + " in " + list.name;
         if (!project::metadata::is_directory(folder)) {
             findings_.push_back(
                 Finding::note(what + " leads nowhere: there is no folder " + inQuotes(folder.native())));

@@ -3,6 +3,7 @@
 #include <vector>
 
 #include "checks/Finding.hpp"
+#include "cli/ShownPaths.hpp"
 #include "project/OpenProject.hpp"
 #include "references/ReferenceLists.hpp"
 
@@ -12,7 +13,8 @@ namespace projectctl {
 /// not read.
 class ReferenceCheck {
 public:
-    explicit ReferenceCheck(OpenProject& project) : project_(project) {}
+    /// @param shown for the paths in findings, borrowed.
+    ReferenceCheck(OpenProject& project, ShownPaths& shown) : project_(project), shown_(shown) {}
 
     /// The caller holds a guard of the store.
     Findings run();
@@ -24,6 +26,7 @@ private:
     void checkTargets(ReferenceList const& list, References const& references);
 
     OpenProject& project_;
+    ShownPaths& shown_;
     Findings findings_;
 };
 

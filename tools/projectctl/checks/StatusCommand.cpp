@@ -6,6 +6,7 @@
 #include "checks/Problems.hpp"
 #include "checks/StatusScan.hpp"
 #include "cli/Settings.hpp"
+#include "cli/ShownPaths.hpp"
 #include "git/GitIgnore.hpp"
 #include "git/MergeSetup.hpp"
 #include "output/JsonRows.hpp"
@@ -40,7 +41,7 @@ public:
             printError("warning: " + line);
         }
         Differences found{gitignore_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
-                          findProblems(project)};
+                          findProblems(project, json_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_))};
         if (settings().sourceControl && lookForMergeSetup(root_) == MergeSetup::Missing) {
             found.problems.push_back(Finding::note("git merges the project's text line by line: 'projectctl "
                                                    "setup' has it done by what the text says"));
@@ -94,8 +95,9 @@ private:
 
     /// @param standsForContents whether a folder is shown alone instead of what is in it.
     void writeLines(char const* word, Files const& files, bool standsForContents) const {
+        ShownPaths shown(root_);
         for (auto const& file : files) {
-            std::u16string path = project::metadata::getRelativePath(root_, file.path);
+            std::u16string path(shown.ofAbsolute(file.path));
             path += standsForContents && file.kind == Kind::Folder ? u"/" : u"";
             output().text() += word;
             output().name(path);

@@ -53,15 +53,19 @@ bool isOneOf(std::u16string const& text, std::initializer_list<std::u16string_vi
 } // namespace
 
 TreeCheck::TreeCheck(OpenProject& project)
-    : project_(project), store_(project.store()), guard_(store_.acquireReadLock()), labels_(store_) {
+    : project_(project),
+      store_(project.store()),
+      guard_(store_.acquireReadLock()),
+      labels_(store_),
+      shown_(project.root()) {
 }
 
 Findings TreeCheck::run() {
     for (auto const& head : store_.getChildNodes(MetadataPath::root())) {
         checkHead(head);
     }
-    append(findings_, EntryPointCheck(project_).run());
-    append(findings_, ReferenceCheck(project_).run());
+    append(findings_, EntryPointCheck(project_, shown_).run());
+    append(findings_, ReferenceCheck(project_, shown_).run());
     return std::move(findings_);
 }
 
@@ -111,12 +115,12 @@ void TreeCheck::checkFile(Address const& file) {
     }
     auto const above = file.parent();
     if (above.depth() > 1 && !store_.hasNode(above)) {
-        fault("the file " + inQuotes(pathOf(file)) +
+        fault("the file " + inQuotes(shown_.of(pathOf(file))) +
               " is listed and its folder is not, so that no list of the project shows it");
     }
     if (file[0].getLocation() == schema::root) {
-        checkName(pathOf(file), findings_);
-        labels_.check(pathOf(file), *node, findings_);
+        checkName(pathOf(file), shown_, findings_);
+        labels_.check(pathOf(file), *node, shown_, findings_);
     }
 }
 

@@ -38,6 +38,7 @@ private:
     project::metadata::MetadataManager& store_; ///< the project's
     cmlink::ReentrantReadWriteLock::LockGuard guard_;
     LabelCheck labels_;
+    ShownPaths shown_;
     Findings findings_;
 };
 

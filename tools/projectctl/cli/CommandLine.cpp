@@ -2,17 +2,54 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <iterator>
 
 #include "cli/Settings.hpp"
 #include "cli/TextArguments.hpp"
+#include "cli/WorkingFolder.hpp"
 #include "output/Output.hpp"
 
 namespace projectctl {
 
 namespace {
 
-/// Stands wherever among the arguments, for the parser would want it before the command.
+// The options that every command accepts. They may be anywhere among the arguments; the parser would accept
+// them only before the command.
 constexpr char const* sourceControlOff = "--no-source-control";
+constexpr char const* fullNames = "--full-name";
+constexpr char const* inFolder = "-C";
+
+/// Declares them to the parser, for the help text alone.
+void declareCommonOptions(CLI::App& tool) {
+    auto const ignore = [] {};
+    auto const ignoreValue = [](CLI::results_t const&) { return true; };
+    tool.add_option(inFolder, ignoreValue, "Run as if started in the folder DIR")->option_text("DIR");
+    tool.add_flag_callback(fullNames, ignore,
+                           "Show paths relative to the project's root, not to the current folder");
+    tool.add_flag_callback(sourceControlOff, ignore,
+                           "Do not use git: stage nothing, and remove nothing from its index");
+    // Help of each command shows this, too.
+    tool.footer(
+        "Every command accepts -C DIR, --full-name and --no-source-control, before and after its name: see "
+        "'projectctl --help'.");
+}
+
+/// Applies them and removes them from the arguments.
+/// @return the folders to enter, one after the other.
+std::vector<std::string> takeCommonOptions(std::vector<std::string>& arguments) {
+    settings().sourceControl = std::erase(arguments, sourceControlOff) == 0;
+    settings().showsFullNames = std::erase(arguments, fullNames) > 0;
+    std::vector<std::string> folders;
+    for (auto found = std::ranges::find(arguments, inFolder); found != arguments.end();
+         found = std::ranges::find(arguments, inFolder)) {
+        if (std::next(found) == arguments.end()) {
+            throw CLI::ArgumentMismatch("-C needs a folder");
+        }
+        folders.push_back(unmarked(*std::next(found)));
+        arguments.erase(found, found + 2);
+    }
+    return folders;
+}
 
 /// The command that was called for, as far as it was named, and how it is called.
 struct Called {
@@ -56,18 +93,17 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     CLI::App tool("Keeps the definition of an engineering project beside its files.", "projectctl");
     tool.require_subcommand(1);
     tool.set_version_flag("--version", version, "Show the version and exit");
-    bool shownInHelpAlone = false;
-    tool.add_flag(sourceControlOff, shownInHelpAlone,
-                  "With any command: leave git alone, stage nothing, take nothing out of its index");
+    declareCommonOptions(tool);
     std::vector<CLI::App*> declared;
     declared.reserve(commands.size());
     for (auto const& command : commands) {
         declared.push_back(command->declare(tool));
     }
     auto arguments = markedArguments(argc, argv);
-    settings().sourceControl = std::erase(arguments, sourceControlOff) == 0;
-    std::ranges::reverse(arguments); // so the parser wants them
+    std::vector<std::string> folders;
     try {
+        folders = takeCommonOptions(arguments);
+        std::ranges::reverse(arguments); // the order that the parser expects
         tool.parse(std::move(arguments));
     } catch (CLI::CallForHelp const&) {
         return showHelp(tool);
@@ -78,6 +114,7 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     } catch (CLI::ParseError const& error) {
         return refuse(error, tool);
     }
+    std::ranges::for_each(folders, enterFolder);
     auto const called =
         std::find_if(declared.begin(), declared.end(), [](auto* app) { return app->parsed(); });
     auto const result = commands[static_cast<std::size_t>(called - declared.begin())]->run();

@@ -36,4 +36,18 @@ std::vector<Path> PathArguments::read() const {
     return result;
 }
 
+Path absolutePath(std::string const& argument) {
+    return ArgumentPaths(workingFolder()).absolute(argument);
+}
+
+std::vector<Path> absolutePaths(std::vector<std::string> const& arguments) {
+    ArgumentPaths paths(workingFolder());
+    std::vector<Path> result;
+    result.reserve(arguments.size());
+    for (auto const& argument : arguments) {
+        result.push_back(paths.absolute(argument));
+    }
+    return result;
+}
+
 } // namespace projectctl

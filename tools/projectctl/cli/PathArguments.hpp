@@ -27,4 +27,12 @@ private:
     bool null_ = false;
 };
 
+/// The absolute path of one argument, in the form of the project's root. Relative paths start from the
+/// current folder.
+/// @throws Failure for an empty argument.
+Path absolutePath(std::string const& argument);
+
+/// The same for several arguments.
+std::vector<Path> absolutePaths(std::vector<std::string> const& arguments);
+
 } // namespace projectctl

@@ -2,9 +2,10 @@
 
 namespace projectctl {
 
-/// What the person who calls has chosen for whatever command.
+/// The options that every command accepts.
 struct Settings {
-    bool sourceControl = true; ///< else git is left alone
+    bool sourceControl = true;   ///< false: the tool does not use git
+    bool showsFullNames = false; ///< show paths relative to the root instead of the current folder
 };
 
 /// Set while the command line is read.

@@ -24,12 +24,6 @@ std::string_view behindMarks(std::string_view text) {
     return text.substr(std::min(text.find_first_not_of(mark), text.size()));
 }
 
-std::string unmarked(std::string const& argument) {
-    auto const rest = behindMarks(argument);
-    bool const isMarked = rest.size() < argument.size() && (isSpecial(rest) || rest.starts_with('-'));
-    return isMarked ? argument.substr(1) : argument;
-}
-
 } // namespace
 
 CLI::Option* takeText(CLI::App& app, std::string const& name, std::optional<std::string>& value,
@@ -64,6 +58,12 @@ std::vector<std::string> markedArguments(int argc, char const* const* argv) {
                          std::string(argument));
     }
     return result;
+}
+
+std::string unmarked(std::string const& argument) {
+    auto const rest = behindMarks(argument);
+    bool const isMarked = rest.size() < argument.size() && (isSpecial(rest) || rest.starts_with('-'));
+    return isMarked ? argument.substr(1) : argument;
 }
 
 std::string withoutMarks(std::string text) {

@@ -21,6 +21,9 @@ CLI::Option* takeTexts(CLI::App& app, std::string const& name, std::vector<std::
 /// `takeTexts` return them to the form in which they were given.
 std::vector<std::string> markedArguments(int argc, char const* const* argv);
 
+/// One of these arguments in the form in which it was given.
+std::string unmarked(std::string const& argument);
+
 /// A text of the parser, which may quote arguments, in the form in which they were given.
 std::string withoutMarks(std::string text);
 

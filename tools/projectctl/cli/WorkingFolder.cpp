@@ -16,4 +16,15 @@ fl::filesystem::Path workingFolder() {
     return fl::filesystem::fromSystem(folder);
 }
 
+void enterFolder(std::string const& folder) {
+    if (folder.empty()) {
+        return;
+    }
+    std::error_code error;
+    std::filesystem::current_path(folder, error);
+    if (error) {
+        throw Failure("cannot change to the folder \"" + folder + "\": " + error.message());
+    }
+}
+
 } // namespace projectctl

@@ -22,7 +22,7 @@ EntryPointGroup& Groups::named(std::string const& name) const {
     auto const chosen = choose(names, wanted, "entry point groups");
     if (!chosen) {
         throw Failure("there is no entry point group " + inQuotes(wanted) +
-                      ". 'projectctl group list' shows those that there are");
+                      ". 'projectctl group list' shows the groups");
     }
     return *groups_[*chosen];
 }

@@ -1,9 +1,11 @@
 #include <algorithm>
 #include <iterator>
+#include <set>
 #include <string>
 #include <vector>
 
 #include "cli/PathArguments.hpp"
+#include "cli/ShownPaths.hpp"
 #include "files/Commands.hpp"
 #include "files/DiskFolder.hpp"
 #include "files/DiskWalk.hpp"
@@ -13,81 +15,113 @@
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
 #include "project/ProjectCommand.hpp"
+#include "project/files/LabelIDSet.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
 
 namespace {
 
-/// Adds files and folders, all in one step: either all of them are in the project afterwards, or none is.
+/// Adds files and folders in one step: either all of them are in the project afterwards, or none is.
+///
+/// The file manager drops the labels of a file that is added again, and those of the folders above an added
+/// file. This command therefore passes it only paths that are not in the project yet, unless the user asks
+/// for the rest with --anew; and it reports the folders that have lost their labels.
 class AddCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand("add", "Add files and folders to the project");
-        given_.declare(*app, "What to add");
-        app->add_flag("-r,--recursive", recursive_,
-                      "Add what folders contain, at any depth: not what source control or a project's store "
-                      "keeps, no sockets, pipes and devices; symbolic links are added and not entered");
-        app->add_flag("--gitignore", gitignore_, "Of what folders contain, leave out what git ignores")
+        auto* const app = tool.add_subcommand(
+            "add", "Add files and folders to the project. Those that are already in the project are skipped");
+        given_.declare(*app, "The files and folders");
+        app->add_flag(
+            "-r,--recursive", isRecursive_,
+            "Also add the contents of folders, at any depth, except the data of source control and of "
+            "project stores, sockets, pipes and devices. Symbolic links are added but not followed");
+        app->add_flag("--gitignore", leavesOutIgnored_, "Leave out the contents of folders that git ignores")
             ->needs("--recursive");
+        app->add_flag("--anew", addsAnew_,
+                      "Do not skip the given paths that are already in the project: add them again, without "
+                      "their labels");
         return app;
     }
 
     int run(OpenProject& project) override {
-        auto paths = given_.read();
-        add(project, paths);
-        tellUnaddable();
-        output().say(std::to_string(paths.size()) + " added to the project");
+        auto const given = given_.read();
+        Progress progress("Reading folders");
+        auto const contents = isRecursive_ ? contentsOf(given, project, progress) : std::vector<Path>();
+        auto const addedCount = add(project, given, contents, progress);
+        report(project, addedCount);
         return 0;
     }
 
 private:
-    /// @param paths becomes all that was added.
-    void add(OpenProject& project, std::vector<Path>& paths) {
-        Progress progress("Reading folders");
-        auto contents = recursive_ ? contentsOf(paths, project, progress) : std::vector<Path>();
-        std::erase(paths, project.root()); // in every project, and nothing to add
-        paths.insert(paths.end(), std::make_move_iterator(contents.begin()),
-                     std::make_move_iterator(contents.end()));
-        progress.begin("Adding " + std::to_string(paths.size()) + " files and folders");
-        project.files().add(paths);
-        project.stageReturned(paths);
+    /// @return the number of paths that were added.
+    std::size_t add(OpenProject& project, std::vector<Path> const& given, std::vector<Path> const& contents,
+                    Progress& progress) {
+        auto const guard = project.store().acquireWriteLock(); // one state for the questions and the change
+        std::vector<Path> added;
+        std::vector<Path> skipped;
+        for (auto const& path : given) {
+            if (path != project.root()) { // the root is part of every project
+                auto const isSkipped = !addsAnew_ && project.files().isFileInProject(path);
+                (isSkipped ? skipped : added).push_back(path);
+            }
+        }
+        std::ranges::copy_if(contents, std::back_inserter(added),
+                             [&](Path const& path) { return !project.files().isFileInProject(path); });
+        losingLabels_ = foldersLosingLabels(project, added);
+        progress.begin("Adding " + std::to_string(added.size()) + " files and folders");
+        project.files().add(added);
+        project.stageReturned(added);
+        project.stageReturned(skipped);
+        skippedCount_ = skipped.size();
+        return added.size();
     }
 
-    /// What the folders among the paths contain and the project does not have yet: what it has is not
-    /// touched.
-    std::vector<Path> contentsOf(std::vector<Path> const& paths, OpenProject& project, Progress& progress) {
+    /// The folders above added paths that are in the project with labels. Folders that are added again
+    /// themselves are not among them: the user asked for that.
+    std::vector<Path> foldersLosingLabels(OpenProject& project, std::vector<Path> const& added) const {
+        std::set<Path> addedAgain;
+        if (addsAnew_) {
+            addedAgain.insert(added.begin(), added.end());
+        }
+        std::set<Path> visited;
+        std::vector<Path> result;
+        for (auto const& path : added) {
+            auto folder = project::metadata::getParentFolder(path);
+            while (project::metadata::isParent(folder, project.root()) && visited.insert(folder).second) {
+                if (!addedAgain.contains(folder) && project.files().isFileInProject(folder) &&
+                    !project.files().getLabelIDSets(folder).empty()) {
+                    result.push_back(folder);
+                }
+                folder = project::metadata::getParentFolder(folder);
+            }
+        }
+        return result;
+    }
+
+    /// The contents of the given folders.
+    std::vector<Path> contentsOf(std::vector<Path> const& given, OpenProject& project, Progress& progress) {
         DiskWalk walk(project.root(), progress);
         auto const storeFolder = project.store().getMetadataRoot();
-        for (auto const& path : paths) {
-            // What cannot be added is not walked through: the file manager says why it cannot.
+        for (auto const& path : given) {
+            // A folder that cannot be added is not walked: the file manager reports why it cannot.
             if (isWithin(path, project.root()) && !isWithin(path, storeFolder) && isFolderItself(path)) {
                 walk.enter(path);
             }
         }
         unaddable_ = walk.unaddable();
         auto result = walk.found();
-        if (gitignore_) {
+        if (leavesOutIgnored_) {
             progress.begin("Asking git what it ignores");
             result = withoutIgnoredByGit(project.root(), std::move(result));
         }
-        requireReadable(walk.unreadable(), paths, result);
-        auto const guard = project.store().acquireReadLock();
-        std::erase_if(result, [&](Path const& path) { return project.files().isFileInProject(path); });
+        requireReadable(walk.unreadable(), given, result);
         return result;
     }
 
     static bool isWithin(Path const& path, Path const& folder) {
         return path == folder || project::metadata::isParent(path, folder);
-    }
-
-    void tellUnaddable() const {
-        if (!unaddable_.empty()) {
-            auto const others = unaddable_.size() - 1;
-            printError("left out \"" + shown(unaddable_.front()) + '"' +
-                       (others > 0 ? " and " + std::to_string(others) + " more" : "") +
-                       ": a name that begins with two dots cannot be added from the project's root");
-        }
     }
 
     /// A folder that is not added need not be readable.
@@ -100,10 +134,29 @@ private:
         }
     }
 
+    void report(OpenProject& project, std::size_t addedCount) const {
+        ShownPaths shown(project.root());
+        if (!unaddable_.empty()) {
+            auto const others = unaddable_.size() - 1;
+            printError("left out " + inQuotes(shown.ofAbsolute(unaddable_.front())) +
+                       (others > 0 ? " and " + std::to_string(others) + " more" : "") +
+                       ": a name that begins with two dots cannot be added from the project's root");
+        }
+        for (auto const& folder : losingLabels_) {
+            printError("warning: the folder " + inQuotes(shown.ofAbsolute(folder)) +
+                       " has lost its labels, because a path below it was added");
+        }
+        output().say(std::to_string(addedCount) + " added to the project" +
+                     (skippedCount_ > 0 ? ", " + std::to_string(skippedCount_) + " already in it" : ""));
+    }
+
     PathArguments given_;
-    bool recursive_ = false;
-    bool gitignore_ = false;
-    std::vector<Path> unaddable_; ///< what was left out of the folders' contents
+    bool isRecursive_ = false;
+    bool leavesOutIgnored_ = false;
+    bool addsAnew_ = false;
+    std::size_t skippedCount_ = 0;
+    std::vector<Path> unaddable_;    ///< left out of the contents of the folders
+    std::vector<Path> losingLabels_; ///< folders above added paths
 };
 
 } // namespace

@@ -27,12 +27,12 @@ struct CloseFolder {
 
 using FolderHandle = std::unique_ptr<DIR, CloseFolder>;
 
-/// What a folder of one of these names is, no project holds.
-constexpr std::array<std::string_view, 8> foldersOfOthers{".git",   ".hg", ".svn", ".bzr",
-                                                          "_darcs", "CVS", ".jj",  ".projectdata"};
+/// Folders with these names belong to source control or to a project store.
+constexpr std::array<std::string_view, 8> foreignFolders{".git",   ".hg", ".svn", ".bzr",
+                                                         "_darcs", "CVS", ".jj",  ".projectdata"};
 
-/// The kind as the file system noted it beside the name; a file system that does not is asked.
-unsigned char noteOf(DIR* folder, dirent const& entry) {
+/// The kind of an entry as the file system returned it with the name, or else as fstatat returns it.
+unsigned char typeOf(DIR* folder, dirent const& entry) {
     struct stat status {};
 
     if (entry.d_type != DT_UNKNOWN) {
@@ -44,12 +44,12 @@ unsigned char noteOf(DIR* folder, dirent const& entry) {
     return static_cast<unsigned char>(IFTODT(status.st_mode));
 }
 
-/// @return empty for what a project does not hold.
-std::optional<Kind> kindOf(std::string_view name, unsigned char note) {
-    bool const ofOthers = std::ranges::find(foldersOfOthers, name) != foldersOfOthers.end();
-    switch (note) {
+/// @return empty for an entry that a project does not contain.
+std::optional<Kind> kindOf(std::string_view name, unsigned char type) {
+    bool const isForeign = std::ranges::find(foreignFolders, name) != foreignFolders.end();
+    switch (type) {
     case DT_DIR:
-        return name == "." || name == ".." || ofOthers ? std::nullopt : std::optional(Kind::Folder);
+        return name == "." || name == ".." || isForeign ? std::nullopt : std::optional(Kind::Folder);
     case DT_REG: // in a linked working tree or a submodule, .git is a file
         return name == ".git" ? std::nullopt : std::optional(Kind::File);
     case DT_LNK:
@@ -81,9 +81,9 @@ std::vector<DiskEntry> readDiskFolder(Path const& folder) {
     }
     std::vector<DiskEntry> result;
     errno = 0;
-    while (auto const* entry = readdir(handle.get())) { // NOLINT(concurrency-mt-unsafe): each its own folder
+    while (auto const* entry = readdir(handle.get())) { // NOLINT(concurrency-mt-unsafe): own handle
         std::string_view const found = &entry->d_name[0];
-        if (auto const kind = kindOf(found, noteOf(handle.get(), *entry))) {
+        if (auto const kind = kindOf(found, typeOf(handle.get(), *entry))) {
             result.push_back({toText(found), *kind});
         }
         errno = 0;

@@ -10,30 +10,30 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// Something on disk that a project can hold: a file, a folder or a symbolic link, which counts as a file.
+/// A file or folder on disk that a project can contain. A symbolic link counts as a file.
 struct DiskEntry {
     std::u16string name;
     Kind kind;
 };
 
-/// What a folder on disk holds, by name in code units.
+/// The entries of a folder on disk, sorted by name in code units.
 ///
-/// Left out is what never belongs to a project: what source control and the projects' own stores keep, and
-/// sockets, pipes and devices. Asks the disk nothing but the folder's own entries, where the file system
-/// tells the kind of each with its name.
-/// @throws std::system_error when the folder cannot be read.
+/// The data of source control and of project stores, sockets, pipes and devices are left out: they never
+/// belong to a project. If the file system returns the kind of each entry with its name, only the folder
+/// itself is read.
+/// @throws std::system_error if the folder cannot be read.
 std::vector<DiskEntry> readDiskFolder(Path const& folder);
 
-/// True when something is on disk under the path, which no last link is followed for. What cannot be seen,
-/// for want of a permission, counts as there.
+/// Whether something exists at the path; a symbolic link is not followed. A path that cannot be checked for
+/// lack of permission counts as existing.
 bool isOnDisk(Path const& path);
 
-/// The same for what the project lists in a folder. False, without a question to the disk, for names that
-/// nothing in a folder can have and that lead elsewhere: "..", ".", or one with a separator in it. A text
-/// that somebody else made may hold them.
+/// The same for a name that the project lists in a folder. False, without access to the disk, for names that
+/// cannot be in a folder and lead elsewhere: "..", ".", and names with a separator. A text that somebody else
+/// wrote may contain them.
 bool isOnDisk(Path const& folder, std::u16string const& name);
 
-/// True when the path itself is a folder, and no symbolic link to one.
+/// Whether the path is a folder, not a symbolic link to one.
 bool isFolderItself(Path const& path);
 
 } // namespace projectctl

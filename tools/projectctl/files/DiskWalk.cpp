@@ -17,7 +17,7 @@ DiskWalk::DiskWalk(Path root, Progress& progress) : root_(std::move(root)), prog
 }
 
 void DiskWalk::enter(Path const& folder) {
-    std::vector<Open> openFolders; // not by recursion: folders may be as deep as somebody cares to make them
+    std::vector<Open> openFolders; // not recursively: folders can be nested very deeply
     open(folder, openFolders);
     while (!openFolders.empty()) {
         auto& here = openFolders.back();
@@ -44,7 +44,8 @@ void DiskWalk::open(Path folder, std::vector<Open>& openFolders) {
         auto entries = readDiskFolder(folder);
         openFolders.push_back({std::move(folder), std::move(entries), 0});
     } catch (std::system_error const& error) {
-        if (error.code() != std::errc::no_such_file_or_directory) { // else it has gone since it was listed
+        if (error.code() !=
+            std::errc::no_such_file_or_directory) { // otherwise it was deleted since it was listed
             unreadable_.push_back({std::move(folder), error.what()});
         }
     }

@@ -10,7 +10,7 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// What lies in a folder on disk, at any depth. Symbolic links are listed and not entered.
+/// The contents of folders on disk, at any depth. Symbolic links are found but not followed.
 class DiskWalk {
 public:
     struct Unreadable {
@@ -21,15 +21,17 @@ public:
     /// @param root the project's root.
     DiskWalk(Path root, Progress& progress);
 
-    /// Takes in everything in a folder, a folder before its contents. May be called for several folders.
+    /// Adds the contents of a folder to `found`, folders before their contents. May be called for several
+    /// folders.
     void enter(Path const& folder);
 
     std::vector<Path> const& found() const noexcept { return found_; }
 
-    /// What begins with two dots directly in the root: a project cannot hold it, nor what is in it.
+    /// Paths directly in the root whose names begin with two dots. A project cannot contain them or anything
+    /// below them.
     std::vector<Path> const& unaddable() const noexcept { return unaddable_; }
 
-    /// Folders that are in `found` and could not be looked into.
+    /// Folders of `found` that could not be read.
     std::vector<Unreadable> const& unreadable() const noexcept { return unreadable_; }
 
 private:

@@ -2,6 +2,7 @@
 #include <vector>
 
 #include "cli/PathArguments.hpp"
+#include "cli/ShownPaths.hpp"
 #include "files/Commands.hpp"
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
@@ -14,25 +15,21 @@ namespace projectctl {
 
 namespace {
 
-/// Takes files and folders out of the project, all in one step, and leaves the disk alone.
+/// Removes files and folders from the project in one step. The files stay on disk.
 class RemoveCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
-            "remove",
-            "Remove files, and folders with all that is in the project below them, from the project: "
-            "with their labels, data and entry points. The files stay on disk");
-        paths_.declare(*app, "What to remove");
+            "remove", "Remove files, and folders with everything below them, from the project, together with "
+                      "their labels, data and entry points. The files stay on disk");
+        paths_.declare(*app, "The files and folders");
         return app;
     }
 
     int run(OpenProject& project) override {
         auto const paths = paths_.read();
-        requireWithin(project, paths);
-        for (auto const& path : project.trackedOutsideProject(paths)) {
-            printError("warning: \"" + shown(path) +
-                       "\" is below a removed folder and not in the project; git will not track it any more");
-        }
+        requireWithinRoot(project, paths);
+        warnOfTrackedFiles(project, paths);
         Progress const progress("Removing " + std::to_string(paths.size()) + " files and folders");
         auto const removed = project.files().remove(paths);
         output().say(std::to_string(removed.size()) + " removed from the project");
@@ -40,20 +37,27 @@ public:
     }
 
 private:
-    /// A text that somebody else made may list what lies outside the project. Git would take that out of its
-    /// own list too, where it belongs to another part of the repository.
-    static void requireWithin(OpenProject& project, std::vector<Path> const& paths) {
+    /// A text that somebody else wrote may list files outside the root. Removing such a file from the project
+    /// would also remove it from git's index, where it belongs to another part of the repository.
+    static void requireWithinRoot(OpenProject& project, std::vector<Path> const& paths) {
         auto const isOutside = [&project](Path const& path) {
             return path != project.root() && !project::metadata::isParent(path, project.root());
         };
         auto const guard = project.store().acquireReadLock();
         for (auto const& path : paths) {
             if (isOutside(path) && project.files().isFileInProject(path)) {
-                throw Failure(
-                    '"' + shown(path) +
-                    "\" lies outside the project's folder; nothing was removed. Take its line out of "
-                    "the project's text in an editor.");
+                throw Failure('"' + shown(path) +
+                              "\" is outside the project's folder; nothing was removed. Delete its line from "
+                              "the project's text with an editor.");
             }
+        }
+    }
+
+    static void warnOfTrackedFiles(OpenProject& project, std::vector<Path> const& paths) {
+        ShownPaths shown(project.root());
+        for (auto const& path : project.trackedOutsideProject(paths)) {
+            printError("warning: " + inQuotes(shown.ofAbsolute(path)) +
+                       " is below a removed folder but not in the project; git will no longer track it");
         }
     }
 

@@ -6,12 +6,12 @@
 
 namespace projectctl {
 
-// The commands about the labels that there are.
+// The members of the command group `label`. Three are about the labels of a category:
 std::unique_ptr<Command> makeCreateLabelCommand();
 std::unique_ptr<Command> makeListLabelsCommand();
 std::unique_ptr<Command> makeDeleteLabelCommand();
 
-// The commands about the labels on files.
+// Four are about the labels on files:
 std::unique_ptr<Command> makePutLabelCommand();
 std::unique_ptr<Command> makeTakeLabelCommand();
 std::unique_ptr<Command> makeShowLabelsCommand();

@@ -52,10 +52,10 @@ Label LabelNames::label(std::string const& category, std::string const& name) {
         return {found, labels_.getLabelByUUID(found, wanted)};
     }
     throw Failure("the category " + inQuotes(found.getName()) + " has no label " + inQuotes(wanted) +
-                  ". 'projectctl label list' shows those that it has");
+                  ". 'projectctl label list' shows its labels");
 }
 
-Label LabelNames::labelOrWhatIsLeft(std::string const& category, std::string const& name) {
+Label LabelNames::labelEvenIfDeleted(std::string const& category, std::string const& name) {
     auto const categoryUUID = textOf(category);
     auto const labelUUID = textOf(name);
     auto const known = find(categoryUUID);

@@ -10,25 +10,27 @@
 
 namespace projectctl {
 
-/// Finds categories and labels by their names, or by their UUIDs where a name would fit several.
+/// Finds categories and labels by their names, or by their UUIDs.
 ///
-/// Whoever acts on the result holds a guard of the store from before the question until after the act.
+/// A caller that changes the result holds a guard of the store from before the search until after the change.
 class LabelNames {
 public:
+    /// @param labels borrowed.
     explicit LabelNames(project::management::LabelManager& labels) : labels_(labels) {}
 
     /// @param name bytes of an argument.
-    /// @throws CategoryDoesNotExist, CategoryDoesNotExistsByUUID; Failure when several are called so.
+    /// @throws CategoryDoesNotExist, CategoryDoesNotExistsByUUID; Failure if several categories have the
+    /// name.
     project::management::CategoryIdentifier category(std::string const& name);
 
-    /// The label of a category, each by its name.
-    /// @throws what category throws; LabelDoesNotExistsByUUID; Failure when there is no label of the name, or
-    ///         when there are several.
+    /// A label of a category.
+    /// @throws what category throws; LabelDoesNotExistsByUUID; Failure if no label or several labels have the
+    ///         name.
     project::management::Label label(std::string const& category, std::string const& name);
 
-    /// The same, but UUIDs of what no longer exists are taken as they are, so that what is left of it on
-    /// files can be taken off.
-    project::management::Label labelOrWhatIsLeft(std::string const& category, std::string const& name);
+    /// The same, but UUIDs are accepted even if the label or its category was deleted. Files may still have
+    /// such a label.
+    project::management::Label labelEvenIfDeleted(std::string const& category, std::string const& name);
 
 private:
     std::optional<project::management::CategoryIdentifier> find(std::u16string const& category);

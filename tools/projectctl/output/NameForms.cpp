@@ -180,7 +180,7 @@ void appendJsonString(std::string& out, std::u16string_view text) {
     out += '"';
 }
 
-std::string inQuotes(std::u16string const& text) {
+std::string inQuotes(std::u16string_view text) {
     return '"' + fl::i18n::toUtf8(text) + '"';
 }
 

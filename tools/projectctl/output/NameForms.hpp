@@ -27,7 +27,7 @@ void appendQuoted(std::string& out, std::string_view bytes);
 void appendJsonString(std::string& out, std::u16string_view text);
 
 /// Text in double quotes for a message, in UTF-8.
-std::string inQuotes(std::u16string const& text);
+std::string inQuotes(std::u16string_view text);
 
 /// A path for a message, in UTF-8.
 std::string shown(fl::filesystem::Path const& path);

@@ -47,8 +47,8 @@ void writeNode(Node const& node) {
     }
 }
 
-/// The text as a string of Graphviz, which knows no escape but that of the quotation mark and those that
-/// begin with a backslash.
+/// The text as a quoted string of Graphviz. The only escapes there are those of the quotation mark and the
+/// backslash.
 std::string dotString(std::u16string_view text) {
     std::string result = "\"";
     for (auto const byte : withoutControls(fl::i18n::toUtf8(text), false)) {

@@ -4,9 +4,9 @@
 
 namespace projectctl {
 
-// The forms in which a graph of projects is written to standard output.
+// Writers of a graph of projects to standard output.
 
-/// As a tree, a line for each reference; what a project references is shown where it comes first.
+/// As a tree, one line per reference. The references of a project are shown where it appears first.
 void writeTree(ReferenceGraph const& graph);
 
 /// As a JSON object with the arrays "projects", "references" and "cycles".

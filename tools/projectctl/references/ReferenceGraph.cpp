@@ -28,13 +28,13 @@ ReferenceGraph::State stateOf(Path const& folder) {
 
 ReferenceGraph::ReferenceGraph(Path const& root) {
     enter(indexOf(root));
-    while (!way_.empty()) { // not by recursion: how long a way is, is up to whoever wrote the projects
-        auto& here = way_.back();
+    while (!currentPath_.empty()) { // not recursively: other people decide how long a path is
+        auto& here = currentPath_.back();
         if (here.next < nodes_[here.node].references.size()) {
             follow(here.node, here.next++);
         } else {
             progress_[here.node] = Progress::Done;
-            way_.pop_back();
+            currentPath_.pop_back();
         }
     }
 }
@@ -54,8 +54,8 @@ std::size_t ReferenceGraph::indexOf(Path const& folder) {
 }
 
 void ReferenceGraph::enter(std::size_t index) {
-    progress_[index] = Progress::OnTheWay;
-    way_.push_back({index, 0});
+    progress_[index] = Progress::OnCurrentPath;
+    currentPath_.push_back({index, 0});
     if (nodes_[index].state != State::Project) {
         return;
     }
@@ -78,10 +78,11 @@ void ReferenceGraph::follow(std::size_t from, std::size_t reference) {
     auto& followed = nodes_[from].references[reference];
     if (progress_[followed.to] == Progress::Unread) {
         enter(followed.to);
-    } else if (progress_[followed.to] == Progress::OnTheWay) {
+    } else if (progress_[followed.to] == Progress::OnCurrentPath) {
         followed.closesCycle = true;
         auto& cycle = cycles_.emplace_back();
-        for (auto step = std::ranges::find(way_, followed.to, &Step::node); step != way_.end(); ++step) {
+        for (auto step = std::ranges::find(currentPath_, followed.to, &Step::node);
+             step != currentPath_.end(); ++step) {
             cycle.push_back(step->node);
         }
     }

@@ -11,46 +11,46 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// Which projects reference which, from one project on. Every project that is reached is opened and read
-/// once.
+/// The graph of references between projects, beginning with one project. Every project that is reached is
+/// opened and read once.
 class ReferenceGraph {
 public:
     enum class State {
         Project,
-        NoFolder,   ///< the folder is not there
-        NoProject,  ///< the folder is there and holds no project
-        Unreadable, ///< there is a project, and it cannot be read
+        NoFolder,   ///< the folder does not exist
+        NoProject,  ///< the folder exists but does not contain a project
+        Unreadable, ///< the folder contains a project that cannot be read
     };
 
     struct Reference {
         std::size_t to;      ///< index of a node
-        std::u16string text; ///< the path that is kept
+        std::u16string text; ///< the stored path
         std::u16string type; ///< "Relative" or "Absolute"
-        bool closesCycle;    ///< it leads back to a project on the way here
+        bool closesCycle;    ///< it leads back to a project on the current path
     };
 
     struct Node {
         Path folder; ///< canonical
         State state;
-        std::u16string name;               ///< of a project that could be read
-        std::string problem;               ///< why it cannot be read
+        std::u16string name;               ///< empty unless the project could be read
+        std::string problem;               ///< the reason if it cannot be read
         std::vector<Reference> references; ///< by location
     };
 
-    /// @param root of the project to begin with, canonical.
+    /// @param root of the first project, canonical.
     explicit ReferenceGraph(Path const& root);
 
-    /// The first one is where it begins.
+    /// All projects that are reached; the first project is the first element.
     std::vector<Node> const& nodes() const noexcept { return nodes_; }
 
-    /// For each reference that closes a cycle, the projects on the cycle in the order of their references.
+    /// For each reference that closes a cycle, the projects on the cycle, in the order of their references.
     std::vector<std::vector<std::size_t>> const& cycles() const noexcept { return cycles_; }
 
-    /// Whether all that is referenced can be read and no project references itself, by whatever way.
+    /// Whether all referenced projects can be read and none references itself, directly or indirectly.
     bool isSound() const;
 
 private:
-    enum class Progress { Unread, OnTheWay, Done };
+    enum class Progress { Unread, OnCurrentPath, Done };
 
     struct Step {
         std::size_t node;
@@ -64,7 +64,7 @@ private:
     std::vector<Node> nodes_;
     std::vector<Progress> progress_; ///< of each node
     std::map<Path, std::size_t> indices_;
-    std::vector<Step> way_; ///< from where it begins to where we are
+    std::vector<Step> currentPath_; ///< from the first project to the one that is being followed
     std::vector<std::vector<std::size_t>> cycles_;
 };
 

@@ -2,18 +2,20 @@
 
 #include <exception>
 
-#include "project/Schema.hpp"
 #include "project/core/ProjectPathManager.hpp"
 #include "project/core/ProjectReferenceManager.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace projectctl {
+
+namespace referenceSchema = project::metadata::schema::references;
 
 ReferenceList const& projectPath() {
     static ReferenceList const list{
         [](OpenProject& project) -> project::management::FolderReferenceManager& {
             return project.manager().getProjectPathManager().getFolderReferenceManager();
         },
-        schema::projectPath, "the project path", false};
+        referenceSchema::projectPathType, "the project path", false};
     return list;
 }
 
@@ -22,7 +24,7 @@ ReferenceList const& projectReferences() {
         [](OpenProject& project) -> project::management::FolderReferenceManager& {
             return project.manager().getProjectReferenceManager().getFolderReferenceManager();
         },
-        schema::references, "the referenced projects", true};
+        referenceSchema::referencesType, "the referenced projects", true};
     return list;
 }
 

@@ -8,18 +8,18 @@
 
 namespace projectctl {
 
-/// One of the two lists of folders that a project keeps, and how it is spoken of.
+/// One of the two lists of folders that a project stores.
 struct ReferenceList {
     project::management::FolderReferenceManager& (*manager)(OpenProject& project);
-    std::u16string_view head; ///< type of the address that the store keeps it under
-    std::string name;         ///< "the project path"
-    bool isOfProjects; ///< of whole projects, kept relative or absolute; else of folders, kept relative
+    std::u16string_view head; ///< type of the first step of its addresses
+    std::string name;         ///< for messages: "the project path"
+    bool isOfProjects; ///< true: folders of projects, relative or absolute; false: folders, relative only
 };
 
 ReferenceList const& projectPath();
 ReferenceList const& projectReferences();
 
-/// A path without links and dots on the way, as far as it can be followed; as it is where it cannot.
+/// A path without links and dots, as far as it can be followed; unchanged if it cannot be followed at all.
 Path followed(Path const& path);
 
 } // namespace projectctl

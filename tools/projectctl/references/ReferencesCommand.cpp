@@ -9,26 +9,26 @@ namespace projectctl {
 
 namespace {
 
-/// Follows the references to other projects.
+/// Follows the references to other projects, beginning with this one.
 class ReferencesCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
             "references",
-            "Follow the references to other projects, from this one on; fails when one is missing "
-            "or cannot be read, and when projects reference each other in a circle");
-        app->add_flag("--graph", graph_, "Show all projects that are reached, with what each references")
+            "Follow the references to other projects. Exits with 1 if a project is missing or unreadable, or "
+            "if projects reference each other in a cycle");
+        app->add_flag("--graph", isGraph_, "Show all projects that are reached, with their references")
             ->required();
-        auto* const json = app->add_flag("--json", json_, "As a JSON object instead of a tree");
-        app->add_flag("--dot", dot_, "As text for Graphviz instead of a tree")->excludes(json);
+        auto* const json = app->add_flag("--json", isJson_, "Write a JSON object instead of a tree");
+        app->add_flag("--dot", isDot_, "Write text for Graphviz instead of a tree")->excludes(json);
         return app;
     }
 
     int run() override {
         ReferenceGraph const graph(findProjectRoot(workingFolder()));
-        if (json_) {
+        if (isJson_) {
             writeJson(graph);
-        } else if (dot_) {
+        } else if (isDot_) {
             writeDot(graph);
         } else {
             writeTree(graph);
@@ -37,9 +37,9 @@ public:
     }
 
 private:
-    bool graph_ = false; ///< the only thing to do yet, and always asked for
-    bool json_ = false;
-    bool dot_ = false;
+    bool isGraph_ = false; ///< required: the only form so far
+    bool isJson_ = false;
+    bool isDot_ = false;
 };
 
 } // namespace

@@ -2,7 +2,6 @@
 
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
-#include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
 
@@ -45,7 +44,8 @@ JsonObject::Texts named(Identifier const& identifier) {
 
 } // namespace
 
-EventLines::EventLines(OpenProject& project, bool asJson) : root_(project.root()), asJson_(asJson) {
+EventLines::EventLines(OpenProject& project, bool asJson)
+    : shown_(asJson ? ShownPaths::fromRoot(project.root()) : ShownPaths(project.root())), asJson_(asJson) {
     using Files = std::vector<Path>;
     auto& events = project.events();
     events.onFileListUpdate([this](Files const& files) { writeFiles("fileListUpdate", files); });
@@ -77,8 +77,7 @@ void EventLines::writeFiles(std::string_view event, std::vector<Path> const& fil
     std::vector<std::u16string> names;
     names.reserve(files.size());
     for (auto const& file : files) {
-        auto name = project::metadata::getRelativePath(root_, file);
-        names.push_back(name.empty() ? u"." : std::move(name));
+        names.emplace_back(shown_.ofAbsolute(file));
     }
     if (asJson_) {
         auto object = beginJson(event);

@@ -3,6 +3,7 @@
 #include <string_view>
 #include <vector>
 
+#include "cli/ShownPaths.hpp"
 #include "output/JsonObject.hpp"
 #include "project/OpenProject.hpp"
 
@@ -28,7 +29,7 @@ private:
     void writeCategory(std::string_view event, CategoryIdentifier const& category);
     void writeLabel(Label const& label);
 
-    Path root_;
+    ShownPaths shown_;
     bool asJson_;
 };
 

@@ -2,11 +2,11 @@
 
 #include <regex>
 
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 
-/// A project with the files "a", "b" and "c", whose labels are looked at and changed by the tool.
+/// A project with the files "a", "b" and "c", for tests of labels.
 class LabelToolTest : public ToolTest {
 protected:
     void SetUp() override {
@@ -17,8 +17,9 @@ protected:
         ASSERT_THAT(tool({"add", "a", "b", "c"}), SucceedsSilently());
     }
 
-    /// Makes a category with one label, and puts that on a file.
-    void makeLabelled(std::string const& category, std::string const& label, std::string const& file) const {
+    /// Creates a category with one label, and puts the label on a file.
+    void createLabelled(std::string const& category, std::string const& label,
+                        std::string const& file) const {
         ASSERT_THAT(tool({"category", "create", category}), SucceedsSilently());
         ASSERT_THAT(tool({"label", "create", category, label}), SucceedsSilently());
         ASSERT_THAT(tool({"label", "put", category, label, file}), SucceedsSilently());
@@ -32,7 +33,7 @@ protected:
         return found("\"label\": \"" + name + "\", \"labelUuid\": \"([^\"]*)\"", {"label", "list", "--json"});
     }
 
-    /// Replaces every occurrence in the project's text, of which there must be one.
+    /// Replaces every occurrence in the project's text. There must be at least one.
     void replaceInText(std::string const& what, std::string const& with) const {
         auto content = readText();
         auto at = content.find(what);
@@ -44,7 +45,7 @@ protected:
     }
 
 private:
-    /// What the first group of an expression matches in the output of a command.
+    /// The match of the first group of an expression in the output of a command.
     std::string found(std::string const& expression, std::vector<std::string> command) const {
         auto const output = tool(std::move(command)).output;
         std::smatch match;

@@ -1,4 +1,4 @@
-#include "LabelToolTest.hpp"
+#include "tools/labels/LabelToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -40,7 +40,7 @@ TEST_F(LabelCommand, listsEveryAttributeAsJson) {
     EXPECT_THAT(tool({"label", "list", "--json"}), Prints("[]\n"));
 }
 
-TEST_F(LabelCommand, makesLabelsInAReadOnlyCategory) {
+TEST_F(LabelCommand, createsLabelsInAReadOnlyCategory) {
     ASSERT_THAT(tool({"category", "create", "Fixed", "--read-only"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"label", "create", "Fixed", "Done"}), SucceedsSilently());
@@ -70,7 +70,7 @@ TEST_F(LabelCommand, deletesALabelFromEveryFile) {
     EXPECT_THAT(tool({"label", "show", "a", "c"}), SucceedsSilently());
 }
 
-TEST_F(LabelCommand, deletesWhatIsWritableAndNothingReadOnly) {
+TEST_F(LabelCommand, deletesWritableLabelsAndNoReadOnlyOnes) {
     ASSERT_THAT(tool({"category", "create", "Fixed", "--read-only"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "create", "Fixed", "Inherits"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "create", "Fixed", "Writable", "--writable"}), SucceedsSilently());
@@ -82,7 +82,7 @@ TEST_F(LabelCommand, deletesWhatIsWritableAndNothingReadOnly) {
     EXPECT_THAT(tool({"label", "list"}), Prints("Fixed: Inherits\nStatus: ReadOnly (read-only)\n"));
 }
 
-TEST_F(LabelCommand, doesNotKnowWhatWasNeverMade) {
+TEST_F(LabelCommand, reportsLabelsAndCategoriesThatDoNotExist) {
     EXPECT_THAT(tool({"label", "create", "Area", "Open"}), FailsWith(1, "There is no category \"Area\""));
     EXPECT_THAT(tool({"label", "list", "Area"}), FailsWith(1, "There is no category \"Area\""));
     EXPECT_THAT(tool({"label", "delete", "Status", "Open"}),
@@ -91,12 +91,12 @@ TEST_F(LabelCommand, doesNotKnowWhatWasNeverMade) {
                 FailsWith(1, "There is no label with the UUID \"01234567-89ab-4def-8123-456789abcdef\""));
 }
 
-TEST_F(LabelCommand, listsTheUUIDsOfANameThatFitsSeveralLabels) {
+TEST_F(LabelCommand, listsTheUUIDsOfANameThatSeveralLabelsHave) {
     ASSERT_THAT(tool({"label", "create", "Status", "Open"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "create", "Status", "Opem"}), SucceedsSilently());
     auto const first = labelUUID("Open");
     auto const second = labelUUID("Opem");
-    replaceInText("Opem", "Open"); // as a merge of two people's work may have it
+    replaceInText("Opem", "Open"); // possible after a merge
 
     auto const ambiguous = tool({"label", "delete", "Status", "Open"});
 
@@ -107,7 +107,7 @@ TEST_F(LabelCommand, listsTheUUIDsOfANameThatFitsSeveralLabels) {
     EXPECT_EQ(labelUUID("Open"), first);
 }
 
-TEST_F(LabelCommand, failsOnAReadOnlyStateThatIsNone) {
+TEST_F(LabelCommand, failsOnAnUnknownReadOnlyState) {
     ASSERT_THAT(tool({"label", "create", "Status", "Open"}), SucceedsSilently());
     replaceInText("INHERITED", "Inherited");
 

@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -15,7 +15,7 @@ protected:
         ASSERT_THAT(tool({"add", "main.cpp", "src/pump.cpp"}), SucceedsSilently());
     }
 
-    /// The output of `entry show` without the UUID, which nobody can foresee.
+    /// The output of `entry show` without the UUID, which is random.
     std::string show(std::string const& file) const {
         auto const result = tool({"entry", "show", file});
         EXPECT_EQ(result.exitCode, 0) << result.errors;
@@ -28,13 +28,13 @@ TEST_F(EntryCommand, listsNothingInANewProject) {
     EXPECT_THAT(tool({"entry", "list", "--json"}), Prints("[]\n"));
 }
 
-TEST_F(EntryCommand, givesWhatIsNotSaidItsDefault) {
+TEST_F(EntryCommand, usesDefaultsForOptionsThatAreNotGiven) {
     ASSERT_THAT(tool({"entry", "set", "src/pump.cpp"}), SucceedsSilently());
 
     EXPECT_EQ(show("src/pump.cpp"), "name: pump\ntype: Basic\nvisible: yes\ngroup: Default\n");
 }
 
-TEST_F(EntryCommand, keepsAllThatIsSaid) {
+TEST_F(EntryCommand, storesAllOptions) {
     ASSERT_THAT(tool({"group", "create", "Nightly"}), SucceedsSilently());
     ASSERT_THAT(tool({"entry", "set", "main.cpp", "--type", "Batch_Job", "--name", "All of it", "--hidden",
                       "--group", "Nightly", "--extension", "args=-v a=b", "--extension", "empty="}),
@@ -44,7 +44,7 @@ TEST_F(EntryCommand, keepsAllThatIsSaid) {
                                 "extension args: -v a=b\nextension empty: \n");
 }
 
-TEST_F(EntryCommand, changesOnlyWhatIsSaidOfAnEntryPointThatIsThere) {
+TEST_F(EntryCommand, changesOnlyTheGivenOptionsOfAnExistingEntryPoint) {
     ASSERT_THAT(tool({"entry", "set", "main.cpp", "--type", "Startup", "--hidden", "--extension", "a=1",
                       "--extension", "b=2"}),
                 SucceedsSilently());
@@ -66,7 +66,7 @@ TEST_F(EntryCommand, listsEntryPointsByTheirFiles) {
                 Prints("main.cpp: Startup, main (hidden)\nsrc/pump.cpp: Shutdown, pump\n"));
 }
 
-TEST_F(EntryCommand, listsAllThatIsKeptAsJson) {
+TEST_F(EntryCommand, listsEverythingThatIsStoredAsJson) {
     ASSERT_THAT(tool({"entry", "set", "main.cpp", "--extension", "k\"=v", "--extension", "l="}),
                 SucceedsSilently());
 
@@ -89,10 +89,10 @@ TEST_F(EntryCommand, removesEntryPointsAndLeavesTheFiles) {
 
     EXPECT_THAT(tool({"entry", "list"}), Prints("src/pump.cpp: Basic, pump\n"));
     EXPECT_THAT(tool({"list"}), Prints("main.cpp\nsrc\nsrc/pump.cpp\n"));
-    EXPECT_THAT(tool({"entry", "show", "main.cpp"}), FailsWith(1, "/main.cpp\" is no entry point."));
+    EXPECT_THAT(tool({"entry", "show", "main.cpp"}), FailsWith(1, "\"main.cpp\" is not an entry point."));
 }
 
-TEST_F(EntryCommand, isForFilesOfTheProjectAlone) {
+TEST_F(EntryCommand, requiresAFileOfTheProject) {
     folder_.file(u"new");
     ASSERT_THAT(tool({"entry", "set", "main.cpp"}), SucceedsSilently());
     auto const before = readText();
@@ -103,13 +103,13 @@ TEST_F(EntryCommand, isForFilesOfTheProjectAlone) {
     EXPECT_EQ(readText(), before);
 }
 
-TEST_F(EntryCommand, refusesWhatItDoesNotUnderstand) {
+TEST_F(EntryCommand, refusesInvalidOptions) {
     EXPECT_THAT(tool({"entry", "set", "main.cpp", "--type", "batch"}),
                 FailsWith(1, "\"batch\" is not a type of entry point."));
     EXPECT_THAT(tool({"entry", "set", "main.cpp", "--group", "Nightly"}),
                 FailsWith(1, "there is no entry point group \"Nightly\""));
     EXPECT_THAT(tool({"entry", "set", "main.cpp", "--extension", "args"}),
-                FailsWith(1, "\"args\" is no extension. Give it as KEY=VALUE"));
+                FailsWith(1, "\"args\" is not an extension. Give it as KEY=VALUE"));
     EXPECT_THAT(tool({"entry", "set", "main.cpp", "--hidden", "--visible"}), FailsWith(2, "excludes"));
     EXPECT_THAT(tool({"entry", "set"}), FailsWith(2, "'projectctl entry set --help' tells more"));
     EXPECT_THAT(tool({"entry", "list"}), SucceedsSilently());
@@ -119,7 +119,7 @@ TEST_F(EntryCommand, refusesAFileWhoseEntryPointCouldNotBeFoundAgain) {
     folder_.addFile("back\\slash");
     ASSERT_THAT(tool({"add", "back\\slash"}), SucceedsSilently());
 
-    EXPECT_THAT(tool({"entry", "set", "back\\slash"}), FailsWith(1, "because of the backslash in its name"));
+    EXPECT_THAT(tool({"entry", "set", "back\\slash"}), FailsWith(1, "because of the backslash in the path"));
     EXPECT_THAT(tool({"entry", "list"}), SucceedsSilently());
 }
 
@@ -133,7 +133,7 @@ TEST_F(EntryCommand, keepsAnyBytesOfANameAndOfAnExtension) {
                                        "extension k\xFE: \xFD\n");
 }
 
-TEST_F(EntryCommand, goesWithItsFile) {
+TEST_F(EntryCommand, isRemovedWithItsFile) {
     ASSERT_THAT(tool({"entry", "set", "src/pump.cpp"}), SucceedsSilently());
 
     ASSERT_THAT(tool({"remove", "src"}), SucceedsSilently());
@@ -188,7 +188,7 @@ TEST_F(EntryCommand, isSeenByStatusAndCheckWhenItsFileHasAnother) {
     EXPECT_THAT(tool({"check"}), SucceedsSilently());
 }
 
-TEST_F(EntryCommand, failsOnAStoredTypeThatIsNone) {
+TEST_F(EntryCommand, failsOnAnUnknownStoredType) {
     insertLineBefore(
         "\"main.cpp\"",
         R"({"at":["EntryPoints","Root","EntryPoint","e"],"keys":{"File":"main.cpp","Type":"x"}})");

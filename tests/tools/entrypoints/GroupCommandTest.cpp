@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -66,7 +66,7 @@ TEST_F(GroupCommand, doesNotDeleteTheDefaultGroup) {
     EXPECT_THAT(tool({"group", "list"}), Prints("Default\nMain\n"));
 }
 
-TEST_F(GroupCommand, letsTheEntryPointsOfADeletedGroupStay) {
+TEST_F(GroupCommand, keepsTheEntryPointsOfADeletedGroup) {
     ASSERT_THAT(tool({"group", "create", "Nightly"}), SucceedsSilently());
     ASSERT_THAT(tool({"entry", "set", "a", "--group", "Nightly"}), SucceedsSilently());
 
@@ -76,7 +76,7 @@ TEST_F(GroupCommand, letsTheEntryPointsOfADeletedGroupStay) {
     EXPECT_THAT(tool({"entry", "list"}), Prints("a: Basic, a\n"));
 }
 
-TEST_F(GroupCommand, doesNotKnowWhatWasNeverMade) {
+TEST_F(GroupCommand, reportsAGroupThatDoesNotExist) {
     EXPECT_THAT(tool({"group", "rename", "Nightly", "x"}),
                 FailsWith(1, "there is no entry point group \"Nightly\""));
     EXPECT_THAT(tool({"group", "delete", "Nightly"}),
@@ -84,7 +84,7 @@ TEST_F(GroupCommand, doesNotKnowWhatWasNeverMade) {
     EXPECT_THAT(tool({"group", "list"}), Prints("Default\n"));
 }
 
-TEST_F(GroupCommand, listsTheUUIDsOfANameThatFitsSeveral) {
+TEST_F(GroupCommand, listsTheUUIDsOfANameThatSeveralHave) {
     for (auto const* uuid : {"g1", "g2"}) {
         insertLineBefore("\"a\"", std::string(R"({"at":["EntryPointGroups","Root","EntryPointGroup",")") +
                                       uuid + R"("],"keys":{"Name":"Nightly"}})");

@@ -1,4 +1,4 @@
-#include "LabelToolTest.hpp"
+#include "tools/labels/LabelToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -18,7 +18,8 @@ protected:
         ASSERT_THAT(tool({"label", "create", "Owner", "Bob"}), SucceedsSilently());
     }
 
-    /// Puts the only label on the file "a" a second time, as two people who label the same file and merge do.
+    /// Puts the only label on the file "a" a second time, as a merge of two people who label the same file
+    /// does.
     void doubleTheLabelOnA(std::string const& uuid) const {
         auto const label = R"({"type":"Label","keys":{"UUID":")" + uuid + R"("}})";
         replaceInText(label, label + ',' + label);
@@ -52,20 +53,19 @@ TEST_F(FileLabelCommand, takesPathsRelativeToWhereItIsCalled) {
     EXPECT_THAT(tool({"label", "find", "Owner"}), Prints("src/pump.cpp\n"));
 }
 
-TEST_F(FileLabelCommand, displacesTheOtherLabelOfASingleValuedCategory) {
+TEST_F(FileLabelCommand, replacesTheOtherLabelOfASingleValuedCategory) {
     ASSERT_THAT(tool({"label", "put", "Status", "Open", "a"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "put", "Status", "Done", "a"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"label", "show", "a"}), Prints("Status: Done\n"));
 }
 
-TEST_F(FileLabelCommand, saysOnATerminalWhatWasDisplaced) {
+TEST_F(FileLabelCommand, reportsTheChangesOnATerminal) {
     ASSERT_THAT(tool({"label", "put", "Status", "Open", "a"}), SucceedsSilently());
     settings_.onTerminal = true;
 
-    EXPECT_EQ(tool({"label", "put", "Status", "Done", "a", "b"}).output,
-              "put on 2, in place of 1 others\r\n");
-    EXPECT_EQ(tool({"label", "take", "Status", "Done", "a", "b", "c"}).output, "taken off 2\r\n");
+    EXPECT_EQ(tool({"label", "put", "Status", "Done", "a", "b"}).output, "put on 2, replacing 1 others\r\n");
+    EXPECT_EQ(tool({"label", "take", "Status", "Done", "a", "b", "c"}).output, "removed from 2\r\n");
 }
 
 TEST_F(FileLabelCommand, keepsSeveralLabelsOfAnyOtherCategory) {
@@ -75,7 +75,7 @@ TEST_F(FileLabelCommand, keepsSeveralLabelsOfAnyOtherCategory) {
     EXPECT_THAT(tool({"label", "show", "a"}), Prints("Owner: Ann\nOwner: Bob\n"));
 }
 
-TEST_F(FileLabelCommand, leavesALabelThatIsThereAlreadyStandingOnce) {
+TEST_F(FileLabelCommand, doesNotPutALabelOnAFileTwice) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     auto const before = readText();
 
@@ -98,12 +98,12 @@ TEST_F(FileLabelCommand, changesNothingWhenOneFileIsNotInTheProject) {
     EXPECT_EQ(readText(), before);
 }
 
-TEST_F(FileLabelCommand, putsNothingOnTheRootWhichHasNoPlaceForLabels) {
+TEST_F(FileLabelCommand, putsNothingOnTheRootWhichCannotHaveLabels) {
     EXPECT_THAT(tool({"label", "put", "Owner", "Ann", "."}), FailsWith(1, "is not in the project."));
     EXPECT_THAT(tool({"label", "show", "."}), SucceedsSilently());
 }
 
-TEST_F(FileLabelCommand, takesOffOneLabelAndLeavesTheOthers) {
+TEST_F(FileLabelCommand, removesOneLabelAndLeavesTheOthers) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "put", "Owner", "Bob", "a"}), SucceedsSilently());
 
@@ -112,7 +112,7 @@ TEST_F(FileLabelCommand, takesOffOneLabelAndLeavesTheOthers) {
     EXPECT_THAT(tool({"label", "show", "a"}), Prints("Owner: Bob\n"));
 }
 
-TEST_F(FileLabelCommand, takesOffALabelHoweverOftenItStandsThere) {
+TEST_F(FileLabelCommand, removesALabelThatAFileHasTwice) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     doubleTheLabelOnA(labelUUID("Ann"));
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "b"}), SucceedsSilently());
@@ -124,12 +124,12 @@ TEST_F(FileLabelCommand, takesOffALabelHoweverOftenItStandsThere) {
     EXPECT_THAT(tool({"check"}), SucceedsSilently());
 }
 
-TEST_F(FileLabelCommand, takesOffWhatIsLeftOfADeletedLabelByItsUUIDs) {
+TEST_F(FileLabelCommand, removesADeletedLabelByItsUUIDs) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     auto const owner = categoryUUID("Owner");
     auto const ann = labelUUID("Ann");
     doubleTheLabelOnA(ann);
-    ASSERT_THAT(tool({"label", "delete", "Owner", "Ann"}), SucceedsSilently()); // takes one of the two off
+    ASSERT_THAT(tool({"label", "delete", "Owner", "Ann"}), SucceedsSilently()); // removes one of the two
     ASSERT_THAT(tool({"label", "show", "a"}), FailsWith(1, "There is no label with the UUID \"" + ann));
 
     ASSERT_THAT(tool({"label", "take", owner, ann, "a"}), SucceedsSilently());
@@ -139,7 +139,7 @@ TEST_F(FileLabelCommand, takesOffWhatIsLeftOfADeletedLabelByItsUUIDs) {
                 FailsWith(1, "the category \"Owner\" has no label \"Ann\""));
 }
 
-TEST_F(FileLabelCommand, takesOffWhatIsLeftOfADeletedCategory) {
+TEST_F(FileLabelCommand, removesALabelOfADeletedCategory) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     auto const owner = categoryUUID("Owner");
     auto const ann = labelUUID("Ann");
@@ -169,7 +169,7 @@ TEST_F(FileLabelCommand, showsALabelThatHasDataOnceWithItsData) {
                           "\", \"data\": \"since May\"},\n"));
 }
 
-TEST_F(FileLabelCommand, findsTheFilesThatBearALabelOrAnyLabelOfACategory) {
+TEST_F(FileLabelCommand, findsTheFilesWithALabelOrAnyLabelOfACategory) {
     folder_.file(u"src/pump.cpp");
     ASSERT_THAT(tool({"add", "src/pump.cpp"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "src", "b"}), SucceedsSilently());
@@ -185,22 +185,22 @@ TEST_F(FileLabelCommand, findsTheFilesThatBearALabelOrAnyLabelOfACategory) {
     EXPECT_THAT(tool({"label", "find", "Status", "Open", "--json"}), Prints("[]\n"));
 }
 
-TEST_F(FileLabelCommand, findsNothingForWhatDoesNotExist) {
+TEST_F(FileLabelCommand, reportsALabelToFindThatDoesNotExist) {
     EXPECT_THAT(tool({"label", "find", "Area"}), FailsWith(1, "There is no category \"Area\""));
     EXPECT_THAT(tool({"label", "find", "Owner", "Eve"}),
                 FailsWith(1, "the category \"Owner\" has no label \"Eve\""));
     EXPECT_THAT(tool({"label", "find", "Owner", "--json", "-0"}), FailsWith(2, "excludes"));
 }
 
-TEST_F(FileLabelCommand, losesTheLabelsOfAFileThatIsAddedAgain) {
+TEST_F(FileLabelCommand, losesTheLabelsOfAFileThatIsAddedAnew) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a", "b"}), SucceedsSilently());
 
-    ASSERT_THAT(tool({"add", "a"}), SucceedsSilently());
+    ASSERT_THAT(tool({"add", "--anew", "a"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"label", "find", "Owner", "Ann"}), Prints("b\n"));
 }
 
-TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenItsLabelIsGone) {
+TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenTheLabelDoesNotExist) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     auto const ann = labelUUID("Ann");
     replaceInText(R"("Label",")" + ann, R"("Label","another)");
@@ -215,7 +215,7 @@ TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenItsLabelIsGone) {
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": " + text + "\n"));
 }
 
-TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenItsCategoryIsGone) {
+TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenItsCategoryDoesNotExist) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     auto const owner = categoryUUID("Owner");
     replaceInText(R"("Category",")" + owner, R"("Category","another)");
@@ -226,7 +226,7 @@ TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenItsCategoryIsGone) {
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": " + text));
 }
 
-TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenASingleValuedCategoryStandsTwiceOnAFile) {
+TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenAFileHasTwoLabelsOfASingleValuedCategory) {
     ASSERT_THAT(tool({"label", "put", "Status", "Open", "a"}), SucceedsSilently());
     auto const label = [](std::string const& uuid) {
         return R"({"type":"Label","keys":{"UUID":")" + uuid + R"("}})";
@@ -242,7 +242,7 @@ TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenASingleValuedCategoryStandsTw
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
 }
 
-TEST_F(FileLabelCommand, isNotedByStatusAndCheckWhenItStandsOnAFileTwice) {
+TEST_F(FileLabelCommand, isNotedByStatusAndCheckWhenAFileHasItTwice) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     doubleTheLabelOnA(labelUUID("Ann"));
 

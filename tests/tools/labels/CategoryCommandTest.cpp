@@ -1,4 +1,4 @@
-#include "LabelToolTest.hpp"
+#include "tools/labels/LabelToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -14,7 +14,7 @@ TEST_F(CategoryCommand, listsNothingInANewProject) {
     EXPECT_THAT(tool({"category", "list", "--json"}), Prints("[]\n"));
 }
 
-TEST_F(CategoryCommand, listsCategoriesByNameWithWhatSetsThemApart) {
+TEST_F(CategoryCommand, listsCategoriesByNameWithTheirAttributes) {
     ASSERT_THAT(tool({"category", "create", "Owner", "--type", "Text", "--read-only"}), SucceedsSilently());
     ASSERT_THAT(tool({"category", "create", "Area"}), SucceedsSilently());
     ASSERT_THAT(tool({"category", "create", "Status", "--single-valued"}), SucceedsSilently());
@@ -40,14 +40,14 @@ TEST_F(CategoryCommand, refusesASecondCategoryOfTheSameName) {
     EXPECT_EQ(readText(), before);
 }
 
-TEST_F(CategoryCommand, tellsNamesApartByCase) {
+TEST_F(CategoryCommand, distinguishesNamesByCase) {
     ASSERT_THAT(tool({"category", "create", "Status"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"category", "create", "status"}), SucceedsSilently());
 }
 
 TEST_F(CategoryCommand, renamesACategoryAndKeepsItsLabelsOnFiles) {
-    makeLabelled("Status", "Done", "a");
+    createLabelled("Status", "Done", "a");
 
     ASSERT_THAT(tool({"category", "rename", "Status", "State"}), SucceedsSilently());
 
@@ -62,11 +62,11 @@ TEST_F(CategoryCommand, renamesToANameThatIsTakenWithAWarning) {
     auto const renamed = tool({"category", "rename", "State", "Status"});
 
     EXPECT_EQ(renamed.exitCode, 0);
-    EXPECT_THAT(renamed.errors, HasSubstr("warning: 2 categories are called \"Status\" now"));
+    EXPECT_THAT(renamed.errors, HasSubstr("warning: 2 categories now have the name \"Status\""));
     EXPECT_THAT(tool({"category", "list"}), Prints("Status\nStatus\n"));
 }
 
-TEST_F(CategoryCommand, listsTheUUIDsOfANameThatFitsSeveral) {
+TEST_F(CategoryCommand, listsTheUUIDsOfANameThatSeveralHave) {
     ASSERT_THAT(tool({"category", "create", "Status"}), SucceedsSilently());
     ASSERT_THAT(tool({"category", "create", "State"}), SucceedsSilently());
     auto const status = categoryUUID("Status");
@@ -83,7 +83,7 @@ TEST_F(CategoryCommand, listsTheUUIDsOfANameThatFitsSeveral) {
 }
 
 TEST_F(CategoryCommand, deletesACategoryWithItsLabelsOnEveryFile) {
-    makeLabelled("Status", "Done", "a");
+    createLabelled("Status", "Done", "a");
 
     ASSERT_THAT(tool({"category", "delete", "Status"}), SucceedsSilently());
 
@@ -101,14 +101,14 @@ TEST_F(CategoryCommand, neitherRenamesNorDeletesAReadOnlyCategory) {
     EXPECT_EQ(readText(), before);
 }
 
-TEST_F(CategoryCommand, doesNotKnowACategoryThatWasNeverMade) {
+TEST_F(CategoryCommand, reportsACategoryThatDoesNotExist) {
     EXPECT_THAT(tool({"category", "delete", "Status"}),
                 FailsWith(1, "There is no category \"Status\" in the project."));
     EXPECT_THAT(tool({"category", "delete", "01234567-89ab-4def-8123-456789abcdef"}),
                 FailsWith(1, "There is no category with the UUID \"01234567-89ab-4def-8123-456789abcdef\""));
 }
 
-TEST_F(CategoryCommand, doesNotListAnAddressThatHoldsNoCategory) {
+TEST_F(CategoryCommand, doesNotListAnAddressWithoutACategory) {
     insertLineBefore("\"a\"",
                      R"({"at":["Categories","Root","Category","01234567-89ab-4def-8123-456789abcdef"],)"
                      R"("node":false})");
@@ -127,14 +127,14 @@ TEST_F(CategoryCommand, keepsAnyBytesOfAName) {
     EXPECT_THAT(tool({"category", "list"}), SucceedsSilently());
 }
 
-TEST_F(CategoryCommand, quotesANameForATerminalThatCouldSteerIt) {
+TEST_F(CategoryCommand, quotesANameThatCouldControlTheTerminal) {
     ASSERT_THAT(tool({"category", "create", "a\033[2Jb", "--type", "x\ny"}), SucceedsSilently());
     settings_.onTerminal = true;
 
     EXPECT_EQ(tool({"category", "list"}).output, "\"a\\033[2Jb\" (type x\\ny)\r\n");
 }
 
-TEST_F(CategoryCommand, tellsHowItIsUsed) {
+TEST_F(CategoryCommand, describesItsUse) {
     EXPECT_THAT(tool({"category"}), FailsWith(2, "'projectctl category --help' tells more"));
     EXPECT_THAT(tool({"category", "paint"}), FailsWith(2, "there is no command or option \"paint\""));
     EXPECT_THAT(tool({"category", "create"}), FailsWith(2, "'projectctl category create --help' tells more"));

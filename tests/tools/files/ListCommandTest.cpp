@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -16,23 +16,23 @@ protected:
     }
 };
 
-TEST_F(ListCommand, givesAPathALineAFolderBeforeItsContents) {
+TEST_F(ListCommand, writesOnePathPerLineAFolderBeforeItsContents) {
     EXPECT_THAT(tool({"list"}), Prints("src\nsrc/io\nsrc/io/pump.cpp\nsrc/main.cpp\nsrc.txt\n"));
 }
 
-TEST_F(ListCommand, givesPathsFromTheRootWhereverItIsCalled) {
-    EXPECT_THAT(toolFrom("src/io", {"list"}),
+TEST_F(ListCommand, listsTheWholeProjectFromAnyFolder) {
+    EXPECT_THAT(toolFrom("src/io", {"list"}), Prints("..\n.\npump.cpp\n../main.cpp\n../../src.txt\n"));
+    EXPECT_THAT(toolFrom("src/io", {"list", "--full-name"}),
                 Prints("src\nsrc/io\nsrc/io/pump.cpp\nsrc/main.cpp\nsrc.txt\n"));
 }
 
-TEST_F(ListCommand, givesAPartOfTheProject) {
+TEST_F(ListCommand, listsAPartOfTheProject) {
     EXPECT_THAT(tool({"list", "src/io"}), Prints("src/io\nsrc/io/pump.cpp\n"));
-    EXPECT_THAT(toolFrom("src", {"list", "main.cpp"}), Prints("src/main.cpp\n"));
-    EXPECT_THAT(toolFrom("src", {"list", ".."}),
-                Prints("src\nsrc/io\nsrc/io/pump.cpp\nsrc/main.cpp\nsrc.txt\n"));
+    EXPECT_THAT(toolFrom("src", {"list", "main.cpp"}), Prints("main.cpp\n"));
+    EXPECT_THAT(toolFrom("src", {"list", ".."}), Prints(".\nio\nio/pump.cpp\nmain.cpp\n../src.txt\n"));
 }
 
-TEST_F(ListCommand, complainsOfAPathThatIsNotInTheProject) {
+TEST_F(ListCommand, reportsAPathThatIsNotInTheProject) {
     folder_.file(u"new");
 
     EXPECT_THAT(tool({"list", "new"}), FailsWith(1, '"' + inFolder("new") + "\" is not in the project"));
@@ -43,7 +43,7 @@ TEST_F(ListCommand, showsATree) {
     EXPECT_THAT(tool({"list", "--tree", "src/io"}), Prints("src/io/\n  pump.cpp\n"));
 }
 
-TEST_F(ListCommand, givesJsonWithKinds) {
+TEST_F(ListCommand, writesJsonWithKinds) {
     EXPECT_THAT(tool({"list", "--json"}), Prints("[\n"
                                                  "{\"path\": \"src\", \"kind\": \"folder\"},\n"
                                                  "{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
@@ -53,7 +53,7 @@ TEST_F(ListCommand, givesJsonWithKinds) {
                                                  "]\n"));
 }
 
-TEST_F(ListCommand, stillCallsAFolderOneWhenItHasGoneFromTheDisk) {
+TEST_F(ListCommand, listsADeletedFolderStillAsAFolder) {
     folder_.remove(u"src");
 
     EXPECT_THAT(tool({"list", "--json", "src/io"}),
@@ -71,13 +71,13 @@ TEST_F(ListCommand, refusesTwoFormsAtOnce) {
     EXPECT_THAT(tool({"list", "--tree", "-0"}), FailsWith(2, "excludes"));
 }
 
-TEST_F(ListCommand, listsFilesOnlyThatTheFileManagerLists) {
+TEST_F(ListCommand, listsTheSameFilesAsTheFileManager) {
     insertLineBefore("\"src/\"", "\"lost/file\""); // the folder above it is not in the project
 
     EXPECT_THAT(list(), ElementsAre("src", "src/io", "src/io/pump.cpp", "src/main.cpp", "src.txt"));
 }
 
-TEST(ListCommandOfNothing, givesNothing) {
+TEST(ListCommandOfAnEmptyProject, writesNothing) {
     TemporaryFolder const folder;
     ProgramSettings settings;
     settings.folder = folder.onDisk();

@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -17,7 +17,7 @@ protected:
     }
 };
 
-TEST_F(RemoveCommand, takesAFileOutOfTheProjectAndLeavesItOnDisk) {
+TEST_F(RemoveCommand, removesAFileFromTheProjectAndLeavesItOnDisk) {
     ASSERT_THAT(tool({"remove", "src/main.cpp"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"list"}), Prints("a\nsrc\nsrc/io\nsrc/io/pump.cpp\n"));
@@ -25,7 +25,7 @@ TEST_F(RemoveCommand, takesAFileOutOfTheProjectAndLeavesItOnDisk) {
     EXPECT_THAT(tool({"status"}), Prints("new  src/main.cpp\n"));
 }
 
-TEST_F(RemoveCommand, takesAllBelowAFolderAlong) {
+TEST_F(RemoveCommand, removesEverythingBelowAFolder) {
     ASSERT_THAT(tool({"category", "create", "Status"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "create", "Status", "Done"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "put", "Status", "Done", "src/io", "src/io/pump.cpp", "a"}),
@@ -46,7 +46,7 @@ TEST_F(RemoveCommand, takesPathsFromStandardInput) {
     EXPECT_THAT(tool({"list"}), Prints("src\nsrc/io\nsrc/io/pump.cpp\n"));
 }
 
-TEST_F(RemoveCommand, removesWhatIsGoneFromTheDisk) {
+TEST_F(RemoveCommand, removesFilesThatWereDeletedFromTheDisk) {
     folder_.remove(u"src");
 
     ASSERT_THAT(tool({"remove", "src/"}), SucceedsSilently());
@@ -63,13 +63,13 @@ TEST_F(RemoveCommand, removesNothingWhenOnePathIsNotInTheProject) {
     EXPECT_EQ(readText(), before);
 }
 
-TEST_F(RemoveCommand, saysOnATerminalHowManyWent) {
+TEST_F(RemoveCommand, reportsTheNumberOnATerminal) {
     settings_.onTerminal = true;
 
     EXPECT_EQ(tool({"remove", "src"}).output, "4 removed from the project\r\n");
 }
 
-TEST_F(RemoveCommand, wantsAPath) {
+TEST_F(RemoveCommand, requiresAPath) {
     EXPECT_THAT(tool({"remove"}), FailsWith(2, "PATH is required"));
 }
 

@@ -1,0 +1,48 @@
+#include <optional>
+#include <string>
+
+#include "cli/TextArguments.hpp"
+#include "entrypoints/GroupCommands.hpp"
+#include "entrypoints/Groups.hpp"
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+namespace {
+
+class DeleteGroupCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand(
+            "delete", "Delete a group of entry points. Its entry points remain, without a group. For the "
+                      "default group under another name, delete only that name");
+        takeText(*app, "GROUP", group_, "The group's name or UUID")->required();
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto const guard = project.store().acquireWriteLock();
+        auto& entryPoints = project.manager().getEntryPointManager();
+        Groups const groups(entryPoints);
+        auto const& group = groups.named(*group_);
+        if (groups.isDefault(group)) {
+            throw Failure("the group " + inQuotes(group.getName()) +
+                          " is the default group; every project has it, and it cannot be deleted");
+        }
+        entryPoints.deleteEntryPointGroup(group);
+        return 0;
+    }
+
+private:
+    std::optional<std::string> group_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeDeleteGroupCommand() {
+    return std::make_unique<DeleteGroupCommand>();
+}
+
+} // namespace projectctl

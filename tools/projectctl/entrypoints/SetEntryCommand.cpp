@@ -1,0 +1,118 @@
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "cli/PathArguments.hpp"
+#include "cli/TextArguments.hpp"
+#include "entrypoints/EntryCommands.hpp"
+#include "entrypoints/Groups.hpp"
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
+#include "project/ProjectCommand.hpp"
+#include "project/entrypoints/EntryPoint.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/ProjectException.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::management::EntryPointDefinition;
+using project::management::EntryPointManager;
+using ZEPHRA::project::management::FileNotInProject;
+
+/// The stored path has "/" in place of every backslash. An entry point of such a file could not be found
+/// again.
+void requireNoBackslash(Path const& root, Path const& file) {
+    auto const fromRoot = project::metadata::getRelativePath(root, file);
+    if (fromRoot.find(u'\\') != std::u16string::npos) {
+        throw Failure(
+            "an entry point of " + inQuotes(fromRoot) +
+            " could not be found again because of the backslash in the path. Rename the file first");
+    }
+}
+
+class SetEntryCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand(
+            "set", "Create an entry point for a file of the project, or change the one that it has");
+        takeText(*app, "FILE", file_, "A file of the project")->required();
+        takeText(*app, "--type", type_, "Basic, Startup, Shutdown or Batch_Job (default: Basic)");
+        takeText(*app, "--name", name_,
+                 "The name for users (default: the file's name without its extension)");
+        auto* const hidden = app->add_flag("--hidden", isHidden_, "Hide it from users");
+        app->add_flag("--visible", isVisible_, "Show it to users (default)")->excludes(hidden);
+        takeText(*app, "--group", group_, "The name or UUID of its group (default: the default group)");
+        takeTexts(*app, "--extension", extensions_,
+                  "KEY=VALUE, to be stored with it; may be given several times")
+            ->allow_extra_args(false);
+        takeTexts(*app, "--no-extension", removed_,
+                  "KEY of an extension to be deleted; may be given several times")
+            ->allow_extra_args(false);
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto const file = absolutePath(*file_);
+        requireNoBackslash(project.root(), file);
+        auto const guard = project.store().acquireWriteLock();
+        auto& entryPoints = project.manager().getEntryPointManager();
+        auto const present = entryPoints.getEntryPoint(file);
+        if (!present) {
+            project::exception::raise(FileNotInProject(file.native()));
+        }
+        EntryPointDefinition entry(*present);
+        change(entry, entryPoints);
+        entryPoints.setEntryPoint(entry);
+        return 0;
+    }
+
+private:
+    void change(EntryPointDefinition& entry, EntryPointManager& entryPoints) const {
+        if (type_) {
+            entry.setType(project::management::getFromName(textOf(*type_)));
+        }
+        if (name_) {
+            entry.setName(textOf(*name_));
+        }
+        if (isHidden_ || isVisible_) {
+            entry.setVisible(isVisible_);
+        }
+        if (group_) {
+            entry.setGroup(Groups(entryPoints).named(*group_));
+        }
+        changeExtensions(entry);
+    }
+
+    void changeExtensions(EntryPointDefinition& entry) const {
+        for (auto const& key : removed_) {
+            entry.removeExtensionData(textOf(key));
+        }
+        for (auto const& pair : extensions_) {
+            auto const equals = pair.find('=');
+            if (equals == std::string::npos) {
+                throw Failure('"' + pair + "\" is not an extension. Give it as KEY=VALUE");
+            }
+            entry.setExtensionData(textOf(pair.substr(0, equals)), textOf(pair.substr(equals + 1)));
+        }
+    }
+
+    std::optional<std::string> file_;
+    std::optional<std::string> type_;
+    std::optional<std::string> name_;
+    std::optional<std::string> group_;
+    std::vector<std::string> extensions_;
+    std::vector<std::string> removed_;
+    bool isHidden_ = false;
+    bool isVisible_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeSetEntryCommand() {
+    return std::make_unique<SetEntryCommand>();
+}
+
+} // namespace projectctl

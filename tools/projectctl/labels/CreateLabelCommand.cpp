@@ -1,0 +1,53 @@
+#include <optional>
+#include <string>
+
+#include "cli/TextArguments.hpp"
+#include "labels/LabelCommands.hpp"
+#include "labels/LabelNames.hpp"
+#include "output/NameForms.hpp"
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::management::LabelDefinition;
+using project::management::LabelReadOnlyState;
+
+class CreateLabelCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand("create", "Create a label in a category");
+        takeText(*app, "CATEGORY", category_, "The category's name or UUID")->required();
+        takeText(*app, "NAME", name_, "The name of the label")->required();
+        auto* const readOnly = app->add_flag("--read-only", isReadOnly_, "Do not allow it to be deleted");
+        app->add_flag("--writable", isWritable_, "Allow it to be deleted even if its category is read-only")
+            ->excludes(readOnly);
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto const guard = project.store().acquireWriteLock();
+        auto& labels = project.manager().getLabelManager();
+        LabelDefinition label(textOf(*name_));
+        if (isReadOnly_ || isWritable_) {
+            label.setIsReadOnly(isReadOnly_ ? LabelReadOnlyState::READ_ONLY : LabelReadOnlyState::WRITABLE);
+        }
+        labels.createLabel(LabelNames(labels).category(*category_), label);
+        return 0;
+    }
+
+private:
+    std::optional<std::string> category_;
+    std::optional<std::string> name_;
+    bool isReadOnly_ = false;
+    bool isWritable_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeCreateLabelCommand() {
+    return std::make_unique<CreateLabelCommand>();
+}
+
+} // namespace projectctl

@@ -1,0 +1,43 @@
+#include <optional>
+#include <string>
+
+#include "cli/TextArguments.hpp"
+#include "labels/LabelCommands.hpp"
+#include "labels/LabelNames.hpp"
+#include "output/Progress.hpp"
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+namespace {
+
+class DeleteLabelCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand("delete", "Delete a label, and remove it from all files");
+        takeText(*app, "CATEGORY", category_, "The category's name or UUID")->required();
+        takeText(*app, "LABEL", label_, "The label's name or UUID")->required();
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto const guard = project.store().acquireWriteLock();
+        auto& labels = project.manager().getLabelManager();
+        Progress const progress("Removing the label from all files");
+        auto const label = LabelNames(labels).label(*category_, *label_);
+        labels.deleteLabel(label.getCategory(), label.getLabelIdentifier());
+        return 0;
+    }
+
+private:
+    std::optional<std::string> category_;
+    std::optional<std::string> label_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeDeleteLabelCommand() {
+    return std::make_unique<DeleteLabelCommand>();
+}
+
+} // namespace projectctl

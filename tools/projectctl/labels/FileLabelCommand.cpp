@@ -1,0 +1,34 @@
+#include "labels/FileLabelCommand.hpp"
+
+#include <algorithm>
+
+#include "cli/TextArguments.hpp"
+#include "output/Progress.hpp"
+#include "project/files/LabelIDSet.hpp"
+
+namespace projectctl {
+
+int FileLabelCommand::run(OpenProject& project) {
+    auto const paths = paths_.read();
+    Progress const progress("Labelling " + std::to_string(paths.size()) + " files and folders");
+    auto const guard = project.store().acquireWriteLock();
+    for (auto const& path : paths) {
+        project.requireInProject(path);
+    }
+    change(project, paths);
+    return 0;
+}
+
+void FileLabelCommand::declareArguments(CLI::App& app, std::string const& use) {
+    takeText(app, "CATEGORY", category_, "The category's name or UUID")->required();
+    takeText(app, "LABEL", label_, "The label's name or UUID")->required();
+    paths_.declare(app, use);
+}
+
+std::size_t FileLabelCommand::countOn(OpenProject& project, Path const& path,
+                                      project::management::Label const& label) {
+    project::management::LabelIDSet const wanted(label.getCategory(), label.getLabelIdentifier());
+    return static_cast<std::size_t>(std::ranges::count(project.files().getLabelIDSets(path), wanted));
+}
+
+} // namespace projectctl

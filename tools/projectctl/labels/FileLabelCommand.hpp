@@ -1,0 +1,40 @@
+#pragma once
+
+#include <cstddef>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "cli/PathArguments.hpp"
+#include "project/ProjectCommand.hpp"
+#include "project/labels/Label.hpp"
+
+namespace projectctl {
+
+/// A command that changes the labels of files: its arguments are one label and the files.
+class FileLabelCommand : public ProjectCommand {
+public:
+    int run(OpenProject& project) override;
+
+protected:
+    /// @param paths all of them in the project.
+    virtual void change(OpenProject& project, std::vector<Path> const& paths) const = 0;
+
+    /// @param use the description of the paths for the help text.
+    void declareArguments(CLI::App& app, std::string const& use);
+
+    std::string const& category() const { return *category_; }
+
+    std::string const& label() const { return *label_; }
+
+    /// How many times a file has a label. More than once is possible in a text that was merged or edited.
+    static std::size_t countOn(OpenProject& project, Path const& path,
+                               project::management::Label const& label);
+
+private:
+    std::optional<std::string> category_;
+    std::optional<std::string> label_;
+    PathArguments paths_;
+};
+
+} // namespace projectctl

@@ -1,0 +1,84 @@
+#include <algorithm>
+#include <string>
+
+#include "labels/CategoryCommands.hpp"
+#include "output/JsonRows.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::management::CategoryDefinition;
+using project::management::CategoryIdentifier;
+
+class ListCategoriesCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand("list", "List the categories of the project by name");
+        app->add_flag("--json", isJson_, "Write a JSON array of objects, with the UUIDs");
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        project.warnOfDamage();
+        auto categories = project.manager().getLabelManager().getAllCategories();
+        std::ranges::stable_sort(categories, {}, &CategoryIdentifier::getName);
+        isJson_ ? writeJson(categories) : writeLines(categories);
+        return 0;
+    }
+
+private:
+    static void writeLines(std::vector<CategoryIdentifier> const& categories) {
+        for (auto const& category : categories) {
+            output().name(category.getName());
+            output().text() += attributesOf(category);
+            output().text() += '\n';
+        }
+    }
+
+    static void writeJson(std::vector<CategoryIdentifier> const& categories) {
+        JsonRows rows;
+        for (auto const& category : categories) {
+            rows.begin();
+            rows.addText("name", category.getName());
+            rows.addText("uuid", category.getUUID());
+            rows.addFlag("readOnly", category.isReadOnly());
+            rows.addFlag("singleValued", category.isSingleValued());
+            rows.addText("type", category.getDataType());
+        }
+        rows.finishOutput();
+    }
+
+    /// The differences from a category that was created without options: " (read-only, type Number)".
+    static std::string attributesOf(CategoryIdentifier const& category) {
+        std::string result;
+        auto const append = [&result](std::string const& attribute) {
+            result += (result.empty() ? " (" : ", ") + attribute;
+        };
+        if (category.isReadOnly()) {
+            append("read-only");
+        }
+        if (category.isSingleValued()) {
+            append("single-valued");
+        }
+        if (auto const type = category.getDataType(); type != CategoryDefinition({}, {}).getDataType()) {
+            std::string bytes;
+            appendBytes(bytes, type);
+            append("type " + withoutControls(bytes, false));
+        }
+        return result + (result.empty() ? "" : ")");
+    }
+
+    bool isJson_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeListCategoriesCommand() {
+    return std::make_unique<ListCategoriesCommand>();
+}
+
+} // namespace projectctl

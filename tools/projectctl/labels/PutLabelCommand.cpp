@@ -1,0 +1,43 @@
+#include <string>
+#include <vector>
+
+#include "labels/FileLabelCommand.hpp"
+#include "labels/LabelCommands.hpp"
+#include "labels/LabelNames.hpp"
+#include "output/Output.hpp"
+#include "project/files/FileLabel.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// Puts a label on files. A file that already has the label is left alone: it would get the label twice.
+class PutLabelCommand : public FileLabelCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand(
+            "put",
+            "Put a label on files and folders of the project, in one step. In a single-valued category "
+            "it replaces the label that was there");
+        declareArguments(*app, "The files and folders");
+        return app;
+    }
+
+private:
+    void change(OpenProject& project, std::vector<Path> const& paths) const override {
+        auto const label = LabelNames(project.manager().getLabelManager()).label(category(), this->label());
+        auto lacking = paths;
+        std::erase_if(lacking, [&](Path const& path) { return countOn(project, path, label) > 0; });
+        auto const replaced = project.files().addLabels(lacking, {label});
+        output().say("put on " + std::to_string(lacking.size()) +
+                     (replaced.empty() ? "" : ", replacing " + std::to_string(replaced.size()) + " others"));
+    }
+};
+
+} // namespace
+
+std::unique_ptr<Command> makePutLabelCommand() {
+    return std::make_unique<PutLabelCommand>();
+}
+
+} // namespace projectctl

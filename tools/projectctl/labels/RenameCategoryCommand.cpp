@@ -1,0 +1,56 @@
+#include <algorithm>
+#include <optional>
+#include <string>
+
+#include "cli/TextArguments.hpp"
+#include "labels/CategoryCommands.hpp"
+#include "labels/LabelNames.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::management::CategoryIdentifier;
+
+class RenameCategoryCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand("rename", "Rename a category");
+        takeText(*app, "CATEGORY", category_, "The category's name or UUID")->required();
+        takeText(*app, "NAME", name_, "The new name")->required();
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto const guard = project.store().acquireWriteLock();
+        auto& labels = project.manager().getLabelManager();
+        labels.renameCategory(LabelNames(labels).category(*category_), textOf(*name_));
+        warnOfSharedName(labels.getAllCategories());
+        return 0;
+    }
+
+private:
+    /// Several categories may have the same name, but then the name no longer identifies any of them.
+    void warnOfSharedName(std::vector<CategoryIdentifier> const& categories) const {
+        auto const name = textOf(*name_);
+        auto const count = std::ranges::count(categories, name, &CategoryIdentifier::getName);
+        if (count > 1) {
+            printError("warning: " + std::to_string(count) + " categories now have the name " +
+                       inQuotes(name) + "; only their UUIDs distinguish them");
+        }
+    }
+
+    std::optional<std::string> category_;
+    std::optional<std::string> name_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeRenameCategoryCommand() {
+    return std::make_unique<RenameCategoryCommand>();
+}
+
+} // namespace projectctl

@@ -1,0 +1,110 @@
+#include <algorithm>
+#include <string_view>
+#include <vector>
+
+#include "cli/PathArguments.hpp"
+#include "cli/ShownPaths.hpp"
+#include "labels/LabelCommands.hpp"
+#include "output/JsonRows.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
+#include "project/files/FileLabel.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::management::FileLabel;
+
+/// Shows the labels of files, each label once, with its data if it has any.
+class ShowLabelsCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand("show", "Show the labels of files and folders of the project");
+        paths_.declare(*app, "The files and folders");
+        app->add_flag("--json", isJson_, "Write a JSON array of objects, one per label, with the UUIDs");
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto const paths = paths_.read();
+        project.warnOfDamage();
+        auto const guard = project.store().acquireReadLock();
+        ShownPaths shown(project.root());
+        JsonRows rows;
+        for (auto const& path : paths) {
+            auto const fromRoot = project::metadata::getRelativePath(project.root(), path);
+            for (auto const& label : labelsOf(project, path)) {
+                if (isJson_) {
+                    writeJson(rows, fromRoot, label);
+                } else {
+                    writeLine(paths.size() > 1 ? shown.of(fromRoot) : std::u16string_view(), label);
+                }
+            }
+        }
+        if (isJson_) {
+            rows.finishOutput();
+        }
+        return 0;
+    }
+
+private:
+    /// The file manager lists a label that has data twice, first with the data and then without.
+    static std::vector<FileLabel> labelsOf(OpenProject& project, Path const& path) {
+        std::vector<FileLabel> result;
+        for (auto const& label : readLabels(project, path)) {
+            auto const isSame = [&label](FileLabel const& other) {
+                return other.getUUID() == label.getUUID() &&
+                       other.getCategory().getUUID() == label.getCategory().getUUID();
+            };
+            if (std::ranges::none_of(result, isSame)) {
+                result.push_back(label);
+            }
+        }
+        return result;
+    }
+
+    static std::vector<FileLabel> readLabels(OpenProject& project, Path const& path) {
+        project.requireInProject(path);
+        return path == project.root() ? std::vector<FileLabel>() : project.files().getLabels(path);
+    }
+
+    static void writeJson(JsonRows& rows, std::u16string const& path, FileLabel const& label) {
+        rows.begin();
+        rows.addText("path", path);
+        rows.addText("category", label.getCategory().getName());
+        rows.addText("categoryUuid", label.getCategory().getUUID());
+        rows.addText("label", label.getLabelIdentifier().getName());
+        rows.addText("labelUuid", label.getUUID());
+        rows.addText("data", label.getData());
+    }
+
+    /// @param path empty if the line should not show it.
+    static void writeLine(std::u16string_view path, FileLabel const& label) {
+        if (!path.empty()) {
+            output().name(path);
+            output().text() += ": ";
+        }
+        output().name(label.getCategory().getName());
+        output().text() += ": ";
+        output().name(label.getLabelIdentifier().getName());
+        if (!label.getData().empty()) {
+            output().text() += " = ";
+            output().name(label.getData());
+        }
+        output().text() += '\n';
+        output().settle();
+    }
+
+    PathArguments paths_;
+    bool isJson_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeShowLabelsCommand() {
+    return std::make_unique<ShowLabelsCommand>();
+}
+
+} // namespace projectctl

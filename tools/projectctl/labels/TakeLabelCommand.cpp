@@ -1,0 +1,51 @@
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "labels/FileLabelCommand.hpp"
+#include "labels/LabelCommands.hpp"
+#include "labels/LabelNames.hpp"
+#include "output/Output.hpp"
+#include "project/files/FileLabel.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// Removes a label from files, however many times they have it.
+class TakeLabelCommand : public FileLabelCommand {
+public:
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand(
+            "take", "Remove a label from files and folders of the project, in one step. A label that was "
+                    "deleted but is still on files can be removed by its UUIDs");
+        declareArguments(*app, "The files and folders");
+        return app;
+    }
+
+private:
+    void change(OpenProject& project, std::vector<Path> const& paths) const override {
+        auto const label =
+            LabelNames(project.manager().getLabelManager()).labelEvenIfDeleted(category(), this->label());
+        std::vector<Path> labelled;
+        std::size_t most = 0;
+        for (auto const& path : paths) {
+            if (auto const count = countOn(project, path, label); count > 0) {
+                labelled.push_back(path);
+                most = std::max(most, count);
+            }
+        }
+        if (!labelled.empty()) {
+            project.files().removeLabels(labelled, std::vector(most, label)); // each element removes one
+        }
+        output().say("removed from " + std::to_string(labelled.size()));
+    }
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeTakeLabelCommand() {
+    return std::make_unique<TakeLabelCommand>();
+}
+
+} // namespace projectctl

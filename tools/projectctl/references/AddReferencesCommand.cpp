@@ -1,0 +1,70 @@
+#include <string>
+#include <vector>
+
+#include "cli/PathArguments.hpp"
+#include "cli/TextArguments.hpp"
+#include "output/Failure.hpp"
+#include "output/NameForms.hpp"
+#include "project/ProjectCommand.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
+#include "project/references/FolderReference.hpp"
+#include "references/ReferenceCommands.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::management::FolderReference;
+
+class AddReferencesCommand : public ProjectCommand {
+public:
+    explicit AddReferencesCommand(ReferenceList const& list) : list_(list) {}
+
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand("add", "Add folders to " + list_.name);
+        takeTexts(*app, "FOLDER", arguments_, "The folders, inside or outside the project")->required();
+        if (list_.isOfProjects) {
+            app->add_flag("--absolute", isAbsolute_,
+                          "Store the absolute path instead of the path relative to the root");
+        }
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        std::vector<FolderReference> references;
+        for (auto const& folder : absolutePaths(arguments_)) {
+            if (!project::metadata::is_directory(folder)) {
+                throw Failure('"' + shown(folder) + "\" is not a folder");
+            }
+            references.push_back(isAbsolute_ ? project::management::absoluteFolderReference(folder)
+                                             : relativeReference(folder, project.root()));
+        }
+        list_.manager(project).addReferences(references);
+        return 0;
+    }
+
+private:
+    /// The stored path has "/" in place of every backslash, and may lead elsewhere.
+    FolderReference relativeReference(Path const& folder, Path const& root) const {
+        auto result = project::management::relativeFolderReference(folder, root);
+        if (project::metadata::getRelativePath(root, result.getLocation()) != result.getStoredPath()) {
+            throw Failure('"' + shown(folder) +
+                          "\" could not be found again because of the backslash in its path. " +
+                          (list_.isOfProjects ? "Rename the folder, or add it with --absolute"
+                                              : "Rename the folder first"));
+        }
+        return result;
+    }
+
+    ReferenceList const& list_;
+    std::vector<std::string> arguments_;
+    bool isAbsolute_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeAddReferencesCommand(ReferenceList const& list) {
+    return std::make_unique<AddReferencesCommand>(list);
+}
+
+} // namespace projectctl

@@ -1,0 +1,80 @@
+#include <algorithm>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "cli/ShownPaths.hpp"
+#include "output/JsonRows.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
+#include "project/references/FolderReference.hpp"
+#include "references/ReferenceCommands.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::management::FolderReference;
+
+class ListReferencesCommand : public ProjectCommand {
+public:
+    explicit ListReferencesCommand(ReferenceList const& list) : list_(list) {}
+
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand("list", "List the folders of " + list_.name);
+        auto* const json =
+            app->add_flag("--json", isJson_,
+                          "Write a JSON array of objects with the stored path, the folder that "
+                          "it leads to on this machine, and the UUID");
+        app->add_flag("-0,--null", isNullEnded_, "End each path with a zero byte")->excludes(json);
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        project.warnOfDamage();
+        auto references = list_.manager(project).getReferences();
+        std::ranges::stable_sort(references, std::less<>(), &FolderReference::getLocation);
+        isJson_ ? writeJson(references) : writePaths(references, project.root());
+        return 0;
+    }
+
+private:
+    static void writeJson(std::vector<FolderReference> const& references) {
+        JsonRows rows;
+        for (auto const& reference : references) {
+            rows.begin();
+            rows.addText("path", reference.getStoredPath());
+            rows.addText("type", reference.getType());
+            rows.addText("location", reference.getLocation().native());
+            rows.addText("uuid", reference.getUUID());
+        }
+        rows.finishOutput();
+    }
+
+    void writePaths(std::vector<FolderReference> const& references, Path const& root) const {
+        ShownPaths shown(root);
+        for (auto const& reference : references) {
+            auto const path = shown.of(reference.getStoredPath());
+            if (isNullEnded_) {
+                appendBytes(output().text(), path);
+                output().text() += '\0';
+            } else {
+                output().name(path);
+                output().text() += '\n';
+            }
+        }
+    }
+
+    ReferenceList const& list_;
+    bool isJson_ = false;
+    bool isNullEnded_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeListReferencesCommand(ReferenceList const& list) {
+    return std::make_unique<ListReferencesCommand>(list);
+}
+
+} // namespace projectctl
