@@ -51,7 +51,7 @@ TEST_F(FileSystems, whereNothingCanBeWrittenProjectsOpenForReading) {
         auto const names = std::set<std::string>{"look", "look after others", "check", "close", "discard"};
         EXPECT_EQ(!names.contains(operation.name), thrown.has_value()) << operation.name;
         if (thrown) {
-            EXPECT_EQ("The file system takes no writes: mount it writable, or work on a copy.",
+            EXPECT_EQ("The file system is read-only: mount it writable, or work on a copy.",
                       thrown->getRemedy());
         }
         EXPECT_EQ(text, project->text());
