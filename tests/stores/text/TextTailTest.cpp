@@ -141,7 +141,7 @@ TEST(TextTail, severalUnreadableBatchesAtTheEndAreOneTornTail) {
         batch->replace(1, 1, 1, '\0');
     }
     ProjectText const text = readWhole(body + one + two);
-    EXPECT_EQ(told(text.faults()), "TornTail 6");
+    EXPECT_EQ(described(text.faults()), "TornTail 6");
     EXPECT_EQ(text.damagedLines(), "");
 }
 
@@ -151,7 +151,7 @@ TEST(TextTail, anUnreadableBatchBeforeAReadableOneWithAWrongSumIsDamage) {
     one.replace(1, 1, 1, '\0');
     two.replace(1, 1, "x");
     ProjectText const text = readWhole(body + one + two);
-    EXPECT_EQ(told(text.faults()), "Damage 6, Damage 9");
+    EXPECT_EQ(described(text.faults()), "Damage 6, Damage 9");
     EXPECT_EQ(text.damagedLines(), one + two);
 }
 
@@ -161,7 +161,7 @@ TEST(TextTail, aValidBatchAfterDamageReplacesWhateverItChainsTo) {
     std::string const one = batchOf({key}, sumOf(body));
     std::string const two = batchOf({next}, std::string(32, '0'));
     ProjectText const text = readWhole(body + one + "\"lost\"\n" + two);
-    EXPECT_EQ(told(text.faults()), "Damage 8");
+    EXPECT_EQ(described(text.faults()), "Damage 8");
     EXPECT_EQ(contentOf(text).at(fileAddress(u"a")), "Info(l=2;)");
 }
 
@@ -170,7 +170,7 @@ TEST(TextTail, aRemovalDiscardsNodesThatAreBeingJoinedBelowIt) {
     std::string const other = R"({"file":"folder/c","keys":{"l":"2"}})";
     std::string const unchained = batchOf({key, R"({"remove":"folder"})", other}, std::string(32, '0'));
     ProjectText const text = readWhole(body + unchained);
-    EXPECT_EQ(told(text.faults()), "Irregular 9");
+    EXPECT_EQ(described(text.faults()), "Irregular 9");
     EXPECT_EQ(contentOf(text),
               (Content{{fileAddress(u"a"), "Info()"}, {fileAddress(u"folder/c"), "Info(l=2;)"}}));
 }
