@@ -24,6 +24,9 @@ protected:
         std::filesystem::remove(copy);
         if (std::filesystem::exists(repository.indexFile())) {
             std::filesystem::copy_file(repository.indexFile(), copy);
+            // git reads a file again whose entry is as young as the index; a younger index would hide its
+            // change.
+            std::filesystem::last_write_time(copy, std::filesystem::last_write_time(repository.indexFile()));
         }
         repository.runOnIndex(copy, arguments);
         return repository.runOnIndex(copy, {"ls-files", "-z", "-s", "-t", "-v"});
