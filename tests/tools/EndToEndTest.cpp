@@ -10,8 +10,8 @@ namespace {
 
 using Lines = ProjectModel::Lines;
 
-/// A project over a tree of over 20,000 files, driven through every command of the tool, each call a process
-/// of its own, with each answer compared with a model's.
+/// A project with over 20,000 files that is changed by every command of the tool, each in a process of its
+/// own. All output is compared with that of a model.
 class EndToEnd : public ToolTest {
 protected:
     static constexpr int folders = 1'000;
@@ -34,7 +34,7 @@ protected:
 
     void makeFile(std::string const& path) {
         folder_.addFile(path);
-        model_.makeOnDisk(path);
+        model_.createOnDisk(path);
     }
 
     void succeed(std::vector<std::string> const& command, std::string_view input = {}) const {
@@ -48,7 +48,7 @@ protected:
         return {lines.begin(), lines.end()};
     }
 
-    // Chance, the same in every run.
+    // Random choices, the same in every run.
 
     std::size_t below(std::size_t limit) {
         return std::uniform_int_distribution<std::size_t>(0, limit - 1)(chance_);
@@ -65,7 +65,7 @@ protected:
         return result;
     }
 
-    // The changes: each on the project and on the model.
+    // The changes. Each is made to the project and to the model.
 
     void addNewFiles() {
         std::string input;
@@ -162,27 +162,28 @@ protected:
         area_ = renamed;
     }
 
-    void makeTheLabelAnew() {
+    void createTheLabelAnew() {
         auto const [category, label] = aLabel();
         succeed({"label", "delete", category, label});
         succeed({"label", "create", category, label});
         model_.deleteLabel(category, label);
-        model_.makeLabel(category, label);
+        model_.createLabel(category, label);
     }
 
-    void makeTheCategoryAnew() {
+    void createTheCategoryAnew() {
         succeed({"category", "delete", area_});
         model_.deleteCategory(area_);
-        makeCategory(area_, false, {"Ann", "Bob"});
+        createCategory(area_, false, {"Ann", "Bob"});
     }
 
-    void makeCategory(std::string const& name, bool isSingleValued, std::vector<std::string> const& labels) {
+    void createCategory(std::string const& name, bool isSingleValued,
+                        std::vector<std::string> const& labels) {
         isSingleValued ? succeed({"category", "create", name, "--single-valued"})
                        : succeed({"category", "create", name});
-        model_.makeCategory(name, isSingleValued);
+        model_.createCategory(name, isSingleValued);
         for (auto const& label : labels) {
             succeed({"label", "create", name, label});
-            model_.makeLabel(name, label);
+            model_.createLabel(name, label);
         }
     }
 
@@ -216,11 +217,11 @@ protected:
         group_ = renamed;
     }
 
-    void makeTheGroupAnew() {
+    void createTheGroupAnew() {
         succeed({"group", "delete", group_});
         succeed({"group", "create", group_});
         model_.deleteGroup(group_);
-        model_.makeGroup(group_);
+        model_.createGroup(group_);
     }
 
     void addAndRemoveReferences() {
@@ -292,15 +293,15 @@ protected:
     Lines references_;
 };
 
-TEST_F(EndToEnd, everyCommandAnswersAsTheModelDoes) {
+TEST_F(EndToEnd, everyCommandAgreesWithTheModel) {
     succeed({"add", "--recursive", "."});
     model_.addContents("");
     changeTheTexts();
-    makeCategory("Status", true, {"Open", "Done"});
-    makeCategory("Owner", false, {"Ann", "Bob"});
-    makeCategory(area_, false, {"Ann", "Bob"});
+    createCategory("Status", true, {"Open", "Done"});
+    createCategory("Owner", false, {"Ann", "Bob"});
+    createCategory(area_, false, {"Ann", "Bob"});
     succeed({"group", "create", group_});
-    model_.makeGroup(group_);
+    model_.createGroup(group_);
     compareEverything();
 
     std::vector<std::function<void()>> const changes{
@@ -315,13 +316,13 @@ TEST_F(EndToEnd, everyCommandAnswersAsTheModelDoes) {
         [this] { putLabels(); },
         [this] { takeLabels(); },
         [this] { renameTheCategory(); },
-        [this] { makeTheLabelAnew(); },
-        [this] { makeTheCategoryAnew(); },
+        [this] { createTheLabelAnew(); },
+        [this] { createTheCategoryAnew(); },
         [this] { setAnEntry(); },
         [this] { setAnEntry(); },
         [this] { removeAnEntry(); },
         [this] { renameTheGroup(); },
-        [this] { makeTheGroupAnew(); },
+        [this] { createTheGroupAnew(); },
         [this] { addAndRemoveReferences(); },
         [this] { changeTheTexts(); },
     };

@@ -24,7 +24,8 @@ TEST_F(FindProject, findsItThroughALink) {
 
     EXPECT_THAT(tool({"add", "file"}), SucceedsSilently());
 
-    EXPECT_THAT(tool({"list"}), Prints("real\nreal/deep\nreal/deep/file\n"));
+    EXPECT_THAT(tool({"list"}), Prints("..\n.\nfile\n"));
+    EXPECT_THAT(tool({"list", "--full-name"}), Prints("real\nreal/deep\nreal/deep/file\n"));
 }
 
 TEST_F(FindProject, saysThatThereIsNone) {

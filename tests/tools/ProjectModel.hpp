@@ -9,8 +9,9 @@
 
 namespace project::test {
 
-/// What a project is told to hold, in plain containers: every command of the tool that changes something has
-/// its counterpart here, and every one that shows something its answer. Paths are relative to the root.
+/// The expected state of a project in plain containers. Every command of the tool that changes the project
+/// has a counterpart here, and every command that shows something has its expected output. Paths are relative
+/// to the root.
 class ProjectModel {
 public:
     struct Entry {
@@ -22,7 +23,7 @@ public:
 
     using Lines = std::multiset<std::string>;
 
-    void makeOnDisk(std::string const& file) {
+    void createOnDisk(std::string const& file) {
         for (auto path = file; !path.empty(); path = parentOf(path)) {
             disk_[path] = disk_.contains(path) ? disk_[path] : path != file;
         }
@@ -68,11 +69,11 @@ public:
         std::erase_if(entries_, [&](auto const& item) { return isWithin(item.first, file); });
     }
 
-    void makeCategory(std::string const& name, bool isSingleValued) {
+    void createCategory(std::string const& name, bool isSingleValued) {
         categories_[name].first = isSingleValued;
     }
 
-    void makeLabel(std::string const& category, std::string const& label) {
+    void createLabel(std::string const& category, std::string const& label) {
         categories_[category].second.insert(label);
     }
 
@@ -126,7 +127,7 @@ public:
 
     void removeEntry(std::string const& file) { entries_.erase(file); }
 
-    void makeGroup(std::string const& name) { groups_.insert(name); }
+    void createGroup(std::string const& name) { groups_.insert(name); }
 
     void renameGroup(std::string const& name, std::string const& newName) {
         groups_.erase(name);
@@ -201,7 +202,7 @@ public:
         return result;
     }
 
-    /// What status tells of files.
+    /// The lines of status about files.
     Lines differences() const {
         Lines result;
         for (auto const& [path, isFolder] : disk_) {
@@ -218,7 +219,7 @@ public:
         return result;
     }
 
-    /// How many entry points status finds fault with: for a file that is gone, and for a group that is.
+    /// The number of problems that status reports for entry points: missing files and missing groups.
     std::size_t entryProblems() const {
         std::size_t result = 0;
         for (auto const& [file, entry] : entries_) {
@@ -227,7 +228,7 @@ public:
         return result;
     }
 
-    /// Whether an entry point is in a group that is gone; a file that is gone is no fault of the definition.
+    /// Whether an entry point is in a deleted group. A missing file is not a fault of the definition.
     bool hasFaults() const {
         return std::any_of(entries_.begin(), entries_.end(),
                            [](auto const& item) { return item.second.group.empty(); });
@@ -237,7 +238,7 @@ public:
 
     std::vector<std::string> entryFiles() const { return keysOf(entries_); }
 
-    /// What is in the project and no folder on disk.
+    /// Whether a path of the project is not a folder on disk.
     bool isFile(std::string const& path) const {
         auto const found = disk_.find(path);
         return found == disk_.end() || !found->second;
