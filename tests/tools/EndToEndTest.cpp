@@ -2,8 +2,8 @@
 #include <functional>
 #include <random>
 
-#include "ProjectModel.hpp"
-#include "ToolTest.hpp"
+#include "tools/ProjectModel.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {

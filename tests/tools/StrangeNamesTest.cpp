@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {

@@ -20,7 +20,7 @@ class ToolTest : public ::testing::Test {
 protected:
     ToolTest() { settings_.folder = folder_.onDisk(); }
 
-    /// Calls projectctl with the settings as they stand.
+    /// Calls projectctl with the current settings.
     ProgramResult tool(std::vector<std::string> arguments, std::string_view input = {}) const {
         return runProgram(commandFor(std::move(arguments)), settings_, input);
     }
@@ -37,7 +37,7 @@ protected:
         return arguments;
     }
 
-    /// What `list` gives, line by line.
+    /// The lines of `list`.
     std::vector<std::string> list() const { return linesOf(tool({"list"}).output); }
 
     static std::vector<std::string> linesOf(std::string const& text) {
@@ -50,7 +50,7 @@ protected:
         return result;
     }
 
-    /// The names with a zero byte behind each.
+    /// The names, each followed by a zero byte.
     static std::string withZeros(std::vector<std::string> const& names) {
         std::string result;
         for (auto const& name : names) {
@@ -72,7 +72,7 @@ protected:
         std::ofstream(text(), std::ios::binary | std::ios::trunc) << content;
     }
 
-    /// Puts a line, given without its end, before the first line that begins with the mark.
+    /// Inserts a line, given without its end, before the first line that begins with the mark.
     void insertLineBefore(std::string const& mark, std::string const& line) const {
         auto content = readText();
         auto const place = content.find('\n' + mark);
@@ -89,14 +89,14 @@ protected:
     ProgramSettings settings_;
 };
 
-/// A run that went well and said nothing.
+/// A run that succeeded without any output.
 MATCHER(SucceedsSilently, "") {
     *result_listener << "exit code " << arg.exitCode << ", errors: " << arg.errors
                      << ", output: " << arg.output;
     return arg.exitCode == 0 && arg.output.empty() && arg.errors.empty();
 }
 
-/// A run that failed with this exit code, one line of error that holds this text, and nothing else.
+/// A run that failed with this exit code and one line of error that contains this text, without other output.
 MATCHER_P2(FailsWith, exitCode, text, "") {
     *result_listener << "exit code " << arg.exitCode << ", errors: " << arg.errors
                      << ", output: " << arg.output;
@@ -104,7 +104,7 @@ MATCHER_P2(FailsWith, exitCode, text, "") {
            arg.errors.find('\n') == arg.errors.size() - 1 && arg.errors.find(text) != std::string::npos;
 }
 
-/// A run that went well, said this, and complained of nothing.
+/// A run that succeeded with this output and without errors.
 MATCHER_P(Prints, output, "") {
     *result_listener << "exit code " << arg.exitCode << ", errors: " << arg.errors
                      << ", output: " << arg.output;

@@ -5,6 +5,7 @@
 
 #include "checks/Commands.hpp"
 #include "cli/CommandLine.hpp"
+#include "cli/ExitCode.hpp"
 #include "cli/Language.hpp"
 #include "entrypoints/Commands.hpp"
 #include "files/Commands.hpp"
@@ -34,19 +35,19 @@ std::vector<std::unique_ptr<projectctl::Command>> makeCommands() {
     return result;
 }
 
-/// Ends as a program does whose reader has gone: by the signal, without a word.
+/// Ends like any program whose output was closed: by the signal, without a message.
 int endOfClosedOutput() {
     std::signal(SIGPIPE, SIG_DFL);
     std::raise(SIGPIPE);
-    return 1; // whoever called us holds the signal back
+    return projectctl::exit_code::failed; // the caller has blocked the signal
 }
 
 } // namespace
 
 int main(int argc, char** argv) {
-    std::signal(SIGPIPE, SIG_IGN); // a closed pipe is an error of the write to it
-    std::signal(SIGXFSZ, SIG_IGN); // so is a limit on the size of files, and the store undoes what it did
-    std::signal(SIGCHLD, SIG_DFL); // else, when our caller ignores it, the end of git cannot be told
+    std::signal(SIGPIPE, SIG_IGN); // so that a write to a closed pipe fails instead
+    std::signal(SIGXFSZ, SIG_IGN); // the same for a limit on the size of files: the store then rolls back
+    std::signal(SIGCHLD, SIG_DFL); // if the caller ignores it, we could not wait for git
     try {
         fl::i18n::MessageCatalog::setGlobalLocale(projectctl::languageOfEnvironment());
         return projectctl::runCommandLine(argc, argv, PROJECTCTL_VERSION, makeCommands());
@@ -54,6 +55,6 @@ int main(int argc, char** argv) {
         return endOfClosedOutput();
     } catch (std::exception const& error) {
         projectctl::printError(error.what());
-        return 1;
+        return projectctl::exitCodeFor(error);
     }
 }

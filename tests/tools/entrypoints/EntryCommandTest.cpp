@@ -111,7 +111,7 @@ TEST_F(EntryCommand, refusesInvalidOptions) {
     EXPECT_THAT(tool({"entry", "set", "main.cpp", "--extension", "args"}),
                 FailsWith(1, "\"args\" is not an extension. Give it as KEY=VALUE"));
     EXPECT_THAT(tool({"entry", "set", "main.cpp", "--hidden", "--visible"}), FailsWith(2, "excludes"));
-    EXPECT_THAT(tool({"entry", "set"}), FailsWith(2, "'projectctl entry set --help' tells more"));
+    EXPECT_THAT(tool({"entry", "set"}), FailsWith(2, "'projectctl entry set --help' shows the usage"));
     EXPECT_THAT(tool({"entry", "list"}), SucceedsSilently());
 }
 
@@ -170,7 +170,7 @@ TEST_F(EntryCommand, isSeenByStatusAndCheckWhenItsGroupIsGone) {
     EXPECT_THAT(tool({"status"}).output,
                 MatchesRegex("bad  the entry point \"[-0-9a-f]*\" of the file \"main.cpp\" "
                              "is in the group \"[-0-9a-f]*\", which does not exist\n"));
-    EXPECT_EQ(tool({"check"}).exitCode, 1);
+    EXPECT_EQ(tool({"check"}).exitCode, 3);
     EXPECT_EQ(show("main.cpp"), "name: main\ntype: Basic\nvisible: yes\n");
 }
 

@@ -92,8 +92,7 @@ TEST_F(GroupCommand, listsTheUUIDsOfANameThatSeveralHave) {
 
     EXPECT_THAT(
         tool({"group", "delete", "Nightly"}),
-        FailsWith(1, "several entry point groups are called \"Nightly\". Give the UUID of the one that is "
-                     "meant: g1, g2"));
+        FailsWith(1, "several entry point groups have the name \"Nightly\". Give a UUID instead: g1, g2"));
     EXPECT_THAT(tool({"group", "delete", "g2"}), SucceedsSilently());
     EXPECT_THAT(tool({"group", "delete", "Nightly"}), SucceedsSilently());
 }

@@ -75,7 +75,7 @@ TEST_F(CategoryCommand, listsTheUUIDsOfANameThatSeveralHave) {
 
     auto const ambiguous = tool({"category", "delete", "Status"});
 
-    EXPECT_THAT(ambiguous, FailsWith(1, "several categories are called \"Status\". Give the UUID"));
+    EXPECT_THAT(ambiguous, FailsWith(1, "several categories have the name \"Status\". Give a UUID"));
     EXPECT_THAT(ambiguous.errors, HasSubstr(status));
     EXPECT_THAT(ambiguous.errors, HasSubstr(state));
     EXPECT_THAT(tool({"category", "rename", state, "State"}), SucceedsSilently());
@@ -135,9 +135,10 @@ TEST_F(CategoryCommand, quotesANameThatCouldControlTheTerminal) {
 }
 
 TEST_F(CategoryCommand, describesItsUse) {
-    EXPECT_THAT(tool({"category"}), FailsWith(2, "'projectctl category --help' tells more"));
-    EXPECT_THAT(tool({"category", "paint"}), FailsWith(2, "there is no command or option \"paint\""));
-    EXPECT_THAT(tool({"category", "create"}), FailsWith(2, "'projectctl category create --help' tells more"));
+    EXPECT_THAT(tool({"category"}), FailsWith(2, "'projectctl category --help' shows the usage"));
+    EXPECT_THAT(tool({"category", "paint"}), FailsWith(2, "unknown command or option \"paint\""));
+    EXPECT_THAT(tool({"category", "create"}),
+                FailsWith(2, "'projectctl category create --help' shows the usage"));
     EXPECT_THAT(tool({"category", "rename", "--help"}).output,
                 HasSubstr("Usage: projectctl category rename [OPTIONS] CATEGORY NAME"));
 }

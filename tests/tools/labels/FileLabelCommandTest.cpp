@@ -211,7 +211,7 @@ TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenTheLabelDoesNotExist) {
     EXPECT_THAT(
         tool({"status", "--json"}).output,
         HasSubstr("\"problems\": [\n{\"fault\": true, \"text\": \"the file \\\"a\\\" bears the label "));
-    EXPECT_EQ(tool({"check"}).exitCode, 1);
+    EXPECT_EQ(tool({"check"}).exitCode, 3);
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": " + text + "\n"));
 }
 
@@ -237,7 +237,7 @@ TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenAFileHasTwoLabelsOfASingleVal
         std::string("the file \"a\" bears 2 labels of the category \"Status\", which allows one\n");
     EXPECT_THAT(tool({"status"}), Prints("bad  " + text));
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": " + text));
-    EXPECT_EQ(tool({"check"}).exitCode, 1);
+    EXPECT_EQ(tool({"check"}).exitCode, 3);
     ASSERT_THAT(tool({"label", "take", "Status", "Open", "a"}), SucceedsSilently());
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
 }

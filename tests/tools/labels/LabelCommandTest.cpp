@@ -57,7 +57,7 @@ TEST_F(LabelCommand, refusesASecondLabelOfTheSameNameInOneCategory) {
 
 TEST_F(LabelCommand, cannotBothBeReadOnlyAndWritable) {
     EXPECT_THAT(tool({"label", "create", "Status", "Open", "--read-only", "--writable"}),
-                FailsWith(2, "'projectctl label create --help' tells more"));
+                FailsWith(2, "'projectctl label create --help' shows the usage"));
 }
 
 TEST_F(LabelCommand, deletesALabelFromEveryFile) {
@@ -100,7 +100,7 @@ TEST_F(LabelCommand, listsTheUUIDsOfANameThatSeveralLabelsHave) {
 
     auto const ambiguous = tool({"label", "delete", "Status", "Open"});
 
-    EXPECT_THAT(ambiguous, FailsWith(1, "several labels of the category are called \"Open\""));
+    EXPECT_THAT(ambiguous, FailsWith(1, "several labels of the category have the name \"Open\""));
     EXPECT_THAT(ambiguous.errors, HasSubstr(first));
     EXPECT_THAT(ambiguous.errors, HasSubstr(second));
     EXPECT_THAT(tool({"label", "delete", "Status", second}), SucceedsSilently());

@@ -57,11 +57,11 @@ TEST_F(ReferenceGraph, findsACircleOfProjects) {
 
     auto const tree = toolFrom("engine", {"references", "--graph"});
 
-    EXPECT_EQ(tree.exitCode, 1);
+    EXPECT_EQ(tree.exitCode, 3);
     EXPECT_EQ(tree.output, shown("engine") + "\n  ../pump: " + shown("pump") + "\n    ../seal: " +
                                shown("seal") + "\n      ../pump: " + shown("pump") + ", a cycle\n");
     auto const json = toolFrom("engine", {"references", "--graph", "--json"});
-    EXPECT_EQ(json.exitCode, 1);
+    EXPECT_EQ(json.exitCode, 3);
     EXPECT_THAT(json.output,
                 HasSubstr("\"cycles\": [\n[" + quoted("pump") + ", " + quoted("seal") + "]\n]}\n"));
 }
@@ -71,7 +71,7 @@ TEST_F(ReferenceGraph, findsAProjectThatReferencesItself) {
 
     auto const tree = toolFrom("engine", {"references", "--graph"});
 
-    EXPECT_EQ(tree.exitCode, 1);
+    EXPECT_EQ(tree.exitCode, 3);
     EXPECT_EQ(tree.output, shown("engine") + "\n  .: " + shown("engine") + ", a cycle\n");
 }
 
@@ -95,7 +95,7 @@ TEST_F(ReferenceGraph, namesWhatIsMissingAndGoesOn) {
 
     auto const tree = toolFrom("engine", {"references", "--graph"});
 
-    EXPECT_EQ(tree.exitCode, 1);
+    EXPECT_EQ(tree.exitCode, 3);
     EXPECT_EQ(tree.errors, "");
     EXPECT_EQ(tree.output, shown("engine") + "\n  ../pump: missing (" + inFolder("pump") +
                                ")\n  ../seal: no project (" + inFolder("seal") +
@@ -109,7 +109,7 @@ TEST_F(ReferenceGraph, namesAProjectThatCannotBeRead) {
 
     auto const tree = toolFrom("engine", {"references", "--graph"});
 
-    EXPECT_EQ(tree.exitCode, 1);
+    EXPECT_EQ(tree.exitCode, 3);
     EXPECT_THAT(tree.output, HasSubstr("  ../pump: unreadable (" + inFolder("pump") + "): "));
     EXPECT_THAT(toolFrom("engine", {"references", "--graph", "--json"}).output,
                 HasSubstr("{\"folder\": " + quoted("pump") +
@@ -137,7 +137,7 @@ TEST_F(ReferenceGraph, givesTextForGraphviz) {
 
     auto const dot = toolFrom("engine", {"references", "--graph", "--dot"});
 
-    EXPECT_EQ(dot.exitCode, 1);
+    EXPECT_EQ(dot.exitCode, 3);
     EXPECT_EQ(dot.output, "digraph references {\n  " + quoted("engine") + " [label=\"engine\"];\n  " +
                               quoted("pump") + " [label=\"the \\\"pump\\\" \\\\\"];\n  " + quoted("seal") +
                               " [label=" + quoted("seal") + ", style=dashed, color=red];\n  " +

@@ -3,7 +3,9 @@
 #include <vector>
 
 #include "checks/Commands.hpp"
+#include "checks/MergeSetupCheck.hpp"
 #include "checks/TreeCheck.hpp"
+#include "cli/ExitCode.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
@@ -43,8 +45,18 @@ public:
             faults += isFault ? 1 : 0;
             tell(file + (isFault ? ": " : ": note: ") + finding.text);
         }
-        output().say(faults == 0 ? "The project has no faults." : adviceFor(faultsOfText));
-        return faults == 0 ? 0 : 1;
+        Findings ofSetup;
+        checkMergeSetup(project.root(), ofSetup);
+        auto const faultsOfProject = faults;
+        for (auto const& finding : ofSetup) {
+            bool const isFault = finding.weight == Finding::Weight::Fault;
+            faults += isFault ? 1 : 0;
+            tell((isFault ? "" : "note: ") + finding.text);
+        }
+        output().say(faults == 0            ? "The project has no faults."
+                     : faultsOfProject == 0 ? "'projectctl setup' configures the merge driver."
+                                            : adviceFor(faultsOfText));
+        return faults == 0 ? exit_code::done : exit_code::finding;
     }
 
 private:

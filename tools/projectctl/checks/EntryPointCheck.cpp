@@ -3,12 +3,14 @@
 #include <utility>
 
 #include "output/NameForms.hpp"
-#include "project/Schema.hpp"
 #include "project/core/EntryPointManager.hpp"
 #include "project/entrypoints/EntryPointGroup.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace projectctl {
+
+namespace treeSchema = project::metadata::schema;
 
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
@@ -18,7 +20,7 @@ Findings EntryPointCheck::run() {
         groups_.insert(group->getUUID());
     }
     auto const head = MetadataPath::root().child(
-        PathElement(std::u16string(schema::entryPoints), std::u16string(schema::root)));
+        PathElement(treeSchema::entrypoints::entryPointsType, treeSchema::rootLocation));
     for (auto const& address : project_.store().getChildNodes(head)) {
         if (auto const node = project_.store().getNode(address)) {
             check(address.leaf().getLocation(), *node);
@@ -35,11 +37,11 @@ Findings EntryPointCheck::run() {
 }
 
 void EntryPointCheck::check(std::u16string const& uuid, Node const& node) {
-    auto const& file = node.get(schema::fileKey);
+    auto const& file = node.get(treeSchema::entrypoints::fileKey);
     auto const entry = "the entry point " + inQuotes(uuid) + " of the file " + inQuotes(shown_.of(file));
     ++files_[file];
     checkFile(entry, file);
-    auto const& group = node.get(schema::groupKey);
+    auto const& group = node.get(treeSchema::entrypoints::groupUUIDKey);
     if (!group.empty() && !groups_.contains(group)) {
         findings_.push_back(
             Finding::fault(entry + " is in the group " + inQuotes(group) + ", which does not exist"));

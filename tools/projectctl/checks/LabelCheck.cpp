@@ -3,9 +3,11 @@
 #include <cstddef>
 
 #include "output/NameForms.hpp"
-#include "project/Schema.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace projectctl {
+
+namespace treeSchema = project::metadata::schema;
 
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
@@ -27,19 +29,21 @@ Finding repeated(std::string const& file, std::u16string const& label, std::stri
 
 LabelCheck::LabelCheck(project::metadata::MetadataManager& store) {
     auto const head = MetadataPath::root().child(
-        PathElement(std::u16string(schema::categories), std::u16string(schema::root)));
+        PathElement(treeSchema::categories::categoriesType, treeSchema::rootLocation));
     for (auto const& address : store.getChildNodes(head)) {
         auto const node = store.getNode(address);
-        if (!node || address.leaf().getType() != schema::category) {
+        if (!node || address.leaf().getType() != treeSchema::categories::categoryType) {
             continue;
         }
         auto& category = categories_[address.leaf().getLocation()];
-        category.name = node->get(schema::nameKey);
-        category.isSingleValued = node->get(schema::singleValuedKey) == u"1";
+        category.name = node->get(treeSchema::categories::categoryNameKey);
+        category.isSingleValued =
+            node->get(treeSchema::categories::categorySingleValuedKey) == treeSchema::categories::flagTrue;
         for (auto const& below : store.getChildNodes(address)) {
             auto const label = store.getNode(below);
-            if (below.leaf().getType() == schema::label && label) {
-                category.labels.emplace(below.leaf().getLocation(), label->get(schema::nameKey));
+            if (below.leaf().getType() == treeSchema::categories::labelType && label) {
+                category.labels.emplace(below.leaf().getLocation(),
+                                        label->get(treeSchema::categories::labelNameKey));
             }
         }
     }
@@ -59,13 +63,14 @@ void LabelCheck::check(std::u16string_view path, Node const& node, ShownPaths& s
 std::map<std::u16string, LabelCheck::Counts> LabelCheck::labelsOn(Node const& node) {
     std::map<std::u16string, Counts> result;
     for (auto const& category : node.getChildren()) {
-        auto const uuid = category->get(schema::uuidKey);
-        if (category->getType() != schema::category || uuid.empty()) {
+        auto const uuid = category->get(treeSchema::files::categoryUUIDKey);
+        if (category->getType() != treeSchema::files::categoryType || uuid.empty()) {
             continue; // every reader passes over it
         }
         for (auto const& label : category->getChildren()) {
-            if (label->getType() == schema::label && !label->get(schema::uuidKey).empty()) {
-                ++result[uuid][label->get(schema::uuidKey)];
+            if (label->getType() == treeSchema::files::labelType &&
+                !label->get(treeSchema::files::labelUUIDKey).empty()) {
+                ++result[uuid][label->get(treeSchema::files::labelUUIDKey)];
             }
         }
     }

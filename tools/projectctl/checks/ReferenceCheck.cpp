@@ -5,11 +5,13 @@
 
 #include "output/NameForms.hpp"
 #include "project/ProjectFolder.hpp"
-#include "project/Schema.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/TreeSchema.hpp"
 #include "project/references/FolderReference.hpp"
 
 namespace projectctl {
+
+namespace treeSchema = project::metadata::schema;
 
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
@@ -29,15 +31,15 @@ void ReferenceCheck::checkForms(ReferenceList const& list, References const& ref
         read.insert(reference.getUUID());
     }
     auto const head =
-        MetadataPath::root().child(PathElement(std::u16string(list.head), std::u16string(schema::root)));
+        MetadataPath::root().child(PathElement(std::u16string(list.head), treeSchema::rootLocation));
     for (auto const& address : project_.store().getChildNodes(head)) {
         auto const& uuid = address.leaf().getLocation();
         auto const node = project_.store().getNode(address);
-        bool const isReference = node && address.leaf().getType() == schema::reference;
+        bool const isReference = node && address.leaf().getType() == treeSchema::references::referenceType;
         if (isReference && !read.contains(uuid)) {
             findings_.push_back(Finding::note("the reference " + inQuotes(uuid) + " in " + list.name +
                                               " is not shown, because nothing there reads its type " +
-                                              inQuotes(node->get(schema::typeKey))));
+                                              inQuotes(node->get(treeSchema::references::typeKey))));
         }
     }
 }
@@ -50,7 +52,7 @@ void ReferenceCheck::checkTargets(ReferenceList const& list, References const& r
         if (!project::metadata::is_directory(folder)) {
             findings_.push_back(
                 Finding::note(what + " leads nowhere: there is no folder " + inQuotes(folder.native())));
-        } else if (list.isOfProjects && lookForProject(folder) == ProjectTrace::None) {
+        } else if (list.isOfProjects && findProjectIn(folder) == ProjectTrace::None) {
             findings_.push_back(
                 Finding::note(what + " leads to no project: there is none in " + inQuotes(folder.native())));
         }

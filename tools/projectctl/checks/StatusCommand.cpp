@@ -3,12 +3,11 @@
 #include <vector>
 
 #include "checks/Commands.hpp"
+#include "checks/MergeSetupCheck.hpp"
 #include "checks/Problems.hpp"
 #include "checks/StatusScan.hpp"
-#include "cli/Settings.hpp"
 #include "cli/ShownPaths.hpp"
 #include "git/GitIgnore.hpp"
-#include "git/MergeSetup.hpp"
 #include "output/JsonRows.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
@@ -42,10 +41,7 @@ public:
         }
         Differences found{gitignore_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
                           findProblems(project, json_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_))};
-        if (settings().sourceControl && lookForMergeSetup(root_) == MergeSetup::Missing) {
-            found.problems.push_back(Finding::note("git merges the project's text line by line: 'projectctl "
-                                                   "setup' has it done by what the text says"));
-        }
+        checkMergeSetup(root_, found.problems);
         json_ ? writeJson(found) : writeLines(found);
         return 0;
     }
@@ -102,7 +98,7 @@ private:
             output().text() += word;
             output().name(path);
             output().text() += '\n';
-            output().settle();
+            output().flushWhenLarge();
         }
     }
 

@@ -9,10 +9,12 @@
 #include "checks/ReferenceCheck.hpp"
 #include "fl/filesystem/SystemName.hpp"
 #include "output/NameForms.hpp"
-#include "project/Schema.hpp"
 #include "project/core/ProjectManagerBase.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace projectctl {
+
+namespace treeSchema = project::metadata::schema;
 
 using fl::filesystem::Path;
 using project::management::ProjectManagerBase;
@@ -34,7 +36,7 @@ std::string described(MetadataPath const& address) {
 std::u16string pathOf(MetadataPath const& address) {
     std::u16string result;
     for (std::size_t index = 1; index < address.depth(); ++index) {
-        if (address[index].getType() == schema::file) {
+        if (address[index].getType() == treeSchema::files::fileType) {
             result += (result.empty() ? u"" : u"/") + address[index].getLocation();
         }
     }
@@ -71,16 +73,17 @@ Findings TreeCheck::run() {
 
 void TreeCheck::checkHead(Address const& head) {
     auto const leaf = head.getLeaf();
-    bool const isRoot = leaf.getLocation() == schema::root;
-    if (leaf.getType() == schema::files) {
+    bool const isRoot = leaf.getLocation() == treeSchema::rootLocation;
+    if (leaf.getType() == treeSchema::files::filesType) {
         checkFiles(head);
-    } else if (isRoot && leaf.getType() == schema::categories) {
+    } else if (isRoot && leaf.getType() == treeSchema::categories::categoriesType) {
         checkCategories(head);
-    } else if (isRoot && leaf.getType() == schema::entryPoints) {
+    } else if (isRoot && leaf.getType() == treeSchema::entrypoints::entryPointsType) {
         checkEntryPoints(head);
-    } else if (isRoot && leaf.getType() == schema::entryPointGroups) {
+    } else if (isRoot && leaf.getType() == treeSchema::entrypoints::groupsType) {
         checkGroups(head);
-    } else if (isRoot && isOneOf(leaf.getType(), {schema::projectPath, schema::references})) {
+    } else if (isRoot && isOneOf(leaf.getType(), {treeSchema::references::projectPathType,
+                                                  treeSchema::references::referencesType})) {
         checkReferences(head);
     } else if (head != ProjectManagerBase::getRootNodePath() &&
                head != ProjectManagerBase::getDescriptionNodePath().parent()) {
@@ -98,7 +101,7 @@ void TreeCheck::checkFiles(Address const& scope) {
         }
         auto below = store_.getChildNodes(address);
         std::erase_if(below, [](Address const& child) { // folders' markers, label data
-            return child.leaf().getType() != schema::file;
+            return child.leaf().getType() != treeSchema::files::fileType;
         });
         waiting.insert(waiting.end(), std::make_move_iterator(below.rbegin()),
                        std::make_move_iterator(below.rend()));
@@ -118,7 +121,7 @@ void TreeCheck::checkFile(Address const& file) {
         fault("the file " + inQuotes(shown_.of(pathOf(file))) +
               " is listed and its folder is not, so that no list of the project shows it");
     }
-    if (file[0].getLocation() == schema::root) {
+    if (file[0].getLocation() == treeSchema::rootLocation) {
         checkName(pathOf(file), shown_, findings_);
         labels_.check(pathOf(file), *node, shown_, findings_);
     }
@@ -136,7 +139,7 @@ void TreeCheck::checkLabels(Address const& category) {
         if (!requireNode(label, "the label")) {
             continue;
         }
-        auto const state = store_.getNode(label)->get(schema::readOnlyKey);
+        auto const state = store_.getNode(label)->get(treeSchema::categories::labelReadOnlyKey);
         if (!isOneOf(state, {u"", u"READ_ONLY", u"WRITABLE", u"INHERITED"})) {
             fault("the label " + inQuotes(label.leaf().getLocation()) + " has the unknown read-only state " +
                   inQuotes(state));
@@ -151,7 +154,7 @@ void TreeCheck::checkEntryPoints(Address const& head) {
         }
         auto const node = store_.getNode(entryPoint);
         auto const uuid = inQuotes(entryPoint.leaf().getLocation());
-        auto const& type = node->get(schema::typeKey);
+        auto const& type = node->get(treeSchema::entrypoints::typeKey);
         if (!isOneOf(type, {u"Basic", u"Startup", u"StartUp", u"Shutdown", u"Batch_Job", u"Batch Job"})) {
             fault("the entry point " + uuid + " has the unknown type " + inQuotes(type));
         }

@@ -9,17 +9,17 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// Makes the paths of arguments absolute, in the form of the project's root.
+/// Converts path arguments to absolute paths, in the form of the project's root.
 ///
-/// The folder part is resolved, so that the same file gets the same path whichever way it was named. The last
-/// element stays as it is, so that a symbolic link is itself and not what it leads to; but "." and "..", and
-/// what stands before a trailing slash, name a folder and are resolved.
+/// Symbolic links in the folder part are resolved, so that a file has the same path however it was named. The
+/// last element is not resolved: an argument that names a symbolic link means the link. "." and "..", and the
+/// part before a trailing slash, always name a folder and are resolved.
 class ArgumentPaths {
 public:
-    /// @param from the folder that relative paths start from, canonical.
+    /// @param from the folder to which relative paths are relative, canonical.
     explicit ArgumentPaths(Path from);
 
-    /// @param argument bytes as the system has them.
+    /// @param argument bytes as on disk.
     /// @throws Failure for an empty argument.
     Path absolute(std::string const& argument);
 
@@ -27,7 +27,7 @@ private:
     Path const& resolved(std::string const& folder);
 
     Path from_;
-    std::map<std::string, Path> resolved_; ///< thousands of arguments share a few folders
+    std::map<std::string, Path> resolved_; ///< by folder: thousands of arguments share a few
 };
 
 } // namespace projectctl

@@ -10,16 +10,16 @@ namespace projectctl {
 
 std::optional<std::size_t> choose(std::vector<Named> const& things, std::u16string const& wanted,
                                   std::string const& kind) {
-    auto const isNamedSo = [&wanted](Named const& thing) { return thing.name == wanted; };
-    if (std::ranges::count_if(things, isNamedSo) > 1) {
+    auto const hasName = [&wanted](Named const& thing) { return thing.name == wanted; };
+    if (std::ranges::count_if(things, hasName) > 1) {
         std::string uuids;
         for (auto const& thing : things) {
-            uuids += isNamedSo(thing) ? (uuids.empty() ? "" : ", ") + fl::i18n::toUtf8(thing.uuid) : "";
+            uuids += hasName(thing) ? (uuids.empty() ? "" : ", ") + fl::i18n::toUtf8(thing.uuid) : "";
         }
-        throw Failure("several " + kind + " are called " + inQuotes(wanted) +
-                      ". Give the UUID of the one that is meant: " + uuids);
+        throw Failure("several " + kind + " have the name " + inQuotes(wanted) +
+                      ". Give a UUID instead: " + uuids);
     }
-    auto found = std::ranges::find_if(things, isNamedSo);
+    auto found = std::ranges::find_if(things, hasName);
     if (found == things.end()) {
         found = std::ranges::find(things, wanted, &Named::uuid);
     }

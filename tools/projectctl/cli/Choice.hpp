@@ -7,16 +7,16 @@
 
 namespace projectctl {
 
-/// Something that people call by its name and the project by its UUID.
+/// A thing that users refer to by its name, and the project by its UUID.
 struct Named {
     std::u16string name;
     std::u16string uuid;
 };
 
-/// Which of several things an argument means: the one of that name, or else the one of that UUID.
-/// @param kind what they are, in the plural, for the error.
-/// @return its index; none when there is no such thing.
-/// @throws Failure when several bear the name; it lists them with their UUIDs.
+/// Finds the thing that an argument names: the one with that name, else the one with that UUID.
+/// @param kind the noun for these things, in the plural, for the error.
+/// @return its index; empty when there is none.
+/// @throws Failure when several things have the name. The text lists their UUIDs.
 std::optional<std::size_t> choose(std::vector<Named> const& things, std::u16string const& wanted,
                                   std::string const& kind);
 

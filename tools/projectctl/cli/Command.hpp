@@ -4,21 +4,21 @@
 
 namespace projectctl {
 
-/// One command of the tool: what it is called, what it takes, and what it does. Each stands in a file of its
-/// own; Commands.hpp lists them.
+/// A command of the tool: its name, its arguments, and its work. Each command has its own file; the header
+/// Commands.hpp of each room lists those of the room.
 ///
-/// The order of use: declare, then, if it is the one that was called for, run.
+/// Order of use: declare, then run, if the command line calls this command.
 class Command {
 public:
     virtual ~Command() = default;
 
-    /// Adds the command to the tool's, with its options, which are kept in this object.
-    /// @return what was added.
+    /// Adds the command and its options to the tool. The values of the options are stored in this object.
+    /// @return the added command.
     virtual CLI::App* declare(CLI::App& tool) = 0;
 
-    /// Does the work. What is to be seen goes to output(), which the caller flushes.
-    /// @return the exit code: 0, or 1 for bad news that are no error.
-    /// @throws std::exception with the one line that tells what went wrong.
+    /// Does the work. Results are written to output(), which the caller flushes.
+    /// @return the exit code: `done`, or `finding`.
+    /// @throws std::exception whose text is the one line for the user.
     virtual int run() = 0;
 };
 

@@ -8,10 +8,10 @@
 
 namespace projectctl {
 
-/// Commands about one thing, called by its name and then their own: `projectctl category rename`.
+/// Commands on one subject, called by the name of the subject and their own: `projectctl category rename`.
 class CommandGroup : public Command {
 public:
-    /// @param members in the order in which help shows them.
+    /// @param members the commands, in the order in which help shows them.
     CommandGroup(std::string name, std::string description, std::vector<std::unique_ptr<Command>> members);
 
     CLI::App* declare(CLI::App& tool) override;
@@ -21,7 +21,7 @@ private:
     std::string name_;
     std::string description_;
     std::vector<std::unique_ptr<Command>> members_;
-    std::vector<CLI::App*> declared_; ///< one for each member
+    std::vector<CLI::App*> declared_; ///< one per member
 };
 
 } // namespace projectctl

@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <iterator>
 
+#include "cli/ExitCode.hpp"
 #include "cli/Settings.hpp"
 #include "cli/TextArguments.hpp"
 #include "cli/WorkingFolder.hpp"
@@ -51,7 +52,13 @@ std::vector<std::string> takeCommonOptions(std::vector<std::string>& arguments) 
     return folders;
 }
 
-/// The command that was called for, as far as it was named, and how it is called.
+constexpr char const* exitCodes =
+    "Exit codes: 0 done; 1 the operation is not possible; 2 wrong arguments; 3 done, and a "
+    "fault was found;\n4 another program is at work, try again; 5 the text is damaged; 6 "
+    "the text contains conflict markers;\n7 the disk failed; 8 the outcome of a write is "
+    "unknown. 'merge' has those of a merge driver.";
+
+/// The command that the arguments name, as far as they could be parsed, and its full name.
 struct Called {
     CLI::App const* app;
     std::string name;
@@ -66,20 +73,20 @@ Called calledOf(CLI::App const& tool) {
     return result;
 }
 
-/// What is told of a wrong use: the parser's text, and where to read on.
+/// Reports a wrong use: the parser's text, and the command that shows the help.
 int refuse(CLI::ParseError const& error, CLI::App const& tool) {
     auto const called = calledOf(tool);
     auto const isGroup = !called.app->get_subcommands([](auto const*) { return true; }).empty();
     auto const unknown = isGroup ? called.app->remaining() : std::vector<std::string>();
     auto const problem =
-        unknown.empty() ? error.what() : "there is no command or option \"" + unknown.front() + '"';
-    printError(withoutMarks(problem) + " ('" + called.name + " --help' tells more)");
-    return 2;
+        unknown.empty() ? error.what() : "unknown command or option \"" + unknown.front() + '"';
+    printError(withoutMarks(problem) + " ('" + called.name + " --help' shows the usage)");
+    return exit_code::wrongUse;
 }
 
 int showHelp(CLI::App const& tool) {
     auto const called = calledOf(tool);
-    auto const end = called.name.rfind(' '); // of what stands before the command's own name
+    auto const end = called.name.rfind(' '); // of the part before the command's own name
     output().text() +=
         called.app->help(end == std::string::npos ? std::string() : called.name.substr(0, end));
     output().flush();
@@ -90,7 +97,8 @@ int showHelp(CLI::App const& tool) {
 
 int runCommandLine(int argc, char const* const* argv, std::string const& version,
                    std::vector<std::unique_ptr<Command>> const& commands) {
-    CLI::App tool("Keeps the definition of an engineering project beside its files.", "projectctl");
+    CLI::App tool("Manages the definition of an engineering project, stored beside its files.", "projectctl");
+    tool.footer(exitCodes);
     tool.require_subcommand(1);
     tool.set_version_flag("--version", version, "Show the version and exit");
     declareCommonOptions(tool);

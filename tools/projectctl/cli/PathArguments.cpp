@@ -9,10 +9,10 @@
 namespace projectctl {
 
 void PathArguments::declare(CLI::App& app, std::string const& description) {
-    takeTexts(app, "PATH", arguments_, description + "; - for the lines of standard input");
-    app.add_flag("-0,--null", null_, "Read paths from standard input too, with a zero byte behind each");
+    takeTexts(app, "PATH", arguments_, description + "; - reads paths from standard input, one per line");
+    app.add_flag("-0,--null", isNull_, "Also read paths from standard input, each followed by a zero byte");
     app.final_callback([this] {
-        if (arguments_.empty() && !null_) {
+        if (arguments_.empty() && !isNull_) {
             throw CLI::RequiredError("PATH");
         }
     });
@@ -21,7 +21,7 @@ void PathArguments::declare(CLI::App& app, std::string const& description) {
 std::vector<Path> PathArguments::read() const {
     ArgumentPaths absolute(workingFolder());
     std::vector<Path> result;
-    bool readsInput = null_;
+    bool readsInput = isNull_;
     for (auto const& argument : arguments_) {
         if (argument == "-") {
             readsInput = true;
@@ -30,7 +30,7 @@ std::vector<Path> PathArguments::read() const {
         }
     }
     std::cin.sync_with_stdio(false);
-    for (std::string line; readsInput && std::getline(std::cin, line, null_ ? '\0' : '\n');) {
+    for (std::string line; readsInput && std::getline(std::cin, line, isNull_ ? '\0' : '\n');) {
         result.push_back(absolute.absolute(line));
     }
     return result;

@@ -11,20 +11,20 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// The files and folders that a command is called for: arguments, and what standard input names.
+/// The files and folders that a command works on: from the arguments and from standard input.
 class PathArguments {
 public:
     /// Declares the arguments, at least one, and the option -0.
-    /// @param description what is done with the paths.
+    /// @param description what the command does with the paths, for its help.
     void declare(CLI::App& app, std::string const& description);
 
-    /// The paths, absolute, in the order in which they were given. Reads standard input if that is asked for.
+    /// The paths, absolute, in the given order. Reads standard input if the arguments say so.
     /// @throws Failure for an empty path.
     std::vector<Path> read() const;
 
 private:
     std::vector<std::string> arguments_;
-    bool null_ = false;
+    bool isNull_ = false;
 };
 
 /// The absolute path of one argument, in the form of the project's root. Relative paths start from the

@@ -8,7 +8,7 @@ struct Settings {
     bool showsFullNames = false; ///< show paths relative to the root instead of the current folder
 };
 
-/// Set while the command line is read.
+/// Set when the command line is parsed.
 Settings& settings();
 
 } // namespace projectctl

@@ -10,16 +10,16 @@ namespace projectctl {
 
 namespace {
 
-// Arguments are bytes of names, and the parser has views on some: it takes "[a,b]" apart as a list, "++" ends
-// a command, and what follows "--" is an argument only if none came before. A mark in front keeps it off
-// them.
+// An argument can be any name, but the parser interprets some of them: it splits "[a,b]" as a list, "++" ends
+// a command, and after "--" it still reads options if an argument came before. A mark in front of such an
+// argument prevents this.
 constexpr char mark = '\x01';
 
 bool isSpecial(std::string_view text) {
     return text.starts_with('[') || text == "++";
 }
 
-/// What is left without the marks that the argument had to begin with.
+/// The text without the marks at its beginning.
 std::string_view behindMarks(std::string_view text) {
     return text.substr(std::min(text.find_first_not_of(mark), text.size()));
 }

@@ -8,23 +8,23 @@
 
 namespace projectctl {
 
-/// Declares an argument or an option that takes one text, byte for byte as it was given.
+/// Declares an argument or an option with one text, byte for byte as it was given.
 /// @param name "NAME" for an argument, "--name" for an option. @param value lives as long as the app.
 CLI::Option* takeText(CLI::App& app, std::string const& name, std::optional<std::string>& value,
                       std::string const& description);
 
-/// Declares an argument that takes one or more texts, byte for byte as they were given.
+/// Declares an argument with one or more texts, byte for byte as they were given.
 CLI::Option* takeTexts(CLI::App& app, std::string const& name, std::vector<std::string>& values,
                        std::string const& description);
 
-/// The arguments of a command line in the form in which the parser leaves them alone. `takeText` and
-/// `takeTexts` return them to the form in which they were given.
+/// The arguments of a command line with marks, which keep the parser from interpreting texts. `takeText` and
+/// `takeTexts` remove the marks.
 std::vector<std::string> markedArguments(int argc, char const* const* argv);
 
 /// One of these arguments in the form in which it was given.
 std::string unmarked(std::string const& argument);
 
-/// A text of the parser, which may quote arguments, in the form in which they were given.
+/// Removes all marks from a message of the parser, which may quote arguments.
 std::string withoutMarks(std::string text);
 
 } // namespace projectctl

@@ -60,7 +60,7 @@ private:
             output().name(entry.getName());
             output().text() += entry.isVisible() ? "\n" : " (hidden)\n";
         }
-        output().settle();
+        output().flushWhenLarge();
     }
 
     bool isJson_ = false;

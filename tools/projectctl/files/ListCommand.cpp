@@ -57,7 +57,7 @@ private:
                 output().name(shown.of(file.path));
                 output().text() += '\n';
             }
-            output().settle();
+            output().flushWhenLarge();
         });
     }
 
@@ -72,7 +72,7 @@ private:
             output().text().append(2 * file.depth, ' ');
             output().name(name);
             output().text() += file.kind == Kind::Folder ? "/\n" : "\n";
-            output().settle();
+            output().flushWhenLarge();
         });
     }
 

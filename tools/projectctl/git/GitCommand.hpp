@@ -9,8 +9,8 @@
 
 namespace projectctl {
 
-/// Runs git in a folder, to its end.
-/// @throws std::system_error when it cannot be started; no_such_file_or_directory when it is not installed.
+/// Runs git in a folder and waits for its end.
+/// @throws std::system_error when git cannot be started; no_such_file_or_directory when it is not installed.
 ProcessResult runGit(fl::filesystem::Path const& folder, std::vector<std::string> const& arguments,
                      std::string_view input = {});
 

@@ -16,7 +16,7 @@ namespace projectctl {
 
 namespace {
 
-/// So that a name that begins with a colon is not taken for one of git's patterns.
+/// Prevents git from reading a name that begins with a colon as a pattern.
 constexpr std::string_view here = "./";
 
 std::string namesFor(Path const& root, std::vector<Path> const& paths) {
@@ -35,26 +35,26 @@ std::string_view takeName(std::string_view& names) {
     return name;
 }
 
-/// @param accepted the highest exit code that is no failure.
+/// @param accepted the highest exit code that is not a failure.
 std::string askGit(Path const& root, std::vector<std::string> const& arguments, std::string_view input,
                    int accepted) {
     try {
         auto result = runGit(root, arguments, input);
         if (result.exitCode < 0 || result.exitCode > accepted) {
             auto const line = result.errors.substr(0, result.errors.find('\n'));
-            throw Failure("git cannot tell what it ignores: " + (line.empty() ? "it failed" : line));
+            throw Failure("git cannot list ignored files: " + (line.empty() ? "unknown error" : line));
         }
         return std::move(result.output);
     } catch (std::system_error const& error) {
         if (error.code() == std::errc::no_such_file_or_directory) {
-            throw Failure("--gitignore asks git, which is not installed");
+            throw Failure("--gitignore needs git, which is not installed");
         }
-        throw Failure("git cannot be asked what it ignores: " + std::string(error.what()));
+        throw Failure("git cannot list ignored files: " + std::string(error.what()));
     }
 }
 
-/// The files that match a pattern of things to ignore and are tracked all the same.
-std::unordered_set<std::string> trackedAllTheSame(Path const& root) {
+/// The tracked files that match an ignore pattern.
+std::unordered_set<std::string> trackedDespitePattern(Path const& root) {
     auto const output =
         askGit(root, {"ls-files", "-z", "--cached", "--ignored", "--exclude-standard"}, {}, 0);
     std::unordered_set<std::string> result;
@@ -68,12 +68,12 @@ std::unordered_set<std::string> trackedAllTheSame(Path const& root) {
 
 std::vector<Path> withoutIgnoredByGit(Path const& root, std::vector<Path> paths) {
     auto const names = namesFor(root, paths);
-    // Without the index: with it, git goes through the whole index for each name that it is asked about.
+    // --no-index, because git would otherwise search the whole index for each name.
     auto const matching = askGit(root, {"check-ignore", "-z", "--stdin", "--no-index"}, names, 1);
     if (matching.empty()) {
         return paths;
     }
-    auto const tracked = trackedAllTheSame(root);
+    auto const tracked = trackedDespitePattern(root);
     std::vector<Path> result;
     std::string_view asked = names;
     std::string_view answered = matching; // in the order asked

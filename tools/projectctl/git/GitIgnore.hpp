@@ -8,13 +8,14 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// Takes out of a list what git ignores in the repository that the project lies in: what matches a pattern,
-/// or lies in a folder that does, and is not tracked all the same.
+/// Removes from a list the paths that git ignores in the project's repository: those that match a pattern, or
+/// lie in a folder that does, and are not tracked.
 ///
-/// One process of git for the whole list, and a second one if anything matches.
+/// Runs git once for the whole list, and a second time if any path matches.
 /// @param root the project's root.
-/// @param paths below the root, none beyond a symbolic link. They keep their order.
-/// @throws Failure when git is missing, fails, or knows of no repository here.
+/// @param paths below the root, none of them below a symbolic link.
+/// @return the others, in the same order.
+/// @throws Failure when git is not installed or fails, or when the root is not in a repository.
 std::vector<Path> withoutIgnoredByGit(Path const& root, std::vector<Path> paths);
 
 } // namespace projectctl

@@ -6,18 +6,25 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-// The store's .gitattributes name a merge driver for the project's text. What that driver is, each clone of a
-// repository has to be told.
+// The store's .gitattributes assigns a merge driver to the project's text. The command behind that driver is
+// in git's configuration, which is not part of the repository: each clone needs it once.
 
+/// How git merges the text of the project in a folder.
 enum class MergeSetup {
-    NoRepository, ///< the folder lies in none, or there is no git to ask
-    Missing,      ///< git merges the text line by line
-    Done,
+    NoRepository,   ///< the folder is not in a repository, or git is not installed
+    NotAssigned,    ///< git's attributes do not assign the driver to the text: git merges it line by line
+    Missing,        ///< the driver is not configured: git merges the text line by line
+    OtherCommand,   ///< the driver is configured, but not as setUpMerge does
+    ProgramMissing, ///< the driver calls a program that is not there any more, or that cannot be run
+    Works,
 };
 
-MergeSetup lookForMergeSetup(Path const& folder);
+MergeSetup mergeSetupOf(Path const& folder);
 
-/// Tells the repository that a folder lies in to merge projects' texts by this tool.
+/// Configures the repository of a folder to merge projects' texts with this program, by its absolute path.
+///
+/// Where the program cannot be run or fails, the configured command has git merge the text line by line, so
+/// that the text holds both sides or markers around them in every case.
 /// @throws Failure when git refuses.
 void setUpMerge(Path const& folder);
 

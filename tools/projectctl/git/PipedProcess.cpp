@@ -20,7 +20,7 @@ namespace {
     throw std::system_error(error, std::generic_category(), what);
 }
 
-/// One end of a pipe, closed when the object goes.
+/// One end of a pipe, closed by the destructor.
 class Descriptor {
 public:
     explicit Descriptor(int value = -1) : value_(value) {}
@@ -54,12 +54,12 @@ struct Pipe {
 Pipe makePipe() {
     std::array<int, 2> ends{};
     if (pipe2(ends.data(), O_CLOEXEC) != 0) {
-        fail(errno, "no pipe can be made");
+        fail(errno, "a pipe cannot be created");
     }
     return {Descriptor(ends[0]), Descriptor(ends[1])};
 }
 
-/// What the child finds: its three streams, and signals as a program expects them.
+/// The state in which the child starts: its three streams, and the default handling of signals.
 class SpawnSettings {
 public:
     SpawnSettings(int input, int output, int errors) {
@@ -106,7 +106,7 @@ private:
     posix_spawnattr_t attributes_{};
 };
 
-/// Writes what the pipe takes now. Closes it when all is written, or when nobody reads it any more.
+/// Writes as much as the pipe accepts now. Closes it when all is written, or when its reader has closed it.
 void feed(Descriptor& pipe, std::string_view& input) {
     auto const written = input.empty() ? 0 : write(pipe.get(), input.data(), input.size());
     if (written > 0) {
@@ -118,7 +118,7 @@ void feed(Descriptor& pipe, std::string_view& input) {
     }
 }
 
-/// Reads what the pipe has now. Closes it at its end.
+/// Reads what is in the pipe now. Closes it at its end.
 void drain(Descriptor& pipe, std::string& to) {
     std::array<char, 65536> piece; // NOLINT(cppcoreguidelines-pro-type-member-init): read fills it
     auto const got = read(pipe.get(), piece.data(), piece.size());
@@ -132,12 +132,12 @@ void drain(Descriptor& pipe, std::string& to) {
 void exchange(Descriptor& toChild, std::string_view input, Descriptor& output, Descriptor& errors,
               ProcessResult& result) {
     while (output.get() >= 0 || errors.get() >= 0) {
-        // A closed one is negative, which poll passes over.
+        // The descriptor of a closed pipe is negative, and poll ignores it.
         std::array<pollfd, 3> waiting{{{toChild.get(), POLLOUT, 0}, //
                                        {output.get(), POLLIN, 0},
                                        {errors.get(), POLLIN, 0}}};
         if (poll(waiting.data(), waiting.size(), -1) < 0 && errno != EINTR) {
-            fail(errno, "a program's output cannot be waited for");
+            fail(errno, "cannot wait for a program's output");
         }
         if (waiting[0].revents != 0) {
             feed(toChild, input);
@@ -155,7 +155,7 @@ int waitFor(pid_t child) {
     int status = 0;
     while (waitpid(child, &status, 0) < 0) {
         if (errno != EINTR) {
-            fail(errno, "a program's end cannot be waited for");
+            fail(errno, "cannot wait for a program's end");
         }
     }
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;

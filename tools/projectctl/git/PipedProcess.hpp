@@ -6,16 +6,16 @@
 
 namespace projectctl {
 
-/// How a program ended, and what it wrote.
+/// The exit code and the output of a program.
 struct ProcessResult {
-    int exitCode; ///< -1 when a signal ended it
+    int exitCode; ///< -1 when the program was ended by a signal
     std::string output;
     std::string errors;
 };
 
-/// Runs a program to its end, with the input given on its standard input. Feeds and reads at the same time,
-/// so that neither side waits for the other, whatever the sizes.
-/// @param command the program, looked for on the search path, and its arguments; no shell reads them.
+/// Runs a program with a given standard input and waits for its end. Writes and reads at the same time, so
+/// that input and output of any size cannot block each other.
+/// @param command the program, which is searched on the PATH, and its arguments; no shell interprets them.
 /// @throws std::system_error when it cannot be started.
 ProcessResult runWithInput(std::vector<std::string> const& command, std::string_view input);
 

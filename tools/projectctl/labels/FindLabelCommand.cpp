@@ -79,7 +79,7 @@ private:
     void writeJson(FileList::File const& file) {
         rows_.begin();
         rows_.addFile(file.path, file.kind);
-        output().settle();
+        output().flushWhenLarge();
     }
 
     void writePath(std::u16string_view path) const {
@@ -90,7 +90,7 @@ private:
             output().name(path);
             output().text() += '\n';
         }
-        output().settle();
+        output().flushWhenLarge();
     }
 
     std::optional<std::string> category_;

@@ -94,7 +94,7 @@ private:
             output().name(label.getData());
         }
         output().text() += '\n';
-        output().settle();
+        output().flushWhenLarge();
     }
 
     PathArguments paths_;

@@ -4,9 +4,11 @@
 #include <string_view>
 
 #include "output/NameForms.hpp"
-#include "project/Schema.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace projectctl {
+
+namespace treeSchema = project::metadata::schema;
 
 using project::metadata::MetadataPath;
 using project::stores::MergeConflict;
@@ -25,31 +27,32 @@ MergeSide otherThan(MergeSide side) {
 std::u16string pathOf(MetadataPath const& address) {
     std::u16string result;
     for (auto const& element : address.getPath()) {
-        if (element.getType() == schema::file) {
+        if (element.getType() == treeSchema::files::fileType) {
             result += (result.empty() ? u"" : u"/") + element.getLocation();
         }
     }
     return result;
 }
 
-/// What a thing in the project is called that has the address's last element for its type and UUID.
+/// The noun for an entry of the definition. @param head the type of the first step. @param type of the last
+/// one.
 std::optional<std::string> nounFor(std::u16string_view head, std::u16string_view type) {
-    if (type == schema::category) {
+    if (type == treeSchema::categories::categoryType) {
         return "the category";
     }
-    if (type == schema::label) {
+    if (type == treeSchema::categories::labelType) {
         return "the label";
     }
-    if (head == schema::entryPoints) {
+    if (head == treeSchema::entrypoints::entryPointsType) {
         return "the entry point";
     }
-    if (head == schema::entryPointGroups) {
+    if (head == treeSchema::entrypoints::groupsType) {
         return "the entry point group";
     }
-    if (head == schema::projectPath) {
+    if (head == treeSchema::references::projectPathType) {
         return "the reference in the project path";
     }
-    if (head == schema::references) {
+    if (head == treeSchema::references::referencesType) {
         return "the reference in the referenced projects";
     }
     return std::nullopt;
@@ -59,27 +62,28 @@ std::string described(MetadataPath const& address) {
     auto const& elements = address.getPath();
     auto const& leaf = address.leaf();
     auto const head = elements.front().getType();
-    if (head == schema::files) {
+    if (head == treeSchema::files::filesType) {
         auto const file = "the file " + inQuotes(pathOf(address));
-        return leaf.getType() == schema::file ? file : "what is kept of " + file;
+        return leaf.getType() == treeSchema::files::fileType ? file : "the data of " + file;
     }
     if (elements.size() > 1) {
         if (auto const noun = nounFor(head, leaf.getType())) {
             return *noun + ' ' + inQuotes(leaf.getLocation());
         }
     }
-    std::string result = "what is kept at";
+    std::string result = "the data at";
     for (auto const& element : elements) {
         result += ' ' + inQuotes(element.getType() + u' ' + element.getLocation());
     }
     return result;
 }
 
-/// "the label "uuid" of the category "uuid" on", for what is nested in a node; empty for the node itself.
+/// "the label "uuid" of the category "uuid" on" for a nested node; empty for the node itself.
 std::string describedNested(MergeConflict const& conflict) {
     std::string result;
     for (auto step = conflict.nested.rbegin(); step != conflict.nested.rend(); ++step) {
-        bool const isLabel = step->type == schema::label || step->type == schema::category;
+        bool const isLabel = step->type == treeSchema::categories::labelType ||
+                             step->type == treeSchema::categories::categoryType;
         auto const noun = nounFor({}, step->type).value_or("the " + inQuotes(step->type));
         result += noun + ' ' + inQuotes(step->value) +
                   (isLabel && step + 1 != conflict.nested.rend() ? " of " : " on ");
@@ -87,12 +91,12 @@ std::string describedNested(MergeConflict const& conflict) {
     return result;
 }
 
-std::string said(std::optional<std::u16string> const& value, MergeSide side) {
+std::string changeBy(std::optional<std::u16string> const& value, MergeSide side) {
     return value ? "set to " + inQuotes(*value) + " by " + wordFor(side)
                  : std::string("removed by ") + wordFor(side);
 }
 
-std::string excluding(MergeConflict const& conflict) {
+std::string removedAndChanged(MergeConflict const& conflict) {
     auto const removing = conflict.removedBy.value_or(MergeSide::Ours);
     return std::string(" is removed by ") + wordFor(removing) + " and changed by " +
            wordFor(otherThan(removing));
@@ -101,21 +105,22 @@ std::string excluding(MergeConflict const& conflict) {
 } // namespace
 
 std::string inWords(MergeConflict const& conflict) {
-    auto const what = describedNested(conflict) + described(conflict.address);
-    auto const both = said(conflict.values.ours, MergeSide::Ours) + " and " +
-                      said(conflict.values.theirs, MergeSide::Theirs);
+    auto const subject = describedNested(conflict) + described(conflict.address);
+    auto const both = changeBy(conflict.values.ours, MergeSide::Ours) + " and " +
+                      changeBy(conflict.values.theirs, MergeSide::Theirs);
     switch (conflict.kind) {
     case MergeConflict::Kind::Key:
-        return "the " + inQuotes(conflict.key) + " of " + what + " is " + both;
+        return "the " + inQuotes(conflict.key) + " of " + subject + " is " + both;
     case MergeConflict::Kind::Type:
-        return "the type of " + what + " is " + both;
+        return "the type of " + subject + " is " + both;
     case MergeConflict::Kind::Nested:
-        return what + excluding(conflict);
+        return subject + removedAndChanged(conflict);
     case MergeConflict::Kind::Subtree:
         break;
     }
     auto const isOther = !conflict.changed.empty() && conflict.changed.front() != conflict.address;
-    return what + excluding(conflict) + (isOther ? ", in " + described(conflict.changed.front()) : "");
+    return subject + removedAndChanged(conflict) +
+           (isOther ? ", in " + described(conflict.changed.front()) : "");
 }
 
 } // namespace projectctl

@@ -6,7 +6,7 @@
 
 namespace projectctl {
 
-/// A conflict of a merge in words of the project, in UTF-8: one clause.
+/// A conflict of a merge as one clause for the user, in UTF-8.
 std::string inWords(project::stores::MergeConflict const& conflict);
 
 } // namespace projectctl

@@ -1,3 +1,4 @@
+#include <exception>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -16,23 +17,37 @@ namespace projectctl {
 
 namespace {
 
-/// Merges two versions of a project's text, as a merge driver of git does.
+/// Merges two versions of a project's text, as git's merge driver.
+///
+/// The exit codes are those of a merge driver, and not those of the other commands: 1 for a conflict, and
+/// more than 128 for a failure, because git takes anything in between for a conflict.
 class MergeCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
             "merge",
-            "Merge two versions of a project's text, for git ('projectctl setup' tells it); fails when "
-            "both changed one thing, and marks it in the result");
-        takeText(*app, "BASE", base_, "The version that both come from; empty when there is none")
-            ->required();
-        takeText(*app, "OURS", ours_, "One version; the result takes its place")->required();
+            "Merge two versions of a project's text; git calls this after 'projectctl setup'. Exits with 1 "
+            "if there is a conflict, which is marked in the result, and with 129 if it fails");
+        takeText(*app, "BASE", base_, "The common ancestor; an empty file if there is none")->required();
+        takeText(*app, "OURS", ours_, "One version; replaced by the result")->required();
         takeText(*app, "THEIRS", theirs_, "The other version")->required();
-        takeText(*app, "PATH", path_, "What the text is called in messages");
+        takeText(*app, "PATH", path_, "The name of the text in messages");
         return app;
     }
 
     int run() override {
+        try {
+            return mergeFiles();
+        } catch (std::exception const& error) {
+            printError(error.what());
+            return failed;
+        }
+    }
+
+private:
+    static constexpr int failed = 129;
+
+    int mergeFiles() const {
         auto const merge =
             project::stores::mergeTexts(contentOf(*base_), contentOf(*ours_), contentOf(*theirs_));
         replace(*ours_, merge.textWithMarkers());
@@ -42,7 +57,6 @@ public:
         return merge.conflicts().empty() ? 0 : 1;
     }
 
-private:
     static std::string contentOf(std::string const& name) {
         std::ifstream file(name, std::ios::binary);
         std::string result{std::istreambuf_iterator<char>(file), {}};
@@ -52,7 +66,7 @@ private:
         return result;
     }
 
-    /// Either the old content stays or all of the new is there, also when the disk is full.
+    /// Replaces the content of a file as a whole: a full disk leaves the old content.
     static void replace(std::string const& name, std::string const& content) {
         auto const next = name + ".merged";
         std::ofstream file(next, std::ios::binary | std::ios::trunc);

@@ -25,17 +25,16 @@ using project::stores::TextMerge;
 
 constexpr char const* textInRoot = "./.projectdata/project.jsonl";
 
-/// Settles what a merge left to a person, from the versions that git keeps until then.
+/// Resolves the conflicts of a merge, from the versions in git's index.
 class ResolveCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
             "resolve",
-            "Settle a conflict of the project's text that a merge has left, and tell git; asks for each "
-            "thing that both sides changed, if it is called on a terminal");
-        auto* const ours =
-            app->add_flag("--ours", ours_, "Of all that both changed, keep what this branch has");
-        app->add_flag("--theirs", theirs_, "Of all that both changed, take what the other branch has")
+            "Resolve the conflicts that a merge has left in the project's text, and stage the result; on a "
+            "terminal, asks which side to take for each conflict");
+        auto* const ours = app->add_flag("--ours", ours_, "Resolve all conflicts in favour of this branch");
+        app->add_flag("--theirs", theirs_, "Resolve all conflicts in favour of the other branch")
             ->excludes(ours);
         return app;
     }
@@ -45,8 +44,8 @@ public:
         auto const choices = choose(merge.conflicts());
         project.shield().raise();
         project.text().resolve(merge.text(choices));
-        tellGit(project.root());
-        output().say("The project's text is whole again.");
+        stage(project.root());
+        output().say("The conflicts are resolved.");
         return 0;
     }
 
@@ -58,21 +57,21 @@ private:
         auto const our = version(root, ours);
         auto const their = version(root, theirs);
         if (!our || !their) {
-            throw Failure("git has no conflict of the project's text that could be settled");
+            throw Failure("git has no conflict of the project's text to resolve");
         }
         return project::stores::mergeTexts(version(root, base).value_or(std::string()), *our, *their);
     }
 
-    /// The text as git keeps it in one stage of a merge; nothing when it has none there.
+    /// The text in one stage of git's index; empty if there is none.
     static std::optional<std::string> version(Path const& root, int stage) {
         auto result = git(root, {"cat-file", "blob", ":" + std::to_string(stage) + ':' + textInRoot});
         return result.exitCode == 0 ? std::optional(std::move(result.output)) : std::nullopt;
     }
 
-    static void tellGit(Path const& root) {
+    static void stage(Path const& root) {
         auto const result = git(root, {"add", "--", textInRoot});
         if (result.exitCode != 0) {
-            throw Failure("the conflict is settled, but git cannot be told: " +
+            throw Failure("the conflict is resolved, but the text cannot be staged: " +
                           result.errors.substr(0, result.errors.find('\n')));
         }
     }
@@ -81,7 +80,7 @@ private:
         try {
             return runGit(root, arguments);
         } catch (std::system_error const& error) {
-            throw Failure("git cannot be asked for the versions of the text: " + std::string(error.what()));
+            throw Failure("the versions of the text cannot be read from git: " + std::string(error.what()));
         }
     }
 
@@ -89,20 +88,20 @@ private:
         if (ours_ || theirs_) {
             return {conflicts.size(), ours_ ? MergeSide::Ours : MergeSide::Theirs};
         }
-        bool const isAsked = output().isTerminal() && isatty(STDIN_FILENO) == 1;
+        bool const canAsk = output().isTerminal() && isatty(STDIN_FILENO) == 1;
         std::vector<MergeSide> result;
         result.reserve(conflicts.size());
         for (auto const& conflict : conflicts) {
-            if (isAsked) {
+            if (canAsk) {
                 result.push_back(ask(conflict, result.size() + 1, conflicts.size()));
             } else {
                 printError("conflict: " + inWords(conflict));
             }
         }
         if (result.size() < conflicts.size()) {
-            throw Failure("both sides changed " + std::to_string(conflicts.size()) +
-                          (conflicts.size() == 1 ? " thing" : " things") +
-                          ". Give --ours or --theirs, or call this on a terminal to choose for each");
+            throw Failure(
+                std::to_string(conflicts.size()) + (conflicts.size() == 1 ? " conflict" : " conflicts") +
+                " to resolve. Use --ours or --theirs, or call this on a terminal to choose for each");
         }
         return result;
     }
@@ -111,7 +110,7 @@ private:
         output().text() += std::to_string(number) + " of " + std::to_string(total) + ": " +
                            withoutControls(inWords(conflict), false) + ".\n";
         for (std::string answer;;) {
-            output().text() += "Keep ours or theirs (o, t, or q to leave it all as it is)? ";
+            output().text() += "Take ours or theirs (o or t; q quits and changes nothing)? ";
             output().flush();
             if (!std::getline(std::cin, answer) || answer == "q") {
                 throw Failure("nothing was changed");

@@ -10,23 +10,23 @@ namespace projectctl {
 
 namespace {
 
-/// Readies a clone of a repository for work on the project in it.
+/// Configures a clone of a repository to merge the project's text with this tool.
 class SetupCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
         return tool.add_subcommand("setup",
-                                   "Have git merge the project's text by what it says, in this clone of "
-                                   "the repository");
+                                   "Configure the git repository to merge the project's text with this tool; "
+                                   "do this once in each clone, and after the tool was moved");
     }
 
     int run() override {
         auto const root = findProjectRoot(workingFolder());
-        if (lookForMergeSetup(root) == MergeSetup::NoRepository) {
+        if (mergeSetupOf(root) == MergeSetup::NoRepository) {
             throw Failure("\"" + shown(root) +
-                          "\" is in no git repository, so that there is nothing to set up");
+                          "\" is not in a git repository, so there is nothing to set up");
         }
         setUpMerge(root);
-        output().say("git merges the project's text by 'projectctl merge' now.");
+        output().say("git now merges the project's text with this tool.");
         return 0;
     }
 };

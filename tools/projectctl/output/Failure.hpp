@@ -4,8 +4,7 @@
 
 namespace projectctl {
 
-/// What the tool itself cannot do. The text is one clause or sentence in UTF-8 for the person at the
-/// terminal.
+/// An error that the tool itself detects. The text is one clause or sentence in UTF-8 for the user.
 class Failure : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;

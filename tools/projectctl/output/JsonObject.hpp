@@ -9,22 +9,22 @@
 
 namespace projectctl {
 
-/// A JSON object on standard output, in one line.
+/// Writes a JSON object to standard output, on one line.
 ///
-/// The order of use: begin, then its members, then end.
+/// Order of use: begin, then the members, then end.
 class JsonObject {
 public:
     void begin();
     void addText(std::string_view key, std::u16string_view text);
     void addList(std::string_view key, std::vector<std::u16string> const& texts);
 
-    /// Several texts by name, as an object of their own.
+    /// Adds several texts, each by its name, as a nested object.
     using Texts = std::vector<std::pair<std::u16string, std::u16string>>;
     void addTexts(std::string_view key, Texts const& texts);
 
     void addFlag(std::string_view key, bool value);
 
-    /// The members "path" and "kind" of a file.
+    /// Adds the members "path" and "kind" of a file.
     void addFile(std::u16string_view path, Kind kind);
 
     void end();

@@ -11,7 +11,7 @@ void JsonRows::begin() {
         end();
         output().text() += ",\n";
     }
-    output().settle();
+    output().flushWhenLarge();
     isEmpty_ = false;
     JsonObject::begin();
 }

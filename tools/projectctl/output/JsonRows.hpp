@@ -4,21 +4,21 @@
 
 namespace projectctl {
 
-/// A JSON array of objects on standard output, one a line.
+/// Writes a JSON array of objects to standard output, one object per line.
 ///
-/// The order of use: for each object begin, then its members; finish at the end.
+/// Order of use: for each object begin, then its members; finish after the last one.
 class JsonRows : public JsonObject {
 public:
     void begin();
 
-    /// Ends the array, which is part of something.
+    /// Ends an array that is part of a larger value.
     void finish();
 
-    /// Ends the array and the line: the output is nothing but this array.
+    /// Ends an array that is the whole output, with a line feed.
     void finishOutput();
 
 private:
-    bool isEmpty_ = true; ///< no object has begun
+    bool isEmpty_ = true; ///< no object was written
 };
 
 } // namespace projectctl

@@ -2,7 +2,8 @@
 
 namespace projectctl {
 
-/// What a path leads to. Whatever is no folder counts as a file, a symbolic link to a folder too.
+/// The kind of a file system entry. Everything that is not a folder counts as a file, also a symbolic link to
+/// a folder.
 enum class Kind { File, Folder };
 
 } // namespace projectctl

@@ -2,9 +2,10 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <cstdint>
 
 #include "fl/filesystem/SystemName.hpp"
+#include "fl/i18n/CodePoints.hpp"
+#include "fl/i18n/JsonString.hpp"
 #include "fl/i18n/Utf8.hpp"
 
 namespace projectctl {
@@ -13,33 +14,13 @@ namespace {
 
 constexpr char digits[] = "0123456789abcdef";
 
-bool isContinuation(std::string_view bytes, std::size_t index) {
-    return index < bytes.size() && (static_cast<unsigned char>(bytes[index]) & 0xC0U) == 0x80U;
-}
-
-/// How many bytes at an index make a character of UTF-8; 0 when they make none.
+/// The length in bytes of the UTF-8 character at an index; 0 when it is not valid.
 std::size_t characterLength(std::string_view bytes, std::size_t index) {
-    auto const first = static_cast<unsigned char>(bytes[index]);
-    if (first < 0x80) {
-        return 1;
-    }
-    std::size_t const length = first >= 0xF0 ? 4 : first >= 0xE0 ? 3 : 2;
-    if (first < 0xC2 || first > 0xF4) {
-        return 0;
-    }
-    for (std::size_t next = 1; next < length; ++next) {
-        if (!isContinuation(bytes, index + next)) {
-            return 0;
-        }
-    }
-    auto const second = static_cast<unsigned char>(bytes[index + 1]);
-    bool const overlong = (first == 0xE0 && second < 0xA0) || (first == 0xF0 && second < 0x90);
-    bool const surrogate = first == 0xED && second >= 0xA0;
-    bool const beyond = first == 0xF4 && second >= 0x90;
-    return overlong || surrogate || beyond ? 0 : length;
+    return fl::i18n::decodeUtf8(bytes, index).length;
 }
 
-/// True for the control characters of ASCII and, in UTF-8, for U+0080 to U+009F, which terminals obey too.
+/// True for the control characters of ASCII and for U+0080 to U+009F in UTF-8, which terminals also
+/// interpret.
 bool isControl(std::string_view bytes, std::size_t index) {
     auto const first = static_cast<unsigned char>(bytes[index]);
     return first < 0x20 || first == 0x7F ||
@@ -71,53 +52,6 @@ bool needsQuotes(std::string_view bytes) {
     return false;
 }
 
-bool isHighSurrogate(char16_t unit) {
-    return unit >= 0xD800 && unit < 0xDC00;
-}
-
-bool isLowSurrogate(char16_t unit) {
-    return unit >= 0xDC00 && unit < 0xE000;
-}
-
-void appendUnitEscape(std::string& out, char16_t unit) {
-    out += "\\u";
-    for (unsigned shift = 16; shift > 0;) {
-        shift -= 4;
-        out += digits[(static_cast<unsigned>(unit) >> shift) & 15U];
-    }
-}
-
-/// Appends a character beyond ASCII as UTF-8.
-void appendCharacter(std::string& out, std::uint32_t character) {
-    if (character < 0x800) {
-        out += static_cast<char>(0xC0U | (character >> 6U));
-    } else {
-        if (character < 0x10000) {
-            out += static_cast<char>(0xE0U | (character >> 12U));
-        } else {
-            out += static_cast<char>(0xF0U | (character >> 18U));
-            out += static_cast<char>(0x80U | ((character >> 12U) & 0x3FU));
-        }
-        out += static_cast<char>(0x80U | ((character >> 6U) & 0x3FU));
-    }
-    out += static_cast<char>(0x80U | (character & 0x3FU));
-}
-
-void appendJsonAscii(std::string& out, char unit) {
-    if (unit == '"' || unit == '\\') {
-        out += '\\';
-        out += unit;
-    } else if (unit == '\n') {
-        out += "\\n";
-    } else if (unit == '\t') {
-        out += "\\t";
-    } else if (unit < ' ' || unit == '\x7F') {
-        appendUnitEscape(out, static_cast<char16_t>(unit));
-    } else {
-        out += unit;
-    }
-}
-
 } // namespace
 
 void appendBytes(std::string& out, std::u16string_view name) {
@@ -125,7 +59,7 @@ void appendBytes(std::string& out, std::u16string_view name) {
     out.resize(before + name.size());
     auto* to = out.data() + before;
     bool isAscii = true;
-    for (auto const unit : name) { // one pass without a way out of it, which is what a million names are for
+    for (auto const unit : name) { // without an early exit, so that the loop is vectorised
         isAscii = isAscii && unit != 0 && unit < 0x80;
         *to++ = static_cast<char>(unit);
     }
@@ -163,21 +97,7 @@ void appendQuoted(std::string& out, std::string_view bytes) {
 }
 
 void appendJsonString(std::string& out, std::u16string_view text) {
-    out += '"';
-    for (std::size_t index = 0; index < text.size(); ++index) {
-        auto const unit = text[index];
-        if (unit < 0x80) {
-            appendJsonAscii(out, static_cast<char>(unit));
-        } else if (isHighSurrogate(unit) && index + 1 < text.size() && isLowSurrogate(text[index + 1])) {
-            ++index;
-            appendCharacter(out, 0x10000U + ((unit - 0xD800U) << 10U) + (text[index] - 0xDC00U));
-        } else if (isHighSurrogate(unit) || isLowSurrogate(unit) || unit < 0xA0) {
-            appendUnitEscape(out, unit);
-        } else {
-            appendCharacter(out, unit);
-        }
-    }
-    out += '"';
+    fl::i18n::appendJsonString(out, text, fl::i18n::JsonEscapes::Controls);
 }
 
 std::string inQuotes(std::u16string_view text) {

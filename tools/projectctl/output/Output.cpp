@@ -13,7 +13,7 @@ namespace projectctl {
 
 namespace {
 
-constexpr std::size_t pieceSize = std::size_t(256) * 1024;
+constexpr std::size_t bufferSize = std::size_t(256) * 1024;
 
 } // namespace
 
@@ -30,8 +30,8 @@ void Output::name(std::u16string_view name) {
     }
 }
 
-void Output::settle() {
-    if (text_.size() >= pieceSize) {
+void Output::flushWhenLarge() {
+    if (text_.size() >= bufferSize) {
         flush();
     }
 }
@@ -67,7 +67,7 @@ void printError(std::string_view text) noexcept {
         auto const line = "projectctl: " + withoutControls(text, false) + '\n';
         [[maybe_unused]] auto const written = write(STDERR_FILENO, line.data(), line.size());
     } catch (...) {
-        // There is no memory left for the line: the exit code tells what can be told.
+        // Without memory for the line, the exit code is the only report.
         return;
     }
 }

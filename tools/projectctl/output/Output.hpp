@@ -5,36 +5,37 @@
 
 namespace projectctl {
 
-/// The reader of the output has gone, as `head` does when it has seen enough. No error to anybody.
+/// Thrown when the reader of the output has closed it, as `head` does. The tool does not report this as an
+/// error.
 class OutputClosed {};
 
-/// The tool's standard output, written in large pieces.
+/// The tool's standard output, buffered.
 ///
-/// What is still held when the object goes is lost: whoever finishes a piece of work calls flush, so that an
-/// output that cannot be written is an error and not a silence.
+/// The destructor drops what is in the buffer. Callers flush at the end of their work, so that an output that
+/// cannot be written is reported.
 class Output {
 public:
     explicit Output(int descriptor);
 
-    /// True when a person is looking at it.
+    /// True when the output is a terminal.
     bool isTerminal() const noexcept { return isTerminal_; }
 
-    /// What is still held; append to it, then call settle.
+    /// The buffer. Append to it, then call flushWhenLarge.
     std::string& text() noexcept { return text_; }
 
-    /// Appends a name or path: its bytes in a pipe, and on a terminal with what could be taken for another
-    /// name quoted.
+    /// Appends a name or path: as appendQuoted does on a terminal, otherwise its bytes.
     void name(std::u16string_view name);
 
-    /// Writes when enough has come together to be worth a system call.
-    void settle();
+    /// Writes the buffer when it is large enough to be worth a system call.
+    void flushWhenLarge();
 
-    /// Appends a line that tells a person what was done; nothing in a pipe, where nobody asks.
+    /// Appends a line that confirms what was done, on a terminal only.
     void say(std::string_view line);
 
-    /// Writes all that is held.
-    /// @throws OutputClosed when nobody reads it any more; Failure when it cannot be written, for instance
-    ///         to a full disk.
+    /// Writes the buffer.
+    /// @throws OutputClosed when the reader has closed it; Failure when it cannot be written, for instance to
+    /// a
+    ///         full disk.
     void flush();
 
 private:
@@ -46,7 +47,7 @@ private:
 /// Standard output.
 Output& output();
 
-/// Writes "projectctl: " and the text to standard error, as one line whatever the text holds.
+/// Writes "projectctl: " and the text to standard error, as one line: line feeds are escaped.
 void printError(std::string_view text) noexcept;
 
 } // namespace projectctl

@@ -13,7 +13,7 @@ namespace {
 constexpr std::string_view clearLine = "\r\033[K";
 
 void draw(int descriptor, std::string_view text) {
-    // What a terminal does not take now is not worth waiting for.
+    // Progress is not worth waiting for a terminal that is busy.
     [[maybe_unused]] auto const written = write(descriptor, text.data(), text.size());
 }
 
@@ -36,7 +36,7 @@ Progress::Progress(std::string work, int descriptor, Timing timing)
     if (isatty(descriptor) != 1) {
         return;
     }
-    // The thread must not be the one that a signal reaches: it would get what the main thread holds back.
+    // The thread blocks all signals: it would otherwise receive those that the main thread has blocked.
     sigset_t all;
     sigset_t before;
     sigfillset(&all);
@@ -50,27 +50,27 @@ Progress::~Progress() {
         return;
     }
     {
-        std::lock_guard const guard(guarding_);
-        stopped_ = true;
+        std::lock_guard const guard(mutex_);
+        isStopped_ = true;
     }
     changed_.notify_one();
     drawing_.join();
 }
 
 void Progress::begin(std::string work) {
-    std::lock_guard const guard(guarding_);
+    std::lock_guard const guard(mutex_);
     work_ = std::move(work);
     reach(0);
 }
 
 void Progress::drawUntilStopped() {
-    std::unique_lock guard(guarding_);
-    if (changed_.wait_for(guard, timing_.patience, [this] { return stopped_; })) {
+    std::unique_lock guard(mutex_);
+    if (changed_.wait_for(guard, timing_.patience, [this] { return isStopped_; })) {
         return;
     }
     do {
         draw(descriptor_, line());
-    } while (!changed_.wait_for(guard, timing_.interval, [this] { return stopped_; }));
+    } while (!changed_.wait_for(guard, timing_.interval, [this] { return isStopped_; }));
     draw(descriptor_, clearLine);
 }
 

@@ -10,30 +10,30 @@
 
 namespace projectctl {
 
-/// Tells the person at the terminal what takes so long: one line, from a second on, gone again at the end.
+/// Shows on the terminal what the tool is working on: one line, after a second, deleted at the end.
 ///
-/// A thread of its own draws it, since the work may be one long call into the library. Where there is no
-/// terminal there is no thread either, and nothing is written.
+/// A thread draws the line, because the work may be one long call into the library. Without a terminal there
+/// is no thread, and nothing is written.
 class Progress {
 public:
     struct Timing {
-        std::chrono::milliseconds patience = std::chrono::seconds(1); ///< before anything is shown
+        std::chrono::milliseconds patience = std::chrono::seconds(1); ///< time until the line is shown
         std::chrono::milliseconds interval = std::chrono::milliseconds(200);
     };
 
-    /// @param work what is done first, for instance "reading folders".
+    /// @param work the first piece of work, for instance "Reading folders".
     explicit Progress(std::string work);
 
-    /// @param descriptor where to draw, if it is a terminal.
+    /// @param descriptor the terminal to draw on; nothing is drawn if it is not a terminal.
     Progress(std::string work, int descriptor, Timing timing);
     ~Progress();
     Progress(Progress const&) = delete;
     Progress& operator=(Progress const&) = delete;
 
-    /// Goes over to another piece of work, with a count of 0.
+    /// Continues with another piece of work, with a count of 0.
     void begin(std::string work);
 
-    /// How far the work is; shown when it is not 0. Cheap enough to be called for each file.
+    /// Sets the count, which is shown if it is not 0. Cheap enough to call for each file.
     void reach(std::size_t count) noexcept { count_.store(count, std::memory_order_relaxed); }
 
 private:
@@ -43,10 +43,10 @@ private:
     int descriptor_;
     Timing timing_;
     std::atomic<std::size_t> count_ = 0;
-    std::mutex guarding_;
+    std::mutex mutex_;
     std::string work_;
     std::condition_variable changed_;
-    bool stopped_ = false;
+    bool isStopped_ = false;
     std::thread drawing_;
 };
 

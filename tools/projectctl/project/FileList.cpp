@@ -4,33 +4,35 @@
 #include <utility>
 #include <vector>
 
-#include "project/Schema.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/TreeSchema.hpp"
 
 namespace projectctl {
+
+namespace treeSchema = project::metadata::schema;
 
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
 using project::stores::Child;
 
-/// A folder whose contents are being visited.
+/// A folder that is being visited.
 struct FileList::Open {
     MetadataPath address;
     project::stores::Children files;
     std::size_t next;
-    std::size_t pathLength; ///< of the folder, with the separator behind it
+    std::size_t pathLength; ///< of the folder, including the separator
 };
 
 FileList::FileList(OpenProject& project) : project_(project), guard_(project.store().acquireReadLock()) {
 }
 
 MetadataPath FileList::addressOf(Path const& path) const {
-    auto result =
-        MetadataPath::root().child(PathElement(std::u16string(schema::files), std::u16string(schema::root)));
+    auto result = MetadataPath::root().child(
+        PathElement(treeSchema::files::filesType, treeSchema::files::fileListScope));
     auto const relative = project::metadata::getRelativePath(project_.root(), path);
     for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
         auto const name = fl::filesystem::detail::extract_first_element(rest);
-        result = result.child(PathElement(std::u16string(schema::file), std::u16string(name)));
+        result = result.child(PathElement(treeSchema::files::fileType, std::u16string(name)));
     }
     return result;
 }
@@ -39,10 +41,10 @@ FileList::Level FileList::level(MetadataPath const& address) const {
     Level result;
     result.files = project_.text().load(address);
     std::erase_if(result.files, [&result](Child const& child) {
-        if (child.element.getType() == schema::folderMarker) {
+        if (child.element.getType() == treeSchema::files::markerType) {
             result.kind = Kind::Folder;
         }
-        return child.element.getType() != schema::file;
+        return child.element.getType() != treeSchema::files::fileType;
     });
     return result;
 }
@@ -65,7 +67,7 @@ void FileList::visit(Path const& path, Visitor const& visitor) const {
 
 void FileList::visitBelow(MetadataPath start, Level level, std::u16string path, std::size_t depth,
                           Visitor const& visitor) const {
-    // Not by recursion: how deep the tree is, is up to whoever wrote the text.
+    // Not recursive: a text from another source may contain a tree of any depth.
     std::vector<Open> open;
     open.push_back({std::move(start), std::move(level.files), 0, path.size()});
     while (!open.empty()) {

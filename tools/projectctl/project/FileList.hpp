@@ -9,39 +9,39 @@
 
 namespace projectctl {
 
-/// The project's file list, read straight from the store: the same files as the file manager lists, and of
-/// each whether it is a folder, for a tenth of the time. A folder is what was one when it was added.
+/// The project's file list, read directly from the store: the files that the file manager lists, with their
+/// kinds, in a tenth of the time. An entry is a folder if it was one when it was added.
 ///
-/// Holds the store's read guard, so that all of it is one state of the project.
+/// Holds the store's read guard, so that all results show one state of the project.
 class FileList {
 public:
     explicit FileList(OpenProject& project);
 
-    /// What the store has at one address of the list.
+    /// The content of one address of the list.
     struct Level {
-        Kind kind = Kind::File;          ///< of what the address leads to
-        project::stores::Children files; ///< directly below it, by name in code units
+        Kind kind = Kind::File;          ///< of the entry at the address
+        project::stores::Children files; ///< the entries directly below it, by name in code units
     };
 
     /// The address of a file. @param path absolute, the project's root or below it.
     project::metadata::MetadataPath addressOf(Path const& path) const;
 
-    /// Empty for an address that does not exist. A file below it without a node is not in the project, nor is
-    /// what lies below that.
+    /// The level of an address; empty when the address does not exist. An entry in it without a node is not
+    /// in the project, nor is anything below that entry.
     Level level(project::metadata::MetadataPath const& address) const;
 
     /// A file or folder of the project.
     struct File {
         std::u16string const& path; ///< relative to the root
-        std::size_t depth;          ///< how many folders lie between it and where the walk began
+        std::size_t depth;          ///< number of folders between it and the start of the visit
         Kind kind;
-        project::metadata::MetadataNode const& node; ///< what stands on it
+        project::metadata::MetadataNode const& node; ///< the value stored for it
     };
 
     using Visitor = std::function<void(File const& file)>;
 
-    /// Visits everything in the project below a path, a folder before its contents, in the order of their
-    /// names; the path itself too, unless it is the root.
+    /// Visits a path, unless it is the root, and everything in the project below it: a folder before its
+    /// contents, and the contents by name.
     /// @param path absolute, in the project.
     void visit(Path const& path, Visitor const& visitor) const;
 

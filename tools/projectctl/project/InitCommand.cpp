@@ -17,13 +17,13 @@ namespace projectctl {
 
 namespace {
 
-/// Makes a project in a folder.
+/// Creates a project in a folder.
 class InitCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand("init", "Make a project in a folder");
-        takeText(*app, "FOLDER", folder_, "The project's root folder; the current one by default");
-        takeText(*app, "--name", name_, "The project's name; the folder's by default");
+        auto* const app = tool.add_subcommand("init", "Create a project in a folder");
+        takeText(*app, "FOLDER", folder_, "The root folder; by default the current folder");
+        takeText(*app, "--name", name_, "The name of the project; by default the name of the folder");
         return app;
     }
 
@@ -31,12 +31,14 @@ public:
         auto const root = folder_ ? chosenFolder(*folder_) : workingFolder();
         requireNoProject(root);
         auto const name = name_ ? textOf(*name_) : nameOf(root);
-        OpenProject::make(root, name).stage();
-        if (settings().sourceControl && lookForMergeSetup(root) == MergeSetup::Missing) {
-            setUpMerge(root);
+        OpenProject::create(root, name).stage();
+        if (settings().sourceControl) {
+            auto const setup = mergeSetupOf(root);
+            if (setup == MergeSetup::Missing || setup == MergeSetup::ProgramMissing) {
+                setUpMerge(root);
+            }
         }
-        output().say("There is a project in \"" + shown(root) +
-                     "\" now. 'projectctl add' puts files into it.");
+        output().say("Created a project in \"" + shown(root) + "\". 'projectctl add' adds files to it.");
         return 0;
     }
 
@@ -45,15 +47,15 @@ private:
         auto folder = fl::filesystem::canonical(fl::filesystem::fromSystem(argument), workingFolder());
         if (argument.empty() || !project::metadata::is_directory(folder)) {
             throw Failure("there is no folder \"" + shown(fl::filesystem::fromSystem(argument)) +
-                          "\". Make it first.");
+                          "\". Create it first.");
         }
         return folder;
     }
 
     static void requireNoProject(Path const& root) {
-        if (lookForProject(root) != ProjectTrace::None) {
-            findProjectRoot(root); // tells of a text that is missing
-            throw Failure("there is a project in \"" + shown(root) + "\" already");
+        if (findProjectIn(root) != ProjectTrace::None) {
+            findProjectRoot(root); // throws if the text is missing
+            throw Failure("there is already a project in \"" + shown(root) + '"');
         }
     }
 

@@ -19,7 +19,7 @@ using ZEPHRA::project::management::FileNotInProject;
 
 namespace {
 
-/// A command stages what it has written once, when it is done.
+/// A command stages the text once, at its end.
 project::session::Options sessionOptions() {
     auto const sourceControl = settings().sourceControl ? SourceControl::WhenAsked : SourceControl::Off;
     return {sourceControl, true};
@@ -30,7 +30,7 @@ project::session::Options sessionOptions() {
 OpenProject::OpenProject(Path const& root) : OpenProject(Session::open(root, sessionOptions())) {
 }
 
-OpenProject OpenProject::make(Path const& root, std::u16string const& name) {
+OpenProject OpenProject::create(Path const& root, std::u16string const& name) {
     return OpenProject(Session::create(root, name, sessionOptions()));
 }
 
@@ -71,7 +71,7 @@ void OpenProject::warnOfDamage() {
     }
     if (count > 0) {
         printError("warning: " + first + (count > 1 ? ", and " + std::to_string(count - 1) + " more" : "") +
-                   ". 'projectctl check' tells more.");
+                   ". 'projectctl check' shows all faults.");
     }
 }
 

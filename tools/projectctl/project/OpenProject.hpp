@@ -13,21 +13,21 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// A project with its store, as one command uses it: opened, used, and gone with the process.
+/// A project with its store, opened for one command.
 ///
-/// Commands go through the managers. Those that only look, and must be fast or must see what a manager would
-/// stumble over, go to the store itself.
+/// Commands use the managers. Commands that only read use the store directly where they must be fast, or must
+/// see entries that a manager cannot handle.
 class OpenProject {
 public:
     /// Opens the project in a folder. Nothing is read yet, and nothing is written.
     explicit OpenProject(Path const& root);
     ~OpenProject();
 
-    /// Makes a project in a folder.
-    /// @throws StoreError when there is one already.
-    static OpenProject make(Path const& root, std::u16string const& name);
+    /// Creates a project in a folder.
+    /// @throws StoreError when there is already one.
+    static OpenProject create(Path const& root, std::u16string const& name);
 
-    /// Opens the project that the working folder lies in.
+    /// Opens the project that contains the working folder.
     /// @throws Failure when there is none.
     static OpenProject ofWorkingFolder();
 
@@ -45,37 +45,36 @@ public:
 
     project::metadata::MetadataManager& store() noexcept { return session_.store(); }
 
-    /// What the store keeps its tree in. While a guard of the store is open, this may be loaded from.
+    /// The backend of the store. Its `load` may be called while a guard of the store is open.
     project::stores::TextBackend& text() noexcept { return access_.text(); }
 
     WriteShield& shield() noexcept { return *shield_; }
 
-    /// The text's path on disk, for messages.
+    /// The path of the text, for messages.
     std::string textFile() const;
 
     /// The path of another file in the store's folder, for messages. @param name in UTF-8.
     std::string storeFile(std::string const& name) const;
 
-    /// Tells on standard error, in one line, if the text is damaged or has conflicts in it: what was listed
-    /// may lack something then. To be called with no guard open.
+    /// Warns on standard error, in one line, if the text is damaged or contains conflicts, because a listing
+    /// may then be incomplete. Call this without an open guard.
     void warnOfDamage();
 
-    /// Takes in what others have changed, and dispatches the events that tell of it.
+    /// Reads the changes of other programs, and raises the events for them.
     void refresh() { session_.refresh(); }
 
     project::management::ProjectEventBroadcaster& events() noexcept { return *session_.events(); }
 
-    /// Stages the project's text in git, if it was written and git tracks it. To be called with no guard
-    /// open.
+    /// Stages the text in git, if it was written and git tracks it. Call this without an open guard.
     void stage() { session_.stage(); }
 
-    /// Stages those of some files that were just added whose removal git has staged.
+    /// Of files that were just added, stages those whose removal is staged.
     void stageReturned(std::vector<Path> const& files) { access_.stageReturned(files); }
 
-    /// Has stage count what was changed through text().
+    /// Makes stage() count a change that was made through text().
     void stageLater() noexcept { access_.markTextForStaging(); }
 
-    /// What git tracks below some folders and the project does not have. @param folders absolute.
+    /// The files below some folders that git tracks and that are not in the project. @param folders absolute.
     std::vector<Path> trackedOutsideProject(std::vector<Path> const& folders) {
         return access_.trackedOutsideProject(folders);
     }
@@ -85,7 +84,8 @@ private:
 
     explicit OpenProject(Session session);
 
-    std::shared_ptr<WriteShield> shield_; ///< before the session: it goes last, when all is written
+    std::shared_ptr<WriteShield>
+        shield_; ///< before the session, so that it is destroyed after the last write
     Session session_;
     project::session::ToolAccess access_{session_};
 };

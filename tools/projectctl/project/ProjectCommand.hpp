@@ -5,13 +5,12 @@
 
 namespace projectctl {
 
-/// A command that works on the project that the working folder lies in. What it has changed is staged when it
-/// is done.
+/// A command on the project that contains the working folder. The text is staged after the command's work.
 class ProjectCommand : public Command {
 public:
     int run() final;
 
-    /// Does the work. No guard of the store outlives it. @return as Command::run.
+    /// Does the work, and leaves no guard of the store open. @return as Command::run.
     virtual int run(OpenProject& project) = 0;
 };
 

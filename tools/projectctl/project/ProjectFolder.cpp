@@ -11,17 +11,19 @@
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
+#include "project/stores/StoreError.hpp"
 #include "project/stores/TextBackend.hpp"
 
 namespace projectctl {
 
 using fl::filesystem::SystemName;
+using project::stores::StoreError;
 using project::stores::TextBackend;
 
 namespace {
 
-/// The kind of what is at a path, no link followed.
-/// @return empty when nothing can be seen there; errno tells why.
+/// The kind of the entry at a path; links are not followed.
+/// @return empty when there is none, or it cannot be read; errno contains the reason.
 std::optional<mode_t> kindOf(Path const& path) {
     SystemName const name(path);
 
@@ -41,11 +43,11 @@ bool isEmptyFolder(Path const& folder) {
 
 } // namespace
 
-ProjectTrace lookForProject(Path const& folder) {
+ProjectTrace findProjectIn(Path const& folder) {
     auto const store = folder / TextBackend::folderName;
     auto const kind = kindOf(store);
     if (kind == S_IFLNK) {
-        return ProjectTrace::Text; // the store says why it does not open this
+        return ProjectTrace::Text; // the store refuses it, with the reason
     }
     if (kind != S_IFDIR) {
         return ProjectTrace::None;
@@ -58,19 +60,20 @@ ProjectTrace lookForProject(Path const& folder) {
 
 Path findProjectRoot(Path const& folder) {
     for (auto here = folder;;) {
-        auto const trace = lookForProject(here);
+        auto const trace = findProjectIn(here);
         if (trace == ProjectTrace::Text) {
             return here;
         }
         if (trace == ProjectTrace::TextMissing) {
-            throw Failure(shown(TextBackend::textPath(here)) +
-                          ": the project's text is missing. Bring it back, for instance from source control; "
-                          "or remove the folder it was in to start anew.");
+            throw StoreError(StoreError::Kind::Damaged, shown(TextBackend::textPath(here)), 0,
+                             "the project's text is missing",
+                             "Restore it, for instance from source control, or delete its folder to start "
+                             "again.");
         }
         auto above = project::metadata::getParentFolder(here);
         if (above == here) {
             throw Failure("no project in \"" + shown(folder) +
-                          "\" or a folder above it. Make one with 'projectctl init'.");
+                          "\" or a folder above it. 'projectctl init' creates one.");
         }
         here = std::move(above);
     }

@@ -6,19 +6,20 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// What a folder holds of a project.
+/// The parts of a project that a folder contains.
 enum class ProjectTrace {
-    None,        ///< no project's store; an empty folder of that name is what a broken off start leaves
-    TextMissing, ///< a store whose text is gone
-    Text,        ///< a store with its text, whatever state that is in
+    None,        ///< no store; an interrupted `init` can leave an empty folder with the store's name
+    TextMissing, ///< a store without its text
+    Text,        ///< a store with its text, in any state
 };
 
-ProjectTrace lookForProject(Path const& folder);
+ProjectTrace findProjectIn(Path const& folder);
 
-/// The root of the project that a folder lies in: the nearest folder upwards that holds a project's text.
+/// The root of the project that contains a folder: the nearest folder upwards with a project's text.
 /// @param folder canonical.
-/// @throws Failure when there is none, or when a store on the way has lost its text: that must not be taken
-///         for a project further up.
+/// @throws Failure when there is none; StoreError when a store on the way has no text: its files must not be
+/// mistaken for
+///         files of a project further up.
 Path findProjectRoot(Path const& folder);
 
 } // namespace projectctl

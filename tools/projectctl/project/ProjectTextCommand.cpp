@@ -13,8 +13,8 @@ namespace {
 
 using project::management::ProjectManager;
 
-/// Shows or sets one of the two texts that a project has of its own. Texts are bytes to the tool, as names of
-/// files are, and come out as they went in.
+/// Shows or sets the name or the description of the project. The tool preserves any bytes in them, as in file
+/// names.
 class ProjectTextCommand : public ProjectCommand {
 public:
     using Getter = std::u16string (ProjectManager::*)() const;
@@ -25,7 +25,8 @@ public:
 
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(name_, "Show or set the project's " + name_);
-        takeText(*app, "TEXT", text_, "The new " + name_ + "; without it, the present one is shown");
+        takeText(*app, "TEXT", text_,
+                 "The new " + name_ + "; without it, the current " + name_ + " is shown");
         return app;
     }
 

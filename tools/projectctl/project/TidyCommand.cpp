@@ -6,21 +6,21 @@ namespace projectctl {
 
 namespace {
 
-/// Writes the project's text in its one canonical form, so that a commit holds nothing but what changed.
+/// Rewrites the text in its canonical form, so that a commit contains only what changed.
 class TidyCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         return tool.add_subcommand(
-            "tidy", "Bring the project's text into its canonical form, to be done before it is committed");
+            "tidy", "Rewrite the project's text in its canonical form; do this before you commit it");
     }
 
     int run(OpenProject& project) override {
         project.shield().raise();
         if (project.text().tidy()) {
             project.stageLater();
-            output().say("The project's text is tidy now.");
+            output().say("The project's text was tidied.");
         } else {
-            output().say("The project's text is tidy.");
+            output().say("The project's text is already tidy.");
         }
         return 0;
     }

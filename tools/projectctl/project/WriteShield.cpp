@@ -3,22 +3,23 @@
 namespace projectctl {
 
 WriteShield::~WriteShield() {
-    if (raised_) {
-        pthread_sigmask(SIG_SETMASK, &before_, nullptr); // a signal that came meanwhile ends the process here
+    if (isRaised_) {
+        pthread_sigmask(SIG_SETMASK, &before_,
+                        nullptr); // a signal that arrived in the meantime ends the process here
     }
 }
 
 void WriteShield::raise() {
-    if (raised_) {
+    if (isRaised_) {
         return;
     }
-    sigset_t held;
-    sigemptyset(&held);
+    sigset_t blocked;
+    sigemptyset(&blocked);
     for (int const signal : {SIGINT, SIGTERM, SIGHUP, SIGQUIT}) {
-        sigaddset(&held, signal);
+        sigaddset(&blocked, signal);
     }
-    pthread_sigmask(SIG_BLOCK, &held, &before_);
-    raised_ = true;
+    pthread_sigmask(SIG_BLOCK, &blocked, &before_);
+    isRaised_ = true;
 }
 
 void WriteShield::fileRemovalRequested(project::metadata::MetadataManager& /*store*/,

@@ -6,14 +6,14 @@
 
 namespace projectctl {
 
-/// Lets a write that has begun come to its end: from the moment at which the store tells of it, Ctrl-C and
-/// its like wait until this object goes. Before that moment they end the process at once, and nothing has
-/// happened.
+/// Lets a write finish: from the moment when the store notifies its listeners, Ctrl-C and similar signals are
+/// blocked until this object is destroyed. Before that moment they end the process at once, and nothing was
+/// written.
 class WriteShield : public project::metadata::FileChangeRequestListener {
 public:
     ~WriteShield() override;
 
-    /// Holds the signals back from now on, for a write of which no listener is told.
+    /// Blocks the signals from now on, for a write that does not notify listeners.
     void raise();
 
     void fileRemovalRequested(project::metadata::MetadataManager& store,
@@ -24,7 +24,7 @@ public:
     bool acceptsFileChangeRequests() override;
 
 private:
-    bool raised_ = false;
+    bool isRaised_ = false;
     sigset_t before_{};
 };
 

@@ -17,7 +17,7 @@ using project::management::FolderReference;
 namespace {
 
 ReferenceGraph::State stateOf(Path const& folder) {
-    if (lookForProject(folder) != ProjectTrace::None) {
+    if (findProjectIn(folder) != ProjectTrace::None) {
         return ReferenceGraph::State::Project;
     }
     return project::metadata::is_directory(folder) ? ReferenceGraph::State::NoProject

@@ -1,3 +1,4 @@
+#include "cli/ExitCode.hpp"
 #include "cli/WorkingFolder.hpp"
 #include "project/OpenProject.hpp"
 #include "project/ProjectFolder.hpp"
@@ -33,7 +34,7 @@ public:
         } else {
             writeTree(graph);
         }
-        return graph.isSound() ? 0 : 1;
+        return graph.isSound() ? exit_code::done : exit_code::finding;
     }
 
 private:

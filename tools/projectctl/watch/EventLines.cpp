@@ -7,18 +7,18 @@ namespace projectctl {
 
 namespace {
 
-/// What a line is made of.
+/// The fields of a line.
 struct Line {
     std::string_view event;
-    std::vector<std::u16string> words;
+    std::vector<std::u16string> data;
 };
 
 void writeLine(Line const& line) {
     auto& out = output().text();
     out += line.event;
-    for (auto const& word : line.words) {
+    for (std::u16string const& text : line.data) {
         std::string bytes;
-        appendBytes(bytes, word);
+        appendBytes(bytes, text);
         out += '\t';
         appendQuoted(out, bytes);
     }

@@ -9,11 +9,10 @@
 
 namespace projectctl {
 
-/// Writes each event of a project as a line on standard output, from its construction on: the event's name,
-/// and what it carries, separated by tabs; or as a JSON object.
+/// Writes each event of a project to standard output, from construction on: a line with the event's name and
+/// data, separated by tabs, or a JSON object.
 ///
-/// Names are quoted where they hold what could be taken for something else, so that a line is always one
-/// event. Must outlive the last event.
+/// Names are quoted as appendQuoted does, so that a line is always one event. Must outlive the last event.
 class EventLines {
 public:
     EventLines(OpenProject& project, bool asJson);

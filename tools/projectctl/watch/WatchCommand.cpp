@@ -12,33 +12,33 @@ namespace projectctl {
 
 namespace {
 
-/// How long a change stays unseen at most. A look costs one system call.
-constexpr auto betweenLooks = std::chrono::milliseconds(50);
+/// The time between two checks for changes. A check costs one system call.
+constexpr auto checkInterval = std::chrono::milliseconds(50);
 
-/// Tells what others change in the project, for as long as it runs.
+/// Prints the changes that other programs make to the project, until it is ended.
 class WatchCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "watch", "Tell what others change in the project, a line for each event, until interrupted");
-        app->add_flag("--json", json_, "Each line as a JSON object with \"event\" and what it carries");
+        auto* const app = tool.add_subcommand("watch", "Print the changes that other programs make to the "
+                                                       "project, one line per event, until interrupted");
+        app->add_flag("--json", json_, "Print each event as a JSON object with \"event\" and its data");
         return app;
     }
 
     [[noreturn]] int run(OpenProject& project) override {
-        project.refresh(); // what is there already is no change
+        project.refresh(); // the current state is not a change
         EventLines const lines(project, json_);
-        output().say("Waiting for changes. Ctrl-C ends it.");
+        output().say("Waiting for changes. Press Ctrl-C to stop.");
         for (;;) {
             output().flush();
-            std::this_thread::sleep_for(betweenLooks);
-            look(project);
+            std::this_thread::sleep_for(checkInterval);
+            checkForChanges(project);
         }
     }
 
 private:
-    /// A text that can't be read now may be whole again later: somebody is at work on it.
-    void look(OpenProject& project) {
+    /// A text that cannot be read now may be readable later: another program may be writing it.
+    void checkForChanges(OpenProject& project) {
         try {
             project.refresh();
             lastProblem_.clear();

@@ -41,7 +41,7 @@ TEST_F(ArgumentPathsTest, leavesTheLastElementAlone) {
     EXPECT_EQ(absolute("..dots"), u"/..dots");
 }
 
-TEST_F(ArgumentPathsTest, resolvesWhatNamesAFolder) {
+TEST_F(ArgumentPathsTest, resolvesAnArgumentThatNamesAFolder) {
     EXPECT_EQ(absolute("."), u"");
     EXPECT_EQ(absolute("real/.."), u"");
     EXPECT_EQ(absolute("real/deep/.."), u"/real");
@@ -51,16 +51,16 @@ TEST_F(ArgumentPathsTest, resolvesWhatNamesAFolder) {
     EXPECT_EQ(absolute("/"), u"/");
 }
 
-TEST_F(ArgumentPathsTest, takesAbsolutePaths) {
+TEST_F(ArgumentPathsTest, acceptsAbsolutePaths) {
     EXPECT_EQ(absolute((folder_.onDisk() / "link/deep").string()), u"/real/deep");
     EXPECT_EQ(absolute("/file"), u"/file");
 }
 
-TEST_F(ArgumentPathsTest, takesFoldersThatAreMissing) {
+TEST_F(ArgumentPathsTest, acceptsFoldersThatDoNotExist) {
     EXPECT_EQ(absolute("missing/deep/file"), u"/missing/deep/file");
 }
 
-TEST_F(ArgumentPathsTest, keepsBytesThatAreNoUtf8) {
+TEST_F(ArgumentPathsTest, preservesBytesThatAreNotUtf8) {
     EXPECT_EQ(absolute("a\xFF"), (std::u16string{u'/', u'a', char16_t(0xDCFF)}));
 }
 

@@ -1,11 +1,13 @@
-#include "ToolTest.hpp"
+#include <set>
+
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
 
 class InitCommand : public ToolTest {};
 
-TEST_F(InitCommand, makesAProjectNamedAfterItsFolder) {
+TEST_F(InitCommand, createsAProjectNamedAfterItsFolder) {
     folder_.folder(u"pump station");
 
     EXPECT_THAT(toolFrom("pump station", {"init"}), SucceedsSilently());
@@ -15,7 +17,7 @@ TEST_F(InitCommand, makesAProjectNamedAfterItsFolder) {
         std::filesystem::is_regular_file(folder_.onDisk() / "pump station/.projectdata/project.jsonl"));
 }
 
-TEST_F(InitCommand, takesTheFolderAndTheName) {
+TEST_F(InitCommand, usesTheGivenFolderAndName) {
     folder_.folder(u"a");
 
     EXPECT_THAT(tool({"init", "a", "--name", "Pump station"}), SucceedsSilently());
@@ -23,17 +25,17 @@ TEST_F(InitCommand, takesTheFolderAndTheName) {
     EXPECT_THAT(toolFrom("a", {"name"}), Prints("Pump station\n"));
 }
 
-TEST_F(InitCommand, refusesAFolderThatHoldsAProject) {
+TEST_F(InitCommand, refusesAFolderThatContainsAProject) {
     initProject();
     auto const before = readText();
 
     EXPECT_THAT(tool({"init", "--name", "other"}),
-                FailsWith(1, "there is a project in \"" + folder_.onDisk().string()));
+                FailsWith(1, "there is already a project in \"" + folder_.onDisk().string()));
 
     EXPECT_EQ(readText(), before);
 }
 
-TEST_F(InitCommand, refusesAFolderThatIsNotThere) {
+TEST_F(InitCommand, refusesAFolderThatDoesNotExist) {
     EXPECT_THAT(tool({"init", "missing"}), FailsWith(1, "there is no folder \"missing\""));
 }
 
@@ -43,7 +45,7 @@ TEST_F(InitCommand, refusesAFile) {
     EXPECT_THAT(tool({"init", "file"}), FailsWith(1, "there is no folder \"file\""));
 }
 
-TEST_F(InitCommand, makesAProjectInsideAnother) {
+TEST_F(InitCommand, createsAProjectInsideAnother) {
     initProject();
     folder_.folder(u"inner");
 
@@ -52,20 +54,20 @@ TEST_F(InitCommand, makesAProjectInsideAnother) {
     EXPECT_THAT(toolFrom("inner", {"name"}), Prints("inner\n"));
 }
 
-TEST_F(InitCommand, startsOverInAStoreFolderThatIsStillEmpty) {
+TEST_F(InitCommand, createsAProjectInAnEmptyStoreFolder) {
     folder_.folder(u".projectdata"); // a start that was broken off at once
 
     EXPECT_THAT(tool({"init"}), SucceedsSilently());
 }
 
-TEST_F(InitCommand, refusesAStoreWhoseTextIsGone) {
+TEST_F(InitCommand, refusesAStoreWhoseTextIsMissing) {
     initProject();
     std::filesystem::remove(text());
 
-    EXPECT_THAT(tool({"init"}), FailsWith(1, "the project's text is missing"));
+    EXPECT_THAT(tool({"init"}), FailsWith(5, "the project's text is missing"));
 }
 
-TEST_F(InitCommand, takesALinkForTheFolderItLeadsTo) {
+TEST_F(InitCommand, followsALinkToAFolder) {
     folder_.folder(u"real");
     folder_.addLink("link", "real");
 
@@ -74,7 +76,7 @@ TEST_F(InitCommand, takesALinkForTheFolderItLeadsTo) {
     EXPECT_THAT(toolFrom("real", {"name"}), Prints("real\n"));
 }
 
-TEST_F(InitCommand, makesOneProjectWhenTwoProcessesTryAtOnce) {
+TEST_F(InitCommand, createsOneProjectWhenTwoProcessesTryAtOnce) {
     for (int round = 0; round < 10; ++round) {
         settings_.folder = folder_.addFolder(std::to_string(round));
         RunningProgram first(commandFor({"init", "--name", "first"}), settings_);
@@ -82,18 +84,21 @@ TEST_F(InitCommand, makesOneProjectWhenTwoProcessesTryAtOnce) {
 
         auto const results = std::pair(first.finish(), second.finish());
 
-        EXPECT_EQ(results.first.exitCode + results.second.exitCode, 1)
+        std::set<int> const codes{results.first.exitCode, results.second.exitCode};
+        // The other one finds a project, or its folder without a text yet, or notices at its write that a
+        // project was created in the meantime.
+        EXPECT_TRUE(codes == (std::set{0, 1}) || codes == (std::set{0, 4}) || codes == (std::set{0, 5}))
             << results.first.errors << results.second.errors;
         EXPECT_THAT(tool({"name"}), Prints(results.first.exitCode == 0 ? "first\n" : "second\n"));
     }
 }
 
-TEST_F(InitCommand, leavesNothingBehindWhereNothingCanBeWritten) {
+TEST_F(InitCommand, leavesNoFilesWhereNothingCanBeWritten) {
     settings_.fileSize = 0; // every file is too large
 
     auto const result = tool({"init"});
 
-    EXPECT_THAT(result, FailsWith(1, ".projectdata"));
+    EXPECT_THAT(result, FailsWith(7, ".projectdata"));
     EXPECT_TRUE(std::filesystem::is_empty(folder_.onDisk()));
 }
 

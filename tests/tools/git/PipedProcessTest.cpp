@@ -8,7 +8,7 @@
 namespace projectctl {
 namespace {
 
-TEST(PipedProcess, givesOutputErrorsAndExitCode) {
+TEST(PipedProcess, returnsOutputErrorsAndExitCode) {
     auto const result = runWithInput({"sh", "-c", "cat; echo bad >&2; exit 3"}, "in");
 
     EXPECT_EQ(result.output, "in");
@@ -16,13 +16,13 @@ TEST(PipedProcess, givesOutputErrorsAndExitCode) {
     EXPECT_EQ(result.exitCode, 3);
 }
 
-TEST(PipedProcess, feedsAndReadsAtTheSameTime) {
+TEST(PipedProcess, writesAndReadsAtTheSameTime) {
     std::string const much(std::size_t(20) * 1024 * 1024, 'x'); // far more than the pipes hold
 
     EXPECT_EQ(runWithInput({"cat"}, much).output, much);
 }
 
-TEST(PipedProcess, readsErrorsWhileItFeeds) {
+TEST(PipedProcess, readsErrorsWhileItWrites) {
     std::string const much(std::size_t(2) * 1024 * 1024, 'x');
 
     auto const result = runWithInput({"sh", "-c", "cat >&2; echo done"}, much);
@@ -31,7 +31,7 @@ TEST(PipedProcess, readsErrorsWhileItFeeds) {
     EXPECT_EQ(result.output, "done\n");
 }
 
-TEST(PipedProcess, doesNotMindAProgramThatReadsNothing) {
+TEST(PipedProcess, acceptsAProgramThatReadsNothing) {
     std::signal(SIGPIPE, SIG_IGN); // as the tool has it
     std::string const much(std::size_t(2) * 1024 * 1024, 'x');
 
@@ -42,13 +42,13 @@ TEST(PipedProcess, passesArgumentsWithoutAShell) {
     EXPECT_EQ(runWithInput({"printf", "%s|", "a b", "$HOME", "'"}, "").output, "a b|$HOME|'|");
 }
 
-TEST(PipedProcess, givesTheChildTheSignalsThatProgramsExpect) {
+TEST(PipedProcess, startsTheChildWithDefaultSignalHandling) {
     std::signal(SIGPIPE, SIG_IGN);
 
     EXPECT_EQ(runWithInput({"sh", "-c", "kill -PIPE $$; echo survived"}, "").exitCode, -1);
 }
 
-TEST(PipedProcess, saysThatAProgramIsMissing) {
+TEST(PipedProcess, reportsAMissingProgram) {
     try {
         runWithInput({"/nonexistent/program"}, "");
         FAIL() << "nothing was thrown";

@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -25,19 +25,19 @@ TEST_F(ProjectTextCommand, showsAnEmptyLineForADescriptionThatWasNeverSet) {
     EXPECT_THAT(tool({"description"}), Prints("\n"));
 }
 
-TEST_F(ProjectTextCommand, takesAnEmptyText) {
+TEST_F(ProjectTextCommand, acceptsAnEmptyText) {
     EXPECT_THAT(tool({"name", ""}), SucceedsSilently());
 
     EXPECT_THAT(tool({"name"}), Prints("\n"));
 }
 
-TEST_F(ProjectTextCommand, keepsBytesThatAreNoUtf8) {
+TEST_F(ProjectTextCommand, preservesBytesThatAreNotUtf8) {
     EXPECT_THAT(tool({"name", "caf\xE9 \xD7\xA9\xD7\x9C\xD7\x95\xD7\x9D"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"name"}), Prints("caf\xE9 \xD7\xA9\xD7\x9C\xD7\x95\xD7\x9D\n"));
 }
 
-TEST_F(ProjectTextCommand, doesNotLetATextSteerTheTerminal) {
+TEST_F(ProjectTextCommand, doesNotLetATextControlTheTerminal) {
     ASSERT_THAT(tool({"description", "red \x1B[31m\nline"}), SucceedsSilently());
     settings_.onTerminal = true;
 

@@ -1,13 +1,13 @@
 #include "git/GitIgnore.hpp"
 
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
 
 using ::testing::ElementsAre;
 
-/// A project in the root of a repository of git.
+/// A project in the root of a git repository.
 class GitIgnore : public ToolTest {
 protected:
     GitIgnore() {
@@ -27,7 +27,7 @@ protected:
     }
 };
 
-TEST_F(GitIgnore, leavesOutWhatGitIgnores) {
+TEST_F(GitIgnore, leavesOutIgnoredFiles) {
     folder_.file(u".gitignore", "*.o\n/build/\n");
     folder_.file(u"src/main.cpp");
     folder_.file(u"src/main.o");
@@ -39,7 +39,7 @@ TEST_F(GitIgnore, leavesOutWhatGitIgnores) {
     EXPECT_THAT(list(), ElementsAre(".gitignore", "src", "src/build", "src/build/kept.cpp", "src/main.cpp"));
 }
 
-TEST_F(GitIgnore, takesWhatGitTracksThoughAPatternMatches) {
+TEST_F(GitIgnore, keepsTrackedFilesThatMatchAPattern) {
     folder_.file(u".gitignore", "*.o\nbuild\n");
     folder_.file(u"tracked.o");
     folder_.file(u"build/tracked");
@@ -74,7 +74,7 @@ TEST_F(GitIgnore, worksForAProjectDeepInARepository) {
     EXPECT_THAT(toolFrom("project", {"list"}), Prints("main.cpp\ntracked.o\n"));
 }
 
-TEST_F(GitIgnore, passesStrangeNamesToGitUnharmed) {
+TEST_F(GitIgnore, passesUnusualNamesToGitUnchanged) {
     folder_.addFile(".gitignore", "*.o\n");
     for (auto const* name :
          {"a\nb", ":(top)c", "d\xFF", "!e", "*.o.kept", "space at end ", "f\nb.o", ":!g.o", "h\xFF.o"}) {
@@ -87,7 +87,7 @@ TEST_F(GitIgnore, passesStrangeNamesToGitUnharmed) {
                                                         "d\xFF", "space at end "})));
 }
 
-TEST_F(GitIgnore, takesRepositoriesInsideTheRepository) {
+TEST_F(GitIgnore, keepsRepositoriesInsideTheRepository) {
     folder_.file(u".gitignore", "*.o\n");
     folder_.file(u"inner/main.cpp");
     folder_.file(u"inner/main.o");
@@ -98,7 +98,7 @@ TEST_F(GitIgnore, takesRepositoriesInsideTheRepository) {
     EXPECT_THAT(list(), ElementsAre(".gitignore", "inner", "inner/main.cpp"));
 }
 
-TEST_F(GitIgnore, doesNotMindAFolderThatCannotBeReadWhenGitIgnoresIt) {
+TEST_F(GitIgnore, acceptsAnUnreadableFolderThatGitIgnores) {
     folder_.file(u".gitignore", "/closed/\n");
     folder_.file(u"closed/file");
     std::filesystem::permissions(inFolder("closed"), std::filesystem::perms::none);
@@ -124,25 +124,25 @@ TEST_F(GitIgnore, isRefusedWithoutRecursive) {
     EXPECT_THAT(tool({"add", "--gitignore", "."}), FailsWith(2, "--gitignore requires --recursive"));
 }
 
-TEST_F(GitIgnore, saysThatThereIsNoRepository) {
+TEST_F(GitIgnore, reportsThatThereIsNoRepository) {
     folder_.file(u"file");
     folder_.remove(u".git");
     settings_.environment["GIT_CEILING_DIRECTORIES"] = folder_.onDisk().parent_path();
 
     EXPECT_THAT(tool({"add", "-r", "--gitignore", "."}),
-                FailsWith(1, "git cannot tell what it ignores: fatal: not a git repository"));
+                FailsWith(1, "git cannot list ignored files: fatal: not a git repository"));
 
     EXPECT_THAT(list(), ElementsAre());
 }
 
-TEST_F(GitIgnore, saysThatGitIsMissing) {
+TEST_F(GitIgnore, reportsThatGitIsNotInstalled) {
     folder_.file(u"file");
     settings_.environment["PATH"] = "/nonexistent";
 
     EXPECT_THAT(tool({"add", "-r", "--gitignore", "."}), FailsWith(1, "git, which is not installed"));
 }
 
-TEST_F(GitIgnore, takesAHundredThousandPathsAtOnce) {
+TEST_F(GitIgnore, acceptsAHundredThousandPathsAtOnce) {
     folder_.file(u".gitignore", "*.o\n");
     std::vector<fl::filesystem::Path> paths; // git does not ask the disk for them
     for (int number = 0; number < 100'000; ++number) {

@@ -2,12 +2,12 @@
 #include <filesystem>
 #include <fstream>
 
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
 
-/// A project with two files, and a person who watches it.
+/// A project with two files, and a `watch` of it.
 class WatchCommand : public ToolTest {
 protected:
     void SetUp() override {
@@ -18,7 +18,7 @@ protected:
         ASSERT_EQ(tool({"category", "create", "Status"}).exitCode, 0);
     }
 
-    /// A watch that has begun.
+    /// A `watch` that is running.
     std::unique_ptr<RunningProgram> watch(std::vector<std::string> options = {}) const {
         options.insert(options.begin(), "watch");
         auto watching = std::make_unique<RunningProgram>(commandFor(std::move(options)), settings_);
@@ -26,7 +26,7 @@ protected:
         return watching;
     }
 
-    /// The line that somebody else's command makes a watch write.
+    /// The line that a `watch` prints for another command.
     std::string told(RunningProgram& watching, std::vector<std::string> command) const {
         auto const result = tool(std::move(command));
         EXPECT_EQ(result.exitCode, 0) << result.errors;
@@ -39,7 +39,7 @@ protected:
     }
 };
 
-TEST_F(WatchCommand, tellsEachEventInALine) {
+TEST_F(WatchCommand, printsEachEventInALine) {
     auto const watching = watch();
 
     EXPECT_EQ(told(*watching, {"add", "valve.cpp"}), "fileListUpdate\tvalve.cpp");
@@ -55,7 +55,7 @@ TEST_F(WatchCommand, tellsEachEventInALine) {
     EXPECT_EQ(interrupt(*watching).signal, SIGINT);
 }
 
-TEST_F(WatchCommand, tellsEachEventAsAnObjectOfJson) {
+TEST_F(WatchCommand, printsEachEventAsAJsonObject) {
     auto const watching = watch({"--json"});
 
     EXPECT_EQ(told(*watching, {"add", "valve.cpp"}),
@@ -76,14 +76,14 @@ TEST_F(WatchCommand, keepsANameWithALineFeedInOneLine) {
     EXPECT_EQ(told(*watching, {"add", "two\nlines"}), "fileListUpdate\t\"two\\nlines\"");
 }
 
-TEST_F(WatchCommand, tellsWhatAnEditorChanges) {
+TEST_F(WatchCommand, reportsTheChangesOfAnEditor) {
     auto const watching = watch();
     insertLineBefore("\"src/pump.cpp\"", "\"src/a.cpp\"");
 
     EXPECT_EQ(watching->readLine(), "fileListUpdate\tsrc/a.cpp");
 }
 
-TEST_F(WatchCommand, goesOnWhenTheTextCannotBeReadForAWhile) {
+TEST_F(WatchCommand, continuesAfterATextThatCouldNotBeRead) {
     auto const watching = watch();
     auto const good = readText();
     std::filesystem::rename(text(), folder_.onDisk() / "aside");
@@ -95,7 +95,7 @@ TEST_F(WatchCommand, goesOnWhenTheTextCannotBeReadForAWhile) {
     EXPECT_EQ(interrupt(*watching).errors, "");
 }
 
-TEST_F(WatchCommand, endsWithoutAWordWhenNobodyReadsItAnyMore) {
+TEST_F(WatchCommand, endsWithoutAMessageWhenItsOutputIsClosed) {
     auto const watching = watch();
     ASSERT_EQ(tool({"name", "Engine"}).exitCode, 0);
     watching->readAndClose(1);
@@ -107,7 +107,7 @@ TEST_F(WatchCommand, endsWithoutAWordWhenNobodyReadsItAnyMore) {
     EXPECT_EQ(result.errors, "");
 }
 
-TEST_F(WatchCommand, isAnErrorOutsideAnyProject) {
+TEST_F(WatchCommand, failsOutsideAProject) {
     std::filesystem::remove_all(folder_.onDisk() / ".projectdata");
 
     EXPECT_THAT(tool({"watch"}), FailsWith(1, "project"));

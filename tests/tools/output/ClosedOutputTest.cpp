@@ -1,11 +1,11 @@
 #include <csignal>
 
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
 
-/// The reader of a list goes away before its end, as head does.
+/// The reader of a list closes it before its end, as `head` does.
 class ClosedOutput : public ToolTest {
 protected:
     void SetUp() override {
@@ -18,25 +18,25 @@ protected:
     }
 };
 
-TEST_F(ClosedOutput, endsTheListWithoutAWord) {
+TEST_F(ClosedOutput, endsTheListWithoutAMessage) {
     for (auto const* form : {"--null", "--json", "--tree"}) {
         RunningProgram listing(commandFor({"list", form}), settings_);
         EXPECT_NE(listing.readAndClose(1), "");
 
         auto const result = listing.finish();
 
-        EXPECT_EQ(result.signal, SIGPIPE); // as any program ends whose reader has gone
+        EXPECT_EQ(result.signal, SIGPIPE); // like any program whose output was closed
         EXPECT_EQ(result.errors, "");
     }
 }
 
-TEST_F(ClosedOutput, isNoErrorToAShell) {
+TEST_F(ClosedOutput, isNotAnErrorForAShell) {
     RunningProgram shell({"sh", "-c", PROJECTCTL " list | head -n 1"}, settings_);
 
     EXPECT_THAT(shell.finish(), Prints("folder\n"));
 }
 
-TEST_F(ClosedOutput, endsTheSameWayWhereOurCallerIgnoresTheSignal) {
+TEST_F(ClosedOutput, endsTheSameWayWhereTheCallerIgnoresTheSignal) {
     RunningProgram shell({"bash", "-c", "trap '' PIPE; " PROJECTCTL " list | true; exit ${PIPESTATUS[0]}"},
                          settings_);
 

@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -11,17 +11,17 @@ protected:
     static constexpr auto german = "ist nicht im Projekt";
 };
 
-TEST_F(Language, isEnglishWithoutAWord) {
+TEST_F(Language, isEnglishByDefault) {
     EXPECT_THAT(tool({"list", "missing"}), FailsWith(1, english));
 }
 
-TEST_F(Language, isThatOfTheEnvironment) {
+TEST_F(Language, isReadFromTheEnvironment) {
     settings_.environment["LANG"] = "de_DE.UTF-8";
 
     EXPECT_THAT(tool({"list", "missing"}), FailsWith(1, german));
 }
 
-TEST_F(Language, obeysTheStrongerVariable) {
+TEST_F(Language, isReadFromTheVariableWithPrecedence) {
     settings_.environment["LANG"] = "en_GB.UTF-8";
     settings_.environment["LC_MESSAGES"] = "de";
     EXPECT_THAT(tool({"list", "missing"}), FailsWith(1, german));
@@ -30,14 +30,14 @@ TEST_F(Language, obeysTheStrongerVariable) {
     EXPECT_THAT(tool({"list", "missing"}), FailsWith(1, english));
 }
 
-TEST_F(Language, takesAnEmptyVariableForNone) {
+TEST_F(Language, ignoresAnEmptyVariable) {
     settings_.environment["LC_ALL"] = "";
     settings_.environment["LANG"] = "de_AT@euro";
 
     EXPECT_THAT(tool({"list", "missing"}), FailsWith(1, german));
 }
 
-TEST_F(Language, isEnglishForOneThatNobodyTranslated) {
+TEST_F(Language, isEnglishWhereThereIsNoTranslation) {
     settings_.environment["LANG"] = "eo.UTF-8";
 
     EXPECT_THAT(tool({"list", "missing"}), FailsWith(1, english));

@@ -1,5 +1,5 @@
-#include "ToolTest.hpp"
 #include "support/GitFolder.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -40,7 +40,7 @@ TEST_F(InRepository, addStagesTheFilesAndTheirEntries) {
     EXPECT_EQ(staged(), readText());
 }
 
-TEST_F(InRepository, removeTakesTheFilesOutOfTheIndexAndLeavesThemOnDisk) {
+TEST_F(InRepository, removeDeletesTheFilesFromTheIndexAndNotFromTheDisk) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
     git_.commitAll();
@@ -51,7 +51,7 @@ TEST_F(InRepository, removeTakesTheFilesOutOfTheIndexAndLeavesThemOnDisk) {
     EXPECT_EQ(staged(), readText());
 }
 
-TEST_F(InRepository, addBringsBackWhatWasRemovedAndNotYetCommitted) {
+TEST_F(InRepository, addStagesFilesAgainWhoseRemovalIsNotCommitted) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
     git_.commitAll();
@@ -74,7 +74,7 @@ TEST_F(InRepository, addStagesAgainAFileThatIsInTheProjectAndWasRemovedFromTheIn
     EXPECT_EQ(status(), "");
 }
 
-TEST_F(InRepository, removeNamesWhatGitTrackedAndTheProjectNeverHad) {
+TEST_F(InRepository, removeNamesTrackedFilesThatWereNeverInTheProject) {
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
     ASSERT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
     git_.commitAll();
@@ -136,7 +136,7 @@ TEST_F(InRepository, queriesStageNothing) {
     EXPECT_EQ(status(), before);
 }
 
-TEST_F(InRepository, leavesGitAloneWhenToldSo) {
+TEST_F(InRepository, doesNotUseGitWithTheOption) {
     ASSERT_THAT(tool({"init", "--no-source-control"}), SucceedsSilently());
     ASSERT_THAT(tool({"--no-source-control", "add", "-r", "."}), SucceedsSilently());
     EXPECT_THAT(status(), ::testing::Not(HasSubstr("A ")));
@@ -152,14 +152,14 @@ TEST_F(InRepository, changesNothingWhenTheIndexIsLocked) {
     auto const before = readText();
     folder_.addFile(".git/index.lock");
 
-    EXPECT_THAT(tool({"add", "src/main.cpp"}), FailsWith(1, inFolder(".git/index.lock")));
+    EXPECT_THAT(tool({"add", "src/main.cpp"}), FailsWith(4, inFolder(".git/index.lock")));
 
     EXPECT_EQ(readText(), before);
     std::filesystem::remove(inFolder(".git/index.lock"));
     EXPECT_THAT(tool({"add", "src/main.cpp"}), SucceedsSilently());
 }
 
-TEST_F(InRepository, doesNotAddWhatGitIgnoresToItsIndex) {
+TEST_F(InRepository, doesNotStageIgnoredFiles) {
     folder_.file(u".gitignore", "*.cpp\n");
     ASSERT_THAT(tool({"init"}), SucceedsSilently());
 
@@ -169,7 +169,7 @@ TEST_F(InRepository, doesNotAddWhatGitIgnoresToItsIndex) {
     EXPECT_EQ(status(), std::string(storeAdded) + "?? .gitignore\n");
 }
 
-TEST_F(InRepository, takesTheRepositoryThatTheEnvironmentNames) {
+TEST_F(InRepository, usesTheRepositoryThatTheEnvironmentNames) {
     std::filesystem::rename(inFolder(".git"), inFolder("elsewhere.git"));
     settings_.environment["GIT_DIR"] = inFolder("elsewhere.git");
     settings_.environment["GIT_WORK_TREE"] = folder_.onDisk().string();
@@ -179,7 +179,7 @@ TEST_F(InRepository, takesTheRepositoryThatTheEnvironmentNames) {
                 ::testing::Eq(storeAdded));
 }
 
-TEST_F(InRepository, passesOverAConfigurationOfTheUserThatCannotBeRead) {
+TEST_F(InRepository, ignoresAUserConfigurationThatCannotBeRead) {
     auto const unreadable = folder_.addFile("home/.gitconfig");
     std::filesystem::permissions(unreadable, std::filesystem::perms::none);
     settings_.environment["HOME"] = inFolder("home");

@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -34,20 +34,20 @@ TEST_F(CommandLine, needsACommand) {
     EXPECT_THAT(tool({}), FailsWith(2, "projectctl --help"));
 }
 
-TEST_F(CommandLine, refusesACommandThatItDoesNotKnow) {
+TEST_F(CommandLine, refusesAnUnknownCommand) {
     EXPECT_THAT(tool({"lsit"}), FailsWith(2, "\"lsit\""));
 }
 
-TEST_F(CommandLine, refusesAnOptionThatItDoesNotKnow) {
+TEST_F(CommandLine, refusesAnUnknownOption) {
     EXPECT_THAT(tool({"list", "--long"}), FailsWith(2, "--long"));
     EXPECT_THAT(tool({"--long"}), FailsWith(2, "--long"));
 }
 
-TEST_F(CommandLine, refusesAWrongUseAlsoWhereThereIsNoProject) {
+TEST_F(CommandLine, refusesAWrongUseAlsoOutsideAProject) {
     EXPECT_THAT(tool({"list", "a", "b"}), FailsWith(2, "projectctl list --help"));
 }
 
-TEST_F(CommandLine, takesNamesThatLookLikeSomethingElse) {
+TEST_F(CommandLine, acceptsNamesThatLookLikeOptionsOrLists) {
     initProject();
     std::vector<std::string> const names{"++",   "[]", "[a,b]", "[c",  "add",
                                          "list", "{}", "%%",    "a=b", "\x01[d]"};
@@ -62,7 +62,7 @@ TEST_F(CommandLine, takesNamesThatLookLikeSomethingElse) {
     EXPECT_THAT(list(), ElementsAre("\x01[d]", "%%", "++", "[]", "[a,b]", "[c", "a=b", "add", "list", "{}"));
 }
 
-TEST_F(CommandLine, takesNamesThatBeginWithADashBehindTwoDashes) {
+TEST_F(CommandLine, acceptsNamesThatBeginWithADashAfterTwoDashes) {
     initProject();
     for (auto const* name : {"-r", "--", "--help", "-", "plain", "\x01-x"}) {
         folder_.addFile(name);
@@ -73,7 +73,7 @@ TEST_F(CommandLine, takesNamesThatBeginWithADashBehindTwoDashes) {
     EXPECT_THAT(list(), ElementsAre("\x01-x", "-", "--", "--help", "-r", "plain"));
 }
 
-TEST_F(CommandLine, takesTextsThatLookLikeSomethingElse) {
+TEST_F(CommandLine, acceptsTextsThatLookLikeOptionsOrLists) {
     initProject();
     for (auto const* name : {"[a,b]", "{}", "++", "add", "%%"}) {
         EXPECT_THAT(tool({"name", name}), SucceedsSilently());
@@ -81,14 +81,14 @@ TEST_F(CommandLine, takesTextsThatLookLikeSomethingElse) {
     }
 }
 
-TEST_F(CommandLine, tellsOfAnErrorInOneLineWhateverTheNameHolds) {
+TEST_F(CommandLine, reportsAnErrorInOneLineWhateverTheNameContains) {
     initProject();
 
     EXPECT_THAT(tool({"add", "two\nlines\x1B[31m"}), FailsWith(1, "two\\nlines\\033[31m"));
     EXPECT_THAT(tool({"list", "--two\nlines"}), FailsWith(2, "--two\\nlines"));
 }
 
-TEST_F(CommandLine, saysThatItsOutputCannotBeWritten) {
+TEST_F(CommandLine, reportsAnOutputThatCannotBeWritten) {
     initProject();
     RunningProgram shell({"sh", "-c", PROJECTCTL " name >/dev/full"}, settings_);
 

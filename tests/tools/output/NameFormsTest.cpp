@@ -25,14 +25,14 @@ std::string json(std::u16string_view text) {
     return result;
 }
 
-TEST(NameForms, givesTheBytesThatANameHasOnDisk) {
+TEST(NameForms, returnsTheBytesOfANameOnDisk) {
     for (std::string const name :
          {"plain", "caf\xE9", "\xD7\xA9", "\xF0\x9F\x98\x80", "\x80\xBF\xC0\xFF", ""}) {
         EXPECT_EQ(bytesOf(fl::filesystem::fromSystem(name).native()), name);
     }
 }
 
-TEST(NameForms, appendsToWhatIsThere) {
+TEST(NameForms, appendsToExistingText) {
     std::string text = "before ";
     appendBytes(text, u"caf\u00E9");
     appendBytes(text, u" after");
@@ -40,11 +40,11 @@ TEST(NameForms, appendsToWhatIsThere) {
     EXPECT_EQ(text, "before caf\xC3\xA9 after");
 }
 
-TEST(NameForms, showsTextThatNoFileCanHaveWithAReplacement) {
+TEST(NameForms, showsTextThatCannotBeAFileNameWithReplacementCharacters) {
     EXPECT_EQ(bytesOf(std::u16string{u'a', char16_t(0xD800)}), "a\xEF\xBF\xBD");
 }
 
-TEST(NameForms, quotesOnlyWhatCouldBeMistaken) {
+TEST(NameForms, quotesOnlyAmbiguousNames) {
     EXPECT_EQ(quoted("a b'c"), "a b'c");
     EXPECT_EQ(quoted("\xD7\xA9 \xE2\x82\xAC \xF0\x9F\x98\x80"), "\xD7\xA9 \xE2\x82\xAC \xF0\x9F\x98\x80");
     EXPECT_EQ(quoted("a\"b"), "\"a\\\"b\"");
@@ -53,7 +53,7 @@ TEST(NameForms, quotesOnlyWhatCouldBeMistaken) {
     EXPECT_EQ(quoted("\xC2\x9B[31m"), "\"\\302\\233[31m\"");
 }
 
-TEST(NameForms, quotesEachByteThatIsNoUtf8) {
+TEST(NameForms, quotesEachByteThatIsNotUtf8) {
     EXPECT_EQ(quoted("\x80"), "\"\\200\"");
     EXPECT_EQ(quoted("\xC0\xAF"), "\"\\300\\257\"");                   // longer than need be
     EXPECT_EQ(quoted("\xE0\x80\xAF"), "\"\\340\\200\\257\"");          // likewise
@@ -63,7 +63,7 @@ TEST(NameForms, quotesEachByteThatIsNoUtf8) {
     EXPECT_EQ(quoted("\xE2\x82\xAC\xFF"), "\"\xE2\x82\xAC\\377\"");
 }
 
-TEST(NameForms, makesJsonStringsOfAnyCodeUnits) {
+TEST(NameForms, writesAnyCodeUnitsAsJsonStrings) {
     EXPECT_EQ(json(u"a\"b\\c/d"), "\"a\\\"b\\\\c/d\"");
     EXPECT_EQ(json(u"\n\t\u0001\u007F\u0085"), "\"\\n\\t\\u0001\\u007f\\u0085\"");
     EXPECT_EQ(json(u"\u00E9\u20AC\U0001F600"), "\"\xC3\xA9\xE2\x82\xAC\xF0\x9F\x98\x80\"");

@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -61,7 +61,7 @@ TEST_F(CheckCommand, namesAFileThatIsNotTheStores) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output), ElementsAre(tells("displaced-0123456789abcdef.jsonl")));
 }
 
@@ -72,7 +72,7 @@ TEST_F(CheckCommand, namesEveryFaultOfTheTextWithItsLine) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_EQ(result.errors, "");
     auto const file = text().string();
     EXPECT_THAT(linesOf(result.output),
@@ -86,7 +86,7 @@ TEST_F(CheckCommand, namesConflictMarkers) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(result.output, StartsWith(text().string() + ":3: "));
 }
 
@@ -101,7 +101,7 @@ TEST_F(CheckCommand, findsEveryAddressWithoutANode) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output),
                 UnorderedElementsAre(tells("category \"c1\""), tells("label \"l1\""), tells("group \"g1\""),
                                      tells("entry point \"e1\""), tells("reference \"p1\""),
@@ -123,7 +123,7 @@ TEST_F(CheckCommand, findsTextsThatNoManagerUnderstands) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output),
                 UnorderedElementsAre(tells("label \"lWritable\""), tells("label \"l1\""),
                                      tells("entry point \"ebatch\""), tells("entry point \"e\""),
@@ -135,7 +135,7 @@ TEST_F(CheckCommand, findsFilesWhoseFolderIsNotInTheProject) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output), ElementsAre(tells("\"lost/deep/file\"")));
 }
 
@@ -144,7 +144,7 @@ TEST_F(CheckCommand, findsThemInOtherScopesToo) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output), ElementsAre(tells("\"lost/file\"")));
 }
 
@@ -156,7 +156,7 @@ TEST_F(CheckCommand, findsNamesThatNoFileCanHave) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output),
                 UnorderedElementsAre(tells("\"\\000\""), tells("\"..\""), tells("\"a/b\"")));
 }
@@ -174,7 +174,7 @@ TEST_F(CheckCommand, findsLabelsOnFilesThatDoNotExist) {
 
     auto const result = tool({"check"});
 
-    EXPECT_EQ(result.exitCode, 1);
+    EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output), ElementsAre(AllOf(tells("\"c2\""), HasSubstr("\"unknown\"")),
                                                     AllOf(tells("\"c3\""), HasSubstr("\"gone\""))));
 }
@@ -223,7 +223,7 @@ TEST_F(CheckCommand, repairsNothingInASoundProject) {
 TEST_F(CheckCommand, leavesConflictsToAPerson) {
     insertLineBefore("\"b\"", "<<<<<<< ours");
 
-    EXPECT_THAT(tool({"check", "--repair"}), FailsWith(1, text().string() + ":3: "));
+    EXPECT_THAT(tool({"check", "--repair"}), FailsWith(6, text().string() + ":3: "));
 }
 
 } // namespace

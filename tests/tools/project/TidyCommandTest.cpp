@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -13,7 +13,7 @@ protected:
     }
 };
 
-TEST_F(TidyCommand, bringsTheTextIntoItsCanonicalForm) {
+TEST_F(TidyCommand, rewritesTheTextInItsCanonicalForm) {
     auto const tidy = readText();
     auto untidy = tidy;
     untidy.replace(untidy.find("\"a\"\n\"b\"\n"), 8, "\"b\"\n\n \"a\"\r\n\"a\"\n");
@@ -24,7 +24,7 @@ TEST_F(TidyCommand, bringsTheTextIntoItsCanonicalForm) {
     EXPECT_EQ(readText(), tidy);
 }
 
-TEST_F(TidyCommand, leavesATidyTextAlone) {
+TEST_F(TidyCommand, doesNotChangeATidyText) {
     auto const before = std::filesystem::last_write_time(text());
 
     EXPECT_THAT(tool({"tidy"}), SucceedsSilently());
@@ -32,19 +32,19 @@ TEST_F(TidyCommand, leavesATidyTextAlone) {
     EXPECT_EQ(std::filesystem::last_write_time(text()), before);
 }
 
-TEST_F(TidyCommand, tellsOnATerminalWhatItDid) {
+TEST_F(TidyCommand, reportsOnATerminal) {
     settings_.onTerminal = true;
-    EXPECT_EQ(tool({"tidy"}).output, "The project's text is tidy.\r\n");
+    EXPECT_EQ(tool({"tidy"}).output, "The project's text is already tidy.\r\n");
 
     writeText(readText() + "\"torn");
 
-    EXPECT_EQ(tool({"tidy"}).output, "The project's text is tidy now.\r\n");
+    EXPECT_EQ(tool({"tidy"}).output, "The project's text was tidied.\r\n");
 }
 
 TEST_F(TidyCommand, refusesADamagedText) {
     insertLineBefore("\"b\"", "{\"file\":");
 
-    EXPECT_THAT(tool({"tidy"}), FailsWith(1, text().string() + ":3: "));
+    EXPECT_THAT(tool({"tidy"}), FailsWith(5, text().string() + ":3: "));
 }
 
 } // namespace

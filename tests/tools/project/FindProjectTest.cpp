@@ -1,11 +1,11 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
 
 class FindProject : public ToolTest {};
 
-TEST_F(FindProject, goesUpToTheNearestProject) {
+TEST_F(FindProject, findsTheNearestProjectUpwards) {
     ASSERT_THAT(tool({"init", "--name", "outer"}), SucceedsSilently());
     folder_.folder(u"inner/deep/deeper");
     ASSERT_THAT(tool({"init", "inner", "--name", "inner"}), SucceedsSilently());
@@ -14,7 +14,7 @@ TEST_F(FindProject, goesUpToTheNearestProject) {
     EXPECT_THAT(tool({"name"}), Prints("outer\n"));
 }
 
-TEST_F(FindProject, findsItThroughALink) {
+TEST_F(FindProject, findsTheProjectThroughALink) {
     ASSERT_THAT(tool({"init", "--name", "mine"}), SucceedsSilently());
     folder_.folder(u"real/deep");
     folder_.file(u"real/deep/file");
@@ -28,26 +28,26 @@ TEST_F(FindProject, findsItThroughALink) {
     EXPECT_THAT(tool({"list", "--full-name"}), Prints("real\nreal/deep\nreal/deep/file\n"));
 }
 
-TEST_F(FindProject, saysThatThereIsNone) {
+TEST_F(FindProject, reportsThatThereIsNone) {
     for (auto const* command : {"list", "status", "check", "tidy", "name", "description"}) {
         EXPECT_THAT(tool({command}), FailsWith(1, "no project in \"" + folder_.onDisk().string() + '"'));
     }
 }
 
-TEST_F(FindProject, passesByAnEmptyStoreFolder) {
+TEST_F(FindProject, skipsAnEmptyStoreFolder) {
     ASSERT_THAT(tool({"init", "--name", "outer"}), SucceedsSilently());
     folder_.folder(u"inner/.projectdata");
 
     EXPECT_THAT(toolFrom("inner", {"name"}), Prints("outer\n"));
 }
 
-TEST_F(FindProject, doesNotPassByAProjectWhoseTextIsGone) {
+TEST_F(FindProject, doesNotSkipAProjectWhoseTextIsMissing) {
     ASSERT_THAT(tool({"init", "--name", "outer"}), SucceedsSilently());
     folder_.folder(u"inner/deep");
     ASSERT_THAT(tool({"init", "inner"}), SucceedsSilently());
     std::filesystem::remove(inFolder("inner/.projectdata/project.jsonl"));
 
-    EXPECT_THAT(toolFrom("inner/deep", {"name"}), FailsWith(1, inFolder("inner/.projectdata/project.jsonl") +
+    EXPECT_THAT(toolFrom("inner/deep", {"name"}), FailsWith(5, inFolder("inner/.projectdata/project.jsonl") +
                                                                    ": the project's text is missing"));
 }
 
@@ -58,10 +58,10 @@ TEST_F(FindProject, doesNotFollowALinkInPlaceOfTheStoreFolder) {
     settings_.folder = folder_.onDisk();
     folder_.addLink(".projectdata", elsewhere.onDisk() / ".projectdata");
 
-    EXPECT_THAT(tool({"name"}), FailsWith(1, inFolder(".projectdata")));
+    EXPECT_THAT(tool({"name"}), FailsWith(5, inFolder(".projectdata")));
 }
 
-TEST_F(FindProject, saysThatTheWorkingFolderHasGone) {
+TEST_F(FindProject, reportsAWorkingFolderThatWasDeleted) {
     folder_.folder(u"going");
     RunningProgram shell({"sh", "-c", "cd going && rmdir ../going && exec " PROJECTCTL " list"}, settings_);
 

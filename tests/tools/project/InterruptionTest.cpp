@@ -1,6 +1,6 @@
 #include <csignal>
 
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {

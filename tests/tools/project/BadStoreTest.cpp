@@ -1,4 +1,4 @@
-#include "ToolTest.hpp"
+#include "tools/ToolTest.hpp"
 
 namespace project::test {
 namespace {
@@ -8,7 +8,7 @@ using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 using ::testing::Not;
 
-/// A project whose text something happened to.
+/// A project whose text is damaged, or cannot be read or written.
 class BadStore : public ToolTest {
 protected:
     void SetUp() override {
@@ -37,10 +37,10 @@ TEST_F(BadStore, ofALaterFormatIsNotRead) {
     }
 }
 
-TEST_F(BadStore, thatIsNoProjectsTextIsNotRead) {
+TEST_F(BadStore, withAnotherFirstLineIsNotRead) {
     writeText("hello\n");
 
-    EXPECT_THAT(tool({"list"}), FailsWith(1, text().string()));
+    EXPECT_THAT(tool({"list"}), FailsWith(5, text().string()));
 }
 
 TEST_F(BadStore, withADamagedLineIsListedAndNotWritten) {
@@ -48,7 +48,7 @@ TEST_F(BadStore, withADamagedLineIsListedAndNotWritten) {
 
     expectListedWithWarning("3: ");
     auto const before = readText();
-    EXPECT_THAT(tool({"add", "c"}), FailsWith(1, text().string() + ":3: "));
+    EXPECT_THAT(tool({"add", "c"}), FailsWith(5, text().string() + ":3: "));
     EXPECT_EQ(readText(), before);
     EXPECT_THAT(tool({"status"}).output, HasSubstr("new  c\n"));
 }
@@ -72,11 +72,11 @@ TEST_F(BadStore, withConflictMarkersIsListedAndNotWritten) {
     EXPECT_EQ(listed.output, "a\nb\nc\n"); // both sides count
     EXPECT_THAT(linesOf(listed.errors), ElementsAre(HasSubstr(text().string() + ":3: ")));
     folder_.file(u"d");
-    EXPECT_THAT(tool({"add", "d"}), FailsWith(1, text().string() + ":3: "));
+    EXPECT_THAT(tool({"add", "d"}), FailsWith(6, text().string() + ":3: "));
     EXPECT_EQ(readText(), content);
 }
 
-/// The project lies in a folder of a repository, and its text lists what lies beside it.
+/// A project in a folder of a repository, with a text that lists files beside that folder.
 class StoreThatLeadsOutside : public BadStore {
 protected:
     void SetUp() override {
@@ -110,19 +110,19 @@ protected:
     }
 };
 
-TEST_F(StoreThatLeadsOutside, asksTheDiskForNothingThere) {
+TEST_F(StoreThatLeadsOutside, isNotFollowedOnDisk) {
     EXPECT_THAT(tool({"status"}).output, AllOf(HasSubstr("gone ../beside.txt\n"), HasSubstr("gone ..\n")));
 }
 
-TEST_F(StoreThatLeadsOutside, isToldOfByCheck) {
+TEST_F(StoreThatLeadsOutside, isReportedByCheck) {
     auto const checked = tool({"check"});
 
-    EXPECT_EQ(checked.exitCode, 1);
+    EXPECT_EQ(checked.exitCode, 3);
     EXPECT_THAT(checked.output, AllOf(HasSubstr("no file can have the name \"..\""),
                                       HasSubstr("no file can have the name \"../beside.txt\"")));
 }
 
-TEST_F(StoreThatLeadsOutside, takesNothingThereOutOfGitsIndex) {
+TEST_F(StoreThatLeadsOutside, doesNotUnstageFilesOutside) {
     for (auto const* path : {"../beside.txt", ".."}) {
         EXPECT_THAT(tool({"remove", path}), FailsWith(1, "outside the project's folder"));
     }
@@ -131,7 +131,7 @@ TEST_F(StoreThatLeadsOutside, takesNothingThereOutOfGitsIndex) {
     EXPECT_THAT(git({"status", "--porcelain", ".."}), Not(HasSubstr("beside.txt")));
 }
 
-TEST_F(BadStore, withATornTailHasLostNothing) {
+TEST_F(BadStore, withATornTailLosesNothing) {
     writeText(readText() + "\"half a ba");
 
     EXPECT_THAT(tool({"list"}), Prints("a\nb\n"));
@@ -140,13 +140,13 @@ TEST_F(BadStore, withATornTailHasLostNothing) {
     EXPECT_THAT(readText(), ::testing::Not(HasSubstr("half")));
 }
 
-TEST_F(BadStore, thatEndsTooEarlyIsNeverTakenForAnEmptyProject) {
+TEST_F(BadStore, thatIsIncompleteIsNeverReadAsAnEmptyProject) {
     auto const whole = readText();
     auto const half = whole.substr(0, whole.size() / 2);
 
     writeText(half);
     RunningProgram listing(commandFor({"list"}), settings_);
-    ASSERT_TRUE(listing.waitUntilItSleeps()); // it looks again and again for the rest
+    ASSERT_TRUE(listing.waitUntilItSleeps()); // it waits for the rest of the text
     writeText(whole);
     EXPECT_THAT(listing.finish(), Prints("a\nb\n"));
 
@@ -158,18 +158,18 @@ TEST_F(BadStore, thatEndsTooEarlyIsNeverTakenForAnEmptyProject) {
     EXPECT_THAT(tool({"list"}), Prints("a\nb\nc\n"));
 }
 
-TEST_F(BadStore, thatIsGoneIsAnError) {
+TEST_F(BadStore, withoutItsTextIsAnError) {
     std::filesystem::remove(text());
 
-    EXPECT_THAT(tool({"list"}), FailsWith(1, text().string() + ": the project's text is missing"));
+    EXPECT_THAT(tool({"list"}), FailsWith(5, text().string() + ": the project's text is missing"));
 }
 
-TEST_F(BadStore, inAFolderThatCannotBeWrittenIsReadAllTheSame) {
+TEST_F(BadStore, inAFolderThatCannotBeWrittenIsRead) {
     std::filesystem::permissions(inFolder(".projectdata"), std::filesystem::perms(0555));
     dropPrivileges();
 
     EXPECT_THAT(tool({"list"}), Prints("a\nb\n"));
-    EXPECT_THAT(tool({"add", "c"}), FailsWith(1, inFolder(".projectdata")));
+    EXPECT_THAT(tool({"add", "c"}), FailsWith(7, inFolder(".projectdata")));
     EXPECT_THAT(tool({"list"}), Prints("a\nb\n"));
 }
 
@@ -177,14 +177,14 @@ TEST_F(BadStore, thatCannotBeReadIsAnError) {
     std::filesystem::permissions(inFolder(".projectdata"), std::filesystem::perms::none);
     dropPrivileges();
 
-    EXPECT_THAT(tool({"list"}), FailsWith(1, inFolder(".projectdata")));
+    EXPECT_THAT(tool({"list"}), FailsWith(7, inFolder(".projectdata")));
 }
 
-TEST_F(BadStore, onAFullDiskIsAsItWasBefore) {
+TEST_F(BadStore, isUnchangedOnAFullDisk) {
     auto const before = readText();
     settings_.fileSize = before.size(); // the text cannot grow
 
-    EXPECT_THAT(tool({"add", "c"}), FailsWith(1, ".projectdata"));
+    EXPECT_THAT(tool({"add", "c"}), FailsWith(7, ".projectdata"));
 
     EXPECT_EQ(readText(), before);
     settings_.fileSize = RLIM_INFINITY;
@@ -192,7 +192,7 @@ TEST_F(BadStore, onAFullDiskIsAsItWasBefore) {
     EXPECT_THAT(tool({"add", "c"}), SucceedsSilently());
 }
 
-TEST_F(BadStore, thatIsAppendedToOnAFullDiskHasLostNothing) {
+TEST_F(BadStore, losesNothingInAnAppendOnAFullDisk) {
     std::string const longName(240, 'x');
     for (int number = 0; number < 1200; ++number) {
         folder_.addFile("folder/" + longName + std::to_string(number));
@@ -202,7 +202,7 @@ TEST_F(BadStore, thatIsAppendedToOnAFullDiskHasLostNothing) {
     ASSERT_GT(before.size(), 256U * 1024); // from there on batches are appended
     settings_.fileSize = before.size() + 10;
 
-    EXPECT_THAT(tool({"add", "c"}), FailsWith(1, ".projectdata"));
+    EXPECT_THAT(tool({"add", "c"}), FailsWith(7, ".projectdata"));
 
     settings_.fileSize = RLIM_INFINITY;
     EXPECT_EQ(list().size(), 1203U);
@@ -210,7 +210,7 @@ TEST_F(BadStore, thatIsAppendedToOnAFullDiskHasLostNothing) {
     EXPECT_EQ(list().size(), 1204U);
 }
 
-TEST_F(BadStore, thatSomebodyElseHoldsIsWaitedFor) {
+TEST_F(BadStore, thatAnotherProcessHasLockedIsWaitedFor) {
     RunningProgram holder({"flock", ".projectdata", "sh", "-c", "echo held; read line"}, [this] {
         auto settings = settings_;
         settings.inputStaysOpen = true;

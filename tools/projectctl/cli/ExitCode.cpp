@@ -1,0 +1,35 @@
+#include "cli/ExitCode.hpp"
+
+#include "project/git/GitError.hpp"
+#include "project/stores/StoreError.hpp"
+
+namespace projectctl {
+
+using project::git::GitError;
+using project::stores::StoreError;
+
+int exitCodeFor(std::exception const& error) {
+    auto const* const ofStore = dynamic_cast<StoreError const*>(&error);
+    if (ofStore == nullptr) {
+        auto const* const ofGit = dynamic_cast<GitError const*>(&error);
+        bool const isBusy = ofGit != nullptr && ofGit->kind() == GitError::Kind::Busy;
+        return isBusy ? exit_code::busy : exit_code::failed;
+    }
+    switch (ofStore->kind()) {
+    case StoreError::Kind::Refused:
+        return exit_code::failed;
+    case StoreError::Kind::Busy:
+        return exit_code::busy;
+    case StoreError::Kind::Damaged:
+        return exit_code::damaged;
+    case StoreError::Kind::Conflict:
+        return exit_code::conflict;
+    case StoreError::Kind::DiskFailed:
+        return exit_code::diskFailed;
+    case StoreError::Kind::OutcomeUnknown:
+        return exit_code::outcomeUnknown;
+    }
+    return exit_code::failed;
+}
+
+} // namespace projectctl
