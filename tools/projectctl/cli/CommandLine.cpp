@@ -98,7 +98,6 @@ int showHelp(CLI::App const& tool) {
 int runCommandLine(int argc, char const* const* argv, std::string const& version,
                    std::vector<std::unique_ptr<Command>> const& commands) {
     CLI::App tool("Manages the definition of an engineering project, stored beside its files.", "projectctl");
-    tool.footer(exitCodes);
     tool.require_subcommand(1);
     tool.set_version_flag("--version", version, "Show the version and exit");
     declareCommonOptions(tool);
@@ -107,6 +106,7 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     for (auto const& command : commands) {
         declared.push_back(command->declare(tool));
     }
+    tool.footer(exitCodes); // after the commands, which take over the footer that they find
     auto arguments = markedArguments(argc, argv);
     std::vector<std::string> folders;
     try {
