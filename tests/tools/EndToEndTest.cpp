@@ -266,7 +266,7 @@ protected:
         EXPECT_THAT(tool({"description"}), Prints("about " + name_ + "\n"));
         compareStatus();
         EXPECT_EQ(tool({"references", "--graph"}).exitCode,
-                  references_.empty() ? 0 : 1); // no projects in them
+                  references_.empty() ? 0 : 3); // no projects in them
     }
 
     void compareStatus() const {
@@ -337,7 +337,7 @@ TEST_F(EndToEnd, everyCommandAgreesWithTheModel) {
     }
 
     EXPECT_THAT(tool({"tidy"}), SucceedsSilently());
-    EXPECT_EQ(tool({"check", "--repair"}).exitCode, model_.hasFaults() ? 1 : 0);
+    EXPECT_EQ(tool({"check", "--repair"}).exitCode, model_.hasFaults() ? 3 : 0);
     compareEverything();
     EXPECT_GT(model_.files().size(), 20'000);
 }
