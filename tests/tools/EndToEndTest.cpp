@@ -65,7 +65,7 @@ protected:
         return result;
     }
 
-    // The changes. Each is made to the project and to the model.
+    // The changes. Each is applied to the project and to the model.
 
     void addNewFiles() {
         std::string input;

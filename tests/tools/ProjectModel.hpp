@@ -206,8 +206,8 @@ public:
     Lines differences() const {
         Lines result;
         for (auto const& [path, isFolder] : disk_) {
-            bool const standsForItself = parentOf(path).empty() || hasAnyBelow(parentOf(path));
-            if (!files_.contains(path) && standsForItself) {
+            bool const isShown = parentOf(path).empty() || hasAnyBelow(parentOf(path));
+            if (!files_.contains(path) && isShown) {
                 result.insert("new  " + path + (isFolder ? "/" : ""));
             }
         }

@@ -6,7 +6,7 @@ namespace {
 using ::testing::ElementsAre;
 using ::testing::HasSubstr;
 
-/// Names that come through every command as they are on disk.
+/// Names that every command preserves as they are on disk.
 class StrangeNames : public ToolTest {
 protected:
     void SetUp() override { initProject(); }
@@ -24,7 +24,7 @@ protected:
                                           "\xEF\xBF\xBD replacement"};
 };
 
-TEST_F(StrangeNames, comeThroughAddAndListUnharmed) {
+TEST_F(StrangeNames, arePreservedByAddAndList) {
     for (auto const& name : names_) {
         folder_.addFile(name);
     }
@@ -37,7 +37,7 @@ TEST_F(StrangeNames, comeThroughAddAndListUnharmed) {
     EXPECT_EQ(tool({"check"}).exitCode, 0);
 }
 
-TEST_F(StrangeNames, comeThroughAsArguments) {
+TEST_F(StrangeNames, arePreservedAsArguments) {
     auto command = names_;
     for (auto const& name : names_) {
         folder_.addFile(name);

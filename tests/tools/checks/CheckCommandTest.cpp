@@ -18,9 +18,9 @@ protected:
         ASSERT_THAT(tool({"add", "a", "b"}), SucceedsSilently());
     }
 
-    /// A line about something in the project that has no line of the text to point to.
-    auto tells(std::string const& what) const {
-        return AllOf(StartsWith(text().string() + ": "), HasSubstr(what));
+    /// A line with the name of the text, without the number of a line, and with this part.
+    auto reports(std::string const& part) const {
+        return AllOf(StartsWith(text().string() + ": "), HasSubstr(part));
     }
 
     static constexpr auto beforeTheName = R"({"at":["Info","ProjectData"])";
@@ -37,35 +37,35 @@ TEST_F(CheckCommand, saysSoOnATerminal) {
     EXPECT_EQ(tool({"check"}).output, "The project has no faults.\r\n");
 }
 
-TEST_F(CheckCommand, tellsOnATerminalWhatToDo) {
+TEST_F(CheckCommand, showsTheRemedyOnATerminal) {
     auto const lastLine = [this] { return linesOf(tool({"check"}).output).back(); };
     auto const sound = readText();
     settings_.onTerminal = true;
 
     writeText(sound + "\"torn");
-    EXPECT_EQ(lastLine(), "'projectctl tidy' puts right what is only irregular or torn.\r");
+    EXPECT_EQ(lastLine(), "'projectctl tidy' corrects irregular lines and torn tails.\r");
 
     insertLineBefore("\"b\"", "nonsense");
     EXPECT_EQ(lastLine(), "'projectctl check --repair' sets damaged lines aside.\r");
 
     insertLineBefore("\"b\"", "<<<<<<< ours");
-    EXPECT_EQ(lastLine(), "'projectctl resolve' settles what a merge left.\r");
+    EXPECT_EQ(lastLine(), "'projectctl resolve' resolves the conflicts.\r");
 
     writeText(sound);
     insertLineBefore(beforeTheName, "\"lost/file\"");
-    EXPECT_EQ(lastLine(), "What the lines say is to be put right in an editor.\r");
+    EXPECT_EQ(lastLine(), "Correct these lines in an editor.\r");
 }
 
-TEST_F(CheckCommand, namesAFileThatIsNotTheStores) {
+TEST_F(CheckCommand, reportsAFileThatDoesNotBelongToTheStore) {
     folder_.file(u".projectdata/displaced-0123456789abcdef.jsonl");
 
     auto const result = tool({"check"});
 
     EXPECT_EQ(result.exitCode, 3);
-    EXPECT_THAT(linesOf(result.output), ElementsAre(tells("displaced-0123456789abcdef.jsonl")));
+    EXPECT_THAT(linesOf(result.output), ElementsAre(reports("displaced-0123456789abcdef.jsonl")));
 }
 
-TEST_F(CheckCommand, namesEveryFaultOfTheTextWithItsLine) {
+TEST_F(CheckCommand, reportsEveryFaultOfTheTextWithItsLine) {
     insertLineBefore("\"b\"", "{\"file\":");
     insertLineBefore("\"b\"", "\"a\"");
     writeText(readText() + "\"torn");
@@ -79,7 +79,7 @@ TEST_F(CheckCommand, namesEveryFaultOfTheTextWithItsLine) {
                 ElementsAre(StartsWith(file + ":3: "), StartsWith(file + ":4: "), StartsWith(file + ":8: ")));
 }
 
-TEST_F(CheckCommand, namesConflictMarkers) {
+TEST_F(CheckCommand, reportsConflictMarkers) {
     auto content = readText();
     content.replace(content.find("\"b\"\n"), 4, "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
     writeText(content);
@@ -103,12 +103,12 @@ TEST_F(CheckCommand, findsEveryAddressWithoutANode) {
 
     EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output),
-                UnorderedElementsAre(tells("category \"c1\""), tells("label \"l1\""), tells("group \"g1\""),
-                                     tells("entry point \"e1\""), tells("reference \"p1\""),
-                                     tells("reference \"r1\"")));
+                UnorderedElementsAre(reports("category \"c1\""), reports("label \"l1\""),
+                                     reports("group \"g1\""), reports("entry point \"e1\""),
+                                     reports("reference \"p1\""), reports("reference \"r1\"")));
 }
 
-TEST_F(CheckCommand, findsTextsThatNoManagerUnderstands) {
+TEST_F(CheckCommand, findsValuesThatNoManagerAccepts) {
     insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c"]})");
     for (auto const* state : {"", "READ_ONLY", "WRITABLE", "INHERITED", "Writable", "1"}) {
         insertLineBefore("\"a\"", std::string(R"({"at":["Categories","Root","Category","c","Label","l)") +
@@ -125,9 +125,9 @@ TEST_F(CheckCommand, findsTextsThatNoManagerUnderstands) {
 
     EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output),
-                UnorderedElementsAre(tells("label \"lWritable\""), tells("label \"l1\""),
-                                     tells("entry point \"ebatch\""), tells("entry point \"e\""),
-                                     tells("the file \"a\" has 8 entry points")));
+                UnorderedElementsAre(reports("label \"lWritable\""), reports("label \"l1\""),
+                                     reports("entry point \"ebatch\""), reports("entry point \"e\""),
+                                     reports("the file \"a\" has 8 entry points")));
 }
 
 TEST_F(CheckCommand, findsFilesWhoseFolderIsNotInTheProject) {
@@ -136,16 +136,16 @@ TEST_F(CheckCommand, findsFilesWhoseFolderIsNotInTheProject) {
     auto const result = tool({"check"});
 
     EXPECT_EQ(result.exitCode, 3);
-    EXPECT_THAT(linesOf(result.output), ElementsAre(tells("\"lost/deep/file\"")));
+    EXPECT_THAT(linesOf(result.output), ElementsAre(reports("\"lost/deep/file\"")));
 }
 
-TEST_F(CheckCommand, findsThemInOtherScopesToo) {
+TEST_F(CheckCommand, findsSuchFilesInOtherScopesToo) {
     insertLineBefore("\"a\"", R"({"at":["Files","Notes","File","lost","File","file"]})");
 
     auto const result = tool({"check"});
 
     EXPECT_EQ(result.exitCode, 3);
-    EXPECT_THAT(linesOf(result.output), ElementsAre(tells("\"lost/file\"")));
+    EXPECT_THAT(linesOf(result.output), ElementsAre(reports("\"lost/file\"")));
 }
 
 TEST_F(CheckCommand, findsNamesThatNoFileCanHave) {
@@ -158,7 +158,7 @@ TEST_F(CheckCommand, findsNamesThatNoFileCanHave) {
 
     EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output),
-                UnorderedElementsAre(tells("\"\\000\""), tells("\"..\""), tells("\"a/b\"")));
+                UnorderedElementsAre(reports("\"\\000\""), reports("\"..\""), reports("\"a/b\"")));
 }
 
 TEST_F(CheckCommand, findsLabelsOnFilesThatDoNotExist) {
@@ -175,11 +175,11 @@ TEST_F(CheckCommand, findsLabelsOnFilesThatDoNotExist) {
     auto const result = tool({"check"});
 
     EXPECT_EQ(result.exitCode, 3);
-    EXPECT_THAT(linesOf(result.output), ElementsAre(AllOf(tells("\"c2\""), HasSubstr("\"unknown\"")),
-                                                    AllOf(tells("\"c3\""), HasSubstr("\"gone\""))));
+    EXPECT_THAT(linesOf(result.output), ElementsAre(AllOf(reports("\"c2\""), HasSubstr("\"unknown\"")),
+                                                    AllOf(reports("\"c3\""), HasSubstr("\"gone\""))));
 }
 
-TEST_F(CheckCommand, onlyNotesWhatItDoesNotKnow) {
+TEST_F(CheckCommand, onlyNotesUnknownData) {
     insertLineBefore("\"a\"",
                      R"({"at":["EntryPoints","Root","EntryPoint","e"],"keys":{"File":"no","Type":"Basic"}})");
     insertLineBefore(beforeTheEnd, R"({"at":["References","Root","Reference","r"],"keys":{"Type":"Cloud"}})");
@@ -188,13 +188,13 @@ TEST_F(CheckCommand, onlyNotesWhatItDoesNotKnow) {
     auto const result = tool({"check"});
 
     EXPECT_EQ(result.exitCode, 0);
-    EXPECT_THAT(
-        linesOf(result.output),
-        UnorderedElementsAre(tells("note: nothing in this version knows what is kept at (\"Simulation\""),
-                             tells("note: the entry point \"e\""), tells("note: the reference \"r\"")));
+    EXPECT_THAT(linesOf(result.output),
+                UnorderedElementsAre(reports("note: this version does not use the data at (\"Simulation\""),
+                                     reports("note: the entry point \"e\""),
+                                     reports("note: the reference \"r\"")));
 }
 
-TEST_F(CheckCommand, repairsByPuttingDamageAside) {
+TEST_F(CheckCommand, setsDamagedLinesAsideWithRepair) {
     insertLineBefore("\"b\"", "{\"file\":");
 
     auto const result = tool({"check", "--repair"});
@@ -202,9 +202,9 @@ TEST_F(CheckCommand, repairsByPuttingDamageAside) {
     EXPECT_EQ(result.exitCode, 0);
     EXPECT_EQ(result.errors, "");
     auto const lines = linesOf(result.output);
-    ASSERT_THAT(lines, ElementsAre(AllOf(StartsWith("what was damaged stands in "), HasSubstr("damaged-"))));
-    auto const begin = lines[0].find('/');
-    std::ifstream aside(lines[0].substr(begin, lines[0].rfind(' ') - begin));
+    ASSERT_THAT(lines,
+                ElementsAre(AllOf(StartsWith("the damaged lines are now in "), HasSubstr("damaged-"))));
+    std::ifstream aside(lines[0].substr(lines[0].find('/')));
     std::string damaged;
     std::getline(aside, damaged);
     EXPECT_EQ(damaged, "{\"file\":");
@@ -220,7 +220,7 @@ TEST_F(CheckCommand, repairsNothingInASoundProject) {
     EXPECT_EQ(readText(), before);
 }
 
-TEST_F(CheckCommand, leavesConflictsToAPerson) {
+TEST_F(CheckCommand, doesNotRepairConflicts) {
     insertLineBefore("\"b\"", "<<<<<<< ours");
 
     EXPECT_THAT(tool({"check", "--repair"}), FailsWith(6, text().string() + ":3: "));

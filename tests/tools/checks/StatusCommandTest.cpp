@@ -13,7 +13,7 @@ protected:
     }
 };
 
-TEST_F(StatusCommand, saysNothingWhenProjectAndDiskAgree) {
+TEST_F(StatusCommand, showsNothingWhenProjectAndDiskAgree) {
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
     EXPECT_THAT(tool({"status", "--json"}), Prints("{\"new\": [],\n\"gone\": [],\n\"problems\": []}\n"));
 }
@@ -21,10 +21,10 @@ TEST_F(StatusCommand, saysNothingWhenProjectAndDiskAgree) {
 TEST_F(StatusCommand, saysSoOnATerminal) {
     settings_.onTerminal = true;
 
-    EXPECT_EQ(tool({"status"}).output, "The project and the disk hold the same files.\r\n");
+    EXPECT_EQ(tool({"status"}).output, "The project and the disk contain the same files.\r\n");
 }
 
-TEST_F(StatusCommand, tellsWhatIsNewAndWhatIsGone) {
+TEST_F(StatusCommand, showsNewAndMissingFiles) {
     folder_.file(u"src/new.cpp");
     folder_.file(u"a");
     folder_.remove(u"src/main.cpp");
@@ -45,7 +45,7 @@ TEST_F(StatusCommand, showsANewFolderInsteadOfItsContents) {
     EXPECT_THAT(tool({"status"}), Prints("new  docs/\n"));
 }
 
-TEST_F(StatusCommand, looksIntoAFolderOfWhichAPartIsInTheProject) {
+TEST_F(StatusCommand, comparesTheContentsOfAFolderThatIsPartlyInTheProject) {
     folder_.file(u"docs/guide/first.md");
     folder_.file(u"docs/second.md");
     ASSERT_THAT(tool({"add", "docs/second.md"}), SucceedsSilently());
@@ -53,20 +53,20 @@ TEST_F(StatusCommand, looksIntoAFolderOfWhichAPartIsInTheProject) {
     EXPECT_THAT(tool({"status"}), Prints("new  docs/guide/\n"));
 }
 
-TEST_F(StatusCommand, tellsEverythingOfAFolderThatHasGone) {
+TEST_F(StatusCommand, showsAllContentsOfADeletedFolder) {
     folder_.remove(u"src");
 
     EXPECT_THAT(tool({"status"}), Prints("gone src\ngone src/io\ngone src/io/pump.cpp\ngone src/main.cpp\n"));
 }
 
-TEST_F(StatusCommand, tellsWhatIsGoneBelowAFolderThatBecameAFile) {
+TEST_F(StatusCommand, showsMissingFilesBelowAFolderThatBecameAFile) {
     folder_.remove(u"src/io");
     folder_.file(u"src/io");
 
     EXPECT_THAT(tool({"status"}), Prints("gone src/io/pump.cpp\n"));
 }
 
-TEST_F(StatusCommand, doesNotMissALinkWhoseTargetHasGone) {
+TEST_F(StatusCommand, doesNotReportALinkWhoseTargetWasDeleted) {
     folder_.addLink("link", "src/main.cpp");
     ASSERT_THAT(tool({"add", "link"}), SucceedsSilently());
     folder_.remove(u"src/main.cpp");
@@ -74,7 +74,7 @@ TEST_F(StatusCommand, doesNotMissALinkWhoseTargetHasGone) {
     EXPECT_THAT(tool({"status"}), Prints("gone src/main.cpp\n"));
 }
 
-TEST_F(StatusCommand, leavesOutWhatAddLeavesOut) {
+TEST_F(StatusCommand, leavesOutTheSameFilesAsAdd) {
     folder_.file(u".git/config");
     folder_.file(u"src/.svn/entries");
     folder_.file(u"..hidden");
@@ -86,7 +86,7 @@ TEST_F(StatusCommand, leavesOutWhatAddLeavesOut) {
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
 }
 
-TEST_F(StatusCommand, knowsAPipeThatSomebodyAdded) {
+TEST_F(StatusCommand, recognisesAPipeThatIsInTheProject) {
     ASSERT_EQ(mkfifo(inFolder("pipe").c_str(), 0600), 0);
     folder_.file(u".git/config");
     ASSERT_THAT(tool({"add", "pipe", ".git/config"}), SucceedsSilently());
@@ -98,7 +98,7 @@ TEST_F(StatusCommand, knowsAPipeThatSomebodyAdded) {
     EXPECT_THAT(tool({"status"}), Prints("gone .git/config\ngone pipe\n"));
 }
 
-TEST_F(StatusCommand, givesJson) {
+TEST_F(StatusCommand, writesJson) {
     folder_.file(u"docs/a");
     folder_.addFile("b\xFF");
     folder_.remove(u"src/io");
@@ -114,7 +114,7 @@ TEST_F(StatusCommand, givesJson) {
                                                    "\"problems\": []}\n"));
 }
 
-TEST_F(StatusCommand, goesOnWhereAFolderCannotBeRead) {
+TEST_F(StatusCommand, continuesAfterAFolderThatCannotBeRead) {
     folder_.file(u"new");
     std::filesystem::permissions(inFolder("src"), std::filesystem::perms::none);
     dropPrivileges();
@@ -123,7 +123,7 @@ TEST_F(StatusCommand, goesOnWhereAFolderCannotBeRead) {
 
     std::filesystem::permissions(inFolder("src"), std::filesystem::perms::all);
     EXPECT_EQ(result.exitCode, 0);
-    EXPECT_EQ(result.output, "new  new\n"); // and nothing is called gone that cannot be seen
+    EXPECT_EQ(result.output, "new  new\n"); // files in the unreadable folder are not reported as gone
     EXPECT_EQ(result.errors, "projectctl: warning: the folder \"" + inFolder("src") +
                                  "\" cannot be read: Permission denied\n");
 }

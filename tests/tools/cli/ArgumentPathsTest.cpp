@@ -16,7 +16,7 @@ protected:
         folder_.addLink("fileLink", "real/deep/file");
     }
 
-    /// Relative to the folder in which the arguments are taken, for what lies below it.
+    /// Relative to the current folder if the path is below it.
     std::u16string absolute(std::string const& argument) {
         auto const result = paths_.absolute(argument).native();
         auto const root = folder_.root().native();
@@ -31,7 +31,7 @@ TEST_F(ArgumentPathsTest, resolvesTheFolderPart) {
     EXPECT_EQ(absolute("real/deep/file"), u"/real/deep/file");
     EXPECT_EQ(absolute("link/deep/file"), u"/real/deep/file");
     EXPECT_EQ(absolute("./real//deep/../deep/./file"), u"/real/deep/file");
-    EXPECT_EQ(absolute("link/deep/../other"), u"/real/other"); // up from where the link leads to
+    EXPECT_EQ(absolute("link/deep/../other"), u"/real/other"); // from the target of the link upwards
 }
 
 TEST_F(ArgumentPathsTest, leavesTheLastElementAlone) {

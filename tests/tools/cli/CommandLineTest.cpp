@@ -43,7 +43,7 @@ TEST_F(CommandLine, refusesAnUnknownOption) {
     EXPECT_THAT(tool({"--long"}), FailsWith(2, "--long"));
 }
 
-TEST_F(CommandLine, refusesAWrongUseAlsoOutsideAProject) {
+TEST_F(CommandLine, refusesWrongArgumentsOutsideAProjectToo) {
     EXPECT_THAT(tool({"list", "a", "b"}), FailsWith(2, "projectctl list --help"));
 }
 

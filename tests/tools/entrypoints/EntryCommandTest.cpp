@@ -66,7 +66,7 @@ TEST_F(EntryCommand, listsEntryPointsByTheirFiles) {
                 Prints("main.cpp: Startup, main (hidden)\nsrc/pump.cpp: Shutdown, pump\n"));
 }
 
-TEST_F(EntryCommand, listsEverythingThatIsStoredAsJson) {
+TEST_F(EntryCommand, listsAllStoredDataAsJson) {
     ASSERT_THAT(tool({"entry", "set", "main.cpp", "--extension", "k\"=v", "--extension", "l="}),
                 SucceedsSilently());
 
@@ -152,17 +152,17 @@ TEST_F(EntryCommand, isNotedByStatusAndCheckWhenItsFileIsNotInTheProject) {
     EXPECT_THAT(tool({"check"}).output, HasSubstr(std::string(": note: ") + text));
 }
 
-TEST_F(EntryCommand, isNotedByStatusAndCheckWhenItsFileIsGoneFromTheDisk) {
+TEST_F(EntryCommand, isNotedByStatusAndCheckWhenItsFileIsNotOnDisk) {
     ASSERT_THAT(tool({"entry", "set", "main.cpp"}), SucceedsSilently());
     folder_.remove(u"main.cpp");
 
-    auto const text = "of the file \"main.cpp\" cannot be used, because the file is gone from the disk\n";
+    auto const text = "of the file \"main.cpp\" cannot be used, because the file is not on disk\n";
     EXPECT_THAT(tool({"status"}).output, HasSubstr(text));
     EXPECT_THAT(tool({"status"}).output, HasSubstr("gone main.cpp\n"));
     EXPECT_THAT(tool({"check"}).output, HasSubstr(text));
 }
 
-TEST_F(EntryCommand, isSeenByStatusAndCheckWhenItsGroupIsGone) {
+TEST_F(EntryCommand, isReportedByStatusAndCheckWhenItsGroupDoesNotExist) {
     ASSERT_THAT(tool({"group", "create", "Nightly"}), SucceedsSilently());
     ASSERT_THAT(tool({"entry", "set", "main.cpp", "--group", "Nightly"}), SucceedsSilently());
     ASSERT_THAT(tool({"group", "delete", "Nightly"}), SucceedsSilently());
@@ -174,15 +174,15 @@ TEST_F(EntryCommand, isSeenByStatusAndCheckWhenItsGroupIsGone) {
     EXPECT_EQ(show("main.cpp"), "name: main\ntype: Basic\nvisible: yes\n");
 }
 
-TEST_F(EntryCommand, isSeenByStatusAndCheckWhenItsFileHasAnother) {
+TEST_F(EntryCommand, isReportedByStatusAndCheckWhenItsFileHasAnother) {
     for (auto const* uuid : {"e1", "e2"}) {
         insertLineBefore("\"main.cpp\"", std::string(R"({"at":["EntryPoints","Root","EntryPoint",")") + uuid +
                                              R"("],"keys":{"File":"main.cpp","Name":"m","Type":"Basic"}})");
     }
 
     EXPECT_THAT(tool({"status"}),
-                Prints("bad  the file \"main.cpp\" has 2 entry points, and only the first is "
-                       "ever found by its file\n"));
+                Prints("bad  the file \"main.cpp\" has 2 entry points, but only the first one "
+                       "can be found by its path\n"));
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": the file \"main.cpp\" has 2 entry points"));
     ASSERT_THAT(tool({"entry", "remove", "main.cpp"}), SucceedsSilently()); // both
     EXPECT_THAT(tool({"check"}), SucceedsSilently());

@@ -57,7 +57,7 @@ TEST_F(AddRecursively, leavesOutFoldersOfSourceControl) {
 
 TEST_F(AddRecursively, leavesOutTheFileWithWhichGitLinksAWorkingTree) {
     folder_.file(u"submodule/.git", "gitdir: elsewhere");
-    folder_.file(u"submodule/CVS", "a file of that name is nothing special");
+    folder_.file(u"submodule/CVS", "a file with that name is an ordinary file");
 
     EXPECT_THAT(tool({"add", "-r", "."}), SucceedsSilently());
 

@@ -144,7 +144,7 @@ TEST_F(GitIgnore, reportsThatGitIsNotInstalled) {
 
 TEST_F(GitIgnore, acceptsAHundredThousandPathsAtOnce) {
     folder_.file(u".gitignore", "*.o\n");
-    std::vector<fl::filesystem::Path> paths; // git does not ask the disk for them
+    std::vector<fl::filesystem::Path> paths; // they need not exist for git
     for (int number = 0; number < 100'000; ++number) {
         auto const name = "folder/file" + std::to_string(number) + (number % 2 == 0 ? ".o" : ".c");
         paths.push_back(folder_.root() / fl::filesystem::fromSystem(name));

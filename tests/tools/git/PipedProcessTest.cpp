@@ -32,7 +32,7 @@ TEST(PipedProcess, readsErrorsWhileItWrites) {
 }
 
 TEST(PipedProcess, acceptsAProgramThatReadsNothing) {
-    std::signal(SIGPIPE, SIG_IGN); // as the tool has it
+    std::signal(SIGPIPE, SIG_IGN); // as in the tool
     std::string const much(std::size_t(2) * 1024 * 1024, 'x');
 
     EXPECT_EQ(runWithInput({"true"}, much).exitCode, 0);

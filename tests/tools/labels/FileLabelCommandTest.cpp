@@ -18,8 +18,8 @@ protected:
         ASSERT_THAT(tool({"label", "create", "Owner", "Bob"}), SucceedsSilently());
     }
 
-    /// Puts the only label on the file "a" a second time, as a merge of two people who label the same file
-    /// does.
+    /// Puts the only label on the file "a" a second time, as after a merge of two branches that
+    /// label the same file.
     void doubleTheLabelOnA(std::string const& uuid) const {
         auto const label = R"({"type":"Label","keys":{"UUID":")" + uuid + R"("}})";
         replaceInText(label, label + ',' + label);
@@ -45,7 +45,7 @@ TEST_F(FileLabelCommand, takesFilesFromStandardInput) {
     EXPECT_THAT(tool({"label", "find", "Owner", "Ann"}), SucceedsSilently());
 }
 
-TEST_F(FileLabelCommand, takesPathsRelativeToWhereItIsCalled) {
+TEST_F(FileLabelCommand, takesPathsRelativeToTheCurrentFolder) {
     folder_.file(u"src/pump.cpp");
     ASSERT_THAT(tool({"add", "src/pump.cpp"}), SucceedsSilently());
 
@@ -200,33 +200,32 @@ TEST_F(FileLabelCommand, losesTheLabelsOfAFileThatIsAddedAnew) {
     EXPECT_THAT(tool({"label", "find", "Owner", "Ann"}), Prints("b\n"));
 }
 
-TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenTheLabelDoesNotExist) {
+TEST_F(FileLabelCommand, isReportedByStatusAndCheckWhenTheLabelDoesNotExist) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     auto const ann = labelUUID("Ann");
     replaceInText(R"("Label",")" + ann, R"("Label","another)");
 
     auto const text =
-        "the file \"a\" bears the label \"" + ann + "\" of the category \"Owner\", which does not exist";
+        "the file \"a\" has the label \"" + ann + "\" of the category \"Owner\", which does not exist";
     EXPECT_THAT(tool({"status"}), Prints("bad  " + text + "\n"));
     EXPECT_THAT(
         tool({"status", "--json"}).output,
-        HasSubstr("\"problems\": [\n{\"fault\": true, \"text\": \"the file \\\"a\\\" bears the label "));
+        HasSubstr("\"problems\": [\n{\"fault\": true, \"text\": \"the file \\\"a\\\" has the label "));
     EXPECT_EQ(tool({"check"}).exitCode, 3);
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": " + text + "\n"));
 }
 
-TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenItsCategoryDoesNotExist) {
+TEST_F(FileLabelCommand, isReportedByStatusAndCheckWhenItsCategoryDoesNotExist) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     auto const owner = categoryUUID("Owner");
     replaceInText(R"("Category",")" + owner, R"("Category","another)");
 
-    auto const text =
-        "the file \"a\" bears a label of the category \"" + owner + "\", which does not exist\n";
+    auto const text = "the file \"a\" has a label of the category \"" + owner + "\", which does not exist\n";
     EXPECT_THAT(tool({"status"}), Prints("bad  " + text));
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": " + text));
 }
 
-TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenAFileHasTwoLabelsOfASingleValuedCategory) {
+TEST_F(FileLabelCommand, isReportedByStatusAndCheckWhenAFileHasTwoLabelsOfASingleValuedCategory) {
     ASSERT_THAT(tool({"label", "put", "Status", "Open", "a"}), SucceedsSilently());
     auto const label = [](std::string const& uuid) {
         return R"({"type":"Label","keys":{"UUID":")" + uuid + R"("}})";
@@ -234,7 +233,7 @@ TEST_F(FileLabelCommand, isSeenByStatusAndCheckWhenAFileHasTwoLabelsOfASingleVal
     replaceInText(label(labelUUID("Open")), label(labelUUID("Open")) + ',' + label(labelUUID("Done")));
 
     auto const text =
-        std::string("the file \"a\" bears 2 labels of the category \"Status\", which allows one\n");
+        std::string("the file \"a\" has 2 labels of the category \"Status\", which allows one\n");
     EXPECT_THAT(tool({"status"}), Prints("bad  " + text));
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": " + text));
     EXPECT_EQ(tool({"check"}).exitCode, 3);
@@ -246,8 +245,7 @@ TEST_F(FileLabelCommand, isNotedByStatusAndCheckWhenAFileHasItTwice) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ann", "a"}), SucceedsSilently());
     doubleTheLabelOnA(labelUUID("Ann"));
 
-    auto const text =
-        std::string("the file \"a\" bears the label \"Ann\" of the category \"Owner\" 2 times\n");
+    auto const text = std::string("the file \"a\" has the label \"Ann\" of the category \"Owner\" 2 times\n");
     EXPECT_THAT(tool({"status"}), Prints("note " + text));
     EXPECT_EQ(tool({"check"}).exitCode, 0);
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": note: " + text));

@@ -70,7 +70,7 @@ TEST_F(LabelCommand, deletesALabelFromEveryFile) {
     EXPECT_THAT(tool({"label", "show", "a", "c"}), SucceedsSilently());
 }
 
-TEST_F(LabelCommand, deletesWritableLabelsAndNoReadOnlyOnes) {
+TEST_F(LabelCommand, deletesWritableLabelsButNotReadOnlyOnes) {
     ASSERT_THAT(tool({"category", "create", "Fixed", "--read-only"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "create", "Fixed", "Inherits"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "create", "Fixed", "Writable", "--writable"}), SucceedsSilently());

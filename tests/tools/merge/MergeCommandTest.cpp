@@ -23,7 +23,7 @@ TEST_F(MergeCommand, combinesTheChangesOfTwoPeopleToOneFile) {
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
 }
 
-TEST_F(MergeCommand, mergesNeighbouringLinesThatGitAloneWouldNot) {
+TEST_F(MergeCommand, mergesNeighbouringLinesThatGitAloneCannotMerge) {
     folder_.file(u"d");
     folder_.file(u"e");
 

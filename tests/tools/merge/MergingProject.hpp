@@ -24,7 +24,7 @@ protected:
         commit("the project");
     }
 
-    /// Commits what the tool has staged.
+    /// Commits the files that the tool has staged.
     void commit(std::string const& message) const { git_.run({"commit", "-q", "-m", message}); }
 
     /// Runs one command on a new branch and another one on the main branch, and merges.

@@ -49,8 +49,9 @@ TEST_F(SetupCommand, replacesAnotherCommandWhichIsReported) {
     for (auto const* command : {"projectctl merge %O %A %B %P", "p=", "p='/nowhere/projectctl'; true"}) {
         git_.run({"config", "--add", driverKey, command});
 
-        EXPECT_THAT(tool({"status"}), Prints("note git merges the project's text with another command than "
-                                             "'projectctl setup' configures\n"))
+        EXPECT_THAT(tool({"status"}),
+                    Prints("note git merges the project's text with another command than the one "
+                           "that 'projectctl setup' configures\n"))
             << command;
     }
 
@@ -61,7 +62,7 @@ TEST_F(SetupCommand, replacesAnotherCommandWhichIsReported) {
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
 }
 
-TEST_F(SetupCommand, isLeftAloneByInitWhereSomebodyHasConfiguredAnotherCommand) {
+TEST_F(SetupCommand, isNotReplacedByInitWhenAnotherCommandIsConfigured) {
     folder_.addFolder("other");
     git_.run({"config", driverKey, "true"});
 
@@ -70,7 +71,7 @@ TEST_F(SetupCommand, isLeftAloneByInitWhereSomebodyHasConfiguredAnotherCommand) 
     EXPECT_EQ(git_.run({"config", driverKey}), "true\n");
 }
 
-TEST_F(SetupCommand, doesNotHelpWhereGitsAttributesNameAnotherDriver) {
+TEST_F(SetupCommand, isReportedWhenGitsAttributesNameAnotherDriver) {
     folder_.addFile(".git/info/attributes", "*.jsonl merge=union\n");
 
     EXPECT_THAT(tool({"status"}).output,
@@ -143,7 +144,7 @@ protected:
         EXPECT_THAT(readText(), AllOf(HasSubstr("<<<<<<< ours\n"), HasSubstr("\"d\""), HasSubstr("\"e\""),
                                       HasSubstr(">>>>>>> theirs\n")));
         EXPECT_THAT(linesOf(tool({"list"}).output), ElementsAre("a", "b", "c", "d", "e"));
-        EXPECT_THAT(tool({"add", "a"}), FailsWith(6, "project.jsonl")); // the store knows the markers
+        EXPECT_THAT(tool({"add", "a"}), FailsWith(6, "project.jsonl")); // the store recognises the markers
     }
 
     /// `git add` of the text as the merge left it loses nothing.
@@ -153,7 +154,7 @@ protected:
         EXPECT_EQ(git_.run({"show", ":.projectdata/project.jsonl"}), merged);
     }
 
-    /// The exit code of the configured command on three files, which hold the texts.
+    /// The exit code of the configured command on three files with these texts.
     int driverOn(std::string const& base, std::string const& ours, std::string const& theirs) const {
         folder_.addFile("base", base);
         folder_.addFile("ours", ours);
@@ -171,7 +172,7 @@ protected:
 
     std::string const reported =
         "bad  git merges the project's text line by line: the merge driver calls a program "
-        "that cannot be run; 'projectctl setup' configures it anew\n";
+        "that cannot be run; 'projectctl setup' configures it again\n";
     TemporaryFolder programs_;
     std::filesystem::path program_;
 };
@@ -204,7 +205,7 @@ TEST_F(MovedProgram, leavesMarkersAfterItWasDeleted) {
     expectThatStagingLosesNothing();
 }
 
-TEST_F(MovedProgram, leavesMarkersThatTheStoreKnowsWhateverSizeGitIsConfiguredFor) {
+TEST_F(MovedProgram, leavesMarkersOfTheSizeThatTheStoreRecognisesWhateverGitsConfiguration) {
     std::filesystem::remove(program_);
     folder_.addFile(".git/info/attributes", "*.jsonl conflict-marker-size=12\n");
 

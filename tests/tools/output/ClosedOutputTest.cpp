@@ -11,7 +11,7 @@ protected:
     void SetUp() override {
         initProject();
         std::string const longName(240, 'x');
-        for (int number = 0; number < 1000; ++number) { // more than twice what a pipe holds
+        for (int number = 0; number < 1000; ++number) { // more than twice the capacity of a pipe
             folder_.addFile("folder/" + longName + std::to_string(number));
         }
         ASSERT_THAT(tool({"add", "-r", "."}), SucceedsSilently());

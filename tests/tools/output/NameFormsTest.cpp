@@ -55,11 +55,11 @@ TEST(NameForms, quotesOnlyAmbiguousNames) {
 
 TEST(NameForms, quotesEachByteThatIsNotUtf8) {
     EXPECT_EQ(quoted("\x80"), "\"\\200\"");
-    EXPECT_EQ(quoted("\xC0\xAF"), "\"\\300\\257\"");                   // longer than need be
+    EXPECT_EQ(quoted("\xC0\xAF"), "\"\\300\\257\"");                   // longer than necessary
     EXPECT_EQ(quoted("\xE0\x80\xAF"), "\"\\340\\200\\257\"");          // likewise
     EXPECT_EQ(quoted("\xED\xA0\x80"), "\"\\355\\240\\200\"");          // a surrogate
     EXPECT_EQ(quoted("\xF4\x90\x80\x80"), "\"\\364\\220\\200\\200\""); // beyond the last character
-    EXPECT_EQ(quoted("\xE2\x82"), "\"\\342\\202\"");                   // broken off
+    EXPECT_EQ(quoted("\xE2\x82"), "\"\\342\\202\"");                   // incomplete
     EXPECT_EQ(quoted("\xE2\x82\xAC\xFF"), "\"\xE2\x82\xAC\\377\"");
 }
 

@@ -21,7 +21,7 @@ using std::chrono::milliseconds;
 using ::testing::EndsWith;
 using ::testing::HasSubstr;
 
-/// A pseudo terminal, and what was written to it.
+/// A pseudo terminal, and the output that was written to it.
 class Terminal {
 public:
     Terminal() { EXPECT_EQ(openpty(&shown_, &written_, nullptr, nullptr, nullptr), 0); }
@@ -67,7 +67,7 @@ TEST(Progress, showsTheWorkAndItsCountAndIsDeletedAtTheEnd) {
     EXPECT_THAT(terminal.read(milliseconds(50)), EndsWith("\r\033[K"));
 }
 
-TEST(Progress, showsTheNextPieceOfWork) {
+TEST(Progress, showsTheNextTask) {
     Terminal terminal;
     Progress progress("Reading folders", terminal.descriptor(), atOnce);
     progress.reach(3);
@@ -102,7 +102,7 @@ TEST(Progress, writesNothingToAPipe) {
     {
         Progress progress("Reading folders", ends[1], atOnce);
         progress.reach(5);
-        EXPECT_EQ(threads(), before); // nothing that could draw later
+        EXPECT_EQ(threads(), before); // there is no thread that could draw later
     }
     char byte = 0;
 

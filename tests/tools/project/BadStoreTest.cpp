@@ -69,7 +69,7 @@ TEST_F(BadStore, withConflictMarkersIsListedAndNotWritten) {
     writeText(content);
 
     auto const listed = tool({"list"});
-    EXPECT_EQ(listed.output, "a\nb\nc\n"); // both sides count
+    EXPECT_EQ(listed.output, "a\nb\nc\n"); // the files of both sides
     EXPECT_THAT(linesOf(listed.errors), ElementsAre(HasSubstr(text().string() + ":3: ")));
     folder_.file(u"d");
     EXPECT_THAT(tool({"add", "d"}), FailsWith(6, text().string() + ":3: "));
@@ -219,7 +219,7 @@ TEST_F(BadStore, thatAnotherProcessHasLockedIsWaitedFor) {
     ASSERT_TRUE(holder.waitUntilItSleeps());
     RunningProgram adding(commandFor({"add", "c"}), settings_);
     ASSERT_TRUE(adding.waitUntilItSleeps());
-    EXPECT_THAT(tool({"list"}), Prints("a\nb\n")); // a reader waits for nobody
+    EXPECT_THAT(tool({"list"}), Prints("a\nb\n")); // a reader does not wait
 
     EXPECT_EQ(holder.finish("\n").output, "held\n");
 

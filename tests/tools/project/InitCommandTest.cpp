@@ -55,7 +55,7 @@ TEST_F(InitCommand, createsAProjectInsideAnother) {
 }
 
 TEST_F(InitCommand, createsAProjectInAnEmptyStoreFolder) {
-    folder_.folder(u".projectdata"); // a start that was broken off at once
+    folder_.folder(u".projectdata"); // as after a creation that was interrupted at once
 
     EXPECT_THAT(tool({"init"}), SucceedsSilently());
 }
@@ -93,7 +93,7 @@ TEST_F(InitCommand, createsOneProjectWhenTwoProcessesTryAtOnce) {
     }
 }
 
-TEST_F(InitCommand, leavesNoFilesWhereNothingCanBeWritten) {
+TEST_F(InitCommand, leavesNoFilesBehindWhenNothingCanBeWritten) {
     settings_.fileSize = 0; // every file is too large
 
     auto const result = tool({"init"});

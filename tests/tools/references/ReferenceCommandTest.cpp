@@ -107,7 +107,7 @@ TEST_F(ReferenceCommand, removesOneEntryByItsUUID) {
     EXPECT_THAT(tool({"path", "list"}), SucceedsSilently());
 }
 
-TEST_F(ReferenceCommand, removesNothingWhenOneIsNotThere) {
+TEST_F(ReferenceCommand, removesNothingWhenOneIsNotListed) {
     ASSERT_THAT(tool({"path", "add", "lib"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"path", "remove", "lib", "src"}),
@@ -124,7 +124,7 @@ TEST_F(ReferenceCommand, storesTheTargetOfALinkAndNotTheLink) {
     EXPECT_THAT(tool({"reference", "list"}), Prints("../pump\n"));
 }
 
-TEST_F(ReferenceCommand, refusesABackslashThatCouldNotBeFollowedAgain) {
+TEST_F(ReferenceCommand, refusesAFolderWhosePathHasABackslash) {
     std::filesystem::create_directory(inFolder("engine/back\\slash"));
 
     EXPECT_THAT(tool({"path", "add", "back\\slash"}),
@@ -134,26 +134,26 @@ TEST_F(ReferenceCommand, refusesABackslashThatCouldNotBeFollowedAgain) {
     EXPECT_THAT(tool({"reference", "list"}), Prints(inFolder("engine/back\\slash") + "\n"));
 }
 
-TEST_F(ReferenceCommand, isNotedByStatusAndCheckWhenItLeadsNowhere) {
+TEST_F(ReferenceCommand, isNotedByStatusAndCheckWhenItCannotBeFollowed) {
     ASSERT_THAT(tool({"path", "add", "../valve"}), SucceedsSilently());
     ASSERT_THAT(tool({"reference", "add", "../pump", "../valve"}), SucceedsSilently());
     folder_.remove(u"pump");
 
-    auto const gone =
-        "the reference \"../pump\" in the referenced projects leads nowhere: there is no folder \"" +
-        inFolder("pump") + "\"\n";
+    auto const missing =
+        "the reference \"../pump\" in the referenced projects cannot be followed: the folder \"" +
+        inFolder("pump") + "\" does not exist\n";
     auto const empty =
-        "the reference \"../valve\" in the referenced projects leads to no project: there is none in \"" +
-        inFolder("valve") + "\"\n";
+        "the reference \"../valve\" in the referenced projects cannot be followed: the folder \"" +
+        inFolder("valve") + "\" does not contain a project\n";
     auto const status = tool({"status"}).output;
-    EXPECT_THAT(status, HasSubstr("note " + gone));
+    EXPECT_THAT(status, HasSubstr("note " + missing));
     EXPECT_THAT(status, HasSubstr("note " + empty));
-    EXPECT_THAT(status, ::testing::Not(HasSubstr("project path"))); // which is of folders, not of projects
-    EXPECT_THAT(tool({"check"}).output, HasSubstr(": note: " + gone));
+    EXPECT_THAT(status, ::testing::Not(HasSubstr("project path"))); // it lists folders, not projects
+    EXPECT_THAT(tool({"check"}).output, HasSubstr(": note: " + missing));
     EXPECT_EQ(tool({"check"}).exitCode, 0);
 }
 
-TEST_F(ReferenceCommand, isNotedByStatusAndCheckWhenNoReaderUnderstandsIt) {
+TEST_F(ReferenceCommand, isNotedByStatusAndCheckWhenItsTypeIsNotSupported) {
     auto const uuid = std::string("01234567-89ab-4def-8123-456789abcdef");
     std::ifstream in(textOfEngine());
     std::string content{std::istreambuf_iterator<char>(in), {}};
@@ -163,7 +163,7 @@ TEST_F(ReferenceCommand, isNotedByStatusAndCheckWhenNoReaderUnderstandsIt) {
 
     auto const text =
         "the reference \"" + uuid +
-        "\" in the project path is not shown, because nothing there reads its type \"Absolute\"\n";
+        "\" in the project path is not shown, because this list does not support its type \"Absolute\"\n";
     EXPECT_THAT(tool({"path", "list"}), SucceedsSilently());
     EXPECT_THAT(tool({"status"}).output, HasSubstr("note " + text));
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": note: " + text));

@@ -50,7 +50,7 @@ TEST_F(ReferenceGraph, findsTheProjectFromAnyFolderInIt) {
                 HasSubstr("../pump: " + shown("pump")));
 }
 
-TEST_F(ReferenceGraph, findsACircleOfProjects) {
+TEST_F(ReferenceGraph, findsACycleOfProjects) {
     makeReference("engine", "pump");
     makeReference("pump", "seal");
     makeReference("seal", "pump");
@@ -75,7 +75,7 @@ TEST_F(ReferenceGraph, findsAProjectThatReferencesItself) {
     EXPECT_EQ(tree.output, shown("engine") + "\n  .: " + shown("engine") + ", a cycle\n");
 }
 
-TEST_F(ReferenceGraph, findsEveryCircleOfSeveral) {
+TEST_F(ReferenceGraph, findsEachOfSeveralCycles) {
     makeReference("engine", "pump");
     makeReference("pump", "engine");
     makeReference("engine", "valve");
@@ -86,7 +86,7 @@ TEST_F(ReferenceGraph, findsEveryCircleOfSeveral) {
                           quoted("engine") + ", " + quoted("valve") + "]\n]}\n"));
 }
 
-TEST_F(ReferenceGraph, namesWhatIsMissingAndGoesOn) {
+TEST_F(ReferenceGraph, showsMissingProjectsAndContinues) {
     makeReference("engine", "pump");
     makeReference("engine", "seal");
     makeReference("engine", "valve");
@@ -102,7 +102,7 @@ TEST_F(ReferenceGraph, namesWhatIsMissingAndGoesOn) {
                                ")\n  ../valve: " + shown("valve") + "\n");
 }
 
-TEST_F(ReferenceGraph, namesAProjectThatCannotBeRead) {
+TEST_F(ReferenceGraph, showsAProjectThatCannotBeRead) {
     makeReference("engine", "pump");
     std::ofstream(inFolder("pump/.projectdata/project.jsonl"))
         << "{\"format\":\"project-definition\",\"version\":9}\n";
@@ -116,7 +116,7 @@ TEST_F(ReferenceGraph, namesAProjectThatCannotBeRead) {
                           ", \"state\": \"unreadable\", \"name\": \"\", \"problem\": \""));
 }
 
-TEST_F(ReferenceGraph, givesJson) {
+TEST_F(ReferenceGraph, writesJson) {
     makeReference("engine", "pump");
 
     EXPECT_THAT(toolFrom("engine", {"references", "--graph", "--json"}),
@@ -128,7 +128,7 @@ TEST_F(ReferenceGraph, givesJson) {
                        "\"cycles\": []}\n"));
 }
 
-TEST_F(ReferenceGraph, givesTextForGraphviz) {
+TEST_F(ReferenceGraph, writesTextForGraphviz) {
     ASSERT_THAT(toolFrom("pump", {"name", "the \"pump\" \\"}), SucceedsSilently());
     makeReference("engine", "pump");
     makeReference("pump", "engine");
@@ -146,7 +146,7 @@ TEST_F(ReferenceGraph, givesTextForGraphviz) {
                               quoted("seal") + ";\n}\n");
 }
 
-TEST_F(ReferenceGraph, followsReferencesKeptFromTheDisksRootAndThroughLinksToOneProject) {
+TEST_F(ReferenceGraph, followsAbsoluteReferencesAndLinksToOneProject) {
     std::filesystem::create_directory_symlink(inFolder("pump"), inFolder("link"));
     ASSERT_THAT(toolFrom("engine", {"reference", "add", "--absolute", "../link"}), SucceedsSilently());
     makeReference("engine", "pump");
@@ -157,7 +157,7 @@ TEST_F(ReferenceGraph, followsReferencesKeptFromTheDisksRootAndThroughLinksToOne
                              "\n  ../pump: " + shown("pump") + "\n"));
 }
 
-TEST_F(ReferenceGraph, goesToTheEndOfALongWay) {
+TEST_F(ReferenceGraph, followsALongChain) {
     std::string const last = "p99";
     for (int number = 0; number < 100; ++number) {
         auto const name = "p" + std::to_string(number);
@@ -171,7 +171,7 @@ TEST_F(ReferenceGraph, goesToTheEndOfALongWay) {
     EXPECT_EQ(linesOf(toolFrom("p0", {"references", "--graph"}).output).size(), 100);
 }
 
-TEST_F(ReferenceGraph, tellsHowItIsUsed) {
+TEST_F(ReferenceGraph, requiresExactlyOneForm) {
     EXPECT_THAT(tool({"references"}), FailsWith(2, "--graph is required"));
     EXPECT_THAT(tool({"references", "--graph", "--json", "--dot"}), FailsWith(2, "excludes"));
 }

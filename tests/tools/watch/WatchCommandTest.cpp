@@ -27,7 +27,7 @@ protected:
     }
 
     /// The line that a `watch` prints for another command.
-    std::string told(RunningProgram& watching, std::vector<std::string> command) const {
+    std::string printed(RunningProgram& watching, std::vector<std::string> command) const {
         auto const result = tool(std::move(command));
         EXPECT_EQ(result.exitCode, 0) << result.errors;
         return watching.readLine();
@@ -42,38 +42,38 @@ protected:
 TEST_F(WatchCommand, printsEachEventInALine) {
     auto const watching = watch();
 
-    EXPECT_EQ(told(*watching, {"add", "valve.cpp"}), "fileListUpdate\tvalve.cpp");
-    EXPECT_EQ(told(*watching, {"remove", "src"}), "fileListUpdate\tsrc\tsrc/pump.cpp");
-    EXPECT_EQ(told(*watching, {"category", "create", "Owner"}), "categoryAdded\tOwner");
-    EXPECT_EQ(told(*watching, {"category", "rename", "Owner", "Keeper"}), "categoryRenamed\tOwner");
-    EXPECT_EQ(told(*watching, {"label", "create", "Status", "Done"}), "labelModified\tStatus\tDone");
-    EXPECT_EQ(told(*watching, {"label", "put", "Status", "Done", "valve.cpp"}),
+    EXPECT_EQ(printed(*watching, {"add", "valve.cpp"}), "fileListUpdate\tvalve.cpp");
+    EXPECT_EQ(printed(*watching, {"remove", "src"}), "fileListUpdate\tsrc\tsrc/pump.cpp");
+    EXPECT_EQ(printed(*watching, {"category", "create", "Owner"}), "categoryAdded\tOwner");
+    EXPECT_EQ(printed(*watching, {"category", "rename", "Owner", "Keeper"}), "categoryRenamed\tOwner");
+    EXPECT_EQ(printed(*watching, {"label", "create", "Status", "Done"}), "labelModified\tStatus\tDone");
+    EXPECT_EQ(printed(*watching, {"label", "put", "Status", "Done", "valve.cpp"}),
               "fileLabelsChanged\tvalve.cpp");
-    EXPECT_EQ(told(*watching, {"name", "Engine"}), "nameChanged");
-    EXPECT_EQ(told(*watching, {"description", "Pumps"}), "metadataChange");
-    EXPECT_EQ(told(*watching, {"entry", "set", "valve.cpp"}), "entryPointsChanged");
+    EXPECT_EQ(printed(*watching, {"name", "Engine"}), "nameChanged");
+    EXPECT_EQ(printed(*watching, {"description", "Pumps"}), "metadataChange");
+    EXPECT_EQ(printed(*watching, {"entry", "set", "valve.cpp"}), "entryPointsChanged");
     EXPECT_EQ(interrupt(*watching).signal, SIGINT);
 }
 
 TEST_F(WatchCommand, printsEachEventAsAJsonObject) {
     auto const watching = watch({"--json"});
 
-    EXPECT_EQ(told(*watching, {"add", "valve.cpp"}),
+    EXPECT_EQ(printed(*watching, {"add", "valve.cpp"}),
               R"({"event": "fileListUpdate", "files": ["valve.cpp"]})");
-    EXPECT_EQ(told(*watching, {"remove", "src"}),
+    EXPECT_EQ(printed(*watching, {"remove", "src"}),
               R"({"event": "fileListUpdate", "files": ["src", "src/pump.cpp"]})");
-    EXPECT_THAT(told(*watching, {"label", "create", "Status", "Done"}),
+    EXPECT_THAT(printed(*watching, {"label", "create", "Status", "Done"}),
                 testing::MatchesRegex(R"(\{"event": "labelModified", "category": \{"uuid": "[-0-9a-f]+", )"
                                       R"("name": "Status"\}, "label": \{"uuid": "[-0-9a-f]+", )"
                                       R"("name": "Done"\}\})"));
-    EXPECT_EQ(told(*watching, {"name", "Engine"}), R"({"event": "nameChanged"})");
+    EXPECT_EQ(printed(*watching, {"name", "Engine"}), R"({"event": "nameChanged"})");
 }
 
 TEST_F(WatchCommand, keepsANameWithALineFeedInOneLine) {
     folder_.addFile("two\nlines");
     auto const watching = watch();
 
-    EXPECT_EQ(told(*watching, {"add", "two\nlines"}), "fileListUpdate\t\"two\\nlines\"");
+    EXPECT_EQ(printed(*watching, {"add", "two\nlines"}), "fileListUpdate\t\"two\\nlines\"");
 }
 
 TEST_F(WatchCommand, reportsTheChangesOfAnEditor) {
@@ -91,7 +91,7 @@ TEST_F(WatchCommand, continuesAfterATextThatCouldNotBeRead) {
     ASSERT_NE(watching->readErrorLine().find("project.jsonl"), std::string::npos);
     std::filesystem::rename(folder_.onDisk() / "aside", text());
 
-    EXPECT_EQ(told(*watching, {"name", "Engine"}), "nameChanged");
+    EXPECT_EQ(printed(*watching, {"name", "Engine"}), "nameChanged");
     EXPECT_EQ(interrupt(*watching).errors, "");
 }
 

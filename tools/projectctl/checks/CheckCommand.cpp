@@ -17,13 +17,13 @@ namespace {
 
 using project::stores::Fault;
 
-/// Looks for faults in the project's text and in what it says, and tells all of them.
+/// Reports all faults of the project's text, of its definition and of the merge set-up.
 class CheckCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand("check", "Look through the whole project for faults");
+        auto* const app = tool.add_subcommand("check", "Check the whole project for faults");
         app->add_flag("--repair", repair_,
-                      "First set damaged lines aside into a file of their own, and write the rest anew");
+                      "First set damaged lines aside in a file of their own, and rewrite the rest");
         return app;
     }
 
@@ -31,19 +31,19 @@ public:
         if (repair_) {
             repair(project);
         }
-        Progress progress("Looking through the project");
+        Progress progress("Checking the project");
         std::size_t faults = 0;
         auto const file = project.textFile();
         auto const faultsOfText = project.text().check();
         for (auto const& fault : faultsOfText) {
             ++faults;
             auto const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
-            tell(file + line + ": " + fault.problem);
+            report(file + line + ": " + fault.problem);
         }
         for (auto const& finding : TreeCheck(project).run()) {
             bool const isFault = finding.weight == Finding::Weight::Fault;
             faults += isFault ? 1 : 0;
-            tell(file + (isFault ? ": " : ": note: ") + finding.text);
+            report(file + (isFault ? ": " : ": note: ") + finding.text);
         }
         Findings ofSetup;
         checkMergeSetup(project.root(), ofSetup);
@@ -51,7 +51,7 @@ public:
         for (auto const& finding : ofSetup) {
             bool const isFault = finding.weight == Finding::Weight::Fault;
             faults += isFault ? 1 : 0;
-            tell((isFault ? "" : "note: ") + finding.text);
+            report((isFault ? "" : "note: ") + finding.text);
         }
         output().say(faults == 0            ? "The project has no faults."
                      : faultsOfProject == 0 ? "'projectctl setup' configures the merge driver."
@@ -65,7 +65,7 @@ private:
         auto const aside = project.text().repair();
         if (!aside.empty()) {
             project.stageLater();
-            tell("what was damaged stands in " + project.storeFile(aside) + " now");
+            report("the damaged lines are now in " + project.storeFile(aside));
         }
     }
 
@@ -74,19 +74,19 @@ private:
             return std::ranges::find(faults, kind, &Fault::kind) != faults.end();
         };
         if (has(Fault::Kind::Conflict)) {
-            return "'projectctl resolve' settles what a merge left.";
+            return "'projectctl resolve' resolves the conflicts.";
         }
         if (has(Fault::Kind::Damage)) {
             return "'projectctl check --repair' sets damaged lines aside.";
         }
         if (has(Fault::Kind::Irregular) || has(Fault::Kind::TornTail)) {
-            return "'projectctl tidy' puts right what is only irregular or torn.";
+            return "'projectctl tidy' corrects irregular lines and torn tails.";
         }
-        return "What the lines say is to be put right in an editor.";
+        return "Correct these lines in an editor.";
     }
 
-    /// One line, whatever is in it.
-    static void tell(std::string const& text) { output().text() += withoutControls(text, false) + '\n'; }
+    /// Writes one line. Control characters are replaced by C escapes.
+    static void report(std::string const& text) { output().text() += withoutControls(text, false) + '\n'; }
 
     bool repair_ = false;
 };

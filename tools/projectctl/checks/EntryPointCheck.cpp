@@ -30,7 +30,7 @@ Findings EntryPointCheck::run() {
         if (count > 1) {
             findings_.push_back(
                 Finding::fault("the file " + inQuotes(shown_.of(file)) + " has " + std::to_string(count) +
-                               " entry points, and only the first is ever found by its file"));
+                               " entry points, but only the first one can be found by its path"));
         }
     }
     return std::move(findings_);
@@ -53,7 +53,7 @@ void EntryPointCheck::checkFile(std::string const& entry, std::u16string const& 
     if (!project_.files().isFileInProject(path)) {
         findings_.push_back(Finding::note(entry + " is not shown, because the file is not in the project"));
     } else if (!project::metadata::exists(path)) {
-        findings_.push_back(Finding::note(entry + " cannot be used, because the file is gone from the disk"));
+        findings_.push_back(Finding::note(entry + " cannot be used, because the file is not on disk"));
     }
 }
 

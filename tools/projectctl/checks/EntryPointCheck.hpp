@@ -10,10 +10,10 @@
 
 namespace projectctl {
 
-/// What is stored of entry points and cannot be followed: files that are not in the project or gone from the
-/// disk, groups that are gone, and files that are an entry point twice.
+/// Finds entry points that cannot be used: their file is not in the project, is not on disk or has another
+/// entry point, or their group does not exist.
 ///
-/// It reads the store, since the manager's own list leaves out some of these and ends at others.
+/// It reads the store, because the manager leaves out some of these entry points and fails on others.
 class EntryPointCheck {
 public:
     /// @param shown for the paths in findings, borrowed.

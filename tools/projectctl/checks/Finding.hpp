@@ -7,15 +7,15 @@
 
 namespace projectctl {
 
-/// Something in a project's definition that somebody should know.
+/// A fault or a note about a project's definition.
 struct Finding {
     enum class Weight {
-        Note,  ///< nobody is misled by it
-        Fault, ///< what the definition says cannot be used as it stands
+        Note,  ///< useful to know, and harmless
+        Fault, ///< a part of the definition cannot be used without a correction
     };
 
     Weight weight;
-    std::string text; ///< one clause in UTF-8, which names what it is about
+    std::string text; ///< one clause in UTF-8, which names its subject
 
     static Finding fault(std::string text) { return {Weight::Fault, std::move(text)}; }
 

@@ -15,13 +15,13 @@ using project::metadata::PathElement;
 namespace {
 
 Finding missing(std::string const& file, std::u16string const& uuid, std::string const& category) {
-    return Finding::fault(file + " bears the label " + inQuotes(uuid) + " of the category " + category +
+    return Finding::fault(file + " has the label " + inQuotes(uuid) + " of the category " + category +
                           ", which does not exist");
 }
 
 Finding repeated(std::string const& file, std::u16string const& label, std::string const& category,
                  std::size_t count) {
-    return Finding::note(file + " bears the label " + inQuotes(label) + " of the category " + category + ' ' +
+    return Finding::note(file + " has the label " + inQuotes(label) + " of the category " + category + ' ' +
                          std::to_string(count) + " times");
 }
 
@@ -65,7 +65,7 @@ std::map<std::u16string, LabelCheck::Counts> LabelCheck::labelsOn(Node const& no
     for (auto const& category : node.getChildren()) {
         auto const uuid = category->get(treeSchema::files::categoryUUIDKey);
         if (category->getType() != treeSchema::files::categoryType || uuid.empty()) {
-            continue; // every reader passes over it
+            continue; // no reader uses it
         }
         for (auto const& label : category->getChildren()) {
             if (label->getType() == treeSchema::files::labelType &&
@@ -81,7 +81,7 @@ void LabelCheck::checkCategory(std::string const& file, std::u16string const& uu
                                Findings& findings) const {
     auto const category = categories_.find(uuid);
     if (category == categories_.end()) {
-        findings.push_back(Finding::fault(file + " bears a label of the category " + inQuotes(uuid) +
+        findings.push_back(Finding::fault(file + " has a label of the category " + inQuotes(uuid) +
                                           ", which does not exist"));
         return;
     }
@@ -97,7 +97,7 @@ void LabelCheck::checkCategory(std::string const& file, std::u16string const& uu
         }
     }
     if (category->second.isSingleValued && total > 1) {
-        findings.push_back(Finding::fault(file + " bears " + std::to_string(total) +
+        findings.push_back(Finding::fault(file + " has " + std::to_string(total) +
                                           " labels of the category " + name + ", which allows one"));
     }
 }

@@ -10,20 +10,21 @@
 
 namespace projectctl {
 
-/// Compares the labels on files with the categories and labels of the project. A merge, or a label that
-/// stands on a file twice and is deleted, leaves labels on files that nobody can resolve any more.
+/// Compares the labels on files with the categories and labels of the project. After a merge, or after the
+/// deletion of a label that a file has twice, files can have labels that do not exist.
 class LabelCheck {
 public:
     /// Reads all categories and labels. The caller holds a read guard, and holds it while it checks.
     explicit LabelCheck(project::metadata::MetadataManager& store);
 
-    /// What is wrong with the labels on one file. Cheap for a file without labels.
+    /// Adds the faults of the labels on one file to the findings. Cheap for a file without labels.
     /// @param path relative to the root. @param node of the file.
     void check(std::u16string_view path, project::metadata::MetadataNode const& node, ShownPaths& shown,
                Findings& findings) const;
 
 private:
-    /// A category as the store has it. One without a node exists for nobody who reads a file's labels.
+    /// A category in the store. A category without a node is left out: it does not exist for readers of a
+    /// file's labels.
     struct Category {
         std::u16string name;
         bool isSingleValued = false;
@@ -32,7 +33,7 @@ private:
 
     using Node = project::metadata::MetadataNode;
 
-    /// How often each label stands on a file, by UUID.
+    /// The number of times that a file has each label, by UUID.
     using Counts = std::map<std::u16string, std::size_t>;
 
     static std::map<std::u16string, Counts> labelsOn(Node const& node);

@@ -21,13 +21,13 @@ void checkMergeSetup(fl::filesystem::Path const& root, Findings& findings) {
         break;
     case MergeSetup::OtherCommand:
         findings.push_back(
-            Finding::note("git merges the project's text with another command than 'projectctl "
-                          "setup' configures"));
+            Finding::note("git merges the project's text with another command than the one that "
+                          "'projectctl setup' configures"));
         break;
     case MergeSetup::ProgramMissing:
         findings.push_back(
             Finding::fault("git merges the project's text line by line: the merge driver calls a "
-                           "program that cannot be run; 'projectctl setup' configures it anew"));
+                           "program that cannot be run; 'projectctl setup' configures it again"));
         break;
     case MergeSetup::NoRepository:
     case MergeSetup::Works:

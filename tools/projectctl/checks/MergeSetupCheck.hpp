@@ -5,8 +5,8 @@
 
 namespace projectctl {
 
-/// Reports a repository that does not merge the project's text with this tool. Nothing where the user has
-/// asked to leave git alone.
+/// Reports a git repository that does not merge the project's text with this tool. Reports nothing if the
+/// user turned source control off.
 /// @param root the project's root.
 void checkMergeSetup(fl::filesystem::Path const& root, Findings& findings);
 

@@ -10,8 +10,8 @@ void checkName(std::u16string_view path, ShownPaths& shown, Findings& findings) 
     if (backslash != std::u16string_view::npos &&
         (separator == std::u16string_view::npos || separator < backslash)) {
         findings.push_back(Finding::note(inQuotes(shown.of(path)) +
-                                         " has a backslash in its name: entry points of it, and "
-                                         "of what is below it, and references to it cannot be found again"));
+                                         " has a backslash in its name: entry points of it or of files "
+                                         "below it, and references to it, cannot be found again"));
     }
 }
 

@@ -7,8 +7,8 @@
 
 namespace projectctl {
 
-/// Notes a file or folder whose name holds a backslash. What is stored of entry points and references has "/"
-/// for it, and so does not lead back.
+/// Notes a file or folder whose name contains a backslash. Entry points and references store "/" instead of
+/// it, so they cannot find the file again.
 /// @param path relative to the root.
 void checkName(std::u16string_view path, ShownPaths& shown, Findings& findings);
 

@@ -6,8 +6,8 @@
 
 namespace projectctl {
 
-/// What the definition of a project says and nobody can follow, because what it refers to is gone or what it
-/// says twice is allowed once. Looks at what the project lists, not at the whole store.
+/// Finds the parts of a project's definition that refer to something that does not exist, or that contradict
+/// each other. Reads only the files that the project lists, not the whole store.
 /// @param shown for the paths in findings.
 Findings findProblems(OpenProject& project, ShownPaths shown);
 

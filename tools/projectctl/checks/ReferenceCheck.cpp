@@ -38,7 +38,7 @@ void ReferenceCheck::checkForms(ReferenceList const& list, References const& ref
         bool const isReference = node && address.leaf().getType() == treeSchema::references::referenceType;
         if (isReference && !read.contains(uuid)) {
             findings_.push_back(Finding::note("the reference " + inQuotes(uuid) + " in " + list.name +
-                                              " is not shown, because nothing there reads its type " +
+                                              " is not shown, because this list does not support its type " +
                                               inQuotes(node->get(treeSchema::references::typeKey))));
         }
     }
@@ -47,14 +47,14 @@ void ReferenceCheck::checkForms(ReferenceList const& list, References const& ref
 void ReferenceCheck::checkTargets(ReferenceList const& list, References const& references) {
     for (auto const& reference : references) {
         auto const& folder = reference.getLocation();
-        auto const what =
+        auto const subject =
             "the reference " + inQuotes(shown_.of(reference.getStoredPath())) + " in " + list.name;
         if (!project::metadata::is_directory(folder)) {
-            findings_.push_back(
-                Finding::note(what + " leads nowhere: there is no folder " + inQuotes(folder.native())));
+            findings_.push_back(Finding::note(subject + " cannot be followed: the folder " +
+                                              inQuotes(folder.native()) + " does not exist"));
         } else if (list.isOfProjects && findProjectIn(folder) == ProjectTrace::None) {
-            findings_.push_back(
-                Finding::note(what + " leads to no project: there is none in " + inQuotes(folder.native())));
+            findings_.push_back(Finding::note(subject + " cannot be followed: the folder " +
+                                              inQuotes(folder.native()) + " does not contain a project"));
         }
     }
 }

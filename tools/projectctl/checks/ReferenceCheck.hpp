@@ -9,8 +9,8 @@
 
 namespace projectctl {
 
-/// What is stored of folder references and leads nowhere on this machine, or is in a form that the list does
-/// not read.
+/// Finds references to folders that do not exist on this machine, and references of a type that their list
+/// does not support.
 class ReferenceCheck {
 public:
     /// @param shown for the paths in findings, borrowed.

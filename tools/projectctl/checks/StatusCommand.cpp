@@ -19,16 +19,17 @@ namespace projectctl {
 
 namespace {
 
-/// Tells in what the project and the disk differ.
+/// Shows the differences between the project and the disk, and the problems of the definition.
 class StatusCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
             "status",
-            "Tell what is new on disk and not in the project, what is in the project and gone, and what "
-            "in the project refers to something that is gone");
-        app->add_flag("--json", json_, "As a JSON object with the arrays \"new\", \"gone\" and \"problems\"");
-        app->add_flag("--gitignore", gitignore_, "Leave out what git ignores");
+            "Show the files on disk that are not in the project, the files in the project that are not on "
+            "disk, and references to things that do not exist");
+        app->add_flag("--json", isJson_,
+                      "Write a JSON object with the arrays \"new\", \"gone\" and \"problems\"");
+        app->add_flag("--gitignore", leavesOutIgnored_, "Leave out files that git ignores");
         return app;
     }
 
@@ -39,10 +40,10 @@ public:
         for (auto const& line : scan.unreadable()) {
             printError("warning: " + line);
         }
-        Differences found{gitignore_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
-                          findProblems(project, json_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_))};
+        Differences found{leavesOutIgnored_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
+                          findProblems(project, isJson_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_))};
         checkMergeSetup(root_, found.problems);
-        json_ ? writeJson(found) : writeLines(found);
+        isJson_ ? writeJson(found) : writeLines(found);
         return 0;
     }
 
@@ -70,7 +71,7 @@ private:
         auto const kept = withoutIgnoredByGit(root_, std::move(paths));
         Files result;
         for (auto const& file : files) {
-            if (result.size() < kept.size() && file.path == kept[result.size()]) { // they keep their order
+            if (result.size() < kept.size() && file.path == kept[result.size()]) { // in the same order
                 result.push_back(file);
             }
         }
@@ -85,16 +86,16 @@ private:
             output().text() += (isFault ? "bad  " : "note ") + withoutControls(problem.text, false) + '\n';
         }
         if (found.added.empty() && found.gone.empty() && found.problems.empty()) {
-            output().say("The project and the disk hold the same files.");
+            output().say("The project and the disk contain the same files.");
         }
     }
 
-    /// @param standsForContents whether a folder is shown alone instead of what is in it.
-    void writeLines(char const* word, Files const& files, bool standsForContents) const {
+    /// @param hasSlashes whether folders end with a slash, because they are shown without their contents.
+    void writeLines(char const* word, Files const& files, bool hasSlashes) const {
         ShownPaths shown(root_);
         for (auto const& file : files) {
             std::u16string path(shown.ofAbsolute(file.path));
-            path += standsForContents && file.kind == Kind::Folder ? u"/" : u"";
+            path += hasSlashes && file.kind == Kind::Folder ? u"/" : u"";
             output().text() += word;
             output().name(path);
             output().text() += '\n';
@@ -128,8 +129,8 @@ private:
     }
 
     Path root_;
-    bool json_ = false;
-    bool gitignore_ = false;
+    bool isJson_ = false;
+    bool leavesOutIgnored_ = false;
 };
 
 } // namespace

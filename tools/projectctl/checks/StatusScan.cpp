@@ -11,7 +11,8 @@ namespace {
 using Listed = project::stores::Children::const_iterator;
 using Found = std::vector<DiskEntry>::const_iterator;
 
-/// Which of two sorted lists has the next name: below 0 the first, above 0 the second, 0 both.
+/// Compares the next names of two sorted lists: less than 0 if the first list has the smaller one, greater
+/// than 0 if the second has, 0 if they are equal.
 int orderOf(Listed file, Listed lastFile, Found entry, Found lastEntry) {
     if (file == lastFile || entry == lastEntry) {
         return file == lastFile ? 1 : -1;
@@ -70,14 +71,14 @@ void StatusScan::lookFor(Path const& folder, Address const& address, Child const
         return; // it is not in the project
     }
     if (isOnDisk(folder, name)) {
-        compareListed(path, address.child(file.element)); // of a kind that is left out, but somebody added it
+        compareListed(path, address.child(file.element)); // scans leave out its kind, but a user added it
     } else {
         takeGone(path);
     }
 }
 
 void StatusScan::takeAdded(Path const& folder, DiskEntry const& entry) {
-    if (folder != root_ || !entry.name.starts_with(u"..")) { // those cannot be added
+    if (folder != root_ || !entry.name.starts_with(u"..")) { // such names cannot be added
         added_.push_back({folder / Path(entry.name), entry.kind});
     }
 }

@@ -20,17 +20,17 @@ public:
 
     explicit StatusScan(OpenProject& project);
 
-    /// To be called once.
+    /// Makes the comparison. Call it once.
     void run(Progress& progress);
 
-    /// On disk and not in the project. A folder stands for everything below it, none of which is in the
-    /// project either.
+    /// The files and folders that are on disk but not in the project. A folder without any files in the
+    /// project is listed without its contents.
     std::vector<File> const& added() const noexcept { return added_; }
 
-    /// In the project and gone from the disk.
+    /// The files and folders that are in the project but not on disk.
     std::vector<File> const& gone() const noexcept { return gone_; }
 
-    /// One line for each folder that could not be looked into.
+    /// One line for each folder that could not be read.
     std::vector<std::string> const& unreadable() const noexcept { return unreadable_; }
 
 private:

@@ -22,7 +22,7 @@ using project::metadata::MetadataPath;
 
 namespace {
 
-/// The address step by step, for what has no better name.
+/// The steps of an address, for findings about nodes that have no name.
 std::string described(MetadataPath const& address) {
     std::string result;
     for (auto const& element : address.getPath()) {
@@ -87,7 +87,7 @@ void TreeCheck::checkHead(Address const& head) {
         checkReferences(head);
     } else if (head != ProjectManagerBase::getRootNodePath() &&
                head != ProjectManagerBase::getDescriptionNodePath().parent()) {
-        note("nothing in this version knows what is kept at " + described(head));
+        note("this version does not use the data at " + described(head));
     }
 }
 
@@ -114,12 +114,12 @@ void TreeCheck::checkFile(Address const& file) {
     }
     auto const node = store_.getNode(file);
     if (!node) {
-        return; // what lies below it says so
+        return; // the files below it are reported
     }
     auto const above = file.parent();
     if (above.depth() > 1 && !store_.hasNode(above)) {
         fault("the file " + inQuotes(shown_.of(pathOf(file))) +
-              " is listed and its folder is not, so that no list of the project shows it");
+              " is in the project but its folder is not, so listings do not show it");
     }
     if (file[0].getLocation() == treeSchema::rootLocation) {
         checkName(pathOf(file), shown_, findings_);
@@ -173,12 +173,11 @@ void TreeCheck::checkReferences(Address const& head) {
     }
 }
 
-bool TreeCheck::requireNode(Address const& address, std::string const& what) {
+bool TreeCheck::requireNode(Address const& address, std::string const& kind) {
     if (store_.hasNode(address)) {
         return true;
     }
-    fault(what + ' ' + inQuotes(address.leaf().getLocation()) +
-          " has an address and nothing is stored there");
+    fault(kind + ' ' + inQuotes(address.leaf().getLocation()) + " has an address without a node");
     return false;
 }
 

@@ -8,15 +8,15 @@
 
 namespace projectctl {
 
-/// Looks through the whole tree of a project for what the managers would stumble over or pass by in silence.
+/// Searches the whole tree of a project for nodes that the managers fail on or silently ignore.
 ///
-/// It reads the store and not the managers' lists, since those end at the first fault.
+/// It reads the store and not the managers' lists, because these fail on the first fault.
 class TreeCheck {
 public:
-    /// Takes the store's read guard and keeps it, so that all of it is one state of the project.
+    /// Takes the store's read guard and holds it, so that all findings are about one state of the project.
     explicit TreeCheck(OpenProject& project);
 
-    /// All that is found. To be called once.
+    /// Makes all checks. Call it once.
     Findings run();
 
 private:
@@ -30,7 +30,7 @@ private:
     void checkEntryPoints(Address const& head);
     void checkGroups(Address const& head);
     void checkReferences(Address const& head);
-    bool requireNode(Address const& address, std::string const& what);
+    bool requireNode(Address const& address, std::string const& kind);
     void fault(std::string text);
     void note(std::string text);
 

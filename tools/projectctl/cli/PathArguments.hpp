@@ -15,7 +15,7 @@ using fl::filesystem::Path;
 class PathArguments {
 public:
     /// Declares the arguments, at least one, and the option -0.
-    /// @param description what the command does with the paths, for its help.
+    /// @param description of the paths, for the help.
     void declare(CLI::App& app, std::string const& description);
 
     /// The paths, absolute, in the given order. Reads standard input if the arguments say so.

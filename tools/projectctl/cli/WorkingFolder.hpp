@@ -10,7 +10,7 @@ namespace projectctl {
 /// @throws Failure when it does not exist any more.
 fl::filesystem::Path workingFolder();
 
-/// Makes another folder the current one, as if the tool had been called there.
+/// Changes the current folder, as if the tool had been called there.
 /// @param folder bytes of an argument, relative to the current folder or absolute. Nothing happens if it is
 /// empty.
 /// @throws Failure if it is not a folder that can be entered.

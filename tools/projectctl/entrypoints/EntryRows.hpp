@@ -6,7 +6,7 @@
 
 namespace projectctl {
 
-/// Entry points as a JSON array of objects on standard output, with everything that is stored of each.
+/// Writes entry points with all their data to standard output, as a JSON array of objects.
 class EntryRows {
 public:
     /// @param root of the project, borrowed. Paths are relative to it.
@@ -14,7 +14,7 @@ public:
 
     void add(project::management::EntryPoint const& entry);
 
-    /// Ends the output. To be called once, after the last entry point.
+    /// Ends the output. Call it once, after the last entry point.
     void finish() { rows_.finishOutput(); }
 
 private:

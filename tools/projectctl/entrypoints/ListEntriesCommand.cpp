@@ -18,8 +18,7 @@ public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app =
             group.add_subcommand("list", "List the entry points of the project, sorted by file");
-        auto* const json =
-            app->add_flag("--json", isJson_, "Write a JSON array of objects with everything that is stored");
+        auto* const json = app->add_flag("--json", isJson_, "Write a JSON array of objects with all data");
         app->add_flag("-0,--null", isNullEnded_, "Write only the files, each ended by a zero byte")
             ->excludes(json);
         return app;

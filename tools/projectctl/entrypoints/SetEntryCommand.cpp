@@ -45,11 +45,10 @@ public:
         auto* const hidden = app->add_flag("--hidden", isHidden_, "Hide it from users");
         app->add_flag("--visible", isVisible_, "Show it to users (default)")->excludes(hidden);
         takeText(*app, "--group", group_, "The name or UUID of its group (default: the default group)");
-        takeTexts(*app, "--extension", extensions_,
-                  "KEY=VALUE, to be stored with it; may be given several times")
+        takeTexts(*app, "--extension", extensions_, "KEY=VALUE to store with it; may be given several times")
             ->allow_extra_args(false);
         takeTexts(*app, "--no-extension", removed_,
-                  "KEY of an extension to be deleted; may be given several times")
+                  "KEY of an extension to delete; may be given several times")
             ->allow_extra_args(false);
         return app;
     }

@@ -20,8 +20,7 @@ using project::management::EntryPoint;
 class ShowEntryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app =
-            group.add_subcommand("show", "Show everything that is stored of a file's entry point");
+        auto* const app = group.add_subcommand("show", "Show all data of a file's entry point");
         takeText(*app, "FILE", file_, "A file of the project")->required();
         app->add_flag("--json", isJson_, "Write a JSON array of one object");
         return app;

@@ -113,7 +113,7 @@ private:
         unaddable_ = walk.unaddable();
         auto result = walk.found();
         if (leavesOutIgnored_) {
-            progress.begin("Asking git what it ignores");
+            progress.begin("Asking git for ignored files");
             result = withoutIgnoredByGit(project.root(), std::move(result));
         }
         requireReadable(walk.unreadable(), given, result);

@@ -29,8 +29,8 @@ std::vector<DiskEntry> readDiskFolder(Path const& folder);
 bool isOnDisk(Path const& path);
 
 /// The same for a name that the project lists in a folder. False, without access to the disk, for names that
-/// cannot be in a folder and lead elsewhere: "..", ".", and names with a separator. A text that somebody else
-/// wrote may contain them.
+/// cannot be in a folder and lead elsewhere: "..", ".", and names with a separator. A text that another
+/// person wrote may contain them.
 bool isOnDisk(Path const& folder, std::u16string const& name);
 
 /// Whether the path is a folder, not a symbolic link to one.

@@ -37,8 +37,8 @@ public:
     }
 
 private:
-    /// A text that somebody else wrote may list files outside the root. Removing such a file from the project
-    /// would also remove it from git's index, where it belongs to another part of the repository.
+    /// A text that another person wrote may list files outside the root. Removing such a file from the
+    /// project would also remove it from git's index, where it belongs to another part of the repository.
     static void requireWithinRoot(OpenProject& project, std::vector<Path> const& paths) {
         auto const isOutside = [&project](Path const& path) {
             return path != project.root() && !project::metadata::isParent(path, project.root());

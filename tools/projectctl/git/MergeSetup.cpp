@@ -19,13 +19,13 @@ constexpr char const* driverKey = "merge.project-definition.driver";
 constexpr char const* nameKey = "merge.project-definition.name";
 constexpr char const* textInProject = "./.projectdata/project.jsonl";
 
-// A merge driver that ends with 1 to 128 reports a conflict, and git then keeps whatever the file of "ours"
-// holds. A shell ends with 126 or 127 when it cannot run a program. Both together would lose the other side
-// without a trace, so the command runs the program itself and looks at its exit code: 0 and 1 are the
+// A merge driver that ends with 1 to 128 reports a conflict, and git then keeps the content of the file of
+// "ours". A shell ends with 126 or 127 when it cannot run a program. Both together would lose the other side
+// without a trace, so the command runs the program itself and checks its exit code: 0 and 1 are the
 // program's answer, anything else is followed by a merge of the lines. When the program failed, the command
 // ends with more than 128, which newer versions of git report as an error; the older ones report a conflict,
-// and the markers are in the text. The markers have seven characters whatever %L says: the store knows no
-// others.
+// and the markers are in the text. The markers have seven characters whatever %L says: the store does not
+// recognise any others.
 constexpr std::string_view commandStart = "p=";
 constexpr std::string_view commandEnd =
     R"(; s=127; if test -f "$p" && test -x "$p"; then "$p" merge %O %A %B %P; s=$?; fi; )"

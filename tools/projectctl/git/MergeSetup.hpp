@@ -24,7 +24,7 @@ MergeSetup mergeSetupOf(Path const& folder);
 /// Configures the repository of a folder to merge projects' texts with this program, by its absolute path.
 ///
 /// Where the program cannot be run or fails, the configured command has git merge the text line by line, so
-/// that the text holds both sides or markers around them in every case.
+/// that the text contains both sides or markers around them in every case.
 /// @throws Failure when git refuses.
 void setUpMerge(Path const& folder);
 

@@ -118,7 +118,7 @@ void feed(Descriptor& pipe, std::string_view& input) {
     }
 }
 
-/// Reads what is in the pipe now. Closes it at its end.
+/// Reads the bytes that are in the pipe now. Closes it at its end.
 void drain(Descriptor& pipe, std::string& to) {
     std::array<char, 65536> piece; // NOLINT(cppcoreguidelines-pro-type-member-init): read fills it
     auto const got = read(pipe.get(), piece.data(), piece.size());

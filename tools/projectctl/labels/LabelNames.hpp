@@ -24,8 +24,8 @@ public:
     project::management::CategoryIdentifier category(std::string const& name);
 
     /// A label of a category.
-    /// @throws what category throws; LabelDoesNotExistsByUUID; Failure if no label or several labels have the
-    ///         name.
+    /// @throws the same errors as category(); LabelDoesNotExistsByUUID; Failure if no label or several labels
+    ///         have the name.
     project::management::Label label(std::string const& category, std::string const& name);
 
     /// The same, but UUIDs are accepted even if the label or its category was deleted. Files may still have

@@ -11,7 +11,7 @@ class OutputClosed {};
 
 /// The tool's standard output, buffered.
 ///
-/// The destructor drops what is in the buffer. Callers flush at the end of their work, so that an output that
+/// The destructor discards the buffer. Callers flush at the end of their work, so that an output that
 /// cannot be written is reported.
 class Output {
 public:
@@ -29,7 +29,7 @@ public:
     /// Writes the buffer when it is large enough to be worth a system call.
     void flushWhenLarge();
 
-    /// Appends a line that confirms what was done, on a terminal only.
+    /// Appends a line that confirms a change, on a terminal only.
     void say(std::string_view line);
 
     /// Writes the buffer.

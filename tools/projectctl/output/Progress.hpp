@@ -10,7 +10,7 @@
 
 namespace projectctl {
 
-/// Shows on the terminal what the tool is working on: one line, after a second, deleted at the end.
+/// Shows the current work of the tool on the terminal: one line, after a second, deleted at the end.
 ///
 /// A thread draws the line, because the work may be one long call into the library. Without a terminal there
 /// is no thread, and nothing is written.

@@ -71,7 +71,7 @@ public:
     /// Of files that were just added, stages those whose removal is staged.
     void stageReturned(std::vector<Path> const& files) { access_.stageReturned(files); }
 
-    /// Makes stage() count a change that was made through text().
+    /// Marks the text as changed through text(), so that stage() stages it.
     void stageLater() noexcept { access_.markTextForStaging(); }
 
     /// The files below some folders that git tracks and that are not in the project. @param folders absolute.

@@ -6,7 +6,7 @@ namespace projectctl {
 
 namespace {
 
-/// Rewrites the text in its canonical form, so that a commit contains only what changed.
+/// Rewrites the text in its canonical form, so that a commit contains only real changes.
 class TidyCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {

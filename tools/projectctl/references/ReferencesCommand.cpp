@@ -16,7 +16,7 @@ public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
             "references",
-            "Follow the references to other projects. Exits with 1 if a project is missing or unreadable, or "
+            "Follow the references to other projects. Exits with 3 if a project is missing or unreadable, or "
             "if projects reference each other in a cycle");
         app->add_flag("--graph", isGraph_, "Show all projects that are reached, with their references")
             ->required();
