@@ -8,8 +8,8 @@
 #include "project/entrypoints/EntryPoint.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
-// 1,000 entry points in a project of 100,000 files: listing them, and removing a folder of twenty files with
-// those of its files.
+// 1,000 entry points in a project of 100,000 files: listing them, and removing a folder of twenty files
+// together with their entry points.
 
 namespace project::benchmarks {
 namespace {
@@ -20,7 +20,7 @@ using management::ProjectManager;
 
 constexpr std::size_t entryPoints = 1'000;
 
-/// Every hundredth file, which is one in each fifth folder.
+/// Every hundredth file: one file in every fifth folder.
 std::vector<Path> entryFiles(GeneratedTree const& tree) {
     std::vector<Path> result;
     auto const step = tree.files().size() / entryPoints;
@@ -43,7 +43,7 @@ std::vector<std::string> rowsOf(GeneratedTree const& tree, std::vector<Path> con
     return result;
 }
 
-/// A project on the tree that has been read already, with its entry points.
+/// Opens the project of the tree, adds the entry points, and reads it once.
 std::unique_ptr<ProjectManager> openWithEntries(GeneratedTree const& tree) {
     tree.fillProject();
     auto project = tree.openProject();
@@ -84,7 +84,7 @@ void listInSqlite(benchmark::State& state) {
     }
 }
 
-/// The first files of the tree, which lie in one folder.
+/// The files in the first folder of the tree.
 std::vector<Path> firstFolder(GeneratedTree const& tree) {
     constexpr std::ptrdiff_t filesInAFolder = 20;
     return {tree.files().begin(), tree.files().begin() + filesInAFolder};

@@ -27,11 +27,11 @@ std::string folderName(std::size_t number) {
 GeneratedTree::GeneratedTree(std::size_t files) {
     auto pattern = (std::filesystem::temp_directory_path() / "project-benchmark-XXXXXX").string();
     if (mkdtemp(pattern.data()) == nullptr) {
-        throw std::runtime_error("no temporary folder could be made at " + pattern);
+        throw std::runtime_error("cannot create a temporary folder at " + pattern);
     }
     root_ = std::filesystem::canonical(pattern);
     rootPath_ = fl::filesystem::fromSystem(root_);
-    std::fprintf(stderr, "making %zu files in %s\n", files, root_.c_str());
+    std::fprintf(stderr, "creating %zu files in %s\n", files, root_.c_str());
     for (std::size_t made = 0; made < files; ++made) {
         auto const folder = root_ / folderName(made / filesInAFolder);
         if (made % filesInAFolder == 0) {
@@ -53,7 +53,7 @@ GeneratedTree const& GeneratedTree::large() {
     return tree;
 }
 
-fl::filesystem::Path GeneratedTree::makeFile(std::string const& name) const {
+fl::filesystem::Path GeneratedTree::createFile(std::string const& name) const {
     auto const file = root_ / folderName(0) / name;
     std::ofstream(file).flush();
     return fl::filesystem::fromSystem(file);

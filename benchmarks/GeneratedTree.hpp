@@ -10,7 +10,7 @@
 
 namespace project::benchmarks {
 
-/// A tree of folders with twenty empty files each, on disk in a temporary folder; gone with the object.
+/// A tree of folders with twenty empty files each, in a temporary folder. The destructor deletes it.
 class GeneratedTree {
 public:
     explicit GeneratedTree(std::size_t files);
@@ -25,22 +25,22 @@ public:
 
     fl::filesystem::Path const& root() const { return rootPath_; }
 
-    /// The files, absolute; the folders come with them.
+    /// The absolute paths of the files. Adding a file to a project also adds its folders.
     std::vector<fl::filesystem::Path> const& files() const { return files_; }
 
-    /// Makes one more file in the first folder.
-    fl::filesystem::Path makeFile(std::string const& name) const;
+    /// Creates one more file in the first folder.
+    fl::filesystem::Path createFile(std::string const& name) const;
 
-    /// A project on the tree with the text store, as a new process would open it.
+    /// Opens the project of the tree with the text store, like a new process.
     std::unique_ptr<management::ProjectManager> openProject() const;
 
-    /// Removes the project's definition.
+    /// Deletes the project's definition.
     void removeProject() const;
 
-    /// Sees to it that all files are in the project.
+    /// Adds all files to the project, if they are not in it yet.
     void fillProject() const;
 
-    /// Sees to it that the tree is a git repository with all files in its index.
+    /// Creates a git repository with all files in its index, if there is none yet.
     void fillRepository() const;
 
 private:

@@ -7,8 +7,8 @@
 #include "project/core/LabelManager.hpp"
 #include "project/files/FileLabel.hpp"
 
-// Labels on 10,000 files of a project of 100,000: putting one on all of them in one step, asking one file for
-// its labels, and deleting the category.
+// Labels on 10,000 files of a project of 100,000: putting one label on all of them in one step, looking up
+// the labels of one file, and deleting the category.
 
 namespace project::benchmarks {
 namespace {
@@ -19,7 +19,7 @@ using management::LabelDefinition;
 using management::ProjectManager;
 
 constexpr std::size_t labelled = 10'000;
-constexpr std::size_t stride = 7919; // a prime, so that questions jump over the labelled files
+constexpr std::size_t stride = 7919; // a prime, so that look-ups are spread over the labelled files
 
 std::vector<fl::filesystem::Path> labelledFiles(GeneratedTree const& tree) {
     std::vector<fl::filesystem::Path> result;
@@ -45,7 +45,7 @@ Label makeLabel(ProjectManager& project) {
     return label;
 }
 
-/// A project on the tree that has been read already, and no categories.
+/// Opens the project of the tree without categories, and reads it once.
 std::unique_ptr<ProjectManager> openRead(GeneratedTree const& tree) {
     tree.fillProject();
     auto project = tree.openProject();
@@ -84,7 +84,7 @@ void deleteInProject(benchmark::State& state) {
     }
 }
 
-void askProject(benchmark::State& state) {
+void lookUpInProject(benchmark::State& state) {
     auto const& tree = GeneratedTree::large();
     auto const project = openRead(tree);
     auto const files = labelledFiles(tree);
@@ -93,7 +93,7 @@ void askProject(benchmark::State& state) {
     std::size_t next = 0;
     for (auto _ : state) {
         if (project->getFileManager().getLabels(files[next]).size() != 1) {
-            state.SkipWithError("the label has gone");
+            state.SkipWithError("the label is missing");
         }
         next = (next + stride) % files.size();
     }
@@ -122,14 +122,14 @@ void deleteInSqlite(benchmark::State& state) {
     }
 }
 
-void askSqlite(benchmark::State& state) {
+void lookUpInSqlite(benchmark::State& state) {
     auto const rows = labelledRows(GeneratedTree::large());
     TemporaryPeer peer;
     peer->putLabel(rows, "Status", "Done");
     std::size_t next = 0;
     for (auto _ : state) {
         if (peer->labelsOn(rows[next]) != 1) {
-            state.SkipWithError("the label has gone");
+            state.SkipWithError("the label is missing");
         }
         next = (next + stride) % rows.size();
     }
@@ -143,11 +143,11 @@ void askSqlite(benchmark::State& state) {
     repeat(benchmark::RegisterBenchmark("labels/put-on-10000/sqlite", putInSqlite));
     repeat(benchmark::RegisterBenchmark("labels/delete-category/project", deleteInProject));
     repeat(benchmark::RegisterBenchmark("labels/delete-category/sqlite", deleteInSqlite));
-    benchmark::RegisterBenchmark("labels/of-one-file/project", askProject)->UseRealTime();
-    benchmark::RegisterBenchmark("labels/of-one-file/sqlite", askSqlite)->UseRealTime();
+    benchmark::RegisterBenchmark("labels/of-one-file/project", lookUpInProject)->UseRealTime();
+    benchmark::RegisterBenchmark("labels/of-one-file/sqlite", lookUpInSqlite)->UseRealTime();
     Ratios::compare("one label put on 10,000 of 100,000 files to one SQLite transaction of 10,000 rows",
                     "labels/put-on-10000/project", {"labels/put-on-10000/sqlite"});
-    Ratios::compare("a category deleted that stands on 10,000 of 100,000 files to one indexed DELETE",
+    Ratios::compare("a category deleted with its labels on 10,000 of 100,000 files to one indexed DELETE",
                     "labels/delete-category/project", {"labels/delete-category/sqlite"});
     Ratios::compare("getLabels of one file to one SELECT by key", "labels/of-one-file/project",
                     {"labels/of-one-file/sqlite"});

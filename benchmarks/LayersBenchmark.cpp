@@ -7,8 +7,8 @@
 #include "Ratios.hpp"
 #include "project/session.hpp"
 
-// What source control and events cost over the bare managers, in a git repository: adding one file to a
-// project of 100,000, and adding all 100,000.
+// The cost of source control and events compared with the managers alone, in a git repository: adding one
+// file to a project of 100,000, and adding all 100,000.
 
 namespace project::benchmarks {
 namespace {
@@ -18,8 +18,8 @@ using session::Options;
 using session::Session;
 using session::SourceControl;
 
-/// A repository over the tree with nothing in its index.
-void makeEmptyRepository(GeneratedTree const& tree) {
+/// Creates a repository in the tree, with an empty index.
+void createEmptyRepository(GeneratedTree const& tree) {
     std::filesystem::remove_all(tree.onDisk() / ".git");
     runSilently(tree.onDisk(), {"git", "init", "-q"});
 }
@@ -33,7 +33,7 @@ void addAllInSession(benchmark::State& state) {
     for (auto _ : state) {
         state.PauseTiming();
         tree.removeProject();
-        makeEmptyRepository(tree);
+        createEmptyRepository(tree);
         auto session = Session::create(tree.root(), u"benchmark");
         state.ResumeTiming();
         session.project().getFileManager().add(tree.files());
@@ -58,7 +58,7 @@ void addAllByGit(benchmark::State& state) {
     tree.removeProject();
     for (auto _ : state) {
         state.PauseTiming();
-        makeEmptyRepository(tree);
+        createEmptyRepository(tree);
         state.ResumeTiming();
         runSilently(tree.onDisk(), {"git", "add", "."});
     }
@@ -68,7 +68,7 @@ void addAllByGit(benchmark::State& state) {
 std::vector<Path> freshFiles(benchmark::State const& state, std::string const& name) {
     std::vector<Path> result;
     for (benchmark::IterationCount number = 0; number < state.max_iterations; ++number) {
-        result.push_back(GeneratedTree::large().makeFile(name + std::to_string(number)));
+        result.push_back(GeneratedTree::large().createFile(name + std::to_string(number)));
     }
     return result;
 }
@@ -80,11 +80,11 @@ void removeFiles(management::ProjectManager& project, std::vector<Path> const& f
     }
 }
 
-/// In a repository that tracks all files and the project's text.
+/// Adds one file in a repository that tracks all files and the project's text.
 void addOneInSession(benchmark::State& state, SourceControl sourceControl) {
     auto const& tree = GeneratedTree::large();
     tree.fillProject();
-    makeEmptyRepository(tree);
+    createEmptyRepository(tree);
     runSilently(tree.onDisk(), {"git", "add", "."});
     Options options;
     options.sourceControl = sourceControl;
@@ -99,11 +99,11 @@ void addOneInSession(benchmark::State& state, SourceControl sourceControl) {
     removeRepository(tree);
 }
 
-/// The same by the command: the file, and a text of the size of the project's that has changed.
+/// The same with `git add`: the file, and a changed text of the same size as the project's text.
 void addOneByGit(benchmark::State& state) {
     auto const& tree = GeneratedTree::large();
     tree.fillProject();
-    makeEmptyRepository(tree);
+    createEmptyRepository(tree);
     runSilently(tree.onDisk(), {"git", "add", "."});
     auto const files = freshFiles(state, "git");
     auto const text = tree.onDisk() / ".projectdata" / "project.jsonl";
@@ -151,12 +151,12 @@ void addOneBare(benchmark::State& state) {
     often(benchmark::RegisterBenchmark("layers/add-one/off", addOneInSession, SourceControl::Off));
     often(benchmark::RegisterBenchmark("layers/add-one/bare", addOneBare));
     often(benchmark::RegisterBenchmark("layers/add-one/git-add", addOneByGit));
-    Ratios::compare("100,000 files added in a session to the bare manager and git add",
+    Ratios::compare("100,000 files added in a session to the manager alone and git add",
                     "layers/add-all/session", {"layers/add-all/bare", "layers/add-all/git-add"});
-    Ratios::compare("  the same to the bare manager", "layers/add-all/session", {"layers/add-all/bare"});
-    Ratios::compare("one file added in a session to the bare manager and git add of file and text",
+    Ratios::compare("  the same to the manager alone", "layers/add-all/session", {"layers/add-all/bare"});
+    Ratios::compare("one file added in a session to the manager alone and git add of file and text",
                     "layers/add-one/session", {"layers/add-one/bare", "layers/add-one/git-add"});
-    Ratios::compare("  the same to the bare manager", "layers/add-one/session", {"layers/add-one/bare"});
+    Ratios::compare("  the same to the manager alone", "layers/add-one/session", {"layers/add-one/bare"});
     Ratios::compare("  the same with the text staged when asked", "layers/add-one/text-when-asked",
                     {"layers/add-one/bare"});
     Ratios::compare("  the same without source control", "layers/add-one/off", {"layers/add-one/bare"});

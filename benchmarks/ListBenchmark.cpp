@@ -17,7 +17,7 @@ void listProject(benchmark::State& state) {
     for (auto _ : state) {
         auto project = tree.openProject();
         auto files = project->getFileManager().getProjectFiles();
-        state.PauseTiming(); // the peers keep nothing that has to be destroyed
+        state.PauseTiming(); // the peers have no objects to destroy
         if (files.size() < tree.files().size()) {
             state.SkipWithError("files are missing");
         }

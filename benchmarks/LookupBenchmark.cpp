@@ -6,12 +6,12 @@
 #include "SqlitePeer.hpp"
 #include "project/core/FileManager.hpp"
 
-// Asking for one file of a project of 100,000.
+// Looking up one file in a project of 100,000.
 
 namespace project::benchmarks {
 namespace {
 
-constexpr std::size_t stride = 7919; // a prime, so that questions jump over the whole tree
+constexpr std::size_t stride = 7919; // a prime, so that look-ups are spread over the whole tree
 
 void lookUpInProject(benchmark::State& state) {
     auto const& tree = GeneratedTree::large();

@@ -8,16 +8,16 @@
 
 namespace project::benchmarks {
 
-/// Shows results as usual and keeps the times, so that the ratios can be printed at the end: machines differ
-/// and are noisy, and only what ran side by side can be compared.
+/// Shows results as usual and stores the times, so that print() can show ratios. Machines differ and are
+/// noisy: only times that were measured in the same run can be compared.
 class Ratios : public benchmark::ConsoleReporter {
 public:
-    /// Registers a ratio of one benchmark's time to the sum of its peers' times.
-    static void compare(std::string what, std::string benchmark, std::vector<std::string> peers);
+    /// Registers the ratio of one benchmark's time to the sum of its peers' times.
+    static void compare(std::string title, std::string benchmark, std::vector<std::string> peers);
 
     void ReportRuns(std::vector<Run> const& runs) override;
 
-    /// Prints every ratio of which all benchmarks ran.
+    /// Prints each ratio whose benchmarks were all run.
     void print() const;
 
 private:

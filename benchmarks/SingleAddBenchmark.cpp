@@ -10,7 +10,7 @@
 #include "Ratios.hpp"
 #include "project/core/FileManager.hpp"
 
-// One durable add into a full project, beside the least that any durable change costs on the same disk.
+// One durable add into a large project, compared with the minimum cost of a durable change on the same disk.
 
 namespace project::benchmarks {
 namespace {
@@ -20,7 +20,7 @@ void addOne(benchmark::State& state, GeneratedTree const& tree, std::string cons
     auto const project = tree.openProject();
     std::vector<fl::filesystem::Path> extra;
     for (auto number = 0; number < state.max_iterations; ++number) {
-        extra.push_back(tree.makeFile(name + std::to_string(number)));
+        extra.push_back(tree.createFile(name + std::to_string(number)));
     }
     benchmark::DoNotOptimize(project->getFileManager().isFileInProject(extra[0]));
     std::size_t next = 0;

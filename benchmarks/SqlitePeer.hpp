@@ -9,8 +9,8 @@ struct sqlite3_stmt;
 
 namespace project::benchmarks {
 
-/// Tables of paths, of the labels on them and of entry points in an SQLite database set up as one that must
-/// not lose a commit: WAL, synchronous FULL.
+/// An SQLite database with tables of paths, of their labels and of entry points. It is configured not to lose
+/// a commit: WAL, synchronous FULL.
 class SqlitePeer {
 public:
     explicit SqlitePeer(std::filesystem::path const& file);
@@ -27,22 +27,22 @@ public:
     void putLabel(std::vector<std::string> const& paths, std::string const& category,
                   std::string const& label);
 
-    /// The labels on a path with their categories. @return how many there are.
+    /// Reads the labels of a path with their categories. @return their number.
     std::size_t labelsOn(std::string const& path);
 
-    /// Takes all labels of a category off all paths.
+    /// Removes all labels of a category from all paths.
     void deleteCategory(std::string const& category);
 
-    /// Makes each path an entry point, in one transaction.
+    /// Inserts an entry point for each path, in one transaction.
     void insertEntries(std::vector<std::string> const& paths);
 
-    /// Reads all entry points whose path is there. @return how many there were.
+    /// Reads all entry points whose path is in the table of paths. @return their number.
     std::size_t entries();
 
-    /// Removes paths with their entry points in one transaction.
+    /// Deletes paths with their entry points in one transaction.
     void remove(std::vector<std::string> const& paths);
 
-    /// Reads all rows. @return how many there were.
+    /// Reads all paths. @return their number.
     std::size_t list();
 
 private:

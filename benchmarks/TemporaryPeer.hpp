@@ -7,7 +7,7 @@
 
 namespace project::benchmarks {
 
-/// A fresh database beside the large tree, gone with the object.
+/// An empty database beside the large tree. The destructor deletes it.
 class TemporaryPeer {
 public:
     TemporaryPeer() : file_(GeneratedTree::large().onDisk() / ".peer.db"), peer_(file_) {}
