@@ -1,11 +1,11 @@
-# The layers of the library and how their targets are made.
+# Functions that create the targets of the library's layers.
 
-# Options of every piece of code that is written here.
+# The compiler options of all our code.
 add_library(project_build_options INTERFACE)
 target_compile_features(project_build_options INTERFACE cxx_std_20)
 target_compile_options(project_build_options INTERFACE -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
 
-# In a unity build GCC takes each included source for a header, and warns of types in its unnamed namespace.
+# In a unity build GCC treats each included source as a header, and warns of types in its unnamed namespace.
 if(CMAKE_UNITY_BUILD AND CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
   target_compile_options(project_build_options INTERFACE -Wno-subobject-linkage)
 endif()
@@ -14,15 +14,15 @@ find_package(Threads REQUIRED)
 
 # project_add_layer(<name> DEPENDS <targets>...)
 #
-# Makes a layer from the sources that its folders add to project_<name>_compiled:
+# Creates a layer from the sources that its folders add to project_<name>_compiled:
 #   project_<name>_compiled  the objects, with hidden visibility
 #   project_<name>           the shared library of them, also as project::<name>
-#   project_<name>_objects   the same objects for tests, which may look inside src/
+#   project_<name>_objects   the same objects for tests, which may include headers of src/
 function(project_add_layer name)
   cmake_parse_arguments(layer "" "" "DEPENDS;TEST_INCLUDES" ${ARGN})
   set(include_root "${CMAKE_CURRENT_SOURCE_DIR}/include")
   if(NOT EXISTS "${include_root}")
-    set(include_root "${CMAKE_CURRENT_SOURCE_DIR}/../include") # src/ has its public headers beside it
+    set(include_root "${CMAKE_CURRENT_SOURCE_DIR}/../include") # the public headers of src/ are beside it
   endif()
 
   add_library(project_${name}_compiled OBJECT)
@@ -37,7 +37,7 @@ function(project_add_layer name)
   add_library(project::${name} ALIAS project_${name})
   set_target_properties(project_${name} PROPERTIES
     EXPORT_NAME ${name} LINKER_LANGUAGE CXX VERSION ${PROJECT_VERSION} SOVERSION ${PROJECT_VERSION_MAJOR}
-    INSTALL_RPATH "$ORIGIN") # installed libraries find each other wherever that is
+    INSTALL_RPATH "$ORIGIN") # installed libraries find each other in any folder
   target_include_directories(project_${name}
     PUBLIC "$<BUILD_INTERFACE:${include_root}>" "$<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>")
   target_link_libraries(project_${name} PUBLIC ${layer_DEPENDS})
@@ -46,7 +46,7 @@ endfunction()
 
 # project_add_objects(<name> LAYERS <layers>... DEPENDS <targets>... INCLUDES <folders>...)
 #
-# An interface target that carries the objects of some layers, for tests that look inside.
+# Creates an interface target with the objects of some layers, for tests that include internal headers.
 function(project_add_objects name)
   cmake_parse_arguments(objects "" "" "LAYERS;DEPENDS;INCLUDES" ${ARGN})
   add_library(project_${name}_objects INTERFACE)

@@ -1,13 +1,13 @@
-# Compiles message texts and puts them into a target.
+# Compiles message texts and embeds them in a target.
 
 find_program(GENRB genrb REQUIRED)
 find_program(PKGDATA pkgdata REQUIRED)
 
 # project_embed_messages(<target> <package> <locale>.txt...)
 #
-# Makes ICU package data of the texts, one bundle for each file, and links it into the target as the hidden
-# array `extern "C" unsigned char const <package>[]`, aligned as ICU wants it. The folder must be listed by
-# the one that makes the target, or be it.
+# Creates ICU package data from the texts, one bundle for each file, and links it into the target as the hidden
+# array `extern "C" unsigned char const <package>[]`, aligned as ICU requires. Call this in the folder
+# that creates the target, or in a folder that it adds.
 function(project_embed_messages target package)
   set(folder "${CMAKE_CURRENT_BINARY_DIR}/${package}")
   file(MAKE_DIRECTORY "${folder}")

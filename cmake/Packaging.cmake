@@ -19,7 +19,7 @@ install(FILES
   "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfigVersion.cmake"
   DESTINATION "${package_folder}")
 
-# Relative to the file itself, since the prefix may be another one when it is installed.
+# Relative to the file itself, because the prefix can change at installation.
 file(RELATIVE_PATH from_pkgconfig_to_prefix "/prefix/${CMAKE_INSTALL_LIBDIR}/pkgconfig" "/prefix")
 configure_file(packaging/project-management.pc.in "${CMAKE_CURRENT_BINARY_DIR}/project-management.pc" @ONLY)
 install(FILES "${CMAKE_CURRENT_BINARY_DIR}/project-management.pc" DESTINATION "${CMAKE_INSTALL_LIBDIR}/pkgconfig")
