@@ -88,11 +88,11 @@ protected:
     }
 
     /// Expects that a call succeeded, and warned of exactly these folders, which lost their labels.
-    static void expectLoss(ProgramResult const& result, std::set<std::string> const& folders) {
+    static void expectLoss(ProgramResult const& result, std::set<std::string> const& unlabelled) {
         EXPECT_EQ(result.exitCode, 0);
         EXPECT_EQ(result.output, "");
         Lines expected;
-        for (auto const& folder : folders) {
+        for (auto const& folder : unlabelled) {
             expected.insert("projectctl: warning: the folder \"" + folder +
                             "\" has lost its labels, because a path below it was added");
         }
