@@ -26,7 +26,7 @@ TEST(JsonString, theControlCharactersOfTerminalsAreEscapedOnRequest) {
     EXPECT_EQ(contentOf(u"\n\x1B", JsonEscapes::Controls), R"(\n\u001b)");
 }
 
-TEST(JsonString, pairsOfSurrogatesAreUtf8AndLoneOnesAreEscaped) {
+TEST(JsonString, surrogatePairsAreUtf8AndLoneSurrogatesAreEscaped) {
     for (auto const escapes : {JsonEscapes::Required, JsonEscapes::Controls}) {
         EXPECT_EQ(contentOf(u"\xD83D\xDE00", escapes), "\xF0\x9F\x98\x80");
         EXPECT_EQ(contentOf(u"\xDE00\xD83D", escapes), R"(\ude00\ud83d)");

@@ -22,7 +22,7 @@ TEST(StoreError, namesTheFileTheLineTheProblemAndTheRemedy) {
     EXPECT_EQ(error.getRemedy(), "Restore it from source control.");
 }
 
-TEST(StoreError, leavesOutWhatIsNotThere) {
+TEST(StoreError, omitsMissingParts) {
     EXPECT_STREQ(StoreError(StoreError::Kind::DiskFailed, "/p", 0, "no permission", "Ask the owner.").what(),
                  "/p: no permission. Ask the owner.");
     EXPECT_STREQ(StoreError(StoreError::Kind::DiskFailed, "", 0, "the disk is full", "").what(),
@@ -31,7 +31,7 @@ TEST(StoreError, leavesOutWhatIsNotThere) {
                  "the disk is full.");
 }
 
-TEST(StoreError, recordsWhereItWasMadeAndACopyKeepsThat) {
+TEST(StoreError, recordsItsOriginAndACopyKeepsIt) {
     StoreError const error(StoreError::Kind::DiskFailed, "/p", 0, "no permission", "");
     StoreError const copy(error);
 

@@ -216,7 +216,7 @@ void CrashPoints::checkNames(Situation const& now) {
     }
 }
 
-TEST(CrashPointsOfTheStore, atEveryCallEveryFaultLeavesTheStateBeforeOrTheStateAfter) {
+TEST(CrashPointsOfTheStore, everyFaultAtEveryCallLeavesTheStateBeforeOrTheStateAfter) {
     auto const seed = testSeed();
     SCOPED_TRACE("to repeat it: PROJECT_TEST_SEED=" + std::to_string(seed));
     auto const wanted = numberFromEnvironment("PROJECT_TEST_CRASH_POINTS", 0);

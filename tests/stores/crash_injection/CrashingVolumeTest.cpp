@@ -57,7 +57,7 @@ protected:
     CrashingDisk disk{volume};
 };
 
-TEST_F(CrashingVolumeForgetting, whatWasSyncedIsThereAfterAnyPowerCut) {
+TEST_F(CrashingVolumeForgetting, syncedDataSurvivesAnyPowerCut) {
     makeDurable("a", "12");
     append("34");
     disk.sync();
@@ -65,7 +65,7 @@ TEST_F(CrashingVolumeForgetting, whatWasSyncedIsThereAfterAnyPowerCut) {
     EXPECT_THAT(contentsAfterPowerCuts("a"), ElementsAre("1234"));
 }
 
-TEST_F(CrashingVolumeForgetting, anySubsetOfTheWritesThatWereNotSyncedIsLeftAndThoseMayBeTorn) {
+TEST_F(CrashingVolumeForgetting, anySubsetOfTheUnsyncedWritesIsKeptAndMayBeTorn) {
     makeDurable("a", "");
     append("12");
     append("34");
@@ -80,7 +80,7 @@ TEST_F(CrashingVolumeForgetting, anySubsetOfTheWritesThatWereNotSyncedIsLeftAndT
         << "the length of a write without its data";
 }
 
-TEST_F(CrashingVolumeForgetting, writesOfTwoFilesAreLostByThemselves) {
+TEST_F(CrashingVolumeForgetting, writesToTwoFilesAreLostIndependently) {
     makeDurable("a", "");
     makeDurable("b", "");
     append("x");
@@ -98,7 +98,7 @@ TEST_F(CrashingVolumeForgetting, aNewNameIsLostUntilTheFolderIsSynced) {
     EXPECT_THAT(afterPowerCuts(described), ElementsAre("a=x"));
 }
 
-TEST_F(CrashingVolumeForgetting, aRemovedNameComesBackUntilTheFolderIsSynced) {
+TEST_F(CrashingVolumeForgetting, aRemovedNameMayReappearUntilTheFolderIsSynced) {
     makeDurable("a", "x");
     disk.remove("a");
     EXPECT_THAT(afterPowerCuts(described), UnorderedElementsAre("", "a=x"));
@@ -107,7 +107,7 @@ TEST_F(CrashingVolumeForgetting, aRemovedNameComesBackUntilTheFolderIsSynced) {
     EXPECT_THAT(afterPowerCuts(described), ElementsAre(""));
 }
 
-TEST_F(CrashingVolumeForgetting, eachNameOfARenamedFileIsThereOrNotByItself) {
+TEST_F(CrashingVolumeForgetting, eachNameOfARenamedFileExistsOrNotIndependently) {
     makeDurable("a", "x");
     disk.rename("a", "b");
 
@@ -122,7 +122,7 @@ TEST_F(CrashingVolumeForgetting, eachOfTwoExchangedNamesLeadsToEitherFile) {
     EXPECT_THAT(afterPowerCuts(described), UnorderedElementsAre("a=x b=x", "a=x b=y", "a=y b=x", "a=y b=y"));
 }
 
-TEST_F(CrashingVolumeForgetting, aNameLeadsToAnyFileThatItLedToSinceTheLastSync) {
+TEST_F(CrashingVolumeForgetting, aNameMayLeadToAnyOfItsFilesSinceTheLastSync) {
     makeDurable("a", "1");
     makeDurable("b", "2");
     makeDurable("c", "3");
@@ -132,7 +132,7 @@ TEST_F(CrashingVolumeForgetting, aNameLeadsToAnyFileThatItLedToSinceTheLastSync)
     EXPECT_THAT(contentsAfterPowerCuts("a"), UnorderedElementsAre("1", "2", "3"));
 }
 
-TEST_F(CrashingVolumeForgetting, whatASyncFailedToWriteIsNotMadeDurableByALaterOne) {
+TEST_F(CrashingVolumeForgetting, dataOfAFailedSyncIsNotMadeDurableByALaterOne) {
     makeDurable("a", "");
     append("1");
     volume->plan(CrashingVolume::InjectedFault::Fails, 0);
@@ -159,7 +159,7 @@ TEST_F(CrashingVolumeForgetting, aStampIsLostUntilTheFileIsSynced) {
     EXPECT_THAT(afterPowerCuts(question), ElementsAre("kept"));
 }
 
-TEST_F(CrashingVolumeForgetting, aFolderWhoseMakerDiedAtItMayGoAndOneThatWasMadeStays) {
+TEST_F(CrashingVolumeForgetting, aFolderWhoseCreatorDiedInTheCallMayBeLostAndACreatedOneStays) {
     EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "gone"; }),
                 ElementsAre("there"));
 
@@ -172,7 +172,7 @@ TEST_F(CrashingVolumeForgetting, aFolderWhoseMakerDiedAtItMayGoAndOneThatWasMade
                 UnorderedElementsAre("there", "gone"));
 }
 
-TEST_F(CrashingVolumeForgetting, aRemovedFolderMayComeBack) {
+TEST_F(CrashingVolumeForgetting, aRemovedFolderMayReappear) {
     disk.removeFolder();
 
     EXPECT_FALSE(volume->hasFolder());
@@ -180,7 +180,7 @@ TEST_F(CrashingVolumeForgetting, aRemovedFolderMayComeBack) {
                 UnorderedElementsAre("there", "gone"));
 }
 
-TEST_F(CrashingVolumeForgetting, aCopyGoesItsOwnWay) {
+TEST_F(CrashingVolumeForgetting, aCopyIsIndependent) {
     makeDurable("a", "1");
     append("2");
     disk.rename("a", "b");
@@ -228,7 +228,7 @@ protected:
     }
 };
 
-TEST_F(CrashingVolumeDying, beforeAmidAndAfterACallLeaveNothingAPartAndAll) {
+TEST_F(CrashingVolumeDying, dyingBeforeAmidOrAfterACallLeavesNothingAPartOrAll) {
     EXPECT_THAT(left(InjectedFault::DiesBefore), ElementsAre(""));
     EXPECT_THAT(left(InjectedFault::DiesAfter), ElementsAre("12345678"));
     EXPECT_THAT(left(InjectedFault::DiesAmid),
@@ -236,7 +236,7 @@ TEST_F(CrashingVolumeDying, beforeAmidAndAfterACallLeaveNothingAPartAndAll) {
     EXPECT_THAT(left(InjectedFault::Dies), IsSupersetOf({"12345678", "1234"}));
 }
 
-TEST_F(CrashingVolumeDying, theLockGoesWithTheProcess) {
+TEST_F(CrashingVolumeDying, theLockIsReleasedWhenTheProcessDies) {
     disk.openFolder();
     disk.lock(std::chrono::milliseconds(1));
     volume->plan(InjectedFault::DiesBefore, 0);
@@ -247,7 +247,7 @@ TEST_F(CrashingVolumeDying, theLockGoesWithTheProcess) {
     EXPECT_TRUE(next.lock(std::chrono::milliseconds(1)));
 }
 
-TEST_F(CrashingVolumeDying, aFaultComesToTheCallThatIsMeantAndForGoodOrOnce) {
+TEST_F(CrashingVolumeDying, aFaultHitsThePlannedCallOnceOrPermanently) {
     volume->plan(InjectedFault::Fails, 1);
     disk.identify("a");
     EXPECT_EQ("", volume->faulted());
@@ -262,7 +262,7 @@ TEST_F(CrashingVolumeDying, aFaultComesToTheCallThatIsMeantAndForGoodOrOnce) {
     EXPECT_TRUE(disk.identify("a"));
 }
 
-TEST(CrashingVolumeFolding, namesInOtherCapitalsLeadToTheSameFileAndKeepTheirs) {
+TEST(CrashingVolumeFolding, namesThatDifferInCaseLeadToTheSameFileWhichKeepsItsCase) {
     auto const volume = std::make_shared<CrashingVolume>();
     volume->foldsNames = true;
     volume->makeFolder();

@@ -34,7 +34,7 @@ protected:
     }
 };
 
-TEST_F(FileSystems, whereNothingCanBeWrittenProjectsOpenForReading) {
+TEST_F(FileSystems, projectsOnReadOnlyFileSystemsOpenForReading) {
     auto const readOnly = [](SystemCall const& call) { return call.isChange() ? EROFS : 0; };
     for (auto const& operation : systemOperations()) {
         auto const project = projectFor(operation);
@@ -59,13 +59,13 @@ TEST_F(FileSystems, whereNothingCanBeWrittenProjectsOpenForReading) {
     }
 }
 
-TEST_F(FileSystems, whereFilesCanNotBeExchangedEverythingIsDoneAllTheSame) {
+TEST_F(FileSystems, everyOperationWorksWithoutExchange) {
     for (int const error : {EINVAL, ENOSYS, EOPNOTSUPP}) {
         expectAllOperationsDone(refusing(RENAME_EXCHANGE, error));
     }
 }
 
-TEST_F(FileSystems, whereFilesCanNotBeExchangedAnyOtherCallMayFailToo) {
+TEST_F(FileSystems, anyOtherCallMayFailWithoutExchange) {
     for (bool const isForGood : {false, true}) {
         bool isReached = true;
         for (std::size_t call = 0; isReached && !HasFailure(); ++call) {
@@ -75,23 +75,23 @@ TEST_F(FileSystems, whereFilesCanNotBeExchangedAnyOtherCallMayFailToo) {
     EXPECT_GT(hits["renameat"], 0U);
 }
 
-TEST_F(FileSystems, whereARenameCanNotLookOutForOthersEverythingIsDoneAllTheSame) {
+TEST_F(FileSystems, everyOperationWorksWithoutRenamesThatKeepExistingFiles) {
     for (int const error : {EINVAL, ENOSYS, EOPNOTSUPP}) {
         expectAllOperationsDone(refusing(RENAME_NOREPLACE, error));
     }
 }
 
-TEST_F(FileSystems, whereRenamesCanDoNeitherEverythingIsDoneAllTheSame) {
+TEST_F(FileSystems, everyOperationWorksWithPlainRenamesOnly) {
     expectAllOperationsDone([](SystemCall const& call) { return call.name == "renameat2" ? ENOSYS : 0; });
 }
 
-TEST_F(FileSystems, whereTimesModesAndOwnersAreNotKeptEverythingIsDoneAllTheSame) {
+TEST_F(FileSystems, everyOperationWorksWithoutTimesModesAndOwners) {
     expectAllOperationsDone([](SystemCall const& call) {
         return call.name == "futimens" || call.name == "fchmod" || call.name == "fchown" ? EPERM : 0;
     });
 }
 
-TEST_F(FileSystems, whereANameIsRefusedTheErrorNamesItAndNothingIsLost) {
+TEST_F(FileSystems, aRefusedNameIsAnErrorThatNamesItAndNothingIsLost) {
     for (int const error : {ENAMETOOLONG, EINVAL, EILSEQ}) {
         for (auto const& operation : {rewritingOperation(), creatingOperation()}) {
             auto const project = projectFor(operation);
@@ -108,7 +108,7 @@ TEST_F(FileSystems, whereANameIsRefusedTheErrorNamesItAndNothingIsLost) {
     }
 }
 
-TEST_F(FileSystems, whereTheFolderItselfIsRefusedTheErrorNamesItAndNothingIsLeft) {
+TEST_F(FileSystems, aRefusedFolderIsAnErrorThatNamesItAndNothingIsLeft) {
     auto const operation = creatingOperation();
     auto const project = projectFor(operation);
 
@@ -122,7 +122,7 @@ TEST_F(FileSystems, whereTheFolderItselfIsRefusedTheErrorNamesItAndNothingIsLeft
 }
 
 /// Git can create names that differ from the store's only in case.
-TEST_F(FileSystems, namesInOtherCapitalsAreSomebodyElsesWhereCapitalsCount) {
+TEST_F(FileSystems, namesThatDifferInCaseBelongToOthersOnCaseSensitiveFileSystems) {
     auto const operation = creatingOperation();
     auto const project = projectFor(operation);
     project->root.addFile(".ProjectData/project.jsonl", textOf(addFiles({u"theirs"})));

@@ -21,7 +21,7 @@ protected:
     Batch const files = addFiles(manyFiles(20));
 };
 
-TEST_F(FoldingNames, aTextInOtherCapitalsIsTheProjectsText) {
+TEST_F(FoldingNames, aTextWhoseNameDiffersInCaseIsTheProjectsText) {
     for (auto const& options : {rewriting(), appending()}) {
         auto const backend = open(options);
         EXPECT_EQ(contentAfter({files}), contentOf(*backend));
@@ -36,7 +36,7 @@ TEST_F(FoldingNames, aTextInOtherCapitalsIsTheProjectsText) {
     EXPECT_EQ("* text\n", volume->content(".gitattributes"));
 }
 
-TEST_F(FoldingNames, aFirstBatchTakesNoNameThatIsTaken) {
+TEST_F(FoldingNames, aFirstBatchUsesNoTakenName) {
     volume->remove("PROJECT.JSONL");
     volume->replaceFile("project.jsonl.NOTES", "theirs");
 
@@ -48,7 +48,7 @@ TEST_F(FoldingNames, aFirstBatchTakesNoNameThatIsTaken) {
     EXPECT_EQ("* text\n", volume->content(".gitattributes"));
 }
 
-TEST_F(FoldingNames, atEveryCallEveryFaultLeavesTheBatchInOrOut) {
+TEST_F(FoldingNames, everyFaultAtEveryCallLeavesTheBatchCommittedOrNot) {
     using InjectedFault = CrashingVolume::InjectedFault;
     auto const with = contentAfter({files, addFiles({u"b"})});
     for (auto const fault : {InjectedFault::Fails, InjectedFault::FailsForGood, InjectedFault::DiesBefore,

@@ -28,7 +28,7 @@ Syncs syncsOf(SystemOperation const& operation) {
     return {calls.counts["fdatasync"], calls.counts["fsync"]};
 }
 
-TEST(RealSyncCounts, eachOperationSyncsAsOftenAsItMustAndNotMore) {
+TEST(RealSyncCounts, eachOperationMakesExactlyTheNecessarySyncs) {
     std::map<std::string, Syncs> const expected{
         {"append", {1, 0}},
         {"rewrite", {1, 1}},

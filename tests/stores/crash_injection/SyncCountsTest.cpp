@@ -94,7 +94,7 @@ TEST_F(SyncCounts, aRewriteIsOneSyncOfTheFileAndOneOfTheFolder) {
     EXPECT_EQ(1U, volume->count("syncFolder"));
 }
 
-TEST_F(SyncCounts, aRewriteWithoutExchangeTakesNoSyncMore) {
+TEST_F(SyncCounts, aRewriteWithoutExchangeNeedsNoFurtherSync) {
     prepare({u"a"});
     volume->canExchange = false;
     auto const backend = open();
@@ -121,7 +121,7 @@ TEST_F(SyncCounts, aWriterThatHasNotReadReadsOnce) {
                 ElementsAreArray(joined({lockAndClear, readInLockedFolder, wholeAppend})));
 }
 
-TEST_F(SyncCounts, tidyingIsARewriteAndNothingWhereTheTextIsTidy) {
+TEST_F(SyncCounts, tidyingIsARewriteUnlessTheTextIsTidy) {
     prepareText(textOf(addFiles(manyFiles(20)), {addFiles({u"b"})}));
     auto const backend = open(appending());
     contentOf(*backend);
@@ -132,7 +132,7 @@ TEST_F(SyncCounts, tidyingIsARewriteAndNothingWhereTheTextIsTidy) {
     EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAgain, look})));
 }
 
-TEST_F(SyncCounts, closingIsARewriteAfterAnAppendAndElseNothing) {
+TEST_F(SyncCounts, closingRewritesAfterAnAppendAndOtherwiseDoesNothing) {
     prepare(manyFiles(20));
     auto reader = open(appending());
     auto rewriter = open();
@@ -159,7 +159,7 @@ TEST_F(SyncCounts, repairMakesTheDamagedLinesDurableFirst) {
             {lockAndClear, readInLockedFolder, {"create damaged", "sync", "syncFolder"}, wholeRewrite})));
 }
 
-TEST_F(SyncCounts, settlingIsARewrite) {
+TEST_F(SyncCounts, resolvingIsARewrite) {
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
     prepareText(conflict);
@@ -182,7 +182,7 @@ TEST_F(SyncCounts, discardingABatchSyncsNothing) {
                 ElementsAreArray(joined({lockAndClear, look})));
 }
 
-TEST_F(SyncCounts, discardingAFirstBatchTakesAwayWhatWasMadeAndSyncsNothing) {
+TEST_F(SyncCounts, discardingAFirstBatchDeletesTheNewFilesAndSyncsNothing) {
     auto const backend = open();
 
     EXPECT_THAT(callsOf([&] {
@@ -196,7 +196,7 @@ TEST_F(SyncCounts, discardingAFirstBatchTakesAwayWhatWasMadeAndSyncsNothing) {
                                           "identify .gitignore", "remove .gitignore", "removeFolder"}})));
 }
 
-TEST_F(SyncCounts, aLookIsOneQuestionAndReadsOnlyWhatOthersHaveAdded) {
+TEST_F(SyncCounts, aCheckForChangesIsOneCallAndReadsOnlyAppendedBatches) {
     prepare(manyFiles(20));
     auto const reader = open(appending());
     auto const writer = open(appending());
@@ -213,7 +213,7 @@ TEST_F(SyncCounts, aLookIsOneQuestionAndReadsOnlyWhatOthersHaveAdded) {
     EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(look));
 }
 
-TEST_F(SyncCounts, aFileSystemThatKeepsNoStampsCostsOneReadingMoreAfterAWrite) {
+TEST_F(SyncCounts, aFileSystemWithoutStampsCostsOneMoreReadAfterAWrite) {
     prepare({u"a"});
     volume->keepsStamps = false;
     auto const backend = open();

@@ -92,7 +92,7 @@ SystemCalls::Answer failing(std::string_view name, std::size_t callsBefore) {
 }
 
 /// The last check before an append is committed.
-TEST_F(SystemFaults, aFolderThatCanNotBeLookedAtIsNotTakenForOneThatWasMovedAway) {
+TEST_F(SystemFaults, aFolderThatCannotBeExaminedIsNotTakenForAMovedOne) {
     auto const operation = appendingOperation();
     auto const project = projectFor(operation);
     constexpr std::size_t looksBefore = 2; // when it is locked, and before the append
@@ -104,7 +104,7 @@ TEST_F(SystemFaults, aFolderThatCanNotBeLookedAtIsNotTakenForOneThatWasMovedAway
     checkAfterwards(operation, *project, thrown);
 }
 
-TEST_F(SystemFaults, aNewTextThatCanNotBeLookedAtIsNotPutInPlace) {
+TEST_F(SystemFaults, aNewTextThatCannotBeExaminedDoesNotReplaceTheOldOne) {
     auto const operation = rewritingOperation();
     auto const project = projectFor(operation);
     constexpr std::size_t looksBefore = 2; // at the folder, and at the new file's mode
@@ -117,7 +117,7 @@ TEST_F(SystemFaults, aNewTextThatCanNotBeLookedAtIsNotPutInPlace) {
     checkAfterwards(operation, *project, thrown);
 }
 
-TEST_F(SystemFaults, whenANewTextCanNotBeWrittenNothingOfItIsLeft) {
+TEST_F(SystemFaults, aNewTextThatCannotBeWrittenLeavesNothing) {
     auto const operation = rewritingOperation();
     auto const project = projectFor(operation);
 
@@ -128,7 +128,7 @@ TEST_F(SystemFaults, whenANewTextCanNotBeWrittenNothingOfItIsLeft) {
 }
 
 /// On some file systems, a full disk is reported when a file is closed.
-TEST_F(SystemFaults, aFileThatCanNotBeClosedAfterASyncIsNotDurable) {
+TEST_F(SystemFaults, aFileThatCannotBeClosedAfterASyncIsNotDurable) {
     for (auto const& operation : {appendingOperation(), rewritingOperation(), creatingOperation()}) {
         auto const project = projectFor(operation);
 

@@ -167,7 +167,7 @@ TEST_F(TreeAfterFailures, aWriteThatFailsAtAnyCallLeavesTheTreeAsItWas) {
     EXPECT_EQ(0U, reversals) << "no file comes or goes with a later batch";
 }
 
-TEST_F(TreeAfterFailures, aFirstWriteThatFailsAtAnyCallTellsListenersThatTheFilesWent) {
+TEST_F(TreeAfterFailures, aFirstWriteThatFailsAtAnyCallNotifiesListenersOfTheDeletion) {
     for (auto const write : {addAndChange, makeSome}) {
         failEverywhere(write, rewriting());
     }

@@ -88,7 +88,7 @@ protected:
     TemporaryFolder root;
 };
 
-TEST_F(SystemDisk, theFolderIsMadeOnceAndRemovedWhenEmpty) {
+TEST_F(SystemDisk, theFolderIsCreatedOnceAndRemovedWhenEmpty) {
     auto const disk = makeSystemDisk(root.path(), stores::TextBackend::folderName);
     EXPECT_FALSE(disk->openFolder());
 
@@ -114,7 +114,7 @@ TEST_F(SystemDisk, aMissingRootIsAnErrorThatNamesIt) {
     EXPECT_THAT(error.getRemedy(), HasSubstr("moved or deleted"));
 }
 
-TEST_F(SystemDisk, whatWasWrittenIsReadBackFromAnyOffset) {
+TEST_F(SystemDisk, contentIsReadBackFromAnyOffset) {
     auto const disk = openDisk();
     auto const made = disk->create("a", "hello", std::nullopt);
     disk->sync();
@@ -134,7 +134,7 @@ TEST_F(SystemDisk, whatWasWrittenIsReadBackFromAnyOffset) {
     EXPECT_FALSE(disk->identifyByPath("b"));
 }
 
-TEST_F(SystemDisk, longContentComesThroughWhole) {
+TEST_F(SystemDisk, longContentIsReadBackCompletely) {
     auto const disk = openDisk();
     std::string const bytes(10'000'000, 'x');
 
@@ -209,7 +209,7 @@ TEST_F(SystemDisk, aNewTextHasModeAndOwnerOfTheOldOne) {
     EXPECT_EQ(statusOf("old").st_gid, statusOf("new").st_gid);
 }
 
-TEST_F(SystemDisk, aWriteOfSomebodyElseRightAfterOursAlwaysShows) {
+TEST_F(SystemDisk, aWriteByAnotherProgramRightAfterOursIsAlwaysDetected) {
     auto const disk = openDisk();
     auto state = disk->create("a", "0", std::nullopt);
     ASSERT_TRUE(state.isStamped);
@@ -227,7 +227,7 @@ TEST_F(SystemDisk, aWriteOfSomebodyElseRightAfterOursAlwaysShows) {
     }
 }
 
-TEST_F(SystemDisk, aPipeNeverHangsIt) {
+TEST_F(SystemDisk, aPipeNeverBlocksIt) {
     auto const disk = openDisk();
     ASSERT_EQ(0, ::mkfifo(at("a").c_str(), 0600));
 
@@ -317,7 +317,7 @@ TEST_F(SystemDisk, aFileBeyondTheLimitIsAnErrorAndNotTheEndOfTheProcess) {
     EXPECT_EQ(0, sigismember(&pending, SIGXFSZ));
 }
 
-TEST_F(SystemDisk, noFileIsWrittenBeyondTheLengthThatIsReadAgain) {
+TEST_F(SystemDisk, noFileIsWrittenBeyondTheReadableLength) {
     auto const disk = openDisk();
     disk->create("a", "x", std::nullopt);
     std::filesystem::resize_file(at("a"), stores::Disk::longestFile - 1);
@@ -348,7 +348,7 @@ TEST_F(SystemDisk, aFullFileSystemIsAnErrorThatSaysWhatToDo) {
         std::string(error.what()));
 }
 
-TEST_F(SystemDisk, theLockKeepsOthersOutUntilItIsLetGo) {
+TEST_F(SystemDisk, theLockKeepsOthersOutUntilItIsReleased) {
     auto const disk = openDisk();
     auto const other = openDisk();
     ASSERT_TRUE(disk->lock(std::chrono::milliseconds(0)));
@@ -381,7 +381,7 @@ TEST_F(SystemDisk, theHolderOfTheLockIsNamedWithItsCommand) {
     EXPECT_EQ("process " + std::to_string(child.id()) + " (" + command + ")", disk->lockHolder());
 }
 
-TEST_F(SystemDisk, theLockOfAProcessThatDiesIsFree) {
+TEST_F(SystemDisk, theLockOfADeadProcessIsReleased) {
     auto const disk = openDisk();
     ChildProcess child([this](ChildProcess::Parent const& parent) {
         auto const theirs = openDisk();
@@ -430,7 +430,7 @@ TEST_F(SystemDisk, theChildOfAForkHoldsNothingAndRefusesToWork) {
     EXPECT_EQ("hello", content("a"));
 }
 
-TEST_F(SystemDisk, aForkThatMeetsManyOpeningsLeavesNoDescriptorInTheChild) {
+TEST_F(SystemDisk, aForkDuringManyOpensLeavesNoDescriptorInTheChild) {
     auto const disk = openDisk();
     disk->create("a", "hello", std::nullopt);
     std::atomic<bool> stop = false;

@@ -205,7 +205,7 @@ TEST_F(HostileFolder, aTextOfAnImpossibleLengthIsAnErrorAtOnce) {
     expectRefused();
 }
 
-TEST_F(HostileFolder, aTextThatGrowsAsItIsReadComesToAnEnd) {
+TEST_F(HostileFolder, readingATextThatGrowsEnds) {
     prepareText(bodyOf({"\"a\""}));
     std::atomic<bool> enough = false;
     std::thread writer([&] {
@@ -239,7 +239,7 @@ TEST_F(HostileFolder, aTextThatIsSharedWithACopyOfTheProjectIsNeverAppendedTo) {
     EXPECT_EQ(contentOf(*open()), contentAfter({addFiles({longName(), u"a", u"b"})}));
 }
 
-TEST_F(HostileFolder, aTextThatGetsSharedWhileItIsOpenIsNotAppendedToEither) {
+TEST_F(HostileFolder, aTextThatBecomesSharedWhileItIsOpenIsNotAppendedToEither) {
     prepareText(longText("a"));
     auto const store = open();
     contentOf(*store);
@@ -251,7 +251,7 @@ TEST_F(HostileFolder, aTextThatGetsSharedWhileItIsOpenIsNotAppendedToEither) {
     EXPECT_EQ(contentAt(folder_.onDisk() / "copy.jsonl"), before);
 }
 
-TEST_F(HostileFolder, aTextLinkedToAFileOutsideLeavesThatFileAlone) {
+TEST_F(HostileFolder, aTextLinkedToAFileOutsideDoesNotChangeThatFile) {
     fs::create_directory(root() / ".projectdata");
     fs::create_hard_link(outside(), inStore("project.jsonl"));
 
@@ -277,7 +277,7 @@ TEST_F(HostileFolder, thousandsOfLeftoversAndStrangeNamesDoNoHarm) {
     EXPECT_EQ(left, count + 1); // the store does not delete the files with strange names
 }
 
-TEST_F(HostileFolder, whatIsCalledDisplacedIsNamedAndLeftAlone) {
+TEST_F(HostileFolder, filesNamedDisplacedAreReportedAndKept) {
     prepareText(bodyOf({"\"a\""}));
     fs::create_directory(inStore("displaced-folder"));
     putLink(inStore("displaced-link"), outside());

@@ -115,7 +115,7 @@ TEST_F(NeverOutside, whenAHostileProjectIsWritten) {
     EXPECT_FALSE(contentOf(*open()).contains(fileAddress(u"../..")));
 }
 
-TEST_F(NeverOutside, whenADamagedOneIsRepaired) {
+TEST_F(NeverOutside, whenADamagedTextIsRepaired) {
     write(linesThatLeadOutside + "\"/outside.jsonl\"\n{\"file\":\"../../../damage\n");
     expectInside([this] { EXPECT_FALSE(open()->repair().empty()); });
 }
@@ -135,7 +135,7 @@ TEST_F(NeverOutside, whenAStoreIsCreatedAndRolledBack) {
     });
 }
 
-TEST_F(NeverOutside, aCallForAnotherPlaceWouldBeSeen) {
+TEST_F(NeverOutside, aCallForAnotherPlaceIsDetected) {
     RecordedCalls const recorded;
     RecordedCalls::note("openat", -1, outside().c_str());
     RecordedCalls::note("openat", -1, (store() / "..").c_str());

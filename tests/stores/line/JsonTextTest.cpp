@@ -18,7 +18,7 @@ JsonContentScan scanAlone(std::string const& content) {
     return scanJsonContent(content + '"', 0);
 }
 
-TEST(JsonText, everyCodeUnitComesBack) {
+TEST(JsonText, everyCodeUnitIsReadBackUnchanged) {
     for (unsigned unit = 0; unit <= 0xFFFF; ++unit) {
         std::u16string const text(1, static_cast<char16_t>(unit));
         std::string const content = contentOfText(text);
@@ -28,7 +28,7 @@ TEST(JsonText, everyCodeUnitComesBack) {
     }
 }
 
-TEST(JsonText, onlyWhatHasToBeIsEscaped) {
+TEST(JsonText, onlyNecessaryCharactersAreEscaped) {
     EXPECT_EQ(contentOfText(u"a/b\x7F"), "a/b\x7F");
     EXPECT_EQ(contentOfText(u"\"\\"), R"(\"\\)");
     EXPECT_EQ(contentOfText(u"\b\f\n\r\t"), R"(\b\f\n\r\t)");
@@ -36,7 +36,7 @@ TEST(JsonText, onlyWhatHasToBeIsEscaped) {
     EXPECT_EQ(contentOfText(u"\u00E4\u05D0\uFFFF"), "\xC3\xA4\xD7\x90\xEF\xBF\xBF");
 }
 
-TEST(JsonText, pairsOfSurrogatesAreUtf8AndLoneOnesAreEscaped) {
+TEST(JsonText, surrogatePairsAreUtf8AndLoneSurrogatesAreEscaped) {
     EXPECT_EQ(contentOfText(u"\xD83D\xDE00"), "\xF0\x9F\x98\x80");
     EXPECT_EQ(contentOfText(u"\xDE00\xD83D"), R"(\ude00\ud83d)");
     EXPECT_EQ(contentOfText(u"\xD83D\xD83D\xDE00"), "\\ud83d\xF0\x9F\x98\x80");
@@ -60,7 +60,7 @@ TEST(JsonText, contentOfOtherProgramsIsReadAndRecognised) {
     }
 }
 
-TEST(JsonText, whatIsNoContentIsRefused) {
+TEST(JsonText, invalidContentIsRefused) {
     char const* const wrong[] = {
         "a\nb",
         "\x01",
@@ -90,7 +90,7 @@ TEST(JsonText, whatIsNoContentIsRefused) {
     EXPECT_NE(scanJsonContent("abc\\\"", 0).problem, nullptr);
 }
 
-RC_GTEST_PROP(JsonText, anyTextComesBack, ()) {
+RC_GTEST_PROP(JsonText, anyTextIsReadBackUnchanged, ()) {
     std::u16string const text = *samples::anyText();
     std::string const content = contentOfText(text);
     RC_ASSERT(decodeJsonContent(content) == text);
@@ -100,14 +100,14 @@ RC_GTEST_PROP(JsonText, anyTextComesBack, ()) {
     RC_ASSERT(scan.end == content.size());
 }
 
-RC_GTEST_PROP(JsonText, contentsCompareAsTheirTextsDo, ()) {
+RC_GTEST_PROP(JsonText, contentsHaveTheOrderOfTheirTexts, ()) {
     std::u16string const common = *samples::anyText();
     std::u16string const left = common + *samples::anyText();
     std::u16string const right = common + *samples::anyText();
     RC_ASSERT(compareJsonContents(contentOfText(left), contentOfText(right)) == (left.compare(right) <=> 0));
 }
 
-TEST(JsonText, theFirstDifferenceIsFoundAtEveryPlace) {
+TEST(JsonText, theFirstDifferenceIsFoundAtEveryPosition) {
     std::string const text(40, 'x');
     for (std::size_t i = 0; i < text.size(); ++i) {
         std::string other = text;

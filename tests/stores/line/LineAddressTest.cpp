@@ -15,7 +15,7 @@ bool comesBefore(Address const& left, Address const& right) {
     return compare(AddressText(left).view(), AddressText(right).view()) < 0;
 }
 
-TEST(LineAddress, filesAreWrittenAsPathsAndMarkersWithASlashBehind) {
+TEST(LineAddress, filesAreWrittenAsPathsAndMarkersWithATrailingSlash) {
     EXPECT_EQ(AddressText(fileAddress(u"a/b.c")).view().text, "a/b.c");
     Address const marker = fileAddress(u"a").child({u"DIR_SIGNIFIER", u"1"});
     EXPECT_EQ(AddressText(marker).view().text, "a/");
@@ -42,7 +42,7 @@ TEST(LineAddress, everythingElseIsAListOfSteps) {
     }
 }
 
-TEST(LineAddress, aFolderComesBeforeWhatLiesBelowItAndThatBeforeLongerNames) {
+TEST(LineAddress, aFolderSortsBeforeItsContentsAndTheseBeforeLongerNames) {
     Address const sorted[] = {
         fileAddress(u"a"),
         fileAddress(u"a").child({u"DIR_SIGNIFIER", u"1"}),
@@ -61,11 +61,11 @@ TEST(LineAddress, aFolderComesBeforeWhatLiesBelowItAndThatBeforeLongerNames) {
     }
 }
 
-RC_GTEST_PROP(LineAddress, anyAddressComesBack, (Address const& address)) {
+RC_GTEST_PROP(LineAddress, anyAddressIsReadBackUnchanged, (Address const& address)) {
     RC_ASSERT(toAddress(AddressText(address).view()) == address);
 }
 
-RC_GTEST_PROP(LineAddress, writtenAddressesCompareAsAddressesDo, ()) {
+RC_GTEST_PROP(LineAddress, writtenAddressesHaveTheOrderOfTheAddresses, ()) {
     std::vector<Address> const addresses = *samples::fewOf(20, samples::anyAddress());
     for (Address const& left : addresses) {
         for (Address const& right : addresses) {
@@ -76,7 +76,7 @@ RC_GTEST_PROP(LineAddress, writtenAddressesCompareAsAddressesDo, ()) {
     }
 }
 
-RC_GTEST_PROP(LineAddress, whatLiesBelowAnAddressLiesWithinItAsWritten,
+RC_GTEST_PROP(LineAddress, addressesBelowAnAddressAreWrittenWithinIt,
               (Address const& upper, Address const& other)) {
     Address lower = upper;
     for (metadata::PathElement const& step : other.getPath()) {

@@ -50,7 +50,7 @@ TEST(NodeLine, aPlainFileIsJustItsPath) {
     EXPECT_EQ(lineOf(set(fileAddress(u"a/b").child({u"DIR_SIGNIFIER", u"1"}))), R"("a/b/")");
 }
 
-TEST(NodeLine, nothingThatCanBeLeftOutIsWritten) {
+TEST(NodeLine, membersThatCanBeOmittedAreNotWritten) {
     Node const labelled = makeNode(u"Info", {}, {{u"Category", {{u"UUID", u"c"}}, {{u"Label", {}, {}}}}});
     EXPECT_EQ(
         lineOf(set(fileAddress(u"a"), labelled)),
@@ -65,7 +65,7 @@ TEST(NodeLine, aMarkerWithSomethingInItKeepsItsSlash) {
     EXPECT_EQ(lineOf(set(marker, makeNode(u"Info", {{u"k", u"v"}}))), R"({"file":"a/","keys":{"k":"v"}})");
 }
 
-TEST(NodeLine, madeAddressesAndRemovalsHaveLinesOfTheirOwn) {
+TEST(NodeLine, createdAddressesAndRemovalsHaveLinesOfTheirOwn) {
     EXPECT_EQ(lineOf(make(fileAddress(u"a/b"))), R"({"file":"a/b","node":false})");
     EXPECT_EQ(lineOf(make(addressOf({u"References", u"Root"}))),
               R"({"at":["References","Root"],"node":false})");
@@ -79,7 +79,7 @@ TEST(NodeLine, keysAreSortedByCodeUnits) {
               "{\"file\":\"a\",\"keys\":{\"Z\":\"1\",\"\xF0\x9F\x98\x80\":\"2\",\"\xEE\x80\x80\":\"3\"}}");
 }
 
-RC_GTEST_PROP(NodeLine, anyNodeComesBackFromItsLine, (Address const& address)) {
+RC_GTEST_PROP(NodeLine, anyNodeIsReadBackFromItsLine, (Address const& address)) {
     Node const node = *anyNode();
     std::string const line = lineOf(set(address, node));
     ParsedLine const parsed = parseLine(line);
@@ -90,7 +90,7 @@ RC_GTEST_PROP(NodeLine, anyNodeComesBackFromItsLine, (Address const& address)) {
     RC_ASSERT(described(stateOfLine(line).node) == described(node));
 }
 
-RC_GTEST_PROP(NodeLine, anyWrittenLineIsCanonicalAndTellsItsAddress, (Address const& address)) {
+RC_GTEST_PROP(NodeLine, anyWrittenLineIsCanonicalAndShowsItsAddress, (Address const& address)) {
     Change const change = *rc::gen::element(0, 1) == 0 ? make(address) : set(address, *anyNode());
     std::string const line = lineOf(change);
     auto const found = canonicalAddress(line);
@@ -99,7 +99,7 @@ RC_GTEST_PROP(NodeLine, anyWrittenLineIsCanonicalAndTellsItsAddress, (Address co
     RC_ASSERT(toAddress(addressOfCanonical(line)) == address);
 }
 
-RC_GTEST_PROP(NodeLine, aLineIsCanonicalJustWhenWritingItAnewGivesTheSameBytes, (Address const& address)) {
+RC_GTEST_PROP(NodeLine, aLineIsCanonicalExactlyIfRewritingItGivesTheSameBytes, (Address const& address)) {
     std::string line = lineOf(*rc::gen::element(0, 1) == 0 ? make(address) : set(address, *anyNode()));
     auto const at = *rc::gen::inRange<std::size_t>(0, line.size());
     std::string const put = *rc::gen::elementOf(std::vector<std::string>{
@@ -109,7 +109,7 @@ RC_GTEST_PROP(NodeLine, aLineIsCanonicalJustWhenWritingItAnewGivesTheSameBytes, 
     RC_ASSERT(canonicalAddress(line).has_value() == (rewritten(line) == line && !removal));
 }
 
-RC_GTEST_PROP(NodeLine, theFastRoadTakesOnlyCanonicalPaths, ()) {
+RC_GTEST_PROP(NodeLine, theFastPathAcceptsOnlyCanonicalPaths, ()) {
     auto const content = *rc::gen::scale(0.2, rc::gen::container<std::string>(rc::gen::element(
                                                   'a', 'b', '/', '.', '"', '\\', '\n', '\0', '\xC3')));
     std::string const line = '"' + content + '"';
@@ -145,7 +145,7 @@ TEST(NodeLine, linesOfOtherProgramsAreReadAlthoughTheyAreNotCanonical) {
     }
 }
 
-TEST(NodeLine, whatIsNoLineIsDamage) {
+TEST(NodeLine, anInvalidLineIsDamage) {
     char const* const damaged[] = {
         "",
         "a",
@@ -208,7 +208,7 @@ TEST(NodeLine, whatIsNoLineIsDamage) {
     }
 }
 
-TEST(NodeLine, aRemovalIsNoLineOfABody) {
+TEST(NodeLine, aRemovalIsNotALineOfABody) {
     EXPECT_TRUE(parseLine(R"({"remove":"a"})").change.has_value());
     EXPECT_FALSE(parseBodyLine(R"({"remove":"a"})").change.has_value());
     EXPECT_FALSE(canonicalAddress(R"({"remove":"a"})").has_value());

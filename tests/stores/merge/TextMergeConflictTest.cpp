@@ -17,7 +17,7 @@ using namespace samples;
 constexpr MergeSide ours = MergeSide::Ours;
 constexpr MergeSide theirs = MergeSide::Theirs;
 
-TEST(TextMergeChoice, eachConflictIsChosenByItself) {
+TEST(TextMergeChoice, eachConflictIsResolvedIndependently) {
     TextMerge const merge =
         mergeTexts(bodyOf({R"({"file":"a","keys":{"k":"1","l":"1"}})", R"("b")", R"("b/x")"}),
                    bodyOf({R"({"file":"a","keys":{"k":"2","l":"2","o":"2"}})"}),
@@ -30,7 +30,7 @@ TEST(TextMergeChoice, eachConflictIsChosenByItself) {
     EXPECT_EQ(merge.text({theirs, ours, ours}), bodyOf({R"({"file":"a","keys":{"k":"3","l":"2","o":"2"}})"}));
 }
 
-TEST(TextMergeChoice, aRemovedKeyOrNestedNodeOrNodeGoesOrStays) {
+TEST(TextMergeChoice, aRemovedKeyOrNestedNodeOrNodeIsRemovedOrKept) {
     std::string const base = bodyOf({R"({"file":"a","keys":{"k":"1"}})"});
     TextMerge const key = mergeTexts(base, bodyOf({R"("a")"}), bodyOf({R"({"file":"a","keys":{"k":"2"}})"}));
     EXPECT_EQ(key.text({ours}), bodyOf({R"("a")"}));
@@ -85,11 +85,11 @@ protected:
     });
 };
 
-TEST_F(TextMergeMarkers, standAroundWhatIsInConflictAndTheRestIsMerged) {
+TEST_F(TextMergeMarkers, encloseTheConflictsAndTheRestIsMerged) {
     EXPECT_EQ(mergeTexts(base, one, two).textWithMarkers(), marked);
 }
 
-TEST_F(TextMergeMarkers, areReadWithBothSidesCounting) {
+TEST_F(TextMergeMarkers, areReadWithBothSides) {
     ProjectText const text = readWhole(mergeTexts(base, one, two).textWithMarkers());
     EXPECT_EQ(described(text.faults()), "Conflict 2, Conflict 9");
     EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"({"file":"a","keys":{"k":"3","o":"2"}})", R"("b")",
@@ -106,11 +106,11 @@ TEST_F(TextMergeMarkers, letAStoreOpenAndRefuseWrites) {
     EXPECT_EQ(text(), marked);
 }
 
-TEST_F(TextMergeMarkers, areNotThereWhenNothingIsInConflict) {
+TEST_F(TextMergeMarkers, areOmittedWithoutAConflict) {
     EXPECT_EQ(mergeTexts(base, one, base).textWithMarkers(), one);
 }
 
-TEST(TextMergeInput, versionsWithTailsAreMergedByWhatTheySay) {
+TEST(TextMergeInput, versionsWithTailsAreMergedByContent) {
     ProjectText const common = readWhole(bodyOf({R"("a")", R"("b")", R"("c")"}));
     std::string const base = common.body() + common.tailFor({set(fileAddress(u"d"))});
     std::string const removed =
@@ -123,7 +123,7 @@ TEST(TextMergeInput, versionsWithTailsAreMergedByWhatTheySay) {
     EXPECT_EQ(merged(base, base, base), bodyOf({R"("a")", R"("b")", R"("c")", R"("d")"}));
 }
 
-TEST(TextMergeInput, textsInAnotherFormAreMergedByWhatTheySay) {
+TEST(TextMergeInput, textsThatAreNotCanonicalAreMergedByContent) {
     std::string const base = bodyOf({R"("b")", R"("a")", "", R"( {"keys": {"k":"1"}, "file":"c"})"});
     EXPECT_EQ(
         merged(base, bodyOf({R"("a")", R"("b")", R"({"file":"c","keys":{"k":"1"}})"}), bodyOf({R"("b")"})),
@@ -157,7 +157,7 @@ TEST(TextMergeInput, addressesAsDeepAsTheyMayBeAreMerged) {
               "Subtree at p, removed by theirs, changed " + path + "/b");
 }
 
-TEST(TextMergeInput, whatAWriterThatDiedLeftCountsForNobody) {
+TEST(TextMergeInput, tornTailsOfDeadWritersAreIgnored) {
     std::string const text = bodyOf({R"("a")"});
     EXPECT_EQ(merged(text, text + R"("b")", bodyOf({R"("a")", R"("c")"})), bodyOf({R"("a")", R"("c")"}));
 }
@@ -199,7 +199,7 @@ INSTANTIATE_TEST_SUITE_P(
                 StoreError::Kind::Refused},
         BadText{"somethingElse", "\n\n", 1, StoreError::Kind::Damaged}));
 
-TEST(TextMergeInput, anEmptyTextIsNoVersionOfAProject) {
+TEST(TextMergeInput, anEmptyTextIsNotAVersionOfAProject) {
     std::string const good = bodyOf({R"("a")"});
     EXPECT_EQ(test::errorOf([&] { mergeTexts(good, "", good); }).getFile(), "ours");
     EXPECT_EQ(test::errorOf([&] { mergeTexts(good, good, ""); }).getFile(), "theirs");

@@ -62,7 +62,7 @@ Labels labelsOf(std::string const& text) {
     return labels;
 }
 
-RC_GTEST_PROP(TextMergeModel, labelsAreMergedAsCountsAre, ()) {
+RC_GTEST_PROP(TextMergeModel, labelsAreMergedLikeCounts, ()) {
     Labels const base = drawLabels();
     Labels const ours = drawLabels();
     Labels const theirs = drawLabels();

@@ -131,13 +131,13 @@ std::vector<MergeSide> all(TextMerge const& merge, MergeSide side) {
     return std::vector<MergeSide>(merge.conflicts().size(), side);
 }
 
-RC_GTEST_PROP(TextMergeModel, whatOnlyOneSideChangedIsTaken, ()) {
+RC_GTEST_PROP(TextMergeModel, aChangeOfOnlyOneSideIsApplied, ()) {
     Versions const versions;
     RC_ASSERT(merged(versions.base, versions.base, versions.ours) == tidied(versions.ours));
     RC_ASSERT(merged(versions.base, versions.ours, versions.base) == tidied(versions.ours));
 }
 
-RC_GTEST_PROP(TextMergeModel, whatBothSidesChangedAlikeIsTakenOnce, ()) {
+RC_GTEST_PROP(TextMergeModel, equalChangesOfBothSidesAreAppliedOnce, ()) {
     Versions const versions;
     RC_ASSERT(merged(versions.base, versions.ours, versions.ours) == tidied(versions.ours));
     RC_ASSERT(merged("", versions.ours, versions.ours) == tidied(versions.ours));
@@ -167,7 +167,7 @@ RC_GTEST_PROP(TextMergeModel, theMergedTextIsTidyWhateverIsChosen, ()) {
     RC_ASSERT(read.rewrittenWith({}).body() == text);
 }
 
-RC_GTEST_PROP(TextMergeModel, whatASideRemovedIsNotThereUnlessItIsInConflict, ()) {
+RC_GTEST_PROP(TextMergeModel, aRemovalIsAppliedUnlessItIsInConflict, ()) {
     Versions const versions;
     TextMerge const merge = versions.merge();
     Content const base = contentOf(readWhole(versions.base));
@@ -200,7 +200,7 @@ std::string sideOf(std::string const& marked, std::string const& opening) {
     return text;
 }
 
-RC_GTEST_PROP(TextMergeModel, betweenTheMarkersStandsWhatIsToBeChosenFrom, ()) {
+RC_GTEST_PROP(TextMergeModel, theMarkersEncloseTheSidesToChooseFrom, ()) {
     Versions const versions;
     TextMerge const merge = versions.merge();
     std::string const marked = merge.textWithMarkers();
@@ -270,7 +270,7 @@ Tree drawChanges(Tree tree, int most) {
     return tree;
 }
 
-RC_GTEST_PROP(TextMergeModel, addressesAndKeysAreMergedAsPlainMapsAre, ()) {
+RC_GTEST_PROP(TextMergeModel, addressesAndKeysAreMergedLikePlainMaps, ()) {
     Tree const base = drawChanges({}, 16);
     Tree const ours = drawChanges(base, 10);
     Tree const theirs = drawChanges(base, 10);
@@ -287,7 +287,7 @@ RC_GTEST_PROP(TextMergeModel, addressesAndKeysAreMergedAsPlainMapsAre, ()) {
     }
 }
 
-RC_GTEST_PROP(TextMergeModel, changesOfDifferentAddressesAreBothMade, ()) {
+RC_GTEST_PROP(TextMergeModel, changesOfDifferentAddressesAreBothApplied, ()) {
     Tree const base = drawChanges({}, 8);
     auto const below = [](Tree const& tree, std::u16string const& name) {
         Tree part;

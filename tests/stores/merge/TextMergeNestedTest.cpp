@@ -37,27 +37,27 @@ TEST(TextMergeNested, labelsOfBothSidesAreOnTheFile) {
               file({category(u"c", {label(u"1"), label(u"2")})}));
 }
 
-TEST(TextMergeNested, aLabelThatBothSidesPutOnIsOnTheFileOnce) {
+TEST(TextMergeNested, aLabelThatBothSidesAddedIsOnTheFileOnce) {
     EXPECT_EQ(merged(file({}), file({category(u"c", {label(u"1"), label(u"2")})}),
                      file({category(u"c", {label(u"2")})})),
               file({category(u"c", {label(u"1"), label(u"2")})}));
 }
 
-TEST(TextMergeNested, aLabelThatOneSideTookOffStaysOff) {
+TEST(TextMergeNested, aLabelThatOneSideRemovedStaysRemoved) {
     std::string const base = file({category(u"c", {label(u"1"), label(u"2")})});
     EXPECT_EQ(merged(base, file({category(u"c", {label(u"2")})}),
                      file({category(u"c", {label(u"1"), label(u"2"), label(u"3")})})),
               file({category(u"c", {label(u"2"), label(u"3")})}));
 }
 
-TEST(TextMergeNested, aLabelPutOnStaysWhenTheOtherSideTakesTheLastOneOfItsCategoryOff) {
+TEST(TextMergeNested, anAddedLabelStaysWhenTheOtherSideRemovesTheLastOneOfItsCategory) {
     std::string const base = file({category(u"c", {label(u"1")})});
     std::string const other = file({category(u"c", {label(u"1"), label(u"2")})});
     EXPECT_EQ(merged(base, file({}), other), file({category(u"c", {label(u"2")})}));
     EXPECT_EQ(merged(base, other, file({})), file({category(u"c", {label(u"2")})}));
 }
 
-TEST(TextMergeNested, aCategoryWhoseLabelsBothSidesTookOffIsGone) {
+TEST(TextMergeNested, aCategoryWhoseLabelsBothSidesRemovedIsRemoved) {
     std::string const base = file({category(u"c", {label(u"1"), label(u"2")})});
     EXPECT_EQ(merged(base, file({category(u"c", {label(u"2")})}), file({category(u"c", {label(u"1")})})),
               file({}));
@@ -71,7 +71,7 @@ TEST(TextMergeNested, aCategoryThatOneSideLeftEmptyStays) {
     EXPECT_EQ(merged(base, base, emptied), emptied);
 }
 
-TEST(TextMergeNested, aLabelThatOneSideTookOffAndTheOtherChangedIsAConflict) {
+TEST(TextMergeNested, aLabelThatOneSideRemovedAndTheOtherChangedIsAConflict) {
     std::string const base = file({category(u"c", {label(u"1")})});
     std::string const changed = file({category(u"c", {label(u"1", {{u"Value", u"v"}})})});
     TextMerge const merge = mergeTexts(base, file({category(u"c", {label(u"2")})}), changed);
@@ -83,14 +83,14 @@ TEST(TextMergeNested, aLabelThatOneSideTookOffAndTheOtherChangedIsAConflict) {
     EXPECT_EQ(merged(base, changed, file({})), "Nested at a in Category c/Label 1, removed by theirs");
 }
 
-TEST(TextMergeNested, aNestedNodeThatSaysMoreThanWhatItIsGoesAsAWhole) {
+TEST(TextMergeNested, aNestedNodeWithMoreThanItsIdentityIsRemovedAsAWhole) {
     std::string const base = file({category(u"c", {label(u"1")}, {{u"k", u"v"}})});
     std::string const more = file({category(u"c", {label(u"1"), label(u"2")}, {{u"k", u"v"}})});
     EXPECT_EQ(merged(base, file({}), more), "Nested at a in Category c, removed by ours");
     EXPECT_EQ(merged(base, file({}), base), file({}));
 }
 
-TEST(TextMergeNested, aFileThatOneSideRemovedAndTheOtherTookALabelOffIsGone) {
+TEST(TextMergeNested, aFileThatOneSideRemovedAndTheOtherRemovedALabelFromIsRemoved) {
     std::string const base =
         file({category(u"c", {label(u"1"), label(u"2")}), category(u"d", {label(u"3")})});
     std::string const less = file({category(u"c", {label(u"2")})});
@@ -100,7 +100,7 @@ TEST(TextMergeNested, aFileThatOneSideRemovedAndTheOtherTookALabelOffIsGone) {
     EXPECT_EQ(merged(base, more, textWith({})), "Subtree at a, removed by theirs, changed a");
 }
 
-TEST(TextMergeNested, aNestedNodeThatOneSideRemovedAndTheOtherTookSomethingFromIsGone) {
+TEST(TextMergeNested, aNestedNodeThatOneSideRemovedAndTheOtherRemovedFromIsRemoved) {
     std::string const base = file({label(u"1", {{u"k", u"1"}, {u"l", u"1"}})});
     EXPECT_EQ(merged(base, file({}), file({label(u"1", {{u"k", u"1"}})})), file({}));
 }
@@ -125,7 +125,7 @@ TEST(TextMergeNested, extensionsAreMergedByTheirNames) {
               "Nested at a in Extension color, removed by theirs");
 }
 
-TEST(TextMergeNested, nodesWithoutANameAreMergedByAllOfThem) {
+TEST(TextMergeNested, nodesWithoutANameAreMergedByTheirContent) {
     Nested const one{u"T", {{u"k", u"1"}}, {}};
     Nested const two{u"T", {{u"k", u"2"}}, {}};
     Nested const three{u"T", {{u"k", u"3"}}, {}};
@@ -133,7 +133,7 @@ TEST(TextMergeNested, nodesWithoutANameAreMergedByAllOfThem) {
     EXPECT_EQ(merged(file({}), file({one, two}), file({two})), file({one, two}));
 }
 
-TEST(TextMergeNested, aNodeThatIsThereTwiceOnPurposeIsCounted) {
+TEST(TextMergeNested, deliberateDuplicatesAreCounted) {
     auto const times = [](std::size_t count) {
         return file({category(u"c", std::vector<Nested>(count, label(u"1")))});
     };
@@ -143,7 +143,7 @@ TEST(TextMergeNested, aNodeThatIsThereTwiceOnPurposeIsCounted) {
     EXPECT_EQ(merged(times(3), times(2), times(4)), times(3));
 }
 
-TEST(TextMergeNested, ofSeveralOfOneNameTheFirstMeetsTheFirst) {
+TEST(TextMergeNested, nodesOfOneNameAreMatchedInOrder) {
     Nested const first = label(u"1", {{u"Value", u"x"}});
     Nested const second = label(u"1", {{u"Value", u"y"}});
     std::string const base = file({category(u"c", {first, second})});
@@ -163,7 +163,7 @@ TEST(TextMergeNested, theOrderIsThatOfTheSideThatMovedThem) {
     EXPECT_EQ(merged(base, moved, file({two, one, three})), file({two, one, three}));
 }
 
-TEST(TextMergeNested, whatOneSideAddedStaysBehindWhatItFollowsThere) {
+TEST(TextMergeNested, anAdditionStaysBehindItsPredecessor) {
     Nested const one = label(u"1");
     Nested const two = label(u"2");
     std::string const base = file({one, two});

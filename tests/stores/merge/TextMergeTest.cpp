@@ -11,27 +11,27 @@ namespace {
 
 using namespace samples;
 
-TEST(TextMerge, whatEitherSideAddedIsThere) {
+TEST(TextMerge, additionsOfEitherSideAreMerged) {
     std::string const base = bodyOf({R"("b")"});
     EXPECT_EQ(merged(base, bodyOf({R"("a")", R"("b")"}), bodyOf({R"("b")", R"("c")"})),
               bodyOf({R"("a")", R"("b")", R"("c")"}));
 }
 
-TEST(TextMerge, whatBothSidesAddedIsThereOnce) {
+TEST(TextMerge, additionsOfBothSidesAreMergedOnce) {
     std::string const both = bodyOf({R"("a")", R"("a/")", R"("a/x")"});
     EXPECT_EQ(merged(bodyOf({}), both, both), both);
 }
 
-TEST(TextMerge, whatEitherSideRemovedIsGone) {
+TEST(TextMerge, removalsOfEitherSideAreMerged) {
     std::string const base = bodyOf({R"("a")", R"("b")", R"("c")"});
     EXPECT_EQ(merged(base, bodyOf({R"("b")", R"("c")"}), bodyOf({R"("a")", R"("b")"})), bodyOf({R"("b")"}));
 }
 
-TEST(TextMerge, whatBothSidesRemovedIsGone) {
+TEST(TextMerge, removalsOfBothSidesAreMerged) {
     EXPECT_EQ(merged(bodyOf({R"("a")", R"("a/")", R"("a/x")"}), bodyOf({}), bodyOf({})), bodyOf({}));
 }
 
-TEST(TextMerge, aNodeThatOneSideChangedIsThatSides) {
+TEST(TextMerge, aNodeThatOneSideChangedIsTakenFromThatSide) {
     std::string const base = bodyOf({R"({"file":"a","keys":{"k":"1"}})", R"("b")"});
     std::string const changed = bodyOf({R"({"file":"a","keys":{"k":"2"}})", R"("b")"});
     EXPECT_EQ(merged(base, changed, base), changed);
@@ -91,7 +91,7 @@ TEST(TextMerge, aNodeThatBothSidesAddedIsMergedByKey) {
     EXPECT_EQ(merged(bodyOf({}), ours, bodyOf({R"({"file":"a","keys":{"k":"2"}})"})), "Key k at a");
 }
 
-TEST(TextMerge, anAddressThatOneSideMadeTakesTheNodeOfTheOther) {
+TEST(TextMerge, anAddressThatOneSideCreatedGetsTheNodeOfTheOther) {
     std::string const made = bodyOf({R"({"at":["References","Root"],"node":false})"});
     std::string const node = bodyOf({R"({"at":["References","Root"],"keys":{"k":"1"}})"});
     EXPECT_EQ(merged(bodyOf({}), made, made), made);
@@ -101,14 +101,14 @@ TEST(TextMerge, anAddressThatOneSideMadeTakesTheNodeOfTheOther) {
               R"(Subtree at "References","Root", removed by theirs, changed "References","Root")");
 }
 
-TEST(TextMerge, twoNodesForAnAddressThatWasMadeAreMergedByKey) {
+TEST(TextMerge, twoNodesForAnAddressThatWasCreatedAreMergedByKey) {
     std::string const base = bodyOf({R"({"file":"a","node":false})"});
     std::string const ours = bodyOf({R"({"file":"a","keys":{"o":"1"}})"});
     std::string const theirs = bodyOf({R"({"file":"a","keys":{"t":"1"}})"});
     EXPECT_EQ(merged(base, ours, theirs), bodyOf({R"({"file":"a","keys":{"o":"1","t":"1"}})"}));
 }
 
-TEST(TextMerge, aNodeThatOneSideTookOffItsAddressAndTheOtherChangedIsAConflict) {
+TEST(TextMerge, aNodeThatOneSideRemovedFromItsAddressAndTheOtherChangedIsAConflict) {
     std::string const base = bodyOf({R"("a")", R"("b")"});
     std::string const ours = bodyOf({R"({"file":"a","node":false})", R"("b")"});
     std::string const theirs = bodyOf({R"({"file":"a","keys":{"k":"1"}})", R"("b")"});
@@ -134,7 +134,7 @@ TEST(TextMerge, aFolderThatOneSideRemovedAndTheOtherLabelledAFileInIsAConflict) 
     EXPECT_EQ(merged(base, bodyOf({}), changed), "Subtree at a, removed by ours, changed a/x");
 }
 
-TEST(TextMerge, ofRemovedAddressesTheTopmostIsTold) {
+TEST(TextMerge, onlyTheTopmostOfTheRemovedAddressesIsReported) {
     std::string const base = bodyOf({R"("a")", R"("a/b")", R"("a/b/x")", R"("a/c")"});
     std::string const added = bodyOf({R"("a")", R"("a/b")", R"("a/b/x")", R"("a/b/y")"});
     EXPECT_EQ(merged(base, bodyOf({}), added), "Subtree at a, removed by ours, changed a/b/y");
@@ -142,7 +142,7 @@ TEST(TextMerge, ofRemovedAddressesTheTopmostIsTold) {
               "Subtree at a/b, removed by ours, changed a/b/y");
 }
 
-TEST(TextMerge, aCategoryThatOneSideDeletedAndTheOtherMadeALabelInIsAConflict) {
+TEST(TextMerge, aCategoryThatOneSideDeletedAndTheOtherCreatedALabelInIsAConflict) {
     std::string const category = R"({"at":["Categories","Root","Category","c"],"keys":{"Name":"Kind"}})";
     std::string const label =
         R"({"at":["Categories","Root","Category","c","Label","l"],"keys":{"Name":"Source"}})";
@@ -151,14 +151,14 @@ TEST(TextMerge, aCategoryThatOneSideDeletedAndTheOtherMadeALabelInIsAConflict) {
               R"(changed "Categories","Root","Category","c","Label","l")");
 }
 
-TEST(TextMerge, aFolderThatOneSideRemovedAndTheOtherRemovedFromIsGone) {
+TEST(TextMerge, aFolderThatOneSideRemovedAndTheOtherRemovedFromIsRemoved) {
     std::string const base = bodyOf({R"("a")", R"("a/x")", R"("a/y")", R"("b")"});
     std::string const less = bodyOf({R"("a")", R"("a/y")", R"("b")"});
     EXPECT_EQ(merged(base, bodyOf({R"("b")"}), less), bodyOf({R"("b")"}));
     EXPECT_EQ(merged(base, less, bodyOf({R"("b")"})), bodyOf({R"("b")"}));
 }
 
-TEST(TextMerge, aNodeThatOneSideRemovedAndTheOtherTookSomethingFromIsGone) {
+TEST(TextMerge, aNodeThatOneSideRemovedAndTheOtherRemovedFromIsRemoved) {
     std::string const base = bodyOf({R"("a")", R"({"file":"a/x","keys":{"k":"1","l":"1"}})"});
     std::string const less = bodyOf({R"("a")", R"({"file":"a/x","keys":{"k":"1"}})"});
     std::string const bare = bodyOf({R"("a")", R"({"file":"a/x","node":false})"});
@@ -170,7 +170,7 @@ TEST(TextMerge, aNodeThatOneSideRemovedAndTheOtherTookSomethingFromIsGone) {
     EXPECT_EQ(merged(base, bodyOf({R"("a")"}), swapped), "Subtree at a/x, removed by ours, changed a/x");
 }
 
-TEST(TextMerge, aPlaceThatNothingStoodAtIsNeverRemoved) {
+TEST(TextMerge, anAddressThatDidNotExistIsNeverRemoved) {
     std::string const base = bodyOf({R"({"at":["Categories","Root","Category","c"]})"});
     std::string const other = bodyOf(
         {R"({"at":["Categories","Root","Category","c"]})", R"({"at":["Categories","Root","Category","d"]})"});
@@ -179,7 +179,7 @@ TEST(TextMerge, aPlaceThatNothingStoodAtIsNeverRemoved) {
               bodyOf({R"("a/y")"}));
 }
 
-TEST(TextMerge, aNodeGoesAloneWhereSomethingBelowItStays) {
+TEST(TextMerge, aNodeIsRemovedAloneIfSomethingBelowItStays) {
     std::string const base = bodyOf({R"("a")", R"("a/x")"});
     std::string const gone = bodyOf({R"("a/x")"});
     EXPECT_EQ(merged(base, gone, bodyOf({R"("a")", R"("a/x")", R"("a/y")"})),
@@ -208,7 +208,7 @@ TEST(TextMerge, withoutACommonVersionBothProjectsAreInTheMergedOne) {
     EXPECT_EQ(merged("", ours, bodyOf({})), ours);
 }
 
-TEST(TextMerge, addressesComeInTheirOrderWhateverTheirForm) {
+TEST(TextMerge, addressesAreSortedWhateverTheirForm) {
     std::string const base = bodyOf({});
     std::string const ours = bodyOf({R"("a/b")", R"("a.b")", R"({"at":["Info","x"]})"});
     std::string const theirs = bodyOf({R"({"at":["Categories","Root"]})", R"("a")", R"("a b")"});

@@ -289,7 +289,7 @@ TEST_F(GitMergeOfNewProjects, hasTheFilesOfBoth) {
     }
 }
 
-TEST_F(GitMergeOfNewProjects, leavesTwoNamesToAPerson) {
+TEST_F(GitMergeOfNewProjects, reportsTwoNamesAsAConflict) {
     auto const merged = merge(make(u"Pumps", u"new.txt"), make(u"Station", u"new.txt"));
 
     EXPECT_FALSE(merged.isClean);

@@ -71,7 +71,7 @@ TEST_P(MergeMatrix, mergesTheSameFromVersionsWithTails) {
     }
 }
 
-TEST(MergeMatrixTables, speakOfChangesThatThereAre) {
+TEST(MergeMatrixTables, nameOnlyExistingChanges) {
     std::set<std::string> names;
     for (auto const& change : projectChanges()) {
         EXPECT_TRUE(names.insert(change.name).second) << change.name;
@@ -113,13 +113,13 @@ TEST_F(MergeOfNewProjects, hasTheFilesOfBoth) {
     EXPECT_EQ(merge.text(), both);
 }
 
-TEST_F(MergeOfNewProjects, leavesTwoNamesToAPerson) {
+TEST_F(MergeOfNewProjects, reportsTwoNamesAsAConflict) {
     auto const merge = mergeTexts({}, make(u"Pumps", u"new.txt"), make(u"Station", u"new.txt"));
     ASSERT_EQ(described(merge.conflicts()), R"(Key Name at "Info","ProjectData")");
     EXPECT_EQ(merge.text({MergeSide::Theirs}), make(u"Station", u"new.txt"));
 }
 
-TEST_F(MergeOfNewProjects, takesAllChangesOfBothIntoOne) {
+TEST_F(MergeOfNewProjects, containsAllChangesOfBoth) {
     auto const common = project.after({}, makeCommonProject);
     for (auto const& change : projectChanges()) {
         SCOPED_TRACE(change.name);

@@ -25,7 +25,7 @@ std::string joined(Node const& earlier, Node const& later) {
     return described(joinTwo(earlier, later));
 }
 
-TEST(NodeJoin, theKeysOfBothAreThereAndTheLaterValueWins) {
+TEST(NodeJoin, theKeysOfBothAreKeptAndTheLaterValueWins) {
     Node const earlier = makeNode(u"Info", {{u"a", u"1"}, {u"b", u"1"}});
     Node const later = makeNode(u"Info", {{u"b", u"2"}, {u"c", u"2"}});
     EXPECT_EQ(joined(earlier, later), "Info(a=1;b=2;c=2;)");
@@ -48,19 +48,19 @@ TEST(NodeJoin, theEarlierOrderIsKeptAndNewNestedNodesFollow) {
     EXPECT_EQ(joined(earlier, later), "Info(Category(UUID=2;)Category(UUID=1;)Category(UUID=3;))");
 }
 
-TEST(NodeJoin, nestedNodesWithoutUuidMeetByName) {
+TEST(NodeJoin, nestedNodesWithoutUuidAreMatchedByName) {
     Node const earlier = makeNode(u"Info", {}, {{u"Extension", {{u"Name", u"n"}, {u"Value", u"1"}}, {}}});
     Node const later = makeNode(u"Info", {}, {{u"Extension", {{u"Name", u"n"}, {u"Value", u"2"}}, {}}});
     EXPECT_EQ(joined(earlier, later), "Info(Extension(Name=n;Value=2;))");
 }
 
-TEST(NodeJoin, typesKeepNestedNodesApart) {
+TEST(NodeJoin, nestedNodesOfDifferentTypesAreNotJoined) {
     Node const earlier = makeNode(u"Info", {}, {{u"A", {{u"UUID", u"1"}}, {}}});
     Node const later = makeNode(u"Info", {}, {{u"B", {{u"UUID", u"1"}}, {}}});
     EXPECT_EQ(joined(earlier, later), "Info(A(UUID=1;)B(UUID=1;))");
 }
 
-TEST(NodeJoin, nestedNodesWithoutAnyNameAreKeptOnceWhereTheyAreEqual) {
+TEST(NodeJoin, equalNestedNodesWithoutANameAreKeptOnce) {
     Nested const same{u"T", {{u"k", u"v"}}, {}};
     Nested const other{u"T", {{u"k", u"w"}}, {}};
     EXPECT_EQ(joined(makeNode(u"Info", {}, {same}), makeNode(u"Info", {}, {other, same})),
@@ -69,7 +69,7 @@ TEST(NodeJoin, nestedNodesWithoutAnyNameAreKeptOnceWhereTheyAreEqual) {
               "Info(T(k=v;)T(k=v;))");
 }
 
-TEST(NodeJoin, nestedNodesThatAreThereTwiceMeetInTheirOrder) {
+TEST(NodeJoin, duplicateNestedNodesAreMatchedInOrder) {
     Nested const one{u"T", {{u"UUID", u"1"}, {u"k", u"a"}}, {}};
     Nested const other{u"T", {{u"UUID", u"1"}, {u"l", u"b"}}, {}};
     NodeJoin join(*makeNode(u"Info", {}, {one}));

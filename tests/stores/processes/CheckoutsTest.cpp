@@ -261,7 +261,7 @@ protected:
     SharedMemory<Tally> tally;
 };
 
-TEST_F(Checkouts, besideReadersAndWritersShowWholeVersionsOnly) {
+TEST_F(Checkouts, withReadersAndWritersShowOnlyWholeVersions) {
     auto const store = openStore();
     auto last = readTwice(*store);
     std::vector<std::unique_ptr<ChildProcess>> processes;

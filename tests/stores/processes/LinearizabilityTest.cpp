@@ -53,7 +53,7 @@ TEST_F(LinearizabilityCheck, oneProcessIsLinearizable) {
     EXPECT_EQ(1U, order.countPossible());
 }
 
-TEST_F(LinearizabilityCheck, anAddressThatNothingIsBelowAnyMoreIsGoneUnlessItWasMade) {
+TEST_F(LinearizabilityCheck, anAddressWithoutValuesBelowExistsOnlyIfItWasCreated) {
     EXPECT_TRUE(does(0, set(ax, 7)));
     EXPECT_TRUE(does(0, read(Slots::made, 7, 0)));
     EXPECT_TRUE(does(0, make(a)));
@@ -61,7 +61,7 @@ TEST_F(LinearizabilityCheck, anAddressThatNothingIsBelowAnyMoreIsGoneUnlessItWas
     EXPECT_TRUE(does(0, read(0, 0, 0)));
 }
 
-TEST_F(LinearizabilityCheck, writesAtTheSameTimeMayComeInAnyOrder) {
+TEST_F(LinearizabilityCheck, concurrentWritesMayTakeEffectInAnyOrder) {
     order.begin(0, set(a, 7));
     order.begin(1, set(a, 8));
     order.begin(2, read(8, 0, 0));
@@ -72,47 +72,47 @@ TEST_F(LinearizabilityCheck, writesAtTheSameTimeMayComeInAnyOrder) {
     EXPECT_TRUE(order.end(1));
 }
 
-TEST_F(LinearizabilityCheck, aReadMayShowAWriteThatHasNotEndedOrNotYet) {
+TEST_F(LinearizabilityCheck, aReadMayOrMayNotShowAnUnfinishedWrite) {
     order.begin(0, set(a, 7));
     EXPECT_TRUE(does(1, read(0, 0, 0)));
     EXPECT_TRUE(does(1, read(7, 0, 0)));
     EXPECT_TRUE(order.end(0));
 }
 
-TEST_F(LinearizabilityCheck, aLostUpdateIsNone) {
+TEST_F(LinearizabilityCheck, aLostUpdateIsNotLinearizable) {
     order.begin(0, readAndSet(0, a, 7));
     order.begin(1, readAndSet(0, a, 8)); // it did not see the first write, and overwrote it
     bool const first = order.end(0);
     EXPECT_FALSE(order.end(1) && first);
 }
 
-TEST_F(LinearizabilityCheck, aWriteThatIsNotThereAfterwardsIsNone) {
+TEST_F(LinearizabilityCheck, aLostWriteIsNotLinearizable) {
     EXPECT_TRUE(does(0, set(a, 7)));
     EXPECT_TRUE(does(1, set(b, 8)));
     EXPECT_FALSE(does(2, read(0, 0, 8)));
 }
 
-TEST_F(LinearizabilityCheck, aReadThatIsOlderThanAnEndedWriteIsNone) {
+TEST_F(LinearizabilityCheck, aReadOlderThanAnEndedWriteIsNotLinearizable) {
     EXPECT_TRUE(does(0, set(a, 7)));
     EXPECT_FALSE(does(1, read(0, 0, 0)));
 }
 
-TEST_F(LinearizabilityCheck, aReadOfWhatIsNotYetWrittenIsNone) {
+TEST_F(LinearizabilityCheck, aReadOfAValueBeforeItsWriteIsNotLinearizable) {
     EXPECT_FALSE(does(1, read(7, 0, 0)));
 }
 
-TEST_F(LinearizabilityCheck, aReadOfHalfABatchIsNone) {
+TEST_F(LinearizabilityCheck, aReadOfHalfABatchIsNotLinearizable) {
     order.begin(0, set(a | b, 7));
     EXPECT_FALSE(does(1, read(7, 0, 0)));
 }
 
-TEST_F(LinearizabilityCheck, aProcessThatGoesBackInTimeIsNone) {
+TEST_F(LinearizabilityCheck, aProcessThatGoesBackInTimeIsNotLinearizable) {
     order.begin(0, set(a, 7));
     EXPECT_TRUE(does(1, read(7, 0, 0)));
     EXPECT_FALSE(does(1, read(0, 0, 0)));
 }
 
-TEST_F(LinearizabilityCheck, twoReadersThatSawWritesInDifferentOrdersHaveNone) {
+TEST_F(LinearizabilityCheck, twoReadersThatSawWritesInDifferentOrdersAreNotLinearizable) {
     order.begin(0, set(a, 7));
     order.begin(1, set(b, 8));
     order.begin(2, read(7, 0, 0));
@@ -121,7 +121,7 @@ TEST_F(LinearizabilityCheck, twoReadersThatSawWritesInDifferentOrdersHaveNone) {
     EXPECT_FALSE(order.end(3) && first);
 }
 
-TEST_F(LinearizabilityCheck, aRemovalThatLeavesWhatIsBelowIsNone) {
+TEST_F(LinearizabilityCheck, aRemovalThatKeepsValuesBelowIsNotLinearizable) {
     EXPECT_TRUE(does(0, set(a | ax, 7)));
     EXPECT_TRUE(does(0, remove(a)));
     EXPECT_FALSE(does(1, read(0, 7, 0)));

@@ -205,7 +205,7 @@ TEST_F(GitAsOtherProgram, aMergeWithConflictsIsReportedByAddress) {
     expectReportedByAddress(*store, [this] { git.run({"merge", "--abort"}); });
 }
 
-TEST_F(GitAsOtherProgram, aStashAndItsReturnAreReportedByAddress) {
+TEST_F(GitAsOtherProgram, stashingAndUnstashingAreReportedByAddress) {
     auto const store = open();
     commit(*store, setValues({u"x", u"new"}, u"3"));
     expectReportedByAddress(*store, [this] { git.run({"stash", "-q"}); });
@@ -242,7 +242,7 @@ TEST_F(OtherPrograms, anEditorThatWritesInPlaceIsReportedByAddress) {
                             [this] { writeInPlace(changedText(R"("V":"1")", R"("V":"a longer one")")); });
 }
 
-TEST_F(OtherPrograms, anEditorThatPutsANewFileInPlaceIsReportedByAddress) {
+TEST_F(OtherPrograms, anEditorThatReplacesTheFileIsReportedByAddress) {
     auto const store = open();
     expectReportedByAddress(*store, [this] { writeAnew(changedText(R"("V":"1")", R"("V":"2")")); });
 }
@@ -298,7 +298,7 @@ TEST_F(OtherPrograms, aBackupWithOldTimesIsReportedByAddress) {
     });
 }
 
-TEST_F(OtherPrograms, aCopyOfAProjectLivesAloneAndSoDoesTheProject) {
+TEST_F(OtherPrograms, aProjectAndItsCopyAreIndependent) {
     for (auto const& options : {rewriting(), appending()}) {
         for (auto const* how : {"-a", "-al"}) { // the second one creates hard links
             copy(how, "copy");

@@ -94,7 +94,7 @@ protected:
     TemporaryFolder root;
 };
 
-TEST_F(WriterQueue, writersGetTheLockInTheOrderInWhichTheyCame) {
+TEST_F(WriterQueue, writersGetTheLockInTheOrderOfTheirRequests) {
     struct Order {
         std::atomic<int> next;
         std::array<int, writerCount> turns;
@@ -124,7 +124,7 @@ TEST_F(WriterQueue, writersGetTheLockInTheOrderInWhichTheyCame) {
     EXPECT_EQ(0, placesTaken());
 }
 
-TEST_F(WriterQueue, noOtherComesBeforeAWriterThatWaitsMoreThanOnce) {
+TEST_F(WriterQueue, noWriterOvertakesAWaitingOneMoreThanOnce) {
     struct Counts {
         std::atomic<bool> stop;
         std::array<std::atomic<int>, writerCount> writes;
@@ -172,7 +172,7 @@ TEST_F(WriterQueue, noOtherComesBeforeAWriterThatWaitsMoreThanOnce) {
     }
 }
 
-TEST_F(WriterQueue, aWaitingWriterThatIsKilledStopsNobody) {
+TEST_F(WriterQueue, aWaitingWriterThatIsKilledBlocksNoOther) {
     auto const holder = openDisk();
     ASSERT_TRUE(holder->lock(0ms));
     auto const dead = startWaiting();
@@ -199,7 +199,7 @@ TEST_F(WriterQueue, aWriterThatGivesUpLeavesTheQueue) {
     EXPECT_TRUE(openDisk()->lock(0ms));
 }
 
-TEST_F(WriterQueue, aWriterThatWasStoppedWhileItIsNextStopsNobody) {
+TEST_F(WriterQueue, aWriterThatIsStoppedWhileItIsNextBlocksNoOther) {
     auto const holder = openDisk();
     ASSERT_TRUE(holder->lock(0ms));
     auto const stopped = startWaiting();
@@ -231,7 +231,7 @@ TEST_F(WriterQueue, aWriterThatDoesNotWaitDoesNotOvertakeThoseThatDo) {
     EXPECT_EQ(0, placesTaken()) << "who has the lock needs no place";
 }
 
-TEST_F(WriterQueue, aForkedChildKeepsNoPlaceOfAParentThatDies) {
+TEST_F(WriterQueue, aForkedChildDoesNotKeepThePlaceOfADeadParent) {
     std::array<int, 2> life{}; // the grandchild lives as long as this end is open here
     ASSERT_EQ(0, ::pipe(life.data()));
     auto const holder = openDisk();

@@ -58,7 +58,7 @@ TEST(ConflictText, everyConflictIsReportedAndSoIsAStrayMarker) {
     EXPECT_EQ(contentOf(text).size(), 4U);
 }
 
-TEST(ConflictText, damageBetweenMarkersIsNamedOnce) {
+TEST(ConflictText, damageBetweenMarkersIsReportedOnce) {
     ProjectText const text =
         readWhole(bodyOf({"wrong", "<<<<<<< ours", "worse", "=======", ">>>>>>> theirs"}));
     EXPECT_EQ(described(text.faults()), "Damage 2, Conflict 3, Damage 4");
@@ -93,7 +93,7 @@ TEST(ConflictText, inTheTailOfASideLaterLinesWin) {
     EXPECT_EQ(contentOf(text).at(fileAddress(u"a")), "Info(l=2;)");
 }
 
-TEST(ConflictText, aBatchWhoseLinesBothSidesShareIsStillRight) {
+TEST(ConflictText, aBatchWhoseLinesBothSidesShareIsStillValid) {
     std::string const body = bodyOf({R"("a")"});
     std::string const ours = readWhole(body).tailFor({set(fileAddress(u"b")), set(fileAddress(u"c"))});
     std::string const theirs = readWhole(body).tailFor({set(fileAddress(u"b")), set(fileAddress(u"d"))});
@@ -105,7 +105,7 @@ TEST(ConflictText, aBatchWhoseLinesBothSidesShareIsStillRight) {
     EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"("a")", R"("b")", R"("c")", R"("d")"}));
 }
 
-TEST(ConflictText, aConflictMayReachOverTheEndOfTheBody) {
+TEST(ConflictText, aConflictMayExtendBeyondTheBody) {
     std::string const one = bodyOf({R"("a")", R"("b")"});
     std::string const two = bodyOf({R"("a")", R"("c")"});
     std::string const common = first + "\"a\"\n";

@@ -220,7 +220,7 @@ std::vector<std::string> examplesIn(std::string const& document) {
     return examples;
 }
 
-TEST(StoreDocument, itsExampleIsWhatIsWritten) {
+TEST(StoreDocument, itsExampleEqualsTheWrittenText) {
     std::vector<std::string> const examples = examplesIn(fileBytes(PROJECT_STORE_DOCUMENT));
     ASSERT_EQ(examples.size(), 3U);
     std::string const& body = examples[0];

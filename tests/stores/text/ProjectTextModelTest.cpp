@@ -154,7 +154,7 @@ RC_GTEST_PROP(ProjectTextModel, aTailHasTheContentOfARewrite, ()) {
     }
 }
 
-RC_GTEST_PROP(ProjectTextModel, aRewriteOverATailTakesBothIn, ()) {
+RC_GTEST_PROP(ProjectTextModel, aRewriteOverATailContainsBoth, ()) {
     Model model;
     ProjectText text = ProjectText::empty().rewrittenWith(model.drawBatch());
     Batch const appended = model.drawBatch();

@@ -37,7 +37,7 @@ std::vector<std::string> statesOf(std::vector<Difference> const& differences) {
 
 Change const someFile = set(fileAddress(u"a"));
 
-TEST(ProjectText, theEmptyTextIsTheFrameAlone) {
+TEST(ProjectText, theEmptyTextHasOnlyItsFirstAndLastLine) {
     ProjectText const text = ProjectText::empty();
     EXPECT_EQ(text.body(), first + last);
     EXPECT_TRUE(contentOf(text).empty());
@@ -45,7 +45,7 @@ TEST(ProjectText, theEmptyTextIsTheFrameAlone) {
     EXPECT_TRUE(readWhole(text.body()).isTidy());
 }
 
-TEST(ProjectText, whatEndsBeforeItsLastLineIsIncomplete) {
+TEST(ProjectText, aTextWithoutItsLastLineIsIncomplete) {
     std::string const whole = bodyOf({R"("a")", R"({"file":"b","keys":{"k":"v"}})"});
     for (std::size_t length = 0; length + 1 < whole.size(); ++length) {
         EXPECT_FALSE(ProjectText::read(whole.substr(0, length), "f").has_value()) << length;
@@ -53,7 +53,7 @@ TEST(ProjectText, whatEndsBeforeItsLastLineIsIncomplete) {
     EXPECT_TRUE(ProjectText::read(whole, "f").has_value());
 }
 
-TEST(ProjectText, aLastLineWithoutLineEndIsWholeYetIrregular) {
+TEST(ProjectText, aLastLineWithoutLineEndIsCompleteButIrregular) {
     std::string const whole = bodyOf({R"("a")"});
     ProjectText const text = readWhole(whole.substr(0, whole.size() - 1));
     EXPECT_EQ(described(text.faults()), "Irregular 3");
@@ -134,7 +134,7 @@ TEST(ProjectText, plainNodesAreOneSharedNode) {
     EXPECT_EQ(children[1].node, plainNode());
 }
 
-TEST(ProjectText, carriageReturnsAreToleratedAndGoWithTheNextWrite) {
+TEST(ProjectText, carriageReturnsAreToleratedAndRemovedByTheNextWrite) {
     std::string const plain = bodyOf({R"("a")", R"({"file":"b","keys":{"k":"v"}})"});
     std::string carriage = plain;
     for (std::size_t at = 0; (at = carriage.find('\n', at)) != carriage.npos; at += 2) {
@@ -148,14 +148,14 @@ TEST(ProjectText, carriageReturnsAreToleratedAndGoWithTheNextWrite) {
     EXPECT_EQ(text.body(), carriage);
 }
 
-TEST(ProjectText, linesOfOtherProgramsAreNoFaultButNotTidy) {
+TEST(ProjectText, linesOfOtherProgramsAreNeitherFaultsNorTidy) {
     ProjectText const text = readWhole(bodyOf({R"({ "file": "a", "type": "Info" })", R"("b")"}));
     EXPECT_EQ(described(text.faults()), "");
     EXPECT_FALSE(text.isTidy());
     EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"("a")", R"("b")"}));
 }
 
-TEST(ProjectText, aDamagedLineIsNamedAndLosesNothingElse) {
+TEST(ProjectText, aDamagedLineIsReportedAndTheRestIsRead) {
     std::string const bytes = bodyOf({R"("a")", R"("b" and more)", R"("c")", R"({"remove":"c"})"});
     ProjectText const text = readWhole(bytes);
     EXPECT_EQ(described(text.faults()), "Damage 3, Damage 5");
@@ -167,7 +167,7 @@ TEST(ProjectText, aDamagedLineIsNamedAndLosesNothingElse) {
     EXPECT_EQ(text.rewrittenWith({}).damagedLines(), "");
 }
 
-TEST(ProjectText, linesOutOfPlaceCountAllTheSame) {
+TEST(ProjectText, linesOutOfOrderAreRead) {
     ProjectText const text = readWhole(bodyOf({R"("b")", R"("z")", R"("a")", R"("c")", R"("zz")"}));
     EXPECT_EQ(described(text.faults()), "Irregular 4, Irregular 5");
     EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"("a")", R"("b")", R"("c")", R"("z")", R"("zz")"}));
@@ -192,7 +192,7 @@ TEST(ProjectText, linesForOneAddressAreJoinedInTheirOrder) {
               (Content{{fileAddress(u"a"), "Info(k=3;l=1;m=3;)"}, {fileAddress(u"b"), "Info()"}}));
 }
 
-TEST(ProjectText, aLineOfAnotherProgramHasItsPlaceAmongTheOthers) {
+TEST(ProjectText, aLineOfAnotherProgramIsSortedAmongTheOthers) {
     ProjectText const text = readWhole(bodyOf({
         R"("a")",
         R"({ "file":"c", "keys":{"k":"1"} })",
@@ -204,7 +204,7 @@ TEST(ProjectText, aLineOfAnotherProgramHasItsPlaceAmongTheOthers) {
               bodyOf({R"("a")", R"("b")", R"({"file":"c","keys":{"k":"1","l":"2"}})"}));
 }
 
-TEST(ProjectText, rewritingPutsLinesInTheirPlaces) {
+TEST(ProjectText, rewritingSortsLines) {
     ProjectText const text = readWhole(bodyOf({R"("a")", R"("c")", R"("d/e")"}));
     ProjectText const written =
         text.rewrittenWith({set(fileAddress(u"b")), set(fileAddress(u"c"), makeNode(u"", {})),
@@ -223,7 +223,7 @@ TEST(ProjectText, stepsOfABatchAreAppliedInOrder) {
     EXPECT_EQ(text.rewrittenWith({remove(folder), set(folder)}).body(), bodyOf({R"("a")"}));
 }
 
-TEST(ProjectText, aMadeAddressStaysUntilItIsRemovedOrGetsANode) {
+TEST(ProjectText, aCreatedAddressStaysUntilItIsRemovedOrGetsANode) {
     Address const head = addressOf({u"References", u"Root"});
     Address const below = head.child({u"Reference", u"1"});
     ProjectText text = ProjectText::empty().rewrittenWith({make(head), set(below)});
@@ -232,7 +232,7 @@ TEST(ProjectText, aMadeAddressStaysUntilItIsRemovedOrGetsANode) {
     EXPECT_TRUE(contentOf(text.rewrittenWith({set(head), remove(head)})).empty());
 }
 
-TEST(ProjectText, anAddressWithNothingLeftBelowItIsGone) {
+TEST(ProjectText, anAddressWithNothingLeftBelowItIsRemoved) {
     ProjectText text = readWhole(bodyOf({R"("a/b/c")", R"("a/d")"}));
     std::string const tail = text.tailFor({remove(fileAddress(u"a/b/c"))});
     ASSERT_TRUE(text.extend(tail).has_value());
@@ -264,7 +264,7 @@ TEST(ProjectText, textsWithTheSameContentDoNotDiffer) {
     EXPECT_TRUE(tailed.differencesTo(tidy).empty());
 }
 
-TEST(ProjectText, aDifferenceBehindATailIsSeen) {
+TEST(ProjectText, aDifferenceBeforeATailIsFound) {
     ProjectText text = readWhole(bodyOf({R"("a")", R"("x/y")", R"("x/z")"}));
     ProjectText tailed = readWhole(text.body());
     ASSERT_TRUE(tailed.extend(tailed.tailFor({remove(fileAddress(u"x")), set(fileAddress(u"x/z"))})));
@@ -285,7 +285,7 @@ TEST(ProjectText, differencesHaveTheEarlierAndTheLaterNode) {
     EXPECT_EQ(statesOf(text.extend(tail).value()), expected);
 }
 
-TEST(ProjectText, sizesAndBytesAreThoseOfWhatWasRead) {
+TEST(ProjectText, sizesAndBytesAreThoseOfTheReadText) {
     std::string const body = bodyOf({R"("a")"});
     std::string const tail = readWhole(body).tailFor({someFile});
     ProjectText const text = readWhole(body + tail + "torn");

@@ -109,7 +109,7 @@ TEST(TextDamage, everyAlteredByteOfATextWithATailIsDetected) {
     }
 }
 
-TEST(TextDamage, anAlteredByteOfABodyIsSeenOrChangesItsLineAlone) {
+TEST(TextDamage, anAlteredByteOfABodyIsDetectedOrChangesOnlyItsLine) {
     std::string const bytes = mixedText().body();
     Content const before = contentOf(readWhole(bytes));
     std::size_t unseen = 0;
@@ -133,7 +133,7 @@ TEST(TextDamage, anAlteredByteOfABodyIsSeenOrChangesItsLineAlone) {
     EXPECT_GT(unseen, 0U) << "a body has no checksum; this test is to show what that costs";
 }
 
-TEST(TextDamage, everyOneOfManyDamagedLinesIsNamed) {
+TEST(TextDamage, everyOneOfManyDamagedLinesIsReported) {
     std::string bytes = std::string(firstLine) + "\n";
     for (int i = 0; i < 20'000; ++i) {
         bytes += "damaged\n";

@@ -64,7 +64,7 @@ TEST(TextTail, laterLinesWin) {
               (Content{{fileAddress(u"a"), "Info(l=2;)"}, {fileAddress(u"folder/d"), "Info()"}}));
 }
 
-TEST(TextTail, lineEndsDoNotCountInSums) {
+TEST(TextTail, checksumsIgnoreLineEnds) {
     std::string text = body + batchOf({R"("d")"}, sumOf(body));
     for (std::size_t at = 0; (at = text.find('\n', at)) != text.npos; at += 2) {
         text.insert(at, 1, '\r');
@@ -92,7 +92,7 @@ TEST(TextTail, aLastBatchWithHolesIsTorn) {
     EXPECT_EQ(files(text), "a folder ");
 }
 
-TEST(TextTail, aBatchOfGoodLinesWithAWrongSumIsDamage) {
+TEST(TextTail, aBatchOfReadableLinesWithAWrongChecksumIsDamage) {
     std::string one = batchOf({R"("d")", R"("e")"}, sumOf(body));
     one.replace(one.find("\"d\""), 3, "\"x\"");
     ProjectText const text = readWhole(body + one);
@@ -101,7 +101,7 @@ TEST(TextTail, aBatchOfGoodLinesWithAWrongSumIsDamage) {
     EXPECT_EQ(text.damagedLines(), one);
 }
 
-TEST(TextTail, aBatchWithHolesBeforeARightOneIsDamage) {
+TEST(TextTail, aBatchWithHolesBeforeAValidOneIsDamage) {
     std::string one = batchOf({R"("d")", R"("e")"}, sumOf(body));
     std::string const two = batchOf({R"("f")"}, sumIn(one));
     one.replace(one.find("\"d\""), 2, 2, '\0');
@@ -112,7 +112,7 @@ TEST(TextTail, aBatchWithHolesBeforeARightOneIsDamage) {
     EXPECT_EQ(text.rewrittenWith({}).body(), bodyOf({R"("a")", R"("f")", R"("folder/b")", R"("folder/c")"}));
 }
 
-TEST(TextTail, linesThatNoBatchCountsAreDamageBeforeARightOne) {
+TEST(TextTail, linesOutsideABatchAreDamageBeforeAValidOne) {
     std::string const two = batchOf({R"("f")"}, sumOf(body));
     ProjectText const text = readWhole(body + "\"lost\"\n" + two);
     EXPECT_EQ(described(text.faults()), "Damage 6");
@@ -145,7 +145,7 @@ TEST(TextTail, severalUnreadableBatchesAtTheEndAreOneTornTail) {
     EXPECT_EQ(text.damagedLines(), "");
 }
 
-TEST(TextTail, anUnreadableBatchBeforeAReadableOneWithAWrongSumIsDamage) {
+TEST(TextTail, anUnreadableBatchBeforeAReadableOneWithAWrongChecksumIsDamage) {
     std::string one = batchOf({R"("d")"}, sumOf(body));
     std::string two = batchOf({R"("e")"}, sumIn(one));
     one.replace(1, 1, 1, '\0');
@@ -175,7 +175,7 @@ TEST(TextTail, aRemovalDiscardsNodesThatAreBeingJoinedBelowIt) {
               (Content{{fileAddress(u"a"), "Info()"}, {fileAddress(u"folder/c"), "Info(l=2;)"}}));
 }
 
-TEST(TextTail, aRightBatchThatDoesNotChainIsJoined) {
+TEST(TextTail, aValidBatchThatDoesNotChainIsJoined) {
     std::string const key1 = R"({"file":"a","keys":{"k":"1","l":"1"}})";
     std::string const key2 = R"({"file":"a","keys":{"k":"2"}})";
     std::string const ours = batchOf({key1, R"({"file":"made","node":false})"}, sumOf(body));
@@ -187,7 +187,7 @@ TEST(TextTail, aRightBatchThatDoesNotChainIsJoined) {
                                         {fileAddress(u"made"), "Info()"}}));
 }
 
-TEST(TextTail, aBatchBehindOneThatDoesNotChainReplacesAgain) {
+TEST(TextTail, aBatchAfterOneThatDoesNotChainReplacesAgain) {
     std::string const other = batchOf({R"({"file":"a","keys":{"k":"1"}})"}, std::string(32, '0'));
     std::string const next = batchOf({R"({"file":"a","keys":{"l":"2"}})"}, sumIn(other));
     ProjectText const text = readWhole(body + other + next);

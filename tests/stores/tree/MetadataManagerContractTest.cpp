@@ -121,7 +121,7 @@ TEST_P(MetadataManagerContract, theNodesBelowSurviveAWriteAbove) {
     EXPECT_EQ(store.getNode(ab)->get(u"Value"), u"2");
 }
 
-TEST_P(MetadataManagerContract, childrenComeByTypeThenLocationByCodeUnits) {
+TEST_P(MetadataManagerContract, childrenAreSortedByTypeThenLocationByCodeUnits) {
     set({{a.child({u"b", u"1"}), node()},
          {a.child({u"B", u"2"}), node()},
          {a.child({u"b", u""}), node()},
@@ -139,7 +139,7 @@ TEST_P(MetadataManagerContract, anEmptyBatchIsLegal) {
     EXPECT_THAT(store.getChildNodes(MetadataPath::root()), IsEmpty());
 }
 
-TEST_P(MetadataManagerContract, removingAnAddressTakesAllBelowItAlong) {
+TEST_P(MetadataManagerContract, removingAnAddressRemovesEverythingBelowIt) {
     set({{a, node()}, {ab, node()}, {abc, node()}, {at({{u"Top", u"z"}}), node()}});
     remove({a});
     EXPECT_FALSE(store.pathExists(a));
@@ -154,7 +154,7 @@ TEST_P(MetadataManagerContract, removingAMissingAddressIsNotAnError) {
     EXPECT_TRUE(store.hasNode(a));
 }
 
-TEST_P(MetadataManagerContract, removingAnAddressAndWhatLiesBelowItInOneBatchIsOneRemoval) {
+TEST_P(MetadataManagerContract, removingAnAddressAndOneBelowItInOneBatchIsOneRemoval) {
     set({{a, node()}, {ab, node()}});
     remove({ab, a, a});
     EXPECT_FALSE(store.pathExists(a));
@@ -177,7 +177,7 @@ TEST_P(MetadataManagerContract, anAddressAboveWithANodeOrAnotherChildStays) {
     EXPECT_TRUE(store.hasNode(a));
 }
 
-TEST_P(MetadataManagerContract, aMadeAddressExistsWithoutANodeUntilItIsRemoved) {
+TEST_P(MetadataManagerContract, aCreatedAddressExistsWithoutANodeUntilItIsRemoved) {
     make({ab});
     EXPECT_TRUE(store.pathExists(ab));
     EXPECT_FALSE(store.hasNode(ab));
@@ -188,7 +188,7 @@ TEST_P(MetadataManagerContract, aMadeAddressExistsWithoutANodeUntilItIsRemoved) 
     EXPECT_FALSE(store.pathExists(a));
 }
 
-TEST_P(MetadataManagerContract, makingAnAddressThatExistsChangesNothing) {
+TEST_P(MetadataManagerContract, creatingAnExistingAddressChangesNothing) {
     set({{ab, node(u"1")}, {abc, node()}});
     make({ab, a});
     EXPECT_EQ(store.getNode(ab)->get(u"Value"), u"1");
@@ -196,7 +196,7 @@ TEST_P(MetadataManagerContract, makingAnAddressThatExistsChangesNothing) {
     EXPECT_FALSE(store.pathExists(a)); // it existed because of the node below, and was not created
 }
 
-TEST_P(MetadataManagerContract, aMadeAddressCanBeGivenANode) {
+TEST_P(MetadataManagerContract, aCreatedAddressCanBeGivenANode) {
     make({a});
     set({{a, node(u"1")}});
     EXPECT_TRUE(store.hasNode(a));
@@ -208,7 +208,7 @@ TEST_P(MetadataManagerContract, aNullNodeOrTheRootAddressIsRefusedBeforeAnything
     EXPECT_FALSE(store.pathExists(a));
 }
 
-TEST_P(MetadataManagerContract, anyCodeUnitsMakeARoundTrip) {
+TEST_P(MetadataManagerContract, anyCodeUnitsAreReadBackUnchanged) {
     std::u16string odd = u"\xD800 \xDC00\xDBFF\n\t\"\\/ \x05D0\x05D1";
     odd.push_back(0);
     odd.push_back(0xFFFF);
@@ -234,7 +234,7 @@ TEST_P(MetadataManagerContract, aWriterTakesTheReadLockAgainAndOthersWaitForTheO
     EXPECT_TRUE(other.isDone());
 }
 
-TEST_P(MetadataManagerContract, createPathsCreatesEachOfItsAddressesInWhateverOrderTheyAreGiven) {
+TEST_P(MetadataManagerContract, createPathsCreatesItsAddressesInAnyOrder) {
     for (Paths const& paths : {Paths{ab, a}, Paths{a, ab}}) {
         make(paths);
         TreeMetadataManager again(GetParam().makeBackend(folder.root()), folder.path(u".projectdata"));
@@ -274,7 +274,7 @@ public:
     std::function<void()> act = [] {};
 };
 
-TEST_P(MetadataManagerContract, everyWriteOfNodesMakesOneReportOfAdditions) {
+TEST_P(MetadataManagerContract, everyWriteOfNodesNotifiesListenersOnce) {
     auto const listener = std::make_shared<Listener>();
     store.subscribe(listener);
     set({});
@@ -282,7 +282,7 @@ TEST_P(MetadataManagerContract, everyWriteOfNodesMakesOneReportOfAdditions) {
     EXPECT_THAT(listener->reports, ElementsAre("addition", "addition"));
 }
 
-TEST_P(MetadataManagerContract, everyRemovalMakesOneReportOfRemovals) {
+TEST_P(MetadataManagerContract, everyRemovalNotifiesListenersOnce) {
     set({{a, node()}});
     auto const listener = std::make_shared<Listener>();
     store.subscribe(listener);
@@ -291,7 +291,7 @@ TEST_P(MetadataManagerContract, everyRemovalMakesOneReportOfRemovals) {
     EXPECT_THAT(listener->reports, ElementsAre("removal", "removal"));
 }
 
-TEST_P(MetadataManagerContract, makingAddressesReportsNothingWithoutFiles) {
+TEST_P(MetadataManagerContract, creatingAddressesReportsNothingWithoutFiles) {
     set({{a, node()}});
     auto const listener = std::make_shared<Listener>();
     store.subscribe(listener);
@@ -299,7 +299,7 @@ TEST_P(MetadataManagerContract, makingAddressesReportsNothingWithoutFiles) {
     EXPECT_THAT(listener->reports, IsEmpty());
 }
 
-TEST_P(MetadataManagerContract, aListenerThatHasGoneOrDoesNotAcceptIsPassedOver) {
+TEST_P(MetadataManagerContract, aDestroyedListenerAndOneThatDoesNotAcceptAreSkipped) {
     auto const refusing = std::make_shared<Listener>();
     refusing->accepts = false;
     store.subscribe(refusing);
@@ -318,7 +318,7 @@ TEST_P(MetadataManagerContract, aListenerSeesTheWriteThatItIsNotifiedOf) {
     EXPECT_TRUE(seen);
 }
 
-TEST_P(MetadataManagerContract, aListenerThatWritesGetsAnErrorAndTheWriteIsUndone) {
+TEST_P(MetadataManagerContract, aListenerThatWritesGetsAnErrorAndTheWriteIsRolledBack) {
     auto const listener = std::make_shared<Listener>();
     listener->act = [&] { set({{ab, node()}}); };
     store.subscribe(listener);

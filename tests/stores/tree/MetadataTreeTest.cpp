@@ -42,7 +42,7 @@ TEST_F(MetadataTreeTest, aLevelIsLoadedWhenItIsFirstAskedForAndOnlyOnce) {
     EXPECT_THAT(loaded, ElementsAre(root, a));
 }
 
-TEST_F(MetadataTreeTest, nothingIsLoadedBelowWhatIsKnownToHaveNoChildren) {
+TEST_F(MetadataTreeTest, nothingIsLoadedBelowAnAddressKnownToHaveNoChildren) {
     levels[root] = {plain(u"a")};
     EXPECT_THAT(tree.children(a), IsEmpty());
     EXPECT_FALSE(tree.exists(aa));
@@ -65,7 +65,7 @@ TEST_F(MetadataTreeTest, aChangedNodeIsLoadedAgainAndItsSiblingsStay) {
     EXPECT_THAT(loaded, ElementsAre(root, a)); // b is not loaded again
 }
 
-TEST_F(MetadataTreeTest, anAddressThatWasThereOnlyForWhatLayBelowGoesWithIt) {
+TEST_F(MetadataTreeTest, anAddressThatExistedOnlyForItsChildrenIsRemovedWithThem) {
     levels[root] = {bare(u"a"), plain(u"b")};
     levels[a] = {plain(u"a")};
     tree.children(a);
@@ -78,7 +78,7 @@ TEST_F(MetadataTreeTest, anAddressThatWasThereOnlyForWhatLayBelowGoesWithIt) {
     EXPECT_THAT(tree.children(root), ElementsAre(b));
 }
 
-TEST_F(MetadataTreeTest, whatOthersPutBelowAnAddressWithoutChildrenIsFound) {
+TEST_F(MetadataTreeTest, nodesThatOthersAddBelowAnAddressWithoutChildrenAreFound) {
     levels[root] = {plain(u"a")};
     tree.children(a);
 
@@ -94,7 +94,7 @@ TEST_F(MetadataTreeTest, levelsThatWereNeverLoadedAreNotLoadedForAChange) {
     EXPECT_THAT(loaded, IsEmpty());
 }
 
-TEST_F(MetadataTreeTest, whenEverythingChangedAllIsForgotten) {
+TEST_F(MetadataTreeTest, aChangeOfEverythingDropsAllLoadedLevels) {
     levels[root] = {plain(u"a")};
     tree.children(root);
     levels[root] = {plain(u"b")};

@@ -39,7 +39,7 @@ TEST_F(OthersChanges, areReportedByAddressInTheirOrderAndOnce) {
     EXPECT_THAT(take(), IsEmpty());
 }
 
-TEST_F(OthersChanges, areToldFromBeforeTheFirstToAfterTheLast) {
+TEST_F(OthersChanges, areReportedFromBeforeTheFirstToAfterTheLast) {
     others({set(fileAddress(u"a"), makeNode(u"Info", {{u"k", u"1"}}))});
     EXPECT_TRUE(tree_->hasNode(fileAddress(u"a")));
     others({remove(fileAddress(u"a"))});
@@ -51,7 +51,7 @@ TEST_F(OthersChanges, areToldFromBeforeTheFirstToAfterTheLast) {
     EXPECT_EQ(changes.differences[0].after, nullptr);
 }
 
-TEST_F(OthersChanges, areRememberedWhateverOperationSawThem) {
+TEST_F(OthersChanges, areReportedWhicheverOperationFoundThem) {
     others({set(fileAddress(u"d"))});
     EXPECT_TRUE(tree_->hasNode(fileAddress(u"d")));
     others({set(fileAddress(u"e"))});
@@ -60,7 +60,7 @@ TEST_F(OthersChanges, areRememberedWhateverOperationSawThem) {
     EXPECT_THAT(take(), ElementsAre(fileAddress(u"d"), fileAddress(u"e")));
 }
 
-TEST_F(OthersChanges, areNotToldWhenTheyWereUndone) {
+TEST_F(OthersChanges, areNotReportedIfTheyWereUndone) {
     others({remove(fileAddress(u"a"))});
     EXPECT_FALSE(tree_->hasNode(fileAddress(u"a")));
     others({set(fileAddress(u"a"))});
@@ -86,7 +86,7 @@ TEST_F(OthersChanges, waitForTheEndOfAnOpenGuard) {
     EXPECT_THAT(take(), ElementsAre(fileAddress(u"d")));
 }
 
-TEST_F(OthersChanges, areAllOfACheckout) {
+TEST_F(OthersChanges, areThoseOfTheWholeCheckout) {
     volume->replaceFile("project.jsonl", textOf(addFiles(manyFiles(5'000))));
 
     EXPECT_EQ(take().size(), 5'003U);
@@ -94,7 +94,7 @@ TEST_F(OthersChanges, areAllOfACheckout) {
     EXPECT_FALSE(tree_->hasNode(fileAddress(u"a")));
 }
 
-TEST_F(OthersChanges, areEverythingWhenAStoreComesIntoBeingWhereNoneWas) {
+TEST_F(OthersChanges, areEverythingWhenAStoreIsCreatedWhereNoneWas) {
     volume->removeFolder();
     TreeMetadataManager fresh(open(), u"/project/.projectdata");
     EXPECT_FALSE(fresh.takeOthersChanges().everything);

@@ -331,7 +331,7 @@ private:
     std::vector<Model> notDurable_; ///< contents that a power cut may restore
 };
 
-TEST(TextBackendModel, afterAnyHistoryOfTwoProcessesAProjectHoldsWhatAPlainMapHolds) {
+TEST(TextBackendModel, afterAnyHistoryOfTwoProcessesAProjectEqualsAPlainMap) {
     std::size_t appends = 0;
     std::size_t rewrites = 0;
 
@@ -362,7 +362,7 @@ TEST(TextBackendModel, afterAnyHistoryOfTwoProcessesAProjectHoldsWhatAPlainMapHo
 
 /// An append whose sync fails for good, a rewrite over it, and a power cut that brings the old text back
 /// without the append: it must not be taken for a text that somebody else put in place.
-TEST(TextBackendModel, anOldTextThatAPowerCutToreDoesNotComeBackOverTheNewOne) {
+TEST(TextBackendModel, anOldTextTornByAPowerCutDoesNotReplaceTheNewOne) {
     using Kind = Step::Kind;
     using InjectedFault = CrashingVolume::InjectedFault;
     auto const head = Address::root().child(metadata::PathElement(u"Files", u"Root"));
@@ -383,7 +383,7 @@ TEST(TextBackendModel, anOldTextThatAPowerCutToreDoesNotComeBackOverTheNewOne) {
     }
 }
 
-TEST(TextBackendModel, theSameHoldsForTextsOfTheRealLimits) {
+TEST(TextBackendModel, theSameHoldsForTextsWithTheRealLimits) {
     std::size_t appends = 0;
     std::size_t rewrites = 0;
     for (unsigned seed = 1; seed <= 2; ++seed) {

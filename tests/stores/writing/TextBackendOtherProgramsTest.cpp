@@ -79,7 +79,7 @@ TEST_F(TextBackendOtherPrograms, aFolderThatWasMovedAwayBeforeTheBatchIsNotTouch
     }
 }
 
-TEST_F(TextBackendOtherPrograms, aTextThatComesBeforeTheLastLookIsNotEvenExchanged) {
+TEST_F(TextBackendOtherPrograms, aTextWrittenBeforeTheLastCheckIsNotExchanged) {
     prepare({u"a"});
     auto const backend = open();
     once(volume->afterCall, "renameToFree temporary swapping",
@@ -107,7 +107,7 @@ TEST_F(TextBackendOtherPrograms, aTextThatIsChangedInPlaceWhileASyncFailsMayHave
     EXPECT_EQ(StoreError::Kind::OutcomeUnknown, error.kind());
 }
 
-TEST_F(TextBackendOtherPrograms, aTextThatComesBetweenTheLookAndTheExchangeIsPutBack) {
+TEST_F(TextBackendOtherPrograms, aTextWrittenBetweenTheCheckAndTheExchangeIsRestored) {
     prepare({u"a"});
     auto const backend = open();
     once(volume->beforeCall, "exchange swapping project.jsonl",
@@ -122,7 +122,7 @@ TEST_F(TextBackendOtherPrograms, aTextThatComesBetweenTheLookAndTheExchangeIsPut
     EXPECT_EQ(contentAfter({addFiles({u"their file", u"b"})}), stored());
 }
 
-TEST_F(TextBackendOtherPrograms, aTextThatWasPutBackStaysAfterAPowerCut) {
+TEST_F(TextBackendOtherPrograms, aRestoredTextSurvivesAPowerCut) {
     for (unsigned seed = 0; seed < 20; ++seed) {
         *volume = CrashingVolume(seed);
         prepare({u"a"});
@@ -137,7 +137,7 @@ TEST_F(TextBackendOtherPrograms, aTextThatWasPutBackStaysAfterAPowerCut) {
     }
 }
 
-TEST_F(TextBackendOtherPrograms, whenAPutBackTextCannotBeMadeDurableTheOutcomeIsCalledUnknown) {
+TEST_F(TextBackendOtherPrograms, theOutcomeIsUnknownIfARestoredTextCannotBeMadeDurable) {
     for (unsigned seed = 0; seed < 20; ++seed) {
         *volume = CrashingVolume(seed);
         prepare({u"a"});
@@ -158,7 +158,7 @@ TEST_F(TextBackendOtherPrograms, whenAPutBackTextCannotBeMadeDurableTheOutcomeIs
     }
 }
 
-TEST_F(TextBackendOtherPrograms, whereFilesCannotBeExchangedOneLooksAgainRightBeforeTheRename) {
+TEST_F(TextBackendOtherPrograms, withoutExchangeTheTextIsCheckedAgainRightBeforeTheRename) {
     for (auto const* moment : {"sync", "exchange swapping project.jsonl", "create temporary"}) {
         prepare({u"a"});
         volume->canExchange = false;
@@ -172,7 +172,7 @@ TEST_F(TextBackendOtherPrograms, whereFilesCannotBeExchangedOneLooksAgainRightBe
     }
 }
 
-TEST_F(TextBackendOtherPrograms, aPipeThatComesBetweenIsPutBackToo) {
+TEST_F(TextBackendOtherPrograms, aPipeCreatedInBetweenIsRestoredToo) {
     prepare({u"a"});
     auto const backend = open();
     once(volume->beforeCall, "exchange swapping project.jsonl", [&] { volume->putPipe("project.jsonl"); });
@@ -183,7 +183,7 @@ TEST_F(TextBackendOtherPrograms, aPipeThatComesBetweenIsPutBackToo) {
     EXPECT_THROW(contentOf(*backend), StoreError);
 }
 
-TEST_F(TextBackendOtherPrograms, ofTwoTextsThatComeBetweenNoneIsLost) {
+TEST_F(TextBackendOtherPrograms, twoTextsWrittenInBetweenAreBothKept) {
     prepare({u"a"});
     int exchanges = 0;
     auto const second = textOf(addFiles({u"their second file"}));
@@ -202,7 +202,7 @@ TEST_F(TextBackendOtherPrograms, ofTwoTextsThatComeBetweenNoneIsLost) {
     EXPECT_EQ(second, volume->content(aside.front()));
 }
 
-TEST_F(TextBackendOtherPrograms, aTextThatCannotBePutBackIsSetAsideAndNamed) {
+TEST_F(TextBackendOtherPrograms, aTextThatCannotBeRestoredIsSetAsideAndReported) {
     prepare({u"a"});
     int exchanges = 0;
     auto const backend = open();
@@ -244,7 +244,7 @@ TEST_F(TextBackendOtherPrograms, aTextThatReplacesOursRightAfterTheWriteWinsAndT
     }
 }
 
-TEST_F(TextBackendOtherPrograms, aFolderThatWasMovedAwayDoesNotComeBackWithTheBatch) {
+TEST_F(TextBackendOtherPrograms, aFolderThatWasMovedAwayIsNotRecreatedByTheBatch) {
     for (auto const& [options, call] :
          {std::pair{rewriting(), "create temporary like project.jsonl"},
           std::pair{rewriting(), "exchange swapping project.jsonl"},
@@ -264,7 +264,7 @@ TEST_F(TextBackendOtherPrograms, aFolderThatWasMovedAwayDoesNotComeBackWithTheBa
     }
 }
 
-TEST_F(TextBackendOtherPrograms, whatSomebodyAppendsAfterOurBatchIsSeenAtTheNextGuard) {
+TEST_F(TextBackendOtherPrograms, aBatchThatOthersAppendAfterOursIsSeenByTheNextGuard) {
     prepare(manyFiles(20));
     auto const backend = open(appending());
     once(volume->afterCall, "append project.jsonl", [&] { volume->append("project.jsonl", "\"torn"); });
@@ -312,7 +312,7 @@ TEST_F(TextBackendOtherPrograms, aProcessThatDiesWhileItHoldsTheTextOfAnotherPro
     }
 }
 
-TEST_F(TextBackendOtherPrograms, aTextThatIsPutBackForADeadWriterStaysAfterAPowerCut) {
+TEST_F(TextBackendOtherPrograms, aTextRestoredForADeadWriterSurvivesAPowerCut) {
     for (unsigned seed = 0; seed < 20; ++seed) {
         *volume = CrashingVolume(seed);
         prepare({u"a"});
@@ -331,7 +331,7 @@ TEST_F(TextBackendOtherPrograms, aTextThatIsPutBackForADeadWriterStaysAfterAPowe
     }
 }
 
-TEST_F(TextBackendOtherPrograms, aBatchBehindATextWhoseWriterDiedOutlivesAPowerCut) {
+TEST_F(TextBackendOtherPrograms, aBatchAfterATextOfADeadWriterSurvivesAPowerCut) {
     for (unsigned seed = 0; seed < 40; ++seed) {
         bool const hasWrittenBefore = seed % 2 == 0;
         *volume = CrashingVolume(seed);
@@ -362,7 +362,7 @@ TEST_F(TextBackendOtherPrograms, aBatchBehindATextWhoseWriterDiedOutlivesAPowerC
     }
 }
 
-TEST_F(TextBackendOtherPrograms, whatSomebodyAppendsAtTheVeryMomentOfOurBatchIsSeenAtTheNextGuard) {
+TEST_F(TextBackendOtherPrograms, aBatchThatOthersAppendDuringOursIsSeenByTheNextGuard) {
     prepare(manyFiles(40));
     auto const backend = open(appending());
     auto const lines = textOf(addFiles(manyFiles(40)), {addFiles({u"b"})}).substr(text().size());
@@ -375,7 +375,7 @@ TEST_F(TextBackendOtherPrograms, whatSomebodyAppendsAtTheVeryMomentOfOurBatchIsS
     EXPECT_EQ(1U, stored().count(fileAddress(u"c")));
 }
 
-TEST_F(TextBackendOtherPrograms, aStrangersTextIsSetAsideWhereItsPlaceIsTakenByThen) {
+TEST_F(TextBackendOtherPrograms, aTextOfAnotherProgramIsSetAsideIfItsPlaceIsTaken) {
     prepare({u"a"});
     once(volume->beforeCall, "exchange swapping project.jsonl", [&] {
         volume->replaceFile("project.jsonl", theirs);
@@ -393,7 +393,7 @@ TEST_F(TextBackendOtherPrograms, aStrangersTextIsSetAsideWhereItsPlaceIsTakenByT
     EXPECT_EQ(theirs, volume->content(aside.front()));
 }
 
-TEST_F(TextBackendOtherPrograms, temporaryFilesOfDeadWritersGoWhenAWriterOpensAndOthersStay) {
+TEST_F(TextBackendOtherPrograms, temporaryFilesOfDeadWritersAreDeletedWhenAWriterOpensAndOthersStay) {
     prepare({u"a"});
     volume->replaceFile("project.jsonl.123-0123456789abcdef.tmp", "half");
     volume->replaceFile("project.jsonl.orig", "an editor's");
@@ -410,7 +410,7 @@ TEST_F(TextBackendOtherPrograms, temporaryFilesOfDeadWritersGoWhenAWriterOpensAn
     EXPECT_THAT(volume->namesLike("displaced-"), SizeIs(1));
 }
 
-TEST_F(TextBackendOtherPrograms, leftoversThatCannotBeRemovedStopNobody) {
+TEST_F(TextBackendOtherPrograms, leftoversThatCannotBeDeletedBlockNoWriter) {
     prepare({u"a"});
     volume->replaceFile("project.jsonl.123-0123456789abcdef.tmp", "half");
     volume->beforeCall = [](std::string const& call) {
@@ -439,7 +439,7 @@ TEST_F(TextBackendOtherPrograms, anotherWriterIsWaitedForAndThenNamed) {
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers wait for nobody";
 }
 
-TEST_F(TextBackendOtherPrograms, aGuardThatFailsLetsTheLockGo) {
+TEST_F(TextBackendOtherPrograms, aFailedGuardReleasesTheLock) {
     prepare({u"a"});
     auto const backend = open();
     contentOf(*backend);
@@ -450,7 +450,7 @@ TEST_F(TextBackendOtherPrograms, aGuardThatFailsLetsTheLockGo) {
     EXPECT_NO_THROW(commit(*open(), addFiles({u"b"})));
 }
 
-TEST_F(TextBackendOtherPrograms, aFolderThatIsReplacedWhileWeWaitForItsLockIsOpenedAnew) {
+TEST_F(TextBackendOtherPrograms, aFolderThatIsReplacedWhileWeWaitForItsLockIsReopened) {
     prepare({u"a"});
     auto const backend = open();
     once(volume->beforeCall, "lock", [&] {
@@ -463,7 +463,7 @@ TEST_F(TextBackendOtherPrograms, aFolderThatIsReplacedWhileWeWaitForItsLockIsOpe
     EXPECT_EQ(contentAfter({addFiles({u"their file", u"b"})}), stored());
 }
 
-TEST_F(TextBackendOtherPrograms, aStoreThatSomebodyElseMakesMeanwhileIsNotOverwritten) {
+TEST_F(TextBackendOtherPrograms, aStoreThatAnotherProgramCreatesMeanwhileIsNotOverwritten) {
     auto const backend = open();
     Entered const entered(*backend, Access::Write);
     commit(*open(), addFiles({u"their file"}));
@@ -476,7 +476,7 @@ TEST_F(TextBackendOtherPrograms, aStoreThatSomebodyElseMakesMeanwhileIsNotOverwr
     EXPECT_EQ(usual, volume->names());
 }
 
-TEST_F(TextBackendOtherPrograms, aTextThatGitBringsWhileTheStoreIsMadeIsNotOverwritten) {
+TEST_F(TextBackendOtherPrograms, aTextThatGitWritesWhileTheStoreIsCreatedIsNotOverwritten) {
     auto const backend = open();
     once(volume->beforeCall, "renameToFree temporary project.jsonl",
          [&] { volume->replaceFile("project.jsonl", theirs); });

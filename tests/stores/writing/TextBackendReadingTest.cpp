@@ -42,7 +42,7 @@ TEST_F(TextBackendReading, theFirstGuardReadsTheTextAndTakesNoLock) {
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend));
 }
 
-TEST_F(TextBackendReading, aSettledTextIsLookedAtWithOneCallAndNotRead) {
+TEST_F(TextBackendReading, aTextWithAnOldStampIsCheckedWithOneCallAndNotRead) {
     prepare({u"a"});
     auto const backend = open();
     contentOf(*backend);
@@ -61,7 +61,7 @@ TEST_F(TextBackendReading, ourOwnBatchIsNotReadAgain) {
     }
 }
 
-TEST_F(TextBackendReading, whereNoStampIsKeptOurOwnBatchIsComparedByContentOnce) {
+TEST_F(TextBackendReading, withoutStampsOurOwnBatchIsComparedByContentOnce) {
     volume->keepsStamps = false;
     prepare(manyFiles(20));
     for (auto const& options : {rewriting(), appending()}) {
@@ -77,7 +77,7 @@ TEST_F(TextBackendReading, whereNoStampIsKeptOurOwnBatchIsComparedByContentOnce)
     }
 }
 
-TEST_F(TextBackendReading, aStrangersChangeOfTheSameLengthRightAfterOurBatchIsNoticed) {
+TEST_F(TextBackendReading, aChangeByOthersOfTheSameLengthRightAfterOurBatchIsNoticed) {
     for (bool const stamps : {true, false}) {
         volume->keepsStamps = stamps;
         prepare({u"a"});
@@ -119,7 +119,7 @@ TEST_F(TextBackendReading, aTextWithTimesInTheFutureIsComparedByContent) {
     EXPECT_THAT(callsOfALook(*backend), ElementsAre("identifyByPath project.jsonl"));
 }
 
-TEST_F(TextBackendReading, aBatchThatAnotherProcessAppendedIsTakenInWithoutReadingTheRest) {
+TEST_F(TextBackendReading, aBatchThatAnotherProcessAppendedIsReadWithoutTheRest) {
     prepare(manyFiles(20));
     auto const backend = open(appending());
     contentOf(*backend);
@@ -134,7 +134,7 @@ TEST_F(TextBackendReading, aBatchThatAnotherProcessAppendedIsTakenInWithoutReadi
     EXPECT_EQ(contentOf(*other), loadAll(*backend));
 }
 
-TEST_F(TextBackendReading, severalAppendedBatchesAreTakenInAtOnceAndGoOnToBeWrittenBehind) {
+TEST_F(TextBackendReading, severalAppendedBatchesAreReadAtOnceAndAreAppendedTo) {
     prepare(manyFiles(40));
     auto const backend = open(appending());
     contentOf(*backend);
@@ -164,7 +164,7 @@ TEST_F(TextBackendReading, aBatchThatIsStillBeingAppendedDoesNotCount) {
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20)), addFiles({u"b"})}), contentOf(*backend));
 }
 
-TEST_F(TextBackendReading, aTextThatAnotherProcessWroteAnewIsComparedAndOnlyWhatDiffersCounts) {
+TEST_F(TextBackendReading, aTextThatAnotherProcessRewroteIsComparedAndOnlyDifferencesCount) {
     prepare({u"a", u"b"});
     auto const backend = open();
     contentOf(*backend);
@@ -189,7 +189,7 @@ TEST_F(TextBackendReading, aTidiedTextHasNotChanged) {
     EXPECT_THAT(addressesOf(entered.changes().differences), IsEmpty());
 }
 
-TEST_F(TextBackendReading, aFolderThatWasReplacedIsReadAnew) {
+TEST_F(TextBackendReading, aFolderThatWasReplacedIsReadAgain) {
     prepare({u"a"});
     auto const backend = open();
     contentOf(*backend);
@@ -269,7 +269,7 @@ TEST_F(TextBackendReading, aTextThatVanishedIsWaitedForAndThenAnError) {
     EXPECT_EQ(contentAfter({addFiles({u"b"})}), contentOf(*backend));
 }
 
-TEST_F(TextBackendReading, aTextThatGitHasJustTakenAwayIsWaitedForAlsoByWhoOpensTheProject) {
+TEST_F(TextBackendReading, openingAProjectWaitsForATextThatGitHasJustDeleted) {
     for (auto const access : {Access::Read, Access::Write}) {
         prepare({u"a"});
         volume->remove("project.jsonl");
@@ -285,7 +285,7 @@ TEST_F(TextBackendReading, aTextThatGitHasJustTakenAwayIsWaitedForAlsoByWhoOpens
     }
 }
 
-TEST_F(TextBackendReading, aStoreWhoseMakerDiedBeforeItsTextWasMadeIsAnEmptyProject) {
+TEST_F(TextBackendReading, aStoreWhoseCreatorDiedBeforeItsTextExistedIsAnEmptyProject) {
     prepare({u"a"});
     volume->remove("project.jsonl");
 
@@ -299,7 +299,7 @@ TEST_F(TextBackendReading, aStoreWhoseMakerDiedBeforeItsTextWasMadeIsAnEmptyProj
     EXPECT_EQ(contentAfter({addFiles({u"b"})}), stored());
 }
 
-TEST_F(TextBackendReading, aFolderThatVanishedIsNoEmptyProject) {
+TEST_F(TextBackendReading, aFolderThatVanishedIsNotAnEmptyProject) {
     prepare({u"a"});
     auto const backend = open();
     contentOf(*backend);
@@ -310,7 +310,7 @@ TEST_F(TextBackendReading, aFolderThatVanishedIsNoEmptyProject) {
     EXPECT_FALSE(volume->hasFolder());
 }
 
-TEST_F(TextBackendReading, aStoreWithoutNodesThatItsMakerTookBackIsAProjectWithoutAStore) {
+TEST_F(TextBackendReading, aStoreWithoutNodesThatItsCreatorDiscardedIsAProjectWithoutAStore) {
     auto const maker = open();
     maker->enter(Access::Write);
     maker->write(addFiles({u"a"}));
@@ -324,7 +324,7 @@ TEST_F(TextBackendReading, aStoreWithoutNodesThatItsMakerTookBackIsAProjectWitho
     EXPECT_THAT(commit(*backend, addFiles({u"b"})).added, Not(IsEmpty()));
 }
 
-TEST_F(TextBackendReading, aStoreThatCameIntoBeingIsSeenAtTheNextGuard) {
+TEST_F(TextBackendReading, aNewStoreIsSeenByTheNextGuard) {
     auto const backend = open();
     contentOf(*backend);
     prepare({u"a"});
@@ -347,7 +347,7 @@ TEST_F(TextBackendReading, differencesAreListedHoweverManyTheyAre) {
     EXPECT_EQ(entered.changes().differences.size(), 10'001U);
 }
 
-TEST_F(TextBackendReading, whatACheckSawIsToldByTheNextGuard) {
+TEST_F(TextBackendReading, changesThatCheckFoundAreReportedByTheNextGuard) {
     prepare({u"a"});
     auto const backend = open();
     contentOf(*backend);
@@ -359,7 +359,7 @@ TEST_F(TextBackendReading, whatACheckSawIsToldByTheNextGuard) {
     EXPECT_THAT(addressesOf(entered.changes().differences), ElementsAre(fileAddress(u"b")));
 }
 
-TEST_F(TextBackendReading, aTextThatIsNoneOfOursIsAnErrorWithItsLine) {
+TEST_F(TextBackendReading, aTextInAnotherFormatIsAnErrorWithItsLine) {
     prepareText("hello\n");
 
     auto const error = errorOf([&] { contentOf(*open()); });

@@ -40,7 +40,7 @@ TEST_F(TextBackendRepair, closingAStoreThatHasOnlyReadChangesNothing) {
     EXPECT_EQ(tailed, text());
 }
 
-TEST_F(TextBackendRepair, closingAStoreThatSomebodyElseIsWritingChangesNothingAndWaitsForNobody) {
+TEST_F(TextBackendRepair, closingAStoreThatAnotherProcessIsWritingChangesNothingAndDoesNotWait) {
     prepare(manyFiles(20));
     auto backend = open(appending());
     commit(*backend, addFiles({u"b"}));
@@ -83,12 +83,12 @@ TEST_F(TextBackendRepair, tidyWritesTheBodyWithoutATailAndOnlyOnce) {
     EXPECT_THAT(writes(), IsEmpty());
 }
 
-TEST_F(TextBackendRepair, tidyMakesNoStore) {
+TEST_F(TextBackendRepair, tidyCreatesNoStore) {
     EXPECT_FALSE(open()->tidy());
     EXPECT_FALSE(volume->hasFolder());
 }
 
-TEST_F(TextBackendRepair, whatTidyFindsChangedIsToldByTheNextGuard) {
+TEST_F(TextBackendRepair, changesThatTidyFoundAreReportedByTheNextGuard) {
     prepareText(textOf(addFiles(manyFiles(20))));
     auto const backend = open(appending());
     contentOf(*backend);
@@ -107,7 +107,7 @@ TEST_F(TextBackendRepair, aDamagedTextIsNotTidied) {
     EXPECT_EQ(damaged(), text());
 }
 
-TEST_F(TextBackendRepair, tidyWaitsForAnotherWriterAndLetsTheLockGo) {
+TEST_F(TextBackendRepair, tidyWaitsForAnotherWriterAndReleasesTheLock) {
     prepareText(textOf(addFiles({u"a"}), {addFiles({u"b"})}));
     auto const backend = open();
     {
@@ -120,7 +120,7 @@ TEST_F(TextBackendRepair, tidyWaitsForAnotherWriterAndLetsTheLockGo) {
     EXPECT_NO_THROW(commit(*open(), addFiles({u"c"})));
 }
 
-TEST_F(TextBackendRepair, checkTellsAllFaultsByLineAndTakesNoLock) {
+TEST_F(TextBackendRepair, checkReportsAllFaultsByLineAndTakesNoLock) {
     prepareText(damaged() + "\"torn");
     auto const other = open();
     Entered const theirs(*other, Access::Write);
@@ -151,7 +151,7 @@ TEST_F(TextBackendRepair, checkReadsTheTextWhateverItsTimesSay) {
     EXPECT_EQ(1U, volume->count("read project.jsonl"));
 }
 
-TEST_F(TextBackendRepair, repairSetsDamageAsideAndTheTextTakesWritesAgain) {
+TEST_F(TextBackendRepair, repairSetsDamageAsideAndAllowsWritesAgain) {
     prepareText(damaged());
     auto const backend = open();
     EXPECT_THROW(commit(*backend, addFiles({u"d"})), StoreError);
@@ -166,7 +166,7 @@ TEST_F(TextBackendRepair, repairSetsDamageAsideAndTheTextTakesWritesAgain) {
     EXPECT_EQ("", backend->repair());
 }
 
-TEST_F(TextBackendRepair, theDamagedLinesAreDurableBeforeTheTextGoesOnWithoutThem) {
+TEST_F(TextBackendRepair, theDamagedLinesAreDurableBeforeTheTextOmitsThem) {
     for (unsigned seed = 0; seed < 20; ++seed) {
         bool wasReached = true;
         for (std::size_t call = 0; wasReached; ++call) {
@@ -191,7 +191,7 @@ TEST_F(TextBackendRepair, theDamagedLinesAreDurableBeforeTheTextGoesOnWithoutThe
     }
 }
 
-TEST_F(TextBackendRepair, settlingPutsAWholeTextInThePlaceOfOneWithMarkers) {
+TEST_F(TextBackendRepair, resolvingReplacesTheTextWithMarkers) {
     auto const settled = textOf(addFiles({u"a", u"b"}));
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
@@ -205,7 +205,7 @@ TEST_F(TextBackendRepair, settlingPutsAWholeTextInThePlaceOfOneWithMarkers) {
     commit(*backend, addFiles({u"e"}));
 }
 
-TEST_F(TextBackendRepair, whenSettlingFailsTheMarkersAreThereAgain) {
+TEST_F(TextBackendRepair, aFailedResolveRestoresTheMarkers) {
     auto const settled = textOf(addFiles({u"a", u"b"}));
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
@@ -222,7 +222,7 @@ TEST_F(TextBackendRepair, whenSettlingFailsTheMarkersAreThereAgain) {
     EXPECT_EQ(settled, text());
 }
 
-TEST_F(TextBackendRepair, settlingChangesNothingWhereThereIsNothingToSettle) {
+TEST_F(TextBackendRepair, resolvingChangesNothingWithoutAConflict) {
     auto const sound = textOf(addFiles({u"a"}));
     prepareText(sound);
     auto const backend = open();
@@ -231,7 +231,7 @@ TEST_F(TextBackendRepair, settlingChangesNothingWhereThereIsNothingToSettle) {
     EXPECT_EQ(text(), sound);
 }
 
-TEST_F(TextBackendRepair, settlingTakesNoTextThatIsNotSound) {
+TEST_F(TextBackendRepair, resolvingRefusesAnUnsoundText) {
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
     prepareText(conflict);
@@ -245,7 +245,7 @@ TEST_F(TextBackendRepair, settlingTakesNoTextThatIsNotSound) {
     }
 }
 
-TEST_F(TextBackendRepair, repairLeavesTheMarkersOfAMergeToAPerson) {
+TEST_F(TextBackendRepair, repairKeepsConflictMarkers) {
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
     prepareText(conflict);

@@ -26,7 +26,7 @@ TEST_F(TextBackendWriting, nothingIsWrittenBeforeTheFirstBatch) {
     EXPECT_THAT(writes(), IsEmpty());
 }
 
-TEST_F(TextBackendWriting, theFirstBatchMakesTheStoreBeforeWriteReturns) {
+TEST_F(TextBackendWriting, theFirstBatchCreatesTheStoreBeforeWriteReturns) {
     auto const backend = open();
     Entered const entered(*backend, Access::Write);
 
@@ -46,7 +46,7 @@ TEST_F(TextBackendWriting, theFirstBatchMakesTheStoreBeforeWriteReturns) {
     EXPECT_THAT(stored(), IsEmpty());
 }
 
-TEST_F(TextBackendWriting, theNewStoreOutlivesAPowerCutBeforeKeep) {
+TEST_F(TextBackendWriting, theNewStoreSurvivesAPowerCutBeforeKeep) {
     auto const backend = open();
     backend->enter(Access::Write);
     backend->write(addFiles({u"a"}));
@@ -57,7 +57,7 @@ TEST_F(TextBackendWriting, theNewStoreOutlivesAPowerCutBeforeKeep) {
     EXPECT_EQ(textOf({}), text());
 }
 
-TEST_F(TextBackendWriting, whatIsThereOfANewStoreIsNotMadeAgain) {
+TEST_F(TextBackendWriting, existingFilesOfANewStoreAreNotCreatedAgain) {
     volume->makeFolder();
     volume->replaceFile(".gitattributes", "* text\n");
     auto const backend = open();
@@ -70,7 +70,7 @@ TEST_F(TextBackendWriting, whatIsThereOfANewStoreIsNotMadeAgain) {
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), stored());
 }
 
-TEST_F(TextBackendWriting, discardingTheFirstBatchTakesTheStoreAwaySoThatItIsReportedAgain) {
+TEST_F(TextBackendWriting, discardingTheFirstBatchDeletesTheStoreSoThatItIsReportedAgain) {
     auto const backend = open();
     Entered const entered(*backend, Access::Write);
     auto const first = backend->write(addFiles({u"a"}));
@@ -84,7 +84,7 @@ TEST_F(TextBackendWriting, discardingTheFirstBatchTakesTheStoreAwaySoThatItIsRep
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), stored());
 }
 
-TEST_F(TextBackendWriting, discardingTheFirstBatchLeavesAStoreThatSomebodyHasChanged) {
+TEST_F(TextBackendWriting, discardingTheFirstBatchKeepsAStoreThatAnotherProgramChanged) {
     auto const backend = open();
     Entered const entered(*backend, Access::Write);
     backend->write(addFiles({u"a"}));
@@ -110,7 +110,7 @@ TEST_F(TextBackendWriting, discardingALaterBatchLeavesTheStore) {
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), loadAll(*backend));
 }
 
-TEST_F(TextBackendWriting, aFirstBatchWhoseFilesCannotBeMadeLeavesNothing) {
+TEST_F(TextBackendWriting, aFirstBatchWhoseFilesCannotBeCreatedLeavesNothing) {
     for (std::size_t room : {std::size_t{0}, std::size_t{50}, std::size_t{150}}) {
         volume->room = room;
         auto const backend = open();
@@ -122,7 +122,7 @@ TEST_F(TextBackendWriting, aFirstBatchWhoseFilesCannotBeMadeLeavesNothing) {
     }
 }
 
-TEST_F(TextBackendWriting, writeChangesNothingOnDiskAndLoadAnswersWithTheBatchInIt) {
+TEST_F(TextBackendWriting, writeChangesNothingOnDiskAndLoadIncludesTheBatch) {
     prepare({u"a", u"b"});
     for (auto const& options : {rewriting(), appending()}) {
         auto const before = text();
@@ -140,7 +140,7 @@ TEST_F(TextBackendWriting, writeChangesNothingOnDiskAndLoadAnswersWithTheBatchIn
     }
 }
 
-TEST_F(TextBackendWriting, aShortTextIsWrittenAnewWithOneSyncOfTheFileAndOneOfTheFolder) {
+TEST_F(TextBackendWriting, aShortTextIsRewrittenWithOneSyncOfTheFileAndOneOfTheFolder) {
     prepare({u"a"});
     auto const backend = open();
 
@@ -151,7 +151,7 @@ TEST_F(TextBackendWriting, aShortTextIsWrittenAnewWithOneSyncOfTheFileAndOneOfTh
     EXPECT_EQ(textOf(addFiles({u"a", u"b"})), text());
 }
 
-TEST_F(TextBackendWriting, whereFilesCannotBeExchangedTheNewOneIsRenamedOverTheOldOne) {
+TEST_F(TextBackendWriting, withoutExchangeTheNewFileIsRenamedOverTheOldOne) {
     prepare({u"a"});
     volume->canExchange = false;
     auto const backend = open();
@@ -175,7 +175,7 @@ TEST_F(TextBackendWriting, aSmallBatchIsAppendedToALongBodyWithOneWriteAndOneSyn
     EXPECT_EQ(textOf(addFiles(manyFiles(20)), {addFiles({u"b"})}), text());
 }
 
-TEST_F(TextBackendWriting, aBodyOfJustTheLimitIsWrittenAnewAndALongerOneIsNot) {
+TEST_F(TextBackendWriting, aBodyOfExactlyTheLimitIsRewrittenAndALongerOneIsNot) {
     prepare(manyFiles(20));
     auto options = appending();
     options.alwaysRewritten = text().size();
@@ -238,7 +238,7 @@ TEST_F(TextBackendWriting, aTornTailIsDroppedByTheNextBatchAndNeverCounts) {
     EXPECT_EQ(textOf(addFiles(all)), text());
 }
 
-TEST_F(TextBackendWriting, anIrregularTextIsWrittenAnew) {
+TEST_F(TextBackendWriting, anIrregularTextIsRewritten) {
     auto const lines = textOf(addFiles({u"a", u"b"}));
     auto const swapped =
         lines.substr(0, lines.find("\"a\"")) + "\"b\"\n\"a\"\n" + lines.substr(lines.find("\"b\"\n") + 4);
@@ -250,7 +250,7 @@ TEST_F(TextBackendWriting, anIrregularTextIsWrittenAnew) {
     EXPECT_EQ(textOf(addFiles({u"a", u"b", u"c"})), text());
 }
 
-TEST_F(TextBackendWriting, aBodyThatIsNotInCanonicalFormIsWrittenAnew) {
+TEST_F(TextBackendWriting, aBodyThatIsNotCanonicalIsRewritten) {
     auto other = textOf(addFiles(manyFiles(20)));
     other.insert(other.find("\"many/0007\""), " ");
     prepareText(other);
@@ -262,7 +262,7 @@ TEST_F(TextBackendWriting, aBodyThatIsNotInCanonicalFormIsWrittenAnew) {
     EXPECT_THAT(writes(), ElementsAreArray(rewrite));
 }
 
-TEST_F(TextBackendWriting, aDamagedTextReadsAndTakesNoWrites) {
+TEST_F(TextBackendWriting, aDamagedTextIsReadAndRefusesWrites) {
     auto damaged = textOf(addFiles({u"a", u"b", u"c"}));
     damaged.replace(damaged.find("\"b\""), 3, "\"b  ");
     prepareText(damaged);
@@ -278,7 +278,7 @@ TEST_F(TextBackendWriting, aDamagedTextReadsAndTakesNoWrites) {
     EXPECT_EQ(damaged, text());
 }
 
-TEST_F(TextBackendWriting, aTextWithConflictMarkersReadsWithBothSidesAndTakesNoWrites) {
+TEST_F(TextBackendWriting, aTextWithConflictMarkersIsReadWithBothSidesAndRefusesWrites) {
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
     prepareText(conflict);
@@ -325,7 +325,7 @@ TEST_F(TextBackendWriting, aFullDiskLeavesTheProjectAsItWasAndTheNextBatchRepair
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20)), addFiles({u"b"})}), stored());
 }
 
-TEST_F(TextBackendWriting, aBatchThatLacksJustItsLastByteWhenTheDiskIsFullIsTakenBack) {
+TEST_F(TextBackendWriting, aBatchWithoutItsLastByteOnAFullDiskIsRolledBack) {
     prepare(manyFiles(20));
     auto const lines = textOf(addFiles(manyFiles(20)), {addFiles({u"b"})}).substr(text().size());
     auto const backend = open(appending());
@@ -342,7 +342,7 @@ TEST_F(TextBackendWriting, aBatchThatLacksJustItsLastByteWhenTheDiskIsFullIsTake
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), contentOf(*backend));
 }
 
-TEST_F(TextBackendWriting, aBatchThatLacksJustItsLastByteWhereTheDiskThenFailsIsCalledUnknown) {
+TEST_F(TextBackendWriting, theOutcomeIsUnknownIfTheDiskFailsAfterABatchWithoutItsLastByte) {
     prepare(manyFiles(20));
     auto const lines = textOf(addFiles(manyFiles(20)), {addFiles({u"b"})}).substr(text().size());
     auto const backend = open(appending());
@@ -373,7 +373,7 @@ TEST_F(TextBackendWriting, aFullDiskAtARewriteLeavesTheTextAndNoTemporaryFile) {
     EXPECT_THAT(volume->names(), ElementsAre(".gitattributes", ".gitignore", "project.jsonl"));
 }
 
-TEST_F(TextBackendWriting, whenAnAppendCannotBeSyncedTheTextWithoutItGoesToANewFile) {
+TEST_F(TextBackendWriting, whenAnAppendCannotBeSyncedTheTextWithoutItIsWrittenToANewFile) {
     prepare(manyFiles(20));
     auto const backend = open(appending());
     failOnce("sync");
@@ -398,7 +398,7 @@ TEST_F(TextBackendWriting, afterAFailedSyncTheNextBatchIsWrittenAsUsual) {
     EXPECT_EQ(textOf(addFiles(manyFiles(20)), {addFiles({u"c"})}), text());
 }
 
-TEST_F(TextBackendWriting, whenThatFailsTooTheOutcomeIsCalledUnknownAndNothingIsWrittenUntilOpenedAnew) {
+TEST_F(TextBackendWriting, whenTheNewFileFailsTooTheOutcomeIsUnknownAndNothingIsWrittenUntilReopened) {
     prepare(manyFiles(20));
     auto backend = open(appending());
     volume->beforeCall = [](std::string const& call) {
@@ -421,7 +421,7 @@ TEST_F(TextBackendWriting, whenThatFailsTooTheOutcomeIsCalledUnknownAndNothingIs
     EXPECT_EQ(1U, stored().count(fileAddress(u"c")));
 }
 
-TEST_F(TextBackendWriting, whenTheFolderCannotBeSyncedAfterARewriteTheTextWithoutTheBatchIsPutBack) {
+TEST_F(TextBackendWriting, whenTheFolderCannotBeSyncedAfterARewriteTheTextWithoutTheBatchIsRestored) {
     prepare({u"a"});
     auto const before = text();
     auto const backend = open();
@@ -435,7 +435,7 @@ TEST_F(TextBackendWriting, whenTheFolderCannotBeSyncedAfterARewriteTheTextWithou
     EXPECT_EQ(textOf(addFiles({u"a", u"c"})), text());
 }
 
-TEST_F(TextBackendWriting, aDiskThatCanNotTellWhatAnExchangeTookOutIsNotTakenForAnotherProgram) {
+TEST_F(TextBackendWriting, aDiskThatCannotIdentifyTheExchangedFileIsNotTakenForAnotherProgram) {
     prepare({u"a"});
     auto const before = text();
     auto const backend = open();
@@ -449,7 +449,7 @@ TEST_F(TextBackendWriting, aDiskThatCanNotTellWhatAnExchangeTookOutIsNotTakenFor
     EXPECT_EQ(before, text());
 }
 
-TEST_F(TextBackendWriting, whenAnyCallFailsTheBatchIsWhollyInOrWhollyOutAsTheErrorSays) {
+TEST_F(TextBackendWriting, whenAnyCallFailsTheBatchIsCommittedOrNotAsTheErrorSays) {
     for (auto const& options : {rewriting(), appending()}) {
         prepare(manyFiles(20));
         auto const without = contentAfter({addFiles(manyFiles(20))});
@@ -475,7 +475,7 @@ TEST_F(TextBackendWriting, whenAnyCallFailsTheBatchIsWhollyInOrWhollyOutAsTheErr
     }
 }
 
-TEST_F(TextBackendWriting, aProcessThatDiesAtAnyCallLeavesTheBatchInOrOut) {
+TEST_F(TextBackendWriting, aProcessThatDiesAtAnyCallLeavesTheBatchCommittedOrNot) {
     for (unsigned seed = 0; seed < 20; ++seed) {
         for (bool const appends : {false, true}) {
             bool wasReached = true;

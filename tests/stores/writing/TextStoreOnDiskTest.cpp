@@ -119,7 +119,7 @@ TEST_F(TextStoreOnDisk, processesThatWriteAtTheSameTimeLoseNothing) {
     EXPECT_EQ(all, contentOf(*reader));
 }
 
-TEST_F(TextStoreOnDisk, processesThatMakeTheStoreAtTheSameTimeLoseNothingThatTheyCallKept) {
+TEST_F(TextStoreOnDisk, processesThatCreateTheStoreAtTheSameTimeLoseNoCommittedBatch) {
     for (int round = 0; round < 20; ++round) {
         auto const writer = [this](std::u16string const& name) {
             return [this, name](ChildProcess::Parent const& parent) {
@@ -260,7 +260,7 @@ TEST_F(TextStoreOnDisk, aProjectThatMayNotBeReadIsAnErrorAndNotEmpty) {
     ::chmod(folder().c_str(), 0755);
 }
 
-TEST_F(TextStoreOnDisk, aRootWhereNoFolderMayBeMadeIsAnErrorThatNamesTheFolder) {
+TEST_F(TextStoreOnDisk, aRootWhereNoFolderMayBeCreatedIsAnErrorThatNamesTheFolder) {
     ::chmod(root.onDisk().c_str(), 0555);
 
     auto const answer = inUnprivilegedProcess([this] {
