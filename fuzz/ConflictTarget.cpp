@@ -17,7 +17,7 @@ struct Sides {
     std::string theirs;
 };
 
-/// The texts of both sides; nothing when there are no markers, or when they are not those of consecutive
+/// The texts of both sides; nothing if there are no markers, or if they are not those of consecutive
 /// conflicts.
 std::optional<Sides> sidesOf(std::string_view text) {
     Sides sides;

@@ -33,7 +33,7 @@ bool areAt(std::vector<Difference> const& differences, std::vector<Address> cons
         [](Difference const& difference, Address const& address) { return difference.address == address; });
 }
 
-/// Two texts differ where their contents do.
+/// Two texts differ at the addresses at which their contents differ.
 void run(std::string_view input) {
     auto const parts = partsOf(input);
     auto const left = readText(textOf(parts[0]));
@@ -42,7 +42,8 @@ void run(std::string_view input) {
         return;
     }
     auto const expected = differing(contentsOf(*left), contentsOf(*right));
-    require(areAt(left->differencesTo(*right), expected), "texts differ where their contents do");
+    require(areAt(left->differencesTo(*right), expected),
+            "texts differ at the addresses at which their contents differ");
     require(areAt(right->differencesTo(*left), expected), "texts differ in both directions");
     require(left->differencesTo(*left).empty(), "a text does not differ from itself");
 }

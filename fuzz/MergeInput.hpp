@@ -16,7 +16,7 @@ inline std::string baseOf(std::string_view input) {
     return input.empty() ? std::string() : textOf(input);
 }
 
-/// @return nothing when one of the texts cannot be merged.
+/// @return nothing if one of the texts cannot be merged.
 inline std::optional<stores::TextMerge> merged(std::string const& base, std::string const& ours,
                                                std::string const& theirs) {
     try {

@@ -27,7 +27,7 @@ Elements elementsOf(Path const& path) {
         elements.emplace_back(fl::filesystem::detail::extract_first_element(rest));
         std::size_t const before = rest.size();
         rest = fl::filesystem::detail::move_down(rest);
-        require(rest.size() < before, "moving down comes to an end");
+        require(rest.size() < before, "moving down ends");
     }
     return elements;
 }
@@ -90,7 +90,7 @@ void checkRelative(Path const& base, Path const& target) {
     bool const sameRoot = isAbsolute(base) == isAbsolute(target);
     Path const relative(getRelativePath(base, target));
     require(isParent(target, base) == (sameRoot && within && from.size() < to.size()),
-            "a folder is above what begins with its elements and has more");
+            "a folder is above a path that begins with its elements and has more");
     require(relative.empty() == (from == to), "only the path to the same place is empty");
     require(!isAbsolute(relative), "a path from one place to another is relative");
     if (within && sameRoot) {
@@ -113,7 +113,7 @@ void checkJoined(Path const& left, Path const& right) {
     Elements const names = elementsOf(left);
     Elements above(names.begin(), names.empty() ? names.end() : names.end() - 1);
     if (above.empty() && isAbsolute(left)) {
-        above = names; // above the root is the root
+        above = names; // the root is above the root
     }
     require(elementsOf(getParentFolder(left)) == above, "the folder of a path has all but its last element");
 }

@@ -11,7 +11,7 @@ namespace project::fuzz {
 struct Target {
     char const* name;
 
-    /// @throws BrokenLaw when the input shows that the law does not hold.
+    /// @throws BrokenLaw if the input shows that the law does not hold.
     void (*run)(std::string_view input);
 };
 
@@ -30,7 +30,7 @@ public:
     using logic_error::logic_error;
 };
 
-/// @param law the condition as a clause. @throws BrokenLaw when it does not hold.
+/// @param law the condition as a clause. @throws BrokenLaw if it does not hold.
 inline void require(bool holds, char const* law) {
     if (!holds) {
         throw BrokenLaw(std::string("this law does not hold: ") + law);

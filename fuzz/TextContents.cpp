@@ -15,7 +15,7 @@ using stores::ProjectText;
 namespace {
 
 /// Calls add(address, node) for each address with a node or created without one, in order.
-/// @return true when there are any.
+/// @return true if there are any.
 template <typename Add>
 bool walk(ProjectText const& text, Address const& parent, Add const& add) {
     Children const children = text.children(parent);

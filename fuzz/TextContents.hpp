@@ -14,7 +14,7 @@ using Contents = std::map<stores::Address, std::string>;
 /// children, and have children exactly if it says so.
 Contents contentsOf(stores::ProjectText const& text);
 
-/// The canonical body of what the same walk finds. Cheaper than a map.
+/// The canonical body of the nodes that the same walk finds. Cheaper than a map.
 std::string canonicalOf(stores::ProjectText const& text);
 
 /// Requires a text that was written: canonical, without a tail and without faults.

@@ -15,7 +15,7 @@ void run(std::string_view input) {
     }
     std::string const tidy = readText(side)->rewrittenWith({}).body();
     auto const check = [&](auto const& merge) {
-        require(merge && merge->conflicts().empty(), "a change of one side is no conflict");
+        require(merge && merge->conflicts().empty(), "a change of one side is not a conflict");
         require(merge->text() == tidy, "a change of one side is applied");
     };
     check(first);

@@ -10,7 +10,7 @@ using management::Path;
 
 namespace {
 
-/// Runs an action. @return what it threw; null if it returned.
+/// Runs an action. @return its exception; null if it returned.
 template <typename Action>
 std::exception_ptr errorOf(Action const& action) {
     try {

@@ -51,7 +51,7 @@ std::u16string boolToFlag(bool value) {
     return value ? schema::categories::flagTrue : schema::categories::flagFalse;
 }
 
-// Both checks look at the caller's object and not at the store: clients that manage read-only categories pass
+// Both checks use the caller's object and not the store: clients that manage read-only categories pass
 // a writable definition with the same UUID to change one.
 void requireCategoryWritable(CategoryIdentifier const& category) {
     if (category.isReadOnly()) {

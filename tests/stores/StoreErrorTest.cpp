@@ -7,7 +7,7 @@
 namespace project::stores {
 namespace {
 
-// Managers drop some of the library's own errors as stale data; a failing disk must never be taken for that.
+// Managers drop some of the library's own errors as stale data; a failing disk must never be treated as that.
 static_assert(!std::is_base_of_v<exception::ProjectException, StoreError>);
 
 TEST(StoreError, namesTheFileTheLineTheProblemAndTheRemedy) {
@@ -47,7 +47,7 @@ TEST(StoreError, isCaughtAsAStandardExceptionButNotAsAnErrorOfTheProject) {
             try {
                 throw StoreError(StoreError::Kind::DiskFailed, "", 0, "x", "");
             } catch (exception::ProjectException const&) {
-                FAIL() << "it was taken for stale data";
+                FAIL() << "it was treated as stale data";
             }
         },
         StoreError);

@@ -36,7 +36,7 @@ char readByte(int from) {
 
 void writeAll(int to, std::string const& text) {
     if (::write(to, text.data(), text.size()) != static_cast<ssize_t>(text.size())) {
-        throw std::runtime_error("the other process has gone");
+        throw std::runtime_error("the other process has ended");
     }
 }
 
@@ -62,7 +62,7 @@ ChildProcess::ChildProcess(std::function<void(Parent const&)> const& run) {
             run(Parent(down[0], up[1]));
             status = 0;
         } catch (...) {
-            // told by the status
+            // the status reports it
         }
         ::_exit(status);
     }
@@ -116,7 +116,7 @@ bool ChildProcess::join() {
 std::string inUnprivilegedProcess(std::function<std::string()> const& call) {
     ChildProcess child([&call](ChildProcess::Parent const& parent) {
         if (::geteuid() == 0 && (::setgid(nobody) != 0 || ::setuid(nobody) != 0)) {
-            parent.say("can't give up the rights of root");
+            parent.say("cannot give up the rights of root");
             return;
         }
         try {

@@ -10,14 +10,14 @@ namespace project::test {
 /// A forked process of this program that runs a function and then ends without cleaning up.
 class ChildProcess {
 public:
-    /// A child's end of the talk with its parent.
+    /// A child's end of the connection to its parent.
     class Parent {
     public:
         Parent(int from, int to) : from_(from), to_(to) {}
 
         void say(std::string const& line) const;
 
-        /// Waits for the parent to say something, or to go away.
+        /// Waits until the parent calls goOn or ends.
         void await() const;
 
     private:
@@ -27,25 +27,25 @@ public:
 
     explicit ChildProcess(std::function<void(Parent const&)> const& run);
 
-    /// Ends the child if it is still there.
+    /// Kills the child if it is still running.
     ~ChildProcess();
     ChildProcess(ChildProcess const&) = delete;
     ChildProcess& operator=(ChildProcess const&) = delete;
 
     pid_t id() const { return id_; }
 
-    /// The next line that the child says; empty when it has ended without one.
+    /// The next line that the child says; empty if it has ended without one.
     std::string hear();
 
-    /// True when there is a line to hear, or the child has ended, so that hear does not wait.
+    /// True if a line is available or the child has ended, so that hear does not wait.
     bool hasSaid() const;
 
-    /// Lets a child that awaits go on.
+    /// Lets a child that waits in await continue.
     void goOn() const;
 
     void kill();
 
-    /// @return true when the child came to the end of its function, which threw nothing.
+    /// @return true if the child's function returned without an exception.
     bool join();
 
 private:
@@ -54,8 +54,8 @@ private:
     int to_ = -1;
 };
 
-/// What a function gives, or the text of what it throws, in a process of its own with no more rights than any
-/// user has.
+/// Calls a function in a process of its own, with the rights of an ordinary user. @return its result, or the
+/// text of its exception.
 std::string inUnprivilegedProcess(std::function<std::string()> const& call);
 
 } // namespace project::test

@@ -31,8 +31,7 @@ CrashingDisk::~CrashingDisk() {
 }
 
 /// @param part the partial effect of a call that fails or at which the process dies. Its argument says
-/// whether the
-///             process continues.
+/// whether the process continues.
 template <typename Effect, typename Part>
 auto CrashingDisk::call(std::string const& name, Effect effect, Part part) {
     if (isDead_) {
@@ -97,7 +96,7 @@ bool CrashingDisk::isFailingForGood() const {
 std::shared_ptr<CrashingDisk::File> CrashingDisk::find(std::string const& name) {
     auto const found = volume_->find(names(), name);
     if (found == names().end()) {
-        throw StoreError(StoreError::Kind::DiskFailed, name, 0, "is not there", "");
+        throw StoreError(StoreError::Kind::DiskFailed, name, 0, "does not exist", "");
     }
     return found->second;
 }
@@ -125,9 +124,9 @@ bool CrashingDisk::makeFolder() {
         folder_ = volume_->folder_;
         return isMade;
     };
-    return call("makeFolder", make, [this](bool goesOn) {
+    return call("makeFolder", make, [this](bool continues) {
         // After a permanent fault it cannot be removed again.
-        if (!volume_->folder_ && (!goesOn || isFailingForGood())) {
+        if (!volume_->folder_ && (!continues || isFailingForGood())) {
             volume_->makeFolderUnsynced();
         }
     });
@@ -204,14 +203,14 @@ std::optional<FileContent> CrashingDisk::read(std::string const& name, std::uint
             return std::nullopt;
         }
         if (!identity->isRegular) {
-            throw StoreError(StoreError::Kind::Damaged, name, 0, "is no regular file", "");
+            throw StoreError(StoreError::Kind::Damaged, name, 0, "is not a regular file", "");
         }
         auto const& bytes = find(name)->bytes;
         return FileContent{offset < bytes.size() ? bytes.substr(offset) : std::string(), *identity};
     });
 }
 
-/// Writes as much as there is room for, and fails when that is not everything.
+/// Writes as much as fits, and fails if that is not everything.
 void CrashingDisk::writeWithinRoom(File& file, std::string_view bytes) {
     auto const& room = volume_->room;
     if (room && *room < bytes.size()) {
@@ -252,7 +251,7 @@ WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes
     auto const make = [&] {
         written_ = volume_->makeFile("");
         if (isTaken(name)) {
-            throw StoreError(StoreError::Kind::DiskFailed, name, 0, "is there already", "");
+            throw StoreError(StoreError::Kind::DiskFailed, name, 0, "exists already", "");
         }
         bind(name, written_);
         try {
@@ -264,9 +263,9 @@ WrittenFile CrashingDisk::create(std::string const& name, std::string_view bytes
         bool const isStamped = volume_->stamp(*written_);
         return WrittenFile{CrashingVolume::identify(*written_), isStamped};
     };
-    return call("create " + kindOf(name) + (like ? " like " + *like : ""), make, [&](bool goesOn) {
+    return call("create " + kindOf(name) + (like ? " like " + *like : ""), make, [&](bool continues) {
         // After a permanent fault the partial file cannot be removed.
-        if (!goesOn || isFailingForGood()) {
+        if (!continues || isFailingForGood()) {
             auto const half = volume_->makeFile("");
             volume_->write(*half, bytes.substr(0, volume_->pick(bytes.size())));
             bind(name, half);
@@ -281,9 +280,9 @@ void CrashingDisk::sync() {
             volume_->sync(*written_);
             return true;
         },
-        [this](bool goesOn) {
+        [this](bool continues) {
             for (auto& write : written_->unsynced) {
-                write.isGivenUp = goesOn;
+                write.isGivenUp = continues;
             }
         });
 }

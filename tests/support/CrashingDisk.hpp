@@ -62,7 +62,7 @@ public:
     /// Plans a fault for one call, after a number of others.
     void plan(InjectedFault fault, std::size_t callsBefore);
 
-    /// Cancels the planned fault. @return true when it has not happened yet.
+    /// Cancels the planned fault. @return true if it has not happened yet.
     bool cancelPlan();
 
     /// The first call with the planned fault; empty before.
@@ -76,7 +76,7 @@ public:
     /// Loses some or all of the unsynced content. Open disks must not be used afterwards.
     void powerCut();
 
-    /// Advances the file system's clock, which otherwise stands still, so that writes share one tick.
+    /// Advances the file system's clock, which does not advance by itself, so that writes share one tick.
     void advance(std::int64_t nanoseconds) { clock_ += nanoseconds; }
 
     void advanceBeyondTick() { advance(100'000'000); }

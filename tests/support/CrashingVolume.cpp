@@ -135,7 +135,7 @@ std::shared_ptr<CrashingVolume> CrashingVolume::copy(unsigned seed) const {
     return result;
 }
 
-/// Also copies the files, each once for all its names.
+/// Also copies the files: one copy of each file, whatever the number of its names.
 std::shared_ptr<CrashingVolume::Folder> CrashingVolume::copyOf(Folder const& folder) {
     std::map<File const*, std::shared_ptr<File>> copies;
     auto const copied = [&copies](std::shared_ptr<File> const& file) {

@@ -109,7 +109,7 @@ Outcome outcomeOf(Call const& call) {
     } catch (std::exception const& error) {
         return {std::current_exception(), describe(error) + " was thrown"};
     } catch (...) {
-        return {std::current_exception(), "something that is no std::exception was thrown"};
+        return {std::current_exception(), "an exception that is not a std::exception was thrown"};
     }
 }
 

@@ -10,7 +10,7 @@
 
 namespace project::test {
 
-/// Observes every event of a broadcaster and writes each down as one line: its name, and what it carries. A
+/// Observes every event of a broadcaster and writes each down as one line: its name and its arguments. A
 /// path is written as its text, a category as its UUID and name, a label as the UUIDs of its category and
 /// itself.
 ///
@@ -42,12 +42,12 @@ public:
     EventLog(EventLog const&) = delete;
     EventLog& operator=(EventLog const&) = delete;
 
-    /// Writes down something else that happens, to see it in its order with the events.
-    void note(std::u16string what) { lines_.push_back(std::move(what)); }
+    /// Writes down something else that happens, in order with the events.
+    void note(std::u16string text) { lines_.push_back(std::move(text)); }
 
-    /// A function that writes this down, whatever it is called with: for a mock to do.
-    auto noting(std::u16string what) {
-        return [this, what = std::move(what)](auto const&...) { note(what); };
+    /// A function that writes this text down, for use as a mock's action.
+    auto noting(std::u16string text) {
+        return [this, text = std::move(text)](auto const&...) { note(text); };
     }
 
     /// All lines since the last call.

@@ -12,12 +12,12 @@
 
 namespace project::test {
 
-/// A folder under git, on which the git command works with nobody's configuration.
+/// A folder under git. The git command runs without a user's or system's configuration.
 class GitFolder {
 public:
     using Environment = std::map<std::string, std::string>;
 
-    /// @param environment what git is given beside.
+    /// @param environment further variables for git.
     explicit GitFolder(std::filesystem::path folder, Environment environment = {})
         : folder_(std::move(folder)), environment_(std::move(environment)) {
         environment_.insert(
@@ -26,7 +26,7 @@ public:
         run({"config", "gc.auto", "0"});
     }
 
-    /// Does what may fail.
+    /// Runs a git command that may fail.
     ProgramResult tryTo(std::vector<std::string> const& arguments, std::string_view input = {}) const {
         std::vector<std::string> command{"git", "-c", "user.name=Tester", "-c",
                                          "user.email=tester@example.org"};
@@ -37,8 +37,8 @@ public:
         return runProgram(command, settings, input);
     }
 
-    /// @return what git says.
-    /// @throws std::runtime_error when it fails.
+    /// @return the output of git.
+    /// @throws std::runtime_error if it fails.
     std::string run(std::vector<std::string> const& arguments, std::string_view input = {}) const {
         auto const done = tryTo(arguments, input);
         if (done.exitCode != 0) {

@@ -20,7 +20,7 @@
 #include "project/files/LabelIDSet.hpp"
 #include "project/references/FolderReference.hpp"
 
-// Every manager interface, to see what a decorator asks of what it wraps.
+// Mocks of every manager interface, for the calls that a decorator makes to the object that it wraps.
 
 namespace project::test {
 

@@ -12,7 +12,7 @@ namespace project::stores::samples {
 
 namespace {
 
-std::string toldText(std::u16string const& text) {
+std::string asciiOf(std::u16string const& text) {
     std::string result;
     for (char16_t const unit : text) {
         bool const letter = unit >= 0x20 && unit < 0x7F && unit != '<' && unit != '>';
@@ -51,9 +51,9 @@ void walk(ProjectText const& text, Address const& parent, Content& content) {
 } // namespace
 
 std::string described(metadata::MetadataNode const& node) {
-    std::string result = toldText(node.getType()) + "(";
+    std::string result = asciiOf(node.getType()) + "(";
     for (std::u16string const& key : node.getKeys()) {
-        result += toldText(key) + "=" + toldText(node.get(key)) + ";";
+        result += asciiOf(key) + "=" + asciiOf(node.get(key)) + ";";
     }
     for (auto const& child : node.getChildren()) {
         result += described(*child);
@@ -62,7 +62,7 @@ std::string described(metadata::MetadataNode const& node) {
 }
 
 std::string described(Node const& node) {
-    return node ? described(*node) : "made";
+    return node ? described(*node) : "created";
 }
 
 Node makeNode(std::u16string const& type, Keys const& keys, std::vector<Nested> const& nested) {

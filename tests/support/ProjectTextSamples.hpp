@@ -11,13 +11,13 @@
 
 namespace project::stores::samples {
 
-/// The node at each address, described in full, or "made".
+/// The node at each address, described in full, or "created".
 using Content = std::map<Address, std::string>;
 
 /// Describes a node by its type, keys and nested nodes, in a form that differs from every line of a text.
 std::string described(metadata::MetadataNode const& node);
 
-/// The same, or "made" for no node.
+/// The same, or "created" for no node.
 std::string described(Node const& node);
 
 using Keys = std::map<std::u16string, std::u16string>;

@@ -13,14 +13,14 @@
 
 namespace project::test {
 
-/// What the recording adapter throws when it is told to.
+/// The exception of failOnce.
 class AdapterFailure : public std::runtime_error {
 public:
     AdapterFailure() : std::runtime_error("source control is out of reach") {}
 };
 
 /// A source-control system that does nothing, writes down every call as one line (see PathLines.hpp), and
-/// gives the states that it was told to.
+/// returns the states that were set.
 class RecordingCMAdapter : public cmlink::CMAdapter {
 public:
     using Path = cmlink::Path;
@@ -44,10 +44,10 @@ public:
         return result;
     }
 
-    /// From now on this file has this state; none when it is empty.
+    /// From now on this file has this state; none if it is empty.
     void setState(Path const& file, std::optional<int> state) { states_[file] = state; }
 
-    /// From now on all files without one of their own have this state; none when it is empty, as at first.
+    /// From now on, all files without a state of their own have this one; none if it is empty, as initially.
     void setStateOfOthers(std::optional<int> state) { stateOfOthers_ = state; }
 
     /// The next call of the named operation throws an AdapterFailure; it is written down.

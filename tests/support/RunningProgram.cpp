@@ -45,7 +45,7 @@ Pipe makePipe() {
     return {ends[0], ends[1]};
 }
 
-/// Two pipes for what the program writes, or both ends of a pseudo terminal.
+/// Two pipes for the program's output, or both ends of a pseudo terminal.
 struct Streams {
     Pipe output;
     Pipe errors;
@@ -122,7 +122,7 @@ bool dropCapabilities() {
     _exit(126);
 }
 
-/// @return false at the end of what there is to read.
+/// @return false at the end of the output.
 bool readSome(int descriptor, std::string& to) {
     std::array<char, 65536> piece; // NOLINT: read fills it
     auto const got = read(descriptor, piece.data(), piece.size());
@@ -153,7 +153,7 @@ RunningProgram::RunningProgram(std::vector<std::string> const& command, ProgramS
     auto const environment = pointersTo(environmentTexts);
     auto input = makePipe();
     auto streams = makeStreams(settings.onTerminal);
-    if (settings.inputOnTerminal) { // what is written to the terminal's other side is what is typed
+    if (settings.inputOnTerminal) { // writing to the terminal's other side is typing
         close(input.readEnd);
         close(input.writeEnd);
         input = {fcntl(streams.output.writeEnd, F_DUPFD_CLOEXEC, 0),
@@ -206,7 +206,7 @@ std::string RunningProgram::readErrorLine() const {
 }
 
 bool RunningProgram::waitUntilItSleeps() const {
-    for (int sleeps = 0; sleeps < 5;) { // a program on its way sleeps now and then; not time and again
+    for (int sleeps = 0; sleeps < 5;) { // a running program sleeps now and then, but not this often
         std::ifstream file("/proc/" + std::to_string(child_) + "/stat");
         std::string const text{std::istreambuf_iterator<char>(file), {}};
         auto const behindName = text.rfind(')');

@@ -13,30 +13,29 @@ namespace project::test {
 
 /// How a program ended, and what it wrote.
 struct ProgramResult {
-    int exitCode = -1; ///< -1 when a signal ended it
-    int signal = 0;    ///< which one; 0 when none did
+    int exitCode = -1; ///< -1 if a signal ended it
+    int signal = 0;    ///< the signal that ended it; 0 for none
     std::string output;
     std::string errors;
 };
 
-/// What a program is started with.
+/// The settings of a program.
 struct ProgramSettings {
     std::filesystem::path folder = "/"; ///< the working folder
-    /// Set over what the tests run with. Languages and git's own settings are taken out of that before.
+    /// Overrides variables of the tests. Those of languages and of git are removed first.
     std::map<std::string, std::string> environment;
-    rlim_t fileSize =
-        RLIM_INFINITY; ///< how large a file may become: a full disk to whoever ignores the signal
-    bool withoutPrivileges = false; ///< without root's capabilities: permissions apply to root, too
-    bool onTerminal = false;        ///< standard output and error are one pseudo terminal
-    bool inputOnTerminal = false;   ///< with onTerminal: standard input is the same one, which shows it, too
-    bool inputStaysOpen = false;    ///< until the object goes; else standard input ends at once
+    rlim_t fileSize = RLIM_INFINITY; ///< the largest file; with the signal ignored, like a full disk
+    bool withoutPrivileges = false;  ///< without root's capabilities: permissions apply to root, too
+    bool onTerminal = false;         ///< standard output and error are one pseudo terminal
+    bool inputOnTerminal = false;    ///< with onTerminal: standard input is the same one, which shows it, too
+    bool inputStaysOpen = false;     ///< until the destructor; otherwise standard input ends at once
 };
 
-/// A program that runs as a process of its own, and is ended with the object if it has not ended before.
+/// A program in a process of its own. The destructor ends it if it is still running.
 class RunningProgram {
 public:
     /// @param command the program's path and its arguments.
-    /// @throws std::runtime_error when it cannot be started.
+    /// @throws std::runtime_error if it cannot be started.
     RunningProgram(std::vector<std::string> const& command, ProgramSettings const& settings);
     ~RunningProgram();
     RunningProgram(RunningProgram const&) = delete;
@@ -44,18 +43,18 @@ public:
 
     void sendSignal(int number) const;
 
-    /// Waits for this many bytes of standard output, and then goes away without reading the rest.
+    /// Waits for this many bytes of standard output, and closes it without reading the rest.
     std::string readAndClose(std::size_t length);
 
-    /// Waits for a line on standard output, or on standard error. @return it without its end; what there is
-    /// of one when the program has ended, or after a long time.
+    /// Waits for a line on standard output, or on standard error. @return it without its end; an
+    /// incomplete one if the program has ended, or after a long time.
     std::string readLine() const;
     std::string readErrorLine() const;
 
-    /// Waits until the program sleeps, for input or for a lock. @return false when it has ended instead.
+    /// Waits until the program sleeps, for input or for a lock. @return false if it has ended instead.
     bool waitUntilItSleeps() const;
 
-    /// Feeds the program, and reads what it writes to the end. On a terminal all is `output`.
+    /// Feeds the program, and reads its output to the end. On a terminal, all of it is `output`.
     ProgramResult finish(std::string_view input = {});
 
 private:

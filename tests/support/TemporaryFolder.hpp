@@ -16,7 +16,7 @@ public:
     TemporaryFolder() {
         auto pattern = (std::filesystem::temp_directory_path() / "project-test-XXXXXX").string();
         if (mkdtemp(pattern.data()) == nullptr) {
-            throw std::runtime_error("no temporary folder could be made at " + pattern);
+            throw std::runtime_error("no temporary folder could be created at " + pattern);
         }
         folder_ = std::filesystem::canonical(pattern);
     }

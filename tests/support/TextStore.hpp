@@ -77,7 +77,7 @@ Content contentAfter(std::vector<Batch> const& batches);
 /// A text of these batches, the first one in the body and the others in the tail.
 std::string textOf(Batch const& body, std::vector<Batch> const& tail = {});
 
-/// The error of a call; the test fails when there is none.
+/// The error of a call; the test fails if there is none.
 template <typename Call>
 StoreError errorOf(Call const& call) {
     try {

@@ -16,8 +16,8 @@
 
 namespace project::test {
 
-/// Waits until a condition holds. A minute is for machines that do much else.
-/// @return false when it does not hold in time.
+/// Waits until a condition holds, for up to a minute on a busy machine.
+/// @return false if it does not hold in time.
 inline bool comesTrue(std::function<bool()> const& condition,
                       std::chrono::milliseconds patience = std::chrono::minutes(1)) {
     auto const deadline = std::chrono::steady_clock::now() + patience;
@@ -30,7 +30,7 @@ inline bool comesTrue(std::function<bool()> const& condition,
     return true;
 }
 
-/// True when the system shows a thread of this process as asleep, as it does while the thread waits for a
+/// True if the system shows a thread of this process as asleep, as it does while the thread waits for a
 /// lock.
 inline bool isThreadAsleep(pid_t thread) {
     std::array<char, 64> name{};
@@ -42,7 +42,7 @@ inline bool isThreadAsleep(pid_t thread) {
     return length > 0 && std::strstr(line.data(), ") S ") != nullptr;
 }
 
-/// True when the clock of file systems is at least so much later than the last change of a file.
+/// True if the clock of file systems is at least this much later than the last change of a file.
 inline bool isOlderThan(std::chrono::nanoseconds age, char const* file) {
     struct stat status {};
 

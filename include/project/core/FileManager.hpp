@@ -34,7 +34,7 @@ public:
     virtual std::unique_ptr<FileMetadataManager> getFileMetadataManagerFor(std::u16string const& scope) = 0;
 
     /// Adds files and folders, and all folders between them and the root, in one batch. The contents of a
-    /// folder are not added. A file that is already in the project is stored anew without its labels, and so
+    /// folder are not added. A file that is already in the project is stored again without its labels, and so
     /// are the folders above it: this is deliberate, a file that was just added has no labels. Takes the
     /// write lock.
     /// @throws FileIsMetadataError, FileNotInProjectRoot or FileDoesNotExistError for the first path in Path

@@ -363,7 +363,7 @@ void TextBackend::State::tidyOnClose() noexcept {
             writer_.rewrite(seen_.text().rewrittenWith({}));
         }
     } catch (...) {
-        // a tail is no fault
+        // a tail is not a fault
     }
 }
 

@@ -85,7 +85,7 @@ Outcome CrashPoints::perform(StoreOperation& operation, CrashingVolume& volume, 
     return fault.kills() && !volume.faulted().empty() ? Outcome::Died : outcome;
 }
 
-/// @return false when the operation makes fewer calls.
+/// @return false if the operation makes fewer calls.
 bool CrashPoints::visitCall(Situation const& start, OperationKind const& kind, Choices ofOperation,
                             FaultKind const& fault, std::size_t call, bool isInRecovery) {
     auto now = start;
@@ -142,7 +142,7 @@ void CrashPoints::checkContent(Situation& now, StoreOperation& operation, Outcom
 
 /// The process with the fault continues with the same object.
 void CrashPoints::checkSameProcess(Situation& now, StoreOperation& operation, Outcome outcome) {
-    EXPECT_EQ(now.content, contentOf(*operation.backend)) << "as the process sees it that had the fault";
+    EXPECT_EQ(now.content, contentOf(*operation.backend)) << "as seen by the process with the fault";
     bool const isWritable = now.history != History::Damaged && now.history != History::Conflict;
     if (!isWritable || choices_.oneIn(2)) {
         return;
@@ -183,10 +183,11 @@ void CrashPoints::checkNextWriter(Situation& now) {
     checkNames(now);
     abandon(*now.volume, writer);
     now.volume->powerCut();
-    EXPECT_EQ(after, contentOf(*open(now))) << "after the next writer's batch was kept and the power cut";
+    EXPECT_EQ(after, contentOf(*open(now)))
+        << "after the next writer's batch was committed and the power cut";
 }
 
-/// Repairs or resolves what makes the store refuse writes.
+/// Repairs or resolves the text if the store refuses writes because of it.
 void CrashPoints::bringInOrder(Situation& now) {
     auto const backend = open(now);
     auto const holdsDamagedLine = [&now](std::string const& name) {
@@ -200,9 +201,9 @@ void CrashPoints::bringInOrder(Situation& now) {
     if (now.history == History::Conflict) {
         auto const faults = backend->check();
         if (!faults.empty()) {
-            backend->resolve(now.settled);
+            backend->resolve(now.resolved);
         }
-        now.content = stores::samples::contentOf(stores::samples::readWhole(now.settled));
+        now.content = stores::samples::contentOf(stores::samples::readWhole(now.resolved));
     }
 }
 

@@ -15,7 +15,7 @@ namespace {
 
 using stores::StoreError;
 
-/// The writes that a disk in memory forgets: a disk that forgot nothing would prove nothing.
+/// The writes that a disk in memory loses: tests on a disk that loses nothing would prove nothing.
 class CrashingVolumeForgetting : public testing::Test {
 protected:
     /// All answers to the given question after every possible power cut.
@@ -74,7 +74,7 @@ TEST_F(CrashingVolumeForgetting, anySubsetOfTheUnsyncedWritesIsKeptAndMayBeTorn)
 
     std::string const hole(2, '\0');
     EXPECT_THAT(left, IsSupersetOf({std::string(), std::string("12"), std::string("1234"), hole + "34"}))
-        << "the later write without the earlier one is what a disk leaves that writes in another order";
+        << "a disk that writes in another order keeps the later write without the earlier one";
     EXPECT_THAT(left, IsSupersetOf({std::string("1"), std::string("123"), hole + "3"})) << "torn";
     EXPECT_THAT(left, IsSupersetOf({std::string("1\0", 2), hole, std::string("123\0", 4)}))
         << "the length of a write without its data";
@@ -160,7 +160,7 @@ TEST_F(CrashingVolumeForgetting, aStampIsLostUntilTheFileIsSynced) {
 }
 
 TEST_F(CrashingVolumeForgetting, aFolderWhoseCreatorDiedInTheCallMayBeLostAndACreatedOneStays) {
-    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "gone"; }),
+    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "lost"; }),
                 ElementsAre("there"));
 
     volume->removeFolder();
@@ -168,16 +168,16 @@ TEST_F(CrashingVolumeForgetting, aFolderWhoseCreatorDiedInTheCallMayBeLostAndACr
     EXPECT_THROW(CrashingDisk(volume).makeFolder(), ProcessDied);
 
     ASSERT_TRUE(volume->hasFolder());
-    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "gone"; }),
-                UnorderedElementsAre("there", "gone"));
+    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "lost"; }),
+                UnorderedElementsAre("there", "lost"));
 }
 
 TEST_F(CrashingVolumeForgetting, aRemovedFolderMayReappear) {
     disk.removeFolder();
 
     EXPECT_FALSE(volume->hasFolder());
-    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "gone"; }),
-                UnorderedElementsAre("there", "gone"));
+    EXPECT_THAT(afterPowerCuts([](CrashingVolume const& cut) { return cut.hasFolder() ? "there" : "lost"; }),
+                UnorderedElementsAre("there", "lost"));
 }
 
 TEST_F(CrashingVolumeForgetting, aCopyIsIndependent) {
@@ -197,7 +197,7 @@ TEST_F(CrashingVolumeForgetting, aCopyIsIndependent) {
     copy->powerCut();
     EXPECT_EQ("b=123", described(*copy));
     EXPECT_THAT(afterPowerCuts(described), IsSupersetOf({"", "a=1", "b=1", "a=12 b=12"}))
-        << "what the copy made durable is not so in the first";
+        << "a sync of the copy makes nothing durable in the original";
 }
 
 /// The moments at which a process dies at a call.
@@ -216,7 +216,7 @@ protected:
             copy->plan(fault, 0);
             EXPECT_THROW(dying.append("a", before, "12345678"), ProcessDied);
             EXPECT_EQ("append a", copy->faulted());
-            EXPECT_THROW(dying.identify("a"), ProcessDied) << "it does nothing more";
+            EXPECT_THROW(dying.identify("a"), ProcessDied) << "it refuses further calls";
             found.insert(copy->content("a"));
         }
         return found;

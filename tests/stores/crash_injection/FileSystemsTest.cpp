@@ -48,7 +48,8 @@ TEST_F(FileSystems, projectsOnReadOnlyFileSystemsOpenForReading) {
 
         auto const thrown = perform(operation, *project, readOnly);
 
-        auto const names = std::set<std::string>{"look", "look after others", "check", "close", "discard"};
+        auto const names = std::set<std::string>{"check for changes", "check for changes after others",
+                                                 "check", "close", "discard"};
         EXPECT_EQ(!names.contains(operation.name), thrown.has_value()) << operation.name;
         if (thrown) {
             EXPECT_EQ("The file system is read-only: mount it writable, or work on a copy.",

@@ -33,7 +33,7 @@ public:
 
     bool isAmidABatch() const { return begun_ > kept_; }
 
-    /// The error of the store that it reported; empty when there was none.
+    /// The error of the store that it reported; empty if there was none.
     std::string const& complaint() const { return complaint_; }
 
     /// The number that it has stored in a project; 0 for none.
@@ -43,7 +43,7 @@ public:
     Content contentWith(std::size_t batch) const;
 
     /// It died, and this is its last batch in the project.
-    void settle(std::size_t batch) { kept_ = begun_ = batch; }
+    void acceptOutcome(std::size_t batch) { kept_ = begun_ = batch; }
 
 private:
     std::size_t number_;

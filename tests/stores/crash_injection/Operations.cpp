@@ -97,10 +97,10 @@ StoreOperation repairDamage(Situation& situation, Choices& choices) {
             [](StoreOperation& operation) { operation.backend->repair(); }, situation.content};
 }
 
-StoreOperation settleAConflict(Situation& situation, Choices& choices) {
+StoreOperation resolveAConflict(Situation& situation, Choices& choices) {
     return {openPerhapsRead(situation, choices),
-            [text = situation.settled](StoreOperation& operation) { operation.backend->resolve(text); },
-            stores::samples::contentOf(stores::samples::readWhole(situation.settled))};
+            [text = situation.resolved](StoreOperation& operation) { operation.backend->resolve(text); },
+            stores::samples::contentOf(stores::samples::readWhole(situation.resolved))};
 }
 
 StoreOperation looking(Situation const& situation, std::unique_ptr<TextBackend> backend) {
@@ -109,17 +109,17 @@ StoreOperation looking(Situation const& situation, std::unique_ptr<TextBackend> 
             situation.content};
 }
 
-StoreOperation lookForTheFirstTime(Situation& situation, Choices& /*choices*/) {
+StoreOperation checkForChangesFirst(Situation& situation, Choices& /*choices*/) {
     return looking(situation, open(situation));
 }
 
-StoreOperation lookAgain(Situation& situation, Choices& /*choices*/) {
+StoreOperation checkForChangesAgain(Situation& situation, Choices& /*choices*/) {
     auto backend = open(situation);
     contentOf(*backend);
     return looking(situation, std::move(backend));
 }
 
-StoreOperation lookAfterOthers(Situation& situation, Choices& choices) {
+StoreOperation checkForChangesAfterOthers(Situation& situation, Choices& choices) {
     auto backend = open(situation);
     contentOf(*backend);
     letAnotherWrite(situation, choices.options(), choices);
@@ -154,28 +154,29 @@ std::vector<OperationKind> const& operationKinds() {
         {"tidy", withStore, false, tidyUp},
         {"close", withTail, false, closeWithATail},
         {"repair", {History::Damaged}, true, repairDamage},
-        {"settle", {History::Conflict}, true, settleAConflict},
-        {"first look", everywhere(), false, lookForTheFirstTime},
-        {"look again", everywhere(), false, lookAgain},
-        {"look after others", withStore, false, lookAfterOthers},
-        {"check", everywhere(), false, checkForFaults},
+        {"resolve", {History::Conflict}, true, resolveAConflict},
+        {"first check for changes", everywhere(), false, checkForChangesFirst},
+        {"check for changes again", everywhere(), false, checkForChangesAgain},
+        {"check for changes after others", withStore, false, checkForChangesAfterOthers},
+        {"check for faults", everywhere(), false, checkForFaults},
     };
     return kinds;
 }
 
 std::vector<OperationKind> recoveriesOf(History history) {
-    OperationKind const look{"first look", {}, false, lookForTheFirstTime};
+    OperationKind const firstCheck{"first check for changes", {}, false, checkForChangesFirst};
     switch (history) {
     case History::Damaged:
-        return {{"repair", {}, true, repairDamage}, look};
+        return {{"repair", {}, true, repairDamage}, firstCheck};
     case History::Conflict:
-        return {look}; // the conflict is already resolved, or the process that died was to resolve it
+        return {firstCheck}; // the conflict is already resolved, or resolving it was the task of the process
+                             // that died
     default:
         return {{"commit", {}, true, commitABatch},
                 {"commit", {}, true, commitABatch},
                 {"discard", {}, false, discardABatch},
                 {"tidy", {}, false, tidyUp},
-                look};
+                firstCheck};
     }
 }
 

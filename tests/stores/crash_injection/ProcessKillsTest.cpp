@@ -109,15 +109,15 @@ void Killer::check() {
     for (auto& writer : dead_) {
         checkWriter(writer, writer.kept(), found, expected);
         counts_.keptAllTheSame += writer.isAmidABatch() && writer.notedIn(found) == writer.begun() ? 1 : 0;
-        writer.settle(writer.notedIn(found));
+        writer.acceptOutcome(writer.notedIn(found));
     }
     EXPECT_EQ(expected, found);
 }
 
 void Killer::checkWriter(KilledWriter& writer, std::size_t surely, Content const& found, Content& expected) {
     auto const noted = writer.notedIn(found);
-    EXPECT_GE(noted, surely) << "what was kept is not there";
-    EXPECT_LE(noted, writer.begun()) << "what was never begun is there";
+    EXPECT_GE(noted, surely) << "a committed batch is missing";
+    EXPECT_LE(noted, writer.begun()) << "a batch that was never begun is in the project";
     expected.merge(writer.contentWith(noted));
 }
 
@@ -142,7 +142,7 @@ void Killer::finish() {
         counts_.batches += writer.kept();
     }
     TextBackend next(stores::makeSystemDisk(root_.path(), stores::TextBackend::folderName),
-                     {std::chrono::milliseconds(1'000), 0, 1});
+                     {.patience = std::chrono::milliseconds(1'000), .alwaysRewritten = 0, .bodyToTail = 1});
     commit(next, addFiles({u"own/last"}));
     own_.merge(contentAfter({addFiles({u"own/last"})}));
     check();
@@ -172,8 +172,8 @@ TEST(ProcessKills, aCommittedBatchSurvivesAKillAtAnyMoment) {
     }
     useFolder(false, usual);
     std::cout << counts.kills << " writers of " << counts.projects << " projects were killed, "
-              << counts.amidABatch << " of them amid a batch, which was in the project "
-              << counts.keptAllTheSame << " times; " << counts.batches << " batches were kept\n";
+              << counts.amidABatch << " of them in the middle of a batch, which was in the project "
+              << counts.keptAllTheSame << " times; " << counts.batches << " batches were committed\n";
     EXPECT_GT(counts.amidABatch, 0U);
     EXPECT_GT(counts.batches, 0U);
 }

@@ -34,16 +34,16 @@ TEST(RealSyncCounts, eachOperationMakesExactlyTheNecessarySyncs) {
         {"rewrite", {1, 1}},
         {"create", {4, 3}},  // the root for the folder, the folder for the new store, and for the first batch
         {"recover", {1, 2}}, // the folder before a dead writer's files are deleted
-        {"rewrite somebody else's text", {1, 1}},
+        {"rewrite another owner's text", {1, 1}},
         {"append after others", {1, 0}},
-        {"look after others", {0, 0}},
+        {"check for changes after others", {0, 0}},
         {"close", {1, 1}},
         {"discard", {0, 0}},
         {"discard creation", {3, 2}},
         {"tidy", {1, 1}},
         {"repair", {2, 2}}, // the damaged lines first
-        {"settle", {1, 1}},
-        {"look", {0, 0}},
+        {"resolve", {1, 1}},
+        {"check for changes", {0, 0}},
         {"check", {0, 0}},
     };
     for (auto const& operation : systemOperations()) {

@@ -10,11 +10,11 @@ namespace {
 using std::chrono::milliseconds;
 
 TextBackend::Options rewriting() {
-    return {milliseconds(20), 1'000'000, 16};
+    return {.patience = milliseconds(20), .alwaysRewritten = 1'000'000, .bodyToTail = 16};
 }
 
 TextBackend::Options appending() {
-    return {milliseconds(20), 0, 1};
+    return {.patience = milliseconds(20), .alwaysRewritten = 0, .bodyToTail = 1};
 }
 
 /// So that some writes share a tick of the clock and some do not.
@@ -54,12 +54,12 @@ void joinTwoBatches(Situation& situation, Choices& choices) {
 
 void bringConflict(Situation& situation) {
     auto const body = situation.volume->content("project.jsonl");
-    situation.settled = afterFirstLine(body, "\"both\"\n");
+    situation.resolved = afterFirstLine(body, "\"both\"\n");
     replaceText(situation,
                 afterFirstLine(body, "<<<<<<< ours\n\"our\"\n=======\n\"their\"\n>>>>>>> theirs\n"));
 }
 
-/// A writer dies somewhere, and perhaps the power is cut then.
+/// A writer dies at some call, and the power may be cut then.
 void letAWriterDie(Situation& situation, Choices& choices) {
     auto& volume = *situation.volume;
     auto backend = open(situation, choices.oneIn(2) ? appending() : rewriting());
@@ -69,7 +69,7 @@ void letAWriterDie(Situation& situation, Choices& choices) {
     try {
         commit(*backend, batch);
     } catch (ProcessDied const&) {
-        // it may have, or may have come to the end
+        // it may have died, or may have finished
     }
     bool const isKept = volume.cancelPlan();
     abandon(volume, backend);
@@ -158,7 +158,7 @@ Content applied(Content content, Batch const& batch) {
             std::erase_if(content, [&](auto const& entry) { return entry.first.isWithin(change.address); });
             break;
         case stores::Change::Kind::Create:
-            content[change.address] = "made";
+            content[change.address] = "created";
             break;
         }
     }
@@ -211,7 +211,9 @@ Batch Choices::batch(Content const& content) {
 TextBackend::Options Choices::options() {
     constexpr std::size_t alwaysRewritten[] = {0, 0, 400, 1'000'000};
     constexpr std::size_t bodyToTail[] = {1, 2, 16};
-    return {milliseconds(20), alwaysRewritten[upTo(3)], bodyToTail[upTo(2)]};
+    return {.patience = milliseconds(20),
+            .alwaysRewritten = alwaysRewritten[upTo(3)],
+            .bodyToTail = bodyToTail[upTo(2)]};
 }
 
 Situation projectWith(History history, Choices& choices, bool canExchange, bool keepsStamps) {

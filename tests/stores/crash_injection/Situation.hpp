@@ -37,7 +37,7 @@ struct Situation {
     Content content;                 ///< the content that every process reads
     std::vector<Content> notDurable; ///< contents that a power cut may restore
     bool hadPowerCut = false;
-    std::string settled{}; ///< of Conflict: the text that resolves it
+    std::string resolved{}; ///< of Conflict: the text that resolves it
 };
 
 /// The content after a batch, in the simplest form.

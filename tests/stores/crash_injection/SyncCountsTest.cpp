@@ -13,7 +13,7 @@ using Calls = std::vector<std::string>;
 Calls const lockAndClear{
     "openFolder", "lock", "isFolderInPlace", "identify project.jsonl", "list", "identify project.jsonl"};
 Calls const lockAgain{"openFolder", "lock", "isFolderInPlace", "identify project.jsonl"};
-Calls const look{"identifyByPath project.jsonl"};
+Calls const checkForChanges{"identifyByPath project.jsonl"};
 Calls const readForTheFirstTime{"openFolder", "read project.jsonl"};
 Calls const readInLockedFolder{"read project.jsonl"};
 Calls const findNoStore{"read project.jsonl", "identify .gitattributes"};
@@ -59,7 +59,7 @@ protected:
         return callsOf([&] { commit(backend, addFiles({file})); });
     }
 
-    Calls callsOfLook(TextBackend& backend) const {
+    Calls callsOfCheck(TextBackend& backend) const {
         return callsOf([&] { contentOf(backend); });
     }
 };
@@ -77,8 +77,10 @@ TEST_F(SyncCounts, anAppendIsOneWriteAndOneSync) {
     auto const backend = open(appending());
     contentOf(*backend);
 
-    EXPECT_THAT(callsOfCommit(*backend, u"b"), ElementsAreArray(joined({lockAndClear, look, wholeAppend})));
-    EXPECT_THAT(callsOfCommit(*backend, u"c"), ElementsAreArray(joined({lockAgain, look, wholeAppend})));
+    EXPECT_THAT(callsOfCommit(*backend, u"b"),
+                ElementsAreArray(joined({lockAndClear, checkForChanges, wholeAppend})));
+    EXPECT_THAT(callsOfCommit(*backend, u"c"),
+                ElementsAreArray(joined({lockAgain, checkForChanges, wholeAppend})));
     EXPECT_EQ(1U, volume->count("sync"));
     EXPECT_EQ(0U, volume->count("syncFolder"));
 }
@@ -88,8 +90,10 @@ TEST_F(SyncCounts, aRewriteIsOneSyncOfTheFileAndOneOfTheFolder) {
     auto const backend = open();
     contentOf(*backend);
 
-    EXPECT_THAT(callsOfCommit(*backend, u"b"), ElementsAreArray(joined({lockAndClear, look, wholeRewrite})));
-    EXPECT_THAT(callsOfCommit(*backend, u"c"), ElementsAreArray(joined({lockAgain, look, wholeRewrite})));
+    EXPECT_THAT(callsOfCommit(*backend, u"b"),
+                ElementsAreArray(joined({lockAndClear, checkForChanges, wholeRewrite})));
+    EXPECT_THAT(callsOfCommit(*backend, u"c"),
+                ElementsAreArray(joined({lockAgain, checkForChanges, wholeRewrite})));
     EXPECT_EQ(1U, volume->count("sync"));
     EXPECT_EQ(1U, volume->count("syncFolder"));
 }
@@ -103,7 +107,7 @@ TEST_F(SyncCounts, aRewriteWithoutExchangeNeedsNoFurtherSync) {
     EXPECT_THAT(callsOfCommit(*backend, u"b"),
                 ElementsAreArray(
                     joined({lockAndClear,
-                            look,
+                            checkForChanges,
                             isInPlace,
                             writeNewText,
                             {"exchange swapping project.jsonl", "create temporary", "identify project.jsonl",
@@ -127,9 +131,9 @@ TEST_F(SyncCounts, tidyingIsARewriteUnlessTheTextIsTidy) {
     contentOf(*backend);
     auto const tidy = [&] { backend->tidy(); };
 
-    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAndClear, look, wholeRewrite})));
-    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAndClear, look})));
-    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAgain, look})));
+    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAndClear, checkForChanges, wholeRewrite})));
+    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAndClear, checkForChanges})));
+    EXPECT_THAT(callsOf(tidy), ElementsAreArray(joined({lockAgain, checkForChanges})));
 }
 
 TEST_F(SyncCounts, closingRewritesAfterAnAppendAndOtherwiseDoesNothing) {
@@ -142,7 +146,7 @@ TEST_F(SyncCounts, closingRewritesAfterAnAppendAndOtherwiseDoesNothing) {
     commit(*appender, addFiles({u"c"}));
 
     EXPECT_THAT(callsOf([&] { appender.reset(); }),
-                ElementsAreArray(joined({lockAgain, look, wholeRewrite})));
+                ElementsAreArray(joined({lockAgain, checkForChanges, wholeRewrite})));
     EXPECT_THAT(callsOf([&] { rewriter.reset(); }), IsEmpty());
     EXPECT_THAT(callsOf([&] { reader.reset(); }), IsEmpty());
 }
@@ -179,7 +183,7 @@ TEST_F(SyncCounts, discardingABatchSyncsNothing) {
                     backend->write(addFiles({u"b"}));
                     backend->discard();
                 }),
-                ElementsAreArray(joined({lockAndClear, look})));
+                ElementsAreArray(joined({lockAndClear, checkForChanges})));
 }
 
 TEST_F(SyncCounts, discardingAFirstBatchDeletesTheNewFilesAndSyncsNothing) {
@@ -201,16 +205,16 @@ TEST_F(SyncCounts, aCheckForChangesIsOneCallAndReadsOnlyAppendedBatches) {
     auto const reader = open(appending());
     auto const writer = open(appending());
 
-    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(readForTheFirstTime));
-    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(look));
+    EXPECT_THAT(callsOfCheck(*reader), ElementsAreArray(readForTheFirstTime));
+    EXPECT_THAT(callsOfCheck(*reader), ElementsAreArray(checkForChanges));
     commit(*writer, addFiles({u"b"}));
-    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(lookAndRead));
-    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(look));
-    EXPECT_THAT(callsOfLook(*writer), ElementsAreArray(look))
-        << "what it wrote itself it does not read again";
+    EXPECT_THAT(callsOfCheck(*reader), ElementsAreArray(lookAndRead));
+    EXPECT_THAT(callsOfCheck(*reader), ElementsAreArray(checkForChanges));
+    EXPECT_THAT(callsOfCheck(*writer), ElementsAreArray(checkForChanges))
+        << "it does not read its own batch again";
     writer->tidy();
-    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(lookAndRead));
-    EXPECT_THAT(callsOfLook(*reader), ElementsAreArray(look));
+    EXPECT_THAT(callsOfCheck(*reader), ElementsAreArray(lookAndRead));
+    EXPECT_THAT(callsOfCheck(*reader), ElementsAreArray(checkForChanges));
 }
 
 TEST_F(SyncCounts, aFileSystemWithoutStampsCostsOneMoreReadAfterAWrite) {
@@ -219,8 +223,8 @@ TEST_F(SyncCounts, aFileSystemWithoutStampsCostsOneMoreReadAfterAWrite) {
     auto const backend = open();
     commit(*backend, addFiles({u"b"}));
 
-    EXPECT_THAT(callsOfLook(*backend), ElementsAreArray(lookAndRead));
-    EXPECT_THAT(callsOfLook(*backend), ElementsAreArray(look));
+    EXPECT_THAT(callsOfCheck(*backend), ElementsAreArray(lookAndRead));
+    EXPECT_THAT(callsOfCheck(*backend), ElementsAreArray(checkForChanges));
 }
 
 TEST_F(SyncCounts, aWriterThatFindsTheLeftoversOfADeadOneSyncsTheFolderOnceMore) {
@@ -233,7 +237,7 @@ TEST_F(SyncCounts, aWriterThatFindsTheLeftoversOfADeadOneSyncsTheFolderOnceMore)
                 ElementsAreArray(joined(
                     {{"openFolder", "lock", "isFolderInPlace", "identify project.jsonl", "list", "syncFolder",
                       "identify temporary", "remove temporary", "identify project.jsonl"},
-                     look,
+                     checkForChanges,
                      wholeRewrite})));
 }
 

@@ -25,7 +25,7 @@ std::size_t cut(std::size_t length) {
     return living != nullptr ? std::min(length, living->mostBytes) : length;
 }
 
-/// True when a sync is skipped.
+/// True if a sync is skipped.
 bool isSyncSpared() {
     return living != nullptr && !living->syncs;
 }

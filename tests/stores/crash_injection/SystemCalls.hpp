@@ -15,7 +15,7 @@ struct SystemCall {
     std::string_view file; ///< the name of the file, where one is given
     int flags = 0;         ///< of open, openat, renameat2
 
-    /// True when it changes the disk, or opens a file for writing.
+    /// True if it changes the disk, or opens a file for writing.
     bool isChange() const;
 };
 
@@ -40,7 +40,7 @@ public:
     /// When false, syncs are counted but not executed, to save time.
     bool syncs = false;
 
-    /// @return true when the call fails, with errno set.
+    /// @return true if the call fails, with errno set.
     bool fails(SystemCall const& call);
 
     /// The current object, or null.

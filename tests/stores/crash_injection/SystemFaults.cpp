@@ -89,7 +89,7 @@ void SystemFaults::checkNextWriter(SystemOperation const& operation, RealProject
     auto after = before;
     after.insert(*contentAfter({addFiles({u"z"})}).begin());
     EXPECT_EQ(after, contentOf(*project.open(operation.options)));
-    EXPECT_TRUE(before == found || operation.name == std::string("settle"));
+    EXPECT_TRUE(before == found || operation.name == std::string("resolve"));
     for (auto const& name : project.names()) {
         EXPECT_TRUE(allowed.contains(name) || name.starts_with("damaged-")) << name << " was left";
     }

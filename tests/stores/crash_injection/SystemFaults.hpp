@@ -16,7 +16,7 @@ protected:
     /// In memory if there is such a folder: nothing is synced here, and creating folders on disk is slow.
     static void SetUpTestSuite();
 
-    /// Injects a fault into one call, after a number of others. @return false when the operation makes fewer
+    /// Injects a fault into one call, after a number of others. @return false if the operation makes fewer
     /// calls.
     /// @param system the results of the other calls.
     bool failAt(SystemOperation const& operation, std::size_t callsBefore, int error, bool isForGood,

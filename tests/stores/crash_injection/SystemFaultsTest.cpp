@@ -95,9 +95,9 @@ SystemCalls::Answer failing(std::string_view name, std::size_t callsBefore) {
 TEST_F(SystemFaults, aFolderThatCannotBeExaminedIsNotTakenForAMovedOne) {
     auto const operation = appendingOperation();
     auto const project = projectFor(operation);
-    constexpr std::size_t looksBefore = 2; // when it is locked, and before the append
+    constexpr std::size_t examinedBefore = 2; // when it is locked, and before the append
 
-    auto const thrown = perform(operation, *project, failing("lstat", looksBefore));
+    auto const thrown = perform(operation, *project, failing("lstat", examinedBefore));
 
     ASSERT_TRUE(thrown);
     EXPECT_EQ("cannot be examined: Input/output error", thrown->getProblem());
@@ -107,9 +107,9 @@ TEST_F(SystemFaults, aFolderThatCannotBeExaminedIsNotTakenForAMovedOne) {
 TEST_F(SystemFaults, aNewTextThatCannotBeExaminedDoesNotReplaceTheOldOne) {
     auto const operation = rewritingOperation();
     auto const project = projectFor(operation);
-    constexpr std::size_t looksBefore = 2; // at the folder, and at the new file's mode
+    constexpr std::size_t examinedBefore = 2; // the folder, and the new file's mode
 
-    auto const thrown = perform(operation, *project, failing("fstat", looksBefore));
+    auto const thrown = perform(operation, *project, failing("fstat", examinedBefore));
 
     ASSERT_TRUE(thrown);
     EXPECT_THAT(thrown->getFile(), HasSubstr(".tmp"));

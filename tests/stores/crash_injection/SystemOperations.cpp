@@ -15,8 +15,9 @@ namespace {
 
 using std::chrono::milliseconds;
 
-TextBackend::Options const rewriting{milliseconds(20), 1'000'000, 16};
-TextBackend::Options const appending{milliseconds(20), 0, 1};
+TextBackend::Options const rewriting{
+    .patience = milliseconds(20), .alwaysRewritten = 1'000'000, .bodyToTail = 16};
+TextBackend::Options const appending{.patience = milliseconds(20), .alwaysRewritten = 0, .bodyToTail = 1};
 
 Batch const many = addFiles(manyFiles(20));
 Batch const one = addFiles({u"b"});
@@ -49,12 +50,12 @@ std::string conflictedText() {
 
 void letAnotherProcessAppend(RealProject& project) {
     readFirst(project);
-    // As it is before that process tidies up.
+    // The state before that process tidies the text.
     std::ofstream(project.root.onDisk() / ".projectdata/project.jsonl", std::ios::binary)
         << textOf(many, {one});
 }
 
-void leaveWhatADeadWriterLeft(RealProject& project) {
+void leaveATemporaryFile(RealProject& project) {
     project.root.addFile(".projectdata/project.jsonl.1-0123456789abcdef.tmp", "half a text");
 }
 
@@ -76,15 +77,18 @@ void discardOne(RealProject& project) {
     project.backend->discard();
 }
 
-SystemOperation operation(char const* name, std::optional<std::string> text,
-                          TextBackend::Options const& options, std::function<void(RealProject&)> prepare,
-                          std::function<void(RealProject&)> perform) {
-    auto const before = text ? stores::samples::contentOf(stores::samples::readWhole(*text)) : Content();
-    return {name, std::move(text), options, std::move(prepare), std::move(perform), before, before};
+/// Sets the content before an operation to that of its text.
+SystemOperation changing(SystemOperation operation) {
+    if (operation.text) {
+        operation.before = stores::samples::contentOf(stores::samples::readWhole(*operation.text));
+    }
+    return operation;
 }
 
-SystemOperation withAfter(SystemOperation operation, Content after) {
-    operation.after = std::move(after);
+/// The same for an operation that leaves the content as it is.
+SystemOperation unchanging(SystemOperation operation) {
+    operation = changing(std::move(operation));
+    operation.after = operation.before;
     return operation;
 }
 
@@ -124,52 +128,106 @@ std::unique_ptr<RealProject> projectFor(SystemOperation const& operation) {
 }
 
 SystemOperation appendingOperation() {
-    return withAfter(operation("append", textOf(many), appending, readFirst, commitOne),
-                     contentAfter({many, one}));
+    return changing({.name = "append",
+                     .text = textOf(many),
+                     .options = appending,
+                     .prepare = readFirst,
+                     .perform = commitOne,
+                     .after = contentAfter({many, one})});
 }
 
 SystemOperation rewritingOperation() {
-    return withAfter(operation("rewrite", textOf(many), rewriting, readFirst, commitOne),
-                     contentAfter({many, one}));
+    return changing({.name = "rewrite",
+                     .text = textOf(many),
+                     .options = rewriting,
+                     .prepare = readFirst,
+                     .perform = commitOne,
+                     .after = contentAfter({many, one})});
 }
 
 SystemOperation creatingOperation() {
-    return withAfter(operation("create", std::nullopt, rewriting, nothing, commitOne), contentAfter({one}));
+    return changing({.name = "create",
+                     .text = std::nullopt,
+                     .options = rewriting,
+                     .prepare = nothing,
+                     .perform = commitOne,
+                     .after = contentAfter({one})});
 }
 
 std::vector<SystemOperation> systemOperations() {
-    auto const text = textOf(many);
-    auto afterOthers =
-        operation("append after others", textOf(many), appending, letAnotherProcessAppend, commitAnother);
-    afterOthers.before = contentAfter({many, one});
-    auto lookAfterOthers =
-        operation("look after others", text, appending, letAnotherProcessAppend, readFirst);
-    lookAfterOthers.before = contentAfter({many, one});
-    auto close =
-        operation("close", text, appending, commitOne, [](RealProject& project) { project.backend.reset(); });
-    close.before = contentAfter({many, one});
     return {
         appendingOperation(),
         rewritingOperation(),
         creatingOperation(),
-        withAfter(operation("recover", text, rewriting, leaveWhatADeadWriterLeft, commitOne),
-                  contentAfter({many, one})),
-        withAfter(operation("rewrite somebody else's text", text, rewriting, giveAway, commitOne),
-                  contentAfter({many, one})),
-        withAfter(afterOthers, contentAfter({many, one, another})),
-        withAfter(lookAfterOthers, contentAfter({many, one})),
-        withAfter(close, contentAfter({many, one})),
-        operation("discard", text, appending, nothing, discardOne),
-        operation("discard creation", std::nullopt, appending, nothing, discardOne),
-        operation("tidy", textOf(many, {one}), appending, nothing,
-                  [](RealProject& project) { project.backend->tidy(); }),
-        operation("repair", damagedText(), appending, nothing,
-                  [](RealProject& project) { project.backend->repair(); }),
-        withAfter(operation("settle", conflictedText(), appending, nothing,
-                            [](RealProject& project) { project.backend->resolve(textOf(many)); }),
-                  contentAfter({many})),
-        operation("look", text, appending, nothing, readFirst),
-        operation("check", text, appending, nothing, [](RealProject& project) { project.backend->check(); }),
+        changing({.name = "recover",
+                  .text = textOf(many),
+                  .options = rewriting,
+                  .prepare = leaveATemporaryFile,
+                  .perform = commitOne,
+                  .after = contentAfter({many, one})}),
+        changing({.name = "rewrite another owner's text",
+                  .text = textOf(many),
+                  .options = rewriting,
+                  .prepare = giveAway,
+                  .perform = commitOne,
+                  .after = contentAfter({many, one})}),
+        {.name = "append after others",
+         .text = textOf(many),
+         .options = appending,
+         .prepare = letAnotherProcessAppend,
+         .perform = commitAnother,
+         .before = contentAfter({many, one}),
+         .after = contentAfter({many, one, another})},
+        {.name = "check for changes after others",
+         .text = textOf(many),
+         .options = appending,
+         .prepare = letAnotherProcessAppend,
+         .perform = readFirst,
+         .before = contentAfter({many, one}),
+         .after = contentAfter({many, one})},
+        {.name = "close",
+         .text = textOf(many),
+         .options = appending,
+         .prepare = commitOne,
+         .perform = [](RealProject& project) { project.backend.reset(); },
+         .before = contentAfter({many, one}),
+         .after = contentAfter({many, one})},
+        unchanging({.name = "discard",
+                    .text = textOf(many),
+                    .options = appending,
+                    .prepare = nothing,
+                    .perform = discardOne}),
+        unchanging({.name = "discard creation",
+                    .text = std::nullopt,
+                    .options = appending,
+                    .prepare = nothing,
+                    .perform = discardOne}),
+        unchanging({.name = "tidy",
+                    .text = textOf(many, {one}),
+                    .options = appending,
+                    .prepare = nothing,
+                    .perform = [](RealProject& project) { project.backend->tidy(); }}),
+        unchanging({.name = "repair",
+                    .text = damagedText(),
+                    .options = appending,
+                    .prepare = nothing,
+                    .perform = [](RealProject& project) { project.backend->repair(); }}),
+        changing({.name = "resolve",
+                  .text = conflictedText(),
+                  .options = appending,
+                  .prepare = nothing,
+                  .perform = [](RealProject& project) { project.backend->resolve(textOf(many)); },
+                  .after = contentAfter({many})}),
+        unchanging({.name = "check for changes",
+                    .text = textOf(many),
+                    .options = appending,
+                    .prepare = nothing,
+                    .perform = readFirst}),
+        unchanging({.name = "check",
+                    .text = textOf(many),
+                    .options = appending,
+                    .prepare = nothing,
+                    .perform = [](RealProject& project) { project.backend->check(); }}),
     };
 }
 

@@ -28,8 +28,8 @@ struct SystemOperation {
     TextBackend::Options options;
     std::function<void(RealProject&)> prepare; ///< brings the process to the moment before the operation
     std::function<void(RealProject&)> perform;
-    Content before;
-    Content after;
+    Content before{};
+    Content after{};
 };
 
 /// Creates the project for an operation.

@@ -97,7 +97,7 @@ class TreeAfterFailures : public TextStore {
 protected:
     using InjectedFault = CrashingVolume::InjectedFault;
 
-    /// @return false when the write makes fewer calls.
+    /// @return false if the write makes fewer calls.
     bool writeWithFault(Write write, Options options, InjectedFault fault, std::size_t call);
 
     void failEverywhere(Write write, Options options) {
@@ -139,7 +139,7 @@ bool TreeAfterFailures::writeWithFault(Write write, Options options, InjectedFau
     }
     ++failures;
     reversals += listener->removals;
-    EXPECT_TRUE(listener->there.empty()) << "it was told that files are there of a write that failed";
+    EXPECT_TRUE(listener->there.empty()) << "it was notified of files of a failed write";
     bool const isKnown = failure->kind() != StoreError::Kind::OutcomeUnknown;
     if (isKnown) {
         EXPECT_EQ(before, found);
@@ -164,7 +164,7 @@ TEST_F(TreeAfterFailures, aWriteThatFailsAtAnyCallLeavesTheTreeAsItWas) {
     failEverywhere(addAndChange, rewriting());
 
     EXPECT_GT(failures, 150U);
-    EXPECT_EQ(0U, reversals) << "no file comes or goes with a later batch";
+    EXPECT_EQ(0U, reversals) << "a later batch creates and deletes no file";
 }
 
 TEST_F(TreeAfterFailures, aFirstWriteThatFailsAtAnyCallNotifiesListenersOfTheDeletion) {
@@ -173,7 +173,7 @@ TEST_F(TreeAfterFailures, aFirstWriteThatFailsAtAnyCallNotifiesListenersOfTheDel
     }
 
     EXPECT_GT(failures, 50U);
-    EXPECT_GT(reversals, 50U) << "files were made before the failure";
+    EXPECT_GT(reversals, 50U) << "files were created before the failure";
 }
 
 } // namespace

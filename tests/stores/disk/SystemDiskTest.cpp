@@ -106,11 +106,11 @@ TEST_F(SystemDisk, theFolderIsCreatedOnceAndRemovedWhenEmpty) {
 }
 
 TEST_F(SystemDisk, aMissingRootIsAnErrorThatNamesIt) {
-    auto const disk = makeSystemDisk(root.path(u"gone"), stores::TextBackend::folderName);
+    auto const disk = makeSystemDisk(root.path(u"missing"), stores::TextBackend::folderName);
 
     auto const error = errorOf([&] { disk->openFolder(); });
 
-    EXPECT_EQ((root.onDisk() / "gone").string(), error.getFile());
+    EXPECT_EQ((root.onDisk() / "missing").string(), error.getFile());
     EXPECT_THAT(error.getRemedy(), HasSubstr("moved or deleted"));
 }
 
@@ -426,7 +426,7 @@ TEST_F(SystemDisk, theChildOfAForkHoldsNothingAndRefusesToWork) {
     auto const other = openDisk();
     EXPECT_FALSE(other->lock(std::chrono::milliseconds(0)));
     disk->unlock();
-    EXPECT_TRUE(other->lock(std::chrono::milliseconds(0))) << "the child, which still lives, holds it on";
+    EXPECT_TRUE(other->lock(std::chrono::milliseconds(0))) << "the child is alive and must not hold it";
     EXPECT_EQ("hello", content("a"));
 }
 
@@ -442,8 +442,8 @@ TEST_F(SystemDisk, aForkDuringManyOpensLeavesNoDescriptorInTheChild) {
     auto const countOpen = [&] {
         std::ptrdiff_t count = 0;
         for (auto const& entry : std::filesystem::directory_iterator("/proc/self/fd")) {
-            std::error_code gone;
-            auto const target = std::filesystem::read_symlink(entry.path(), gone);
+            std::error_code ignored;
+            auto const target = std::filesystem::read_symlink(entry.path(), ignored);
             count += target.string().starts_with(root.onDisk().string()) ? 1 : 0;
         }
         return count;

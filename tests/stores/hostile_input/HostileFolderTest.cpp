@@ -30,7 +30,7 @@ using stores::Fault;
 using stores::samples::bodyOf;
 using ::testing::HasSubstr;
 
-/// Creates something other than a regular file of the project at a path. @return false when the system
+/// Creates something other than a regular file of the project at a path. @return false if the system
 /// refuses.
 struct Thing {
     char const* name;

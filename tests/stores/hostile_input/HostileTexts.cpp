@@ -39,10 +39,10 @@ std::string body(std::string_view lines) {
 /// A body of some lines, with a tail of these batches of one line each.
 std::string withBatches(std::size_t count, std::string const& start, std::string const& line, bool chain) {
     std::string text = body(start);
-    std::string anchor = sumOf(text);
+    std::string preceding = sumOf(text);
     for (std::size_t i = 0; i < count; ++i) {
-        std::string const closing = closingOf({line}, chain ? anchor : std::string(anchor.size(), '0'));
-        anchor = closing.substr(closing.size() - anchor.size() - 3, anchor.size());
+        std::string const closing = closingOf({line}, chain ? preceding : std::string(preceding.size(), '0'));
+        preceding = closing.substr(closing.size() - preceding.size() - 3, preceding.size());
         text += line + "\n" + closing + "\n";
     }
     return text;

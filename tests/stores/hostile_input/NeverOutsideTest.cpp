@@ -107,7 +107,7 @@ TEST_F(NeverOutside, whenAHostileProjectIsReadAndChecked) {
 TEST_F(NeverOutside, whenAHostileProjectIsWritten) {
     expectInside([this] {
         auto const store = open();
-        commit(*store, addFiles({u"a"})); // written anew
+        commit(*store, addFiles({u"a"})); // rewritten
         commit(*store, addFiles({u"b"})); // appended
         commit(*store, {remove(fileAddress(u".."))});
         store->tidy();

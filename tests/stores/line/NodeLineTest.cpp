@@ -20,7 +20,7 @@ std::string lineOf(Change const& change) {
     return line;
 }
 
-/// What a line says, written anew.
+/// The change that a line describes, written again.
 std::string rewritten(std::string const& line) {
     ParsedLine const parsed = parseLine(line);
     return parsed.change ? lineOf(*parsed.change) : std::string("damaged");

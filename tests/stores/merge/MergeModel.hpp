@@ -11,11 +11,11 @@
 
 namespace project::stores::samples {
 
-/// What stands where, kept in the plainest way: the values of a node, or nothing for an address that was
-/// made.
+/// The nodes by address, in the simplest form: the values of a node, or nothing for an address that was
+/// created without one.
 using Tree = std::map<Address, std::optional<Keys>>;
 
-/// Three trees merged the slow way, each question asked of whole maps.
+/// A slow merge of three trees, in which each question is answered by searching whole maps.
 class MergeModel {
 public:
     MergeModel(Tree const& base, Tree const& ours, Tree const& theirs)
@@ -73,12 +73,12 @@ private:
     }
 
     void mergeAt(Address const& address) {
-        bool const stood = base_.contains(address);
-        bool const oursGone = stood && !hasAnythingWithin(ours_, address);
-        bool const theirsGone = stood && !hasAnythingWithin(theirs_, address);
-        if (oursGone || theirsGone) {
+        bool const existed = base_.contains(address);
+        bool const oursRemoved = existed && !hasAnythingWithin(ours_, address);
+        bool const theirsRemoved = existed && !hasAnythingWithin(theirs_, address);
+        if (oursRemoved || theirsRemoved) {
             done_.insert(address);
-            bool const changed = hasChangedWithin(oursGone ? theirs_ : ours_, address);
+            bool const changed = hasChangedWithin(oursRemoved ? theirs_ : ours_, address);
             if (changed) {
                 conflicts_.insert(address);
             }
@@ -142,7 +142,7 @@ private:
     Tree const& theirs_;
     Tree merged_;
     std::set<Address> conflicts_;
-    std::set<Address> done_; ///< nothing more is to be said of what lies within these
+    std::set<Address> done_; ///< the addresses within these are merged
 };
 
 } // namespace project::stores::samples

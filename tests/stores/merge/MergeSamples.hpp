@@ -15,7 +15,7 @@ inline std::string textWith(Batch const& batch) {
     return ProjectText::empty().rewrittenWith(batch).body();
 }
 
-inline std::string toldAscii(std::u16string const& text) {
+inline std::string toAscii(std::u16string const& text) {
     std::string result;
     for (char16_t const unit : text) {
         result += static_cast<char>(unit);
@@ -28,11 +28,11 @@ inline std::string toldAscii(std::u16string const& text) {
 inline std::string described(MergeConflict const& conflict) {
     constexpr char const* kinds[] = {"Key", "Type", "Nested", "Subtree"};
     std::string result = kinds[static_cast<int>(conflict.kind)];
-    result += conflict.key.empty() ? "" : " " + toldAscii(conflict.key);
+    result += conflict.key.empty() ? "" : " " + toAscii(conflict.key);
     result += " at " + std::string(AddressText(conflict.address).view().text);
     std::string before = " in ";
     for (NestedStep const& step : conflict.nested) {
-        result += before + toldAscii(step.type) + ' ' + toldAscii(step.value);
+        result += before + toAscii(step.type) + ' ' + toAscii(step.value);
         result += step.earlier == 0 ? "" : "#" + std::to_string(step.earlier);
         before = "/";
     }
@@ -45,7 +45,7 @@ inline std::string described(MergeConflict const& conflict) {
     return result;
 }
 
-/// Conflicts, one a line.
+/// Conflicts, one per line.
 inline std::string described(std::vector<MergeConflict> const& conflicts) {
     std::string result;
     for (MergeConflict const& conflict : conflicts) {

@@ -1,4 +1,4 @@
-// What can be done about conflicts: choosing sides, or a text with markers.
+// Resolution of conflicts: by choosing sides, or in a text with markers.
 #include "project/stores/TextMerge.hpp"
 
 #include <ostream>
@@ -133,11 +133,11 @@ TEST(TextMergeInput, textsThatAreNotCanonicalAreMergedByContent) {
 
 TEST(TextMergeInput, manyLinesAreMerged) {
     constexpr int files = 100'000;
-    auto const without = [](int gone) {
+    auto const without = [](int removed) {
         std::string text = std::string(firstLine) + '\n';
         for (int i = 0; i < files; ++i) {
             std::string const number = std::to_string(files + i);
-            text += i % 1000 == gone ? "" : "\"folder" + number.substr(0, 4) + "/file" + number + "\"\n";
+            text += i % 1000 == removed ? "" : "\"folder" + number.substr(0, 4) + "/file" + number + "\"\n";
         }
         return text + std::string(endLine) + '\n';
     };

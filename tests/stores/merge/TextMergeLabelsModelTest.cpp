@@ -1,4 +1,4 @@
-// Labels on a file, merged as a plain map of counts is.
+// Labels on a file, merged like a plain map of counts.
 #include "project/stores/TextMerge.hpp"
 
 #include <rapidcheck/gtest.h>

@@ -1,4 +1,4 @@
-// Random versions: what holds for every merge, and merges done on plain maps.
+// Random versions: laws of every merge, and merges of plain maps.
 #include "project/stores/TextMerge.hpp"
 
 #include <rapidcheck/gtest.h>
@@ -27,10 +27,10 @@ int drawNumber(int below) {
     return *rc::gen::resize(rc::kNominalSize, rc::gen::inRange(0, below));
 }
 
-/// What stands where; a null node is an address that was made.
+/// Nodes by address; a null node is an address that was created without one.
 using Nodes = std::map<Address, Node>;
 
-/// An address that stands there, or lies above or below one, or may be anywhere.
+/// An address of a node, above one, below one, or anywhere.
 Address drawAddress(Nodes const& nodes) {
     if (nodes.empty() || drawNumber(6) == 0) {
         return *anyAddress();
@@ -100,7 +100,7 @@ Batch drawBatch(Nodes& nodes, int most) {
     return batch;
 }
 
-/// Three versions with any nodes, the two later ones perhaps with tails.
+/// Three versions with arbitrary nodes; the two later ones may have tails.
 struct Versions {
     Versions() {
         Nodes nodes;
@@ -209,7 +209,7 @@ RC_GTEST_PROP(TextMergeModel, theMarkersEncloseTheSidesToChooseFrom, ()) {
     bool const nested =
         std::any_of(merge.conflicts().begin(), merge.conflicts().end(),
                     [](MergeConflict const& it) { return it.kind == MergeConflict::Kind::Nested; });
-    if (!nested) { // where one of several of one name goes, those behind it meet others
+    if (!nested) { // if one of several nodes of one name is removed, the next ones are matched with others
         TextMerge const again = mergeTexts(sideOf(marked, "|"), sideOf(marked, "<"), sideOf(marked, "="));
         RC_ASSERT(described(again.conflicts()) == described(merge.conflicts()));
         RC_ASSERT(again.textWithMarkers() == marked);
@@ -244,7 +244,7 @@ Keys drawKeys() {
     return keys;
 }
 
-/// Addresses of a few names and levels, so that they meet and lie within each other.
+/// Addresses of a few names and levels, so that they coincide and lie within each other.
 Address drawNearAddress() {
     Address address = addressOf({u"Files", u"Root"});
     for (int depth = 1 + drawNumber(3); depth > 0; --depth) {

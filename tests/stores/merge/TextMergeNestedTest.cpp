@@ -1,4 +1,4 @@
-// What becomes of the nodes that are nested in one node: labels on a file, data, extensions.
+// The merge of the nodes that are nested in one node: labels on a file, data, extensions.
 #include "project/stores/TextMerge.hpp"
 
 #include <gtest/gtest.h>

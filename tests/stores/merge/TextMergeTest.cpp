@@ -1,4 +1,4 @@
-// What becomes of addresses, and of the keys and types of their nodes.
+// The merge of addresses, and of the keys and types of their nodes.
 #include "project/stores/TextMerge.hpp"
 
 #include <gtest/gtest.h>
@@ -181,10 +181,10 @@ TEST(TextMerge, anAddressThatDidNotExistIsNeverRemoved) {
 
 TEST(TextMerge, aNodeIsRemovedAloneIfSomethingBelowItStays) {
     std::string const base = bodyOf({R"("a")", R"("a/x")"});
-    std::string const gone = bodyOf({R"("a/x")"});
-    EXPECT_EQ(merged(base, gone, bodyOf({R"("a")", R"("a/x")", R"("a/y")"})),
+    std::string const removed = bodyOf({R"("a/x")"});
+    EXPECT_EQ(merged(base, removed, bodyOf({R"("a")", R"("a/x")", R"("a/y")"})),
               bodyOf({R"("a/x")", R"("a/y")"}));
-    EXPECT_EQ(merged(base, gone, bodyOf({R"({"file":"a","keys":{"k":"1"}})", R"("a/x")"})),
+    EXPECT_EQ(merged(base, removed, bodyOf({R"({"file":"a","keys":{"k":"1"}})", R"("a/x")"})),
               "Subtree at a, removed by ours, changed a");
 }
 

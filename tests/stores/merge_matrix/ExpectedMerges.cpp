@@ -55,26 +55,26 @@ std::vector<Conflict> const& conflicts() {
     return all;
 }
 
-/// Changes that come to something else than their merge when they are made in this order in one project: the
-/// later one reaches what the earlier one made. All other orders that the managers allow come to the merge.
+/// Changes whose result differs from their merge if they are made in this order in one project: the later
+/// one affects the result of the earlier one. All other orders that the managers allow equal the merge.
 std::set<std::pair<std::string, std::string>> const reaching{
     {"label src Source", "add src/new.cpp"}, // adding drops the labels of the folders above
-    // A label on a file whose category or label is gone, which `check` names:
+    // A label on a file whose category or label was deleted, which `check` reports:
     {"label src/one.cpp Test", "delete category Kind"},
     {"label other.cpp Test", "delete category Kind"},
     {"label src Source", "delete category Kind"},
     {"label src Source", "delete label Source"},
-    // An entry point in a group that is gone, which reads as one of the default group:
+    // An entry point in a deleted group, which is read as one of the default group:
     {"delete group tools", "rename entry point main.cpp"},
     {"delete group tools", "extend entry point main.cpp"},
-    // An entry point of a file that is gone, which `check` names; the other order is refused:
+    // An entry point of a removed file, which `check` reports; the other order is refused:
     {"set entry point src/two.cpp", "remove src"},
 };
 
 std::string sortedDescription(metadata::MetadataNode const& node) {
-    std::string result = toldAscii(node.getType());
+    std::string result = toAscii(node.getType());
     for (std::u16string const& key : node.getKeys()) {
-        result += ' ' + toldAscii(key) + '=' + toldAscii(node.get(key));
+        result += ' ' + toAscii(key) + '=' + toAscii(node.get(key));
     }
     std::multiset<std::string> children;
     for (auto const& child : node.getChildren()) {

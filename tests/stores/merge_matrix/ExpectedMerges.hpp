@@ -8,22 +8,22 @@
 
 namespace project::test {
 
-/// What a text says, whatever the order of nested nodes, an address a line.
+/// The content of a text with sorted nested nodes, one address per line.
 std::string contentOf(std::string const& text);
 
-/// What the merge of any two changes has to come to.
+/// The expected results of merging any two changes.
 class ExpectedMerges {
 public:
     ExpectedMerges();
 
-    /// The description of the conflict of two changes; empty when they merge without a conflict.
+    /// The description of the conflict of two changes; empty if they merge without a conflict.
     static std::string conflict(std::string const& ours, std::string const& theirs);
 
-    /// The pairs of names that these tables make exceptions of.
+    /// The pairs of names that these tables list as exceptions.
     static std::vector<std::pair<std::string, std::string>> exceptions();
 
-    /// Fails the test unless a merged text says what both changes come to in one project, one after the other
-    /// in each order that the managers allow.
+    /// Fails the test unless a merged text equals the result of both changes in one project, one after the
+    /// other, in each order that the managers allow.
     void expectBoth(std::string const& merged, NamedChange const& one, NamedChange const& other) const;
 
     SampleProject const& project() const noexcept { return project_; }

@@ -26,7 +26,7 @@ namespace {
 constexpr char const* textPath = ".projectdata/project.jsonl";
 constexpr char const* attributes = "project.jsonl -text merge=project-definition\n";
 
-/// A repository that projectctl merges texts in, with a commit for each version of a text.
+/// A repository in which projectctl merges texts, with a commit for each version of a text.
 class MergingRepository {
 public:
     MergingRepository() {
@@ -36,8 +36,8 @@ public:
         EXPECT_EQ(result.exitCode, 0) << result.errors;
     }
 
-    /// Commits versions of a text, each by its name as a branch.
-    /// @param base what they come from; without one they have no history in common.
+    /// Commits versions of a text, each to a branch of its name.
+    /// @param base the branch that they start from; without one they have no common ancestor.
     void commit(std::map<std::string, std::string> const& versions, std::string const& base) const {
         std::ostringstream stream;
         for (auto const& [name, text] : versions) {
@@ -99,7 +99,7 @@ public:
     }
 
 private:
-    /// Of each merge: whether it is clean, and its tree. A record ends with an empty field behind its
+    /// For each merge: whether it is clean, and its tree. A record ends with an empty field after its
     /// messages.
     static std::vector<std::pair<bool, std::string>> mergesIn(std::string const& output) {
         std::vector<std::pair<bool, std::string>> result;
@@ -112,8 +112,8 @@ private:
         return result;
     }
 
-    /// A clean merge has no more but a line end; another one the entries in conflict, an empty field, and
-    /// messages up to the next one.
+    /// After a clean merge, only a line end follows; after any other, the entries in conflict, an empty
+    /// field, and messages up to the next merge.
     static void skipRest(std::istringstream& fields, bool isClean) {
         std::string field;
         for (int sections = isClean ? 1 : 2; sections > 0 && std::getline(fields, field, '\0');) {
@@ -138,7 +138,7 @@ private:
         {{"PATH", std::filesystem::path(PROJECTCTL).parent_path().string() + ":/usr/bin:/bin"}}};
 };
 
-/// Two changes, and how the versions that have them are written.
+/// Two changes, and how the versions with them are written.
 struct Meeting {
     NamedChange const* ours;
     Writing oursWriting;
@@ -151,7 +151,7 @@ protected:
     GitMergeMatrix() {
         std::map<std::string, std::string> versions;
         for (std::size_t number = 0; number < projectChanges().size(); ++number) {
-            for (auto const writing : {Writing::Anew, Writing::Appending}) {
+            for (auto const writing : {Writing::Rewriting, Writing::Appending}) {
                 auto const text =
                     merges.project().after(merges.common(), projectChanges()[number].make, writing);
                 versions.emplace(branchOf(number, writing), text);
@@ -163,19 +163,19 @@ protected:
     }
 
     static std::string branchOf(std::size_t number, Writing writing) {
-        return "change" + std::to_string(number) + (writing == Writing::Anew ? "" : "-tail");
+        return "change" + std::to_string(number) + (writing == Writing::Rewriting ? "" : "-tail");
     }
 
     static std::string branchOf(NamedChange const* change, Writing writing) {
         return branchOf(static_cast<std::size_t>(change - projectChanges().data()), writing);
     }
 
-    /// Every pair with versions written in every way, or, for the usual run, each pair once on changing sides
-    /// and in changing ways.
+    /// Every pair with versions written in every way; in the usual run, each pair once, with alternating
+    /// sides and ways.
     static std::vector<Meeting> meetings(bool all) {
         std::vector<Meeting> result;
         auto const& changes = projectChanges();
-        constexpr Writing writings[] = {Writing::Anew, Writing::Appending};
+        constexpr Writing writings[] = {Writing::Rewriting, Writing::Appending};
         for (std::size_t i = 0; i < changes.size(); ++i) {
             for (std::size_t j = 0; j < changes.size(); ++j) {
                 for (std::size_t way = 0; way < 4; ++way) {
@@ -248,11 +248,11 @@ TEST_F(GitMergeMatrix, mergesTheSameInAWorkTree) {
     }
 }
 
-/// Projects that were just made: by one side, in a repository that has none yet, or by both.
+/// Projects that were just created: by one side, in a repository that has none yet, or by both.
 class GitMergeOfNewProjects : public testing::Test {
 protected:
     std::string make(std::u16string const& name, std::u16string const& file,
-                     Writing writing = Writing::Anew) const {
+                     Writing writing = Writing::Rewriting) const {
         return project.after(
             {},
             [&](ProjectManager& it, TemporaryFolder const& folder) {
@@ -280,9 +280,9 @@ TEST_F(GitMergeOfNewProjects, hasTheFilesOfBoth) {
         it.create(u"Pumps");
         it.getFileManager().add({folder.path(u"src/one.cpp"), folder.path(u"src/two.cpp")});
     });
-    for (auto const writing : {Writing::Anew, Writing::Appending}) {
-        auto const merged =
-            merge(make(u"Pumps", u"src/one.cpp", writing), make(u"Pumps", u"src/two.cpp", Writing::Anew));
+    for (auto const writing : {Writing::Rewriting, Writing::Appending}) {
+        auto const merged = merge(make(u"Pumps", u"src/one.cpp", writing),
+                                  make(u"Pumps", u"src/two.cpp", Writing::Rewriting));
 
         EXPECT_TRUE(merged.isClean);
         EXPECT_EQ(merged.text, both);

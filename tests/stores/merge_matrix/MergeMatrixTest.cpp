@@ -25,7 +25,7 @@ using stores::mergeTexts;
 
 namespace {
 
-/// One change, against all others.
+/// One change, merged with all others.
 class MergeMatrix : public testing::TestWithParam<NamedChange> {
 protected:
     void expectMerged(std::string const& ours, std::string const& theirs, NamedChange const& other) const {
@@ -90,7 +90,7 @@ std::string testName(testing::TestParamInfo<NamedChange> const& info) {
 
 INSTANTIATE_TEST_SUITE_P(Changes, MergeMatrix, testing::ValuesIn(projectChanges()), testName);
 
-/// Projects that both sides have just made, without a common version.
+/// Projects that both sides have just created, without a common version.
 class MergeOfNewProjects : public testing::Test {
 protected:
     std::string make(std::u16string const& name, std::u16string const& file) const {

@@ -8,7 +8,7 @@
 
 namespace project::test {
 
-/// A change as people make it, by the name that tables of tests call it.
+/// A change through the managers, with the name that the tables use.
 struct NamedChange {
     std::string name;
     Action make;
@@ -16,10 +16,10 @@ struct NamedChange {
     friend void PrintTo(NamedChange const& change, std::ostream* out) { *out << change.name; }
 };
 
-/// Makes the project that all changes start from.
+/// Creates the project that all changes start from.
 void makeCommonProject(ProjectManager& project, TemporaryFolder const& folder);
 
-/// Every kind of change. Whatever comes into being has the same UUID each time.
+/// Every kind of change. New objects have the same UUID each time.
 std::vector<NamedChange> const& projectChanges();
 
 } // namespace project::test

@@ -11,27 +11,28 @@ namespace project::test {
 
 using management::ProjectManager;
 
-/// Something that somebody does in a project. The folder is the project's root.
+/// A change to a project. The folder is the project's root.
 using Action = std::function<void(ProjectManager&, TemporaryFolder const&)>;
 
 /// How a store writes a small text.
 enum class Writing {
-    Anew,
+    Rewriting,
     Appending, ///< each batch goes into the tail
 };
 
 /// A project with the managers and the text store that applications use. Its files are in a folder of their
-/// own, whether or not they are in the project; its text is on a disk in memory, since a merge asks nothing
-/// of disks and real ones make hundreds of pairs wait.
+/// own, whether or not they are in the project; its text is on a disk in memory, since a merge does not
+/// depend on the disk, and a real one is too slow for hundreds of pairs.
 class SampleProject {
 public:
     SampleProject();
 
-    /// The text of the project once somebody has done something in a version of it.
-    /// @param text the version; an empty one for a project that is yet to be made.
-    std::string after(std::string const& text, Action const& action, Writing writing = Writing::Anew) const;
+    /// The text of a version of the project after a change.
+    /// @param text the version; empty for a project that does not exist yet.
+    std::string after(std::string const& text, Action const& action,
+                      Writing writing = Writing::Rewriting) const;
 
-    /// The same, with nothing where the managers refuse the action.
+    /// The same; nothing if the managers refuse the action.
     std::optional<std::string> afterIfAllowed(std::string const& text, Action const& action) const;
 
 private:

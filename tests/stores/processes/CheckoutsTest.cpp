@@ -65,7 +65,7 @@ Batch valueOfMarked(std::u16string const& value) {
 /// The counts of all processes.
 struct Tally {
     std::atomic<bool> stop;
-    std::atomic<unsigned> looks;     ///< guards of readers
+    std::atomic<unsigned> checks;    ///< guards of readers
     std::atomic<unsigned> others;    ///< of them, those that differed from the one before
     std::atomic<unsigned> written;   ///< batches
     std::atomic<unsigned> refused;   ///< batches, with an error
@@ -100,7 +100,7 @@ Sight lookAt(TreeMetadataManager& store) {
     return sight;
 }
 
-/// The part that no complete version contained; empty when there is none.
+/// The part that no complete version contained; empty if there is none.
 std::string wrongWith(Sight const& sight) {
     if (sight.others != folders / 20) {
         return "files are missing that are in every version: " + std::to_string(sight.others);
@@ -194,9 +194,9 @@ protected:
         auto const before = othersSteps();
         comesTrue([&] { return othersSteps() != before; }, 5ms); // best after a change by another process
         if (lookAt(store) != sight) {
-            throw std::runtime_error("what a guard shows has changed under it");
+            throw std::runtime_error("the state that a guard shows has changed");
         }
-        ++tally->looks;
+        ++tally->checks;
         return sight;
     }
 
@@ -295,9 +295,9 @@ TEST_F(Checkouts, withReadersAndWritersShowOnlyWholeVersions) {
     }
 
     EXPECT_STREQ("", tally->wrong.data());
-    std::cout << tally->looks << " looks of readers, one of them at " << tally->others << " changes; "
-              << tally->written << " batches, " << tally->refused << " refused; " << tally->gitDid
-              << " commands of git, " << tally->gitFailed << " failed\n";
+    std::cout << tally->checks << " checks of readers for changes, of which " << tally->others
+              << " found some; " << tally->written << " batches, " << tally->refused << " refused; "
+              << tally->gitDid << " commands of git, " << tally->gitFailed << " failed\n";
     EXPECT_GT(tally->others, 0U);
     EXPECT_GT(tally->written, 0U);
     EXPECT_GT(tally->gitDid, tally->gitFailed);

@@ -23,7 +23,7 @@ Slots Slots::seen() const {
     Slots result = *this;
     for (std::size_t slot = 0; slot < count; ++slot) {
         if (values[slot] == nothing && exists(slot)) {
-            result.values[slot] = made;
+            result.values[slot] = created;
         }
     }
     return result;
@@ -44,7 +44,7 @@ std::optional<Slots> Operation::applyTo(Slots const& before) const {
             auto const from = after.values.begin() + static_cast<std::ptrdiff_t>(slot);
             std::fill_n(from, slot % Slots::inGroup == 0 ? Slots::inGroup : 1, Slots::nothing);
         } else if (!before.exists(slot)) {
-            after.values[slot] = Slots::made;
+            after.values[slot] = Slots::created;
         }
     }
     return after;

@@ -15,13 +15,13 @@ struct Slots {
     static constexpr std::size_t inGroup = 3; ///< the first slot of a group is above the other two
 
     static constexpr std::uint32_t nothing = 0;
-    static constexpr std::uint32_t made = 1; ///< created without a node; any higher number is a node's value
+    static constexpr std::uint32_t created = 1; ///< created without a node; values of nodes are higher
 
     std::array<std::uint32_t, count> values;
 
     friend bool operator==(Slots const&, Slots const&) = default;
 
-    /// True when an address or one below it has a value.
+    /// True if an address or one below it has a value.
     bool exists(std::size_t slot) const;
 
     /// The values as a reader sees them: an address without a node and with values below it appears as
@@ -31,7 +31,7 @@ struct Slots {
 
 /// One operation of a process on a store, with the values that the process saw.
 struct Operation {
-    enum class Kind : std::uint8_t { Read, Set, Remove, Make };
+    enum class Kind : std::uint8_t { Read, Set, Remove, Create };
 
     Kind kind;
     bool hasSeen;       ///< also for a write, if it read under the same guard before
@@ -39,7 +39,7 @@ struct Operation {
     std::uint32_t value;
     Slots seen;
 
-    /// The values after it; nothing when it saw other values than those before.
+    /// The values after it; nothing if it saw other values than those before.
     std::optional<Slots> applyTo(Slots const& before) const;
 };
 
@@ -59,7 +59,7 @@ public:
     /// A process begins an operation. The values that a read sees must already be known.
     void begin(std::size_t lane, Operation const& operation);
 
-    /// @return false when the history so far is not linearizable.
+    /// @return false if the history so far is not linearizable.
     bool end(std::size_t lane);
 
     /// A process died: its operation has taken effect or not.

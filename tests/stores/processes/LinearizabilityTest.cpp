@@ -21,7 +21,7 @@ protected:
 
     static Operation remove(std::uint16_t mask) { return {Kind::Remove, false, mask, 0, {}}; }
 
-    static Operation make(std::uint16_t mask) { return {Kind::Make, false, mask, 0, {}}; }
+    static Operation create(std::uint16_t mask) { return {Kind::Create, false, mask, 0, {}}; }
 
     /// A read that finds these values at a, a/x and b, and nothing elsewhere.
     static Operation read(std::uint32_t atA, std::uint32_t atAx, std::uint32_t atB) {
@@ -48,15 +48,15 @@ TEST_F(LinearizabilityCheck, oneProcessIsLinearizable) {
     EXPECT_TRUE(does(0, set(ax, 8)));
     EXPECT_TRUE(does(0, remove(a)));
     EXPECT_TRUE(does(0, read(0, 0, 7)));
-    EXPECT_TRUE(does(0, make(a | b)));
-    EXPECT_TRUE(does(0, read(Slots::made, 0, 7)));
+    EXPECT_TRUE(does(0, create(a | b)));
+    EXPECT_TRUE(does(0, read(Slots::created, 0, 7)));
     EXPECT_EQ(1U, order.countPossible());
 }
 
 TEST_F(LinearizabilityCheck, anAddressWithoutValuesBelowExistsOnlyIfItWasCreated) {
     EXPECT_TRUE(does(0, set(ax, 7)));
-    EXPECT_TRUE(does(0, read(Slots::made, 7, 0)));
-    EXPECT_TRUE(does(0, make(a)));
+    EXPECT_TRUE(does(0, read(Slots::created, 7, 0)));
+    EXPECT_TRUE(does(0, create(a)));
     EXPECT_TRUE(does(0, remove(ax)));
     EXPECT_TRUE(does(0, read(0, 0, 0)));
 }
@@ -134,7 +134,7 @@ TEST_F(LinearizabilityCheck, theWriteOfADeadProcessTookEffectOrNot) {
         order.die(0);
         EXPECT_EQ(2U, order.countPossible());
         EXPECT_TRUE(does(1, read(seen, 0, seen)));
-        EXPECT_FALSE(does(2, read(7 - seen, 0, 7 - seen))) << "it can't come or go any more";
+        EXPECT_FALSE(does(2, read(7 - seen, 0, 7 - seen))) << "it can no longer take effect or be undone";
     }
 }
 

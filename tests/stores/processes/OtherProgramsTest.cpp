@@ -26,7 +26,7 @@ namespace {
 using namespace std::chrono_literals;
 namespace filesystem = std::filesystem;
 
-/// A text that is older is not compared with what was read: its times show every change.
+/// An older text is not compared by content: its times show every change.
 constexpr auto twoTicks = 20ms;
 
 std::vector<Address> differing(Content const& before, Content const& after) {

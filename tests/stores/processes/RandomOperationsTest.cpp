@@ -28,7 +28,7 @@ using Kind = Operation::Kind;
 /// One operation of one process, with the moments between which it took place.
 struct Record {
     std::uint64_t begin;
-    std::uint64_t end;  ///< 0 as long as it goes on
+    std::uint64_t end;  ///< 0 until it ends
     std::uint64_t died; ///< when its process was known to be dead; 0 when the operation ended
     Operation operation;
 };
@@ -62,7 +62,7 @@ std::uint32_t valueAt(TreeMetadataManager& store, std::size_t slot) {
     auto const address = addressOfSlot(slot);
     auto const node = store.getNode(address);
     if (!node) {
-        return store.pathExists(address) ? Slots::made : Slots::nothing;
+        return store.pathExists(address) ? Slots::created : Slots::nothing;
     }
     auto const text = node->get(u"V");
     return static_cast<std::uint32_t>(std::stoul(std::string(text.begin(), text.end())));
@@ -79,7 +79,7 @@ Slots readSlots(TreeMetadataManager& store, std::mt19937& random) {
     }
     for (auto const slot : order) {
         if (valueAt(store, slot) != seen.values[slot]) {
-            throw std::runtime_error("what a guard shows has changed under it");
+            throw std::runtime_error("the state that a guard shows has changed");
         }
     }
     return seen;
@@ -140,7 +140,7 @@ private:
         auto const choice = below(10);
         auto const mask = static_cast<std::uint16_t>(
             (1U << below(Slots::count)) | (1U << below(Slots::count)) | (1U << below(Slots::count)));
-        auto const kind = choice < 7 ? Kind::Set : choice < 9 ? Kind::Remove : Kind::Make;
+        auto const kind = choice < 7 ? Kind::Set : choice < 9 ? Kind::Remove : Kind::Create;
         bool const readsFirst = below(4) > 0;
         // Set only after the read: a process that dies during the read has seen nothing.
         auto& record = begin({kind, false, mask, ++history_.values, {}});
@@ -315,7 +315,7 @@ protected:
     TemporaryFolder root;
     std::uint64_t const seed = testSeed();
     std::mt19937 random{static_cast<std::mt19937::result_type>(seed)};
-    std::uint32_t lastValue = Slots::made;
+    std::uint32_t lastValue = Slots::created;
     std::uint64_t operations = 0;
     std::uint64_t deaths = 0;
 };

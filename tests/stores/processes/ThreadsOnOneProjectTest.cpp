@@ -39,13 +39,13 @@ protected:
     static constexpr int filesOfEach = 12;
     static constexpr int sessionsOfTheirOwn = 3;
 
-    Path fileOf(std::u16string const& who, int number) const {
-        return folder_.path(who + static_cast<char16_t>(u'a' + number));
+    Path fileOf(std::u16string const& prefix, int number) const {
+        return folder_.path(prefix + static_cast<char16_t>(u'a' + number));
     }
 
-    void addFiles(Session& session, std::u16string const& who) const {
+    void addFiles(Session& session, std::u16string const& prefix) const {
         for (int number = 0; number < filesOfEach; ++number) {
-            session.project().getFileManager().add({fileOf(who, number)});
+            session.project().getFileManager().add({fileOf(prefix, number)});
         }
     }
 
@@ -78,9 +78,9 @@ protected:
 };
 
 TEST_F(ThreadsOnOneProject, loseNothingAndSeeEveryEvent) {
-    for (auto const& who : {std::u16string(u"shared "), nameOf(0), nameOf(1), nameOf(2)}) {
+    for (auto const& prefix : {std::u16string(u"shared "), nameOf(0), nameOf(1), nameOf(2)}) {
         for (int number = 0; number < filesOfEach; ++number) {
-            folder_.file(who + static_cast<char16_t>(u'a' + number));
+            folder_.file(prefix + static_cast<char16_t>(u'a' + number));
         }
     }
     session_.project().setDescription(u"Pump");
@@ -118,9 +118,9 @@ TEST_F(ThreadsOnOneProject, loseNothingAndSeeEveryEvent) {
     session_.refresh();
 
     auto fresh = Session::open(folder_.root(), withoutGit_);
-    for (auto const& who : {std::u16string(u"shared "), nameOf(0), nameOf(1), nameOf(2)}) {
+    for (auto const& prefix : {std::u16string(u"shared "), nameOf(0), nameOf(1), nameOf(2)}) {
         for (int number = 0; number < filesOfEach; ++number) {
-            auto const file = fileOf(who, number);
+            auto const file = fileOf(prefix, number);
             EXPECT_TRUE(fresh.project().getFileManager().isFileInProject(file));
             EXPECT_TRUE(reported.contains(file));
         }

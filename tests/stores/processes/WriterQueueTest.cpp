@@ -36,7 +36,7 @@ using stores::Disk;
 constexpr std::size_t writerCount = 8;
 
 /// From now on, every fcntl for open file description locks fails in this process, as on a file system
-/// without them. @return false when the system cannot filter calls.
+/// without them. @return false if the system cannot filter calls.
 bool refuseLocksOfOpenFiles() {
     std::array<sock_filter, 6> program{{BPF_STMT(BPF_LD | BPF_W | BPF_ABS, offsetof(seccomp_data, nr)),
                                         BPF_JUMP(BPF_JMP | BPF_JEQ | BPF_K, SYS_fcntl, 0, 3),
@@ -228,7 +228,7 @@ TEST_F(WriterQueue, aWriterThatDoesNotWaitDoesNotOvertakeThoseThatDo) {
     EXPECT_FALSE(openDisk()->lock(0ms));
     ::kill(waiting->id(), SIGCONT);
     EXPECT_EQ("mine", waiting->hear());
-    EXPECT_EQ(0, placesTaken()) << "who has the lock needs no place";
+    EXPECT_EQ(0, placesTaken()) << "the lock holder needs no place";
 }
 
 TEST_F(WriterQueue, aForkedChildDoesNotKeepThePlaceOfADeadParent) {
@@ -374,10 +374,10 @@ TEST_F(WriterQueue, inACrowdAWaitIsAsLongAsTheQueue) {
         all.insert(all.end(), waits.begin(), waits.end());
     }
     std::sort(all.begin(), all.end());
-    std::cout << "Writes of others before one's turn, of " << all.size() << " writes in " << seconds
-              << " s by " << writerCount << " processes: median " << quantile(all, 0.5) << ", 90 % "
-              << quantile(all, 0.9) << ", 99 % " << quantile(all, 0.99) << ", 99.9 % " << quantile(all, 0.999)
-              << ", all " << all.back() << "; weighted mean " << weightedMean(all) << "\n";
+    std::cout << "Writes of others during a wait, of " << all.size() << " writes in " << seconds << " s by "
+              << writerCount << " processes: median " << quantile(all, 0.5) << ", 90 % " << quantile(all, 0.9)
+              << ", 99 % " << quantile(all, 0.99) << ", 99.9 % " << quantile(all, 0.999) << ", all "
+              << all.back() << "; weighted mean " << weightedMean(all) << "\n";
     // Each other writer is first once. More can overtake only between a request and its place in the queue.
     // This time is short, and few waits are affected, however busy the machine is.
     EXPECT_LE(weightedMean(all), 2 * (writerCount - 1));

@@ -19,20 +19,20 @@ class Model {
 public:
     void apply(Change const& change) {
         if (change.kind == Change::Kind::Remove) {
-            std::erase_if(standing_, [&](auto const& entry) { return entry.first.isWithin(change.address); });
+            std::erase_if(nodes_, [&](auto const& entry) { return entry.first.isWithin(change.address); });
         } else {
-            standing_[change.address] = change.node;
+            nodes_[change.address] = change.node;
         }
     }
 
     bool exists(Address const& address) const {
-        return std::any_of(standing_.begin(), standing_.end(),
+        return std::any_of(nodes_.begin(), nodes_.end(),
                            [&](auto const& entry) { return entry.first.isWithin(address); });
     }
 
     Content content() const {
         Content content;
-        for (auto const& [address, node] : standing_) {
+        for (auto const& [address, node] : nodes_) {
             content.emplace(address, described(node));
         }
         return content;
@@ -40,7 +40,7 @@ public:
 
     std::string text() const {
         std::string text = std::string(firstLine) + "\n";
-        for (auto const& [address, node] : standing_) {
+        for (auto const& [address, node] : nodes_) {
             appendNodeLine(text, AddressText(address), node);
             text += '\n';
         }
@@ -49,11 +49,11 @@ public:
 
     /// An address that exists, is above one that exists, or is arbitrary.
     Address drawAddress() const {
-        if (standing_.empty() || *rc::gen::inRange(0, 3) == 0) {
+        if (nodes_.empty() || *rc::gen::inRange(0, 3) == 0) {
             return *anyAddress();
         }
-        auto const at = *rc::gen::inRange<std::size_t>(0, standing_.size());
-        Address address = std::next(standing_.begin(), static_cast<std::ptrdiff_t>(at))->first;
+        auto const at = *rc::gen::inRange<std::size_t>(0, nodes_.size());
+        Address address = std::next(nodes_.begin(), static_cast<std::ptrdiff_t>(at))->first;
         for (int up = *rc::gen::inRange(0, 3); up > 0 && address.depth() > 1; --up) {
             address = address.parent();
         }
@@ -85,7 +85,7 @@ public:
     }
 
 private:
-    std::map<Address, Node> standing_;
+    std::map<Address, Node> nodes_;
 };
 
 std::string bytesOf(ProjectText const& text, std::string const& tail) {

@@ -227,7 +227,7 @@ TEST(ProjectText, aCreatedAddressStaysUntilItIsRemovedOrGetsANode) {
     Address const head = addressOf({u"References", u"Root"});
     Address const below = head.child({u"Reference", u"1"});
     ProjectText text = ProjectText::empty().rewrittenWith({make(head), set(below)});
-    EXPECT_EQ(contentOf(text.rewrittenWith({remove(below)})), (Content{{head, "made"}}));
+    EXPECT_EQ(contentOf(text.rewrittenWith({remove(below)})), (Content{{head, "created"}}));
     EXPECT_EQ(contentOf(text.rewrittenWith({set(head)})), (Content{{head, "Info()"}, {below, "Info()"}}));
     EXPECT_TRUE(contentOf(text.rewrittenWith({set(head), remove(head)})).empty());
 }

@@ -81,7 +81,7 @@ std::vector<char> replacementsFor(char byte) {
     return others;
 }
 
-/// Reads arbitrary bytes. @return nothing when they are refused or incomplete.
+/// Reads arbitrary bytes. @return nothing if they are refused or incomplete.
 std::optional<ProjectText> tryRead(std::string bytes) {
     try {
         return ProjectText::read(std::move(bytes), "f");
@@ -130,7 +130,7 @@ TEST(TextDamage, anAlteredByteOfABodyIsDetectedOrChangesOnlyItsLine) {
             }
         }
     }
-    EXPECT_GT(unseen, 0U) << "a body has no checksum; this test is to show what that costs";
+    EXPECT_GT(unseen, 0U) << "a body has no checksum; this test shows the cost of that";
 }
 
 TEST(TextDamage, everyOneOfManyDamagedLinesIsReported) {

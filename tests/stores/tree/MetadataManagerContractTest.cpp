@@ -244,7 +244,7 @@ TEST_P(MetadataManagerContract, createPathsCreatesItsAddressesInAnyOrder) {
         tree.removeNodes(below);
 
         EXPECT_FALSE(tree.pathExists(ab));
-        EXPECT_TRUE(tree.pathExists(a)) << "it was created itself, so it stays when nothing is below it";
+        EXPECT_TRUE(tree.pathExists(a)) << "it was created, so it stays when nothing is below it";
         Paths all{a};
         tree.removeNodes(all);
     }

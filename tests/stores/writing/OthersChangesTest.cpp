@@ -15,7 +15,7 @@ using stores::TreeMetadataManager;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// A store and what others change in it.
+/// A store, and the changes of other processes to it.
 class OthersChanges : public TextStore {
 protected:
     void SetUp() override {

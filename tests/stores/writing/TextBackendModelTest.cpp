@@ -23,9 +23,9 @@ using stores::TreeMetadataManager;
 using stores::samples::described;
 
 /// Fails the case, inside of rapidcheck and outside.
-void require(bool holds, char const* what) {
+void require(bool holds, char const* law) {
     if (!holds) {
-        throw std::logic_error(what);
+        throw std::logic_error(law);
     }
 }
 
@@ -41,7 +41,7 @@ std::string firstDifference(Content const& wanted, Content const& found) {
     return "nothing differs";
 }
 
-/// What a store has to hold, as plainly as it can be said.
+/// The expected content of a store, as a plain map.
 class Model {
 public:
     void set(std::map<Address, Node> const& nodes) {
@@ -57,11 +57,11 @@ public:
         });
     }
 
-    void make(std::vector<Address> const& addresses) {
+    void create(std::vector<Address> const& addresses) {
         auto after = content_;
         for (auto const& address : addresses) {
             if (!exists(address)) {
-                after.emplace(address, "made");
+                after.emplace(address, "created");
             }
         }
         content_ = std::move(after);
@@ -78,7 +78,7 @@ private:
     Content content_;
 };
 
-/// Everything that a tree answers, by the questions that managers ask.
+/// Collects all answers of a tree to the questions that managers ask.
 void ask(TreeMetadataManager& tree, Address const& address, Content& content) {
     for (auto const& child : tree.getChildNodes(address)) {
         require(tree.pathExists(child), "a child does not exist");
@@ -89,19 +89,19 @@ void ask(TreeMetadataManager& tree, Address const& address, Content& content) {
         if (node) {
             content.emplace(child, described(*node));
         } else if (content.size() == before) {
-            content.emplace(child, "made"); // nothing but having been made keeps it
+            content.emplace(child, "created"); // it has no node and nothing below it
         }
     }
 }
 
-/// What ask gives for a content: of addresses that were made, those below which there is something don't
-/// show.
+/// The content as ask collects it: an address that was created without a node is not in it if there is
+/// something below.
 Content visible(Content const& content) {
     Content result;
     for (auto entry = content.begin(); entry != content.end(); ++entry) {
         auto const next = std::next(entry);
         bool const isAbove = next != content.end() && next->first.isWithin(entry->first);
-        if (entry->second != "made" || !isAbove) {
+        if (entry->second != "created" || !isAbove) {
             result.insert(*entry);
         }
     }
@@ -109,19 +109,19 @@ Content visible(Content const& content) {
 }
 
 struct Step {
-    enum class Kind { Set, Remove, Make, Reopen, Tidy, Look, PowerCut };
+    enum class Kind { Set, Remove, Create, Reopen, Tidy, Check, PowerCut };
 
-    Kind kind;
-    std::size_t process; ///< which of the processes does it
-    std::map<Address, Node> nodes;
-    std::vector<Address> addresses;
-    CrashingVolume::InjectedFault fault;
-    std::size_t callsBefore; ///< the fault
+    Kind kind = Kind::Check;
+    std::size_t process = 0; ///< the process that takes it
+    std::map<Address, Node> nodes{};
+    std::vector<Address> addresses{};
+    CrashingVolume::InjectedFault fault = CrashingVolume::InjectedFault::None;
+    std::size_t callsBefore = 0; ///< the calls before the fault
 };
 
 void showValue(Step const& step, std::ostream& out) {
-    constexpr char const* kinds[] = {"Set", "Remove", "Make", "Reopen", "Tidy", "Look", "PowerCut"};
-    constexpr char const* faults[] = {"", "fails", "fails for good", "dies"};
+    constexpr char const* kinds[] = {"Set", "Remove", "Create", "Reopen", "Tidy", "Check", "PowerCut"};
+    constexpr char const* faults[] = {"", "fails", "fails permanently", "dies"};
     out << kinds[static_cast<int>(step.kind)] << " by " << step.process;
     if (step.fault != CrashingVolume::InjectedFault::None) {
         out << ", " << faults[static_cast<int>(step.fault)] << " after " << step.callsBefore << " calls";
@@ -144,10 +144,10 @@ rc::Gen<Step> anyStep() {
     return rc::gen::build<Step>(
         rc::gen::set(&Step::kind, rc::gen::weightedElement<Kind>({{10, Kind::Set},
                                                                   {4, Kind::Remove},
-                                                                  {2, Kind::Make},
+                                                                  {2, Kind::Create},
                                                                   {1, Kind::Reopen},
                                                                   {1, Kind::Tidy},
-                                                                  {2, Kind::Look},
+                                                                  {2, Kind::Check},
                                                                   {1, Kind::PowerCut}})),
         rc::gen::set(&Step::process, rc::gen::inRange<std::size_t>(0, 2)), rc::gen::set(&Step::nodes, nodes),
         rc::gen::set(&Step::addresses, stores::samples::fewOf(3, stores::samples::anyAddress())),
@@ -158,8 +158,7 @@ rc::Gen<Step> anyStep() {
         rc::gen::set(&Step::callsBefore, rc::gen::inRange<std::size_t>(0, 25)));
 }
 
-/// True for the errors after which the outcome is unknown.
-/// Two processes on one project, and what the project has to hold.
+/// Two processes on one project, and the expected content of the project.
 class Processes {
 public:
     Processes(TextBackend::Options options, unsigned seed)
@@ -169,7 +168,7 @@ public:
     }
 
     void take(Step const& step) {
-        volume_->advance(3'000'000); // so that some steps share a tick and some don't
+        volume_->advance(3'000'000); // so that some steps share a tick and some do not
         volume_->plan(step.fault, step.callsBefore);
         Model after = model_;
         bool isDone = false;
@@ -193,15 +192,15 @@ public:
             cutPower(after);
         } else if (hasDied || isUnknown) {
             reopenDead(step.process);
-            settle(after);
+            acceptOutcome(after);
         }
         check(step.process);
-        // A power cut can take the torn tail off an old text that lies beside the new one, and nobody knows
-        // it then.
+        // A power cut can remove the torn tail of an old text beside the new one. The store cannot detect
+        // that, and sets the old text aside.
         require(hadPowerCut_ || volume_->namesLike("displaced-").empty(), "something was set aside");
     }
 
-    /// Both processes close, and what is left is read and written by a third.
+    /// Both processes close, and a third one reads and writes the project.
     void finish() {
         check(0);
         check(1);
@@ -209,7 +208,7 @@ public:
         trees_[1].reset();
         reopen(0);
         check(0);
-        backends_[0]->tidy(); // a writer, so that what dead ones left goes
+        backends_[0]->tidy(); // a writer, which deletes the leftovers of dead ones
         check(0);
         for (auto const& name : volume_->names()) {
             require(name == ".gitattributes" || name == ".gitignore" || name == "project.jsonl" ||
@@ -220,7 +219,7 @@ public:
 
     CrashingVolume& disk() { return *volume_; }
 
-    /// How often it went each way, so that a test of nothing shows.
+    /// The number of appends, so that a run without any is detected.
     std::size_t appends() const { return volume_->count("append project.jsonl"); }
 
     std::size_t rewrites() const { return volume_->count("exchange swapping project.jsonl"); }
@@ -251,8 +250,8 @@ private:
             after.remove(step.addresses);
             tree.removeNodes(addresses);
             break;
-        case Step::Kind::Make:
-            after.make(step.addresses);
+        case Step::Kind::Create:
+            after.create(step.addresses);
             tree.createPaths(addresses);
             break;
         case Step::Kind::Reopen:
@@ -261,7 +260,7 @@ private:
         case Step::Kind::Tidy:
             backends_.at(step.process)->tidy();
             break;
-        case Step::Kind::Look:
+        case Step::Kind::Check:
             static_cast<void>(tree.pathExists(fileAddress(u"a")));
             break;
         case Step::Kind::PowerCut:
@@ -269,7 +268,7 @@ private:
         }
     }
 
-    /// The process is gone: nothing that it does while its objects are destroyed may reach the disk.
+    /// The process has died: the destructors of its objects must not change the disk.
     void reopenDead(std::size_t process) {
         volume_->plan(CrashingVolume::InjectedFault::Dies, 0);
         trees_.at(process).reset();
@@ -277,13 +276,13 @@ private:
         reopen(process);
     }
 
-    /// After the death of a process its batch is in the project or not, for all to see. It is certain only
-    /// with the next batch that is kept: until then a power cut may bring back the other.
-    void settle(Model const& after) {
+    /// After the death of a process its batch is in the project or not, and all processes see the same. Until
+    /// the next committed batch, a power cut may restore the other state.
+    void acceptOutcome(Model const& after) {
         auto const found = visibleTo(0);
         bool const isBefore = found == visible(model_.content());
         require(isBefore || found == visible(after.content()),
-                "the project is neither as before the step nor as after it");
+                "the project equals neither the state before the step nor the one after it");
         notDurable_.push_back(isBefore ? after : model_);
         if (!isBefore) {
             model_ = after;
@@ -302,13 +301,13 @@ private:
         auto const match = std::find_if(possible.begin(), possible.end(), [&](Model const& model) {
             return found == visible(model.content());
         });
-        require(match != possible.end(), "the power cut took what was kept, or left a part of something");
+        require(match != possible.end(), "the power cut lost a committed batch, or left a part of one");
         model_ = *match;
     }
 
     Content visibleTo(std::size_t process) {
         auto& tree = *trees_.at(process);
-        auto const guard = tree.acquireReadLock(); // one look for all the questions
+        auto const guard = tree.acquireReadLock(); // one check for changes for all questions
         Content content;
         ask(tree, Address::root(), content);
         return content;
@@ -318,7 +317,7 @@ private:
         auto const content = visibleTo(process);
         auto const wanted = visible(model_.content());
         if (content != wanted) {
-            throw std::logic_error("the project is not as the model: " + firstDifference(wanted, content));
+            throw std::logic_error("the project differs from the model: " + firstDifference(wanted, content));
         }
     }
 
@@ -336,10 +335,12 @@ TEST(TextBackendModel, afterAnyHistoryOfTwoProcessesAProjectEqualsAPlainMap) {
     std::size_t rewrites = 0;
 
     auto const holds = [&] {
-        // On both sides of each limit: texts here have some hundred to some thousand bytes.
+        // On both sides of each limit: texts here have some hundreds to some thousands of bytes.
         auto const alwaysRewritten = *rc::gen::element<std::size_t>(0, 400, 1'500, 1'000'000);
         auto const bodyToTail = *rc::gen::element<std::size_t>(1, 2, 16);
-        Processes processes({std::chrono::milliseconds(20), alwaysRewritten, bodyToTail},
+        Processes processes({.patience = std::chrono::milliseconds(20),
+                             .alwaysRewritten = alwaysRewritten,
+                             .bodyToTail = bodyToTail},
                             *rc::gen::arbitrary<unsigned>());
         processes.disk().canExchange = *rc::gen::arbitrary<bool>();
         processes.disk().keepsStamps = *rc::gen::arbitrary<bool>();
@@ -360,8 +361,8 @@ TEST(TextBackendModel, afterAnyHistoryOfTwoProcessesAProjectEqualsAPlainMap) {
     EXPECT_GT(rewrites, 100U);
 }
 
-/// An append whose sync fails for good, a rewrite over it, and a power cut that brings the old text back
-/// without the append: it must not be taken for a text that somebody else put in place.
+/// An append whose sync fails permanently, a rewrite over it, and a power cut that restores the old text
+/// without the append: it must not be taken for a text of another program.
 TEST(TextBackendModel, anOldTextTornByAPowerCutDoesNotReplaceTheNewOne) {
     using Kind = Step::Kind;
     using InjectedFault = CrashingVolume::InjectedFault;
@@ -369,16 +370,17 @@ TEST(TextBackendModel, anOldTextTornByAPowerCutDoesNotReplaceTheNewOne) {
     auto const below = head.child(metadata::PathElement(u"DIR_SIGNIFIER", u"1"));
     auto const other = Address::root().child(metadata::PathElement(u"LabelData", u""));
     for (unsigned seed = 0; seed < 100; ++seed) {
-        Processes processes({std::chrono::milliseconds(20), 0, 1}, seed);
-        processes.take({Kind::Set,
-                        1,
-                        {{below, stores::plainNode()}, {other, stores::plainNode()}},
-                        {},
-                        InjectedFault::None,
-                        0});
-        processes.take({Kind::Remove, 0, {}, {head}, InjectedFault::FailsForGood, 10});
-        processes.take({Kind::Set, 0, {{head, stores::plainNode()}}, {}, InjectedFault::None, 0});
-        processes.take({Kind::PowerCut, 0, {}, {}, InjectedFault::None, 0});
+        Processes processes(
+            {.patience = std::chrono::milliseconds(20), .alwaysRewritten = 0, .bodyToTail = 1}, seed);
+        processes.take({.kind = Kind::Set,
+                        .process = 1,
+                        .nodes = {{below, stores::plainNode()}, {other, stores::plainNode()}}});
+        processes.take({.kind = Kind::Remove,
+                        .addresses = {head},
+                        .fault = InjectedFault::FailsForGood,
+                        .callsBefore = 10});
+        processes.take({.kind = Kind::Set, .nodes = {{head, stores::plainNode()}}});
+        processes.take({.kind = Kind::PowerCut});
         processes.finish();
     }
 }
@@ -388,7 +390,7 @@ TEST(TextBackendModel, theSameHoldsForTextsWithTheRealLimits) {
     std::size_t rewrites = 0;
     for (unsigned seed = 1; seed <= 2; ++seed) {
         Processes processes({}, seed);
-        Step many{Step::Kind::Set, 0, {}, {}, CrashingVolume::InjectedFault::None, 0};
+        Step many{.kind = Step::Kind::Set};
         auto const folder = std::u16string(200, u'x'); // long, so that few nodes make a long text
         for (auto const& path : manyFiles(1'400, folder)) {
             many.nodes.emplace(fileAddress(path), stores::plainNode());

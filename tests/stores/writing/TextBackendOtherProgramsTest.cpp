@@ -318,7 +318,7 @@ TEST_F(TextBackendOtherPrograms, aTextRestoredForADeadWriterSurvivesAPowerCut) {
         prepare({u"a"});
         once(volume->beforeCall, "exchange swapping project.jsonl", [&] {
             volume->replaceFile("project.jsonl", theirs);
-            volume->plan(CrashingVolume::InjectedFault::Dies, 1); // before it can be put back
+            volume->plan(CrashingVolume::InjectedFault::Dies, 1); // before the text is restored
         });
         EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
         volume->beforeCall = nullptr;
@@ -379,7 +379,7 @@ TEST_F(TextBackendOtherPrograms, aTextOfAnotherProgramIsSetAsideIfItsPlaceIsTake
     prepare({u"a"});
     once(volume->beforeCall, "exchange swapping project.jsonl", [&] {
         volume->replaceFile("project.jsonl", theirs);
-        volume->plan(CrashingVolume::InjectedFault::Dies, 1); // before it can be put back
+        volume->plan(CrashingVolume::InjectedFault::Dies, 1); // before the text is restored
     });
     EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
     volume->beforeCall = nullptr;
@@ -436,7 +436,7 @@ TEST_F(TextBackendOtherPrograms, anotherWriterIsWaitedForAndThenNamed) {
     EXPECT_EQ("/project/.projectdata", error.getFile());
     EXPECT_EQ(StoreError::Kind::Busy, error.kind());
     EXPECT_EQ("is locked by process 4711 (another)", error.getProblem());
-    EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers wait for nobody";
+    EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers do not wait";
 }
 
 TEST_F(TextBackendOtherPrograms, aFailedGuardReleasesTheLock) {

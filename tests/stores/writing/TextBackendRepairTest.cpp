@@ -192,34 +192,34 @@ TEST_F(TextBackendRepair, theDamagedLinesAreDurableBeforeTheTextOmitsThem) {
 }
 
 TEST_F(TextBackendRepair, resolvingReplacesTheTextWithMarkers) {
-    auto const settled = textOf(addFiles({u"a", u"b"}));
+    auto const resolved = textOf(addFiles({u"a", u"b"}));
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
     prepareText(conflict);
     auto const backend = open();
 
-    backend->resolve(settled);
+    backend->resolve(resolved);
 
-    EXPECT_EQ(text(), settled);
+    EXPECT_EQ(text(), resolved);
     EXPECT_EQ(contentOf(*backend), contentAfter({addFiles({u"a", u"b"})}));
     commit(*backend, addFiles({u"e"}));
 }
 
 TEST_F(TextBackendRepair, aFailedResolveRestoresTheMarkers) {
-    auto const settled = textOf(addFiles({u"a", u"b"}));
+    auto const resolved = textOf(addFiles({u"a", u"b"}));
     auto conflict = textOf(addFiles({u"a", u"d"}));
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
     prepareText(conflict);
     auto const backend = open();
     failOnce("syncFolder");
 
-    EXPECT_EQ("Input/output error", errorOf([&] { backend->resolve(settled); }).getProblem());
+    EXPECT_EQ("Input/output error", errorOf([&] { backend->resolve(resolved); }).getProblem());
 
     EXPECT_EQ(conflict, text());
     EXPECT_EQ(contentAfter({addFiles({u"a", u"b", u"c", u"d"})}), contentOf(*backend));
-    EXPECT_THROW(commit(*backend, addFiles({u"e"})), StoreError) << "it is still to be settled";
-    backend->resolve(settled);
-    EXPECT_EQ(settled, text());
+    EXPECT_THROW(commit(*backend, addFiles({u"e"})), StoreError) << "the conflict is not resolved yet";
+    backend->resolve(resolved);
+    EXPECT_EQ(resolved, text());
 }
 
 TEST_F(TextBackendRepair, resolvingChangesNothingWithoutAConflict) {

@@ -9,7 +9,7 @@ namespace project::test {
 
 namespace {
 
-/// How a text is written anew, with the look before and after left out.
+/// The calls of a rewrite, without the checks before and after it.
 auto const rewrite = {"create temporary like project.jsonl", "sync",       "renameToFree temporary swapping",
                       "exchange swapping project.jsonl",     "syncFolder", "remove swapping"};
 
@@ -417,7 +417,7 @@ TEST_F(TextBackendWriting, whenTheNewFileFailsTooTheOutcomeIsUnknownAndNothingIs
     writes();
     commit(*backend, addFiles({u"c"}));
     EXPECT_THAT(writes(), ElementsAreArray(rewrite))
-        << "what the system holds of the old file is not trusted";
+        << "the system's cached content of the old file is not trusted";
     EXPECT_EQ(1U, stored().count(fileAddress(u"c")));
 }
 

@@ -167,7 +167,7 @@ TEST_F(TextStoreOnDisk, aWriterThatWaitsTooLongNamesTheHolder) {
     EXPECT_EQ(folder().string(), error.getFile());
     EXPECT_EQ(StoreError::Kind::Busy, error.kind());
     EXPECT_THAT(error.getProblem(), StartsWith("is locked by process " + std::to_string(child.id()) + " ("));
-    EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers wait for nobody";
+    EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers do not wait";
     child.kill();
     commit(*backend, addFiles({u"b"}));
     EXPECT_EQ(contentAfter({addFiles({u"a", u"b"})}), contentOf(*open()));

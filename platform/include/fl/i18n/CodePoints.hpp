@@ -4,7 +4,7 @@
 #include <string>
 #include <string_view>
 
-/// UTF-8 and UTF-16, one code point at a time. Everything in the library that looks at encoded text uses
+/// UTF-8 and UTF-16, one code point at a time. All code in the library that decodes or encodes text uses
 /// these functions. None of them allocates, except appendUtf8, and none throws.
 namespace fl::i18n {
 

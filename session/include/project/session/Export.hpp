@@ -1,4 +1,4 @@
 #pragma once
 
-/// Marks what the shared library project::session shows to others.
+/// Marks the classes and functions that the shared library project::session exports.
 #define PROJECT_SESSION_EXPORT __attribute__((visibility("default")))

@@ -1,4 +1,4 @@
 #pragma once
 
-/// Marks what the shared library project::stores shows to others.
+/// Marks the classes and functions that the shared library project::stores exports.
 #define PROJECT_STORES_EXPORT __attribute__((visibility("default")))
