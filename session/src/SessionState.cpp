@@ -64,8 +64,10 @@ std::shared_ptr<TreeMetadataManager> Session::State::makeStore(Options options) 
 }
 
 std::unique_ptr<DefinitionStager> Session::State::makeStager() {
-    return adapter ? std::make_unique<DefinitionStager>(*store, *adapter, TextBackend::textPath(root))
-                   : nullptr;
+    if (!adapter) {
+        return nullptr;
+    }
+    return std::make_unique<DefinitionStager>(*store, *adapter, TextBackend::textPath(root));
 }
 
 std::unique_ptr<ProjectManager> Session::State::makeManagers() {
