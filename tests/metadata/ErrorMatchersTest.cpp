@@ -59,7 +59,7 @@ TEST(ErrorMatchers, describeAnExceptionThatIsNotAnErrorOfTheLibrary) {
     EXPECT_FALSE(exception);
     EXPECT_FALSE(number);
     EXPECT_THAT(exception.message(), HasSubstr("a std::runtime_error: text was thrown"));
-    EXPECT_THAT(number.message(), HasSubstr("no std::exception"));
+    EXPECT_THAT(number.message(), HasSubstr("not a std::exception"));
 }
 
 TEST(ErrorMatchers, distinguishNestedErrorsFromPlainOnes) {
