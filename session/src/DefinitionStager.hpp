@@ -14,8 +14,8 @@ using fl::filesystem::Path;
 /// removed; the text merely changes. A commit must not contain a file without its entry in the text.
 class DefinitionStager {
 public:
-    /// @param store the store whose writes make staging necessary. @param adapter borrowed, as the store
-    /// is.
+    /// @param store the store whose writes make staging necessary; borrowed.
+    /// @param adapter borrowed.
     /// @param text the file to stage.
     DefinitionStager(metadata::MetadataManager& store, cmlink::CMAdapter& adapter, Path text);
 

@@ -3,9 +3,8 @@
 /// The types, locations, keys and fixed values of a project's tree, by subject. docs/tree.md shows the tree
 /// that they form.
 ///
-/// A step of an address is a type and a location. A constant in `...Type` is a step's or a node's type, one
-/// in
-/// `...Location` is a step's location, and one in `...Key` is a key of a node. Every constant converts to
+/// A step of an address is a type and a location. A constant `...Type` is the type of a step or a node,
+/// `...Location` the location of a step, and `...Key` a key of a node. Every constant converts to
 /// std::u16string and to std::u16string_view. Several subjects use the same word ("Name", "Root", "File") for
 /// different things, so each has a constant of its own: the position in the tree says which one applies.
 namespace project::metadata::schema {

@@ -14,9 +14,8 @@ namespace projectctl {
 class ShownPaths {
 public:
     /// Paths in the form that the caller of the tool chose.
-    /// @param root of the project in which the current folder lies. @throws Failure if the current folder
-    /// does
-    ///        not exist any more.
+    /// @param root of the project that contains the current folder.
+    /// @throws Failure if the current folder does not exist any more.
     explicit ShownPaths(fl::filesystem::Path root);
 
     /// Paths relative to the root, whatever the caller of the tool chose.

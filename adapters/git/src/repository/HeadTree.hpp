@@ -13,7 +13,7 @@ class HeadTree {
 public:
     explicit HeadTree(git_repository* repository) : repository_(repository) {}
 
-    /// Reads which commit is the last one. Before the first commit there are no files.
+    /// Reads the last commit. It has no files if nothing was committed yet.
     /// @throws GitError if it cannot be read.
     void refresh();
 
