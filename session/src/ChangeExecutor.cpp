@@ -30,16 +30,18 @@ ChangeExecutor::ChangeExecutor(metadata::MetadataManager& store, DefinitionStage
 
 void ChangeExecutor::run(std::function<void()> const& operation, std::vector<Path> const& added) {
     std::vector<Event> events;
-    std::exception_ptr stagingError;
+    std::exception_ptr changeError;
     {
         auto const guard = store_.acquireWriteLock();
-        operation();
+        changeError = errorOf([&] {
+            operation();
+            stage(added);
+        });
         events = raised_.take();
-        stagingError = errorOf([&] { stage(added); });
     }
-    // The change is committed, so observers are called even if it could not be staged.
+    // Each event belongs to a write that is committed, so observers are called even after an error.
     auto const slotError = errorOf([&] { dispatch(events); });
-    if (auto const& error = stagingError ? stagingError : slotError) {
+    if (auto const& error = changeError ? changeError : slotError) {
         std::rethrow_exception(error);
     }
 }

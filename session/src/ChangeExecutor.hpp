@@ -21,7 +21,11 @@ class DefinitionStager;
 ///    which the event queue collects.
 /// 3. It stages the text, if the session stages each change.
 /// 4. It releases the guard and dispatches the events.
-/// 5. If staging failed, it throws the error.
+/// 5. If the operation or staging failed, it throws the error.
+///
+/// A manager raises an event after it has committed the write that the event reports. The events of an
+/// operation that throws therefore report writes that remain, and are dispatched too; an operation that
+/// throws before it writes has none. In both cases the queue is empty afterwards.
 ///
 /// The guard covers steps 2 and 3 because the store notifies its listeners of every write: without it, the
 /// write of another thread would stage, or remove from git's index, paths of an operation that has not
@@ -37,8 +41,8 @@ public:
 
     /// @param added the files that the operation adds to the project.
     /// @return the result of the operation.
-    /// @throws the operation's exception, before anything is staged or dispatched; else the error of
-    ///         staging; else the exception of a slot.
+    /// @throws the operation's exception, and then stages nothing: the next change stages the text; else
+    ///         the error of staging; else the exception of a slot.
     template <typename Operation>
     auto execute(Operation const& operation, std::vector<management::Path> const& added = {}) {
         if constexpr (std::is_void_v<decltype(operation())>) {
