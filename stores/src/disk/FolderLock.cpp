@@ -13,8 +13,8 @@
 #include <sys/stat.h>
 #include <sys/sysmacros.h>
 
+#include "disk/QueuePlace.hpp"
 #include "disk/SystemError.hpp"
-#include "disk/WriterQueue.hpp"
 
 namespace project::stores {
 

@@ -1,4 +1,4 @@
-#include "disk/WriterQueue.hpp"
+#include "disk/QueuePlace.hpp"
 
 #include <algorithm>
 #include <limits>
