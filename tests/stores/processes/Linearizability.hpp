@@ -34,10 +34,10 @@ struct Operation {
     enum class Kind : std::uint8_t { Read, Set, Remove, Create };
 
     Kind kind;
-    bool hasSeen;       ///< also for a write, if it read under the same guard before
-    std::uint16_t mask; ///< the slots that it writes, one bit each
-    std::uint32_t value;
-    Slots seen;
+    bool hasSeen = false;   ///< also for a write, if it read under the same guard before
+    std::uint16_t mask = 0; ///< the slots that it writes, one bit each
+    std::uint32_t value = 0;
+    Slots seen{};
 
     /// The values after it; nothing if it saw other values than those before.
     std::optional<Slots> applyTo(Slots const& before) const;

@@ -16,20 +16,20 @@ constexpr std::uint16_t b = 8;
 class LinearizabilityCheck : public testing::Test {
 protected:
     static Operation set(std::uint16_t mask, std::uint32_t value) {
-        return {Kind::Set, false, mask, value, {}};
+        return {.kind = Kind::Set, .mask = mask, .value = value};
     }
 
-    static Operation remove(std::uint16_t mask) { return {Kind::Remove, false, mask, 0, {}}; }
+    static Operation remove(std::uint16_t mask) { return {.kind = Kind::Remove, .mask = mask}; }
 
-    static Operation create(std::uint16_t mask) { return {Kind::Create, false, mask, 0, {}}; }
+    static Operation create(std::uint16_t mask) { return {.kind = Kind::Create, .mask = mask}; }
 
     /// A read that finds these values at a, a/x and b, and nothing elsewhere.
     static Operation read(std::uint32_t atA, std::uint32_t atAx, std::uint32_t atB) {
-        return {Kind::Read, true, 0, 0, {{atA, atAx, 0, atB}}};
+        return {.kind = Kind::Read, .hasSeen = true, .seen = {{atA, atAx, 0, atB}}};
     }
 
     static Operation readAndSet(std::uint32_t atA, std::uint16_t mask, std::uint32_t value) {
-        return {Kind::Set, true, mask, value, {{atA}}};
+        return {.kind = Kind::Set, .hasSeen = true, .mask = mask, .value = value, .seen = {{atA}}};
     }
 
     /// One operation after another.

@@ -224,7 +224,7 @@ TEST_F(OtherPrograms, aTextThatGitDeletesIsAnErrorAndNotAnEmptyProject) {
     ASSERT_FALSE(filesystem::exists(textPath()));
     for (auto const& failing :
          {errorOf([&] { contentOf(*store); }), errorOf([&] { commit(*store, addFiles({u"new"})); })}) {
-        EXPECT_EQ(textPath().string(), failing.getFile());
+        EXPECT_EQ(textPath().string(), failing.file());
         EXPECT_EQ(StoreError::Kind::Damaged, failing.kind());
     }
     EXPECT_FALSE(filesystem::exists(textPath()));

@@ -27,9 +27,9 @@ using Kind = Operation::Kind;
 
 /// One operation of one process, with the moments between which it took place.
 struct Record {
-    std::uint64_t begin;
-    std::uint64_t end;  ///< 0 until it ends
-    std::uint64_t died; ///< when its process was known to be dead; 0 when the operation ended
+    std::uint64_t begin = 0;
+    std::uint64_t end = 0;  ///< 0 until it ends
+    std::uint64_t died = 0; ///< when its process was known to be dead; 0 when the operation ended
     Operation operation;
 };
 
@@ -128,7 +128,7 @@ private:
         } else if (choice < 5) {
             backend_->tidy();
         } else if (choice < 45) {
-            auto& record = begin({Kind::Read, true, 0, 0, {}});
+            auto& record = begin({.kind = Kind::Read, .hasSeen = true});
             record.operation.seen = readSlots(*store_, random_);
             end(record);
         } else {
@@ -143,7 +143,7 @@ private:
         auto const kind = choice < 7 ? Kind::Set : choice < 9 ? Kind::Remove : Kind::Create;
         bool const readsFirst = below(4) > 0;
         // Set only after the read: a process that dies during the read has seen nothing.
-        auto& record = begin({kind, false, mask, ++history_.values, {}});
+        auto& record = begin({.kind = kind, .mask = mask, .value = ++history_.values});
         auto const guard = store_->acquireWriteLock();
         if (readsFirst) {
             record.operation.seen = readSlots(*store_, random_);
@@ -177,7 +177,7 @@ private:
 
     Record& begin(Operation const& operation) {
         auto& record = lane_.records[lane_.count];
-        record = {0, 0, 0, operation};
+        record = {.operation = operation};
         record.begin = ++history_.clock;
         ++lane_.count;
         return record;

@@ -24,72 +24,100 @@ protected:
         };
     }
 
+    /// Another program replaces the text once, before or after the first call of a name.
+    void replaceTextBefore(std::string call) {
+        once(volume->beforeCall, std::move(call), [this] { replaceText(); });
+    }
+
+    void replaceTextAfter(std::string call) {
+        once(volume->afterCall, std::move(call), [this] { replaceText(); });
+    }
+
+    void replaceText() { volume->replaceFile("project.jsonl", theirs); }
+
+    /// Runs an action between the write of a batch and its commit, which would rewrite the text, or append.
+    void duringEachKindOfBatch(std::function<void(TextBackend&)> const& action) {
+        for (auto const& options : {rewriting(), appending()}) {
+            prepare(manyFiles(20));
+            auto const backend = open(options);
+            Entered const entered(*backend, Access::Write);
+            backend->write(addFiles({u"b"}));
+            action(*backend);
+        }
+    }
+
+    /// A writer of ours dies while it has the text of another program in its hands, not yet restored.
+    void dieWithTheirText() {
+        prepare({u"a"});
+        once(volume->beforeCall, exchange, [this] {
+            replaceText();
+            volume->plan(CrashingVolume::InjectedFault::Dies, 1); // before the text is restored
+        });
+        EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
+        volume->beforeCall = nullptr;
+    }
+
+    void expectTheirTextAndNoOtherFile(std::string const& situation = "") {
+        EXPECT_EQ(theirs, text()) << situation;
+        EXPECT_EQ(usual, volume->names()) << situation;
+    }
+
+    [[noreturn]] static void failDisk() {
+        throw StoreError(StoreError::Kind::DiskFailed, "", 0, "Input/output error", "");
+    }
+
+    static constexpr char const* exchange = "exchange swapping project.jsonl";
     std::string const theirs = textOf(addFiles({u"their file"}));
     std::vector<std::string> const usual{".gitattributes", ".gitignore", "project.jsonl"};
 };
 
 TEST_F(TextBackendOtherPrograms, aTextThatWasReplacedBeforeTheBatchStaysAndTheBatchIsNotInIt) {
-    for (auto const& options : {rewriting(), appending()}) {
-        prepare(manyFiles(20));
-        auto const backend = open(options);
-        Entered const entered(*backend, Access::Write);
-        backend->write(addFiles({u"b"}));
-        volume->replaceFile("project.jsonl", theirs);
+    duringEachKindOfBatch([&](TextBackend& backend) {
+        replaceText();
 
-        EXPECT_EQ(StoreError::Kind::Busy, errorOf([&] { backend->keep(); }).kind());
+        EXPECT_EQ(StoreError::Kind::Busy, errorOf([&] { backend.keep(); }).kind());
 
-        backend->discard();
-        EXPECT_EQ(theirs, text());
-        EXPECT_EQ(usual, volume->names());
-        EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), loadAll(*backend)) << "the guard shows one state";
-    }
+        backend.discard();
+        expectTheirTextAndNoOtherFile();
+        EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), loadAll(backend)) << "the guard shows one state";
+    });
 }
 
 TEST_F(TextBackendOtherPrograms, aTextThatWasChangedInPlaceBeforeTheBatchStays) {
-    for (auto const& options : {rewriting(), appending()}) {
-        prepare(manyFiles(20));
-        auto const backend = open(options);
-        Entered const entered(*backend, Access::Write);
-        backend->write(addFiles({u"b"}));
+    duringEachKindOfBatch([&](TextBackend& backend) {
         volume->advance(4'000'000);
         volume->overwrite("project.jsonl", theirs);
 
-        EXPECT_THROW(backend->keep(), StoreError);
+        EXPECT_THROW(backend.keep(), StoreError);
 
-        backend->discard();
+        backend.discard();
         EXPECT_EQ(theirs, text());
-    }
+    });
 }
 
 TEST_F(TextBackendOtherPrograms, aFolderThatWasMovedAwayBeforeTheBatchIsNotTouched) {
-    for (auto const& options : {rewriting(), appending()}) {
-        prepare(manyFiles(20));
-        auto const backend = open(options);
-        Entered const entered(*backend, Access::Write);
-        backend->write(addFiles({u"b"}));
+    duringEachKindOfBatch([&](TextBackend& backend) {
         auto const bringBack = volume->moveFolderAway();
         writes();
 
-        EXPECT_THROW(backend->keep(), StoreError);
+        EXPECT_THROW(backend.keep(), StoreError);
 
         EXPECT_THAT(writes(), IsEmpty());
-        backend->discard();
+        backend.discard();
         bringBack();
         EXPECT_EQ(textOf(addFiles(manyFiles(20))), text());
-    }
+    });
 }
 
 TEST_F(TextBackendOtherPrograms, aTextWrittenBeforeTheLastCheckIsNotExchanged) {
     prepare({u"a"});
     auto const backend = open();
-    once(volume->afterCall, "renameToFree temporary swapping",
-         [&] { volume->replaceFile("project.jsonl", theirs); });
+    replaceTextAfter("renameToFree temporary swapping");
 
     EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
 
-    EXPECT_EQ(0U, volume->count("exchange swapping project.jsonl"));
-    EXPECT_EQ(theirs, text());
-    EXPECT_EQ(usual, volume->names());
+    EXPECT_EQ(0U, volume->count(exchange));
+    expectTheirTextAndNoOtherFile();
 }
 
 TEST_F(TextBackendOtherPrograms, aTextThatIsChangedInPlaceWhileASyncFailsMayHaveTheBatchAndTheErrorSaysSo) {
@@ -97,26 +125,24 @@ TEST_F(TextBackendOtherPrograms, aTextThatIsChangedInPlaceWhileASyncFailsMayHave
     auto const backend = open(appending());
     once(volume->beforeCall, "sync", [&] {
         volume->append("project.jsonl", "\"theirs");
-        throw StoreError(StoreError::Kind::DiskFailed, "", 0, "Input/output error", "");
+        failDisk();
     });
 
     auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
 
     volume->beforeCall = nullptr;
-    EXPECT_THAT(error.getProblem(), HasSubstr("Input/output error"));
+    EXPECT_THAT(error.problem(), HasSubstr("Input/output error"));
     EXPECT_EQ(StoreError::Kind::OutcomeUnknown, error.kind());
 }
 
 TEST_F(TextBackendOtherPrograms, aTextWrittenBetweenTheCheckAndTheExchangeIsRestored) {
     prepare({u"a"});
     auto const backend = open();
-    once(volume->beforeCall, "exchange swapping project.jsonl",
-         [&] { volume->replaceFile("project.jsonl", theirs); });
+    replaceTextBefore(exchange);
 
     EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
 
-    EXPECT_EQ(theirs, text());
-    EXPECT_EQ(usual, volume->names());
+    expectTheirTextAndNoOtherFile();
     EXPECT_EQ(contentAfter({addFiles({u"their file"})}), contentOf(*backend));
     commit(*backend, addFiles({u"b"}));
     EXPECT_EQ(contentAfter({addFiles({u"their file", u"b"})}), stored());
@@ -126,8 +152,7 @@ TEST_F(TextBackendOtherPrograms, aRestoredTextSurvivesAPowerCut) {
     for (unsigned seed = 0; seed < 20; ++seed) {
         *volume = CrashingVolume(seed);
         prepare({u"a"});
-        once(volume->beforeCall, "exchange swapping project.jsonl",
-             [&] { volume->replaceFile("project.jsonl", theirs); });
+        replaceTextBefore(exchange);
         EXPECT_THROW(commit(*open(), addFiles({u"b"})), StoreError);
         volume->beforeCall = nullptr;
 
@@ -142,8 +167,7 @@ TEST_F(TextBackendOtherPrograms, theOutcomeIsUnknownIfARestoredTextCannotBeMadeD
         *volume = CrashingVolume(seed);
         prepare({u"a"});
         auto const backend = open();
-        once(volume->beforeCall, "exchange swapping project.jsonl",
-             [&] { volume->replaceFile("project.jsonl", theirs); });
+        replaceTextBefore(exchange);
         once(volume->afterCall, "identify swapping", [&] { failOnce("syncFolder"); });
 
         auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
@@ -159,23 +183,22 @@ TEST_F(TextBackendOtherPrograms, theOutcomeIsUnknownIfARestoredTextCannotBeMadeD
 }
 
 TEST_F(TextBackendOtherPrograms, withoutExchangeTheTextIsCheckedAgainRightBeforeTheRename) {
-    for (auto const* moment : {"sync", "exchange swapping project.jsonl", "create temporary"}) {
+    for (auto const* moment : {"sync", exchange, "create temporary"}) {
         prepare({u"a"});
         volume->canExchange = false;
-        once(volume->afterCall, moment, [&] { volume->replaceFile("project.jsonl", theirs); });
+        replaceTextAfter(moment);
 
         EXPECT_THROW(commit(*open(), addFiles({u"b"})), StoreError) << moment;
 
         volume->afterCall = nullptr;
-        EXPECT_EQ(theirs, text()) << moment;
-        EXPECT_EQ(usual, volume->names()) << moment;
+        expectTheirTextAndNoOtherFile(moment);
     }
 }
 
 TEST_F(TextBackendOtherPrograms, aPipeCreatedInBetweenIsRestoredToo) {
     prepare({u"a"});
     auto const backend = open();
-    once(volume->beforeCall, "exchange swapping project.jsonl", [&] { volume->putPipe("project.jsonl"); });
+    once(volume->beforeCall, exchange, [&] { volume->putPipe("project.jsonl"); });
 
     EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError);
 
@@ -189,7 +212,7 @@ TEST_F(TextBackendOtherPrograms, twoTextsWrittenInBetweenAreBothKept) {
     auto const second = textOf(addFiles({u"their second file"}));
     auto const backend = open();
     volume->beforeCall = [&](std::string const& call) {
-        if (call == "exchange swapping project.jsonl") {
+        if (call == exchange) {
             volume->replaceFile("project.jsonl", ++exchanges == 1 ? theirs : second);
         }
     };
@@ -207,11 +230,11 @@ TEST_F(TextBackendOtherPrograms, aTextThatCannotBeRestoredIsSetAsideAndReported)
     int exchanges = 0;
     auto const backend = open();
     volume->beforeCall = [&](std::string const& call) {
-        if (call == "exchange swapping project.jsonl") {
+        if (call == exchange) {
             if (++exchanges == 2) {
-                throw StoreError(StoreError::Kind::DiskFailed, "", 0, "Input/output error", "");
+                failDisk();
             }
-            volume->replaceFile("project.jsonl", theirs);
+            replaceText();
         }
     };
 
@@ -220,7 +243,7 @@ TEST_F(TextBackendOtherPrograms, aTextThatCannotBeRestoredIsSetAsideAndReported)
     auto const aside = volume->namesLike("displaced-");
     ASSERT_THAT(aside, SizeIs(1));
     EXPECT_EQ(StoreError::Kind::OutcomeUnknown, error.kind());
-    EXPECT_THAT(error.getProblem(), HasSubstr(aside.front()));
+    EXPECT_THAT(error.problem(), HasSubstr(aside.front()));
     EXPECT_EQ(theirs, volume->content(aside.front()));
     auto const faults = backend->check();
     ASSERT_FALSE(faults.empty());
@@ -230,24 +253,22 @@ TEST_F(TextBackendOtherPrograms, aTextThatCannotBeRestoredIsSetAsideAndReported)
 
 TEST_F(TextBackendOtherPrograms, aTextThatReplacesOursRightAfterTheWriteWinsAndTheBatchThrows) {
     for (auto const& [options, call] :
-         {std::pair{rewriting(), "exchange swapping project.jsonl"},
-          std::pair{appending(), "append project.jsonl"}, std::pair{appending(), "sync"}}) {
+         {std::pair{rewriting(), exchange}, std::pair{appending(), "append project.jsonl"},
+          std::pair{appending(), "sync"}}) {
         prepare(manyFiles(20));
         auto const backend = open(options);
-        once(volume->afterCall, call, [&] { volume->replaceFile("project.jsonl", theirs); });
+        replaceTextAfter(call);
 
         EXPECT_THROW(commit(*backend, addFiles({u"b"})), StoreError) << call;
 
         volume->afterCall = nullptr;
-        EXPECT_EQ(theirs, text());
-        EXPECT_EQ(usual, volume->names());
+        expectTheirTextAndNoOtherFile();
     }
 }
 
 TEST_F(TextBackendOtherPrograms, aFolderThatWasMovedAwayIsNotRecreatedByTheBatch) {
     for (auto const& [options, call] :
-         {std::pair{rewriting(), "create temporary like project.jsonl"},
-          std::pair{rewriting(), "exchange swapping project.jsonl"},
+         {std::pair{rewriting(), "create temporary like project.jsonl"}, std::pair{rewriting(), exchange},
           std::pair{appending(), "append project.jsonl"}, std::pair{appending(), "sync"}}) {
         prepare(manyFiles(20));
         auto const backend = open(options);
@@ -284,8 +305,7 @@ TEST_F(TextBackendOtherPrograms, aProcessThatDiesWhileItHoldsTheTextOfAnotherPro
         for (std::size_t call = 0; wasReached; ++call) {
             *volume = CrashingVolume(seed);
             prepare({u"a"});
-            once(volume->beforeCall, "exchange swapping project.jsonl",
-                 [&] { volume->replaceFile("project.jsonl", theirs); });
+            replaceTextBefore(exchange);
             auto backend = open();
             volume->plan(CrashingVolume::InjectedFault::Dies, call);
             bool died = false;
@@ -296,7 +316,7 @@ TEST_F(TextBackendOtherPrograms, aProcessThatDiesWhileItHoldsTheTextOfAnotherPro
             } catch (StoreError const&) {
             }
             wasReached = !volume->cancelPlan();
-            bool const hadCome = volume->count("exchange swapping project.jsonl") > 0;
+            bool const hadCome = volume->count(exchange) > 0;
             volume->beforeCall = nullptr;
 
             commit(*open(), addFiles({u"c"}));
@@ -315,13 +335,7 @@ TEST_F(TextBackendOtherPrograms, aProcessThatDiesWhileItHoldsTheTextOfAnotherPro
 TEST_F(TextBackendOtherPrograms, aTextRestoredForADeadWriterSurvivesAPowerCut) {
     for (unsigned seed = 0; seed < 20; ++seed) {
         *volume = CrashingVolume(seed);
-        prepare({u"a"});
-        once(volume->beforeCall, "exchange swapping project.jsonl", [&] {
-            volume->replaceFile("project.jsonl", theirs);
-            volume->plan(CrashingVolume::InjectedFault::Dies, 1); // before the text is restored
-        });
-        EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
-        volume->beforeCall = nullptr;
+        dieWithTheirText();
         auto const backend = open(appending());
         backend->enter(Access::Write);
 
@@ -337,8 +351,7 @@ TEST_F(TextBackendOtherPrograms, aBatchAfterATextOfADeadWriterSurvivesAPowerCut)
         *volume = CrashingVolume(seed);
         prepare(manyFiles(40));
         volume->canExchange = seed % 4 < 2;
-        auto const* const last =
-            volume->canExchange ? "exchange swapping project.jsonl" : "rename swapping project.jsonl";
+        auto const* const last = volume->canExchange ? exchange : "rename swapping project.jsonl";
         auto const backend = open(appending());
         if (hasWrittenBefore) {
             commit(*backend, addFiles({u"d"}));
@@ -376,13 +389,7 @@ TEST_F(TextBackendOtherPrograms, aBatchThatOthersAppendDuringOursIsSeenByTheNext
 }
 
 TEST_F(TextBackendOtherPrograms, aTextOfAnotherProgramIsSetAsideIfItsPlaceIsTaken) {
-    prepare({u"a"});
-    once(volume->beforeCall, "exchange swapping project.jsonl", [&] {
-        volume->replaceFile("project.jsonl", theirs);
-        volume->plan(CrashingVolume::InjectedFault::Dies, 1); // before the text is restored
-    });
-    EXPECT_THROW(commit(*open(), addFiles({u"b"})), ProcessDied);
-    volume->beforeCall = nullptr;
+    dieWithTheirText();
     volume->replaceFile("project.jsonl", textOf(addFiles({u"d"})));
 
     commit(*open(), addFiles({u"c"}));
@@ -433,9 +440,9 @@ TEST_F(TextBackendOtherPrograms, anotherWriterIsWaitedForAndThenNamed) {
 
     auto const error = errorOf([&] { backend->enter(Access::Write); });
 
-    EXPECT_EQ("/project/.projectdata", error.getFile());
+    EXPECT_EQ("/project/.projectdata", error.file());
     EXPECT_EQ(StoreError::Kind::Busy, error.kind());
-    EXPECT_EQ("is locked by process 4711 (another)", error.getProblem());
+    EXPECT_EQ("is locked by process 4711 (another)", error.problem());
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers do not wait";
 }
 
@@ -455,7 +462,7 @@ TEST_F(TextBackendOtherPrograms, aFolderThatIsReplacedWhileWeWaitForItsLockIsReo
     auto const backend = open();
     once(volume->beforeCall, "lock", [&] {
         volume->moveFolderAway();
-        volume->replaceFile("project.jsonl", theirs);
+        replaceText();
     });
 
     commit(*backend, addFiles({u"b"}));
@@ -478,8 +485,7 @@ TEST_F(TextBackendOtherPrograms, aStoreThatAnotherProgramCreatesMeanwhileIsNotOv
 
 TEST_F(TextBackendOtherPrograms, aTextThatGitWritesWhileTheStoreIsCreatedIsNotOverwritten) {
     auto const backend = open();
-    once(volume->beforeCall, "renameToFree temporary project.jsonl",
-         [&] { volume->replaceFile("project.jsonl", theirs); });
+    replaceTextBefore("renameToFree temporary project.jsonl");
 
     EXPECT_EQ(StoreError::Kind::Busy, errorOf([&] { commit(*backend, addFiles({u"b"})); }).kind());
 
