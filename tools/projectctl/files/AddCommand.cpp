@@ -72,10 +72,11 @@ private:
         losingLabels_ = foldersLosingLabels(project, added);
         progress.begin("Adding " + std::to_string(added.size()) + " files and folders");
         project.files().add(added);
-        project.stageReturned(added);
-        project.stageReturned(skipped);
         skippedCount_ = skipped.size();
-        return added.size();
+        auto const addedCount = added.size();
+        std::ranges::move(skipped, std::back_inserter(added));
+        project.stageReturned(added);
+        return addedCount;
     }
 
     /// The folders above added paths that are in the project with labels. Folders that are added again

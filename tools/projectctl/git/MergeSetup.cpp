@@ -93,26 +93,34 @@ bool isAssigned(Path const& folder) {
     return answer.find(std::string("\0merge\0project-definition\0", 26)) != std::string::npos;
 }
 
+/// The setup according to git's attributes and configuration, which also apply where there is no work tree.
+MergeSetup configuredSetup(Path const& folder) {
+    if (!isAssigned(folder)) {
+        return MergeSetup::NotAssigned;
+    }
+    auto const configured = runGit(folder, {"config", "-z", "--get", driverKey});
+    if (configured.exitCode != 0) {
+        return MergeSetup::Missing;
+    }
+    auto const program =
+        programIn(std::string_view(configured.output).substr(0, configured.output.find('\0')));
+    if (!program) {
+        return MergeSetup::OtherCommand;
+    }
+    return canBeRun(*program) ? MergeSetup::Works : MergeSetup::ProgramMissing;
+}
+
+bool isInWorkTree(Path const& folder) {
+    return runGit(folder, {"rev-parse", "--is-inside-work-tree"}).output == "true\n";
+}
+
 } // namespace
 
 MergeSetup mergeSetupOf(Path const& folder) {
     try {
-        if (runGit(folder, {"rev-parse", "--is-inside-work-tree"}).output != "true\n") {
-            return MergeSetup::NoRepository;
-        }
-        if (!isAssigned(folder)) {
-            return MergeSetup::NotAssigned;
-        }
-        auto const configured = runGit(folder, {"config", "-z", "--get", driverKey});
-        if (configured.exitCode != 0) {
-            return MergeSetup::Missing;
-        }
-        auto const program =
-            programIn(std::string_view(configured.output).substr(0, configured.output.find('\0')));
-        if (!program) {
-            return MergeSetup::OtherCommand;
-        }
-        return canBeRun(*program) ? MergeSetup::Works : MergeSetup::ProgramMissing;
+        auto const setup = configuredSetup(folder);
+        bool const isKnown = setup == MergeSetup::Works || isInWorkTree(folder); // each question is a process
+        return isKnown ? setup : MergeSetup::NoRepository;
     } catch (std::system_error const&) {
         return MergeSetup::NoRepository;
     }
