@@ -14,14 +14,13 @@ using ZEPHRA::project::management::DuplicateReferenceException;
 
 FolderReferenceCustomization::~FolderReferenceCustomization() = default;
 
+void CustomizationWithReaders::validateReference(FolderReference const& /*reference*/) const {
+}
+
 ProjectPathFolderReferenceCustomization::ProjectPathFolderReferenceCustomization(Path const& projectRoot) {
     // There is no reader for absolute references, because the project path must be valid on other machines
     // too. An absolute reference that is added is stored, never listed, and therefore never a duplicate.
-    readers_.push_back(std::make_unique<RelativeFolderReferenceReader>(projectRoot));
-}
-
-void ProjectPathFolderReferenceCustomization::validateReference(FolderReference const& /*reference*/) const {
-    // Every reference is accepted, also an absolute one.
+    addReader(std::make_unique<RelativeFolderReferenceReader>(projectRoot));
 }
 
 metadata::MetadataPath ProjectPathFolderReferenceCustomization::getRootPath() const {
@@ -34,17 +33,9 @@ void ProjectPathFolderReferenceCustomization::throwDuplicate(Path const& locatio
     exception::raise(DuplicatePathEntryException(location.native()));
 }
 
-std::vector<std::unique_ptr<FolderReferenceReader>> const&
-ProjectPathFolderReferenceCustomization::getReaders() const {
-    return readers_;
-}
-
 ProjectFolderReferenceCustomization::ProjectFolderReferenceCustomization(Path const& projectRoot) {
-    readers_.push_back(std::make_unique<RelativeFolderReferenceReader>(projectRoot));
-    readers_.push_back(std::make_unique<AbsoluteFolderReferenceReader>());
-}
-
-void ProjectFolderReferenceCustomization::validateReference(FolderReference const& /*reference*/) const {
+    addReader(std::make_unique<RelativeFolderReferenceReader>(projectRoot));
+    addReader(std::make_unique<AbsoluteFolderReferenceReader>());
 }
 
 metadata::MetadataPath ProjectFolderReferenceCustomization::getRootPath() const {
@@ -55,11 +46,6 @@ metadata::MetadataPath ProjectFolderReferenceCustomization::getRootPath() const 
 
 void ProjectFolderReferenceCustomization::throwDuplicate(Path const& location) const {
     exception::raise(DuplicateReferenceException(location.native()));
-}
-
-std::vector<std::unique_ptr<FolderReferenceReader>> const&
-ProjectFolderReferenceCustomization::getReaders() const {
-    return readers_;
 }
 
 } // namespace project::management

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <memory>
+#include <utility>
 #include <vector>
 
 #include "fl/filesystem/Path.hpp"
@@ -29,32 +30,38 @@ public:
     virtual std::vector<std::unique_ptr<FolderReferenceReader>> const& getReaders() const = 0;
 };
 
-/// The list of the project path. Only relative references are read from it.
-class ProjectPathFolderReferenceCustomization : public FolderReferenceCustomization {
+/// The part that both lists have in common: each has its readers, and accepts every reference.
+class CustomizationWithReaders : public FolderReferenceCustomization {
 public:
-    explicit ProjectPathFolderReferenceCustomization(Path const& projectRoot);
-
     void validateReference(FolderReference const& reference) const override;
-    metadata::MetadataPath getRootPath() const override;
-    [[noreturn]] void throwDuplicate(Path const& location) const override;
-    std::vector<std::unique_ptr<FolderReferenceReader>> const& getReaders() const override;
+
+    std::vector<std::unique_ptr<FolderReferenceReader>> const& getReaders() const override {
+        return readers_;
+    }
+
+protected:
+    void addReader(std::unique_ptr<FolderReferenceReader> reader) { readers_.push_back(std::move(reader)); }
 
 private:
     std::vector<std::unique_ptr<FolderReferenceReader>> readers_;
 };
 
+/// The list of the project path. Only relative references are read from it.
+class ProjectPathFolderReferenceCustomization : public CustomizationWithReaders {
+public:
+    explicit ProjectPathFolderReferenceCustomization(Path const& projectRoot);
+
+    metadata::MetadataPath getRootPath() const override;
+    [[noreturn]] void throwDuplicate(Path const& location) const override;
+};
+
 /// The list of references to other projects, which are relative or absolute.
-class ProjectFolderReferenceCustomization : public FolderReferenceCustomization {
+class ProjectFolderReferenceCustomization : public CustomizationWithReaders {
 public:
     explicit ProjectFolderReferenceCustomization(Path const& projectRoot);
 
-    void validateReference(FolderReference const& reference) const override;
     metadata::MetadataPath getRootPath() const override;
     [[noreturn]] void throwDuplicate(Path const& location) const override;
-    std::vector<std::unique_ptr<FolderReferenceReader>> const& getReaders() const override;
-
-private:
-    std::vector<std::unique_ptr<FolderReferenceReader>> readers_;
 };
 
 } // namespace project::management
