@@ -17,7 +17,7 @@ struct IndexChanges {
     bool empty() const { return staged.empty() && removed.empty(); }
 
     /// Whether the entries for a path, including those of a conflict, are dropped.
-    bool areDropped(char const* path) const { return removed.contains(path) || staged.contains(path); }
+    bool isDropped(char const* path) const { return removed.contains(path) || staged.contains(path); }
 };
 
 } // namespace project::git

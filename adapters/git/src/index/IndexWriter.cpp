@@ -32,7 +32,7 @@ void IndexWriter::write(IndexChanges const& changes) {
     for (std::size_t position = 0; position < git_index_entrycount(old); ++position) {
         auto const& entry = *git_index_get_byindex(old, position);
         addStagedBefore(entry.path);
-        if (!changes.areDropped(entry.path)) {
+        if (!changes.isDropped(entry.path)) {
             keep(entry);
         }
     }
@@ -45,7 +45,7 @@ void IndexWriter::write(IndexChanges const& changes) {
 /// marks that the file has to be read.
 void IndexWriter::keep(git_index_entry const& entry) {
     auto kept = entry;
-    if (comparison_.hidesChanges(entry)) {
+    if (comparison_.canHideChanges(entry)) {
         auto const onDisk = diskEntryAt(repository_.workTree().onDisk(entry.path));
         if (onDisk && isFileOrLink(*onDisk) && comparison_.isModified(entry, *onDisk)) {
             kept.file_size = 0;

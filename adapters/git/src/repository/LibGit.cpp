@@ -51,9 +51,9 @@ void require(int code, std::string const& file, char const* action) {
 
 bool isRepositoryFound(std::string const& folder, std::string const& ceiling) {
     git_buf found = GIT_BUF_INIT;
-    bool const result = git_repository_discover(&found, folder.c_str(), 0, ceiling.c_str()) == 0;
+    bool const isFound = git_repository_discover(&found, folder.c_str(), 0, ceiling.c_str()) == 0;
     git_buf_dispose(&found);
-    return result;
+    return isFound;
 }
 
 } // namespace project::git

@@ -88,9 +88,9 @@ void Repository::requireReadable(int code) const {
     }
 }
 
-bool Repository::isSet(std::string const& name, bool whenAbsent) const {
+bool Repository::isSet(std::string const& name, bool isSetByDefault) const {
     int value = 0;
-    return git_config_get_bool(&value, config_.get(), name.c_str()) == 0 ? value != 0 : whenAbsent;
+    return git_config_get_bool(&value, config_.get(), name.c_str()) == 0 ? value != 0 : isSetByDefault;
 }
 
 std::string Repository::configured(std::string const& name) const {

@@ -49,7 +49,7 @@ public:
     DiskSettings const& settings() const { return settings_; }
 
     /// @param name for example "core.fileMode".
-    bool isSet(std::string const& name, bool whenAbsent) const;
+    bool isSet(std::string const& name, bool isSetByDefault) const;
 
     /// A text of the configuration; empty if it is not set.
     std::string configured(std::string const& name) const;

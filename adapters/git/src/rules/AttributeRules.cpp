@@ -17,7 +17,7 @@ std::vector<AttributeLine> readLines(std::string const& file) {
 
 AttributeRules::AttributeRules(Repository const& repository)
     : repository_(repository),
-      ignoresCase_(repository.isSet("core.ignoreCase", false)),
+      isCaseIgnored_(repository.isSet("core.ignoreCase", false)),
       own_(readLines(git_repository_commondir(repository.get()) + std::string("info/attributes"))) {
     auto const configured = repository.configuredPath("core.attributesFile");
     general_ = {readLines(configured.empty() ? repository.usersFile("attributes") : configured),
@@ -63,7 +63,7 @@ void AttributeRules::defineMacros(Lines const& lines) {
 /// The last line that sets an attribute decides.
 void AttributeRules::applyMatching(Lines const& lines, std::string_view path, Values& values) const {
     for (auto line = lines.rbegin(); line != lines.rend(); ++line) {
-        if (line->pattern && line->pattern->matches(path, false, ignoresCase_)) {
+        if (line->pattern && line->pattern->isMatch(path, false, isCaseIgnored_)) {
             apply(line->states, values);
         }
     }

@@ -37,7 +37,7 @@ private:
     void apply(States const& states, Values& values) const;
 
     Repository const& repository_;
-    bool ignoresCase_;
+    bool isCaseIgnored_;
     Lines own_;
     std::vector<Lines> general_; // in order of precedence
     std::unordered_map<TreePath, Lines> folders_;

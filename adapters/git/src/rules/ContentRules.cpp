@@ -40,13 +40,13 @@ bool isPlainUtf8(std::string const& encoding) {
 
 ContentRules::ContentRules(Repository const& repository) : repository_(repository), attributes_(repository) {
     auto const lineEnds = repository.configured("core.autocrlf");
-    areLineEndsConverted_ = lineEnds == "input" || repository.isSet("core.autocrlf", false);
+    hasConvertedLineEnds_ = lineEnds == "input" || repository.isSet("core.autocrlf", false);
 }
 
 Conversion ContentRules::conversionOf(TreePath const& path) {
     auto const values = attributes_.of(path);
     auto const isGiven = [&](std::string_view name) { return valueOf(values, name) != AttributeValue(); };
-    Conversion result{areLineEndsConverted_ || std::any_of(converting.begin(), converting.end(), isGiven),
+    Conversion result{hasConvertedLineEnds_ || std::any_of(converting.begin(), converting.end(), isGiven),
                       ""};
     auto const driver = valueOf(values, "filter").text;
     auto const encoding = valueOf(values, "working-tree-encoding").text;
@@ -81,10 +81,10 @@ bool ContentRules::isConfigured(std::string const& driver) {
         return known->second;
     }
     auto const section = "filter." + driver + '.';
-    bool const result = !repository_.configured(section + "clean").empty() ||
-                        !repository_.configured(section + "process").empty() ||
-                        repository_.isSet(section + "required", false);
-    return drivers_.try_emplace(driver, result).first->second;
+    bool const hasCommand = !repository_.configured(section + "clean").empty() ||
+                            !repository_.configured(section + "process").empty() ||
+                            repository_.isSet(section + "required", false);
+    return drivers_.try_emplace(driver, hasCommand).first->second;
 }
 
 } // namespace project::git

@@ -30,7 +30,7 @@ private:
 
     Repository const& repository_;
     AttributeRules attributes_;
-    bool areLineEndsConverted_;
+    bool hasConvertedLineEnds_;
     std::unordered_map<std::string, bool> drivers_;
 };
 

@@ -50,7 +50,7 @@ std::optional<IgnoreLine> IgnoreLine::read(std::string_view line) {
 }
 
 IgnoreRules::IgnoreRules(Repository const& repository)
-    : repository_(repository), ignoresCase_(repository.isSet("core.ignoreCase", false)) {
+    : repository_(repository), isCaseIgnored_(repository.isSet("core.ignoreCase", false)) {
     auto const configured = repository.configuredPath("core.excludesFile");
     general_.push_back(
         readLines(git_repository_commondir(repository.get()) + std::string("info/exclude"), Links::Followed));
@@ -58,7 +58,7 @@ IgnoreRules::IgnoreRules(Repository const& repository)
         readLines(configured.empty() ? repository.usersFile("ignore") : configured, Links::Followed));
 }
 
-bool IgnoreRules::ignore(TreePath const& path, bool isFolder) {
+bool IgnoreRules::isIgnored(TreePath const& path, bool isFolder) {
     std::string_view const whole = path;
     for (auto folder = path; !folder.empty();) {
         folder = parentOf(folder);
@@ -88,7 +88,7 @@ IgnoreRules::Lines const& IgnoreRules::ofFolder(TreePath const& folder) {
 /// The last line that matches decides.
 std::optional<bool> IgnoreRules::decide(Lines const& lines, std::string_view path, bool isFolder) const {
     for (auto line = lines.rbegin(); line != lines.rend(); ++line) {
-        if (line->pattern.matches(path, isFolder, ignoresCase_)) {
+        if (line->pattern.isMatch(path, isFolder, isCaseIgnored_)) {
             return !line->isNegative;
         }
     }

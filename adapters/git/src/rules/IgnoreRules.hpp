@@ -30,7 +30,7 @@ public:
     explicit IgnoreRules(Repository const& repository);
 
     /// Whether a rule ignores a path whose folders are not ignored.
-    bool ignore(TreePath const& path, bool isFolder);
+    bool isIgnored(TreePath const& path, bool isFolder);
 
 private:
     using Lines = std::vector<IgnoreLine>;
@@ -39,7 +39,7 @@ private:
     std::optional<bool> decide(Lines const& lines, std::string_view path, bool isFolder) const;
 
     Repository const& repository_;
-    bool ignoresCase_;
+    bool isCaseIgnored_;
     std::vector<Lines> general_; // in order of precedence
     std::unordered_map<TreePath, Lines> folders_;
 };

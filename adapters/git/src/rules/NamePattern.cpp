@@ -24,17 +24,17 @@ std::optional<NamePattern> NamePattern::of(std::string_view text) {
     return result;
 }
 
-bool NamePattern::matches(std::string_view path, bool isFolder, bool ignoresCase) const {
+bool NamePattern::isMatch(std::string_view path, bool isFolder, bool isCaseIgnored) const {
     if (isForFolders_ && !isFolder) {
         return false;
     }
     auto const compared = isPath_ ? path : path.substr(path.rfind('/') + 1);
     if (hasWildcards_) {
-        return matchesWildcards(text_, compared, {isPath_, ignoresCase});
+        return isWildcardMatch(text_, compared, {isPath_, isCaseIgnored});
     }
     return compared.size() == text_.size() &&
-           (ignoresCase ? ::strncasecmp(compared.data(), text_.data(), text_.size()) == 0
-                        : compared == text_);
+           (isCaseIgnored ? ::strncasecmp(compared.data(), text_.data(), text_.size()) == 0
+                          : compared == text_);
 }
 
 } // namespace project::git

@@ -13,7 +13,7 @@ public:
     static std::optional<NamePattern> of(std::string_view text);
 
     /// @param path relative to the folder of the file that contains the pattern.
-    bool matches(std::string_view path, bool isFolder, bool ignoresCase) const;
+    bool isMatch(std::string_view path, bool isFolder, bool isCaseIgnored) const;
 
 private:
     std::string text_;

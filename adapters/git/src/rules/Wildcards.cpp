@@ -34,17 +34,17 @@ constexpr std::array<NamedClass, 12> namedClasses{{{"alnum", std::isalnum},
 class BracketReader {
 public:
     /// @param at the position behind the opening bracket.
-    BracketReader(std::string_view pattern, std::size_t at, bool ignoresCase)
-        : pattern_(pattern), at_(at), ignoresCase_(ignoresCase) {}
+    BracketReader(std::string_view pattern, std::size_t at, bool isCaseIgnored)
+        : pattern_(pattern), at_(at), isCaseIgnored_(isCaseIgnored) {}
 
     /// Nothing if the bracket is not closed or names an unknown class.
-    std::optional<bool> holds(Byte byte) {
+    std::optional<bool> contains(Byte byte) {
         bool const isNegated = isAt('!') || isAt('^');
         at_ += isNegated ? 1 : 0;
         bool isFirst = true;
         bool isHeld = false;
         while (at_ < pattern_.size() && (isFirst || pattern_[at_] != ']')) {
-            auto const held = pattern_.substr(at_, 2) == "[:" ? holdsNamed(byte) : holdsRange(byte);
+            auto const held = pattern_.substr(at_, 2) == "[:" ? containsNamed(byte) : containsRange(byte);
             if (!held) {
                 return std::nullopt;
             }
@@ -64,13 +64,13 @@ public:
 private:
     bool isAt(char sign) const { return at_ < pattern_.size() && pattern_[at_] == sign; }
 
-    std::optional<bool> holdsNamed(Byte byte) {
+    std::optional<bool> containsNamed(Byte byte) {
         auto const close = pattern_.find(']', at_ + 2);
         if (close == std::string_view::npos) {
             return std::nullopt;
         }
         if (pattern_[close - 1] != ':' || close < at_ + 3) {
-            return holdsRange(byte); // not a name: the bracket is one of the characters
+            return containsRange(byte); // not a name: the bracket is one of the characters
         }
         auto const name = pattern_.substr(at_ + 2, close - at_ - 3);
         at_ = close + 1;
@@ -79,10 +79,10 @@ private:
         if (found == namedClasses.end()) {
             return std::nullopt;
         }
-        return found->contains(byte) != 0 || (ignoresCase_ && name == "upper" && std::islower(byte) != 0);
+        return found->contains(byte) != 0 || (isCaseIgnored_ && name == "upper" && std::islower(byte) != 0);
     }
 
-    std::optional<bool> holdsRange(Byte byte) {
+    std::optional<bool> containsRange(Byte byte) {
         auto const first = readSign();
         if (!first) {
             return std::nullopt;
@@ -97,7 +97,7 @@ private:
         }
         auto const isBetween = [&](int sign) { return *first <= sign && sign <= *last; };
         return *first == byte || isBetween(byte) || // in git, "[b-a]" contains its first character
-               (ignoresCase_ && isBetween(std::toupper(byte)));
+               (isCaseIgnored_ && isBetween(std::toupper(byte)));
     }
 
     std::optional<Byte> readSign() {
@@ -110,7 +110,7 @@ private:
 
     std::string_view pattern_;
     std::size_t at_;
-    bool ignoresCase_;
+    bool isCaseIgnored_;
 };
 
 /// Remembers failed positions, so that the time does not grow exponentially with the number of stars.
@@ -119,49 +119,49 @@ public:
     Matcher(std::string_view pattern, std::string_view text, WildcardMode mode)
         : pattern_(pattern), text_(text), mode_(mode), failed_((pattern.size() + 1) * (text.size() + 1), 0) {}
 
-    bool matches(std::size_t inPattern, std::size_t inText) {
+    bool canMatch(std::size_t inPattern, std::size_t inText) {
         auto const place = inPattern * (text_.size() + 1) + inText;
         if (failed_[place] != 0) {
             return false;
         }
-        bool const result =
-            inPattern == pattern_.size() ? inText == text_.size() : matchesNext(inPattern, inText);
-        failed_[place] = result ? 0 : 1;
-        return result;
+        bool const isMatch =
+            inPattern == pattern_.size() ? inText == text_.size() : canMatchNext(inPattern, inText);
+        failed_[place] = isMatch ? 0 : 1;
+        return isMatch;
     }
 
 private:
-    bool matchesNext(std::size_t inPattern, std::size_t inText) {
+    bool canMatchNext(std::size_t inPattern, std::size_t inText) {
         auto const sign = pattern_[inPattern];
         if (sign == '*') {
-            return matchesStars(inPattern, inText);
+            return canMatchStars(inPattern, inText);
         }
         if (inText == text_.size()) {
             return false;
         }
         if (sign == '?') {
-            return !isBarrier(inText) && matches(inPattern + 1, inText + 1);
+            return !isBarrier(inText) && canMatch(inPattern + 1, inText + 1);
         }
         if (sign == '[') {
-            BracketReader bracket(pattern_, inPattern + 1, mode_.ignoresCase);
-            return bracket.holds(byteAt(inText)).value_or(false) && !isBarrier(inText) &&
-                   matches(bracket.end(), inText + 1);
+            BracketReader bracket(pattern_, inPattern + 1, mode_.isCaseIgnored);
+            return bracket.contains(byteAt(inText)).value_or(false) && !isBarrier(inText) &&
+                   canMatch(bracket.end(), inText + 1);
         }
         auto const literal = inPattern + (sign == '\\' ? 1 : 0);
         return literal < pattern_.size() && folded(static_cast<Byte>(pattern_[literal])) == byteAt(inText) &&
-               matches(literal + 1, inText + 1);
+               canMatch(literal + 1, inText + 1);
     }
 
-    bool matchesStars(std::size_t inPattern, std::size_t inText) {
+    bool canMatchStars(std::size_t inPattern, std::size_t inText) {
         auto const behind = std::min(pattern_.find_first_not_of('*', inPattern), pattern_.size());
         bool const isDouble = behind - inPattern > 1 && (inPattern == 0 || pattern_[inPattern - 1] == '/') &&
                               (behind == pattern_.size() || pattern_[behind] == '/');
-        if (isDouble && behind < pattern_.size() && matches(behind + 1, inText)) {
+        if (isDouble && behind < pattern_.size() && canMatch(behind + 1, inText)) {
             return true; // no folder in between
         }
         bool const isStopped = mode_.isPath && !isDouble;
         for (auto end = inText; end <= text_.size(); ++end) {
-            if (matches(behind, end)) {
+            if (canMatch(behind, end)) {
                 return true;
             }
             if (end < text_.size() && isStopped && text_[end] == '/') {
@@ -176,7 +176,7 @@ private:
     Byte byteAt(std::size_t inText) const { return folded(static_cast<Byte>(text_[inText])); }
 
     Byte folded(Byte byte) const {
-        return mode_.ignoresCase && byte < 0x80 ? static_cast<Byte>(std::tolower(byte)) : byte;
+        return mode_.isCaseIgnored && byte < 0x80 ? static_cast<Byte>(std::tolower(byte)) : byte;
     }
 
     std::string_view pattern_;
@@ -187,9 +187,9 @@ private:
 
 } // namespace
 
-bool matchesWildcards(std::string_view pattern, std::string_view text, WildcardMode mode) {
+bool isWildcardMatch(std::string_view pattern, std::string_view text, WildcardMode mode) {
     constexpr std::size_t longestPattern = 8192; // twice the longest path: each sign may be escaped
-    return pattern.size() <= longestPattern && Matcher(pattern, text, mode).matches(0, 0);
+    return pattern.size() <= longestPattern && Matcher(pattern, text, mode).canMatch(0, 0);
 }
 
 } // namespace project::git

@@ -6,8 +6,8 @@ namespace project::git {
 
 /// How a pattern of a `.gitignore` is compared.
 struct WildcardMode {
-    bool isPath;      ///< only "/" and "**" match a slash
-    bool ignoresCase; ///< of ASCII letters
+    bool isPath;        ///< only "/" and "**" match a slash
+    bool isCaseIgnored; ///< of ASCII letters
 };
 
 /// Whether the whole of a text matches a pattern with git's wildcards (gitignore(5)): "?", "*", "**" between
@@ -16,6 +16,6 @@ struct WildcardMode {
 ///
 /// A pattern much longer than any path matches nothing. Time and memory are at most proportional to the
 /// product of both lengths.
-bool matchesWildcards(std::string_view pattern, std::string_view text, WildcardMode mode);
+bool isWildcardMatch(std::string_view pattern, std::string_view text, WildcardMode mode);
 
 } // namespace project::git

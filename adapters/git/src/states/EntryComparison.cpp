@@ -49,7 +49,7 @@ bool EntryComparison::isModified(git_index_entry const& entry, struct stat const
     return isContentModified(entry, onDisk);
 }
 
-bool EntryComparison::hidesChanges(git_index_entry const& entry) const {
+bool EntryComparison::canHideChanges(git_index_entry const& entry) const {
     return !isSubmodule(entry) && entry.mtime.seconds >= repository_.indexStamp().seconds;
 }
 

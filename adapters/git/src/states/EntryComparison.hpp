@@ -23,7 +23,7 @@ public:
 
     /// Whether a new index with this entry would hide a change of its file from git, which compares whole
     /// seconds.
-    bool hidesChanges(git_index_entry const& entry) const;
+    bool canHideChanges(git_index_entry const& entry) const;
 
 private:
     bool isTouched(git_index_entry const& entry, struct stat const& onDisk) const;

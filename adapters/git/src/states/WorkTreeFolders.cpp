@@ -6,7 +6,7 @@
 namespace project::git {
 
 bool WorkTreeFolders::isFileIgnored(TreePath const& path) {
-    return at(parentOf(path)).isIgnored || rules_.ignore(path, false);
+    return at(parentOf(path)).isIgnored || rules_.isIgnored(path, false);
 }
 
 /// As in git, the files of a repository decide, not its owner or its format.
@@ -26,7 +26,7 @@ WorkTreeFolders::Folder const& WorkTreeFolders::at(TreePath const& folder) {
         auto const above = at(parentOf(folder));
         result.kind = determineKind(folder, above.kind);
         result.isIgnored =
-            above.isIgnored || (result.kind == FolderKind::Ours && rules_.ignore(folder, true));
+            above.isIgnored || (result.kind == FolderKind::Ours && rules_.isIgnored(folder, true));
     }
     return folders_.try_emplace(folder, result).first->second;
 }
