@@ -109,11 +109,11 @@ std::unique_ptr<EntryPoint> EntryPointManagerBase::getEntryPoint(Path file) {
 void EntryPointManagerBase::removeEntryPoint(Path file) {
     auto const guard = metadataManager_->acquireWriteLock();
     requireInProject(file);
-    std::u16string const storedFile = getStoredFile(file);
+    std::u16string const stored = storedFile(file);
     std::vector<MetadataPath> found;
     for (auto const& path : getEntryPointNodes()) {
         auto const node = metadataManager_->getNode(path);
-        if (node && node->get(schema::entrypoints::fileKey) == storedFile) {
+        if (node && node->get(schema::entrypoints::fileKey) == stored) {
             found.push_back(path);
         }
     }
@@ -128,7 +128,7 @@ void EntryPointManagerBase::requireInProject(Path const& file) const {
     }
 }
 
-std::u16string EntryPointManagerBase::getStoredFile(Path const& file) const {
+std::u16string EntryPointManagerBase::storedFile(Path const& file) const {
     std::u16string result = metadata::getRelativePath(projectRoot_, file);
     // Entry points are found by this text, so every system that opens the project must spell it the same. The
     // price: the entry point of a name that contains a backslash is read with another path.
@@ -145,17 +145,17 @@ std::vector<MetadataPath> EntryPointManagerBase::getEntryPointNodes() const {
 }
 
 std::u16string EntryPointManagerBase::findUUIDForFile(Path const& file) const {
-    std::u16string const storedFile = getStoredFile(file);
+    std::u16string const stored = storedFile(file);
     for (auto const& path : getEntryPointNodes()) {
         auto const node = metadataManager_->getNode(path);
-        if (node && node->get(schema::entrypoints::fileKey) == storedFile) {
+        if (node && node->get(schema::entrypoints::fileKey) == stored) {
             return path.getLeaf().getLocation();
         }
     }
     return {};
 }
 
-std::u16string EntryPointManagerBase::getUUIDToWrite(EntryPoint const& entryPoint) const {
+std::u16string EntryPointManagerBase::uuidToWrite(EntryPoint const& entryPoint) const {
     // A given UUID is used without a check of other nodes: an entry point that was read and edited replaces
     // its own node, also if its file has changed since.
     if (std::u16string uuid = entryPoint.getUUID(); !uuid.empty()) {
@@ -187,9 +187,9 @@ std::unique_ptr<EntryPoint> EntryPointManagerBase::readEntryPoint(MetadataPath c
 }
 
 void EntryPointManagerBase::writeEntryPoint(EntryPoint const& entryPoint) {
-    std::u16string const uuid = getUUIDToWrite(entryPoint);
+    std::u16string const uuid = uuidToWrite(entryPoint);
     auto const node = std::make_shared<MetadataNodeSpecification>(schema::nodeType);
-    node->put(schema::entrypoints::fileKey, getStoredFile(entryPoint.getFile()));
+    node->put(schema::entrypoints::fileKey, storedFile(entryPoint.getFile()));
     node->put(schema::entrypoints::nameKey, entryPoint.getName());
     node->put(schema::entrypoints::typeKey, toString(entryPoint.getType()));
     node->put(schema::entrypoints::visibleKey,

@@ -40,10 +40,10 @@ private:
     using GroupMap = std::map<std::u16string, std::unique_ptr<EntryPointGroup>>;
 
     void requireInProject(Path const& file) const;
-    std::u16string getStoredFile(Path const& file) const;
+    std::u16string storedFile(Path const& file) const;
     std::vector<MetadataPath> getEntryPointNodes() const;
     std::u16string findUUIDForFile(Path const& file) const;
-    std::u16string getUUIDToWrite(EntryPoint const& entryPoint) const;
+    std::u16string uuidToWrite(EntryPoint const& entryPoint) const;
     std::unique_ptr<EntryPoint> readEntryPoint(MetadataPath const& path, GroupMap const& groups) const;
     void writeEntryPoint(EntryPoint const& entryPoint);
 

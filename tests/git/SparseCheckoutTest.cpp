@@ -60,7 +60,7 @@ TEST_F(SparseCheckout, aSparseIndexIsAnErrorWithARemedy) {
         repository.adapterStates(adapter, {"kept"});
         FAIL() << "it was read";
     } catch (GitError const& error) {
-        EXPECT_NE(error.getRemedy().find("git sparse-checkout reapply --no-sparse-index"), std::string::npos);
+        EXPECT_NE(error.remedy().find("git sparse-checkout reapply --no-sparse-index"), std::string::npos);
     }
     repository.run({"sparse-checkout", "reapply", "--no-sparse-index"});
     expectStates(repository, adapter);

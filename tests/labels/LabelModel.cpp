@@ -269,7 +269,7 @@ void LabelModel::putRecord(Path const& path, std::u16string const& labelUUID, st
     files_.at(path).records.push_back({labelUUID, value});
 }
 
-Lines LabelModel::getRecords(Path const& path) const {
+Lines LabelModel::records(Path const& path) const {
     Lines result;
     auto const file = files_.find(path);
     if (file != files_.end()) {

@@ -108,7 +108,7 @@ public:
     void putRecord(Path const& path, std::u16string const& labelUUID, std::u16string const& value);
 
     /// Returns the data records of a file, the UUID of the label and the data of each.
-    Lines getRecords(Path const& path) const;
+    Lines records(Path const& path) const;
 
     /// Sets a value of the first label of a file, as another program would.
     void putValue(Path const& path, std::u16string const& value);

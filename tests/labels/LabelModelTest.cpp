@@ -162,7 +162,7 @@ public:
         write(address, node);
     }
 
-    Lines getRecords(Path const& path) {
+    Lines records(Path const& path) {
         Lines result;
         if (auto const node = store->getNode(at(path).child({u"LabelData", u"Data"}))) {
             for (auto const& record : node->getChildren()) {
@@ -280,7 +280,7 @@ Lines answers(Path const& root, Files& files, Labels& labels, Others& others) {
     for (auto const& relative : allPaths) {
         append(all, [&] { return lines(files.getLabelIDSets(root / relative)); });
         append(all, [&] { return lines(files.getLabels(root / relative)); });
-        append(all, [&] { return others.getRecords(root / relative); });
+        append(all, [&] { return others.records(root / relative); });
     }
     append(all, [&] { return lines(labels.getAllCategories()); });
     for (auto const& uuid : categoryUUIDs) {

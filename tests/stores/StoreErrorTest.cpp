@@ -16,10 +16,10 @@ TEST(StoreError, namesTheFileTheLineTheProblemAndTheRemedy) {
 
     EXPECT_STREQ(error.what(), "/p/project.jsonl:12: the line is damaged. Restore it from source control.");
     EXPECT_EQ(error.kind(), StoreError::Kind::DiskFailed);
-    EXPECT_EQ(error.getFile(), "/p/project.jsonl");
-    EXPECT_EQ(error.getLine(), 12u);
-    EXPECT_EQ(error.getProblem(), "the line is damaged");
-    EXPECT_EQ(error.getRemedy(), "Restore it from source control.");
+    EXPECT_EQ(error.file(), "/p/project.jsonl");
+    EXPECT_EQ(error.line(), 12u);
+    EXPECT_EQ(error.problem(), "the line is damaged");
+    EXPECT_EQ(error.remedy(), "Restore it from source control.");
 }
 
 TEST(StoreError, omitsMissingParts) {

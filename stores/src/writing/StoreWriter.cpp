@@ -11,7 +11,7 @@ namespace {
 
 /// The remedy after a failure with an unknown outcome.
 std::string reopenAfter(StoreError const& failure) {
-    return failure.getRemedy() + (failure.getRemedy().empty() ? "" : " ") +
+    return failure.remedy() + (failure.remedy().empty() ? "" : " ") +
            "Then reopen the project, and check whether the last change is there.";
 }
 
@@ -185,8 +185,8 @@ void StoreWriter::undoExchange(std::string const& name, FileIdentity const& ours
     } catch (StoreError const& failure) {
         setOutcomeUnknown(ours);
         throw StoreError(StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
-                         failure.getProblem() + "; the other program's text is restored, but after a power "
-                                                "failure the batch may be in the project",
+                         failure.problem() + "; the other program's text is restored, but after a power "
+                                             "failure the batch may be in the project",
                          reopenAfter(failure));
     }
     if (!removeOwn(name, ours)) {
@@ -238,12 +238,12 @@ void StoreWriter::rollBack(FileIdentity const& current, StoreError const& failur
             return; // another program's text, without the batch, has replaced it
         }
     } catch (StoreError const& second) {
-        reason = second.getProblem();
+        reason = second.problem();
     }
     setOutcomeUnknown(current);
     throw StoreError(StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
-                     failure.getProblem() + "; writing the text without the last batch failed too (" +
-                         reason + "): it is unknown whether the batch is in the project",
+                     failure.problem() + "; writing the text without the last batch failed too (" + reason +
+                         "): it is unknown whether the batch is in the project",
                      reopenAfter(failure));
 }
 

@@ -100,10 +100,10 @@ protected:
             FAIL() << "nothing was thrown";
         } catch (GitError const& error) {
             EXPECT_EQ(error.kind(), GitError::Kind::Busy);
-            EXPECT_EQ(error.getFile(), lockFile().string());
+            EXPECT_EQ(error.file(), lockFile().string());
             EXPECT_EQ(std::string(error.what()).find(lockFile().string()), 0u);
-            EXPECT_NE(error.getProblem().find("locked"), std::string::npos);
-            EXPECT_NE(error.getRemedy().find("delete this file"), std::string::npos);
+            EXPECT_NE(error.problem().find("locked"), std::string::npos);
+            EXPECT_NE(error.remedy().find("delete this file"), std::string::npos);
         }
         EXPECT_TRUE(std::filesystem::exists(lockFile())); // of another process
         EXPECT_EQ(repository.index(), before);
@@ -269,7 +269,7 @@ TEST_F(IndexWriting, twoProcessesThatStageAtTheSameTimeLoseNothing) {
                 own.addToSourceControl({path});
                 ++i;
             } catch (GitError const& error) {
-                if (error.getProblem().find("locked") == std::string::npos) {
+                if (error.problem().find("locked") == std::string::npos) {
                     throw;
                 }
             }

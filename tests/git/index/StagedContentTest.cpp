@@ -74,11 +74,11 @@ TEST_F(StagedContent, aFileOfAFilterDriverIsRefusedBeforeAnythingIsStaged) {
         repository.write(name);
         auto const error = errorOfAdding({"a", name});
         EXPECT_EQ(error.kind(), GitError::Kind::Refused);
-        EXPECT_EQ(error.getFile(), (repository.onDisk() / name).string());
-        EXPECT_NE(error.getRemedy().find("git add"), std::string::npos);
+        EXPECT_EQ(error.file(), (repository.onDisk() / name).string());
+        EXPECT_NE(error.remedy().find("git add"), std::string::npos);
     }
-    EXPECT_NE(errorOfAdding({"d/x.up"}).getProblem().find("\"upper\""), std::string::npos);
-    EXPECT_NE(errorOfAdding({"d/x.wide"}).getProblem().find("\"UTF-16\""), std::string::npos);
+    EXPECT_NE(errorOfAdding({"d/x.up"}).problem().find("\"upper\""), std::string::npos);
+    EXPECT_NE(errorOfAdding({"d/x.wide"}).problem().find("\"UTF-16\""), std::string::npos);
     EXPECT_FALSE(std::filesystem::exists(repository.indexFile()));
     EXPECT_EQ(repository.run({"count-objects"}).substr(0, 2), "0 ");
     add({"a"});
@@ -88,7 +88,7 @@ TEST_F(StagedContent, aFileOfAFilterDriverIsRefusedBeforeAnythingIsStaged) {
 TEST_F(StagedContent, aFileWhoseAttributesLibGit2DoesNotUnderstandIsRefused) {
     repository.write(".gitattributes", "\"a b\" text\n");
     repository.write("a b", "1\r\n");
-    EXPECT_NE(errorOfAdding({"a b"}).getRemedy().find("git add"), std::string::npos);
+    EXPECT_NE(errorOfAdding({"a b"}).remedy().find("git add"), std::string::npos);
 }
 
 TEST_F(StagedContent, theAttributesOfAFileThatIsStagedComeFromTheIndexWhereTheDiskHasNone) {
@@ -97,7 +97,7 @@ TEST_F(StagedContent, theAttributesOfAFileThatIsStagedComeFromTheIndexWhereTheDi
     repository.run({"add", "-A"});
     repository.remove(".gitattributes");
     repository.write("a.up");
-    EXPECT_NE(errorOfAdding({"a.up"}).getProblem().find("\"upper\""), std::string::npos);
+    EXPECT_NE(errorOfAdding({"a.up"}).problem().find("\"upper\""), std::string::npos);
 }
 
 TEST_F(StagedContent, aLinkHasNoFilterDriver) {

@@ -8,9 +8,9 @@ TEST(GitError, namesTheFileTheProblemAndTheRemedy) {
 
     EXPECT_STREQ(error.what(), "/p/.git/index.lock: the index is locked. Try again.");
     EXPECT_EQ(error.kind(), GitError::Kind::Busy);
-    EXPECT_EQ(error.getFile(), "/p/.git/index.lock");
-    EXPECT_EQ(error.getProblem(), "the index is locked");
-    EXPECT_EQ(error.getRemedy(), "Try again.");
+    EXPECT_EQ(error.file(), "/p/.git/index.lock");
+    EXPECT_EQ(error.problem(), "the index is locked");
+    EXPECT_EQ(error.remedy(), "Try again.");
 }
 
 TEST(GitError, leavesOutEmptyParts) {

@@ -63,7 +63,7 @@ TEST_F(IndexReading, aSplitIndexIsAnErrorWithARemedy) {
         stateOf("a");
         FAIL() << "it was read";
     } catch (GitError const& error) {
-        EXPECT_NE(error.getRemedy().find("--no-split-index"), std::string::npos);
+        EXPECT_NE(error.remedy().find("--no-split-index"), std::string::npos);
     }
     repository.run({"update-index", "--no-split-index"});
     EXPECT_EQ(agreedStateOf("a"), 1);

@@ -53,7 +53,7 @@ TEST_F(FileSystems, projectsOnReadOnlyFileSystemsOpenForReading) {
         EXPECT_EQ(!names.contains(operation.name), thrown.has_value()) << operation.name;
         if (thrown) {
             EXPECT_EQ("The file system is read-only: mount it writable, or work on a copy.",
-                      thrown->getRemedy());
+                      thrown->remedy());
         }
         EXPECT_EQ(text, project->text());
         checkAfterwards(operation, *project, thrown);
@@ -102,8 +102,8 @@ TEST_F(FileSystems, aRefusedNameIsAnErrorThatNamesItAndNothingIsLost) {
             });
 
             ASSERT_TRUE(thrown) << operation.name;
-            EXPECT_THAT(thrown->getFile(), HasSubstr("/.projectdata/project.jsonl."));
-            EXPECT_THAT(thrown->getRemedy(), HasSubstr("on another file system"));
+            EXPECT_THAT(thrown->file(), HasSubstr("/.projectdata/project.jsonl."));
+            EXPECT_THAT(thrown->remedy(), HasSubstr("on another file system"));
             checkAfterwards(operation, *project, thrown);
         }
     }
@@ -117,7 +117,7 @@ TEST_F(FileSystems, aRefusedFolderIsAnErrorThatNamesItAndNothingIsLeft) {
                                 [](SystemCall const& call) { return call.name == "mkdirat" ? EILSEQ : 0; });
 
     ASSERT_TRUE(thrown);
-    EXPECT_EQ((project->root.onDisk() / ".projectdata").string(), thrown->getFile());
+    EXPECT_EQ((project->root.onDisk() / ".projectdata").string(), thrown->file());
     EXPECT_TRUE(std::filesystem::is_empty(project->root.onDisk()));
     checkAfterwards(operation, *project, thrown);
 }

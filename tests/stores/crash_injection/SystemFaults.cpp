@@ -46,8 +46,8 @@ bool SystemFaults::failAt(SystemOperation const& operation, std::size_t callsBef
                  (isForGood ? " from call " : " at call ") + std::to_string(callsBefore) + ", " + failed);
     if (thrown) {
         EXPECT_FALSE(failed.empty()) << thrown->what();
-        EXPECT_THAT(thrown->getFile(), StartsWith(project->root.onDisk().string())) << thrown->what();
-        EXPECT_THAT(thrown->getRemedy(), Not(IsEmpty())) << thrown->what();
+        EXPECT_THAT(thrown->file(), StartsWith(project->root.onDisk().string())) << thrown->what();
+        EXPECT_THAT(thrown->remedy(), Not(IsEmpty())) << thrown->what();
     }
     checkAfterwards(operation, *project, thrown);
     if (!failed.empty()) {

@@ -100,7 +100,7 @@ TEST_F(SystemFaults, aFolderThatCannotBeExaminedIsNotTakenForAMovedOne) {
     auto const thrown = perform(operation, *project, failing("lstat", examinedBefore));
 
     ASSERT_TRUE(thrown);
-    EXPECT_EQ("cannot be examined: Input/output error", thrown->getProblem());
+    EXPECT_EQ("cannot be examined: Input/output error", thrown->problem());
     checkAfterwards(operation, *project, thrown);
 }
 
@@ -112,8 +112,8 @@ TEST_F(SystemFaults, aNewTextThatCannotBeExaminedDoesNotReplaceTheOldOne) {
     auto const thrown = perform(operation, *project, failing("fstat", examinedBefore));
 
     ASSERT_TRUE(thrown);
-    EXPECT_THAT(thrown->getFile(), HasSubstr(".tmp"));
-    EXPECT_EQ("cannot be examined: Input/output error", thrown->getProblem());
+    EXPECT_THAT(thrown->file(), HasSubstr(".tmp"));
+    EXPECT_EQ("cannot be examined: Input/output error", thrown->problem());
     checkAfterwards(operation, *project, thrown);
 }
 
@@ -139,7 +139,7 @@ TEST_F(SystemFaults, aFileThatCannotBeClosedAfterASyncIsNotDurable) {
         });
 
         ASSERT_TRUE(thrown) << operation.name;
-        EXPECT_EQ("Make room on the disk and try again.", thrown->getRemedy().substr(0, 36));
+        EXPECT_EQ("Make room on the disk and try again.", thrown->remedy().substr(0, 36));
         checkAfterwards(operation, *project, thrown);
     }
 }

@@ -110,8 +110,8 @@ TEST_F(SystemDisk, aMissingRootIsAnErrorThatNamesIt) {
 
     auto const error = errorOf([&] { disk->openFolder(); });
 
-    EXPECT_EQ((root.onDisk() / "missing").string(), error.getFile());
-    EXPECT_THAT(error.getRemedy(), HasSubstr("moved or deleted"));
+    EXPECT_EQ((root.onDisk() / "missing").string(), error.file());
+    EXPECT_THAT(error.remedy(), HasSubstr("moved or deleted"));
 }
 
 TEST_F(SystemDisk, contentIsReadBackFromAnyOffset) {
@@ -235,7 +235,7 @@ TEST_F(SystemDisk, aPipeNeverBlocksIt) {
     EXPECT_FALSE(disk->identifyByPath("a")->isRegular);
     for (auto const& error :
          {errorOf([&] { disk->read("a", 0); }), errorOf([&] { disk->append("a", {}, "x"); })}) {
-        EXPECT_EQ(at("a").string(), error.getFile());
+        EXPECT_EQ(at("a").string(), error.file());
         EXPECT_EQ(StoreError::Kind::Damaged, error.kind());
     }
 }
@@ -255,8 +255,8 @@ TEST_F(SystemDisk, noLinkIsFollowedToAFile) {
     std::filesystem::create_symlink(outside, at("a"));
 
     EXPECT_FALSE(disk->identify("a")->isRegular);
-    EXPECT_EQ("is a symbolic link", errorOf([&] { disk->read("a", 0); }).getProblem());
-    EXPECT_EQ("is a symbolic link", errorOf([&] { disk->append("a", {}, "x"); }).getProblem());
+    EXPECT_EQ("is a symbolic link", errorOf([&] { disk->read("a", 0); }).problem());
+    EXPECT_EQ("is a symbolic link", errorOf([&] { disk->append("a", {}, "x"); }).problem());
     EXPECT_THROW(disk->create("a", "x", std::nullopt), StoreError);
 }
 
@@ -267,9 +267,9 @@ TEST_F(SystemDisk, noLinkIsFollowedToTheFolder) {
 
     auto const error = errorOf([&] { disk->openFolder(); });
 
-    EXPECT_EQ((root.onDisk() / ".projectdata").string(), error.getFile());
+    EXPECT_EQ((root.onDisk() / ".projectdata").string(), error.file());
     EXPECT_EQ(StoreError::Kind::Damaged, error.kind());
-    EXPECT_EQ("is a symbolic link", error.getProblem());
+    EXPECT_EQ("is a symbolic link", error.problem());
     EXPECT_THROW(disk->makeFolder(), StoreError);
 }
 
@@ -307,9 +307,9 @@ TEST_F(SystemDisk, aFileBeyondTheLimitIsAnErrorAndNotTheEndOfTheProcess) {
 
     for (auto const& error : {appended, created}) {
         EXPECT_EQ(StoreError::Kind::DiskFailed, error.kind());
-        EXPECT_THAT(error.getRemedy(), HasSubstr("ulimit -f"));
+        EXPECT_THAT(error.remedy(), HasSubstr("ulimit -f"));
     }
-    EXPECT_EQ(at("a").string(), appended.getFile());
+    EXPECT_EQ(at("a").string(), appended.file());
     EXPECT_LT(content("a").size(), 1200U);
     EXPECT_FALSE(std::filesystem::exists(at("b")));
     sigset_t pending;

@@ -133,7 +133,7 @@ protected:
                  [&] { contentOf(*store); }, [&] { commit(*store, addFiles({u"b"})); },
                  [&] { store->tidy(); }, [&] { store->repair(); }, [&] { store->check(); },
                  [&] { store->resolve(bodyOf({"\"a\""})); }}) {
-            EXPECT_THAT(errorOf(call).getFile(), HasSubstr(".projectdata"));
+            EXPECT_THAT(errorOf(call).file(), HasSubstr(".projectdata"));
         }
     }
 

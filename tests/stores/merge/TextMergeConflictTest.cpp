@@ -102,7 +102,7 @@ TEST_F(TextMergeMarkers, letAStoreOpenAndRefuseWrites) {
     EXPECT_TRUE(test::contentOf(*store).contains(fileAddress(u"b/y")));
     EXPECT_EQ(described(store->check()), "Conflict 2, Conflict 9");
     StoreError const error = test::errorOf([&] { test::commit(*store, test::addFiles({u"e"})); });
-    EXPECT_EQ(error.getLine(), 2U);
+    EXPECT_EQ(error.line(), 2U);
     EXPECT_EQ(text(), marked);
 }
 
@@ -177,8 +177,8 @@ TEST_P(TextMergeRefusal, namesTheVersionAndTheLine) {
     std::string const good = bodyOf({R"("a")"});
     std::string const& bad = GetParam().text;
     auto const expect = [](StoreError const& error, std::string const& version) {
-        EXPECT_EQ(error.getFile(), version);
-        EXPECT_EQ(error.getLine(), GetParam().line);
+        EXPECT_EQ(error.file(), version);
+        EXPECT_EQ(error.line(), GetParam().line);
         EXPECT_EQ(error.kind(), GetParam().kind) << error.what();
     };
     expect(test::errorOf([&] { mergeTexts(bad, good, good); }), "base");
@@ -201,8 +201,8 @@ INSTANTIATE_TEST_SUITE_P(
 
 TEST(TextMergeInput, anEmptyTextIsNotAVersionOfAProject) {
     std::string const good = bodyOf({R"("a")"});
-    EXPECT_EQ(test::errorOf([&] { mergeTexts(good, "", good); }).getFile(), "ours");
-    EXPECT_EQ(test::errorOf([&] { mergeTexts(good, good, ""); }).getFile(), "theirs");
+    EXPECT_EQ(test::errorOf([&] { mergeTexts(good, "", good); }).file(), "ours");
+    EXPECT_EQ(test::errorOf([&] { mergeTexts(good, good, ""); }).file(), "theirs");
 }
 
 TEST(TextMergeInput, aDamagedTailIsRefused) {
@@ -211,7 +211,7 @@ TEST(TextMergeInput, aDamagedTailIsRefused) {
     tail[1] = 'x';
     StoreError const error = test::errorOf([&] { mergeTexts("", text.body() + tail, text.body()); });
     EXPECT_EQ(error.kind(), StoreError::Kind::Damaged);
-    EXPECT_EQ(error.getLine(), 5U);
+    EXPECT_EQ(error.line(), 5U);
 }
 
 } // namespace

@@ -18,9 +18,9 @@ std::size_t lineOfError(std::string const& bytes) {
     try {
         ProjectText::read(bytes, "some/file");
     } catch (StoreError const& error) {
-        EXPECT_EQ(error.getFile(), "some/file");
-        EXPECT_FALSE(error.getRemedy().empty());
-        return error.getLine();
+        EXPECT_EQ(error.file(), "some/file");
+        EXPECT_FALSE(error.remedy().empty());
+        return error.line();
     }
     return 0;
 }
@@ -86,9 +86,9 @@ TEST(ProjectText, aLaterVersionAsksForANewerProgram) {
         FAIL() << "a later version was read";
     } catch (StoreError const& error) {
         EXPECT_EQ(error.kind(), StoreError::Kind::Refused);
-        EXPECT_EQ(error.getLine(), 1U);
-        EXPECT_THAT(error.getProblem(), testing::HasSubstr("version 2"));
-        EXPECT_THAT(error.getRemedy(), testing::HasSubstr("newer version of the program"));
+        EXPECT_EQ(error.line(), 1U);
+        EXPECT_THAT(error.problem(), testing::HasSubstr("version 2"));
+        EXPECT_THAT(error.remedy(), testing::HasSubstr("newer version of the program"));
     }
 }
 

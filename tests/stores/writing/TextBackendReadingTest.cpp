@@ -232,9 +232,9 @@ TEST_F(TextBackendReading, aTextThatStaysIncompleteIsAnErrorAndNeverAnEmptyProje
 
         auto const error = errorOf([&] { contentOf(*open()); });
 
-        EXPECT_EQ("/project/.projectdata/project.jsonl", error.getFile());
+        EXPECT_EQ("/project/.projectdata/project.jsonl", error.file());
         EXPECT_EQ(StoreError::Kind::Damaged, error.kind());
-        EXPECT_THAT(error.getRemedy(), HasSubstr("git checkout"));
+        EXPECT_THAT(error.remedy(), HasSubstr("git checkout"));
         EXPECT_THROW(commit(*open(), addFiles({u"c"})), StoreError);
         EXPECT_EQ(incomplete, text());
     }
@@ -365,8 +365,8 @@ TEST_F(TextBackendReading, aTextInAnotherFormatIsAnErrorWithItsLine) {
     auto const error = errorOf([&] { contentOf(*open()); });
 
     EXPECT_EQ(StoreError::Kind::Damaged, error.kind());
-    EXPECT_EQ("/project/.projectdata/project.jsonl", error.getFile());
-    EXPECT_EQ(1U, error.getLine());
+    EXPECT_EQ("/project/.projectdata/project.jsonl", error.file());
+    EXPECT_EQ(1U, error.line());
 }
 
 TEST_F(TextBackendReading, aPipeInThePlaceOfTheTextIsAnError) {

@@ -103,7 +103,7 @@ TEST_F(TextBackendRepair, changesThatTidyFoundAreReportedByTheNextGuard) {
 TEST_F(TextBackendRepair, aDamagedTextIsNotTidied) {
     prepareText(damaged());
 
-    EXPECT_EQ(3U, errorOf([&] { open()->tidy(); }).getLine());
+    EXPECT_EQ(3U, errorOf([&] { open()->tidy(); }).line());
     EXPECT_EQ(damaged(), text());
 }
 
@@ -213,7 +213,7 @@ TEST_F(TextBackendRepair, aFailedResolveRestoresTheMarkers) {
     auto const backend = open();
     failOnce("syncFolder");
 
-    EXPECT_EQ("Input/output error", errorOf([&] { backend->resolve(resolved); }).getProblem());
+    EXPECT_EQ("Input/output error", errorOf([&] { backend->resolve(resolved); }).problem());
 
     EXPECT_EQ(conflict, text());
     EXPECT_EQ(contentAfter({addFiles({u"a", u"b", u"c", u"d"})}), contentOf(*backend));
@@ -250,7 +250,7 @@ TEST_F(TextBackendRepair, repairKeepsConflictMarkers) {
     conflict.insert(conflict.find("\"d\""), "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs\n");
     prepareText(conflict);
 
-    EXPECT_EQ(3U, errorOf([&] { open()->repair(); }).getLine());
+    EXPECT_EQ(3U, errorOf([&] { open()->repair(); }).line());
 
     EXPECT_EQ(conflict, text());
 }

@@ -117,7 +117,7 @@ TEST_F(TextBackendWriting, aFirstBatchWhoseFilesCannotBeCreatedLeavesNothing) {
 
         auto const error = errorOf([&] { commit(*backend, addFiles({u"a"})); });
 
-        EXPECT_EQ("Make room on the disk and try again.", error.getRemedy());
+        EXPECT_EQ("Make room on the disk and try again.", error.remedy());
         EXPECT_FALSE(volume->hasFolder()) << room;
     }
 }
@@ -272,9 +272,9 @@ TEST_F(TextBackendWriting, aDamagedTextIsReadAndRefusesWrites) {
     auto const error = errorOf([&] { commit(*backend, addFiles({u"d"})); });
 
     EXPECT_EQ(StoreError::Kind::Damaged, error.kind());
-    EXPECT_EQ("/project/.projectdata/project.jsonl", error.getFile());
-    EXPECT_EQ(3U, error.getLine());
-    EXPECT_THAT(error.getRemedy(), HasSubstr("projectctl check --repair"));
+    EXPECT_EQ("/project/.projectdata/project.jsonl", error.file());
+    EXPECT_EQ(3U, error.line());
+    EXPECT_THAT(error.remedy(), HasSubstr("projectctl check --repair"));
     EXPECT_EQ(damaged, text());
 }
 
@@ -288,8 +288,8 @@ TEST_F(TextBackendWriting, aTextWithConflictMarkersIsReadWithBothSidesAndRefuses
     auto const error = errorOf([&] { commit(*backend, addFiles({u"e"})); });
 
     EXPECT_EQ(StoreError::Kind::Conflict, error.kind());
-    EXPECT_EQ(3U, error.getLine());
-    EXPECT_THAT(error.getRemedy(), HasSubstr("projectctl resolve"));
+    EXPECT_EQ(3U, error.line());
+    EXPECT_THAT(error.remedy(), HasSubstr("projectctl resolve"));
     EXPECT_EQ(conflict, text());
 }
 
@@ -302,7 +302,7 @@ TEST_F(TextBackendWriting, aTextOfALaterFormatIsNeitherReadNorWritten) {
     for (auto const& error :
          {errorOf([&] { contentOf(*backend); }), errorOf([&] { commit(*backend, addFiles({u"b"})); })}) {
         EXPECT_EQ(StoreError::Kind::Refused, error.kind());
-        EXPECT_EQ(1U, error.getLine());
+        EXPECT_EQ(1U, error.line());
     }
     EXPECT_EQ(later, text());
 }
@@ -315,7 +315,7 @@ TEST_F(TextBackendWriting, aFullDiskLeavesTheProjectAsItWasAndTheNextBatchRepair
     auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
 
     EXPECT_EQ(StoreError::Kind::DiskFailed, error.kind());
-    EXPECT_EQ("No space left on device", error.getProblem());
+    EXPECT_EQ("No space left on device", error.problem());
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), contentOf(*backend));
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), stored());
     volume->room.reset();
@@ -336,7 +336,7 @@ TEST_F(TextBackendWriting, aBatchWithoutItsLastByteOnAFullDiskIsRolledBack) {
         }
     };
 
-    EXPECT_EQ("No space left on device", errorOf([&] { commit(*backend, addFiles({u"b"})); }).getProblem());
+    EXPECT_EQ("No space left on device", errorOf([&] { commit(*backend, addFiles({u"b"})); }).problem());
 
     EXPECT_EQ(textOf(addFiles(manyFiles(20))), text());
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), contentOf(*backend));
@@ -380,7 +380,7 @@ TEST_F(TextBackendWriting, whenAnAppendCannotBeSyncedTheTextWithoutItIsWrittenTo
 
     auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
 
-    EXPECT_EQ("Input/output error", error.getProblem());
+    EXPECT_EQ("Input/output error", error.problem());
     EXPECT_EQ(textOf(addFiles(manyFiles(20))), text());
     EXPECT_EQ(contentAfter({addFiles(manyFiles(20))}), contentOf(*backend));
     volume->powerCut();
@@ -427,7 +427,7 @@ TEST_F(TextBackendWriting, whenTheFolderCannotBeSyncedAfterARewriteTheTextWithou
     auto const backend = open();
     failOnce("syncFolder");
 
-    EXPECT_EQ("Input/output error", errorOf([&] { commit(*backend, addFiles({u"b"})); }).getProblem());
+    EXPECT_EQ("Input/output error", errorOf([&] { commit(*backend, addFiles({u"b"})); }).problem());
 
     EXPECT_EQ(before, text());
     EXPECT_THAT(volume->names(), ElementsAre(".gitattributes", ".gitignore", "project.jsonl"));
@@ -441,7 +441,7 @@ TEST_F(TextBackendWriting, aDiskThatCannotIdentifyTheExchangedFileIsNotTakenForA
     auto const backend = open();
     failOnce("identify swapping");
 
-    EXPECT_EQ("Input/output error", errorOf([&] { commit(*backend, addFiles({u"b"})); }).getProblem());
+    EXPECT_EQ("Input/output error", errorOf([&] { commit(*backend, addFiles({u"b"})); }).problem());
 
     EXPECT_EQ(before, text());
     EXPECT_THAT(volume->names(), ElementsAre(".gitattributes", ".gitignore", "project.jsonl"));

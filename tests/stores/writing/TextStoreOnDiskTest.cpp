@@ -164,9 +164,9 @@ TEST_F(TextStoreOnDisk, aWriterThatWaitsTooLongNamesTheHolder) {
 
     auto const error = errorOf([&] { commit(*backend, addFiles({u"b"})); });
 
-    EXPECT_EQ(folder().string(), error.getFile());
+    EXPECT_EQ(folder().string(), error.file());
     EXPECT_EQ(StoreError::Kind::Busy, error.kind());
-    EXPECT_THAT(error.getProblem(), StartsWith("is locked by process " + std::to_string(child.id()) + " ("));
+    EXPECT_THAT(error.problem(), StartsWith("is locked by process " + std::to_string(child.id()) + " ("));
     EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend)) << "readers do not wait";
     child.kill();
     commit(*backend, addFiles({u"b"}));
@@ -179,8 +179,8 @@ TEST_F(TextStoreOnDisk, aChildOfAForkCannotUseTheStoreOfItsParentAndLeavesItAlon
     commit(*backend, addFiles({u"b"}));
     auto const tailed = text();
     ChildProcess child([&](ChildProcess::Parent const& parent) {
-        parent.say(errorOf([&] { contentOf(*backend); }).getRemedy());
-        parent.say(errorOf([&] { commit(*backend, addFiles({u"c"})); }).getRemedy());
+        parent.say(errorOf([&] { contentOf(*backend); }).remedy());
+        parent.say(errorOf([&] { commit(*backend, addFiles({u"c"})); }).remedy());
         backend.reset();
         parent.say(contentOf(*open()).size() == 51 ? "its own store works" : "its own store fails");
     });
@@ -206,7 +206,7 @@ TEST_F(TextStoreOnDisk, whenTheDiskIsFullTheErrorNamesTheFileAndNothingIsLost) {
         auto const error = errorOf([&] { commit(*backend, addFiles({u"a file with a longer name"})); });
 
         ::setrlimit(RLIMIT_FSIZE, &saved);
-        EXPECT_THAT(error.getFile(), StartsWith(textPath().string()));
+        EXPECT_THAT(error.file(), StartsWith(textPath().string()));
         EXPECT_EQ(StoreError::Kind::DiskFailed, error.kind());
         EXPECT_EQ(before, text().substr(0, before.size()));
         EXPECT_EQ(contentAfter({addFiles(many)}), contentOf(*backend));
@@ -295,8 +295,8 @@ TEST_F(TextStoreOnDisk, aPipeInThePlaceOfTheTextIsAnErrorAtOnce) {
 
     auto const error = errorOf([&] { contentOf(*open()); });
 
-    EXPECT_EQ(textPath().string(), error.getFile());
-    EXPECT_EQ("is not a regular file", error.getProblem());
+    EXPECT_EQ(textPath().string(), error.file());
+    EXPECT_EQ("is not a regular file", error.problem());
 }
 
 TEST_F(TextStoreOnDisk, aRewriteKeepsTheModeOfTheText) {

@@ -37,13 +37,13 @@ public:
 
     Kind kind() const noexcept { return kind_; }
 
-    std::string const& getFile() const noexcept { return file_; }
+    std::string const& file() const noexcept { return file_; }
 
-    std::size_t getLine() const noexcept { return line_; }
+    std::size_t line() const noexcept { return line_; }
 
-    std::string const& getProblem() const noexcept { return problem_; }
+    std::string const& problem() const noexcept { return problem_; }
 
-    std::string const& getRemedy() const noexcept { return remedy_; }
+    std::string const& remedy() const noexcept { return remedy_; }
 
 private:
     Kind kind_;

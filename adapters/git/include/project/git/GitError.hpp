@@ -31,11 +31,11 @@ public:
 
     Kind kind() const noexcept { return kind_; }
 
-    std::string const& getFile() const noexcept { return file_; }
+    std::string const& file() const noexcept { return file_; }
 
-    std::string const& getProblem() const noexcept { return problem_; }
+    std::string const& problem() const noexcept { return problem_; }
 
-    std::string const& getRemedy() const noexcept { return remedy_; }
+    std::string const& remedy() const noexcept { return remedy_; }
 
 private:
     Kind kind_;
