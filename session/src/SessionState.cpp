@@ -21,6 +21,7 @@ using management::EventBroadcastingProjectManager;
 using management::ProjectManager;
 using management::ProjectManagerBase;
 using metadata::MetadataPath;
+using stores::StoreError;
 using stores::TextBackend;
 using stores::TreeMetadataManager;
 
@@ -84,19 +85,30 @@ void Session::State::requireProject() const {
     auto const status =
         std::filesystem::symlink_status(fl::filesystem::toSystem(TextBackend::textPath(root)), error);
     if (status.type() == std::filesystem::file_type::not_found) {
-        throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(root.native()), 0,
-                                 "there is no project in this folder",
-                                 "Check the path, or create a project there.");
+        throw StoreError(StoreError::Kind::Refused, fl::i18n::toUtf8(root.native()), 0,
+                         "there is no project in this folder", "Check the path, or create a project there.");
     }
 }
 
 bool Session::State::createProject(std::u16string const& name) {
-    auto const guard = store->acquireWriteLock();
-    bool const isMissing = store->getChildNodes(MetadataPath::root()).empty();
-    if (isMissing) {
-        project->create(name);
+    try {
+        auto const guard = store->acquireWriteLock();
+        bool const isMissing = isStoreEmpty();
+        if (isMissing) {
+            project->create(name);
+        }
+        return isMissing;
+    } catch (StoreError const& error) {
+        // There was no folder to lock, so another process may have created the project at the same time.
+        if (error.kind() == StoreError::Kind::Busy && !isStoreEmpty()) {
+            return false;
+        }
+        throw;
     }
-    return isMissing;
+}
+
+bool Session::State::isStoreEmpty() const {
+    return store->getChildNodes(MetadataPath::root()).empty();
 }
 
 void Session::State::stage() {

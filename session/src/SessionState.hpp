@@ -24,7 +24,8 @@ public:
     /// @throws StoreError if the folder does not contain a text.
     void requireProject() const;
 
-    /// Creates the project if the store is empty. @return whether it was empty.
+    /// Creates the project if the store is empty. @return false if there is a project, perhaps one that
+    /// another process has created at the same time.
     bool createProject(std::u16string const& name);
 
     void stage();
@@ -44,6 +45,7 @@ private:
     std::shared_ptr<stores::TreeMetadataManager> makeStore(Options options);
     std::unique_ptr<DefinitionStager> makeStager();
     std::unique_ptr<management::ProjectManager> makeManagers();
+    bool isStoreEmpty() const;
     void queueEventsOfOthers();
     std::optional<Event> nextEventOfOthers();
 

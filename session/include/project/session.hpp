@@ -57,7 +57,8 @@ public:
     static Session open(Path const& root, Options options = {});
 
     /// Creates a project in a folder.
-    /// @throws stores::StoreError if the folder already contains a project.
+    /// @throws stores::StoreError if the folder already contains a project, perhaps one that another process
+    ///         has created at the same time.
     static Session create(Path const& root, std::u16string const& name, Options options = {});
 
     /// Opens the project in a folder, or creates it if there is none.

@@ -53,7 +53,11 @@ private:
     }
 
     static void requireNoProject(Path const& root) {
-        if (findProjectIn(root) != ProjectTrace::None) {
+        auto trace = findProjectIn(root);
+        if (trace == ProjectTrace::TextMissing) {
+            trace = findFinishedProjectIn(root);
+        }
+        if (trace != ProjectTrace::None) {
             findProjectRoot(root); // throws if the text is missing
             throw Failure("there is already a project in \"" + shown(root) + '"');
         }

@@ -2,8 +2,10 @@
 
 #include <cerrno>
 #include <filesystem>
+#include <memory>
 #include <optional>
 #include <system_error>
+#include <utility>
 
 #include <sys/stat.h>
 
@@ -12,13 +14,16 @@
 #include "output/NameForms.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/stores/StoreError.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
 
 namespace projectctl {
 
 using fl::filesystem::SystemName;
 using project::stores::StoreError;
 using project::stores::TextBackend;
+using project::stores::TreeMetadataManager;
 
 namespace {
 
@@ -56,6 +61,14 @@ ProjectTrace findProjectIn(Path const& folder) {
         return ProjectTrace::Text;
     }
     return isEmptyFolder(store) ? ProjectTrace::None : ProjectTrace::TextMissing;
+}
+
+ProjectTrace findFinishedProjectIn(Path const& folder) {
+    auto disk = project::stores::makeSystemDisk(folder, TextBackend::folderName);
+    TreeMetadataManager store(std::make_unique<TextBackend>(std::move(disk)),
+                              folder / TextBackend::folderName);
+    auto const guard = store.acquireWriteLock();
+    return findProjectIn(folder);
 }
 
 Path findProjectRoot(Path const& folder) {

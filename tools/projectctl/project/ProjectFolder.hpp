@@ -15,11 +15,15 @@ enum class ProjectTrace {
 
 ProjectTrace findProjectIn(Path const& folder);
 
+/// The same, after another process has finished with the store: until then, a store without its text may
+/// belong to a project that is being created.
+/// @throws StoreError if the process takes too long.
+ProjectTrace findFinishedProjectIn(Path const& folder);
+
 /// The root of the project that contains a folder: the nearest folder upwards with a project's text.
 /// @param folder canonical.
 /// @throws Failure when there is none; StoreError when a store on the way has no text: its files must not be
-/// mistaken for
-///         files of a project further up.
+///         mistaken for files of a project further up.
 Path findProjectRoot(Path const& folder);
 
 } // namespace projectctl
