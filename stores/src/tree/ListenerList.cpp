@@ -28,19 +28,18 @@ std::vector<std::shared_ptr<ListenerList::Listener>> ListenerList::accepting() {
 void ListenerList::Notification::notify(FileChanges files, Always always) {
     current_ = listeners_.accepting();
     files_ = std::move(files);
-    bool const removalFirst = always == Always::Removal;
     auto const additions = [&] {
-        if (always == Always::Addition || !files_.added.empty()) {
+        if (always.addition || !files_.added.empty()) {
             notifyAll(Kind::Addition, files_.added);
         }
     };
-    if (!removalFirst) {
+    if (!always.removal) {
         additions();
     }
-    if (removalFirst || !files_.removed.empty()) {
+    if (always.removal || !files_.removed.empty()) {
         notifyAll(Kind::Removal, files_.removed);
     }
-    if (removalFirst) {
+    if (always.removal) {
         additions();
     }
 }

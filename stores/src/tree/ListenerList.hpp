@@ -16,8 +16,11 @@ class ListenerList {
 public:
     using Listener = metadata::FileChangeRequestListener;
 
-    /// The notification that is sent even without files; the other one is sent only if there are files.
-    enum class Always { Addition, Removal, None };
+    /// The notifications that are sent even without files. The others are sent only if there are files.
+    struct Always {
+        bool addition = false;
+        bool removal = false;
+    };
 
     class Notification;
 
@@ -38,6 +41,8 @@ public:
     Notification(ListenerList& listeners, metadata::MetadataManager& store, Path const& metadataRoot)
         : listeners_(listeners), store_(store), metadataRoot_(metadataRoot) {}
 
+    /// Removals precede additions if the notification of removals is sent in any case.
+    ///
     /// An exception of a listener propagates to the caller; the listeners after it are not notified.
     void notify(FileChanges files, Always always);
 

@@ -9,6 +9,7 @@
 #include "tree/ChangeLog.hpp"
 #include "tree/ListenerList.hpp"
 #include "tree/MetadataTree.hpp"
+#include "tree/WriteLog.hpp"
 
 namespace project::stores {
 
@@ -24,15 +25,15 @@ Node copyOf(MetadataNode const& node) {
                                        : std::make_shared<MetadataNodeSpecification const>(node);
 }
 
-/// Marks the time between the write of a batch and its commit.
-class WritingMark {
+/// Marks the time in which a batch is committed.
+class CommittingMark {
 public:
-    explicit WritingMark(bool& mark) : mark_(mark) { mark_ = true; }
+    explicit CommittingMark(bool& mark) : mark_(mark) { mark_ = true; }
 
-    ~WritingMark() { mark_ = false; }
+    ~CommittingMark() { mark_ = false; }
 
-    WritingMark(WritingMark const&) = delete;
-    WritingMark& operator=(WritingMark const&) = delete;
+    CommittingMark(CommittingMark const&) = delete;
+    CommittingMark& operator=(CommittingMark const&) = delete;
 
 private:
     bool& mark_;
@@ -46,20 +47,26 @@ public:
         : backend(std::move(storage)),
           metadataRoot(std::move(root)),
           tree([this](Address const& address) { return backend->load(address); }),
+          log(tree),
           lock({[this](Access access) { enter(access); }, [this] { backend->leave(); }}) {}
 
-    /// Writes a batch through to the backend, notifies the listeners, and commits it.
-    void write(MetadataManager& store, Batch const& batch, ListenerList::Always always);
+    /// Applies a batch to the tree. Commits it, unless a transaction is open.
+    void write(MetadataManager& store, Batch batch, ListenerList::Always always);
+
+    /// Writes all batches of the log to the backend as one, notifies the listeners, and commits it. If that
+    /// fails, everything is undone.
+    void commit(MetadataManager& store);
 
     /// @throws StoreError if a listener writes while it is notified of a write.
-    void requireNotWriting() const;
+    void requireNotCommitting() const;
 
     std::unique_ptr<Backend> const backend;
     Path const metadataRoot;
     MetadataTree tree;
+    WriteLog log;
     ChangeLog othersChanges;
     ListenerList listeners;
-    bool writing = false;
+    bool committing = false;
     ReentrantReadWriteLock lock; // last, since it enters and leaves the backend
 
 private:
@@ -78,31 +85,38 @@ void TreeMetadataManager::State::enter(Access access) {
     }
 }
 
-void TreeMetadataManager::State::requireNotWriting() const {
-    if (writing) {
+void TreeMetadataManager::State::requireNotCommitting() const {
+    if (committing) {
         throw StoreError(StoreError::Kind::Refused, fl::filesystem::toSystem(metadataRoot).string(), 0,
                          "a listener wrote to the store while it was notified of a write",
                          "The listener must write after the operation has returned.");
     }
 }
 
-void TreeMetadataManager::State::write(MetadataManager& store, Batch const& batch,
-                                       ListenerList::Always always) {
-    WritingMark const mark(writing);
-    ListenerList::Notification notification(listeners, store, metadataRoot);
-    if (batch.empty()) {
-        notification.notify({}, always);
-        return;
+void TreeMetadataManager::State::write(MetadataManager& store, Batch batch, ListenerList::Always always) {
+    log.apply(std::move(batch), always);
+    if (!log.isInTransaction()) {
+        commit(store);
     }
-    MetadataTree::Undo undo;
+}
+
+void TreeMetadataManager::State::commit(MetadataManager& store) {
+    CommittingMark const mark(committing);
+    ListenerList::Notification notification(listeners, store, metadataRoot);
+    Batch batch;
     try {
-        auto const files = backend->write(batch);
-        undo = tree.apply(batch);
-        notification.notify(files, always);
-        backend->keep();
+        batch = log.takeBatch();
+        auto files = batch.empty() ? FileChanges() : backend->write(batch);
+        notification.notify(std::move(files), log.always());
+        if (!batch.empty()) {
+            backend->keep();
+        }
+        log.clear();
     } catch (...) {
-        backend->discard();
-        tree.undo(std::move(undo));
+        if (!batch.empty()) {
+            backend->discard();
+        }
+        log.undoAll();
         notification.notifyOfReverse();
         throw;
     }
@@ -134,7 +148,7 @@ std::unique_ptr<MetadataNode> TreeMetadataManager::getNode(Address const& path) 
 
 void TreeMetadataManager::setNodes(std::map<Address, std::shared_ptr<MetadataNode>>& nodes) {
     auto const guard = state_->lock.writeLock();
-    state_->requireNotWriting();
+    state_->requireNotCommitting();
     Batch batch;
     for (auto const& [address, node] : nodes) {
         if (!node || address.depth() == 0) {
@@ -146,7 +160,7 @@ void TreeMetadataManager::setNodes(std::map<Address, std::shared_ptr<MetadataNod
             batch.push_back({Change::Kind::Set, address, copyOf(*node)});
         }
     }
-    state_->write(*this, batch, ListenerList::Always::Addition);
+    state_->write(*this, std::move(batch), {.addition = true});
 }
 
 bool TreeMetadataManager::hasNode(Address const& path) {
@@ -165,7 +179,7 @@ void TreeMetadataManager::subscribe(std::weak_ptr<metadata::FileChangeRequestLis
 
 void TreeMetadataManager::removeNodes(std::vector<Address>& paths) {
     auto const guard = state_->lock.writeLock();
-    state_->requireNotWriting();
+    state_->requireNotCommitting();
     std::set<Address> all;
     for (auto const& path : paths) {
         if (path.depth() == 0) {
@@ -182,12 +196,12 @@ void TreeMetadataManager::removeNodes(std::vector<Address>& paths) {
             batch.push_back({Change::Kind::Remove, address, nullptr});
         }
     }
-    state_->write(*this, batch, ListenerList::Always::Removal);
+    state_->write(*this, std::move(batch), {.removal = true});
 }
 
 void TreeMetadataManager::createPaths(std::vector<Address>& paths) {
     auto const guard = state_->lock.writeLock();
-    state_->requireNotWriting();
+    state_->requireNotCommitting();
     // Sorted, so that each address is created before those below it. Otherwise it would exist by then,
     // because of them alone, and would be deleted with them.
     std::set<Address> absent;
@@ -201,12 +215,33 @@ void TreeMetadataManager::createPaths(std::vector<Address>& paths) {
     for (auto const& address : absent) {
         batch.push_back({Change::Kind::Create, address, nullptr});
     }
-    state_->write(*this, batch, ListenerList::Always::None);
+    state_->write(*this, std::move(batch), {});
 }
 
 bool TreeMetadataManager::pathExists(Address path) {
     auto const guard = state_->lock.readLock();
     return state_->tree.exists(path);
+}
+
+Transaction TreeMetadataManager::transaction() {
+    auto guard = state_->lock.writeLock();
+    state_->requireNotCommitting();
+    return Transaction(*this, std::move(guard), state_->log.begin());
+}
+
+bool TreeMetadataManager::isInnermost(std::uint64_t transaction) const noexcept {
+    return state_->log.isInnermost(transaction);
+}
+
+void TreeMetadataManager::commitInnermost() {
+    state_->log.end();
+    if (!state_->log.isInTransaction()) {
+        state_->commit(*this);
+    }
+}
+
+void TreeMetadataManager::rollBack(std::uint64_t transaction) noexcept {
+    state_->log.rollBack(transaction);
 }
 
 Changes TreeMetadataManager::takeOthersChanges() {

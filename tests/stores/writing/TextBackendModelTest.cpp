@@ -1,5 +1,6 @@
 #include <algorithm>
 #include <array>
+#include <optional>
 #include <ostream>
 #include <stdexcept>
 #include <tuple>
@@ -108,49 +109,92 @@ Content visible(Content const& content) {
     return result;
 }
 
+/// A write in a transaction.
+struct PartialWrite {
+    enum class Kind { Set, Remove, Create };
+
+    Kind kind = Kind::Set;
+    std::map<Address, Node> nodes{};
+    std::vector<Address> addresses{};
+    bool isNested = false; ///< in a transaction of its own
+    bool isKept = true;    ///< otherwise the nested transaction is rolled back
+};
+
 struct Step {
-    enum class Kind { Set, Remove, Create, Reopen, Tidy, Check, PowerCut };
+    enum class Kind { Set, Remove, Create, Transaction, Reopen, Tidy, Check, PowerCut };
 
     Kind kind = Kind::Check;
     std::size_t process = 0; ///< the process that takes it
     std::map<Address, Node> nodes{};
     std::vector<Address> addresses{};
+    std::vector<PartialWrite> writes{}; ///< of a transaction
+    bool isCommitted = true;            ///< of a transaction
     CrashingVolume::InjectedFault fault = CrashingVolume::InjectedFault::None;
     std::size_t callsBefore = 0; ///< the calls before the fault
 };
 
+void showWrite(std::map<Address, Node> const& nodes, std::vector<Address> const& addresses,
+               std::ostream& out) {
+    for (auto const& [address, node] : nodes) {
+        out << "\n    " << testing::PrintToString(address) << " = " << described(node);
+    }
+    for (auto const& address : addresses) {
+        out << "\n    " << testing::PrintToString(address);
+    }
+}
+
 void showValue(Step const& step, std::ostream& out) {
-    constexpr char const* kinds[] = {"Set", "Remove", "Create", "Reopen", "Tidy", "Check", "PowerCut"};
+    constexpr char const* kinds[] = {"Set",    "Remove", "Create", "Transaction",
+                                     "Reopen", "Tidy",   "Check",  "PowerCut"};
     constexpr char const* faults[] = {"", "fails", "fails permanently", "dies"};
     out << kinds[static_cast<int>(step.kind)] << " by " << step.process;
     if (step.fault != CrashingVolume::InjectedFault::None) {
         out << ", " << faults[static_cast<int>(step.fault)] << " after " << step.callsBefore << " calls";
     }
-    for (auto const& [address, node] : step.nodes) {
-        out << "\n    " << testing::PrintToString(address) << " = " << described(node);
+    showWrite(step.nodes, step.addresses, out);
+    for (auto const& write : step.writes) {
+        constexpr char const* writeKinds[] = {"Set", "Remove", "Create"};
+        out << "\n  " << writeKinds[static_cast<int>(write.kind)] << (write.isNested ? ", nested" : "")
+            << (write.isNested && !write.isKept ? ", rolled back" : "");
+        showWrite(write.nodes, write.addresses, out);
     }
-    for (auto const& address : step.addresses) {
-        out << "\n    " << testing::PrintToString(address);
-    }
-    out << "\n";
+    out << (step.isCommitted ? "\n" : "\n  rolled back\n");
+}
+
+rc::Gen<std::map<Address, Node>> anyNodes() {
+    return rc::gen::map(
+        stores::samples::fewOf(6, rc::gen::pair(stores::samples::anyAddress(), stores::samples::anyNode())),
+        [](auto const& pairs) { return std::map<Address, Node>(pairs.begin(), pairs.end()); });
+}
+
+rc::Gen<PartialWrite> anyPartialWrite() {
+    using Kind = PartialWrite::Kind;
+    return rc::gen::build<PartialWrite>(
+        rc::gen::set(&PartialWrite::kind,
+                     rc::gen::weightedElement<Kind>({{4, Kind::Set}, {3, Kind::Remove}, {1, Kind::Create}})),
+        rc::gen::set(&PartialWrite::nodes, anyNodes()),
+        rc::gen::set(&PartialWrite::addresses, stores::samples::fewOf(3, stores::samples::anyAddress())),
+        rc::gen::set(&PartialWrite::isNested, rc::gen::arbitrary<bool>()),
+        rc::gen::set(&PartialWrite::isKept, rc::gen::arbitrary<bool>()));
 }
 
 rc::Gen<Step> anyStep() {
     using Kind = Step::Kind;
     using InjectedFault = CrashingVolume::InjectedFault;
-    auto const nodes = rc::gen::map(
-        stores::samples::fewOf(6, rc::gen::pair(stores::samples::anyAddress(), stores::samples::anyNode())),
-        [](auto const& pairs) { return std::map<Address, Node>(pairs.begin(), pairs.end()); });
     return rc::gen::build<Step>(
         rc::gen::set(&Step::kind, rc::gen::weightedElement<Kind>({{10, Kind::Set},
                                                                   {4, Kind::Remove},
                                                                   {2, Kind::Create},
+                                                                  {6, Kind::Transaction},
                                                                   {1, Kind::Reopen},
                                                                   {1, Kind::Tidy},
                                                                   {2, Kind::Check},
                                                                   {1, Kind::PowerCut}})),
-        rc::gen::set(&Step::process, rc::gen::inRange<std::size_t>(0, 2)), rc::gen::set(&Step::nodes, nodes),
+        rc::gen::set(&Step::process, rc::gen::inRange<std::size_t>(0, 2)),
+        rc::gen::set(&Step::nodes, anyNodes()),
         rc::gen::set(&Step::addresses, stores::samples::fewOf(3, stores::samples::anyAddress())),
+        rc::gen::set(&Step::writes, stores::samples::fewOf(5, anyPartialWrite())),
+        rc::gen::set(&Step::isCommitted, rc::gen::weightedElement<bool>({{4, true}, {1, false}})),
         rc::gen::set(&Step::fault, rc::gen::weightedElement<InjectedFault>({{12, InjectedFault::None},
                                                                             {2, InjectedFault::Fails},
                                                                             {1, InjectedFault::FailsForGood},
@@ -235,24 +279,18 @@ private:
 
     void perform(Step const& step, Model& after) {
         auto& tree = *trees_.at(step.process);
-        auto addresses = step.addresses;
         switch (step.kind) {
-        case Step::Kind::Set: {
-            std::map<Address, std::shared_ptr<MetadataNode>> nodes;
-            for (auto const& [address, node] : step.nodes) {
-                nodes.emplace(address, std::make_shared<MetadataNodeSpecification>(*node));
-            }
-            after.set(step.nodes);
-            tree.setNodes(nodes);
+        case Step::Kind::Set:
+            write(tree, {.kind = PartialWrite::Kind::Set, .nodes = step.nodes}, after);
             break;
-        }
         case Step::Kind::Remove:
-            after.remove(step.addresses);
-            tree.removeNodes(addresses);
+            write(tree, {.kind = PartialWrite::Kind::Remove, .addresses = step.addresses}, after);
             break;
         case Step::Kind::Create:
-            after.create(step.addresses);
-            tree.createPaths(addresses);
+            write(tree, {.kind = PartialWrite::Kind::Create, .addresses = step.addresses}, after);
+            break;
+        case Step::Kind::Transaction:
+            runTransaction(tree, step, after);
             break;
         case Step::Kind::Reopen:
             reopen(step.process);
@@ -266,6 +304,59 @@ private:
         case Step::Kind::PowerCut:
             break;
         }
+    }
+
+    /// Changes the model first: the write may fail when it is already in the project.
+    static void write(TreeMetadataManager& tree, PartialWrite const& step, Model& after) {
+        auto addresses = step.addresses;
+        switch (step.kind) {
+        case PartialWrite::Kind::Set: {
+            std::map<Address, std::shared_ptr<MetadataNode>> nodes;
+            for (auto const& [address, node] : step.nodes) {
+                nodes.emplace(address, std::make_shared<MetadataNodeSpecification>(*node));
+            }
+            after.set(step.nodes);
+            tree.setNodes(nodes);
+            break;
+        }
+        case PartialWrite::Kind::Remove:
+            after.remove(step.addresses);
+            tree.removeNodes(addresses);
+            break;
+        case PartialWrite::Kind::Create:
+            after.create(step.addresses);
+            tree.createPaths(addresses);
+            break;
+        }
+    }
+
+    static void runTransaction(TreeMetadataManager& tree, Step const& step, Model& after) {
+        auto const before = after;
+        auto transaction = tree.transaction();
+        for (auto const& part : step.writes) {
+            auto const beforePart = after;
+            auto nested = part.isNested ? std::optional(tree.transaction()) : std::nullopt;
+            write(tree, part, after);
+            if (nested && part.isKept) {
+                nested->commit();
+            } else if (nested) {
+                after = beforePart;
+            }
+            nested.reset();
+            require(contentOf(tree) == visible(after.content()),
+                    "an operation in a transaction does not see the effects of the earlier ones");
+        }
+        if (step.isCommitted) {
+            transaction.commit();
+        } else {
+            after = before;
+        }
+    }
+
+    static Content contentOf(TreeMetadataManager& tree) {
+        Content content;
+        ask(tree, Address::root(), content);
+        return content;
     }
 
     /// The process has died: the destructors of its objects must not change the disk.
@@ -308,9 +399,7 @@ private:
     Content visibleTo(std::size_t process) {
         auto& tree = *trees_.at(process);
         auto const guard = tree.acquireReadLock(); // one check for changes for all questions
-        Content content;
-        ask(tree, Address::root(), content);
-        return content;
+        return contentOf(tree);
     }
 
     void check(std::size_t process) {
@@ -388,7 +477,7 @@ TEST(TextBackendModel, anOldTextTornByAPowerCutDoesNotReplaceTheNewOne) {
 TEST(TextBackendModel, theSameHoldsForTextsWithTheRealLimits) {
     std::size_t appends = 0;
     std::size_t rewrites = 0;
-    for (unsigned seed = 1; seed <= 2; ++seed) {
+    for (unsigned seed = 1; seed <= 3; ++seed) {
         Processes processes({}, seed);
         Step many{.kind = Step::Kind::Set};
         auto const folder = std::u16string(200, u'x'); // long, so that few nodes make a long text

@@ -1,21 +1,23 @@
 #pragma once
 
-#include <functional>
+#include <cstdint>
 #include <memory>
 #include <vector>
 
 #include "project/metadata/MetadataManager.hpp"
 #include "project/stores/Backend.hpp"
+#include "project/stores/Transaction.hpp"
 
 namespace project::stores {
 
 /// The metadata store of the library: a tree in memory, which is loaded level by level from a backend on
 /// request and written through to it.
 ///
-/// A write has these steps: nodes that are equal to the stored ones are left out; the backend writes; the
-/// tree changes; the listeners are notified; the backend keeps. If a step throws, the backend discards, the
+/// A write has these steps: nodes that are equal to the stored ones are left out; the tree changes; the
+/// backend writes; the listeners are notified; the backend keeps. If a step throws, the backend discards, the
 /// tree returns to its previous state, listeners that were already notified are notified of the reverse, and
-/// the exception propagates to the caller.
+/// the exception propagates to the caller. In a transaction only the first two steps happen at once; the
+/// others happen at its commit, for all writes together.
 class PROJECT_STORES_EXPORT TreeMetadataManager : public metadata::MetadataManager {
 public:
     /// @param metadataRoot the folder with the backend's files, absolute; nothing is read here.
@@ -34,6 +36,13 @@ public:
     void createPaths(std::vector<metadata::MetadataPath>& paths) override;
     bool pathExists(metadata::MetadataPath path) override;
 
+    /// Takes the write guard and begins a transaction, which the writes of this thread belong to until it
+    /// ends. If one is open already, the new one is nested in it.
+    /// @throws std::system_error (resource_deadlock_would_occur) if this thread has read guards only.
+    /// @throws StoreError if another process holds the lock, as a write does, or in a listener that is being
+    ///         notified of a write.
+    Transaction transaction();
+
     /// The changes of other processes since the last call, or since the first guard if this is the first
     /// call: one difference for each address, sorted, from before its first change to after its last. An
     /// address that is as it was before is left out.
@@ -43,7 +52,12 @@ public:
     Changes takeOthersChanges();
 
 private:
+    friend class Transaction;
     class State;
+
+    bool isInnermost(std::uint64_t transaction) const noexcept;
+    void commitInnermost();
+    void rollBack(std::uint64_t transaction) noexcept;
 
     std::unique_ptr<State> state_;
 };
