@@ -8,61 +8,53 @@
 #include <vector>
 
 #include "EventQueue.hpp"
-#include "project/metadata/MetadataManager.hpp"
+#include "TransactionFiles.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
 
 namespace project::session {
 
 class DefinitionStager;
 
-/// Runs every change that an application makes through a session:
-///
-/// 1. It takes the store's write guard.
-/// 2. It runs the operation. The managers note paths for source control, write the store and raise events,
-///    which the event queue collects.
-/// 3. It stages the text, if the session stages each change.
-/// 4. It releases the guard and dispatches the events.
-/// 5. If the operation or staging failed, it throws the error.
-///
-/// A manager raises an event after it has committed the write that the event reports. The events of an
-/// operation that throws therefore report writes that remain, and are dispatched too; an operation that
-/// throws before it writes has none. In both cases the queue is empty afterwards.
-///
-/// The guard covers steps 2 and 3 because the store notifies its listeners of every write: without it, the
-/// write of another thread would stage, or remove from git's index, paths of an operation that has not
-/// happened yet.
+/// Runs every change that an application makes through a session. A change is a step: an operation, or a
+/// transaction, in which the operations are nested steps. See ChangeStep.
 class ChangeExecutor {
 public:
-    /// @param store borrowed, as are the stager and the queue.
+    /// @param store borrowed, as are the stager, the files and the queue.
     /// @param stager null if the text is not staged after each change.
     /// @param raised the queue of the events that the managers raise.
     /// @param observers the broadcaster to dispatch these events on.
-    ChangeExecutor(metadata::MetadataManager& store, DefinitionStager* stager, EventQueue& raised,
+    ChangeExecutor(stores::TreeMetadataManager& store, DefinitionStager* stager, TransactionFiles& files,
+                   EventQueue& raised,
                    std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers);
 
-    /// @param added the files that the operation adds to the project.
+    /// Runs one operation as a step.
+    /// @param files the files that the operation adds to the project or removes from it.
     /// @return the result of the operation.
-    /// @throws the operation's exception, and then stages nothing: the next change stages the text; else
-    ///         the error of staging; else the exception of a slot.
+    /// @throws the exception of the operation or of ChangeStep::commit.
     template <typename Operation>
-    auto execute(Operation const& operation, std::vector<management::Path> const& added = {}) {
+    auto execute(Operation const& operation, ChangedFiles const& files = {}) {
         if constexpr (std::is_void_v<decltype(operation())>) {
-            run(operation, added);
+            run(operation, files);
         } else {
             std::optional<decltype(operation())> result;
-            run([&] { result = operation(); }, added);
+            run([&] { result = operation(); }, files);
             return *std::move(result);
         }
     }
 
 private:
-    void run(std::function<void()> const& operation, std::vector<management::Path> const& added);
-    void stage(std::vector<management::Path> const& added);
+    friend class ChangeStep;
+
+    void run(std::function<void()> const& operation, ChangedFiles const& files);
+    void stage();
     void dispatch(std::vector<Event> const& events);
 
-    metadata::MetadataManager& store_;
+    stores::TreeMetadataManager& store_;
     DefinitionStager* stager_;
+    TransactionFiles& files_;
     EventQueue& raised_;
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers_;
+    std::size_t openSteps_ = 0;
 };
 
 } // namespace project::session

@@ -36,6 +36,10 @@ EventQueue::EventQueue() : input_(std::make_shared<Broadcaster>()) {
     input_->onReferencesChanged(appendTo(events_, &Broadcaster::dispatchReferencesChanged));
 }
 
+void EventQueue::dropBehind(std::size_t count) noexcept {
+    events_.erase(events_.begin() + static_cast<std::ptrdiff_t>(count), events_.end());
+}
+
 std::vector<Event> EventQueue::take() {
     return std::exchange(events_, {});
 }

@@ -25,6 +25,13 @@ public:
         return input_;
     }
 
+    /// The number of events that are waiting.
+    std::size_t size() const noexcept { return events_.size(); }
+
+    /// Removes all events but the first ones: what they report was rolled back.
+    /// @param count the number of events to keep, at most size().
+    void dropBehind(std::size_t count) noexcept;
+
     /// Removes and returns all events, in the order in which they were raised.
     std::vector<Event> take();
 

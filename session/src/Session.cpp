@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "ChangeStep.hpp"
 #include "SessionState.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
@@ -41,6 +42,10 @@ Session::~Session() = default;
 
 management::ProjectManager& Session::project() noexcept {
     return *state_->project;
+}
+
+Transaction Session::transaction() {
+    return Transaction(std::make_unique<ChangeStep>(state_->executor, ChangeStep::Kind::Transaction));
 }
 
 std::shared_ptr<management::DispatchableProjectEventBroadcaster> const& Session::events() const noexcept {

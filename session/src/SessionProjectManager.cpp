@@ -16,11 +16,11 @@ using management::LabelIdentifier;
 using management::Path;
 
 void SessionFileManager::add(std::vector<Path> const& files) {
-    executor_.execute([&] { FileManagerDecorator::add(files); }, files);
+    executor_.execute([&] { FileManagerDecorator::add(files); }, {.added = files});
 }
 
 std::vector<Path> SessionFileManager::remove(std::vector<Path> const& files) {
-    return executor_.execute([&] { return FileManagerDecorator::remove(files); });
+    return executor_.execute([&] { return FileManagerDecorator::remove(files); }, {.removed = files});
 }
 
 std::vector<FileLabel> SessionFileManager::addLabels(std::vector<Path> const& files,

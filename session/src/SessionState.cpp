@@ -52,9 +52,12 @@ Session::State::State(Path const& folder, Options options)
       store(makeStore(options)),
       stager(makeStager()),
       events(std::make_shared<DispatchableProjectEventBroadcaster>()),
-      executor(*store, options.sourceControl == SourceControl::EachChange ? stager.get() : nullptr, raised,
-               events),
-      project(makeManagers()) {
+      managers(makeManagers()),
+      files(managers.sourceControl,
+            [this](Path const& file) { return project->getFileManager().isFileInProject(file); }),
+      executor(*store, options.sourceControl == SourceControl::EachChange ? stager.get() : nullptr, files,
+               raised, events),
+      project(std::make_unique<SessionProjectManager>(std::move(managers.outermost), executor)) {
 }
 
 std::shared_ptr<TreeMetadataManager> Session::State::makeStore(Options options) {
@@ -71,13 +74,16 @@ std::unique_ptr<DefinitionStager> Session::State::makeStager() {
     return std::make_unique<DefinitionStager>(*store, *adapter, TextBackend::textPath(root));
 }
 
-std::unique_ptr<ProjectManager> Session::State::makeManagers() {
-    std::unique_ptr<ProjectManager> result = std::make_unique<ProjectManagerBase>(root, store);
+Session::State::Managers Session::State::makeManagers() {
+    Managers result{std::make_unique<ProjectManagerBase>(root, store)};
     if (adapter) {
-        result = std::make_unique<CMAwareProjectManager>(std::move(result), *adapter);
+        auto aware = std::make_unique<CMAwareProjectManager>(std::move(result.outermost), *adapter);
+        result.sourceControl = aware.get();
+        result.outermost = std::move(aware);
     }
-    result = std::make_unique<EventBroadcastingProjectManager>(std::move(result), raised.input());
-    return std::make_unique<SessionProjectManager>(std::move(result), executor);
+    result.outermost =
+        std::make_unique<EventBroadcastingProjectManager>(std::move(result.outermost), raised.input());
+    return result;
 }
 
 void Session::State::requireProject() const {

@@ -8,6 +8,8 @@
 #include "ChangeExecutor.hpp"
 #include "DefinitionStager.hpp"
 #include "EventQueue.hpp"
+#include "TransactionFiles.hpp"
+#include "project/cm/CMAwareProjectManager.hpp"
 #include "project/git/GitAdapter.hpp"
 #include "project/session.hpp"
 #include "project/stores/TextBackend.hpp"
@@ -20,6 +22,12 @@ namespace project::session {
 class Session::State {
 public:
     State(Path const& folder, Options options);
+
+    /// The managers between the store and the session's own.
+    struct Managers {
+        std::unique_ptr<management::ProjectManager> outermost;      ///< until the session's own has it
+        management::CMAwareProjectManager* sourceControl = nullptr; ///< one of them; null if it is off
+    };
 
     /// @throws StoreError if the folder does not contain a text.
     void requireProject() const;
@@ -38,13 +46,15 @@ public:
     std::unique_ptr<DefinitionStager> stager; ///< null if source control is off
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> events;
     EventQueue raised; ///< by the managers
+    Managers managers;
+    TransactionFiles files;
     ChangeExecutor executor;
     std::unique_ptr<management::ProjectManager> project;
 
 private:
     std::shared_ptr<stores::TreeMetadataManager> makeStore(Options options);
     std::unique_ptr<DefinitionStager> makeStager();
-    std::unique_ptr<management::ProjectManager> makeManagers();
+    Managers makeManagers();
     bool isStoreEmpty() const;
     void queueEventsOfOthers();
     std::optional<Event> nextEventOfOthers();

@@ -1,5 +1,7 @@
 #include "cm/CMProjectFileEventHandler.hpp"
 
+#include <utility>
+
 namespace project::management {
 
 namespace {
@@ -24,13 +26,13 @@ void CMProjectFileEventHandler::fileRemovalRequested(metadata::MetadataManager& 
                                                      Path const& /*metadataRoot*/,
                                                      std::vector<Path> const& files) {
     noteRemoval(files);
-    actionManager_.remove(takeAll(pendingRemovals_));
+    actionManager_.remove(takeAll(noted_.removals));
 }
 
 void CMProjectFileEventHandler::fileAdditionRequested(metadata::MetadataManager& /*store*/,
                                                       std::vector<Path> const& files) {
     noteAddition(files);
-    actionManager_.add(takeAll(pendingAdditions_), root_);
+    actionManager_.add(takeAll(noted_.additions), root_);
 }
 
 bool CMProjectFileEventHandler::acceptsFileChangeRequests() {
@@ -38,11 +40,15 @@ bool CMProjectFileEventHandler::acceptsFileChangeRequests() {
 }
 
 void CMProjectFileEventHandler::noteAddition(std::vector<Path> const& files) {
-    pendingAdditions_.insert(files.begin(), files.end());
+    noted_.additions.insert(files.begin(), files.end());
 }
 
 void CMProjectFileEventHandler::noteRemoval(std::vector<Path> const& files) {
-    pendingRemovals_.insert(files.begin(), files.end());
+    noted_.removals.insert(files.begin(), files.end());
+}
+
+NotedFiles CMProjectFileEventHandler::exchangeNoted(NotedFiles files) {
+    return std::exchange(noted_, std::move(files));
 }
 
 } // namespace project::management

@@ -1,10 +1,10 @@
 #pragma once
 
-#include <set>
 #include <vector>
 
 #include "cm/CMActionManager.hpp"
 #include "cmlink/CMAdapter.hpp"
+#include "project/cm/NotedFiles.hpp"
 #include "project/metadata/FileChangeRequestListener.hpp"
 
 namespace project::management {
@@ -36,12 +36,14 @@ public:
     /// Call it before these files are removed.
     void noteRemoval(std::vector<Path> const& files);
 
+    /// Replaces the noted files. @return the earlier ones.
+    NotedFiles exchangeNoted(NotedFiles files);
+
 private:
     cmlink::CMAdapter& adapter_;
     CMActionManager actionManager_;
     Path root_;
-    std::set<Path> pendingAdditions_;
-    std::set<Path> pendingRemovals_;
+    NotedFiles noted_;
 };
 
 } // namespace project::management

@@ -18,4 +18,8 @@ FileManager& InternalCMAwareProjectManager::getFileManager() {
     return fileManager_;
 }
 
+NotedFiles InternalCMAwareProjectManager::exchangeNotedFiles(NotedFiles files) {
+    return handler_->exchangeNoted(std::move(files));
+}
+
 } // namespace project::management

@@ -19,6 +19,7 @@ public:
     InternalCMAwareProjectManager(std::unique_ptr<ProjectManager> inner, cmlink::CMAdapter& adapter);
 
     FileManager& getFileManager() override;
+    NotedFiles exchangeNotedFiles(NotedFiles files);
 
 private:
     cmlink::CMAdapter& adapter_;

@@ -3,9 +3,12 @@
 #include <memory>
 
 #include "cmlink/CMAdapter.hpp"
+#include "project/cm/NotedFiles.hpp"
 #include "project/decorators/ProjectManagerDecorator.hpp"
 
 namespace project::management {
+
+class InternalCMAwareProjectManager;
 
 /// Wraps a project so that source control follows it. Files that are added through it are put under source
 /// control, together with their folders and the files that the store creates for them. Files that are
@@ -30,6 +33,18 @@ public:
     /// @param adapter borrowed; must outlive this object.
     CMAwareProjectManager(std::unique_ptr<ProjectManager> inner, cmlink::CMAdapter& adapter);
     ~CMAwareProjectManager() override;
+
+    /// Replaces the files that wait for the next notification of the store. For a caller that collects
+    /// several operations into one write and knows which of their files are added or removed in the end.
+    /// Call it under the store's write guard.
+    /// @return the files that have waited until now.
+    NotedFiles exchangeNotedFiles(NotedFiles files);
+
+private:
+    /// Takes ownership.
+    explicit CMAwareProjectManager(InternalCMAwareProjectManager* inner);
+
+    InternalCMAwareProjectManager& inner_; ///< owned by the base class
 };
 
 } // namespace project::management

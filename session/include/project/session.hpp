@@ -5,6 +5,7 @@
 
 #include "project/management.hpp"
 #include "project/session/Export.hpp"
+#include "project/session/Transaction.hpp"
 
 namespace project::session {
 
@@ -74,6 +75,13 @@ public:
     /// The outermost manager: changes made through it are committed, then staged, then reported to
     /// observers.
     management::ProjectManager& project() noexcept;
+
+    /// Begins a transaction: the following changes of this thread are one step, which is in the project when
+    /// the transaction is committed. If one is open already, the new one is nested in it.
+    ///
+    /// Takes the store's write guard until the transaction ends.
+    /// @throws stores::StoreError if another process holds the lock.
+    Transaction transaction();
 
     /// Reports changes that other processes, git or an editor made to the project: dispatches the matching
     /// events on events(), and metadataChange for everything that has no event of its own.

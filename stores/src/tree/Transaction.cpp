@@ -25,6 +25,10 @@ Transaction::~Transaction() {
     }
 }
 
+bool Transaction::isOpen() const noexcept {
+    return guard_ && store_->isOpen(number_);
+}
+
 void Transaction::commit() {
     requireInnermost();
     auto const guard = *std::exchange(guard_, std::nullopt); // released also if the commit fails

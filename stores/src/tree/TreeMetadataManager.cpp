@@ -229,6 +229,10 @@ Transaction TreeMetadataManager::transaction() {
     return Transaction(*this, std::move(guard), state_->log.begin());
 }
 
+bool TreeMetadataManager::isOpen(std::uint64_t transaction) const noexcept {
+    return state_->log.isOpen(transaction);
+}
+
 bool TreeMetadataManager::isInnermost(std::uint64_t transaction) const noexcept {
     return state_->log.isInnermost(transaction);
 }

@@ -21,6 +21,10 @@ std::uint64_t WriteLog::begin() {
     return ++lastNumber_;
 }
 
+bool WriteLog::isOpen(std::uint64_t transaction) const noexcept {
+    return std::ranges::find(open_, transaction, &OpenTransaction::number) != open_.end();
+}
+
 bool WriteLog::isInnermost(std::uint64_t transaction) const noexcept {
     return isInTransaction() && open_.back().number == transaction;
 }

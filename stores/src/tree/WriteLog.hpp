@@ -25,6 +25,8 @@ public:
 
     bool isInTransaction() const noexcept { return !open_.empty(); }
 
+    bool isOpen(std::uint64_t transaction) const noexcept;
+
     bool isInnermost(std::uint64_t transaction) const noexcept;
 
     /// Ends the innermost transaction and keeps its writes.

@@ -34,6 +34,9 @@ public:
     /// listener is notified.
     ~Transaction();
 
+    /// False if it was committed, or was rolled back with an outer one.
+    bool isOpen() const noexcept;
+
     /// Ends the transaction. The outermost one writes one batch, notifies the listeners, makes the batch
     /// durable, and releases the guard; it costs about as much as one write with the same nodes. A nested one
     /// leaves its writes to the outer one.

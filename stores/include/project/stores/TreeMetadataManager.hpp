@@ -55,6 +55,7 @@ private:
     friend class Transaction;
     class State;
 
+    bool isOpen(std::uint64_t transaction) const noexcept;
     bool isInnermost(std::uint64_t transaction) const noexcept;
     void commitInnermost();
     void rollBack(std::uint64_t transaction) noexcept;

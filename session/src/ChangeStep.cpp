@@ -1,0 +1,98 @@
+#include "ChangeStep.hpp"
+
+#include <exception>
+#include <vector>
+
+namespace project::session {
+
+namespace {
+
+/// Runs an action. @return its exception; null if it returned.
+template <typename Action>
+std::exception_ptr errorOf(Action const& action) {
+    try {
+        action();
+        return nullptr;
+    } catch (...) {
+        return std::current_exception();
+    }
+}
+
+} // namespace
+
+ChangeStep::ChangeStep(ChangeExecutor& executor, Kind kind)
+    : executor_(executor),
+      kind_(kind),
+      writes_(executor.store_.transaction()),
+      depth_(executor.openSteps_ + 1),
+      earlierEvents_(executor.raised_.size()),
+      earlierFiles_(executor.files_.mark()) {
+    if (isOutermost() && kind_ == Kind::Transaction) {
+        executor_.files_.beginTransaction();
+    }
+    executor_.openSteps_ = depth_;
+}
+
+ChangeStep::~ChangeStep() {
+    if (writes_.isOpen()) {
+        end();
+        drop();
+    }
+}
+
+void ChangeStep::commit() {
+    if (isOutermost()) {
+        commitOutermost();
+    } else {
+        commitWrites();
+    }
+}
+
+void ChangeStep::commitOutermost() {
+    std::vector<Event> events;
+    std::exception_ptr stagingError;
+    {
+        auto const guard = executor_.store_.acquireWriteLock(); // until the text is staged
+        commitWrites();
+        events = executor_.raised_.take();
+        stagingError = errorOf([this] { executor_.stage(); });
+    }
+    // The step is committed, so observers are called even if it could not be staged.
+    auto const slotError = errorOf([&] { executor_.dispatch(events); });
+    if (auto const& error = stagingError ? stagingError : slotError) {
+        std::rethrow_exception(error);
+    }
+}
+
+void ChangeStep::commitWrites() {
+    try {
+        if (isOutermost() && kind_ == Kind::Transaction) {
+            executor_.files_.passToSourceControl();
+        }
+        writes_.commit();
+    } catch (...) {
+        if (!writes_.isOpen()) {
+            end();
+            drop();
+        }
+        throw;
+    }
+    end();
+}
+
+void ChangeStep::end() noexcept {
+    executor_.openSteps_ = depth_ - 1;
+}
+
+void ChangeStep::drop() noexcept {
+    executor_.raised_.dropBehind(earlierEvents_);
+    executor_.files_.dropSince(earlierFiles_);
+    if (isOutermost()) {
+        if (kind_ == Kind::Transaction) {
+            executor_.files_.restoreEarlier();
+        }
+        executor_.files_.clear();
+    }
+}
+
+} // namespace project::session
