@@ -218,6 +218,7 @@ public:
         bool isDone = false;
         bool hasDied = false;
         bool isUnknown = false;
+        auto const earlierAppends = appends();
         try {
             perform(step, after);
             isDone = true;
@@ -229,9 +230,11 @@ public:
         }
         volume_->cancelPlan();
         if (isDone && after.content() != model_.content()) {
+            noteDurability(appends() > earlierAppends);
             model_ = after;
-            notDurable_.clear();
         }
+        mayLackName_ =
+            mayLackName_ || (isUnknown && step.fault == CrashingVolume::InjectedFault::FailsForGood);
         if (step.kind == Step::Kind::PowerCut || (hasDied && step.callsBefore % 2 == 0)) {
             cutPower(after);
         } else if (hasDied || isUnknown) {
@@ -359,6 +362,17 @@ private:
         return content;
     }
 
+    /// A committed batch is durable, with one exception, which the store does not promise: it was appended
+    /// to a text whose name may not be durable.
+    void noteDurability(bool isAppended) {
+        if (mayLackName_ && isAppended) {
+            notDurable_.push_back(model_);
+        } else {
+            notDurable_.clear();
+            mayLackName_ = false;
+        }
+    }
+
     /// The process has died: the destructors of its objects must not change the disk.
     void reopenDead(std::size_t process) {
         volume_->plan(CrashingVolume::InjectedFault::Dies, 0);
@@ -383,6 +397,7 @@ private:
     void cutPower(Model const& after) {
         volume_->powerCut();
         hadPowerCut_ = true;
+        mayLackName_ = false;
         reopenDead(0);
         reopenDead(1);
         auto possible = std::exchange(notDurable_, {});
@@ -416,6 +431,7 @@ private:
     std::array<std::unique_ptr<TreeMetadataManager>, 2> trees_;
     Model model_;
     bool hadPowerCut_ = false;
+    bool mayLackName_ = false; ///< a disk that failed for good could sync neither the folder nor a new text
     std::vector<Model> notDurable_; ///< contents that a power cut may restore
 };
 
