@@ -67,6 +67,20 @@ void makeSome(TreeMetadataManager& tree) {
     tree.createPaths(addresses);
 }
 
+/// Writes of every kind, with one that is rolled back.
+void changeMuchInATransaction(TreeMetadataManager& tree) {
+    auto transaction = tree.transaction();
+    addAndChange(tree);
+    removeSome(tree);
+    {
+        auto const rolledBack = tree.transaction();
+        addAnother(tree);
+        removeSome(tree);
+    }
+    makeSome(tree);
+    transaction.commit();
+}
+
 /// All answers of a tree.
 void collect(TreeMetadataManager& tree, Address const& parent, Content& content) {
     for (auto const& child : tree.getChildNodes(parent)) {
@@ -156,7 +170,7 @@ bool TreeAfterFailures::writeWithFault(Write write, Options options, InjectedFau
 TEST_F(TreeAfterFailures, aWriteThatFailsAtAnyCallLeavesTheTreeAsItWas) {
     prepare(manyFiles(20));
 
-    for (auto const write : {addAndChange, removeSome, makeSome}) {
+    for (auto const write : {addAndChange, removeSome, makeSome, changeMuchInATransaction}) {
         failEverywhere(write, rewriting());
         failEverywhere(write, appending());
     }
@@ -168,7 +182,7 @@ TEST_F(TreeAfterFailures, aWriteThatFailsAtAnyCallLeavesTheTreeAsItWas) {
 }
 
 TEST_F(TreeAfterFailures, aFirstWriteThatFailsAtAnyCallNotifiesListenersOfTheDeletion) {
-    for (auto const write : {addAndChange, makeSome}) {
+    for (auto const write : {addAndChange, makeSome, changeMuchInATransaction}) {
         failEverywhere(write, rewriting());
     }
 
