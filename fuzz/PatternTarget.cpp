@@ -15,10 +15,10 @@ using project::git::NamePattern;
 /// A pattern that matches a file also matches a folder of that name, and its answer is always the same.
 void checkPattern(NamePattern const& pattern, std::string_view path) {
     for (bool const ignoresCase : {false, true}) {
-        bool const asFile = pattern.matches(path, false, ignoresCase);
-        bool const asFolder = pattern.matches(path, true, ignoresCase);
+        bool const asFile = pattern.isMatch(path, false, ignoresCase);
+        bool const asFolder = pattern.isMatch(path, true, ignoresCase);
         require(!asFile || asFolder, "a pattern that matches a file matches a folder");
-        require(asFile == pattern.matches(path, false, ignoresCase), "a pattern gives the same answer again");
+        require(asFile == pattern.isMatch(path, false, ignoresCase), "a pattern gives the same answer again");
     }
 }
 
