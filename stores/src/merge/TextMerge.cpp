@@ -5,8 +5,10 @@
 #include <stdexcept>
 #include <utility>
 
+#include "merge/DisputedBase.hpp"
 #include "merge/MergedBody.hpp"
 #include "project/stores/StoreError.hpp"
+#include "text/ConflictReader.hpp"
 #include "text/TextLines.hpp"
 #include "text/TextReader.hpp"
 
@@ -14,23 +16,14 @@ namespace project::stores {
 
 namespace {
 
-/// Refuses versions of which the merge could silently lose something. A torn tail is ignored, as everywhere.
-void requireSound(TextReading const& reading, char const* version) {
-    for (Fault const& fault : reading.faults) {
-        if (fault.kind == Fault::Kind::Damage) {
-            throw StoreError(StoreError::Kind::Damaged, version, fault.line,
-                             "the text is damaged: " + fault.problem,
-                             "Repair that version before you merge it.");
-        }
-        if (fault.kind == Fault::Kind::Conflict) {
-            throw StoreError(StoreError::Kind::Conflict, version, fault.line,
-                             "another merge left conflict markers",
-                             "Resolve the conflicts in that version before you merge it.");
-        }
-    }
+Fault const* firstFault(TextReading const& reading, Fault::Kind kind) {
+    auto const found = std::ranges::find(reading.faults, kind, &Fault::kind);
+    return found == reading.faults.end() ? nullptr : &*found;
 }
 
-TextBody readBody(std::string_view text, char const* version) {
+/// Reads a version, unless the merge could silently lose something of it. A torn tail is ignored, as
+/// everywhere.
+TextReading readUndamaged(std::string_view text, char const* version) {
     std::optional<TextReading> reading = readText(std::string(text), version);
     if (!reading) {
         auto const lines = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
@@ -38,9 +31,52 @@ TextBody readBody(std::string_view text, char const* version) {
                          lines + (text.empty() || text.back() != '\n' ? 1 : 0),
                          "the text ends before the last line of its body", "");
     }
-    requireSound(*reading, version);
-    bool const isTidy = reading->isCanonical && reading->content.overlay().empty();
-    return isTidy ? std::move(reading->content.body()) : reading->content.write({});
+    if (auto const* const damage = firstFault(*reading, Fault::Kind::Damage)) {
+        throw StoreError(StoreError::Kind::Damaged, version, damage->line,
+                         "the text is damaged: " + damage->problem,
+                         "Repair that version before you merge it.");
+    }
+    return *std::move(reading);
+}
+
+TextBody bodyOf(TextReading reading) {
+    bool const isTidy = reading.isCanonical && reading.content.overlay().empty();
+    return isTidy ? std::move(reading.content.body()) : reading.content.write({});
+}
+
+TextBody readSide(std::string_view text, char const* version) {
+    auto reading = readUndamaged(text, version);
+    if (auto const* const conflict = firstFault(reading, Fault::Kind::Conflict)) {
+        throw StoreError(StoreError::Kind::Conflict, version, conflict->line,
+                         "another merge left conflict markers",
+                         "Resolve the conflicts in that version before you merge it.");
+    }
+    return bodyOf(std::move(reading));
+}
+
+/// An ASCII text that neither body contains.
+std::string textInNeither(TextBody const& ours, TextBody const& theirs) {
+    std::string text = "(disputed)";
+    auto const isIn = [&](TextBody const& body) { return body.bytes().find(text) != std::string::npos; };
+    while (isIn(ours) || isIn(theirs)) {
+        text += ')';
+    }
+    return text;
+}
+
+TextBody readBase(std::string_view text, TextBody const& ours, TextBody const& theirs) {
+    if (text.empty()) {
+        return {};
+    }
+    constexpr char const* version = "base";
+    auto reading = readUndamaged(text, version);
+    if (firstFault(reading, Fault::Kind::Conflict) == nullptr) {
+        return bodyOf(std::move(reading));
+    }
+    auto const [first, second] = sidesOfConflictedText(std::string(text));
+    auto const disputed = textInNeither(ours, theirs);
+    return disputedBase(bodyOf(readUndamaged(first, version)), bodyOf(readUndamaged(second, version)),
+                        std::u16string(disputed.begin(), disputed.end()));
 }
 
 void appendPart(std::string& out, std::string_view marker, std::string_view lines) {
@@ -116,8 +152,8 @@ std::string TextMerge::textWithMarkers() const {
 }
 
 TextMerge mergeTexts(std::string_view base, std::string_view ours, std::string_view theirs) {
-    ThreeWay<TextBody> const bodies{base.empty() ? TextBody() : readBody(base, "base"),
-                                    readBody(ours, "ours"), readBody(theirs, "theirs")};
+    ThreeWay<TextBody> bodies{{}, readSide(ours, "ours"), readSide(theirs, "theirs")};
+    bodies.base = readBase(base, bodies.ours, bodies.theirs);
     return TextMerge(std::make_unique<TextMerge::State const>(mergeBodies(bodies)));
 }
 

@@ -100,6 +100,14 @@ private:
     std::span<TextLine const> lines_;
 };
 
+std::string joined(std::vector<TextLine> const& lines) {
+    std::string text;
+    for (TextLine const& line : lines) {
+        text += line.whole;
+    }
+    return text;
+}
+
 /// Sorts faults by line. Faults in lines of both sides are reported once.
 void sortFaults(std::vector<Fault>& faults) {
     std::stable_sort(faults.begin(), faults.end(),
@@ -141,6 +149,11 @@ std::optional<TextReading> readConflictedText(std::string bytes, std::string con
     reading.isCanonical = false;
     reading.content.body() = TextBody(std::move(bytes));
     return reading;
+}
+
+std::pair<std::string, std::string> sidesOfConflictedText(std::string const& bytes) {
+    Sides const sides = split(bytes);
+    return {joined(sides.ours), joined(sides.theirs)};
 }
 
 } // namespace project::stores

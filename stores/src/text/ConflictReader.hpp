@@ -2,6 +2,7 @@
 
 #include <optional>
 #include <string>
+#include <utility>
 
 #include "text/TextReader.hpp"
 
@@ -13,5 +14,8 @@ namespace project::stores {
 ///
 /// Arguments and result are those of readText.
 std::optional<TextReading> readConflictedText(std::string bytes, std::string const& file);
+
+/// The two texts that a text with conflict markers is read as.
+std::pair<std::string, std::string> sidesOfConflictedText(std::string const& bytes);
 
 } // namespace project::stores

@@ -191,13 +191,23 @@ INSTANTIATE_TEST_SUITE_P(
     ::testing::Values(
         BadText{"noJson", bodyOf({R"("a")", "nonsense"}), 3, StoreError::Kind::Damaged},
         BadText{"unknownMember", bodyOf({R"({"file":"a","color":"red"})"}), 2, StoreError::Kind::Damaged},
-        BadText{"markers", bodyOf({R"("a")", "<<<<<<< ours", "=======", ">>>>>>> theirs"}), 3,
-                StoreError::Kind::Conflict},
         BadText{"brokenLine", std::string(firstLine) + "\n\"a", 2, StoreError::Kind::Damaged},
         BadText{"noLastLine", std::string(firstLine) + "\n\"a\"\n", 2, StoreError::Kind::Damaged},
         BadText{"laterVersion", "{\"format\":\"project-definition\",\"version\":2}\n", 1,
                 StoreError::Kind::Refused},
         BadText{"somethingElse", "\n\n", 1, StoreError::Kind::Damaged}));
+
+TEST(TextMergeInput, conflictMarkersInASideAreRefused) {
+    std::string const good = bodyOf({R"("a")"});
+    std::string const marked = bodyOf({R"("a")", "<<<<<<< ours", "=======", ">>>>>>> theirs"});
+    for (auto const& [error, version] :
+         {std::pair{test::errorOf([&] { mergeTexts(good, marked, good); }), "ours"},
+          std::pair{test::errorOf([&] { mergeTexts(good, good, marked); }), "theirs"}}) {
+        EXPECT_EQ(error.kind(), StoreError::Kind::Conflict);
+        EXPECT_EQ(error.file(), version);
+        EXPECT_EQ(error.line(), 3U);
+    }
+}
 
 TEST(TextMergeInput, anEmptyTextIsNotAVersionOfAProject) {
     std::string const good = bodyOf({R"("a")"});

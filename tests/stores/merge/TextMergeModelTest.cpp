@@ -131,6 +131,14 @@ std::vector<MergeSide> all(TextMerge const& merge, MergeSide side) {
     return std::vector<MergeSide>(merge.conflicts().size(), side);
 }
 
+std::vector<MergeSide> drawChoices(TextMerge const& merge) {
+    std::vector<MergeSide> choices;
+    for (std::size_t i = 0; i < merge.conflicts().size(); ++i) {
+        choices.push_back(*rc::gen::element(MergeSide::Ours, MergeSide::Theirs));
+    }
+    return choices;
+}
+
 RC_GTEST_PROP(TextMergeModel, aChangeOfOnlyOneSideIsApplied, ()) {
     Versions const versions;
     RC_ASSERT(merged(versions.base, versions.base, versions.ours) == tidied(versions.ours));
@@ -156,11 +164,7 @@ RC_GTEST_PROP(TextMergeModel, exchangingTheSidesGivesTheSameText, ()) {
 RC_GTEST_PROP(TextMergeModel, theMergedTextIsTidyWhateverIsChosen, ()) {
     Versions const versions;
     TextMerge const merge = versions.merge();
-    std::vector<MergeSide> choices;
-    for (std::size_t i = 0; i < merge.conflicts().size(); ++i) {
-        choices.push_back(*rc::gen::element(MergeSide::Ours, MergeSide::Theirs));
-    }
-    std::string const text = merge.text(choices);
+    std::string const text = merge.text(drawChoices(merge));
     ProjectText const read = readWhole(text);
     RC_ASSERT(read.isTidy());
     RC_ASSERT(read.faults().empty());
@@ -231,6 +235,37 @@ RC_GTEST_PROP(TextMergeModel, aTextWithMarkersIsReadAsBothSidesJoined, ()) {
             RC_ASSERT(content.contains(address));
         }
     }
+}
+
+/// Such addresses are kept, whatever the earlier merges decided.
+bool hasAddressWithoutNode(TextMerge const& merge) {
+    return merge.textWithMarkers().find("\"node\":false") != std::string::npos;
+}
+
+RC_GTEST_PROP(TextMergeModel, twoResolutionsOfOneMergeAreAConflictUnlessTheyAreEqual, ()) {
+    TextMerge const merge = Versions().merge();
+    RC_PRE(!hasAddressWithoutNode(merge));
+    std::string const one = merge.text(drawChoices(merge));
+    std::string const two = merge.text(drawChoices(merge));
+    TextMerge const again = mergeTexts(merge.textWithMarkers(), one, two);
+    RC_CLASSIFY(one != two, "conflicts");
+    RC_ASSERT(again.conflicts().empty() == (one == two));
+    RC_ASSERT(again.text(all(again, MergeSide::Ours)) == one);
+    RC_ASSERT(again.text(all(again, MergeSide::Theirs)) == two);
+}
+
+RC_GTEST_PROP(TextMergeModel, aChangeAfterAResolutionIsAppliedOrInConflict, ()) {
+    TextMerge const merge = Versions().merge();
+    RC_PRE(!hasAddressWithoutNode(merge));
+    std::string const resolved = merge.text(drawChoices(merge));
+    Nodes nodes;
+    for (auto const& [address, before, after] : ProjectText::empty().differencesTo(readWhole(resolved))) {
+        nodes.emplace(address, after);
+    }
+    std::string const changed = readWhole(resolved).rewrittenWith(drawBatch(nodes, 4)).body();
+    TextMerge const again = mergeTexts(merge.textWithMarkers(), resolved, changed);
+    RC_CLASSIFY(!merge.conflicts().empty() && again.conflicts().empty() && changed != resolved, "applied");
+    RC_ASSERT(again.text(all(again, MergeSide::Theirs)) == changed);
 }
 
 Keys drawKeys() {

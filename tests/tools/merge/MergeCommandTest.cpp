@@ -95,6 +95,75 @@ TEST_F(MergeCommand, mergesProjectsThatBothSidesCreated) {
     EXPECT_THAT(list(), ::testing::ElementsAre("x", "y"));
 }
 
+/// Two branches that have merged each other. Each of them has resolved the conflict between them.
+class CrissCrossHistory : public MergingProject {
+protected:
+    void mergeEachOther(std::vector<std::string> const& theirs, std::vector<std::string> const& ours) const {
+        ASSERT_EQ(mergeOf(theirs, ours).exitCode, 1);
+        git_.run({"branch", "his", "main"});
+    }
+
+    /// @param choice of the branch that is checked out, which has the merge in progress.
+    void resolve(std::string const& choice) const {
+        ASSERT_THAT(tool({"resolve", choice}), SucceedsSilently());
+        commit("resolved");
+    }
+
+    void resolveOnBothBranches(std::string const& hisChoice, std::string const& herChoice) const {
+        resolve(hisChoice);
+        git_.run({"switch", "-q", "hers"});
+        ASSERT_EQ(git_.tryTo({"merge", "-q", "-m", "both", "his"}).exitCode, 1);
+        resolve(herChoice);
+    }
+
+    ProgramResult mergeHersIntoHis() const {
+        git_.run({"switch", "-q", "-f", "main"});
+        EXPECT_THAT(linesOf(git_.run({"merge-base", "--all", "main", "hers"})), ::testing::SizeIs(2));
+        return git_.tryTo({"merge", "-q", "-m", "again", "hers"});
+    }
+};
+
+TEST_F(CrissCrossHistory, isMergedIfBothBranchesResolvedTheConflictAlike) {
+    folder_.file(u"d");
+    mergeEachOther({"name", "Pump"}, {"name", "Valve"});
+    resolveOnBothBranches("--ours", "--theirs");
+    ASSERT_THAT(tool({"remove", "c"}), SucceedsSilently());
+    commit("hers again");
+    git_.run({"switch", "-q", "-f", "main"});
+    ASSERT_THAT(tool({"add", "d"}), SucceedsSilently());
+    commit("his again");
+
+    auto const merged = mergeHersIntoHis();
+
+    EXPECT_EQ(merged.exitCode, 0) << merged.errors;
+    EXPECT_THAT(tool({"name"}), Prints("Valve\n"));
+    EXPECT_THAT(list(), ::testing::ElementsAre("a", "b", "d"));
+}
+
+TEST_F(CrissCrossHistory, hasAConflictIfTheBranchesResolvedItDifferently) {
+    mergeEachOther({"name", "Pump"}, {"name", "Valve"});
+    resolveOnBothBranches("--ours", "--ours");
+
+    auto const merged = mergeHersIntoHis();
+
+    EXPECT_EQ(merged.exitCode, 1);
+    EXPECT_THAT(merged.errors, HasSubstr(" is set to \"Valve\" by ours and set to \"Pump\" by theirs"));
+    ASSERT_THAT(tool({"resolve", "--theirs"}), SucceedsSilently());
+    EXPECT_THAT(tool({"name"}), Prints("Pump\n"));
+}
+
+TEST_F(CrissCrossHistory, neitherLosesNorRestoresAFileThatOneBranchKept) {
+    mergeEachOther({"remove", "b"}, {"label", "put", "Status", "Done", "b"});
+    resolveOnBothBranches("--ours", "--ours");
+
+    auto const merged = mergeHersIntoHis();
+
+    EXPECT_EQ(merged.exitCode, 1);
+    EXPECT_THAT(merged.errors, HasSubstr(": the file \"b\" is removed by theirs and changed by ours\n"));
+    ASSERT_THAT(tool({"resolve", "--ours"}), SucceedsSilently());
+    EXPECT_THAT(tool({"label", "show", "b"}), Prints("Status: Done\n"));
+}
+
 TEST_F(MergeCommand, changesNothingWhenAVersionCannotBeRead) {
     auto const good = readText();
     folder_.addFile("base", good);

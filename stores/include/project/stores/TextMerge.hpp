@@ -54,10 +54,10 @@ private:
 ///
 /// Time and memory are proportional to the texts. Accesses no disk and takes no lock.
 ///
-/// @param base the common version; an empty text if both sides created the project.
-/// @throws StoreError if one of the texts is incomplete, damaged, of a later format, or contains conflict
-/// markers of
-///         another merge. Its file is "base", "ours" or "theirs".
+/// @param base the common version; an empty text if both sides created the project. It may contain conflict
+///        markers, if git merged it from several common versions: where these differ, the sides must agree.
+/// @throws StoreError if one of the texts is incomplete, damaged or of a later format, or if a side contains
+///         conflict markers of another merge. Its file is "base", "ours" or "theirs".
 PROJECT_STORES_EXPORT TextMerge mergeTexts(std::string_view base, std::string_view ours,
                                            std::string_view theirs);
 
