@@ -112,6 +112,15 @@ PathElement const& MetadataPath::operator[](std::size_t index) const noexcept {
     return ascend(step_.get(), index + 1)->element;
 }
 
+void MetadataPath::listSteps(std::vector<PathElement const*>& steps) const {
+    steps.resize(depth());
+    auto const* step = step_.get();
+    for (auto place = steps.rbegin(); place != steps.rend(); ++place) {
+        *place = &step->element;
+        step = step->parent.get();
+    }
+}
+
 std::size_t MetadataPath::depth() const noexcept {
     return step_ ? step_->depth : 0;
 }

@@ -44,6 +44,10 @@ public:
     /// depth(). The cost is one pointer for each step after it.
     PathElement const& operator[](std::size_t index) const noexcept;
 
+    /// Replaces the elements of a list by pointers to the steps from the root down. They are valid as long as
+    /// this address. The cost is one pointer for each step.
+    void listSteps(std::vector<PathElement const*>& steps) const;
+
     /// Returns the number of steps; 0 for the root.
     std::size_t depth() const noexcept;
 

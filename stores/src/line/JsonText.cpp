@@ -162,17 +162,22 @@ private:
 
 std::u16string decodeJsonContent(std::string_view content) {
     std::u16string text;
+    decodeJsonContent(content, text);
+    return text;
+}
+
+void decodeJsonContent(std::string_view content, std::u16string& text) {
     bool const isPlain = std::all_of(content.begin(), content.end(),
                                      [](char c) { return static_cast<signed char>(c) >= 0 && c != '\\'; });
     if (isPlain) {
         text.assign(content.begin(), content.end());
-        return text;
+        return;
     }
+    text.clear();
     CodeUnits units(content);
     for (int unit = units.next(); unit != endOfContent; unit = units.next()) {
         text += static_cast<char16_t>(unit);
     }
-    return text;
 }
 
 std::size_t firstDifference(std::string_view left, std::string_view right) noexcept {

@@ -44,6 +44,9 @@ private:
 /// The text that a content represents. @param content well-formed according to scanJsonContent.
 std::u16string decodeJsonContent(std::string_view content);
 
+/// The same in place of an earlier text, whose memory is used again.
+void decodeJsonContent(std::string_view content, std::u16string& text);
+
 /// Compares the texts of two canonical contents by code units. Decodes them only if there is an escape at the
 /// first difference.
 std::strong_ordering compareJsonContents(std::string_view left, std::string_view right) noexcept;

@@ -107,8 +107,14 @@ std::optional<ProjectText> ProjectText::read(std::string bytes, std::string cons
     return ProjectText(std::make_unique<State>(*std::move(reading)));
 }
 
+void ProjectText::children(Address const& parent, ChildSink& children) const {
+    state_->content().children(parent, children);
+}
+
 Children ProjectText::children(Address const& parent) const {
-    return state_->content().children(parent);
+    ChildCollector collector;
+    children(parent, collector);
+    return collector.take();
 }
 
 std::optional<std::vector<Difference>> ProjectText::extend(std::string_view added) {

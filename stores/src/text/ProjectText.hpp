@@ -31,7 +31,10 @@ public:
     ProjectText& operator=(ProjectText&&) noexcept;
     ~ProjectText();
 
-    /// The children of an address, sorted. Searches the lines once.
+    /// Passes on the children of an address, sorted. Searches the lines once.
+    void children(Address const& parent, ChildSink& children) const;
+
+    /// The same as a list.
     Children children(Address const& parent) const;
 
     /// Applies bytes that were appended to this text, if they are complete batches that chain to it.

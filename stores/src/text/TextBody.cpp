@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "line/CanonicalLine.hpp"
+#include "line/JsonText.hpp"
 #include "line/LineParser.hpp"
 #include "text/TextLines.hpp"
 
@@ -69,27 +70,26 @@ std::size_t TextBody::linesBefore(std::size_t offset) const noexcept {
     return begun == 0 ? 0 : begun - 1;
 }
 
-Children TextBody::children(Range below, std::size_t depth) const {
-    Children children;
+void TextBody::children(Range below, std::size_t depth, ChildSink& children) const {
+    std::u16string type;
+    std::u16string location;
     while (!below.empty()) {
         LineSteps steps(address(below.begin));
         for (std::size_t i = 0; i <= depth; ++i) {
             steps.next();
         }
-        Child child{toElement(steps), nullptr, false, false};
+        decodeJsonContent(steps.type(), type);
+        decodeJsonContent(steps.location(), location);
         LineAddress const prefix = steps.prefix();
+        AddressState state;
         if (!steps.next()) {
-            AddressState state = stateOfLine(line(below.begin));
-            child.node = std::move(state.node);
-            child.isCreated = state.isCreated;
+            state = stateOfLine(line(below.begin));
             ++below.begin;
         }
         std::size_t const end = endOf(below, prefix);
-        child.hasChildren = end > below.begin;
+        children.add({type, location, state.node, state.isCreated, end > below.begin});
         below.begin = end;
-        children.push_back(std::move(child));
     }
-    return children;
 }
 
 std::string TextBody::cutAt(std::size_t size) {

@@ -56,8 +56,8 @@ public:
     /// The number of lines that end, including their line ends, before a position.
     std::size_t linesBefore(std::size_t offset) const noexcept;
 
-    /// The children of an address of this depth. @param below the lines strictly below the address.
-    Children children(Range below, std::size_t depth) const;
+    /// Passes on the children of an address of this depth. @param below the lines strictly below the address.
+    void children(Range below, std::size_t depth, ChildSink& children) const;
 
     /// Adds a line, which must come after all lines added before. @param start the position of its first
     /// byte.

@@ -20,15 +20,14 @@ public:
     ChildWalk(TextBody const& body, TextBody::Range lines, Overlay::Range entries, std::size_t depth)
         : body_(body), lines_(lines), entry_(entries.begin()), end_(entries.end()), depth_(depth) {}
 
-    Children children() {
-        Children children;
+    void passOn(ChildSink& children) {
         while (!lines_.empty() || entry_ != end_) {
-            Child child = next();
+            Child const child = next();
             if (child.node || child.isCreated || child.hasChildren) {
-                children.push_back(std::move(child));
+                children.add({child.element.getType(), child.element.getLocation(), child.node,
+                              child.isCreated, child.hasChildren});
             }
         }
-        return children;
     }
 
 private:
@@ -121,7 +120,7 @@ private:
 
 } // namespace
 
-Children TextContent::children(Address const& parent) const {
+void TextContent::children(Address const& parent, ChildSink& children) const {
     AddressText const text(parent);
     TextBody::Range lines{0, 0};
     if (!overlay_.isHidden(parent)) {
@@ -132,9 +131,10 @@ Children TextContent::children(Address const& parent) const {
     }
     Overlay::Range const entries = overlay_.below(parent);
     if (entries.empty()) {
-        return body_.children(lines, parent.depth());
+        body_.children(lines, parent.depth(), children);
+    } else {
+        ChildWalk(body_, lines, entries, parent.depth()).passOn(children);
     }
-    return ChildWalk(body_, lines, entries, parent.depth()).children();
 }
 
 AddressState TextContent::at(Address const& address) const {

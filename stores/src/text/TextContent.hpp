@@ -26,7 +26,8 @@ public:
 
     Overlay const& overlay() const noexcept { return overlay_; }
 
-    Children children(Address const& parent) const;
+    /// Passes on the children of an address, sorted.
+    void children(Address const& parent, ChildSink& children) const;
 
     /// The state of an address; empty if the address has no line.
     AddressState at(Address const& address) const;

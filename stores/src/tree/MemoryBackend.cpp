@@ -9,8 +9,7 @@ Changes MemoryBackend::enter(Access /*access*/) {
 void MemoryBackend::leave() noexcept {
 }
 
-Children MemoryBackend::load(Address const& /*parent*/) {
-    return {};
+void MemoryBackend::load(Address const& /*parent*/, ChildSink& /*children*/) {
 }
 
 FileChanges MemoryBackend::write(Batch const& /*batch*/) {

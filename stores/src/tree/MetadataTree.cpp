@@ -1,177 +1,147 @@
 #include "tree/MetadataTree.hpp"
 
 #include <algorithm>
+#include <optional>
 #include <set>
 #include <utility>
 
 namespace project::stores {
-
-using metadata::PathElement;
 
 namespace {
 
 /// With more differences than this, it costs less to discard the tree than to reload each level concerned.
 constexpr std::size_t mostReloaded = 4096;
 
+/// The address with the first steps of another one.
+Address firstSteps(Address address, std::size_t depth) {
+    while (address.depth() > depth) {
+        address = address.parent();
+    }
+    return address;
+}
+
 } // namespace
 
-/// Orders siblings, whose addresses differ in the last step only.
-struct MetadataTree::ByElement {
-    using is_transparent = void;
-
-    bool operator()(Address const& left, Address const& right) const noexcept {
-        return left.leaf() < right.leaf();
-    }
-
-    bool operator()(Address const& left, PathElement const& right) const noexcept {
-        return left.leaf() < right;
-    }
-
-    bool operator()(PathElement const& left, Address const& right) const noexcept {
-        return left < right.leaf();
-    }
-};
-
-/// One address in the tree.
-struct MetadataTree::Place {
-    Node node;
-    bool isCreated = false;
-    std::atomic<bool> loaded = false;
-    std::unique_ptr<Places> below; ///< null if there is nothing below it, as far as it is loaded
-
-    bool isEmpty() const noexcept { return !below || below->empty(); }
-
-    Places& makeBelow() {
-        if (!below) {
-            below = std::make_unique<Places>();
-        }
-        return *below;
-    }
-
-    /// Extracts the place at an element; empty if there is none.
-    Places::node_type take(PathElement const& element) {
-        auto const found = makeBelow().find(element);
-        return found == below->end() ? Places::node_type() : below->extract(found);
-    }
-};
-
-/// One step for each change, to be undone from the last to the first.
+/// At most one step for each change, to be undone from the last to the first.
 struct MetadataTree::UndoSteps {
-    struct Step {
-        Address address;
-        bool isNew;                 ///< the place did not exist before
-        Node node;                  ///< the earlier node
-        bool isCreated;             ///< the earlier state
-        Places::node_type detached; ///< of a removal: the place that was extracted
+    enum class Kind {
+        Added,    ///< the address did not exist before
+        Replaced, ///< the address had another state
+        Removed,  ///< the address was removed with everything below it
     };
+
+    struct Step {
+        Kind kind;
+        Address address;
+        Place place; ///< of Replaced, the earlier state; of Removed, the place that was extracted
+    };
+
+    /// True if an address will be removed when the last step is undone, and needs no step of its own.
+    bool includes(Address const& address) const noexcept {
+        return !steps.empty() && steps.back().kind == Kind::Added && address.isWithin(steps.back().address);
+    }
 
     std::vector<Step> steps;
 };
 
-MetadataTree::MetadataTree(Loader loader) : loader_(std::move(loader)), root_(std::make_unique<Place>()) {
+MetadataTree::MetadataTree(Loader loader) : loader_(std::move(loader)) {
 }
 
 MetadataTree::~MetadataTree() = default;
 
 Node MetadataTree::node(Address const& address) const {
-    auto const* place = find(address);
-    return place != nullptr ? place->node : nullptr;
+    Cursors::Use use(cursors_);
+    auto& cursor = *use;
+    if (!moveTo(address, cursor) || cursor.depth() == 0) {
+        return nullptr;
+    }
+    return cursor.level(cursor.depth()).node(cursor.position(cursor.depth()));
+}
+
+bool MetadataTree::hasNode(Address const& address) const {
+    Cursors::Use use(cursors_);
+    auto& cursor = *use;
+    return moveTo(address, cursor) && cursor.depth() > 0 &&
+           cursor.level(cursor.depth()).node(cursor.position(cursor.depth()));
 }
 
 bool MetadataTree::exists(Address const& address) const {
-    auto* place = find(address);
-    if (place == nullptr) {
+    Cursors::Use use(cursors_);
+    if (!moveTo(address, *use)) {
         return false;
     }
-    if (place != root_.get()) {
-        return true; // a place exists only as long as its address
+    if (address.depth() > 0) {
+        return true; // an entry exists only as long as its address
     }
-    load(*place, address);
-    return !place->isEmpty();
+    auto const* level = levelBelow(*use, address, Loading::OnRequest);
+    return level != nullptr && !level->empty();
 }
 
 std::vector<Address> MetadataTree::children(Address const& address) const {
+    Cursors::Use use(cursors_);
     std::vector<Address> result;
-    auto* place = find(address);
-    if (place == nullptr) {
-        return result;
-    }
-    load(*place, address);
-    if (place->below) {
-        result.reserve(place->below->size());
-        for (auto const& [child, content] : *place->below) {
-            result.push_back(child);
-        }
+    auto const* level = moveTo(address, *use) ? levelBelow(*use, address, Loading::OnRequest) : nullptr;
+    if (level != nullptr) {
+        result.reserve(level->size());
+        level->forEach(
+            [&](Level::Position at) { result.push_back(address.child(level->element(types_, at))); });
     }
     return result;
 }
 
-MetadataTree::Place* MetadataTree::find(Address const& address) const {
-    auto const top = Address::root();
-    auto const* here = &top;
-    auto* place = root_.get();
-    auto const depth = address.depth();
-    for (std::size_t index = 0; index < depth; ++index) {
-        load(*place, *here);
-        if (!place->below) {
-            return nullptr;
+bool MetadataTree::moveTo(Address const& address, Cursor& cursor, Loading loading) const {
+    cursor.begin(address);
+    while (!cursor.isAtEnd()) {
+        auto* const level = levelBelow(cursor, address, loading);
+        if (level == nullptr || !cursor.stepDown(*level, types_)) {
+            return false;
         }
-        auto const found = place->below->find(address[index]);
-        if (found == place->below->end()) {
-            return nullptr;
-        }
-        here = &found->first;
-        place = &found->second;
     }
-    return place;
+    return true;
 }
 
-MetadataTree::Place* MetadataTree::findLoaded(Address const& address) const {
-    auto* place = root_.get();
-    for (std::size_t index = 0; index < address.depth(); ++index) {
-        if (!place->loaded.load(std::memory_order_relaxed) || !place->below) {
-            return nullptr;
-        }
-        auto const found = place->below->find(address[index]);
-        if (found == place->below->end()) {
-            return nullptr;
-        }
-        place = &found->second;
+Level* MetadataTree::levelBelow(Cursor const& cursor, Address const& address, Loading loading) const {
+    auto* const found = below(cursor);
+    if (found == nullptr) {
+        return nullptr;
     }
-    return place->loaded.load(std::memory_order_relaxed) ? place : nullptr;
+    auto* const level = found->loaded();
+    if (level != nullptr || loading == Loading::Never || found->isNone()) {
+        return level;
+    }
+    load(*found, firstSteps(address, cursor.depth()));
+    return found->loaded();
 }
 
-void MetadataTree::load(Place& place, Address const& address) const {
-    if (place.loaded.load(std::memory_order_acquire)) {
-        return;
-    }
+LevelBelow* MetadataTree::below(Cursor const& cursor) const noexcept {
+    auto const depth = cursor.depth();
+    return depth == 0 ? &root_ : cursor.level(depth).below(cursor.position(depth));
+}
+
+void MetadataTree::load(LevelBelow& below, Address const& address) const {
     std::lock_guard const guard(loading_);
-    if (place.loaded.load(std::memory_order_relaxed)) {
-        return;
+    if (below.loaded() == nullptr) {
+        below.set(loadLevel(address));
     }
-    auto children = loader_(address);
-    if (!children.empty()) {
-        auto below = std::make_unique<Places>();
-        for (auto& child : children) {
-            auto& added = below->try_emplace(below->end(), address.child(std::move(child.element)))->second;
-            added.node = std::move(child.node);
-            added.isCreated = child.isCreated;
-            added.loaded.store(!child.hasChildren, std::memory_order_relaxed);
-        }
-        place.below = std::move(below);
-    }
-    place.loaded.store(true, std::memory_order_release);
+}
+
+LevelPointer MetadataTree::loadLevel(Address const& address) const {
+    builder_.begin();
+    loader_(address, builder_);
+    return builder_.finish();
 }
 
 MetadataTree::Undo MetadataTree::apply(Batch const& batch) {
+    cursors_.reset();
     auto done = std::make_shared<UndoSteps>();
     done->steps.reserve(batch.size());
     try {
+        Cursor cursor;
         for (auto const& change : batch) {
             if (change.kind == Change::Kind::Remove) {
-                remove(change.address, *done);
+                remove(change.address, cursor, *done);
             } else {
-                set(change, *done);
+                set(change, cursor, *done);
             }
         }
     } catch (...) {
@@ -181,69 +151,98 @@ MetadataTree::Undo MetadataTree::apply(Batch const& batch) {
     return done;
 }
 
-void MetadataTree::set(Change const& change, UndoSteps& undo) {
-    auto* place = root_.get();
-    auto here = Address::root();
-    bool isNew = false;
-    for (std::size_t index = 0; index < change.address.depth(); ++index) {
-        load(*place, here);
-        auto const& element = change.address[index];
-        auto& below = place->makeBelow();
-        auto found = below.lower_bound(element);
-        if (found == below.end() || found->first.leaf() != element) {
-            found = below.try_emplace(found, here.child(element));
-            found->second.loaded.store(true,
-                                       std::memory_order_relaxed); // it is new: nothing is stored below it
-            if (!isNew) {
-                isNew = true;
-                undo.steps.push_back({found->first, true, nullptr, false, {}});
-            }
+void MetadataTree::set(Change const& change, Cursor& cursor, UndoSteps& undo) {
+    using Kind = UndoSteps::Kind;
+    auto const& address = change.address;
+    bool const isCreated = change.kind == Change::Kind::Create;
+    bool const isIncluded = undo.includes(address);
+    if (moveTo(address, cursor)) {
+        auto& level = cursor.level(cursor.depth());
+        auto const at = cursor.position(cursor.depth());
+        if (!isIncluded) {
+            undo.steps.push_back({Kind::Replaced, address, {level.node(at), level.isCreated(at), {}}});
         }
-        here = found->first;
-        place = &found->second;
+        level.setState(at, change.node, isCreated);
+        return;
     }
-    if (!isNew) {
-        undo.steps.push_back({here, false, place->node, place->isCreated, {}});
+    if (!isIncluded) {
+        undo.steps.push_back({Kind::Added, firstSteps(address, cursor.depth() + 1), {}});
     }
-    place->node = change.node;
-    place->isCreated = change.kind == Change::Kind::Create;
+    while (cursor.depth() + 1 < address.depth()) {
+        insertBelow(cursor, {});
+    }
+    insertBelow(cursor, {change.node, isCreated, {}});
 }
 
-void MetadataTree::remove(Address const& address, UndoSteps& undo) {
-    if (find(address) == nullptr) {
+/// Inserts the next element of the cursor.
+void MetadataTree::insertBelow(Cursor& cursor, Place place) {
+    auto const depth = cursor.depth();
+    auto& found = depth == 0
+                      ? root_
+                      : cursor.level(depth).makeBelow(cursor.position(depth)); // created if there is none
+    if (found.isNone()) {
+        found.set(Level::create(&memory_));
+    }
+    auto const& element = cursor.next();
+    cursor.insertBelow(*found.loaded(), {types_.index(element.getType()), NewName(element.getLocation())},
+                       std::move(place));
+}
+
+void MetadataTree::remove(Address const& address, Cursor& cursor, UndoSteps& undo) {
+    if (!moveTo(address, cursor)) {
         return;
     }
     // An address above that has no node, was not created, and has no other children is deleted too.
-    auto removed = address;
-    auto* above = find(removed.parent());
-    while (above != root_.get() && !above->node && !above->isCreated && above->below->size() == 1) {
-        removed = removed.parent();
-        above = find(removed.parent());
+    auto depth = cursor.depth();
+    while (depth > 1 && cursor.level(depth).hasOneEntry()) {
+        auto const& level = cursor.level(depth - 1);
+        auto const at = cursor.position(depth - 1);
+        if (level.node(at) || level.isCreated(at)) {
+            break;
+        }
+        --depth;
     }
-    undo.steps.push_back({removed, false, nullptr, false, {}});
-    undo.steps.back().detached = above->take(removed.leaf());
+    undo.steps.push_back({UndoSteps::Kind::Removed, firstSteps(address, depth), {}});
+    extract(cursor, depth, undo.steps.back().place);
+}
+
+/// Extracts the place of a step of the cursor.
+void MetadataTree::extract(Cursor& cursor, std::size_t depth, Place& place) noexcept {
+    place = cursor.level(depth).extract(cursor.position(depth));
+    cursor.ascendTo(depth - 1);
 }
 
 void MetadataTree::undo(Undo undo) noexcept {
     if (!undo) {
         return;
     }
+    cursors_.reset();
+    Cursor cursor;
     for (auto step = undo->steps.rbegin(); step != undo->steps.rend(); ++step) {
-        auto* above = find(step->address.parent());
-        if (step->detached) {
-            above->makeBelow().insert(std::move(step->detached));
-        } else if (step->isNew) {
-            above->below->erase(above->below->find(step->address.leaf()));
-        } else {
-            auto& place = above->below->find(step->address.leaf())->second;
-            place.node = std::move(step->node);
-            place.isCreated = step->isCreated;
+        auto const& address = step->address;
+        bool const isThere = moveTo(address, cursor); // not for a change that threw
+        switch (step->kind) {
+        case UndoSteps::Kind::Added:
+            if (isThere) {
+                extract(cursor, cursor.depth(), step->place);
+            }
+            break;
+        case UndoSteps::Kind::Replaced:
+            cursor.level(cursor.depth())
+                .setState(cursor.position(cursor.depth()), std::move(step->place.node),
+                          step->place.isCreated);
+            break;
+        case UndoSteps::Kind::Removed:
+            insertBelow(cursor, std::move(step->place));
+            break;
         }
     }
 }
 
-void MetadataTree::forget() {
-    root_ = std::make_unique<Place>();
+void MetadataTree::forget() noexcept {
+    cursors_.reset();
+    root_ = LevelBelow::unloaded();
+    memory_.release();
 }
 
 void MetadataTree::applyChanges(Changes const& changes) {
@@ -251,6 +250,10 @@ void MetadataTree::applyChanges(Changes const& changes) {
         forget();
         return;
     }
+    if (changes.differences.empty()) {
+        return;
+    }
+    cursors_.reset();
     // Whether an address exists can depend on the addresses below it. So every level above a change is
     // reloaded, each level once, from the top.
     std::set<Address> levels;
@@ -263,31 +266,32 @@ void MetadataTree::applyChanges(Changes const& changes) {
         }
     }
     for (auto const& level : levels) {
-        if (auto* place = findLoaded(level)) {
-            reload(*place, level);
+        Cursor cursor;
+        auto* const found = moveTo(level, cursor, Loading::Never) ? below(cursor) : nullptr;
+        if (found != nullptr && found->loaded() != nullptr) {
+            reload(*found, level);
         }
     }
 }
 
-void MetadataTree::reload(Place& place, Address const& address) {
-    auto const children = loader_(address);
-    auto below = std::make_unique<Places>();
-    for (auto const& child : children) {
-        auto handle = place.take(child.element);
-        bool const known = !handle.empty();
-        auto const position = known ? below->insert(below->end(), std::move(handle))
-                                    : below->try_emplace(below->end(), address.child(child.element));
-        auto& content = position->second;
-        content.node = child.node;
-        content.isCreated = child.isCreated;
-        if (!child.hasChildren) {
-            content.below.reset();
-            content.loaded.store(true, std::memory_order_relaxed);
-        } else if (!known || content.isEmpty()) {
-            content.loaded.store(false, std::memory_order_relaxed);
+void MetadataTree::reload(LevelBelow& below, Address const& address) {
+    auto reloaded = loadLevel(address);
+    auto const& earlier = *below.loaded();
+    Level::Position hint;
+    reloaded->forEach([&](Level::Position at) {
+        auto* const unloaded = reloaded->below(at);
+        if (unloaded == nullptr) {
+            return;
         }
-    }
-    place.below = std::move(below);
+        auto const element = reloaded->element(types_, at);
+        auto const found = earlier.find(ElementKey(types_, element.getType(), element.getLocation()), hint);
+        hint = found.position;
+        auto* const known = found.isFound ? earlier.below(found.position) : nullptr;
+        if (known != nullptr && known->loaded() != nullptr && !known->loaded()->empty()) {
+            *unloaded = std::move(*known);
+        }
+    });
+    below.set(std::move(reloaded));
 }
 
 } // namespace project::stores

@@ -46,7 +46,7 @@ public:
     State(std::unique_ptr<Backend> storage, Path root)
         : backend(std::move(storage)),
           metadataRoot(std::move(root)),
-          tree([this](Address const& address) { return backend->load(address); }),
+          tree([this](Address const& address, ChildSink& children) { backend->load(address, children); }),
           log(tree),
           lock({[this](Access access) { enter(access); }, [this] { backend->leave(); }}) {}
 
@@ -165,7 +165,7 @@ void TreeMetadataManager::setNodes(std::map<Address, std::shared_ptr<MetadataNod
 
 bool TreeMetadataManager::hasNode(Address const& path) {
     auto const guard = state_->lock.readLock();
-    return state_->tree.node(path) != nullptr;
+    return state_->tree.hasNode(path);
 }
 
 std::vector<Address> TreeMetadataManager::getChildNodes(Address const& path) {

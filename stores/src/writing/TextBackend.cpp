@@ -56,7 +56,7 @@ public:
 
     Changes enter(Access access);
     void leave() noexcept;
-    Children load(Address const& parent);
+    void load(Address const& parent, ChildSink& children);
     FileChanges write(Batch const& batch);
     void keep();
     void discard() noexcept;
@@ -171,17 +171,18 @@ bool TextBackend::State::lockAndCheck(milliseconds patience) {
     return seen_.exists();
 }
 
-Children TextBackend::State::load(Address const& parent) {
+void TextBackend::State::load(Address const& parent, ChildSink& children) {
     if (!seen_.exists()) {
-        return {};
+        return;
     }
     if (!pending_) {
-        return seen_.text().children(parent);
+        seen_.text().children(parent, children);
+        return;
     }
     if (!pending_->next) {
         pending_->next = seen_.text().rewrittenWith(pending_->batch);
     }
-    return pending_->next->children(parent);
+    pending_->next->children(parent, children);
 }
 
 FileChanges TextBackend::State::write(Batch const& batch) {
@@ -386,8 +387,8 @@ void TextBackend::leave() noexcept {
     state_->leave();
 }
 
-Children TextBackend::load(Address const& parent) {
-    return state_->load(parent);
+void TextBackend::load(Address const& parent, ChildSink& children) {
+    state_->load(parent, children);
 }
 
 FileChanges TextBackend::write(Batch const& batch) {

@@ -22,9 +22,12 @@ protected:
 
     std::map<Address, Children> levels;
     std::vector<Address> loaded;
-    MetadataTree tree{[this](Address const& address) {
+    MetadataTree tree{[this](Address const& address, ChildSink& sink) {
         loaded.push_back(address);
-        return levels[address];
+        for (auto const& child : levels[address]) {
+            sink.add({child.element.getType(), child.element.getLocation(), child.node, child.isCreated,
+                      child.hasChildren});
+        }
     }};
     Address const root = Address::root();
     Address const a = root.child({u"t", u"a"});

@@ -25,9 +25,12 @@ public:
 
     virtual void leave() noexcept = 0;
 
-    /// The addresses directly below one address. A batch that was written and not yet kept is included.
-    /// @return nothing for an address that does not exist.
-    virtual Children load(Address const& parent) = 0;
+    /// Passes on the addresses directly below one address; none for an address that does not exist. A batch
+    /// that was written and not yet kept is included.
+    virtual void load(Address const& parent, ChildSink& children) = 0;
+
+    /// The same as a list.
+    Children load(Address const& parent);
 
     /// Prepares a batch. The files that it creates exist when this returns.
     virtual FileChanges write(Batch const& batch) = 0;

@@ -10,7 +10,8 @@ class PROJECT_STORES_EXPORT MemoryBackend : public Backend {
 public:
     Changes enter(Access access) override;
     void leave() noexcept override;
-    Children load(Address const& parent) override;
+    using Backend::load;
+    void load(Address const& parent, ChildSink& children) override;
     FileChanges write(Batch const& batch) override;
     void keep() override;
     void discard() noexcept override;

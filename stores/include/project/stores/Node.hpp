@@ -1,6 +1,8 @@
 #pragma once
 
 #include <memory>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include "project/metadata/MetadataNode.hpp"
@@ -29,5 +31,38 @@ struct Child {
 /// The addresses directly below one address, sorted by element, each element once. Every child has a node, is
 /// created, or has children.
 using Children = std::vector<Child>;
+
+/// A Child while it is passed on. What it refers to is valid during the call that receives it.
+struct LoadedChild {
+    std::u16string_view type;
+    std::u16string_view location;
+    Node const& node;
+    bool isCreated;
+    bool hasChildren;
+};
+
+/// Receives the children of one address, sorted by element, each element once.
+class PROJECT_STORES_EXPORT ChildSink {
+public:
+    virtual ~ChildSink() = default;
+
+    virtual void add(LoadedChild const& child) = 0;
+
+protected:
+    ChildSink() = default;
+    ChildSink(ChildSink const&) = default;
+    ChildSink& operator=(ChildSink const&) = default;
+};
+
+/// Collects children in a list.
+class PROJECT_STORES_EXPORT ChildCollector : public ChildSink {
+public:
+    void add(LoadedChild const& child) override;
+
+    Children take() noexcept { return std::move(children_); }
+
+private:
+    Children children_;
+};
 
 } // namespace project::stores

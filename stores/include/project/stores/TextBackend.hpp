@@ -46,7 +46,8 @@ public:
 
     Changes enter(Access access) override;
     void leave() noexcept override;
-    Children load(Address const& parent) override;
+    using Backend::load;
+    void load(Address const& parent, ChildSink& children) override;
     FileChanges write(Batch const& batch) override;
     void keep() override;
     void discard() noexcept override;
