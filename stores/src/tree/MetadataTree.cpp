@@ -242,7 +242,6 @@ void MetadataTree::undo(Undo undo) noexcept {
 void MetadataTree::forget() noexcept {
     cursors_.reset();
     root_ = LevelBelow::unloaded();
-    memory_.release();
 }
 
 void MetadataTree::applyChanges(Changes const& changes) {
