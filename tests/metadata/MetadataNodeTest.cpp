@@ -61,6 +61,50 @@ TEST(MetadataNode, aCopyIsDeep) {
     EXPECT_EQ(node.getChildren()[0]->get(u"key"), u"");
 }
 
+/// A node that an application implements itself, with one key.
+class OwnNode : public MetadataNode {
+public:
+    std::u16string const& get(std::u16string const& key) const override {
+        static std::u16string const absent;
+        return key == u"key" ? value_ : absent;
+    }
+
+    void put(std::u16string /*key*/, std::u16string value) override { value_ = std::move(value); }
+
+    std::vector<std::u16string> getKeys() const override { return {u"key"}; }
+
+    std::u16string const& getType() const override { return type_; }
+
+    std::vector<std::unique_ptr<MetadataNode>> const& getChildren() const override { return children_; }
+
+    MetadataNode* addChild(std::u16string type) override {
+        return children_.emplace_back(std::make_unique<MetadataNodeSpecification>(std::move(type))).get();
+    }
+
+    void removeChild(MetadataNode* /*child*/) override {}
+
+private:
+    std::u16string value_;
+    std::u16string type_ = u"Info";
+    std::vector<std::unique_ptr<MetadataNode>> children_;
+};
+
+TEST(MetadataNode, aNodeOfAnyClassIsCopiedAndComparedByItsOperations) {
+    OwnNode own;
+    own.put(u"key", u"value");
+    own.addChild(u"child")->put(u"inner", u"1");
+    MetadataNodeSpecification copy(own);
+    EXPECT_TRUE(isEqual(own, copy));
+    EXPECT_TRUE(isEqual(copy, own));
+    copy.put(u"key", u"other");
+    EXPECT_FALSE(isEqual(own, copy));
+    EXPECT_FALSE(isEqual(copy, own));
+    copy.put(u"key", u"value");
+    copy.put(u"another", u"");
+    EXPECT_FALSE(isEqual(own, copy));
+    EXPECT_FALSE(isEqual(copy, own));
+}
+
 TEST(MetadataNode, nodesDifferInTypeKeysValuesOrTheOrderOfChildren) {
     MetadataNodeSpecification const plain(u"Info");
     EXPECT_FALSE(isEqual(plain, MetadataNodeSpecification(u"Other")));

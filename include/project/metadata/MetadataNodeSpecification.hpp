@@ -28,6 +28,10 @@ public:
     void removeChild(MetadataNode* child) override;
 
 private:
+    friend PROJECT_METADATA_EXPORT bool isEqual(MetadataNode const& left, MetadataNode const& right);
+
+    void copyChildren(MetadataNode const& other);
+
     std::map<std::u16string, std::u16string> values_;
     std::vector<std::unique_ptr<MetadataNode>> children_;
     std::u16string type_;
