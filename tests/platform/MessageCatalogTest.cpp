@@ -1,6 +1,7 @@
 #include "fl/i18n/MessageCatalog.hpp"
 
 #include <unicode/locid.h>
+#include <unicode/uloc.h>
 
 #include "platform/TestMessage.hpp"
 #include "support/GlobalLocale.hpp"
@@ -87,6 +88,7 @@ TEST(MessageCatalog, fallsBackFromARegionToItsLanguage) {
     EXPECT_EQ(MessageCatalog::get_message(greeting(), "de_AT"), u"Servus Ann, late");
     EXPECT_EQ(MessageCatalog::get_message(TestMessage("Count", 1L), "de_AT"), u"1 Dateien");
     EXPECT_EQ(MessageCatalog::get_message(greeting(), "de_CH"), u"late, hallo Ann");
+    EXPECT_EQ(MessageCatalog::get_message(greeting(), "de_419"), u"late, hallo Ann") << "a region in digits";
 }
 
 TEST(MessageCatalog, understandsEverySpellingOfALocale) {
@@ -107,8 +109,18 @@ TEST(MessageCatalog, fallsBackToTheRootAndNotToTheLanguageOfTheEnvironment) {
 
 TEST(MessageCatalog, fallsBackToTheRootForAnInvalidLocale) {
     for (auto const& locale : {std::string(), std::string("../de"), std::string("x/../de"), std::string("C"),
+                               std::string("d:e"), std::string("d[e"), std::string("d{e"),
                                std::string("\xff"), std::string(1000, 'd'), std::string("root")}) {
         EXPECT_EQ(MessageCatalog::get_message(greeting(), locale), u"Hello Ann, it's late") << locale;
+    }
+}
+
+TEST(MessageCatalog, fallsBackToTheLanguageOfALocaleOfAnyLength) {
+    for (std::size_t length = 1; length <= 2 * ULOC_FULLNAME_CAPACITY; ++length) {
+        auto const text = MessageCatalog::get_message(greeting(), "de_AT_" + std::string(length, 'X'));
+
+        bool const isTooLong = length + 6 >= ULOC_FULLNAME_CAPACITY;
+        EXPECT_EQ(text, isTooLong ? u"Hello Ann, it's late" : u"Servus Ann, late") << length;
     }
 }
 

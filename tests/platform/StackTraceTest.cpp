@@ -109,6 +109,16 @@ TEST(StackTrace, aCopyKeepsTheFramesAfterTheOriginalIsDestroyed) {
     EXPECT_EQ(assigned.getFrames(), frames);
 }
 
+TEST(StackTrace, assigningItToItselfKeepsTheFrames) {
+    auto trace = captured();
+    auto const frames = trace.getFrames();
+
+    auto const& same = trace;
+    trace = same;
+
+    EXPECT_EQ(trace.getFrames(), frames);
+}
+
 TEST(StackTrace, captureAllocatesNothing) {
     stacktrace_base trace;
     project::test::Allocations const allocations;
