@@ -23,6 +23,18 @@ protected:
         return AllOf(StartsWith(text().string() + ": "), HasSubstr(part));
     }
 
+    /// The line of a file with labels of a category.
+    static std::string labelled(std::string const& file, std::string const& category,
+                                std::vector<std::string> const& labels) {
+        std::string nested;
+        for (auto const& label : labels) {
+            nested +=
+                (nested.empty() ? "" : ",") + (R"({"type":"Label","keys":{"UUID":")" + label + R"("}})");
+        }
+        return R"({"file":")" + file + R"(","children":[{"type":"Category","keys":{"UUID":")" + category +
+               R"("},"children":[)" + nested + "]}]}";
+    }
+
     static constexpr auto beforeTheName = R"({"at":["Info","ProjectData"])";
     static constexpr auto beforeTheEnd = R"({"end":)";
 };
@@ -152,31 +164,88 @@ TEST_F(CheckCommand, findsNamesThatNoFileCanHave) {
     insertLineBefore("\"a\"", R"({"at":["Files","Root","File","\u0000"]})");
     insertLineBefore("\"a\"", R"("..")");
     insertLineBefore("\"a\"", R"({"at":["Files","Root","File","a/b"]})");
+    insertLineBefore("\"a\"", R"({"at":["Files","Root","File","."]})");
+    insertLineBefore("\"a\"", R"({"at":["Files","Root","File",""]})");
     tool({"tidy"});
 
     auto const result = tool({"check"});
 
     EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output),
-                UnorderedElementsAre(reports("\"\\000\""), reports("\"..\""), reports("\"a/b\"")));
+                UnorderedElementsAre(reports("name \"\\000\""), reports("name \"..\""),
+                                     reports("name \"a/b\""), reports("name \".\""), reports("name \"\"")));
+}
+
+TEST_F(CheckCommand, notesANameWithABackslash) {
+    folder_.addFile("sub\\folder/file");
+    folder_.addFile("back\\slash");
+    ASSERT_THAT(tool({"add", "sub\\folder/file", "back\\slash"}), SucceedsSilently());
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 0);
+    EXPECT_THAT(linesOf(result.output),
+                UnorderedElementsAre(reports(R"(note: "back\slash" has a backslash in its name)"),
+                                     reports(R"(note: "sub\folder" has a backslash in its name)")));
 }
 
 TEST_F(CheckCommand, findsLabelsOnFilesThatDoNotExist) {
     insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c"]})");
     insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c","Label","known"]})");
-    auto const labelled = [](std::string const& file, std::string const& category, std::string const& label) {
-        return R"({"file":")" + file + R"(","children":[{"type":"Category","keys":{"UUID":")" + category +
-               R"("},"children":[{"type":"Label","keys":{"UUID":")" + label + R"("}}]}]})";
-    };
-    insertLineBefore(beforeTheName, labelled("c1", "c", "known"));
-    insertLineBefore(beforeTheName, labelled("c2", "c", "unknown"));
-    insertLineBefore(beforeTheName, labelled("c3", "gone", "known"));
+    insertLineBefore(beforeTheName, labelled("c1", "c", {"known"}));
+    insertLineBefore(beforeTheName, labelled("c2", "c", {"unknown"}));
+    insertLineBefore(beforeTheName, labelled("c3", "gone", {"known"}));
 
     auto const result = tool({"check"});
 
     EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output), ElementsAre(AllOf(reports("\"c2\""), HasSubstr("\"unknown\"")),
                                                     AllOf(reports("\"c3\""), HasSubstr("\"gone\""))));
+}
+
+TEST_F(CheckCommand, acceptsOnlyCategoriesAndLabelsAsSuch) {
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c"]})");
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c","Mark","l"]})");
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Group","g"]})");
+    insertLineBefore(beforeTheName, labelled("c1", "c", {"l"}));
+    insertLineBefore(beforeTheName, labelled("c2", "g", {"l"}));
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 3);
+    EXPECT_THAT(linesOf(result.output), ElementsAre(AllOf(reports("\"c1\""), HasSubstr("label \"l\"")),
+                                                    AllOf(reports("\"c2\""), HasSubstr("category \"g\""))));
+}
+
+TEST_F(CheckCommand, findsLabelsThatAFileHasTooOften) {
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","many"]})");
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","many","Label","l"]})");
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","one"],"keys":{"SingleValued":"1"}})");
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","one","Label","l"]})");
+    insertLineBefore(beforeTheName, labelled("c1", "many", {"l", "l"}));
+    insertLineBefore(beforeTheName, labelled("c2", "one", {"l"}));
+    insertLineBefore(beforeTheName, labelled("c3", "one", {"l", "l"}));
+
+    auto const result = tool({"check"});
+
+    EXPECT_EQ(result.exitCode, 3);
+    EXPECT_THAT(linesOf(result.output),
+                ElementsAre(AllOf(reports("note: "), HasSubstr("\"c1\" has the label")),
+                            AllOf(reports("\"c3\""), HasSubstr("has 2 labels"))));
+}
+
+TEST_F(CheckCommand, acceptsDataOfFilesThatNoReaderUses) {
+    insertLineBefore("\"a\"", R"({"at":["Categories","Root","Category","c"]})");
+    for (auto const* nested : {R"({"type":"Note","keys":{"UUID":"gone"}})", R"({"type":"Category"})",
+                               R"({"type":"Category","keys":{"UUID":"c"},"children":[{"type":"Label"}]})",
+                               R"({"type":"Category","keys":{"UUID":"c"},)"
+                               R"("children":[{"type":"Mark","keys":{"UUID":"gone"}}]})"}) {
+        auto const before = readText();
+        insertLineBefore(beforeTheName, std::string(R"({"file":"c1","children":[)") + nested + "]}");
+
+        EXPECT_THAT(tool({"check"}), SucceedsSilently()) << nested;
+        writeText(before);
+    }
 }
 
 TEST_F(CheckCommand, onlyNotesUnknownData) {

@@ -59,6 +59,14 @@ TEST_F(StatusCommand, showsAllContentsOfADeletedFolder) {
     EXPECT_THAT(tool({"status"}), Prints("gone src\ngone src/io\ngone src/io/pump.cpp\ngone src/main.cpp\n"));
 }
 
+TEST_F(StatusCommand, takesAFolderForNewWhoseContentsAloneAreInTheProject) {
+    insertLineBefore(R"({"at":["Info","ProjectData"])", "\"z/deep/file\"");
+
+    EXPECT_THAT(tool({"status"}), SucceedsSilently()) << "listings do not show it either";
+    folder_.file(u"z/deep/file");
+    EXPECT_THAT(tool({"status"}), Prints("new  z/\n"));
+}
+
 TEST_F(StatusCommand, showsMissingFilesBelowAFolderThatBecameAFile) {
     folder_.remove(u"src/io");
     folder_.file(u"src/io");

@@ -150,6 +150,7 @@ TEST_F(EntryCommand, isNotedByStatusAndCheckWhenItsFileIsNotInTheProject) {
         "the entry point \"e\" of the file \"no\" is not shown, because the file is not in the project\n";
     EXPECT_THAT(tool({"status"}), Prints(std::string("note ") + text));
     EXPECT_THAT(tool({"check"}).output, HasSubstr(std::string(": note: ") + text));
+    EXPECT_THAT(tool({"entry", "set", "no", "--name", "x"}), FailsWith(1, "/no\" is not in the project."));
 }
 
 TEST_F(EntryCommand, isNotedByStatusAndCheckWhenItsFileIsNotOnDisk) {

@@ -142,6 +142,25 @@ TEST_F(GitIgnore, reportsThatGitIsNotInstalled) {
     EXPECT_THAT(tool({"add", "-r", "--gitignore", "."}), FailsWith(1, "git, which is not installed"));
 }
 
+TEST_F(GitIgnore, reportsThatGitCannotBeStarted) {
+    folder_.file(u"file");
+    folder_.file(u"bin/git");
+    settings_.environment["PATH"] = inFolder("bin");
+
+    EXPECT_THAT(tool({"add", "-r", "--gitignore", "."}),
+                FailsWith(1, "git cannot list ignored files: \"git\" cannot be started: Permission denied"));
+}
+
+TEST_F(GitIgnore, reportsAGitThatFailsWithoutAMessage) {
+    folder_.file(u"file");
+    folder_.file(u"bin/git", "#!/bin/sh\nkill -9 $$\n");
+    std::filesystem::permissions(inFolder("bin/git"), std::filesystem::perms::owner_all);
+    settings_.environment["PATH"] = inFolder("bin");
+
+    EXPECT_THAT(tool({"add", "-r", "--gitignore", "."}),
+                FailsWith(1, "git cannot list ignored files: unknown error"));
+}
+
 TEST_F(GitIgnore, acceptsAHundredThousandPathsAtOnce) {
     folder_.file(u".gitignore", "*.o\n");
     std::vector<fl::filesystem::Path> paths; // they need not exist for git

@@ -3,6 +3,9 @@
 #include <csignal>
 #include <system_error>
 
+#include <sys/resource.h>
+#include <sys/time.h>
+
 #include <gtest/gtest.h>
 
 namespace projectctl {
@@ -55,6 +58,64 @@ TEST(PipedProcess, reportsAMissingProgram) {
     } catch (std::system_error const& error) {
         EXPECT_EQ(error.code(), std::errc::no_such_file_or_directory);
     }
+}
+
+TEST(PipedProcess, reportsThatThereAreTooManyOpenFiles) {
+    rlimit before{};
+    ASSERT_EQ(getrlimit(RLIMIT_NOFILE, &before), 0);
+    auto const limited = rlimit{.rlim_cur = 0, .rlim_max = before.rlim_max};
+    ASSERT_EQ(setrlimit(RLIMIT_NOFILE, &limited), 0);
+    std::error_code code;
+    try {
+        runWithInput({"true"}, "");
+    } catch (std::system_error const& error) {
+        code = error.code();
+    }
+    setrlimit(RLIMIT_NOFILE, &before);
+
+    EXPECT_EQ(code, std::errc::too_many_files_open);
+}
+
+/// Interrupts the system calls of this process every few milliseconds.
+class Interruptions {
+public:
+    Interruptions() {
+        struct sigaction action {};
+
+        action.sa_handler = [](int) { count = count + 1; }; // without SA_RESTART
+        sigaction(SIGALRM, &action, &before_);
+        repeat({.tv_sec = 0, .tv_usec = 5'000});
+    }
+
+    ~Interruptions() {
+        repeat({});
+        sigaction(SIGALRM, &before_, nullptr);
+    }
+
+    Interruptions(Interruptions const&) = delete;
+    Interruptions& operator=(Interruptions const&) = delete;
+
+    static inline volatile std::sig_atomic_t count = 0;
+
+private:
+    static void repeat(timeval interval) {
+        itimerval const timer{.it_interval = interval, .it_value = interval};
+        setitimer(ITIMER_REAL, &timer, nullptr);
+    }
+
+    struct sigaction before_ {};
+};
+
+TEST(PipedProcess, continuesAfterASignal) {
+    ProcessResult result{};
+    {
+        Interruptions const interruptions;
+        result = runWithInput({"sh", "-c", "sleep 0.1; cat; exec >&- 2>&-; sleep 0.1; exit 3"}, "in");
+    }
+
+    EXPECT_GT(Interruptions::count, 2);
+    EXPECT_EQ(result.output, "in");
+    EXPECT_EQ(result.exitCode, 3);
 }
 
 } // namespace

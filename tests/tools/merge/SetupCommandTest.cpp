@@ -62,6 +62,21 @@ TEST_F(SetupCommand, replacesAnotherCommandWhichIsReported) {
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
 }
 
+TEST_F(SetupCommand, reportsACommandThatQuotesTheProgramInAnotherWay) {
+    std::string const start = "p=";
+    auto const ours = git_.run({"config", driverKey});
+    auto const end = ours.substr(start.size() + std::string("'" PROJECTCTL "'").size());
+    for (auto const* program : {"", "x", "/bin/true", "'/bin/true", "'/bin/'true'", "'%b'"}) {
+        git_.run({"config", driverKey, start + program + end.substr(0, end.find('\n'))});
+
+        EXPECT_THAT(tool({"status"}).output,
+                    StartsWith("note git merges the project's text with another command"))
+            << program;
+    }
+    git_.run({"config", driverKey, ours.substr(0, ours.find('\n'))});
+    EXPECT_THAT(tool({"status"}), SucceedsSilently());
+}
+
 TEST_F(SetupCommand, isNotReplacedByInitWhenAnotherCommandIsConfigured) {
     folder_.addFolder("other");
     git_.run({"config", driverKey, "true"});

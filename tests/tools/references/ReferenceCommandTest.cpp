@@ -91,6 +91,15 @@ TEST_F(ReferenceCommand, removesAFolderThatDoesNotExistAnyMore) {
     EXPECT_THAT(tool({"reference", "list"}), SucceedsSilently());
 }
 
+TEST_F(ReferenceCommand, removesAFolderThatBecameALinkToItself) {
+    ASSERT_THAT(tool({"path", "add", "lib"}), SucceedsSilently());
+    folder_.remove(u"engine/lib");
+    folder_.addLink("engine/lib", "lib");
+
+    EXPECT_THAT(tool({"path", "remove", "lib"}), SucceedsSilently());
+    EXPECT_THAT(tool({"path", "list"}), SucceedsSilently());
+}
+
 TEST_F(ReferenceCommand, doesNotTakeAPathForOneRelativeToTheRoot) {
     folder_.file(u"engine/src/lib/x");
     ASSERT_THAT(tool({"path", "add", "lib", "src/lib"}), SucceedsSilently());

@@ -52,6 +52,9 @@ TEST_F(WatchCommand, printsEachEventInALine) {
     EXPECT_EQ(printed(*watching, {"name", "Engine"}), "nameChanged");
     EXPECT_EQ(printed(*watching, {"description", "Pumps"}), "metadataChange");
     EXPECT_EQ(printed(*watching, {"entry", "set", "valve.cpp"}), "entryPointsChanged");
+    EXPECT_EQ(printed(*watching, {"path", "add", "."}), "pathChanged");
+    EXPECT_EQ(printed(*watching, {"reference", "add", "."}), "referencesChanged");
+    EXPECT_EQ(printed(*watching, {"category", "delete", "Keeper"}), "categoryDeleted\tKeeper");
     EXPECT_EQ(interrupt(*watching).signal, SIGINT);
 }
 
@@ -62,6 +65,9 @@ TEST_F(WatchCommand, printsEachEventAsAJsonObject) {
               R"({"event": "fileListUpdate", "files": ["valve.cpp"]})");
     EXPECT_EQ(printed(*watching, {"remove", "src"}),
               R"({"event": "fileListUpdate", "files": ["src", "src/pump.cpp"]})");
+    EXPECT_THAT(printed(*watching, {"category", "create", "Owner"}),
+                testing::MatchesRegex(R"(\{"event": "categoryAdded", "category": \{"uuid": "[-0-9a-f]+", )"
+                                      R"("name": "Owner"\}\})"));
     EXPECT_THAT(printed(*watching, {"label", "create", "Status", "Done"}),
                 testing::MatchesRegex(R"(\{"event": "labelModified", "category": \{"uuid": "[-0-9a-f]+", )"
                                       R"("name": "Status"\}, "label": \{"uuid": "[-0-9a-f]+", )"
