@@ -6,6 +6,8 @@
 #include <fcntl.h>
 
 #include "SystemFaults.hpp"
+#include "project/stores/SystemDisk.hpp"
+#include "support/TemporaryFolder.hpp"
 
 using testing::HasSubstr;
 
@@ -80,6 +82,22 @@ TEST_F(FileSystems, everyOperationWorksWithoutRenamesThatKeepExistingFiles) {
     for (int const error : {EINVAL, ENOSYS, EOPNOTSUPP}) {
         expectAllOperationsDone(refusing(RENAME_NOREPLACE, error));
     }
+}
+
+TEST_F(FileSystems, aTakenNameIsNotOverwrittenWithoutRenamesThatKeepExistingFiles) {
+    TemporaryFolder const folder;
+    auto const disk = stores::makeSystemDisk(folder.root(), u".projectdata");
+    disk->makeFolder();
+    for (auto const* const name : {"taken", "new"}) {
+        disk->create(name, name, std::nullopt);
+        disk->sync();
+    }
+    SystemCalls const calls(refusing(RENAME_NOREPLACE, EINVAL));
+
+    EXPECT_FALSE(disk->renameToFree("new", "taken"));
+    EXPECT_EQ(disk->read("taken", 0)->bytes, "taken");
+    EXPECT_TRUE(disk->renameToFree("new", "free"));
+    EXPECT_EQ(disk->read("free", 0)->bytes, "new");
 }
 
 TEST_F(FileSystems, everyOperationWorksWithPlainRenamesOnly) {

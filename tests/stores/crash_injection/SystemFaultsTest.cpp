@@ -6,7 +6,9 @@
 #include <unistd.h>
 
 #include "SystemFaults.hpp"
+#include "project/stores/SystemDisk.hpp"
 #include "support/NightlyScale.hpp"
+#include "support/TemporaryFolder.hpp"
 
 using testing::HasSubstr;
 using testing::UnorderedElementsAre;
@@ -125,6 +127,35 @@ TEST_F(SystemFaults, aNewTextThatCannotBeWrittenLeavesNothing) {
 
     ASSERT_TRUE(thrown);
     EXPECT_THAT(project->names(), UnorderedElementsAre(".gitattributes", ".gitignore", "project.jsonl"));
+}
+
+TEST_F(SystemFaults, theRemedyFitsTheError) {
+    std::map<int, std::string> const remedies{{ENOSPC, "Make room on the disk"},
+                                              {EDQUOT, "within the quota"},
+                                              {EFBIG, "ulimit -f"},
+                                              {EACCES, "the permissions"},
+                                              {EPERM, "the permissions"},
+                                              {EROFS, "read-only"},
+                                              {EMFILE, "ulimit -n"},
+                                              {ENFILE, "ulimit -n"},
+                                              {EIO, "The disk is failing"},
+                                              {ENOENT, "was moved or deleted"},
+                                              {ENOTDIR, "moved or deleted"},
+                                              {ESTALE, "Reopen the project"},
+                                              {ENOMEM, "Free some memory"},
+                                              {ENAMETOOLONG, "the name"},
+                                              {EILSEQ, "the name"},
+                                              {EOPNOTSUPP, "an operation that the"},
+                                              {EBUSY, "Try again"}};
+    for (auto const& [error, remedy] : remedies) {
+        TemporaryFolder const folder;
+        auto const disk = stores::makeSystemDisk(folder.root(), u".projectdata");
+        SystemCalls const calls(
+            [error = error](SystemCall const& call) { return call.name == "open" ? error : 0; });
+
+        EXPECT_THAT([&] { disk->makeFolder(); },
+                    testing::Throws<StoreError>(testing::Property(&StoreError::remedy, HasSubstr(remedy))));
+    }
 }
 
 /// On some file systems, a full disk is reported when a file is closed.

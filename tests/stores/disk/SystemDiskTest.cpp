@@ -63,6 +63,14 @@ private:
 
 class SystemDisk : public testing::Test {
 protected:
+    /// The error of a call. A disk knows the names of files, and no lines.
+    template <typename Call>
+    static StoreError errorOf(Call const& call) {
+        auto const error = test::errorOf(call);
+        EXPECT_EQ(0U, error.line());
+        return error;
+    }
+
     std::unique_ptr<Disk> openDisk() const {
         auto disk = makeSystemDisk(root.path(), stores::TextBackend::folderName);
         disk->makeFolder();

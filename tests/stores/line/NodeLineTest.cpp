@@ -185,6 +185,8 @@ TEST(NodeLine, anInvalidLineIsDamage) {
         R"({"file":"a","type":"x","type":"y"})",
         R"({"file":"a","children":{}})",
         R"({"file":"a","children":[{}]})",
+        R"({"file":"a","children":[{"keys":{}}]})",
+        R"({"file":"a","children":[{"type":"x"},{"children":[]}]})",
         R"({"file":"a","children":[{"type":"x","at":["a","b"]}]})",
         R"({"file":"a","children":[{"type":"x"},]})",
         R"({"file":"a","node":true})",

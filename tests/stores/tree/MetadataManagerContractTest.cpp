@@ -250,6 +250,15 @@ TEST_P(MetadataManagerContract, createPathsCreatesItsAddressesInAnyOrder) {
     }
 }
 
+TEST_P(MetadataManagerContract, removingTheRootRemovesEverything) {
+    set({{a, node()}, {abc, node()}, {at({{u"Top", u"z"}}), node()}});
+
+    remove({abc, MetadataPath::root()});
+
+    EXPECT_THAT(store.getChildNodes(MetadataPath::root()), IsEmpty());
+    EXPECT_FALSE(store.pathExists(abc));
+}
+
 class Listener : public metadata::FileChangeRequestListener {
 public:
     void fileRemovalRequested(metadata::MetadataManager&, Path const&,
@@ -359,6 +368,25 @@ TEST_P(MetadataManagerContract, listenersThatWereAlreadyNotifiedAreNotifiedOfThe
     EXPECT_THROW(set({{a, node()}}), std::runtime_error);
     EXPECT_EQ(first->removed, first->added); // the files of the store that was being created, or none
     EXPECT_EQ(first->reports.size(), first->added.empty() ? 1U : 2U);
+}
+
+TEST_P(MetadataManagerContract, anExceptionInTheReverseDoesNotHideTheErrorOfTheWrite) {
+    auto const first = std::make_shared<Listener>();
+    auto const second = std::make_shared<Listener>();
+    auto const third = std::make_shared<Listener>();
+    second->act = [&] {
+        if (second->reports.back() == "removal") {
+            throw std::runtime_error("the reverse failed");
+        }
+    };
+    third->act = [] { throw std::runtime_error("the write failed"); };
+    for (auto const& listener : {first, second, third}) {
+        store.subscribe(listener);
+    }
+
+    EXPECT_THAT([&] { set({{a, node()}}); }, testing::ThrowsMessage<std::runtime_error>("the write failed"));
+    EXPECT_FALSE(store.pathExists(a));
+    EXPECT_EQ(first->removed, first->added) << "it is notified although another one threw";
 }
 
 TEST_P(MetadataManagerContract, readersShareTheStoreWhileItIsLoaded) {

@@ -470,6 +470,19 @@ TEST_F(TextBackendOtherPrograms, aFolderThatIsReplacedWhileWeWaitForItsLockIsReo
     EXPECT_EQ(contentAfter({addFiles({u"their file", u"b"})}), stored());
 }
 
+TEST_F(TextBackendOtherPrograms, aFolderThatReplacesTheLockedOneIsNotWrittenWithoutALock) {
+    prepare({u"a"});
+    auto const backend = open();
+    once(volume->beforeCall, "identify project.jsonl", [&] { // the first call after the folder was locked
+        volume->moveFolderAway();
+        replaceText();
+    });
+
+    EXPECT_EQ(StoreError::Kind::Busy, errorOf([&] { commit(*backend, addFiles({u"b"})); }).kind());
+
+    EXPECT_EQ(theirs, text());
+}
+
 TEST_F(TextBackendOtherPrograms, aStoreThatAnotherProgramCreatesMeanwhileIsNotOverwritten) {
     auto const backend = open();
     Entered const entered(*backend, Access::Write);

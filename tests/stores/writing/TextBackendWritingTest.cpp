@@ -238,6 +238,17 @@ TEST_F(TextBackendWriting, aTornTailIsDroppedByTheNextBatchAndNeverCounts) {
     EXPECT_EQ(textOf(addFiles(all)), text());
 }
 
+TEST_F(TextBackendWriting, evenASingleTornByteIsDroppedWhenTheStoreIsClosed) {
+    auto backend = open();
+    commit(*backend, addFiles({u"a"}));
+    volume->append("project.jsonl", "{");
+    EXPECT_EQ(contentAfter({addFiles({u"a"})}), contentOf(*backend));
+
+    backend.reset();
+
+    EXPECT_EQ(textOf(addFiles({u"a"})), text());
+}
+
 TEST_F(TextBackendWriting, anIrregularTextIsRewritten) {
     auto const lines = textOf(addFiles({u"a", u"b"}));
     auto const swapped =
