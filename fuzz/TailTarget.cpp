@@ -6,6 +6,18 @@ namespace {
 
 using namespace project::fuzz;
 
+/// The canonical form of a text without faults. Most inputs are refused at once and leave the sample as it
+/// is.
+std::string canonicalAfter(std::string const& text) {
+    static std::string const ofSample = canonicalOf(*readText(sampleBody()));
+    if (text == sampleBody()) {
+        return ofSample;
+    }
+    auto const read = readText(text);
+    require(read && read->faults().empty(), "a tail without faults is accepted");
+    return canonicalOf(*read);
+}
+
 /// Any tail after a sound body: extending the text with one piece after the other gives the same content as
 /// reading the whole. A piece is refused exactly if reading finds a fault in it, and then it changes nothing.
 void run(std::string_view input) {
@@ -19,10 +31,8 @@ void run(std::string_view input) {
         }
         taken += piece;
     }
-    auto const read = readText(taken);
-    require(read && read->faults().empty(), "a tail without faults is accepted");
     require(extended->hasSameBytes(taken), "an extended text has the bytes of the accepted pieces");
-    require(canonicalOf(*read) == canonicalOf(*extended), "extending gives the same content as reading");
+    require(canonicalOf(*extended) == canonicalAfter(taken), "extending gives the same content as reading");
     if (!refused.empty()) {
         auto const faulty = readText(taken + refused);
         require(faulty && !faulty->faults().empty(), "only a tail with faults is refused");
