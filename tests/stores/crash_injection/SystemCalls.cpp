@@ -92,6 +92,16 @@ int __real_flock(int file, int operation);
 int __real_fcntl(int file, int command, ...);
 DIR* __real_fdopendir(int folder);
 dirent* __real_readdir(DIR* folder);
+int __real_clock_gettime(clockid_t clock, timespec* time);
+
+int __wrap_clock_gettime(clockid_t clock, timespec* time) {
+    auto const* const calls = project::test::SystemCalls::current();
+    if (calls == nullptr || !calls->time) {
+        return __real_clock_gettime(clock, time);
+    }
+    *time = *calls->time;
+    return 0;
+}
 
 int __wrap_open(char const* path, int flags, ...) {
     va_list rest;

@@ -1,9 +1,11 @@
 #pragma once
 
 #include <cstddef>
+#include <ctime>
 #include <functional>
 #include <limits>
 #include <map>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -39,6 +41,9 @@ public:
 
     /// When false, syncs are counted but not executed, to save time.
     bool syncs = false;
+
+    /// When set, all clocks show this time.
+    std::optional<timespec> time;
 
     /// @return true if the call fails, with errno set.
     bool fails(SystemCall const& call);

@@ -129,6 +129,22 @@ TEST_F(SystemFaults, aNewTextThatCannotBeWrittenLeavesNothing) {
     EXPECT_THAT(project->names(), UnorderedElementsAre(".gitattributes", ".gitignore", "project.jsonl"));
 }
 
+/// Otherwise another program could change the file within the same tick, and leave it with the same time.
+TEST_F(SystemFaults, noFileHasATimeOfTheCoarseClock) {
+    TemporaryFolder const folder;
+    auto const disk = stores::makeSystemDisk(folder.root(), u".projectdata");
+    disk->makeFolder();
+    SystemCalls calls;
+    for (long const nanoseconds : {0, 1, 999'999'999}) {
+        calls.time = timespec{.tv_sec = 1'000'000'000, .tv_nsec = nanoseconds};
+
+        auto const written = disk->create("at" + std::to_string(nanoseconds), "", std::nullopt);
+
+        EXPECT_TRUE(written.isStamped) << nanoseconds;
+        EXPECT_NE(written.identity.modified, disk->now()) << nanoseconds;
+    }
+}
+
 TEST_F(SystemFaults, theRemedyFitsTheError) {
     std::map<int, std::string> const remedies{{ENOSPC, "Make room on the disk"},
                                               {EDQUOT, "within the quota"},
