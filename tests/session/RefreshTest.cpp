@@ -271,6 +271,15 @@ TEST_F(Refresh, reportsAKeyOfACategoryThatNoManagerReadsAsMetadataChange) {
     EXPECT_THAT(eventsOf([&] { other_.store().setNodes(nodes); }), ElementsAre(u"metadataChange"));
 }
 
+TEST_F(Refresh, reportsAKeyBesideTheNameAsMetadataChange) {
+    auto const address = management::ProjectManagerBase::getRootNodePath();
+    std::shared_ptr<metadata::MetadataNode> const node = other_.store().getNode(address);
+    node->put(u"Colour", u"red");
+    std::map<metadata::MetadataPath, std::shared_ptr<metadata::MetadataNode>> nodes{{address, node}};
+
+    EXPECT_THAT(eventsOf([&] { other_.store().setNodes(nodes); }), ElementsAre(u"metadataChange"));
+}
+
 TEST_F(Refresh, reportsANameThatIsRemoved) {
     std::vector<metadata::MetadataPath> name{management::ProjectManagerBase::getRootNodePath()};
 

@@ -119,5 +119,16 @@ TEST_F(Sessions, canBeMovedWhileReferencesStayValid) {
     EXPECT_EQ(moved.root(), folder_.root());
 }
 
+TEST_F(Sessions, canBeReplacedByOthers) {
+    folder_.folder(u"pump");
+    auto session = Session::create(folder_.root(), u"Engine");
+
+    session = Session::create(folder_.path(u"pump"), u"Pump");
+
+    EXPECT_EQ(session.project().getName(), u"Pump");
+    EXPECT_EQ(session.root(), folder_.path(u"pump"));
+    EXPECT_EQ(Session::open(folder_.root()).project().getName(), u"Engine");
+}
+
 } // namespace
 } // namespace project::session
