@@ -31,38 +31,28 @@ public:
 
     void removeFromDisk(std::string const& file) { disk_.erase(file); }
 
-    /// Adds files that are not in the project. The folders above them lose their labels.
-    /// @return the folders that had labels.
-    std::set<std::string> add(std::vector<std::string> const& files) {
-        std::set<std::string> losing;
+    /// Adds files that are not in the project. The folders above them keep their labels.
+    void add(std::vector<std::string> const& files) {
         for (auto const& file : files) {
             for (auto path = file; !path.empty(); path = parentOf(path)) {
-                if (!files_[path].empty()) {
-                    losing.insert(path);
-                }
-                files_[path] = {};
+                files_.try_emplace(path);
             }
         }
-        return losing;
     }
 
-    /// As `add --recursive`. @return as add.
-    std::set<std::string> addContents(std::string const& folder) {
+    /// As `add --recursive`.
+    void addContents(std::string const& folder) {
         std::vector<std::string> added;
         for (auto const& [path, isFolder] : disk_) {
             if (isWithin(path, folder) && !files_.contains(path)) {
                 added.push_back(path);
             }
         }
-        return add(added);
+        add(added);
     }
 
-    /// As `add --anew` of one path. @return as add, without the path itself.
-    std::set<std::string> addAnew(std::string const& file) {
-        auto losing = add({file});
-        losing.erase(file);
-        return losing;
-    }
+    /// As `add --anew` of one path.
+    void addAnew(std::string const& file) { files_[file] = {}; }
 
     void remove(std::string const& file) {
         std::erase_if(files_, [&](auto const& item) { return isWithin(item.first, file); });

@@ -1,3 +1,5 @@
+#include <algorithm>
+#include <iterator>
 #include <memory>
 
 #include "tools/ToolTest.hpp"
@@ -176,9 +178,13 @@ protected:
 
     std::vector<std::string> labelled() const { return linesOf(tool({"label", "find", "Status"}).output); }
 
-    static std::string lossOf(std::string const& folder) {
-        return "projectctl: warning: the folder \"" + folder +
-               "\" has lost its labels, because a path below it was added\n";
+    /// The UUID of a label.
+    std::string uuidOf(std::string const& name) const {
+        auto const labels = tool({"label", "list", "--json"}).output;
+        auto const key = "\"label\": \"" + name + "\", \"labelUuid\": \"";
+        auto const found = labels.find(key);
+        EXPECT_NE(found, std::string::npos) << labels;
+        return labels.substr(found + key.size(), 36);
     }
 
     std::vector<std::string> const all_{"readme", "src", "src/io", "src/io/pump.cpp"};
@@ -209,45 +215,54 @@ TEST_F(AddToLabelled, reportsOnATerminalHowManyItSkipped) {
     EXPECT_EQ(tool({"add", "readme", "new", "src"}).output, "1 added to the project, 2 already in it\r\n");
 }
 
-TEST_F(AddToLabelled, warnsOfEachFolderThatLosesItsLabels) {
+TEST_F(AddToLabelled, keepsTheLabelsOfTheFoldersAboveANewPath) {
     folder_.file(u"src/io/new");
 
-    auto const added = tool({"add", "src/io/new"});
+    EXPECT_THAT(tool({"add", "src/io/new"}), SucceedsSilently());
 
-    EXPECT_EQ(added.exitCode, 0);
-    EXPECT_EQ(added.errors, lossOf("src/io") + lossOf("src"));
-    EXPECT_THAT(labelled(), ElementsAre("readme", "src/io/pump.cpp"));
+    EXPECT_EQ(labelled(), all_);
+    EXPECT_THAT(list(), ElementsAre("readme", "src", "src/io", "src/io/new", "src/io/pump.cpp"));
 }
 
-TEST_F(AddToLabelled, warnsOnceOfAFolderAndNotOfOneWithoutLabels) {
+TEST_F(AddToLabelled, keepsEverythingElseOfTheText) {
+    ASSERT_THAT(tool({"label", "create", "Status", "Late"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "create", "Status", "Early"}), SucceedsSilently());
+    ASSERT_THAT(tool({"category", "create", "Owner"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "create", "Owner", "Ada"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "put", "Owner", "Ada", "src"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "put", "Status", "Late", "src"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "put", "Status", "Early", "src"}), SucceedsSilently());
+    insertLineBefore("{\"file\":\"readme\"", R"({"at":["Files","Notes","File","src"],"keys":{"Note":"new"}})");
+    insertLineBefore("{\"file\":\"readme\"", R"({"at":["Files","Root","File","src","LabelData","Data"],)"
+                                   R"("children":[{"type":"Record","keys":{"UUID":")" +
+                                       uuidOf("Late") + R"(","Value":"since May"}}]})");
+    ASSERT_THAT(tool({"tidy"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "show", "src"}),
+                Prints("Status: Open\nStatus: Late = since May\nStatus: Early\nOwner: Ada\n"));
+    auto before = linesOf(readText());
     folder_.file(u"src/io/new");
-    folder_.file(u"src/io/newer");
-    ASSERT_THAT(tool({"label", "take", "Status", "Open", "src"}), SucceedsSilently());
 
-    EXPECT_EQ(tool({"add", "src/io/new", "src/io/newer"}).errors, lossOf("src/io"));
-}
+    EXPECT_THAT(tool({"add", "src/io/new"}), SucceedsSilently());
 
-TEST_F(AddToLabelled, warnsWithPathsRelativeToTheCurrentFolder) {
-    folder_.file(u"src/io/new");
-
-    EXPECT_EQ(toolFrom("src/io", {"add", "new"}).errors, lossOf(".") + lossOf(".."));
-    ASSERT_THAT(tool({"label", "put", "Status", "Open", "src"}), SucceedsSilently());
-    EXPECT_EQ(toolFrom("src/io", {"add", "--full-name", "--anew", "new"}).errors, lossOf("src"));
+    before.insert(std::next(std::ranges::find(before, "\"src/io/\"")), "\"src/io/new\"");
+    EXPECT_EQ(linesOf(readText()), before);
 }
 
 TEST_F(AddToLabelled, addsAgainWithoutLabelsWithAnew) {
-    EXPECT_EQ(tool({"add", "--anew", "readme"}).errors, "");
+    EXPECT_THAT(tool({"add", "--anew", "readme"}), SucceedsSilently());
     EXPECT_THAT(labelled(), ElementsAre("src", "src/io", "src/io/pump.cpp"));
 
-    EXPECT_EQ(tool({"add", "--anew", "src/io/pump.cpp"}).errors, lossOf("src/io") + lossOf("src"));
-    EXPECT_THAT(labelled(), IsEmpty());
+    EXPECT_THAT(tool({"add", "--anew", "src/io/pump.cpp"}), SucceedsSilently());
+    EXPECT_THAT(labelled(), ElementsAre("src", "src/io"));
 }
 
-TEST_F(AddToLabelled, doesNotWarnOfAFolderThatIsAddedAnewItself) {
-    EXPECT_EQ(tool({"add", "--anew", "src/io/pump.cpp", "src/io"}).errors, lossOf("src"));
+TEST_F(AddToLabelled, dropsTheLabelsOfAFolderThatIsAddedAnewItself) {
+    EXPECT_THAT(tool({"add", "--anew", "src/io/pump.cpp", "src/io"}), SucceedsSilently());
+
+    EXPECT_THAT(labelled(), ElementsAre("readme", "src"));
 }
 
-TEST_F(AddToLabelled, addsNothingAndWarnsOfNothingWhenOnePathIsBad) {
+TEST_F(AddToLabelled, addsNothingWhenOnePathIsBad) {
     folder_.file(u"src/io/new");
     auto const before = readText();
 
@@ -265,18 +280,18 @@ TEST_F(AddToLabelled, keepsTheLabelsOfAFolderWhoseContentsAreAllInTheProject) {
     EXPECT_EQ(readText(), before);
 }
 
-TEST_F(AddToLabelled, warnsOfFoldersAboveNewContents) {
+TEST_F(AddToLabelled, keepsTheLabelsOfFoldersAboveNewContents) {
     folder_.file(u"src/new/file");
 
-    EXPECT_EQ(tool({"add", "-r", "src"}).errors, lossOf("src"));
+    EXPECT_THAT(tool({"add", "-r", "src"}), SucceedsSilently());
 
-    EXPECT_THAT(labelled(), ElementsAre("readme", "src/io", "src/io/pump.cpp"));
+    EXPECT_EQ(labelled(), all_);
 }
 
 TEST_F(AddToLabelled, addsOnlyTheGivenFolderAnewNotItsContents) {
-    EXPECT_THAT(tool({"add", "-r", "--anew", "src/io"}).errors, lossOf("src"));
+    EXPECT_THAT(tool({"add", "-r", "--anew", "src/io"}), SucceedsSilently());
 
-    EXPECT_THAT(labelled(), ElementsAre("readme", "src/io/pump.cpp"));
+    EXPECT_THAT(labelled(), ElementsAre("readme", "src", "src/io/pump.cpp"));
 }
 
 } // namespace

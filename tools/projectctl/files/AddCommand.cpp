@@ -1,7 +1,10 @@
 #include <algorithm>
 #include <iterator>
+#include <map>
+#include <memory>
 #include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "cli/PathArguments.hpp"
@@ -15,18 +18,23 @@
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
 #include "project/ProjectCommand.hpp"
-#include "project/files/LabelIDSet.hpp"
+#include "project/ProjectTransaction.hpp"
+#include "project/files/FileMetadataManager.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
+#include "project/metadata/TreeSchema.hpp"
+#include "project/stores/Node.hpp"
 
 namespace projectctl {
 
 namespace {
 
+namespace fileSchema = project::metadata::schema::files;
+
 /// Adds files and folders in one step: either all of them are in the project afterwards, or none is.
 ///
 /// The file manager drops the labels of a file that is added again, and those of the folders above an added
 /// file. This command therefore passes it only paths that are not in the project yet, unless the user asks
-/// for the rest with --anew; and it reports the folders that have lost their labels.
+/// for the rest with --anew; and it restores the folders that the user did not name.
 class AddCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
@@ -41,7 +49,7 @@ public:
             ->needs("--recursive");
         app->add_flag("--anew", addsAnew_,
                       "Do not skip the given paths that are already in the project: add them again, without "
-                      "their labels");
+                      "their labels. The folders above them keep theirs");
         return app;
     }
 
@@ -58,7 +66,7 @@ private:
     /// @return the number of paths that were added.
     std::size_t add(OpenProject& project, std::vector<Path> const& given, std::vector<Path> const& contents,
                     Progress& progress) {
-        auto const guard = project.store().acquireWriteLock(); // one state for the questions and the change
+        ProjectTransaction transaction(project);
         std::vector<Path> added;
         std::vector<Path> skipped;
         for (auto const& path : given) {
@@ -69,31 +77,45 @@ private:
         }
         std::ranges::copy_if(contents, std::back_inserter(added),
                              [&](Path const& path) { return !project.files().isFileInProject(path); });
-        losingLabels_ = foldersLosingLabels(project, added);
         progress.begin("Adding " + std::to_string(added.size()) + " files and folders");
-        project.files().add(added);
+        addBelowLabelledFolders(project, added);
+        project.stageReturnedLater(added);
+        project.stageReturnedLater(skipped);
+        transaction.commit();
         skippedCount_ = skipped.size();
-        auto const addedCount = added.size();
-        std::ranges::move(skipped, std::back_inserter(added));
-        project.stageReturned(added);
-        return addedCount;
+        return added.size();
     }
 
-    /// The folders above added paths that are in the project with labels. Folders that are added again
-    /// themselves are not among them: the user asked for that.
-    std::vector<Path> foldersLosingLabels(OpenProject& project, std::vector<Path> const& added) const {
+    /// Adds paths, and keeps the labels of the folders above them.
+    void addBelowLabelledFolders(OpenProject& project, std::vector<Path> const& added) const {
+        auto const fileList = project.files().getFileMetadataManagerFor(fileSchema::fileListScope);
+        auto folders = labelledFoldersAbove(added, project.root(), *fileList);
+        project.files().add(added);
+        if (!folders.empty()) {
+            fileList->setFileNodes(std::move(folders));
+        }
+    }
+
+    using Nodes = std::map<Path, std::shared_ptr<project::metadata::MetadataNode>>;
+
+    /// The folders above added paths that have labels, with their nodes. Folders that are added again themselves
+    /// are not among them: the user asked for that.
+    Nodes labelledFoldersAbove(std::vector<Path> const& added, Path const& root,
+                               project::management::FileMetadataManager& fileList) const {
         std::set<Path> addedAgain;
         if (addsAnew_) {
             addedAgain.insert(added.begin(), added.end());
         }
         std::set<Path> visited;
-        std::vector<Path> result;
+        Nodes result;
         for (auto const& path : added) {
             auto folder = project::metadata::getParentFolder(path);
-            while (project::metadata::isParent(folder, project.root()) && visited.insert(folder).second) {
-                if (!addedAgain.contains(folder) && project.files().isFileInProject(folder) &&
-                    !project.files().getLabelIDSets(folder).empty()) {
-                    result.push_back(folder);
+            while (project::metadata::isParent(folder, root) && visited.insert(folder).second) {
+                if (!addedAgain.contains(folder) && fileList.hasFileNode(folder)) {
+                    auto node = fileList.getFileNode(folder);
+                    if (!project::metadata::isEqual(*node, *project::stores::plainNode())) {
+                        result.emplace(folder, std::move(node));
+                    }
                 }
                 folder = project::metadata::getParentFolder(folder);
             }
@@ -143,10 +165,6 @@ private:
                        (others > 0 ? " and " + std::to_string(others) + " more" : "") +
                        ": a name that begins with two dots cannot be added from the project's root");
         }
-        for (auto const& folder : losingLabels_) {
-            printError("warning: the folder " + inQuotes(shown.ofAbsolute(folder)) +
-                       " has lost its labels, because a path below it was added");
-        }
         output().say(std::to_string(addedCount) + " added to the project" +
                      (skippedCount_ > 0 ? ", " + std::to_string(skippedCount_) + " already in it" : ""));
     }
@@ -156,8 +174,7 @@ private:
     bool leavesOutIgnored_ = false;
     bool addsAnew_ = false;
     std::size_t skippedCount_ = 0;
-    std::vector<Path> unaddable_;    ///< left out of the contents of the folders
-    std::vector<Path> losingLabels_; ///< folders above added paths
+    std::vector<Path> unaddable_; ///< left out of the contents of the folders
 };
 
 } // namespace

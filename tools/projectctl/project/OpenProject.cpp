@@ -59,6 +59,23 @@ void OpenProject::requireInProject(Path const& path) {
     }
 }
 
+void OpenProject::stageReturnedLater(std::vector<Path> const& files) {
+    returned_.insert(returned_.end(), files.begin(), files.end());
+}
+
+void OpenProject::stage() {
+    if (!returned_.empty()) {
+        stageReturned();
+    }
+    session_.stage();
+}
+
+void OpenProject::stageReturned() {
+    auto const guard = store().acquireWriteLock();
+    std::erase_if(returned_, [this](Path const& file) { return !files().isFileInProject(file); });
+    access_.stageReturned(std::exchange(returned_, {}));
+}
+
 void OpenProject::warnOfDamage() {
     std::size_t count = 0;
     std::string first;

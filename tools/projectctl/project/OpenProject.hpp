@@ -65,11 +65,13 @@ public:
 
     project::management::ProjectEventBroadcaster& events() noexcept { return *session_.events(); }
 
-    /// Stages the text in git, if it was written and git tracks it. Call this without an open guard.
-    void stage() { session_.stage(); }
+    /// Lets stage() stage those of these files whose removal is staged: they were added, and git may know them
+    /// as removed ones. A transaction that is rolled back takes the request back.
+    void stageReturnedLater(std::vector<Path> const& files);
 
-    /// Of files that were just added, stages those whose removal is staged.
-    void stageReturned(std::vector<Path> const& files) { access_.stageReturned(files); }
+    /// Brings git's index up to date after the command's work: stages the text, if it was written and git
+    /// tracks it, and the files of stageReturnedLater that are in the project. Call this without an open guard.
+    void stage();
 
     /// Marks the text as changed through text(), so that stage() stages it.
     void stageLater() noexcept { access_.markTextForStaging(); }
@@ -80,14 +82,18 @@ public:
     }
 
 private:
+    friend class ProjectTransaction;
     using Session = project::session::Session;
 
     explicit OpenProject(Session session);
+
+    void stageReturned();
 
     std::shared_ptr<WriteShield>
         shield_; ///< before the session, so that it is destroyed after the last write
     Session session_;
     project::session::ToolAccess access_{session_};
+    std::vector<Path> returned_; ///< of stageReturnedLater
 };
 
 } // namespace projectctl
