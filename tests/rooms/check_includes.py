@@ -38,6 +38,7 @@ ROOMS = {
         "references": ["output", "cli", "git", "project"],
         "merge": ["output", "cli", "git", "project"],
         "watch": ["output", "cli", "git", "project"],
+        "batch": ["output", "cli", "git", "project"],
         "checks": ["output", "cli", "git", "project", "files", "labels", "entrypoints", "references", "merge"],
     },
     "src": {

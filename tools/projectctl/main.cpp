@@ -1,8 +1,7 @@
 #include <csignal>
 #include <exception>
-#include <memory>
-#include <vector>
 
+#include "batch/Commands.hpp"
 #include "checks/Commands.hpp"
 #include "cli/CommandLine.hpp"
 #include "cli/ExitCode.hpp"
@@ -20,18 +19,32 @@
 namespace {
 
 /// All commands, in the order in which help shows them.
-std::vector<std::unique_ptr<projectctl::Command>> makeCommands() {
+projectctl::CommandList const& commands() {
     using namespace projectctl;
-    std::vector<std::unique_ptr<Command>> result;
-    for (auto* const make :
-         {makeInitCommand,     makeRootCommand,      makeNameCommand,       makeDescriptionCommand,
-          makeAddCommand,      makeRemoveCommand,    makeListCommand,       makeStatusCommand,
-          makeCategoryCommand, makeLabelCommand,     makeEntryCommand,      makeGroupCommand,
-          makePathCommand,     makeReferenceCommand, makeReferencesCommand, makeCheckCommand,
-          makeWatchCommand,    makeTidyCommand,      makeSetupCommand,      makeMergeCommand,
-          makeResolveCommand}) {
-        result.push_back(make());
-    }
+    static CommandList const result{
+        {"init", makeInitCommand},
+        {"root", makeRootCommand},
+        {"name", makeNameCommand},
+        {"description", makeDescriptionCommand},
+        {"add", makeAddCommand},
+        {"remove", makeRemoveCommand},
+        {"list", makeListCommand},
+        {"status", makeStatusCommand},
+        {"category", makeCategoryCommand},
+        {"label", makeLabelCommand},
+        {"entry", makeEntryCommand},
+        {"group", makeGroupCommand},
+        {"path", makePathCommand},
+        {"reference", makeReferenceCommand},
+        {"references", makeReferencesCommand},
+        {"batch", [] { return makeBatchCommand(commands()); }},
+        {"check", makeCheckCommand},
+        {"watch", makeWatchCommand},
+        {"tidy", makeTidyCommand},
+        {"setup", makeSetupCommand},
+        {"merge", makeMergeCommand},
+        {"resolve", makeResolveCommand},
+    };
     return result;
 }
 
@@ -50,7 +63,7 @@ int main(int argc, char** argv) {
     std::signal(SIGCHLD, SIG_DFL); // if the caller ignores it, we could not wait for git
     try {
         fl::i18n::MessageCatalog::setGlobalLocale(projectctl::languageOfEnvironment());
-        return projectctl::runCommandLine(argc, argv, PROJECTCTL_VERSION, makeCommands());
+        return projectctl::runCommandLine(argc, argv, PROJECTCTL_VERSION, commands());
     } catch (projectctl::OutputClosed const&) {
         return endOfClosedOutput();
     } catch (std::exception const& error) {

@@ -34,7 +34,7 @@ public:
         Progress progress("Checking the project");
         std::size_t faults = 0;
         auto const file = project.textFile();
-        auto const faultsOfText = project.text().check();
+        auto const& faultsOfText = project.faultsOfText();
         for (auto const& fault : faultsOfText) {
             ++faults;
             auto const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
@@ -58,6 +58,8 @@ public:
                                             : adviceFor(faultsOfText));
         return faults == 0 ? exit_code::done : exit_code::finding;
     }
+
+    bool canRunInBatch() const override { return !repair_; }
 
 private:
     static void repair(OpenProject& project) {

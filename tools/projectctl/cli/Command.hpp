@@ -1,5 +1,9 @@
 #pragma once
 
+#include <memory>
+#include <string_view>
+#include <vector>
+
 #include <CLI/CLI.hpp>
 
 namespace projectctl {
@@ -7,7 +11,7 @@ namespace projectctl {
 /// A command of the tool: its name, its arguments, and its work. Each command has its own file; the header
 /// Commands.hpp of each room lists those of the room.
 ///
-/// Order of use: declare, then run, if the command line calls this command.
+/// Order of use: declare, then run, once, if the command line calls this command.
 class Command {
 public:
     virtual ~Command() = default;
@@ -20,6 +24,18 @@ public:
     /// @return the exit code: `done`, or `finding`.
     /// @throws std::exception whose text is the one line for the user.
     virtual int run() = 0;
+
+    /// Of a group, removes and returns the member that the parsed command line calls; otherwise null.
+    virtual std::unique_ptr<Command> takeCalledMember() { return nullptr; }
 };
+
+/// A command by its name on the command line.
+struct NamedCommand {
+    std::string_view name;
+    std::unique_ptr<Command> (*make)();
+};
+
+/// Commands in the order in which help shows them.
+using CommandList = std::vector<NamedCommand>;
 
 } // namespace projectctl

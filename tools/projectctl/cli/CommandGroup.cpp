@@ -21,10 +21,14 @@ CLI::App* CommandGroup::declare(CLI::App& tool) {
     return app;
 }
 
-int CommandGroup::run() {
+std::unique_ptr<Command> CommandGroup::takeCalledMember() {
     auto const called =
         std::find_if(declared_.begin(), declared_.end(), [](auto* app) { return app->parsed(); });
-    return members_[static_cast<std::size_t>(called - declared_.begin())]->run();
+    return std::move(members_[static_cast<std::size_t>(called - declared_.begin())]);
+}
+
+int CommandGroup::run() {
+    return takeCalledMember()->run();
 }
 
 } // namespace projectctl

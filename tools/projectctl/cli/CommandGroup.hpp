@@ -15,6 +15,7 @@ public:
     CommandGroup(std::string name, std::string description, std::vector<std::unique_ptr<Command>> members);
 
     CLI::App* declare(CLI::App& tool) override;
+    std::unique_ptr<Command> takeCalledMember() override;
     int run() override;
 
 private:

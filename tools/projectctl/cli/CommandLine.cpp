@@ -3,8 +3,9 @@
 #include <algorithm>
 #include <cstddef>
 #include <iterator>
+#include <utility>
 
-#include "cli/ExitCode.hpp"
+#include "cli/CodedFailure.hpp"
 #include "cli/Settings.hpp"
 #include "cli/TextArguments.hpp"
 #include "cli/WorkingFolder.hpp"
@@ -44,7 +45,7 @@ std::vector<std::string> takeCommonOptions(std::vector<std::string>& arguments) 
     for (auto found = std::ranges::find(arguments, inFolder); found != arguments.end();
          found = std::ranges::find(arguments, inFolder)) {
         if (std::next(found) == arguments.end()) {
-            throw CLI::ArgumentMismatch("-C needs a folder");
+            throw WrongUse("-C needs a folder ('projectctl --help' shows the usage)");
         }
         folders.push_back(unmarked(*std::next(found)));
         arguments.erase(found, found + 2);
@@ -73,15 +74,14 @@ Called calledOf(CLI::App const& tool) {
     return result;
 }
 
-/// Reports a wrong use: the parser's text, and the command that shows the help.
-int refuse(CLI::ParseError const& error, CLI::App const& tool) {
+/// The parser's text, and the command that shows the help.
+WrongUse wrongUse(CLI::ParseError const& error, CLI::App const& tool) {
     auto const called = calledOf(tool);
     auto const isGroup = !called.app->get_subcommands([](auto const*) { return true; }).empty();
     auto const unknown = isGroup ? called.app->remaining() : std::vector<std::string>();
     auto const problem =
         unknown.empty() ? error.what() : "unknown command or option \"" + unknown.front() + '"';
-    printError(withoutMarks(problem) + " ('" + called.name + " --help' shows the usage)");
-    return exit_code::wrongUse;
+    return WrongUse(withoutMarks(problem) + " ('" + called.name + " --help' shows the usage)");
 }
 
 int showHelp(CLI::App const& tool) {
@@ -93,41 +93,90 @@ int showHelp(CLI::App const& tool) {
     return 0;
 }
 
+int showVersion(CLI::CallForVersion const& asked) {
+    output().text() += asked.what() + std::string("\n");
+    output().flush();
+    return 0;
+}
+
+/// A command that the parser knows.
+struct Declared {
+    std::unique_ptr<Command> command;
+    CLI::App* app;
+};
+
+/// Declares the command that the arguments name. Declares all commands if they name none, so that the parser
+/// can show them or say what is wrong.
+std::vector<Declared> declareNamed(std::vector<std::string> const& arguments, CommandList const& commands,
+                                   CLI::App& tool) {
+    auto const named = arguments.empty()
+                           ? commands.end()
+                           : std::ranges::find(commands, arguments.front(), &NamedCommand::name);
+    std::vector<Declared> result;
+    for (auto command = commands.begin(); command != commands.end(); ++command) {
+        if (named == commands.end() || command == named) {
+            auto made = command->make();
+            auto* const app = made->declare(tool);
+            result.push_back({std::move(made), app});
+        }
+    }
+    return result;
+}
+
+/// @return the command that the arguments call.
+std::unique_ptr<Command> parse(std::vector<std::string> arguments, std::vector<Declared>& declared,
+                               CLI::App& tool) {
+    std::ranges::reverse(arguments); // the order that the parser expects
+    tool.parse(std::move(arguments));
+    auto const called = std::ranges::find_if(declared, [](auto const& item) { return item.app->parsed(); });
+    auto member = called->command->takeCalledMember();
+    return member ? std::move(member) : std::move(called->command);
+}
+
 } // namespace
 
 int runCommandLine(int argc, char const* const* argv, std::string const& version,
-                   std::vector<std::unique_ptr<Command>> const& commands) {
+                   CommandList const& commands) {
+    auto arguments = markedArguments({argv + 1, argv + argc});
+    auto const folders = takeCommonOptions(arguments);
     CLI::App tool("Manages the definition of an engineering project, stored beside its files.", "projectctl");
     tool.require_subcommand(1);
     tool.set_version_flag("--version", version, "Show the version and exit");
     declareCommonOptions(tool);
-    std::vector<CLI::App*> declared;
-    declared.reserve(commands.size());
-    for (auto const& command : commands) {
-        declared.push_back(command->declare(tool));
-    }
+    auto declared = declareNamed(arguments, commands, tool);
     tool.footer(exitCodes); // after the commands, which take over the footer that they find
-    auto arguments = markedArguments(argc, argv);
-    std::vector<std::string> folders;
+    std::unique_ptr<Command> called;
     try {
-        folders = takeCommonOptions(arguments);
-        std::ranges::reverse(arguments); // the order that the parser expects
-        tool.parse(std::move(arguments));
+        called = parse(std::move(arguments), declared, tool);
     } catch (CLI::CallForHelp const&) {
         return showHelp(tool);
     } catch (CLI::CallForVersion const& asked) {
-        output().text() += asked.what() + std::string("\n");
-        output().flush();
-        return 0;
+        return showVersion(asked);
     } catch (CLI::ParseError const& error) {
-        return refuse(error, tool);
+        throw wrongUse(error, tool);
     }
     std::ranges::for_each(folders, enterFolder);
-    auto const called =
-        std::find_if(declared.begin(), declared.end(), [](auto* app) { return app->parsed(); });
-    auto const result = commands[static_cast<std::size_t>(called - declared.begin())]->run();
+    auto const result = called->run();
     output().flush();
     return result;
+}
+
+std::unique_ptr<Command> parseCommand(std::vector<std::string> const& words, CommandList const& commands) {
+    auto const arguments = markedArguments(words);
+    CLI::App tool("", "projectctl");
+    tool.require_subcommand(1);
+    auto declared = declareNamed(arguments, commands, tool);
+    try {
+        return parse(arguments, declared, tool);
+    } catch (CLI::CallForHelp const&) {
+        throw WrongUse("--help is not an option here");
+    } catch (CLI::ParseError const& error) {
+        throw wrongUse(error, tool);
+    }
+}
+
+bool isCommonOption(std::string const& argument) {
+    return argument == inFolder || argument == fullNames || argument == sourceControlOff;
 }
 
 } // namespace projectctl

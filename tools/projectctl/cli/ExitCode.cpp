@@ -1,5 +1,6 @@
 #include "cli/ExitCode.hpp"
 
+#include "cli/CodedFailure.hpp"
 #include "project/git/GitError.hpp"
 #include "project/stores/StoreError.hpp"
 
@@ -9,6 +10,9 @@ using project::git::GitError;
 using project::stores::StoreError;
 
 int exitCodeFor(std::exception const& error) {
+    if (auto const* const coded = dynamic_cast<CodedFailure const*>(&error)) {
+        return coded->exitCode();
+    }
     auto const* const ofStore = dynamic_cast<StoreError const*>(&error);
     if (ofStore == nullptr) {
         auto const* const ofGit = dynamic_cast<GitError const*>(&error);

@@ -1,8 +1,10 @@
 #include "cli/PathArguments.hpp"
 
+#include <algorithm>
 #include <iostream>
 
 #include "cli/ArgumentPaths.hpp"
+#include "cli/StandardInput.hpp"
 #include "cli/TextArguments.hpp"
 #include "cli/WorkingFolder.hpp"
 
@@ -15,22 +17,27 @@ void PathArguments::declare(CLI::App& app, std::string const& description) {
         if (arguments_.empty() && !isNull_) {
             throw CLI::RequiredError("PATH");
         }
+        if (readsInput()) {
+            claimStandardInput();
+        }
     });
+}
+
+bool PathArguments::readsInput() const {
+    return isNull_ || std::ranges::find(arguments_, "-") != arguments_.end();
 }
 
 std::vector<Path> PathArguments::read() const {
     ArgumentPaths absolute(workingFolder());
     std::vector<Path> result;
-    bool readsInput = isNull_;
     for (auto const& argument : arguments_) {
-        if (argument == "-") {
-            readsInput = true;
-        } else {
+        if (argument != "-") {
             result.push_back(absolute.absolute(argument));
         }
     }
     std::cin.sync_with_stdio(false);
-    for (std::string line; readsInput && std::getline(std::cin, line, isNull_ ? '\0' : '\n');) {
+    bool const hasInput = readsInput();
+    for (std::string line; hasInput && std::getline(std::cin, line, isNull_ ? '\0' : '\n');) {
         result.push_back(absolute.absolute(line));
     }
     return result;

@@ -14,7 +14,8 @@ using fl::filesystem::Path;
 /// The files and folders that a command works on: from the arguments and from standard input.
 class PathArguments {
 public:
-    /// Declares the arguments, at least one, and the option -0.
+    /// Declares the arguments, at least one, and the option -0. Parsing them claims standard input if they
+    /// say that it contains paths.
     /// @param description of the paths, for the help.
     void declare(CLI::App& app, std::string const& description);
 
@@ -23,6 +24,8 @@ public:
     std::vector<Path> read() const;
 
 private:
+    bool readsInput() const;
+
     std::vector<std::string> arguments_;
     bool isNull_ = false;
 };

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <cstddef>
 #include <iterator>
-#include <span>
 #include <string_view>
 
 namespace projectctl {
@@ -44,10 +43,10 @@ CLI::Option* takeTexts(CLI::App& app, std::string const& name, std::vector<std::
     return app.add_option(name, take, description)->expected(CLI::detail::expected_max_vector_size);
 }
 
-std::vector<std::string> markedArguments(int argc, char const* const* argv) {
+std::vector<std::string> markedArguments(std::vector<std::string> const& given) {
     std::vector<std::string> result;
     bool optionsEnded = false;
-    for (std::string_view const argument : std::span(argv, static_cast<std::size_t>(argc)).subspan(1)) {
+    for (std::string_view const argument : given) {
         if (argument == "--" && !optionsEnded) {
             optionsEnded = true;
             continue;

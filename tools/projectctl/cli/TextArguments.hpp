@@ -17,9 +17,9 @@ CLI::Option* takeText(CLI::App& app, std::string const& name, std::optional<std:
 CLI::Option* takeTexts(CLI::App& app, std::string const& name, std::vector<std::string>& values,
                        std::string const& description);
 
-/// The arguments of a command line with marks, which keep the parser from interpreting texts. `takeText` and
-/// `takeTexts` remove the marks.
-std::vector<std::string> markedArguments(int argc, char const* const* argv);
+/// The arguments of a command line, without the tool's name, with marks, which keep the parser from
+/// interpreting texts. `takeText` and `takeTexts` remove the marks.
+std::vector<std::string> markedArguments(std::vector<std::string> const& given);
 
 /// One of these arguments in the form in which it was given.
 std::string unmarked(std::string const& argument);

@@ -49,6 +49,8 @@ public:
         return 0;
     }
 
+    bool canRunInBatch() const override { return false; }
+
 private:
     static TextMerge mergeAgain(Path const& root) {
         constexpr int base = 1;

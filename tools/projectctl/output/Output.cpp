@@ -37,7 +37,7 @@ void Output::flushWhenLarge() {
 }
 
 void Output::say(std::string_view line) {
-    if (isTerminal_) {
+    if (isTerminal_ && !isSilent_) {
         text_ += withoutControls(line, false) + '\n';
     }
 }

@@ -32,6 +32,20 @@ public:
     /// Appends a line that confirms a change, on a terminal only.
     void say(std::string_view line);
 
+    /// As long as it exists, say() appends nothing.
+    class Silence {
+    public:
+        explicit Silence(Output& output) : output_(output) { output_.isSilent_ = true; }
+
+        ~Silence() { output_.isSilent_ = false; }
+
+        Silence(Silence const&) = delete;
+        Silence& operator=(Silence const&) = delete;
+
+    private:
+        Output& output_;
+    };
+
     /// Writes the buffer.
     /// @throws OutputClosed when the reader has closed it; Failure when it cannot be written, for instance to
     /// a
@@ -41,6 +55,7 @@ public:
 private:
     int descriptor_;
     bool isTerminal_;
+    bool isSilent_ = false;
     std::string text_;
 };
 

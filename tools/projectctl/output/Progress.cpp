@@ -33,7 +33,7 @@ Progress::Progress(std::string work) : Progress(std::move(work), STDERR_FILENO, 
 
 Progress::Progress(std::string work, int descriptor, Timing timing)
     : descriptor_(descriptor), timing_(timing), work_(std::move(work)) {
-    if (isatty(descriptor) != 1) {
+    if (isatty(descriptor) != 1 || std::exchange(isAnyShown(), true)) {
         return;
     }
     // The thread blocks all signals: it would otherwise receive those that the main thread has blocked.
@@ -55,6 +55,13 @@ Progress::~Progress() {
     }
     changed_.notify_one();
     drawing_.join();
+    isAnyShown() = false;
+}
+
+/// Used by the main thread alone.
+bool& Progress::isAnyShown() {
+    static bool isShown = false;
+    return isShown;
 }
 
 void Progress::begin(std::string work) {

@@ -13,7 +13,7 @@ namespace projectctl {
 /// Shows the current work of the tool on the terminal: one line, after a second, deleted at the end.
 ///
 /// A thread draws the line, because the work may be one long call into the library. Without a terminal there
-/// is no thread, and nothing is written.
+/// is no thread, and nothing is written. Of two that exist at the same time, only the first one is shown.
 class Progress {
 public:
     struct Timing {
@@ -37,6 +37,7 @@ public:
     void reach(std::size_t count) noexcept { count_.store(count, std::memory_order_relaxed); }
 
 private:
+    static bool& isAnyShown();
     void drawUntilStopped();
     std::string line();
 

@@ -39,7 +39,7 @@ MetadataPath FileList::addressOf(Path const& path) const {
 
 FileList::Level FileList::level(MetadataPath const& address) const {
     Level result;
-    result.files = project_.text().load(address);
+    result.files = project_.childrenOf(address);
     std::erase_if(result.files, [&result](Child const& child) {
         if (child.element.getType() == treeSchema::files::markerType) {
             result.kind = Kind::Folder;

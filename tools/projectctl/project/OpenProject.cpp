@@ -12,6 +12,7 @@
 
 namespace projectctl {
 
+using project::metadata::MetadataPath;
 using project::session::SourceControl;
 using project::stores::Fault;
 using project::stores::TextBackend;
@@ -59,6 +60,27 @@ void OpenProject::requireInProject(Path const& path) {
     }
 }
 
+project::stores::Children OpenProject::childrenOf(MetadataPath const& address) {
+    if (openTransactions_ == 0) {
+        return text().load(address);
+    }
+    project::stores::Children result;
+    for (auto const& child : store().getChildNodes(address)) {
+        auto node = project::stores::Node(store().getNode(child));
+        bool const hasChildren = !store().getChildNodes(child).empty();
+        bool const isCreated = !node && !hasChildren;
+        result.push_back({child.leaf(), std::move(node), isCreated, hasChildren});
+    }
+    return result;
+}
+
+std::vector<Fault> const& OpenProject::faultsOfText() {
+    if (openTransactions_ == 0) {
+        faultsOfText_ = text().check();
+    }
+    return faultsOfText_;
+}
+
 void OpenProject::stageReturnedLater(std::vector<Path> const& files) {
     returned_.insert(returned_.end(), files.begin(), files.end());
 }
@@ -79,7 +101,10 @@ void OpenProject::stageReturned() {
 void OpenProject::warnOfDamage() {
     std::size_t count = 0;
     std::string first;
-    for (auto const& fault : text().check()) {
+    if (openTransactions_ > 0) {
+        return;
+    }
+    for (auto const& fault : faultsOfText()) {
         if (fault.kind == Fault::Kind::Damage || fault.kind == Fault::Kind::Conflict) {
             if (count++ == 0) {
                 first = textFile() + ':' + std::to_string(fault.line) + ": " + fault.problem;

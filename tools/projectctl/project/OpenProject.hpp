@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <memory>
 #include <string>
 #include <vector>
@@ -7,13 +8,14 @@
 #include "project/WriteShield.hpp"
 #include "project/session.hpp"
 #include "project/session/ToolAccess.hpp"
+#include "project/stores/Node.hpp"
 #include "project/stores/TextBackend.hpp"
 
 namespace projectctl {
 
 using fl::filesystem::Path;
 
-/// A project with its store, opened for one command.
+/// A project with its store, opened for one command or one batch of commands.
 ///
 /// Commands use the managers. Commands that only read use the store directly where they must be fast, or must
 /// see entries that a manager cannot handle.
@@ -45,8 +47,18 @@ public:
 
     project::metadata::MetadataManager& store() noexcept { return session_.store(); }
 
-    /// The backend of the store. Its `load` may be called while a guard of the store is open.
+    /// The backend of the store, which does not contain the changes of a transaction. Its `load` may be
+    /// called while a guard of the store is open.
     project::stores::TextBackend& text() noexcept { return access_.text(); }
+
+    /// The addresses directly below one address, as `load` of the text returns them, with the changes of a
+    /// transaction. Call it with a guard of the store open.
+    project::stores::Children childrenOf(project::metadata::MetadataPath const& address);
+
+    /// The faults of the text. In a transaction, those that were found before it: reading the text again
+    /// would show the changes of other programs in the middle of it. Otherwise call this without an open
+    /// guard.
+    std::vector<project::stores::Fault> const& faultsOfText();
 
     WriteShield& shield() noexcept { return *shield_; }
 
@@ -57,7 +69,7 @@ public:
     std::string storeFile(std::string const& name) const;
 
     /// Warns on standard error, in one line, if the text is damaged or contains conflicts, because a listing
-    /// may then be incomplete. Call this without an open guard.
+    /// may then be incomplete. Does nothing in a transaction. Call this without an open guard.
     void warnOfDamage();
 
     /// Reads the changes of other programs, and raises the events for them.
@@ -65,12 +77,13 @@ public:
 
     project::management::ProjectEventBroadcaster& events() noexcept { return *session_.events(); }
 
-    /// Lets stage() stage those of these files whose removal is staged: they were added, and git may know them
-    /// as removed ones. A transaction that is rolled back takes the request back.
+    /// Lets stage() stage those of these files whose removal is staged: they were added, and git may know
+    /// them as removed ones. A transaction that is rolled back takes the request back.
     void stageReturnedLater(std::vector<Path> const& files);
 
     /// Brings git's index up to date after the command's work: stages the text, if it was written and git
-    /// tracks it, and the files of stageReturnedLater that are in the project. Call this without an open guard.
+    /// tracks it, and the files of stageReturnedLater that are in the project. Call this without an open
+    /// guard.
     void stage();
 
     /// Marks the text as changed through text(), so that stage() stages it.
@@ -94,6 +107,8 @@ private:
     Session session_;
     project::session::ToolAccess access_{session_};
     std::vector<Path> returned_; ///< of stageReturnedLater
+    std::vector<project::stores::Fault> faultsOfText_;
+    std::size_t openTransactions_ = 0;
 };
 
 } // namespace projectctl

@@ -24,6 +24,8 @@ public:
         }
         return 0;
     }
+
+    bool canRunInBatch() const override { return false; }
 };
 
 } // namespace

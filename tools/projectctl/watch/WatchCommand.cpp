@@ -36,6 +36,8 @@ public:
         }
     }
 
+    bool canRunInBatch() const override { return false; }
+
 private:
     /// A text that cannot be read now may be readable later: another program may be writing it.
     void checkForChanges(OpenProject& project) {

@@ -1,0 +1,115 @@
+#include <algorithm>
+#include <exception>
+#include <filesystem>
+#include <fstream>
+#include <iostream>
+#include <iterator>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "batch/BatchLines.hpp"
+#include "batch/Commands.hpp"
+#include "cli/CodedFailure.hpp"
+#include "cli/CommandText.hpp"
+#include "cli/StandardInput.hpp"
+#include "cli/TextArguments.hpp"
+#include "output/Output.hpp"
+#include "output/Progress.hpp"
+#include "project/ProjectTransaction.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// Runs several commands as one step. They are commands like any other, and get the project that is open in a
+/// transaction. If one of them fails, none has changed anything.
+class BatchCommand : public ProjectCommand {
+public:
+    explicit BatchCommand(CommandList const& commands) : commands_(commands) {}
+
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand(
+            "batch",
+            "Run several commands as one step: if one fails, nothing is changed. Each line is one command, "
+            "without 'projectctl', whose words are quoted as in a shell; nothing is expanded. Empty lines "
+            "and comments, which begin with #, are skipped. A command sees the changes of those before it. "
+            "The commands init, root, references, batch, watch, tidy, setup, merge, resolve and check "
+            "--repair cannot be part of a batch. Exits with 3 if a command has found a fault, which does not "
+            "stop the batch");
+        takeText(*app, "FILE", file_, "The file with the commands; - or none is standard input");
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto const lines = parseBatch(read(), commands_);
+        project.warnOfDamage();
+        Progress progress("Running the commands");
+        ProjectTransaction transaction(project);
+        auto const result = runAll(lines, project, progress);
+        output().flush(); // while a failure can still roll everything back
+        commit(transaction);
+        output().say(std::to_string(lines.size()) + " commands done");
+        return result;
+    }
+
+    bool canRunInBatch() const override { return false; }
+
+private:
+    std::string read() const {
+        if (!file_ || *file_ == "-") {
+            claimStandardInput();
+            std::cin.sync_with_stdio(false);
+            return {std::istreambuf_iterator<char>(std::cin), {}};
+        }
+        std::error_code error;
+        std::ifstream file(*file_, std::ios::binary);
+        if (!file || std::filesystem::is_directory(*file_, error)) {
+            throw Failure('"' + *file_ + "\" cannot be read");
+        }
+        return {std::istreambuf_iterator<char>(file), {}};
+    }
+
+    /// @return `finding` if a command has returned it, otherwise `done`.
+    static int runAll(std::vector<BatchLine> const& lines, OpenProject& project, Progress& progress) {
+        Output::Silence const silence(output()); // confirmations of changes that are not committed yet
+        int result = exit_code::done;
+        std::size_t count = 0;
+        for (auto const& line : lines) {
+            try {
+                result = std::max(result, line.command->run(project));
+            } catch (std::exception const& error) {
+                fail(ofLine(line.number) + error.what(), error);
+            }
+            progress.reach(++count);
+        }
+        return result;
+    }
+
+    static void commit(ProjectTransaction& transaction) {
+        try {
+            transaction.commit();
+        } catch (std::exception const& error) {
+            if (exitCodeFor(error) == exit_code::outcomeUnknown) {
+                throw;
+            }
+            fail(error.what(), error);
+        }
+    }
+
+    /// Says what the error itself does not: that all lines are rolled back.
+    [[noreturn]] static void fail(std::string const& text, std::exception const& error) {
+        throw CodedFailure(text + " (nothing was changed)", exitCodeFor(error));
+    }
+
+    CommandList const& commands_;
+    std::optional<std::string> file_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeBatchCommand(CommandList const& commands) {
+    return std::make_unique<BatchCommand>(commands);
+}
+
+} // namespace projectctl

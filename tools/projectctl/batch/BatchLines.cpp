@@ -1,0 +1,53 @@
+#include "batch/BatchLines.hpp"
+
+#include <optional>
+#include <utility>
+
+#include "cli/CodedFailure.hpp"
+#include "cli/CommandLine.hpp"
+#include "cli/CommandText.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// The options that are about the whole batch must not be in one of its lines.
+void requireOptionsOfOneCommand(std::vector<std::string> const& words) {
+    for (auto const& word : words) {
+        if (word == "--") {
+            return;
+        }
+        if (isCommonOption(word)) {
+            throw WrongUse(word + " applies to the whole batch: give it to 'projectctl batch'");
+        }
+    }
+}
+
+std::unique_ptr<ProjectCommand> parsed(std::vector<std::string> const& words, CommandList const& commands) {
+    requireOptionsOfOneCommand(words);
+    auto command = parseCommand(words, commands);
+    auto* const ofProject = dynamic_cast<ProjectCommand*>(command.get());
+    if (ofProject == nullptr || !ofProject->canRunInBatch()) {
+        throw WrongUse('\'' + words.front() + "' cannot be part of a batch in this form");
+    }
+    std::unique_ptr<ProjectCommand> result(ofProject);
+    static_cast<void>(command.release());
+    return result;
+}
+
+} // namespace
+
+std::vector<BatchLine> parseBatch(std::string text, CommandList const& commands) {
+    CommandText rest(std::move(text));
+    std::vector<BatchLine> result;
+    while (auto const line = rest.next()) {
+        try {
+            result.push_back({line->number, parsed(line->words, commands)});
+        } catch (WrongUse const& error) {
+            throw WrongUse(ofLine(line->number) + error.what());
+        }
+    }
+    return result;
+}
+
+} // namespace projectctl

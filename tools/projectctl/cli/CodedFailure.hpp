@@ -1,0 +1,27 @@
+#pragma once
+
+#include <string>
+
+#include "cli/ExitCode.hpp"
+#include "output/Failure.hpp"
+
+namespace projectctl {
+
+/// An error with an exit code of its own.
+class CodedFailure : public Failure {
+public:
+    CodedFailure(std::string const& text, int exitCode) : Failure(text), exitCode_(exitCode) {}
+
+    int exitCode() const noexcept { return exitCode_; }
+
+private:
+    int exitCode_;
+};
+
+/// Arguments or commands that cannot be parsed, or that cannot be combined.
+class WrongUse : public CodedFailure {
+public:
+    explicit WrongUse(std::string const& text) : CodedFailure(text, exit_code::wrongUse) {}
+};
+
+} // namespace projectctl
