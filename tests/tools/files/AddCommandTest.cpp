@@ -232,10 +232,11 @@ TEST_F(AddToLabelled, keepsEverythingElseOfTheText) {
     ASSERT_THAT(tool({"label", "put", "Owner", "Ada", "src"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "put", "Status", "Late", "src"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "put", "Status", "Early", "src"}), SucceedsSilently());
-    insertLineBefore("{\"file\":\"readme\"", R"({"at":["Files","Notes","File","src"],"keys":{"Note":"new"}})");
+    insertLineBefore("{\"file\":\"readme\"",
+                     R"({"at":["Files","Notes","File","src"],"keys":{"Note":"new"}})");
     insertLineBefore("{\"file\":\"readme\"", R"({"at":["Files","Root","File","src","LabelData","Data"],)"
-                                   R"("children":[{"type":"Record","keys":{"UUID":")" +
-                                       uuidOf("Late") + R"(","Value":"since May"}}]})");
+                                             R"("children":[{"type":"Record","keys":{"UUID":")" +
+                                                 uuidOf("Late") + R"(","Value":"since May"}}]})");
     ASSERT_THAT(tool({"tidy"}), SucceedsSilently());
     ASSERT_THAT(tool({"label", "show", "src"}),
                 Prints("Status: Open\nStatus: Late = since May\nStatus: Early\nOwner: Ada\n"));

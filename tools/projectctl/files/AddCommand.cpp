@@ -98,8 +98,8 @@ private:
 
     using Nodes = std::map<Path, std::shared_ptr<project::metadata::MetadataNode>>;
 
-    /// The folders above added paths that have labels, with their nodes. Folders that are added again themselves
-    /// are not among them: the user asked for that.
+    /// The folders above added paths that have labels, with their nodes. Folders that are added again
+    /// themselves are not among them: the user asked for that.
     Nodes labelledFoldersAbove(std::vector<Path> const& added, Path const& root,
                                project::management::FileMetadataManager& fileList) const {
         std::set<Path> addedAgain;

@@ -6,8 +6,8 @@
 
 namespace projectctl {
 
-/// Several changes of an open project as one step, which is rolled back unless it is committed. Transactions may
-/// be nested, as those of a session.
+/// Several changes of an open project as one step, which is rolled back unless it is committed. Transactions
+/// may be nested, as those of a session.
 class ProjectTransaction {
 public:
     /// Takes the store's write guard until the transaction ends.
