@@ -12,17 +12,17 @@ constexpr char16_t separator = u'/';
 
 /// The text after the leading separators.
 std::u16string_view withoutLeadingSeparators(std::u16string_view text) noexcept {
-    auto const begin = text.find_first_not_of(separator);
+    std::size_t const begin = text.find_first_not_of(separator);
     return begin == std::u16string_view::npos ? std::u16string_view() : text.substr(begin);
 }
 
 /// The last element of a path, without regard to trailing separators; "/" for a root alone.
 std::u16string_view lastElement(std::u16string_view path) noexcept {
-    auto const end = path.find_last_not_of(separator);
+    std::size_t const end = path.find_last_not_of(separator);
     if (end == std::u16string_view::npos) {
         return path.substr(0, std::min<std::size_t>(path.size(), 1));
     }
-    auto const begin = path.find_last_of(separator, end);
+    std::size_t const begin = path.find_last_of(separator, end);
     return begin == std::u16string_view::npos ? path.substr(0, end + 1) : path.substr(begin + 1, end - begin);
 }
 
@@ -70,7 +70,7 @@ std::u16string_view move_down(std::u16string_view path) noexcept {
 
 std::u16string_view extract_stem(std::u16string_view path) noexcept {
     std::u16string_view const name = lastElement(path);
-    auto const dot = name.rfind(u'.');
+    std::size_t const dot = name.rfind(u'.');
     bool const hasExtension = dot != std::u16string_view::npos && dot != 0 && name != u"..";
     return hasExtension ? name.substr(0, dot) : name;
 }

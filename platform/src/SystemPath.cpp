@@ -19,7 +19,7 @@ std::filesystem::path makeAbsolute(std::filesystem::path const& path) {
 
 /// The text without trailing separators, except that of the root.
 std::u16string withoutTrailingSeparators(std::u16string text) {
-    auto const last = text.find_last_not_of(u'/');
+    std::size_t const last = text.find_last_not_of(u'/');
     text.resize(last == std::u16string::npos ? 1 : last + 1);
     return text;
 }

@@ -33,7 +33,7 @@ void dropSeparators(Text& names) {
 }
 
 Text withoutTrailingSeparators(Text path) {
-    auto const last = path.find_last_not_of(separator);
+    std::size_t const last = path.find_last_not_of(separator);
     return path.substr(0, last == Text::npos ? 0 : last + 1);
 }
 
@@ -76,7 +76,7 @@ std::optional<Text> plainTextBelow(Text base, Text target) {
 void dropCommonText(Text& left, Text& right) {
     auto const ends = std::mismatch(left.begin(), left.end(), right.begin(), right.end());
     auto const same = left.substr(0, static_cast<std::size_t>(ends.first - left.begin()));
-    auto const slash = same.rfind(separator);
+    std::size_t const slash = same.rfind(separator);
     std::size_t const length = slash == Text::npos ? 0 : slash + 1;
     left.remove_prefix(length);
     right.remove_prefix(length);
@@ -139,7 +139,7 @@ bool is_directory(Path const& path) {
 Path getParentFolder(Path const& path) {
     Text const text = path.native();
     Text const names = withoutTrailingSeparators(text);
-    auto const slash = names.rfind(separator);
+    std::size_t const slash = names.rfind(separator);
     Text const parent = withoutTrailingSeparators(names.substr(0, slash == Text::npos ? 0 : slash));
     return std::u16string(parent.empty() && isAbsolute(text) ? text.substr(0, 1) : parent);
 }

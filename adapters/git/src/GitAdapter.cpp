@@ -55,7 +55,7 @@ std::set<fl::filesystem::Path> GitAdapter::trackedBelow(std::vector<Path> const&
     auto* const index = repository->index();
     for (auto const& folder : folders) {
         auto const path = repository->workTree().relativeInProject(folder);
-        auto position = path ? firstBelow(index, *path) : git_index_entrycount(index);
+        std::size_t position = path ? firstBelow(index, *path) : git_index_entrycount(index);
         for (; position < git_index_entrycount(index); ++position) {
             std::string const entry = git_index_get_byindex(index, position)->path;
             if (!isBelow(entry.c_str(), *path)) {

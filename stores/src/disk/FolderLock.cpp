@@ -165,7 +165,7 @@ std::string findLockHolder(int folder) {
         std::string number, kind, advisory, access, process, place;
         words >> number >> kind >> advisory >> access >> process >> place;
         if (kind == "FLOCK" && isLockOn(place, status)) {
-            auto const command = commandOf(process);
+            std::string const command = commandOf(process);
             return "process " + process + (command.empty() ? "" : " (" + command + ")");
         }
     }

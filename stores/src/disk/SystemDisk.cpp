@@ -122,7 +122,7 @@ std::string SystemDisk::lockHolder() {
 
 std::optional<FileIdentity> SystemDisk::identifyByPath(std::string const& name) {
     folder_.requireOwnProcess();
-    auto const path = folder_.pathOf(name);
+    std::string const path = folder_.pathOf(name);
     return identifyIn(AT_FDCWD, path, path);
 }
 
@@ -151,7 +151,7 @@ std::optional<FileContent> SystemDisk::read(std::string const& name, std::uint64
     if (!openFile(file, name, O_RDONLY)) {
         return std::nullopt;
     }
-    auto const path = folder_.pathOf(name);
+    std::string const path = folder_.pathOf(name);
     auto const identity = identifyOpenFile(file.get(), path);
     return FileContent{readFrom(file.get(), offset, identity.size, path), identity};
 }

@@ -56,7 +56,8 @@ private:
             }
         }
         Siblings const siblings({nullptr, &ours, &theirs});
-        for (auto const rank : siblings.mergedOrder(std::vector<bool>(siblings.byRank().size(), true))) {
+        for (std::size_t const rank :
+             siblings.mergedOrder(std::vector<bool>(siblings.byRank().size(), true))) {
             addNested(target, siblings.byRank()[rank]);
         }
     }

@@ -74,7 +74,7 @@ TextBody readBase(std::string_view text, TextBody const& ours, TextBody const& t
         return bodyOf(std::move(reading));
     }
     auto const [first, second] = sidesOfConflictedText(std::string(text));
-    auto const disputed = textInNeither(ours, theirs);
+    std::string const disputed = textInNeither(ours, theirs);
     return disputedBase(bodyOf(readUndamaged(first, version)), bodyOf(readUndamaged(second, version)),
                         std::u16string(disputed.begin(), disputed.end()));
 }

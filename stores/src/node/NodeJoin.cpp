@@ -45,9 +45,9 @@ void NodeJoin::addTo(MetadataNode& target, MetadataNode const& later) {
     ByIdentity& known = nestedIn(target);
     std::unordered_map<std::string, std::size_t> counts;
     for (auto const& child : later.getChildren()) {
-        auto identity = identityOf(*child);
+        std::string identity = identityOf(*child);
         auto& same = known[identity];
-        auto const earlier = counts[std::move(identity)]++;
+        std::size_t const earlier = counts[std::move(identity)]++;
         if (earlier >= same.size()) {
             same.push_back(target.addChild(child->getType()));
             copyInto(*same.back(), *child);

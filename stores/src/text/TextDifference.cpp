@@ -22,7 +22,7 @@ class Candidates {
 public:
     Candidates(TextContent const& left, TextContent const& right) : left_(left), right_(right) {
         compareBodies();
-        auto const ofBodies = found_.size();
+        std::size_t const ofBodies = found_.size();
         addOverlay(left_);
         addOverlay(right_);
         if (found_.size() > ofBodies) {

@@ -33,11 +33,11 @@ public:
         }
         Progress progress("Checking the project");
         std::size_t faults = 0;
-        auto const file = project.textFile();
+        std::string const file = project.textFile();
         auto const& faultsOfText = project.faultsOfText();
         for (auto const& fault : faultsOfText) {
             ++faults;
-            auto const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
+            std::string const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
             report(file + line + ": " + fault.problem);
         }
         for (auto const& finding : TreeCheck(project).run()) {
@@ -47,7 +47,7 @@ public:
         }
         Findings ofSetup;
         checkMergeSetup(project.root(), ofSetup);
-        auto const faultsOfProject = faults;
+        std::size_t const faultsOfProject = faults;
         for (auto const& finding : ofSetup) {
             bool const isFault = finding.weight == Finding::Weight::Fault;
             faults += isFault ? 1 : 0;
@@ -64,7 +64,7 @@ public:
 private:
     static void repair(OpenProject& project) {
         project.shield().raise();
-        auto const aside = project.text().repair();
+        std::string const aside = project.text().repair();
         if (!aside.empty()) {
             project.stageLater();
             report("the damaged lines are now in " + project.storeFile(aside));

@@ -38,7 +38,8 @@ Findings EntryPointCheck::run() {
 
 void EntryPointCheck::check(std::u16string const& uuid, Node const& node) {
     auto const& file = node.get(treeSchema::entrypoints::fileKey);
-    auto const entry = "the entry point " + inQuotes(uuid) + " of the file " + inQuotes(shown_.of(file));
+    std::string const entry =
+        "the entry point " + inQuotes(uuid) + " of the file " + inQuotes(shown_.of(file));
     ++files_[file];
     checkFile(entry, file);
     auto const& group = node.get(treeSchema::entrypoints::groupUUIDKey);

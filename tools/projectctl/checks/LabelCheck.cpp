@@ -54,7 +54,7 @@ void LabelCheck::check(std::u16string_view path, Node const& node, ShownPaths& s
     if (node.getChildren().empty()) {
         return;
     }
-    auto const file = "the file " + inQuotes(shown.of(path));
+    std::string const file = "the file " + inQuotes(shown.of(path));
     for (auto const& [category, labels] : labelsOn(node)) {
         checkCategory(file, category, labels, findings);
     }
@@ -63,7 +63,7 @@ void LabelCheck::check(std::u16string_view path, Node const& node, ShownPaths& s
 std::map<std::u16string, LabelCheck::Counts> LabelCheck::labelsOn(Node const& node) {
     std::map<std::u16string, Counts> result;
     for (auto const& category : node.getChildren()) {
-        auto const uuid = category->get(treeSchema::files::categoryUUIDKey);
+        std::u16string const uuid = category->get(treeSchema::files::categoryUUIDKey);
         if (category->getType() != treeSchema::files::categoryType || uuid.empty()) {
             continue; // no reader uses it
         }
@@ -85,7 +85,7 @@ void LabelCheck::checkCategory(std::string const& file, std::u16string const& uu
                                           ", which does not exist"));
         return;
     }
-    auto const name = inQuotes(category->second.name);
+    std::string const name = inQuotes(category->second.name);
     std::size_t total = 0;
     for (auto const& [label, count] : labels) {
         auto const known = category->second.labels.find(label);

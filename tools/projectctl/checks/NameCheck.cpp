@@ -5,8 +5,8 @@
 namespace projectctl {
 
 void checkName(std::u16string_view path, ShownPaths& shown, Findings& findings) {
-    auto const backslash = path.rfind(u'\\');
-    auto const separator = path.rfind(u'/');
+    std::size_t const backslash = path.rfind(u'\\');
+    std::size_t const separator = path.rfind(u'/');
     if (backslash != std::u16string_view::npos &&
         (separator == std::u16string_view::npos || separator < backslash)) {
         findings.push_back(Finding::note(inQuotes(shown.of(path)) +

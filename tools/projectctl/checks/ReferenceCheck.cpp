@@ -47,7 +47,7 @@ void ReferenceCheck::checkForms(ReferenceList const& list, References const& ref
 void ReferenceCheck::checkTargets(ReferenceList const& list, References const& references) {
     for (auto const& reference : references) {
         auto const& folder = reference.getLocation();
-        auto const subject =
+        std::string const subject =
             "the reference " + inQuotes(shown_.of(reference.getStoredPath())) + " in " + list.name;
         if (!project::metadata::is_directory(folder)) {
             findings_.push_back(Finding::note(subject + " cannot be followed: the folder " +

@@ -139,7 +139,7 @@ void TreeCheck::checkLabels(Address const& category) {
         if (!requireNode(label, "the label")) {
             continue;
         }
-        auto const state = store_.getNode(label)->get(treeSchema::categories::labelReadOnlyKey);
+        std::u16string const state = store_.getNode(label)->get(treeSchema::categories::labelReadOnlyKey);
         if (!isOneOf(state, {u"", u"READ_ONLY", u"WRITABLE", u"INHERITED"})) {
             fault("the label " + inQuotes(label.leaf().getLocation()) + " has the unknown read-only state " +
                   inQuotes(state));
@@ -153,7 +153,7 @@ void TreeCheck::checkEntryPoints(Address const& head) {
             continue;
         }
         auto const node = store_.getNode(entryPoint);
-        auto const uuid = inQuotes(entryPoint.leaf().getLocation());
+        std::string const uuid = inQuotes(entryPoint.leaf().getLocation());
         auto const& type = node->get(treeSchema::entrypoints::typeKey);
         if (!isOneOf(type, {u"Basic", u"Startup", u"StartUp", u"Shutdown", u"Batch_Job", u"Batch Job"})) {
             fault("the entry point " + uuid + " has the unknown type " + inQuotes(type));

@@ -13,7 +13,7 @@ Path ArgumentPaths::absolute(std::string const& argument) {
     if (argument.empty()) {
         throw Failure("an empty path does not name a file");
     }
-    auto const slash = argument.rfind('/');
+    std::size_t const slash = argument.rfind('/');
     auto const last = slash == std::string::npos ? argument : argument.substr(slash + 1);
     if (last.empty() || last == "." || last == "..") {
         return resolved(argument);

@@ -77,16 +77,16 @@ Called calledOf(CLI::App const& tool) {
 /// The parser's text, and the command that shows the help.
 WrongUse wrongUse(CLI::ParseError const& error, CLI::App const& tool) {
     auto const called = calledOf(tool);
-    auto const isGroup = !called.app->get_subcommands([](auto const*) { return true; }).empty();
+    bool const isGroup = !called.app->get_subcommands([](auto const*) { return true; }).empty();
     auto const unknown = isGroup ? called.app->remaining() : std::vector<std::string>();
-    auto const problem =
+    std::string const problem =
         unknown.empty() ? error.what() : "unknown command or option \"" + unknown.front() + '"';
     return WrongUse(withoutMarks(problem) + " ('" + called.name + " --help' shows the usage)");
 }
 
 int showHelp(CLI::App const& tool) {
     auto const called = calledOf(tool);
-    auto const end = called.name.rfind(' '); // of the part before the command's own name
+    std::size_t const end = called.name.rfind(' '); // of the part before the command's own name
     output().text() +=
         called.app->help(end == std::string::npos ? std::string() : called.name.substr(0, end));
     output().flush();

@@ -9,7 +9,7 @@ std::string languageOfEnvironment() {
         auto const* value = std::getenv(variable);
         if (value != nullptr && *value != '\0') { // an empty one counts as not set
             std::string const locale(value);
-            auto const language = locale.substr(0, locale.find_first_of(".@"));
+            std::string const language = locale.substr(0, locale.find_first_of(".@"));
             return language.empty() || language == "C" || language == "POSIX" ? "en" : language;
         }
     }

@@ -51,7 +51,7 @@ std::vector<std::string> markedArguments(std::vector<std::string> const& given) 
             optionsEnded = true;
             continue;
         }
-        auto const rest = behindMarks(argument);
+        std::string_view const rest = behindMarks(argument);
         bool const isDashed = rest.starts_with('-') && (optionsEnded || rest.size() < argument.size());
         result.push_back((isSpecial(rest) || isDashed ? std::string(1, mark) : std::string()) +
                          std::string(argument));
@@ -60,7 +60,7 @@ std::vector<std::string> markedArguments(std::vector<std::string> const& given) 
 }
 
 std::string unmarked(std::string const& argument) {
-    auto const rest = behindMarks(argument);
+    std::string_view const rest = behindMarks(argument);
     bool const isMarked = rest.size() < argument.size() && (isSpecial(rest) || rest.starts_with('-'));
     return isMarked ? argument.substr(1) : argument;
 }

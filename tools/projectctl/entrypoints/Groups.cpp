@@ -18,7 +18,7 @@ EntryPointGroup& Groups::named(std::string const& name) const {
     for (auto const& group : groups_) {
         names.push_back({group->getName(), group->getUUID()});
     }
-    auto const wanted = textOf(name);
+    std::u16string const wanted = textOf(name);
     auto const chosen = choose(names, wanted, "entry point groups");
     if (!chosen) {
         throw Failure("there is no entry point group " + inQuotes(wanted) +

@@ -25,7 +25,7 @@ using ZEPHRA::project::management::FileNotInProject;
 /// The stored path has "/" in place of every backslash. An entry point of such a file could not be found
 /// again.
 void requireNoBackslash(Path const& root, Path const& file) {
-    auto const fromRoot = project::metadata::getRelativePath(root, file);
+    std::u16string const fromRoot = project::metadata::getRelativePath(root, file);
     if (fromRoot.find(u'\\') != std::u16string::npos) {
         throw Failure(
             "an entry point of " + inQuotes(fromRoot) +
@@ -90,7 +90,7 @@ private:
             entry.removeExtensionData(textOf(key));
         }
         for (auto const& pair : extensions_) {
-            auto const equals = pair.find('=');
+            std::size_t const equals = pair.find('=');
             if (equals == std::string::npos) {
                 throw Failure('"' + pair + "\" is not an extension. Give it as KEY=VALUE");
             }

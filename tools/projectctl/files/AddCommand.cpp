@@ -57,7 +57,7 @@ public:
         auto const given = given_.read();
         Progress progress("Reading folders");
         auto const contents = isRecursive_ ? contentsOf(given, project, progress) : std::vector<Path>();
-        auto const addedCount = add(project, given, contents, progress);
+        std::size_t const addedCount = add(project, given, contents, progress);
         report(project, addedCount);
         return 0;
     }
@@ -71,7 +71,7 @@ private:
         std::vector<Path> skipped;
         for (auto const& path : given) {
             if (path != project.root()) { // the root is part of every project
-                auto const isSkipped = !addsAnew_ && project.files().isFileInProject(path);
+                bool const isSkipped = !addsAnew_ && project.files().isFileInProject(path);
                 (isSkipped ? skipped : added).push_back(path);
             }
         }
@@ -160,7 +160,7 @@ private:
     void report(OpenProject& project, std::size_t addedCount) const {
         ShownPaths shown(project.root());
         if (!unaddable_.empty()) {
-            auto const others = unaddable_.size() - 1;
+            std::size_t const others = unaddable_.size() - 1;
             printError("left out " + inQuotes(shown.ofAbsolute(unaddable_.front())) +
                        (others > 0 ? " and " + std::to_string(others) + " more" : "") +
                        ": a name that begins with two dots cannot be added from the project's root");

@@ -30,7 +30,7 @@ std::string namesFor(Path const& root, std::vector<Path> const& paths) {
 }
 
 std::string_view takeName(std::string_view& names) {
-    auto const name = names.substr(0, names.find('\0'));
+    std::string_view const name = names.substr(0, names.find('\0'));
     names.remove_prefix(name.empty() ? names.size() : name.size() + 1);
     return name;
 }
@@ -41,7 +41,7 @@ std::string askGit(Path const& root, std::vector<std::string> const& arguments, 
     try {
         auto result = runGit(root, arguments, input);
         if (result.exitCode < 0 || result.exitCode > accepted) {
-            auto const line = result.errors.substr(0, result.errors.find('\n'));
+            std::string const line = result.errors.substr(0, result.errors.find('\n'));
             throw Failure("git cannot list ignored files: " + (line.empty() ? "unknown error" : line));
         }
         return std::move(result.output);
@@ -55,7 +55,7 @@ std::string askGit(Path const& root, std::vector<std::string> const& arguments, 
 
 /// The tracked files that match an ignore pattern.
 std::unordered_set<std::string> trackedDespitePattern(Path const& root) {
-    auto const output =
+    std::string const output =
         askGit(root, {"ls-files", "-z", "--cached", "--ignored", "--exclude-standard"}, {}, 0);
     std::unordered_set<std::string> result;
     for (std::string_view names = output; !names.empty();) {
@@ -67,9 +67,9 @@ std::unordered_set<std::string> trackedDespitePattern(Path const& root) {
 } // namespace
 
 std::vector<Path> withoutIgnoredByGit(Path const& root, std::vector<Path> paths) {
-    auto const names = namesFor(root, paths);
+    std::string const names = namesFor(root, paths);
     // --no-index, because git would otherwise search the whole index for each name.
-    auto const matching = askGit(root, {"check-ignore", "-z", "--stdin", "--no-index"}, names, 1);
+    std::string const matching = askGit(root, {"check-ignore", "-z", "--stdin", "--no-index"}, names, 1);
     if (matching.empty()) {
         return paths;
     }
@@ -78,8 +78,8 @@ std::vector<Path> withoutIgnoredByGit(Path const& root, std::vector<Path> paths)
     std::string_view asked = names;
     std::string_view answered = matching; // in the order asked
     for (auto& path : paths) {
-        auto const name = takeName(asked);
-        auto next = answered;
+        std::string_view const name = takeName(asked);
+        std::string_view next = answered;
         bool const matches = !answered.empty() && takeName(next) == name;
         if (matches) {
             answered = next;

@@ -45,7 +45,7 @@ constexpr std::string_view quoteInQuotes = R"('\'')";
 
 /// The program in single quotes for the shell, and with its percent signs doubled for git.
 std::string commandFor(std::string const& program) {
-    auto const quoted = '\'' + replaced(replaced(program, "'", quoteInQuotes), "%", "%%") + '\'';
+    std::string const quoted = '\'' + replaced(replaced(program, "'", quoteInQuotes), "%", "%%") + '\'';
     return std::string(commandStart) + quoted + std::string(commandEnd);
 }
 
@@ -60,7 +60,7 @@ std::optional<std::string> programIn(std::string_view command) {
         return std::nullopt;
     }
     auto const inside = std::string(command.substr(1, command.size() - 2));
-    auto program = replaced(replaced(inside, quoteInQuotes, "'"), "%%", "%");
+    std::string program = replaced(replaced(inside, quoteInQuotes, "'"), "%%", "%");
     return commandFor(program).substr(commandStart.size(), command.size()) == command
                ? std::optional(std::move(program))
                : std::nullopt;
@@ -73,7 +73,7 @@ bool canBeRun(std::string const& program) {
 
 std::string thisProgram() {
     std::error_code error;
-    auto program = std::filesystem::read_symlink("/proc/self/exe", error).string();
+    std::string program = std::filesystem::read_symlink("/proc/self/exe", error).string();
     if (error || !canBeRun(program)) {
         throw Failure("git cannot be set up: the path of this program is unknown");
     }
@@ -89,7 +89,7 @@ void configure(Path const& folder, char const* key, std::string const& value) {
 
 /// Whether git's attributes assign the driver to the text.
 bool isAssigned(Path const& folder) {
-    auto const answer = runGit(folder, {"check-attr", "-z", "merge", "--", textInProject}).output;
+    std::string const answer = runGit(folder, {"check-attr", "-z", "merge", "--", textInProject}).output;
     return answer.find(std::string("\0merge\0project-definition\0", 26)) != std::string::npos;
 }
 
@@ -127,7 +127,7 @@ MergeSetup mergeSetupOf(Path const& folder) {
 }
 
 void setUpMerge(Path const& folder) {
-    auto const command = commandFor(thisProgram());
+    std::string const command = commandFor(thisProgram());
     configure(folder, nameKey, "projects, by address and key instead of by line");
     configure(folder, driverKey, command);
 }

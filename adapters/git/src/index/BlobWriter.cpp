@@ -20,7 +20,7 @@ using FilterHandle = std::unique_ptr<git_filter_list, FreedBy<git_filter_list_fr
 } // namespace
 
 BlobWriter::BlobWriter(Repository const& repository) : repository_(repository) {
-    auto const folder = git_repository_commondir(repository.get()) + std::string("objects");
+    std::string const folder = git_repository_commondir(repository.get()) + std::string("objects");
     git_odb* objects = nullptr;
     git_odb_backend* backend = nullptr;
     require(git_odb_new(&objects), folder, action);
@@ -33,7 +33,7 @@ BlobWriter::BlobWriter(Repository const& repository) : repository_(repository) {
 }
 
 bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isConverted, git_oid& id) {
-    auto const name = repository_.workTree().onDisk(path);
+    std::string const name = repository_.workTree().onDisk(path);
     if (S_ISREG(onDisk.st_mode) && onDisk.st_size > tooLargeForMemory) {
         auto const code = git_blob_create_from_workdir(&id, repository_.get(), path.c_str());
         require(code == GIT_ENOTFOUND ? 0 : code, name, action);
@@ -55,7 +55,7 @@ bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isC
 }
 
 std::string BlobWriter::convert(TreePath const& path, std::string const& content) const {
-    auto const name = repository_.workTree().onDisk(path);
+    std::string const name = repository_.workTree().onDisk(path);
     git_filter_list* filters = nullptr;
     require(git_filter_list_load(&filters, repository_.get(), nullptr, path.c_str(), GIT_FILTER_TO_ODB,
                                  GIT_FILTER_DEFAULT),

@@ -68,7 +68,7 @@ Staging::Names Staging::stageable(std::vector<fl::filesystem::Path> const& files
         if (!path || folders.kindOf(parentOf(*path)) != FolderKind::Ours || nameOf(*path) == ".git") {
             continue;
         }
-        auto const name = repository_.workTree().onDisk(*path);
+        std::string const name = repository_.workTree().onDisk(*path);
         auto const onDisk = diskEntryAt(name);
         if (!onDisk || !isFileOrLink(*onDisk)) {
             continue;
@@ -94,7 +94,7 @@ void Staging::stage(TreePath const& path, bool isConverted, BlobWriter& blobs, I
 
 /// Removes entries for a folder in whose place there is a file on disk, or the reverse.
 void Staging::removeReplaced(TreePath const& path, IndexChanges& changes) const {
-    for (auto folder = parentOf(path); !folder.empty(); folder = parentOf(folder)) {
+    for (std::string folder = parentOf(path); !folder.empty(); folder = parentOf(folder)) {
         if (trackedAt(repository_.index(), folder) != nullptr) {
             changes.removed.insert(folder);
         }
@@ -104,7 +104,8 @@ void Staging::removeReplaced(TreePath const& path, IndexChanges& changes) const 
 
 void Staging::removeBelow(TreePath const& folder, IndexChanges& changes) const {
     auto* const index = repository_.index();
-    for (auto position = firstBelow(index, folder); position < git_index_entrycount(index); ++position) {
+    for (std::size_t position = firstBelow(index, folder); position < git_index_entrycount(index);
+         ++position) {
         auto const* const entry = git_index_get_byindex(index, position);
         if (!isBelow(entry->path, folder)) {
             return;

@@ -35,7 +35,7 @@ std::array<FileStamp, 2> Repository::stampConfiguration() const {
 
 // git stores the settings of a sparse checkout in a file that libgit2 does not read before version 1.8.
 void Repository::addWorkTreeConfiguration() {
-    auto const file = git_repository_path(get()) + std::string("config.worktree");
+    std::string const file = git_repository_path(get()) + std::string("config.worktree");
     if (isSet("extensions.worktreeConfig", false) && FileStamp::of(file) != FileStamp()) {
         require(git_config_add_file_ondisk(config_.get(), file.c_str(), GIT_CONFIG_LEVEL_APP, get(), 1), file,
                 "the configuration cannot be read");

@@ -13,8 +13,8 @@ std::size_t firstBelow(git_index* index, TreePath const& folder) {
         return 0;
     }
     std::size_t position = 0;
-    auto const found = git_index_find_prefix(&position, index, (folder + '/').c_str()) == 0;
-    return found ? position : git_index_entrycount(index);
+    bool const isFound = git_index_find_prefix(&position, index, (folder + '/').c_str()) == 0;
+    return isFound ? position : git_index_entrycount(index);
 }
 
 } // namespace project::git

@@ -14,8 +14,8 @@ std::string normalized(std::string_view name) {
     std::string result;
     result.reserve(name.size());
     while (!name.empty()) {
-        auto const length = std::min(name.find('/'), name.size());
-        auto const element = name.substr(0, length);
+        std::size_t const length = std::min(name.find('/'), name.size());
+        std::string_view const element = name.substr(0, length);
         if (element == "..") {
             result.resize(result.empty() ? 0 : result.rfind('/'));
         } else if (!element.empty() && element != ".") {
@@ -34,7 +34,7 @@ bool isAtOrBelow(std::string const& name, std::string const& folder) {
 } // namespace
 
 TreePath parentOf(TreePath const& path) {
-    auto const slash = path.rfind('/');
+    std::size_t const slash = path.rfind('/');
     return slash == TreePath::npos ? TreePath() : path.substr(0, slash);
 }
 
@@ -58,7 +58,7 @@ std::optional<TreePath> WorkTreeRoot::relative(fl::filesystem::Path const& path)
     if (bytes.get() == nullptr || *bytes.get() != '/') {
         return std::nullopt;
     }
-    auto name = normalized(bytes.get());
+    std::string name = normalized(bytes.get());
     if (givenRoot_ != realRoot_ && isAtOrBelow(name, givenRoot_)) {
         name.replace(0, givenRoot_.size(), realRoot_);
     }

@@ -16,7 +16,7 @@ void skipBlanks(std::string_view& text) {
 }
 
 std::string_view takeWord(std::string_view& text) {
-    auto const word = text.substr(0, text.find_first_of(blanks));
+    std::string_view const word = text.substr(0, text.find_first_of(blanks));
     text.remove_prefix(word.size());
     return word;
 }
@@ -44,7 +44,7 @@ std::optional<char> takeEscaped(std::string_view& text) {
     if (!text.empty() && text[0] >= '0' && text[0] <= '3') {
         return takeOctal(text);
     }
-    auto const known = text.empty() ? std::string_view::npos : letters.find(text[0]);
+    std::size_t const known = text.empty() ? std::string_view::npos : letters.find(text[0]);
     if (known == std::string_view::npos) {
         return std::nullopt;
     }
@@ -64,7 +64,7 @@ std::optional<std::string> takeQuoted(std::string_view& text) {
     if (!text.starts_with('"')) {
         return std::nullopt;
     }
-    auto rest = text.substr(1);
+    std::string_view rest = text.substr(1);
     std::string result;
     while (!rest.empty() && rest[0] != '"') {
         auto const sign = takeFirst(rest);
@@ -91,8 +91,8 @@ bool isAttributeName(std::string_view name) {
 
 std::optional<AttributeState> readState(std::string_view word) {
     using Kind = AttributeValue::Kind;
-    auto const equals = word.find('=');
-    auto name = word.substr(0, equals);
+    std::size_t const equals = word.find('=');
+    std::string_view name = word.substr(0, equals);
     AttributeValue value{Kind::Set};
     if (name.starts_with('-') || name.starts_with('!')) {
         value.kind = name[0] == '-' ? Kind::Unset : Kind::Unspecified;
@@ -113,7 +113,7 @@ std::optional<AttributeLine> AttributeLine::read(std::string_view line) {
     }
     AttributeLine result;
     auto const quoted = takeQuoted(line);
-    auto const text = quoted ? *quoted : std::string(takeWord(line));
+    std::string const text = quoted ? *quoted : std::string(takeWord(line));
     if (text.starts_with(macroSign) && text.size() > macroSign.size()) {
         auto name = std::string_view(text).substr(macroSign.size());
         skipBlanks(name);
@@ -140,7 +140,7 @@ std::vector<AttributeLine> readAttributeLines(std::string_view text) {
     }
     std::vector<AttributeLine> result;
     while (!text.empty()) {
-        auto const end = std::min(text.find('\n'), text.size());
+        std::size_t const end = std::min(text.find('\n'), text.size());
         if (auto line = AttributeLine::read(text.substr(0, end))) {
             result.push_back(*std::move(line)); // NOLINT: their number is not known before
         }

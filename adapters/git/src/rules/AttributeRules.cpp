@@ -19,7 +19,7 @@ AttributeRules::AttributeRules(Repository const& repository)
     : repository_(repository),
       isCaseIgnored_(repository.isSet("core.ignoreCase", false)),
       own_(readLines(git_repository_commondir(repository.get()) + std::string("info/attributes"))) {
-    auto const configured = repository.configuredPath("core.attributesFile");
+    std::string const configured = repository.configuredPath("core.attributesFile");
     general_ = {readLines(configured.empty() ? repository.usersFile("attributes") : configured),
                 readLines(ofSystem), readAttributeLines(builtIn)};
     for (auto lines = general_.rbegin(); lines != general_.rend(); ++lines) {
@@ -33,7 +33,7 @@ AttributeRules::Values AttributeRules::of(TreePath const& path) {
     std::string_view const whole = path;
     Values result;
     applyMatching(own_, whole, result);
-    for (auto folder = path; !folder.empty();) {
+    for (std::string folder = path; !folder.empty();) {
         folder = parentOf(folder);
         applyMatching(ofFolder(folder), folder.empty() ? whole : whole.substr(folder.size() + 1), result);
     }
@@ -48,7 +48,7 @@ AttributeRules::Lines const& AttributeRules::ofFolder(TreePath const& folder) {
     if (known != folders_.end()) {
         return known->second;
     }
-    auto const file = folder.empty() ? ".gitattributes" : folder + "/.gitattributes";
+    std::string const file = folder.empty() ? ".gitattributes" : folder + "/.gitattributes";
     return folders_.try_emplace(folder, readAttributeLines(repository_.contentOf(file))).first->second;
 }
 

@@ -39,7 +39,7 @@ bool isPlainUtf8(std::string const& encoding) {
 } // namespace
 
 ContentRules::ContentRules(Repository const& repository) : repository_(repository), attributes_(repository) {
-    auto const lineEnds = repository.configured("core.autocrlf");
+    std::string const lineEnds = repository.configured("core.autocrlf");
     hasConvertedLineEnds_ = lineEnds == "input" || repository.isSet("core.autocrlf", false);
 }
 
@@ -48,8 +48,8 @@ Conversion ContentRules::conversionOf(TreePath const& path) {
     auto const isGiven = [&](std::string_view name) { return valueOf(values, name) != AttributeValue(); };
     Conversion result{hasConvertedLineEnds_ || std::any_of(converting.begin(), converting.end(), isGiven),
                       ""};
-    auto const driver = valueOf(values, "filter").text;
-    auto const encoding = valueOf(values, "working-tree-encoding").text;
+    std::string const driver = valueOf(values, "filter").text;
+    std::string const encoding = valueOf(values, "working-tree-encoding").text;
     if (!driver.empty() && isConfigured(driver)) {
         result.foreign = "the filter driver \"" + driver + '"';
     } else if (!encoding.empty() && !isPlainUtf8(encoding)) {
@@ -80,7 +80,7 @@ bool ContentRules::isConfigured(std::string const& driver) {
     if (known != drivers_.end()) {
         return known->second;
     }
-    auto const section = "filter." + driver + '.';
+    std::string const section = "filter." + driver + '.';
     bool const hasCommand = !repository_.configured(section + "clean").empty() ||
                             !repository_.configured(section + "process").empty() ||
                             repository_.isSet(section + "required", false);

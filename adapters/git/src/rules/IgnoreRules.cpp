@@ -11,7 +11,7 @@ std::string_view withoutEnd(std::string_view line) {
     if (line.ends_with('\r')) {
         line.remove_suffix(1);
     }
-    auto end = line.size();
+    std::size_t end = line.size();
     while (end > 0 && line[end - 1] == ' ') {
         --end;
     }
@@ -30,7 +30,7 @@ std::vector<IgnoreLine> readLines(std::string const& file, Links links) {
     }
     std::vector<IgnoreLine> result;
     while (!text.empty()) {
-        auto const end = std::min(text.find('\n'), text.size());
+        std::size_t const end = std::min(text.find('\n'), text.size());
         if (auto read = IgnoreLine::read(text.substr(0, end))) {
             result.push_back(*std::move(read)); // NOLINT: their number is not known before
         }
@@ -42,7 +42,7 @@ std::vector<IgnoreLine> readLines(std::string const& file, Links links) {
 } // namespace
 
 std::optional<IgnoreLine> IgnoreLine::read(std::string_view line) {
-    auto text = line.starts_with('#') ? std::string_view() : withoutEnd(line);
+    std::string_view text = line.starts_with('#') ? std::string_view() : withoutEnd(line);
     bool const isNegative = text.starts_with('!');
     text.remove_prefix(isNegative ? 1 : 0);
     auto pattern = NamePattern::of(text);
@@ -51,7 +51,7 @@ std::optional<IgnoreLine> IgnoreLine::read(std::string_view line) {
 
 IgnoreRules::IgnoreRules(Repository const& repository)
     : repository_(repository), isCaseIgnored_(repository.isSet("core.ignoreCase", false)) {
-    auto const configured = repository.configuredPath("core.excludesFile");
+    std::string const configured = repository.configuredPath("core.excludesFile");
     general_.push_back(
         readLines(git_repository_commondir(repository.get()) + std::string("info/exclude"), Links::Followed));
     general_.push_back(
@@ -60,9 +60,9 @@ IgnoreRules::IgnoreRules(Repository const& repository)
 
 bool IgnoreRules::isIgnored(TreePath const& path, bool isFolder) {
     std::string_view const whole = path;
-    for (auto folder = path; !folder.empty();) {
+    for (std::string folder = path; !folder.empty();) {
         folder = parentOf(folder);
-        auto const seen = folder.empty() ? whole : whole.substr(folder.size() + 1);
+        std::string_view const seen = folder.empty() ? whole : whole.substr(folder.size() + 1);
         if (auto const decision = decide(ofFolder(folder), seen, isFolder)) {
             return *decision;
         }
@@ -80,7 +80,7 @@ IgnoreRules::Lines const& IgnoreRules::ofFolder(TreePath const& folder) {
     if (known != folders_.end()) {
         return known->second;
     }
-    auto const file = folder.empty() ? ".gitignore" : folder + "/.gitignore";
+    std::string const file = folder.empty() ? ".gitignore" : folder + "/.gitignore";
     return folders_.try_emplace(folder, readLines(repository_.workTree().onDisk(file), Links::NotFollowed))
         .first->second;
 }

@@ -28,7 +28,7 @@ bool NamePattern::isMatch(std::string_view path, bool isFolder, bool isCaseIgnor
     if (isForFolders_ && !isFolder) {
         return false;
     }
-    auto const compared = isPath_ ? path : path.substr(path.rfind('/') + 1);
+    std::string_view const compared = isPath_ ? path : path.substr(path.rfind('/') + 1);
     if (hasWildcards_) {
         return isWildcardMatch(text_, compared, {isPath_, isCaseIgnored});
     }

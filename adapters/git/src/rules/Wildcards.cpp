@@ -65,14 +65,14 @@ private:
     bool isAt(char sign) const { return at_ < pattern_.size() && pattern_[at_] == sign; }
 
     std::optional<bool> containsNamed(Byte byte) {
-        auto const close = pattern_.find(']', at_ + 2);
+        std::size_t const close = pattern_.find(']', at_ + 2);
         if (close == std::string_view::npos) {
             return std::nullopt;
         }
         if (pattern_[close - 1] != ':' || close < at_ + 3) {
             return containsRange(byte); // not a name: the bracket is one of the characters
         }
-        auto const name = pattern_.substr(at_ + 2, close - at_ - 3);
+        std::string_view const name = pattern_.substr(at_ + 2, close - at_ - 3);
         at_ = close + 1;
         auto const* const found = std::find_if(namedClasses.begin(), namedClasses.end(),
                                                [&](NamedClass const& known) { return known.name == name; });
@@ -120,7 +120,7 @@ public:
         : pattern_(pattern), text_(text), mode_(mode), failed_((pattern.size() + 1) * (text.size() + 1), 0) {}
 
     bool canMatch(std::size_t inPattern, std::size_t inText) {
-        auto const place = inPattern * (text_.size() + 1) + inText;
+        std::size_t const place = inPattern * (text_.size() + 1) + inText;
         if (failed_[place] != 0) {
             return false;
         }
@@ -147,20 +147,20 @@ private:
             return bracket.contains(byteAt(inText)).value_or(false) && !isBarrier(inText) &&
                    canMatch(bracket.end(), inText + 1);
         }
-        auto const literal = inPattern + (sign == '\\' ? 1 : 0);
+        std::size_t const literal = inPattern + (sign == '\\' ? 1 : 0);
         return literal < pattern_.size() && folded(static_cast<Byte>(pattern_[literal])) == byteAt(inText) &&
                canMatch(literal + 1, inText + 1);
     }
 
     bool canMatchStars(std::size_t inPattern, std::size_t inText) {
-        auto const behind = std::min(pattern_.find_first_not_of('*', inPattern), pattern_.size());
+        std::size_t const behind = std::min(pattern_.find_first_not_of('*', inPattern), pattern_.size());
         bool const isDouble = behind - inPattern > 1 && (inPattern == 0 || pattern_[inPattern - 1] == '/') &&
                               (behind == pattern_.size() || pattern_[behind] == '/');
         if (isDouble && behind < pattern_.size() && canMatch(behind + 1, inText)) {
             return true; // no folder in between
         }
         bool const isStopped = mode_.isPath && !isDouble;
-        for (auto end = inText; end <= text_.size(); ++end) {
+        for (std::size_t end = inText; end <= text_.size(); ++end) {
             if (canMatch(behind, end)) {
                 return true;
             }

@@ -66,7 +66,7 @@ bool EntryComparison::isContentModified(git_index_entry const& entry, struct sta
     if (entry.file_size != 0 && entry.file_size != static_cast<std::uint32_t>(onDisk.st_size)) {
         return true; // even if a filter would restore the size: git does not check that either
     }
-    auto const name = repository_.workTree().onDisk(entry.path);
+    std::string const name = repository_.workTree().onDisk(entry.path);
     git_oid content{};
     bool isRead = false;
     if (S_ISLNK(onDisk.st_mode)) {

@@ -63,7 +63,7 @@ LocalStatus StateQuery::submoduleState(git_index_entry const& entry, struct stat
     if (!S_ISDIR(onDisk.st_mode)) {
         return LocalStatus::Renamed;
     }
-    auto const folder = repository_.workTree().onDisk(entry.path);
+    std::string const folder = repository_.workTree().onDisk(entry.path);
     git_repository* opened = nullptr;
     auto const code =
         git_repository_open_ext(&opened, folder.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);

@@ -12,7 +12,7 @@ bool WorkTreeFolders::isFileIgnored(TreePath const& path) {
 /// As in git, the files of a repository decide, not its owner or its format.
 bool WorkTreeFolders::isOtherRepository(TreePath const& folder) const {
     auto const& workTree = repository_.workTree();
-    auto const name = workTree.onDisk(folder);
+    std::string const name = workTree.onDisk(folder);
     return diskEntryAt(name + "/.git") && isRepositoryFound(name, workTree.onDisk(parentOf(folder)));
 }
 
