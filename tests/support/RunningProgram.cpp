@@ -116,6 +116,10 @@ bool dropCapabilities() {
     if (settings.withoutPrivileges && geteuid() == 0) {
         ready = ready && dropCapabilities();
     }
+    for (int const number :
+         {SIGHUP, SIGINT, SIGQUIT, SIGTERM}) { // a shell ignores some of these in the background
+        std::signal(number, SIG_DFL);
+    }
     if (ready) {
         execvpe(arguments[0], arguments, environment);
     }
