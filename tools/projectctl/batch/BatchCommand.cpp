@@ -10,6 +10,7 @@
 
 #include "batch/BatchLines.hpp"
 #include "batch/Commands.hpp"
+#include "changes/DryRun.hpp"
 #include "cli/CodedFailure.hpp"
 #include "cli/CommandText.hpp"
 #include "cli/StandardInput.hpp"
@@ -38,6 +39,7 @@ public:
             "--repair cannot be part of a batch. Exits with 3 if a command has found a fault, which does not "
             "stop the batch");
         takeText(*app, "FILE", file_, "The file with the commands; - or none is standard input");
+        dryRun_.declare(*app);
         return app;
     }
 
@@ -48,8 +50,9 @@ public:
         ProjectTransaction transaction(project);
         auto const result = runAll(lines, project, progress);
         output().flush(); // while a failure can still roll everything back
-        commit(transaction);
-        output().say(std::to_string(lines.size()) + " commands done");
+        if (end(transaction, project)) {
+            output().say(std::to_string(lines.size()) + " commands done");
+        }
         return result;
     }
 
@@ -86,9 +89,9 @@ private:
         return result;
     }
 
-    static void commit(ProjectTransaction& transaction) {
+    bool end(ProjectTransaction& transaction, OpenProject& project) const {
         try {
-            transaction.commit();
+            return dryRun_.end(transaction, project);
         } catch (std::exception const& error) {
             if (exitCodeFor(error) == exit_code::outcomeUnknown) {
                 throw;
@@ -104,6 +107,7 @@ private:
 
     CommandList const& commands_;
     std::optional<std::string> file_;
+    DryRun dryRun_;
 };
 
 } // namespace

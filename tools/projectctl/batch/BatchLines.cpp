@@ -3,6 +3,7 @@
 #include <optional>
 #include <utility>
 
+#include "changes/DryRun.hpp"
 #include "cli/CodedFailure.hpp"
 #include "cli/CommandLine.hpp"
 #include "cli/CommandText.hpp"
@@ -17,7 +18,7 @@ void requireOptionsOfOneCommand(std::vector<std::string> const& words) {
         if (word == "--") {
             return;
         }
-        if (isCommonOption(word)) {
+        if (isCommonOption(word) || word == DryRun::option) {
             throw WrongUse(word + " applies to the whole batch: give it to 'projectctl batch'");
         }
     }

@@ -7,6 +7,7 @@
 #include <utility>
 #include <vector>
 
+#include "changes/DryRun.hpp"
 #include "cli/PathArguments.hpp"
 #include "cli/ShownPaths.hpp"
 #include "files/Commands.hpp"
@@ -18,7 +19,6 @@
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
 #include "project/ProjectCommand.hpp"
-#include "project/ProjectTransaction.hpp"
 #include "project/files/FileMetadataManager.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/metadata/TreeSchema.hpp"
@@ -50,6 +50,7 @@ public:
         app->add_flag("--anew", addsAnew_,
                       "Do not skip the given paths that are already in the project: add them again, without "
                       "their labels. The folders above them keep theirs");
+        dryRun_.declare(*app);
         return app;
     }
 
@@ -57,15 +58,14 @@ public:
         auto const given = given_.read();
         Progress progress("Reading folders");
         auto const contents = isRecursive_ ? contentsOf(given, project, progress) : std::vector<Path>();
-        std::size_t const addedCount = add(project, given, contents, progress);
-        report(project, addedCount);
+        reportUnaddable(project);
+        add(project, given, contents, progress);
         return 0;
     }
 
 private:
-    /// @return the number of paths that were added.
-    std::size_t add(OpenProject& project, std::vector<Path> const& given, std::vector<Path> const& contents,
-                    Progress& progress) {
+    void add(OpenProject& project, std::vector<Path> const& given, std::vector<Path> const& contents,
+             Progress& progress) const {
         ProjectTransaction transaction(project);
         std::vector<Path> added;
         std::vector<Path> skipped;
@@ -81,9 +81,10 @@ private:
         addBelowLabelledFolders(project, added);
         project.stageReturnedLater(added);
         project.stageReturnedLater(skipped);
-        transaction.commit();
-        skippedCount_ = skipped.size();
-        return added.size();
+        if (dryRun_.end(transaction, project)) {
+            output().say(std::to_string(added.size()) + " added to the project" +
+                         (skipped.empty() ? "" : ", " + std::to_string(skipped.size()) + " already in it"));
+        }
     }
 
     /// Adds paths, and keeps the labels of the folders above them.
@@ -157,23 +158,20 @@ private:
         }
     }
 
-    void report(OpenProject& project, std::size_t addedCount) const {
-        ShownPaths shown(project.root());
+    void reportUnaddable(OpenProject& project) const {
         if (!unaddable_.empty()) {
             std::size_t const others = unaddable_.size() - 1;
-            printError("left out " + inQuotes(shown.ofAbsolute(unaddable_.front())) +
+            printError("left out " + inQuotes(ShownPaths(project.root()).ofAbsolute(unaddable_.front())) +
                        (others > 0 ? " and " + std::to_string(others) + " more" : "") +
                        ": a name that begins with two dots cannot be added from the project's root");
         }
-        output().say(std::to_string(addedCount) + " added to the project" +
-                     (skippedCount_ > 0 ? ", " + std::to_string(skippedCount_) + " already in it" : ""));
     }
 
     PathArguments given_;
     bool isRecursive_ = false;
     bool leavesOutIgnored_ = false;
     bool addsAnew_ = false;
-    std::size_t skippedCount_ = 0;
+    DryRun dryRun_;
     std::vector<Path> unaddable_; ///< left out of the contents of the folders
 };
 

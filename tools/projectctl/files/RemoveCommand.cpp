@@ -1,6 +1,7 @@
 #include <string>
 #include <vector>
 
+#include "changes/DryRun.hpp"
 #include "cli/PathArguments.hpp"
 #include "cli/ShownPaths.hpp"
 #include "files/Commands.hpp"
@@ -23,6 +24,7 @@ public:
             "remove", "Remove files, and folders with everything below them, from the project, together with "
                       "their labels, data and entry points. The files stay on disk");
         paths_.declare(*app, "The files and folders");
+        dryRun_.declare(*app);
         return app;
     }
 
@@ -31,8 +33,11 @@ public:
         requireWithinRoot(project, paths);
         warnOfTrackedFiles(project, paths);
         Progress const progress("Removing " + std::to_string(paths.size()) + " files and folders");
+        ProjectTransaction transaction(project);
         auto const removed = project.files().remove(paths);
-        output().say(std::to_string(removed.size()) + " removed from the project");
+        if (dryRun_.end(transaction, project)) {
+            output().say(std::to_string(removed.size()) + " removed from the project");
+        }
         return 0;
     }
 
@@ -62,6 +67,7 @@ private:
     }
 
     PathArguments paths_;
+    DryRun dryRun_;
 };
 
 } // namespace

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "cli/TextArguments.hpp"
+#include "output/Output.hpp"
 #include "output/Progress.hpp"
 #include "project/files/LabelIDSet.hpp"
 
@@ -11,11 +12,14 @@ namespace projectctl {
 int FileLabelCommand::run(OpenProject& project) {
     auto const paths = paths_.read();
     Progress const progress("Labelling " + std::to_string(paths.size()) + " files and folders");
-    auto const guard = project.store().acquireWriteLock();
+    ProjectTransaction transaction(project);
     for (auto const& path : paths) {
         project.requireInProject(path);
     }
-    change(project, paths);
+    auto const confirmation = change(project, paths);
+    if (dryRun_.end(transaction, project)) {
+        output().say(confirmation);
+    }
     return 0;
 }
 
@@ -23,6 +27,7 @@ void FileLabelCommand::declareArguments(CLI::App& app, std::string const& use) {
     takeText(app, "CATEGORY", category_, "The category's name or UUID")->required();
     takeText(app, "LABEL", label_, "The label's name or UUID")->required();
     paths_.declare(app, use);
+    dryRun_.declare(app);
 }
 
 std::size_t FileLabelCommand::countOn(OpenProject& project, Path const& path,

@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "changes/DryRun.hpp"
 #include "cli/PathArguments.hpp"
 #include "project/ProjectCommand.hpp"
 #include "project/labels/Label.hpp"
@@ -17,8 +18,8 @@ public:
     int run(OpenProject& project) override;
 
 protected:
-    /// @param paths all of them in the project.
-    virtual void change(OpenProject& project, std::vector<Path> const& paths) const = 0;
+    /// @param paths all of them in the project. @return the confirmation of the change.
+    virtual std::string change(OpenProject& project, std::vector<Path> const& paths) const = 0;
 
     /// @param use the description of the paths for the help text.
     void declareArguments(CLI::App& app, std::string const& use);
@@ -35,6 +36,7 @@ private:
     std::optional<std::string> category_;
     std::optional<std::string> label_;
     PathArguments paths_;
+    DryRun dryRun_;
 };
 
 } // namespace projectctl

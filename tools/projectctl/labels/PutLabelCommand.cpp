@@ -4,7 +4,6 @@
 #include "labels/FileLabelCommand.hpp"
 #include "labels/LabelCommands.hpp"
 #include "labels/LabelNames.hpp"
-#include "output/Output.hpp"
 #include "project/files/FileLabel.hpp"
 
 namespace projectctl {
@@ -24,13 +23,13 @@ public:
     }
 
 private:
-    void change(OpenProject& project, std::vector<Path> const& paths) const override {
+    std::string change(OpenProject& project, std::vector<Path> const& paths) const override {
         auto const label = LabelNames(project.manager().getLabelManager()).label(category(), this->label());
         auto lacking = paths;
         std::erase_if(lacking, [&](Path const& path) { return countOn(project, path, label) > 0; });
         auto const replaced = project.files().addLabels(lacking, {label});
-        output().say("put on " + std::to_string(lacking.size()) +
-                     (replaced.empty() ? "" : ", replacing " + std::to_string(replaced.size()) + " others"));
+        return "put on " + std::to_string(lacking.size()) +
+               (replaced.empty() ? "" : ", replacing " + std::to_string(replaced.size()) + " others");
     }
 };
 

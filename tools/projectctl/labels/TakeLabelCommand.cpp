@@ -5,7 +5,6 @@
 #include "labels/FileLabelCommand.hpp"
 #include "labels/LabelCommands.hpp"
 #include "labels/LabelNames.hpp"
-#include "output/Output.hpp"
 #include "project/files/FileLabel.hpp"
 
 namespace projectctl {
@@ -24,7 +23,7 @@ public:
     }
 
 private:
-    void change(OpenProject& project, std::vector<Path> const& paths) const override {
+    std::string change(OpenProject& project, std::vector<Path> const& paths) const override {
         auto const label =
             LabelNames(project.manager().getLabelManager()).labelEvenIfDeleted(category(), this->label());
         std::vector<Path> labelled;
@@ -38,7 +37,7 @@ private:
         if (!labelled.empty()) {
             project.files().removeLabels(labelled, std::vector(most, label)); // each element removes one
         }
-        output().say("removed from " + std::to_string(labelled.size()));
+        return "removed from " + std::to_string(labelled.size());
     }
 };
 

@@ -1,0 +1,22 @@
+#include "changes/DryRun.hpp"
+
+#include "changes/ChangeLines.hpp"
+#include "changes/TransactionChanges.hpp"
+
+namespace projectctl {
+
+void DryRun::declare(CLI::App& app) {
+    app.add_flag(option, isOn_, "Show what would change, one line per change, and change nothing");
+}
+
+bool DryRun::end(ProjectTransaction& transaction, OpenProject& project) const {
+    if (isOn_) {
+        auto const changes = changesOfTransaction(project);
+        ChangeLines(project, changes).write();
+    } else {
+        transaction.commit();
+    }
+    return !isOn_;
+}
+
+} // namespace projectctl

@@ -1,0 +1,14 @@
+#pragma once
+
+#include <vector>
+
+#include "project/OpenProject.hpp"
+#include "project/stores/Change.hpp"
+
+namespace projectctl {
+
+/// The nodes that the open transaction of a project has changed, by address: the differences between the
+/// text, which does not contain the transaction, and the store. Visits the whole definition.
+std::vector<project::stores::Difference> changesOfTransaction(OpenProject& project);
+
+} // namespace projectctl
