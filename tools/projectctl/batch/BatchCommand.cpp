@@ -48,7 +48,7 @@ public:
         project.warnOfDamage();
         Progress progress("Running the commands");
         ProjectTransaction transaction(project);
-        auto const result = runAll(lines, project, progress);
+        int const result = runAll(lines, project, progress);
         output().flush(); // while a failure can still roll everything back
         if (end(transaction, project)) {
             output().say(std::to_string(lines.size()) + " commands done");

@@ -72,7 +72,7 @@ void CommandText::skipComment() {
 std::string CommandText::takeWord() {
     std::string result;
     while (isAtWord()) {
-        auto const byte = take();
+        char const byte = take();
         if (byte == '\'') {
             takeSingleQuoted(result);
         } else if (byte == '"') {
@@ -90,16 +90,16 @@ void CommandText::takeEscaped(std::string& word) {
     if (isAtEnd()) {
         fail(line_, "nothing follows the backslash");
     }
-    auto const byte = take();
+    char const byte = take();
     if (byte != '\n') {
         word += byte;
     }
 }
 
 void CommandText::takeSingleQuoted(std::string& word) {
-    auto const begin = line_;
+    std::size_t const begin = line_;
     while (!isAtEnd()) {
-        auto const byte = take();
+        char const byte = take();
         if (byte == '\'') {
             return;
         }
@@ -109,9 +109,9 @@ void CommandText::takeSingleQuoted(std::string& word) {
 }
 
 void CommandText::takeDoubleQuoted(std::string& word) {
-    auto const begin = line_;
+    std::size_t const begin = line_;
     while (!isAtEnd()) {
-        auto const byte = take();
+        char const byte = take();
         if (byte == '"') {
             return;
         }
