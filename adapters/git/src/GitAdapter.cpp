@@ -1,5 +1,8 @@
 #include "project/git/GitAdapter.hpp"
 
+#include <utility>
+
+#include "index/IndexUpdate.hpp"
 #include "index/Staging.hpp"
 #include "repository/RepositoryFinder.hpp"
 #include "repository/TrackedFiles.hpp"
@@ -13,17 +16,42 @@ GitAdapter::GitAdapter(Path const& root, GitEnvironment environment)
 
 GitAdapter::~GitAdapter() = default;
 
+/// Runs a change on the staging area of the repository, if there is one. Outside a batch, it is a batch of its
+/// own.
+template <typename Change>
+void GitAdapter::stage(Change const& change) {
+    auto* const found = repository();
+    if (found == nullptr) {
+        return;
+    }
+    std::unique_ptr<IndexUpdate> own;
+    auto& update = isBatchOpen_ ? update_ : own;
+    Staging staging(*found, [&]() -> IndexUpdate& {
+        if (update == nullptr) {
+            update = std::make_unique<IndexUpdate>(*found);
+        }
+        return *update;
+    });
+    change(staging);
+    if (own != nullptr) {
+        own->publish();
+    }
+}
+
+/// While an update is open, the repository shows its changes.
+Repository* GitAdapter::repository() {
+    return update_ == nullptr ? finder_->find() : finder_->found();
+}
+
 void GitAdapter::addToSourceControl(std::vector<Path> const& files) {
-    auto* const repository = files.empty() ? nullptr : finder_->find();
-    if (repository != nullptr) {
-        Staging(*repository).add(files);
+    if (!files.empty()) {
+        stage([&files](Staging& staging) { staging.add(files); });
     }
 }
 
 void GitAdapter::removeFromSourceControl(std::vector<Path> const& files) {
-    auto* const repository = files.empty() ? nullptr : finder_->find();
-    if (repository != nullptr) {
-        Staging(*repository).remove(files);
+    if (!files.empty()) {
+        stage([&files](Staging& staging) { staging.remove(files); });
     }
 }
 
@@ -32,14 +60,14 @@ std::map<fl::filesystem::Path, cmlink::FileState> GitAdapter::getFileStates(std:
     if (files.empty()) {
         return result;
     }
-    auto* const repository = finder_->find();
-    if (repository == nullptr) {
+    auto* const found = repository();
+    if (found == nullptr) {
         for (auto const& file : files) {
             result.try_emplace(file, cmlink::LocalStatus::NotInRepository);
         }
         return result;
     }
-    StateQuery query(*repository);
+    StateQuery query(*found);
     for (auto const& file : files) {
         result.try_emplace(file, query.stateOf(file));
     }
@@ -48,24 +76,37 @@ std::map<fl::filesystem::Path, cmlink::FileState> GitAdapter::getFileStates(std:
 
 std::set<fl::filesystem::Path> GitAdapter::trackedBelow(std::vector<Path> const& folders) {
     std::set<Path> result;
-    auto* const repository = folders.empty() ? nullptr : finder_->find();
-    if (repository == nullptr) {
+    auto* const found = folders.empty() ? nullptr : repository();
+    if (found == nullptr) {
         return result;
     }
-    auto* const index = repository->index();
+    auto const& index = found->index();
     for (auto const& folder : folders) {
-        auto const path = repository->workTree().relativeInProject(folder);
-        std::size_t position = path ? firstBelow(index, *path) : git_index_entrycount(index);
-        for (; position < git_index_entrycount(index); ++position) {
-            std::string const entry = git_index_get_byindex(index, position)->path;
-            if (!isBelow(entry.c_str(), *path)) {
-                break;
-            }
+        auto const path = found->workTree().relativeInProject(folder);
+        std::size_t position = path ? firstBelow(index, *path) : index.size();
+        for (; position < index.size() && isBelow(index.pathAt(position), *path); ++position) {
+            std::string const entry = index.pathAt(position);
             result.insert(folder /
                           fl::filesystem::fromSystem(entry.substr(path->empty() ? 0 : path->size() + 1)));
         }
     }
     return result;
+}
+
+GitAdapter::Batch::Batch(GitAdapter& adapter) : adapter_(adapter) {
+    adapter_.isBatchOpen_ = true;
+}
+
+GitAdapter::Batch::~Batch() {
+    adapter_.update_.reset();
+    adapter_.isBatchOpen_ = false;
+}
+
+void GitAdapter::Batch::publish() {
+    auto const update = std::exchange(adapter_.update_, nullptr);
+    if (update != nullptr) {
+        update->publish();
+    }
 }
 
 } // namespace project::git

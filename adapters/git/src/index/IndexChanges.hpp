@@ -15,9 +15,6 @@ struct IndexChanges {
     std::set<TreePath, std::less<>> removed;
 
     bool empty() const { return staged.empty() && removed.empty(); }
-
-    /// Whether the entries for a path, including those of a conflict, are dropped.
-    bool isDropped(char const* path) const { return removed.contains(path) || staged.contains(path); }
 };
 
 } // namespace project::git

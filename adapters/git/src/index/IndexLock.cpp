@@ -21,6 +21,43 @@ namespace {
                    "Check the permissions of the repository and the free space on its disk, and try again.");
 }
 
+/// A file that is open for writing; created if it does not exist.
+class Descriptor {
+public:
+    explicit Descriptor(std::string const& file)
+        : file_(file), descriptor_(::open(file.c_str(), O_CREAT | O_WRONLY | O_CLOEXEC | O_NOFOLLOW, 0666)) {
+        if (descriptor_ < 0) {
+            throwUnwritable(file, errno);
+        }
+    }
+
+    ~Descriptor() { ::close(descriptor_); }
+
+    Descriptor(Descriptor const&) = delete;
+    Descriptor& operator=(Descriptor const&) = delete;
+
+    int get() const { return descriptor_; }
+
+    /// Replaces the content.
+    void write(std::string_view content) const {
+        auto const size = static_cast<off_t>(content.size());
+        while (!content.empty()) {
+            auto const written = ::write(descriptor_, content.data(), content.size());
+            if (written < 0 && errno != EINTR) {
+                throwUnwritable(file_, errno);
+            }
+            content.remove_prefix(written > 0 ? static_cast<std::size_t>(written) : 0);
+        }
+        if (::ftruncate(descriptor_, size) != 0) { // more may have been reserved
+            throwUnwritable(file_, errno);
+        }
+    }
+
+private:
+    std::string const& file_;
+    int descriptor_;
+};
+
 } // namespace
 
 IndexLock::IndexLock(std::string index)
@@ -43,15 +80,29 @@ IndexLock::~IndexLock() {
     ::unlink(lock_.c_str());
 }
 
-void IndexLock::replaceIndex() const {
+void IndexLock::reserve(std::size_t size) const {
+    Descriptor const file(newIndex_);
+    if (::fallocate(file.get(), 0, 0, static_cast<off_t>(size)) != 0 && errno != EOPNOTSUPP &&
+        errno != ENOSYS) {
+        throwUnwritable(newIndex_, errno);
+    }
+}
+
+FileStamp IndexLock::replaceIndex(std::string_view content) const {
     struct stat old {};
 
-    if (::stat(index_.c_str(), &old) == 0) {
-        ::chmod(newIndex_.c_str(), old.st_mode & 07777); // a repository may be shared with a group
+    {
+        Descriptor const file(newIndex_);
+        file.write(content);
+        if (::stat(index_.c_str(), &old) == 0) {
+            ::fchmod(file.get(), old.st_mode & 07777); // a repository may be shared with a group
+        }
     }
+    auto const result = FileStamp::of(newIndex_);
     if (::rename(newIndex_.c_str(), index_.c_str()) != 0) {
         throwUnwritable(index_, errno);
     }
+    return result;
 }
 
 } // namespace project::git

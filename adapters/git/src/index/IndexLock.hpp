@@ -1,6 +1,10 @@
 #pragma once
 
+#include <cstddef>
 #include <string>
+#include <string_view>
+
+#include "repository/FileStamp.hpp"
 
 namespace project::git {
 
@@ -18,12 +22,14 @@ public:
     IndexLock(IndexLock const&) = delete;
     IndexLock& operator=(IndexLock const&) = delete;
 
-    /// The file for the new index.
-    std::string const& newIndex() const { return newIndex_; }
+    /// Reserves space on the disk for a new index, if the disk can do that.
+    /// @throws GitError if there is no space.
+    void reserve(std::size_t size) const;
 
-    /// Replaces the old index by the new one, with the permissions of the old one.
+    /// Replaces the old index by a new one, with the permissions of the old one.
+    /// @return the stamp of the new one.
     /// @throws GitError if that fails; the old index stays.
-    void replaceIndex() const;
+    FileStamp replaceIndex(std::string_view content) const;
 
 private:
     std::string index_;

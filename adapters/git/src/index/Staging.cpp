@@ -1,7 +1,5 @@
 #include "index/Staging.hpp"
 
-#include "index/IndexLock.hpp"
-#include "index/IndexWriter.hpp"
 #include "project/git/GitError.hpp"
 #include "repository/DiskEntry.hpp"
 #include "repository/TrackedFiles.hpp"
@@ -28,34 +26,28 @@ void Staging::add(std::vector<fl::filesystem::Path> const& files) {
     if (names.empty()) {
         return;
     }
-    IndexLock const lock(repository_.indexFile());
-    repository_.refresh();
+    auto& update = openUpdate_();
     IndexChanges changes;
     BlobWriter blobs(repository_);
     for (auto const& [name, isConverted] : names) {
         stage(name, isConverted, blobs, changes);
     }
-    if (!changes.empty()) {
-        IndexWriter(repository_, lock).write(changes);
-    }
+    update.apply(changes);
 }
 
 void Staging::remove(std::vector<fl::filesystem::Path> const& files) {
-    IndexLock const lock(repository_.indexFile());
-    repository_.refresh();
+    auto& update = openUpdate_();
     IndexChanges changes;
     for (auto const& file : files) {
         auto const path = repository_.workTree().relativeInProject(file);
-        if (path && trackedAt(repository_.index(), *path) != nullptr) {
+        if (path && trackedAt(repository_.index(), *path)) {
             changes.removed.insert(*path);
         }
         if (path) {
             removeBelow(*path, changes);
         }
     }
-    if (!changes.empty()) {
-        IndexWriter(repository_, lock).write(changes);
-    }
+    update.apply(changes);
 }
 
 /// The files of the list that can be staged. Throws if there is one that only git can stage.
@@ -87,7 +79,8 @@ void Staging::stage(TreePath const& path, bool isConverted, BlobWriter& blobs, I
         return; // deleted in the meantime
     }
     record(*onDisk, entry);
-    entry.mode = modeOf(*onDisk, trackedAt(repository_.index(), path), repository_.settings());
+    auto const tracked = trackedAt(repository_.index(), path);
+    entry.mode = modeOf(*onDisk, tracked ? &*tracked : nullptr, repository_.settings());
     removeReplaced(path, changes);
     changes.staged.insert_or_assign(path, entry);
 }
@@ -95,7 +88,7 @@ void Staging::stage(TreePath const& path, bool isConverted, BlobWriter& blobs, I
 /// Removes entries for a folder in whose place there is a file on disk, or the reverse.
 void Staging::removeReplaced(TreePath const& path, IndexChanges& changes) const {
     for (std::string folder = parentOf(path); !folder.empty(); folder = parentOf(folder)) {
-        if (trackedAt(repository_.index(), folder) != nullptr) {
+        if (trackedAt(repository_.index(), folder)) {
             changes.removed.insert(folder);
         }
     }
@@ -103,14 +96,10 @@ void Staging::removeReplaced(TreePath const& path, IndexChanges& changes) const 
 }
 
 void Staging::removeBelow(TreePath const& folder, IndexChanges& changes) const {
-    auto* const index = repository_.index();
-    for (std::size_t position = firstBelow(index, folder); position < git_index_entrycount(index);
-         ++position) {
-        auto const* const entry = git_index_get_byindex(index, position);
-        if (!isBelow(entry->path, folder)) {
-            return;
-        }
-        changes.removed.insert(entry->path);
+    auto const& index = repository_.index();
+    for (std::size_t position = firstBelow(index, folder);
+         position < index.size() && isBelow(index.pathAt(position), folder); ++position) {
+        changes.removed.insert(index.pathAt(position));
     }
 }
 

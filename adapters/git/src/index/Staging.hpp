@@ -1,19 +1,26 @@
 #pragma once
 
+#include <functional>
 #include <map>
+#include <utility>
 #include <vector>
 
 #include "fl/filesystem/Path.hpp"
 #include "index/BlobWriter.hpp"
 #include "index/IndexChanges.hpp"
+#include "index/IndexUpdate.hpp"
 #include "repository/Repository.hpp"
 
 namespace project::git {
 
-/// Applies the changes of one call to the index: all of them, or none.
+/// Prepares the changes of one call to the index: all of them, or none.
 class Staging {
 public:
-    explicit Staging(Repository& repository) : repository_(repository) {}
+    /// Returns the open update of the index. It is called only if there is something to change.
+    using OpenUpdate = std::function<IndexUpdate&()>;
+
+    Staging(Repository& repository, OpenUpdate openUpdate)
+        : repository_(repository), openUpdate_(std::move(openUpdate)) {}
 
     void add(std::vector<fl::filesystem::Path> const& files);
     void remove(std::vector<fl::filesystem::Path> const& files);
@@ -27,6 +34,7 @@ private:
     void removeBelow(TreePath const& folder, IndexChanges& changes) const;
 
     Repository& repository_;
+    OpenUpdate openUpdate_;
 };
 
 } // namespace project::git

@@ -1,8 +1,12 @@
 #include "repository/Repository.hpp"
 
+#include <cerrno>
+#include <system_error>
 #include <utility>
 
+#include "project/git/GitError.hpp"
 #include "repository/FileContent.hpp"
+#include "repository/TrackedFiles.hpp"
 
 namespace project::git {
 
@@ -17,9 +21,12 @@ ConfigHandle configOf(git_repository* repository) {
 
 } // namespace
 
-Repository::Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot)
+Repository::Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot,
+                       std::string indexFile)
     : handle_(std::move(handle)),
       config_(configOf(handle_.get())),
+      indexFile_(indexFile.empty() ? git_repository_path(handle_.get()) + std::string("index")
+                                   : std::move(indexFile)),
       head_(handle_.get()),
       workTree_(git_repository_workdir(handle_.get()), projectRoot),
       configuration_(stampConfiguration()) {
@@ -42,50 +49,36 @@ void Repository::addWorkTreeConfiguration() {
     }
 }
 
-/// libgit2 1.5.1 determines the size of the index before it opens the file. If git replaces the index in
-/// between, libgit2 reports it as truncated. An error is therefore final only if the file has not changed.
-template <typename Read>
-FileStamp Repository::readIndex(std::string const& file, Read const& read) const {
-    constexpr int tries = 100;
-    for (int count = 1;; ++count) {
-        auto const stamp = FileStamp::of(file);
-        auto const code = read();
-        if (code >= 0 || count == tries || stamp == FileStamp::of(file)) {
-            requireReadable(code);
-            return stamp;
-        }
-    }
-}
-
 void Repository::refresh() {
-    if (index_ == nullptr) {
-        openIndex();
-    }
     // After a failure, the next call tries again.
-    if (!isIndexRead_ || FileStamp::of(indexFile()) != indexStamp_) {
+    if (!isIndexRead_ || FileStamp::of(indexFile_) != indexStamp_) {
         isIndexRead_ = false;
-        indexStamp_ = readIndex(indexFile(), [this] { return git_index_read(index_.get(), 1); });
+        readIndex();
         isIndexRead_ = true;
     }
     head_.refresh();
 }
 
-void Repository::openIndex() {
-    git_index* index = nullptr;
-    readIndex(git_repository_path(get()) + std::string("index"),
-              [&] { return git_repository_index(&index, get()); });
-    index_.reset(index);
-    // By default, libgit2 sorts and searches the index according to core.ignoreCase.
-    require(git_index_set_caps(index, 0), indexFile(), "the index cannot be used");
+/// The stamp is taken first: if the index is replaced in between, the next call reads it again.
+void Repository::readIndex() {
+    indexStamp_ = FileStamp::of(indexFile_);
+    auto bytes = readFile(indexFile_, Links::Followed, static_cast<std::size_t>(indexStamp_.size));
+    if (!bytes && errno == ENOENT) {
+        index_ = std::make_shared<IndexContent>();
+        return;
+    }
+    if (!bytes) {
+        throw GitError(GitError::Kind::Failed, indexFile_,
+                       "the index cannot be read: " + std::generic_category().message(errno),
+                       "Check the permissions of the repository, and try again.");
+    }
+    index_ = std::make_shared<IndexContent>(*std::move(bytes), indexFile_);
 }
 
-void Repository::requireReadable(int code) const {
-    if (code < 0) {
-        throwLibGitError(git_repository_path(get()) + std::string("index"), "the index cannot be read",
-                         "If `git status` reads it, it has a format that this library does not know. "
-                         "`git update-index --no-split-index --index-version 2` and "
-                         "`git sparse-checkout reapply --no-sparse-index` write it in a known format.");
-    }
+void Repository::showIndex(std::shared_ptr<IndexContent const> content, FileStamp const& stamp) {
+    index_ = std::move(content);
+    indexStamp_ = stamp;
+    isIndexRead_ = true;
 }
 
 bool Repository::isSet(std::string const& name, bool isSetByDefault) const {
@@ -115,9 +108,10 @@ std::string Repository::contentOf(TreePath const& path) const {
     if (auto content = readFile(workTree_.onDisk(path), Links::NotFollowed)) {
         return *std::move(content);
     }
-    auto const* const entry = git_index_get_bypath(index(), path.c_str(), 0);
+    auto const entry = trackedAt(index(), path);
     git_blob* blob = nullptr;
-    if (entry == nullptr || git_blob_lookup(&blob, get(), &entry->id) != 0) {
+    if (!entry || git_index_entry_is_conflict(&*entry) != 0 ||
+        git_blob_lookup(&blob, get(), &entry->id) != 0) {
         return {};
     }
     BlobHandle const owned(blob);

@@ -1,10 +1,12 @@
 #pragma once
 
 #include <array>
+#include <memory>
 #include <string>
 
 #include "repository/FileStamp.hpp"
 #include "repository/HeadTree.hpp"
+#include "repository/IndexContent.hpp"
 #include "repository/LibGit.hpp"
 #include "repository/WorkTreeRoot.hpp"
 
@@ -22,7 +24,9 @@ struct DiskSettings {
 class Repository {
 public:
     /// @param handle a repository that is not bare.
-    Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot);
+    /// @param indexFile empty for the repository's own.
+    Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot,
+               std::string indexFile = {});
 
     /// False if the repository was deleted or its configuration has changed: libgit2 reads the configuration
     /// once.
@@ -34,10 +38,17 @@ public:
 
     git_repository* get() const { return handle_.get(); }
 
-    /// Sorted by the bytes of the names. Never changed in memory.
-    git_index* index() const { return index_.get(); }
+    IndexContent const& index() const { return *index_; }
 
-    std::string indexFile() const { return git_index_path(index_.get()); }
+    std::shared_ptr<IndexContent const> sharedIndex() const { return index_; }
+
+    /// Lets index() show another content until the index is read again.
+    void showIndex(std::shared_ptr<IndexContent const> content) { index_ = std::move(content); }
+
+    /// The same for the content of an index file that was just written.
+    void showIndex(std::shared_ptr<IndexContent const> content, FileStamp const& stamp);
+
+    std::string const& indexFile() const { return indexFile_; }
 
     /// The stamp of the index file when it was last read.
     FileStamp const& indexStamp() const { return indexStamp_; }
@@ -69,16 +80,12 @@ private:
     std::string textOf(std::string const& name, TextGetter read) const;
     std::array<FileStamp, 2> stampConfiguration() const;
     void addWorkTreeConfiguration();
-    void openIndex();
-    void requireReadable(int code) const;
-
-    /// @return the stamp of the index file before it was read.
-    template <typename Read>
-    FileStamp readIndex(std::string const& file, Read const& read) const;
+    void readIndex();
 
     RepositoryHandle handle_;
     ConfigHandle config_;
-    IndexHandle index_;
+    std::string indexFile_;
+    std::shared_ptr<IndexContent const> index_;
     FileStamp indexStamp_;
     bool isIndexRead_ = false;
     HeadTree head_;

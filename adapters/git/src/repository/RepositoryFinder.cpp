@@ -73,6 +73,7 @@ void setWorkTree(git_repository* repository) {
     }
 }
 
+/// For libgit2, which reads attributes from the index.
 void setIndex(git_repository* repository, char const* file) {
     git_index* index = nullptr;
     require(git_index_open(&index, file), file, "the index cannot be read");
@@ -107,10 +108,17 @@ Repository* RepositoryFinder::find() {
         if (handle == nullptr || git_repository_workdir(handle.get()) == nullptr) {
             return nullptr;
         }
-        repository_ = std::make_unique<Repository>(std::move(handle), root_);
+        repository_ = std::make_unique<Repository>(std::move(handle), root_, indexOfEnvironment());
     }
     repository_->refresh();
     return repository_.get();
+}
+
+/// Empty if none is set.
+std::string RepositoryFinder::indexOfEnvironment() const {
+    auto const* const file =
+        environment_ == GitEnvironment::Honoured ? std::getenv("GIT_INDEX_FILE") : nullptr;
+    return file == nullptr ? std::string() : file;
 }
 
 RepositoryHandle RepositoryFinder::open() const {

@@ -17,8 +17,12 @@ public:
     /// @throws GitError if there is one that cannot be read.
     Repository* find();
 
+    /// The repository that find returned, in the state of that time.
+    Repository* found() const noexcept { return repository_.get(); }
+
 private:
     RepositoryHandle open() const;
+    std::string indexOfEnvironment() const;
 
     LibGit library_; // outlives the repository
     fl::filesystem::Path root_;

@@ -2,19 +2,18 @@
 
 namespace project::git {
 
-git_index_entry const* trackedAt(git_index* index, TreePath const& path) {
-    std::size_t position = 0;
-    return git_index_find(&position, index, path.c_str()) == 0 ? git_index_get_byindex(index, position)
-                                                               : nullptr;
+std::optional<git_index_entry> trackedAt(IndexContent const& index, TreePath const& path) {
+    std::size_t const position = index.firstFrom(path);
+    bool const isTracked = position < index.size() && index.pathAt(position) == path;
+    return isTracked ? std::optional(index.at(position)) : std::nullopt;
 }
 
-std::size_t firstBelow(git_index* index, TreePath const& folder) {
+std::size_t firstBelow(IndexContent const& index, TreePath const& folder) {
     if (folder.empty()) {
         return 0;
     }
-    std::size_t position = 0;
-    bool const isFound = git_index_find_prefix(&position, index, (folder + '/').c_str()) == 0;
-    return isFound ? position : git_index_entrycount(index);
+    std::size_t const position = index.firstFrom(folder + '/');
+    return position < index.size() && isBelow(index.pathAt(position), folder) ? position : index.size();
 }
 
 } // namespace project::git

@@ -1,17 +1,20 @@
 #pragma once
 
 #include <cstddef>
+#include <optional>
 
+#include "repository/IndexContent.hpp"
 #include "repository/LibGit.hpp"
 #include "repository/WorkTreeRoot.hpp"
 
 namespace project::git {
 
-/// The entry of the index for a path, or the first one of a conflict; null if there is none.
-git_index_entry const* trackedAt(git_index* index, TreePath const& path);
+/// The entry of the index for a path, or the first one of a conflict; nothing if there is none. Its path is
+/// valid as long as the index.
+std::optional<git_index_entry> trackedAt(IndexContent const& index, TreePath const& path);
 
 /// The position of the first entry below a folder; the number of entries if there is none.
-std::size_t firstBelow(git_index* index, TreePath const& folder);
+std::size_t firstBelow(IndexContent const& index, TreePath const& folder);
 
 inline bool isBelow(char const* entry, TreePath const& folder) {
     return folder.empty() ||
@@ -19,8 +22,8 @@ inline bool isBelow(char const* entry, TreePath const& folder) {
             folder.compare(0, folder.size(), entry, folder.size()) == 0 && entry[folder.size()] == '/');
 }
 
-inline bool isAnythingTrackedBelow(git_index* index, TreePath const& folder) {
-    return firstBelow(index, folder) < git_index_entrycount(index);
+inline bool isAnythingTrackedBelow(IndexContent const& index, TreePath const& folder) {
+    return firstBelow(index, folder) < index.size();
 }
 
 inline bool isSubmodule(git_index_entry const& entry) {

@@ -49,10 +49,6 @@ bool EntryComparison::isModified(git_index_entry const& entry, struct stat const
     return isContentModified(entry, onDisk);
 }
 
-bool EntryComparison::canHideChanges(git_index_entry const& entry) const {
-    return !isSubmodule(entry) && entry.mtime.seconds >= repository_.indexStamp().seconds;
-}
-
 /// A size of 0 also marks an entry that has to be compared by content.
 bool EntryComparison::isTouched(git_index_entry const& entry, struct stat const& onDisk) const {
     git_index_entry found{};

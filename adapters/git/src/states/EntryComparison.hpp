@@ -21,9 +21,11 @@ public:
     /// Whether a file or link differs from its entry, which has the same type.
     bool isModified(git_index_entry const& entry, struct stat const& onDisk);
 
-    /// Whether a new index with this entry would hide a change of its file from git, which compares whole
-    /// seconds.
-    bool canHideChanges(git_index_entry const& entry) const;
+    /// Whether a new index with an entry of this second would hide a change of its file from git, which
+    /// compares whole seconds.
+    bool canHideChanges(std::int64_t seconds) const {
+        return seconds >= repository_.indexStamp().seconds;
+    }
 
 private:
     bool isTouched(git_index_entry const& entry, struct stat const& onDisk) const;

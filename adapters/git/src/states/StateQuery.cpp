@@ -20,8 +20,8 @@ LocalStatus StateQuery::stateOf(fl::filesystem::Path const& path) {
     if (!place) {
         return LocalStatus::NotInRepository;
     }
-    auto const* const entry = trackedAt(repository_.index(), *place);
-    return entry == nullptr ? untrackedState(*place) : trackedState(*entry);
+    auto const entry = trackedAt(repository_.index(), *place);
+    return entry ? trackedState(*entry) : untrackedState(*place);
 }
 
 LocalStatus StateQuery::trackedState(git_index_entry const& entry) {

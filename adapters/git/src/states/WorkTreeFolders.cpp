@@ -35,8 +35,8 @@ FolderKind WorkTreeFolders::determineKind(TreePath const& folder, FolderKind abo
     if (above != FolderKind::Ours) {
         return above;
     }
-    auto const* const tracked = trackedAt(repository_.index(), folder);
-    if (nameOf(folder) == ".git" || (tracked != nullptr && isSubmodule(*tracked))) {
+    auto const tracked = trackedAt(repository_.index(), folder);
+    if (nameOf(folder) == ".git" || (tracked && isSubmodule(*tracked))) {
         return FolderKind::OtherRepository;
     }
     auto const onDisk = diskEntryAt(repository_.workTree().onDisk(folder));

@@ -11,6 +11,8 @@
 
 namespace project::git {
 
+class IndexUpdate;
+class Repository;
 class RepositoryFinder;
 
 /// Source control by git, for the project in one folder.
@@ -30,6 +32,8 @@ class PROJECT_GIT_EXPORT GitAdapter final : public cmlink::CMAdapter {
 public:
     using Path = fl::filesystem::Path;
 
+    class Batch;
+
     /// Does not access the disk.
     /// @param root the folder of the project.
     explicit GitAdapter(Path const& root, GitEnvironment environment = GitEnvironment::Ignored);
@@ -39,7 +43,7 @@ public:
     ///
     /// Skips folders (git does not track them), files that do not exist, special files, and everything
     /// outside the project's folder, outside the work tree, beyond a symbolic link or in another repository
-    /// inside this one. Writes the index once; does not write it if there is nothing to stage or if
+    /// inside this one. Writes the index once (see Batch); does not write it if there is nothing to stage or if
     /// anything fails.
     /// @throws GitError if the index is locked (the error's file is the lock file) or cannot be written, if a
     ///         file cannot be read, or if a file needs a filter driver or another encoding, which only git
@@ -79,7 +83,35 @@ public:
     std::set<Path> trackedBelow(std::vector<Path> const& folders);
 
 private:
+    template <typename Change>
+    void stage(Change const& change);
+    Repository* repository();
+
     std::unique_ptr<RepositoryFinder> finder_;
+    std::unique_ptr<IndexUpdate> update_; ///< of the batch; null before the first change
+    bool isBatchOpen_ = false;
+};
+
+/// Writes the index once for several calls of an adapter. The calls prepare their changes: they raise all
+/// errors that can be seen before the index is written, and the states include the changes. The first change
+/// takes git's lock of the index, so that no other program can prevent the write.
+///
+/// Without publish, the index stays unchanged. An adapter has one batch at a time, and must outlive it.
+class PROJECT_GIT_EXPORT GitAdapter::Batch {
+public:
+    explicit Batch(GitAdapter& adapter);
+
+    /// Releases the lock.
+    ~Batch();
+    Batch(Batch const&) = delete;
+    Batch& operator=(Batch const&) = delete;
+
+    /// Writes the index if there are changes, and releases the lock. Call it once, at the end.
+    /// @throws GitError if the index cannot be written.
+    void publish();
+
+private:
+    GitAdapter& adapter_;
 };
 
 } // namespace project::git
