@@ -5,10 +5,15 @@
 
 namespace project::session {
 
-ChangeExecutor::ChangeExecutor(stores::TreeMetadataManager& store, DefinitionStager* stager,
-                               TransactionFiles& files, EventQueue& raised,
+ChangeExecutor::ChangeExecutor(stores::TreeMetadataManager& store, git::GitAdapter* adapter,
+                               DefinitionStager* stager, TransactionFiles& files, EventQueue& raised,
                                std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers)
-    : store_(store), stager_(stager), files_(files), raised_(raised), observers_(std::move(observers)) {
+    : store_(store),
+      adapter_(adapter),
+      stager_(stager),
+      files_(files),
+      raised_(raised),
+      observers_(std::move(observers)) {
 }
 
 void ChangeExecutor::run(std::function<void()> const& operation, ChangedFiles const& files) {
@@ -18,13 +23,39 @@ void ChangeExecutor::run(std::function<void()> const& operation, ChangedFiles co
     step.commit();
 }
 
-void ChangeExecutor::stage() {
+/// Stages the files and the text of a step that is committed. If the text cannot be staged, the files are
+/// staged all the same: they are in the project.
+void ChangeExecutor::stage(git::GitAdapter::Batch* batch) {
     auto const added = files_.takeAdded();
+    if (batch == nullptr) {
+        return;
+    }
+    try {
+        stageText(added);
+    } catch (...) {
+        publish(*batch);
+        throw;
+    }
+    publish(*batch);
+}
+
+void ChangeExecutor::stageText(std::vector<Path> const& added) {
     if (stager_ != nullptr) {
         if (!added.empty()) {
             stager_->stageReturned(added);
         }
         stager_->stageIfWritten();
+    }
+}
+
+void ChangeExecutor::publish(git::GitAdapter::Batch& batch) {
+    try {
+        batch.publish();
+    } catch (...) {
+        if (stager_ != nullptr) {
+            stager_->noteWritten(); // the text is not staged after all
+        }
+        throw;
     }
 }
 

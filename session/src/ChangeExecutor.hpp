@@ -9,6 +9,7 @@
 
 #include "EventQueue.hpp"
 #include "TransactionFiles.hpp"
+#include "project/git/GitAdapter.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 
 namespace project::session {
@@ -19,12 +20,13 @@ class DefinitionStager;
 /// transaction, in which the operations are nested steps. See ChangeStep.
 class ChangeExecutor {
 public:
-    /// @param store borrowed, as are the stager, the files and the queue.
+    /// @param store borrowed, as are the adapter, the stager, the files and the queue.
+    /// @param adapter null if source control is off.
     /// @param stager null if the text is not staged after each change.
     /// @param raised the queue of the events that the managers raise.
     /// @param observers the broadcaster to dispatch these events on.
-    ChangeExecutor(stores::TreeMetadataManager& store, DefinitionStager* stager, TransactionFiles& files,
-                   EventQueue& raised,
+    ChangeExecutor(stores::TreeMetadataManager& store, git::GitAdapter* adapter, DefinitionStager* stager,
+                   TransactionFiles& files, EventQueue& raised,
                    std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers);
 
     /// Runs one operation as a step.
@@ -46,10 +48,13 @@ private:
     friend class ChangeStep;
 
     void run(std::function<void()> const& operation, ChangedFiles const& files);
-    void stage();
+    void stage(git::GitAdapter::Batch* batch);
+    void stageText(std::vector<Path> const& added);
+    void publish(git::GitAdapter::Batch& batch);
     void dispatch(std::vector<Event> const& events);
 
     stores::TreeMetadataManager& store_;
+    git::GitAdapter* adapter_;
     DefinitionStager* stager_;
     TransactionFiles& files_;
     EventQueue& raised_;

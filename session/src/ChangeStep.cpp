@@ -1,6 +1,7 @@
 #include "ChangeStep.hpp"
 
 #include <exception>
+#include <optional>
 #include <vector>
 
 namespace project::session {
@@ -53,9 +54,13 @@ void ChangeStep::commitOutermost() {
     std::exception_ptr stagingError;
     {
         auto const guard = executor_.store_.acquireWriteLock(); // until the text is staged
+        std::optional<git::GitAdapter::Batch> batch;
+        if (executor_.adapter_ != nullptr) {
+            batch.emplace(*executor_.adapter_);
+        }
         commitWrites();
         events = executor_.raised_.take();
-        stagingError = errorOf([this] { executor_.stage(); });
+        stagingError = errorOf([&] { executor_.stage(batch ? &*batch : nullptr); });
     }
     // The step is committed, so observers are called even if it could not be staged.
     auto const slotError = errorOf([&] { executor_.dispatch(events); });

@@ -11,8 +11,9 @@ namespace project::session {
 /// 1. It takes the store's write guard and begins a transaction of the store.
 /// 2. The managers note paths for source control, write the store and raise events, which the event queue
 ///    collects. A step that ends without a commit is rolled back, and its events are dropped.
-/// 3. The outermost step commits: the store writes one batch and notifies source control.
-/// 4. It stages the text, if the session stages each change.
+/// 3. The outermost step commits: the store writes one batch and notifies source control, which prepares its
+///    change of git's index. A failure rolls the step back, with the prepared change.
+/// 4. It adds the text to the prepared change, if the session stages each change, and writes git's index.
 /// 5. It releases the guard and dispatches the events.
 ///
 /// The guard covers steps 2 to 4 because the store notifies its listeners of every commit: without it, the

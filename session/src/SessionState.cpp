@@ -55,8 +55,9 @@ Session::State::State(Path const& folder, Options options)
       managers(makeManagers()),
       files(managers.sourceControl,
             [this](Path const& file) { return project->getFileManager().isFileInProject(file); }),
-      executor(*store, options.sourceControl == SourceControl::EachChange ? stager.get() : nullptr, files,
-               raised, events),
+      executor(*store, adapter.get(),
+               options.sourceControl == SourceControl::EachChange ? stager.get() : nullptr, files, raised,
+               events),
       project(std::make_unique<SessionProjectManager>(std::move(managers.outermost), executor)) {
 }
 

@@ -33,7 +33,7 @@ protected:
         std::make_shared<management::DispatchableProjectEventBroadcaster>();
     test::EventLog log_{*observers_};
     TransactionFiles files_{nullptr, [](Path const&) { return true; }};
-    ChangeExecutor executor_{store_, nullptr, files_, raised_, observers_};
+    ChangeExecutor executor_{store_, nullptr, nullptr, files_, raised_, observers_};
 };
 
 TEST_F(ChangeExecutors, dropTheEventsOfAnOperationThatThrows) {

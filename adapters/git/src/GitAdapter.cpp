@@ -16,8 +16,8 @@ GitAdapter::GitAdapter(Path const& root, GitEnvironment environment)
 
 GitAdapter::~GitAdapter() = default;
 
-/// Runs a change on the staging area of the repository, if there is one. Outside a batch, it is a batch of its
-/// own.
+/// Runs a change on the staging area of the repository, if there is one. Outside a batch, it is a batch of
+/// its own.
 template <typename Change>
 void GitAdapter::stage(Change const& change) {
     auto* const found = repository();

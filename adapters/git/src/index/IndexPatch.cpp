@@ -90,8 +90,7 @@ void IndexPatch::add(git_index_entry const& entry, TreePath const& path) {
     auto const begin = result_.size();
     append(result_, entry.ctime);
     append(result_, entry.mtime);
-    for (auto const number :
-         {entry.dev, entry.ino, entry.mode, entry.uid, entry.gid, entry.file_size}) {
+    for (auto const number : {entry.dev, entry.ino, entry.mode, entry.uid, entry.gid, entry.file_size}) {
         append(result_, number);
     }
     result_.append(reinterpret_cast<char const*>(entry.id.id), GIT_OID_RAWSZ);

@@ -81,8 +81,7 @@ void IndexUpdate::markHiddenChanges() {
         }
         auto const entry = new_->at(position);
         auto const onDisk = diskEntryAt(repository_.workTree().onDisk(entry.path));
-        if (!isSubmodule(entry) && onDisk && isFileOrLink(*onDisk) &&
-            comparison.isModified(entry, *onDisk)) {
+        if (!isSubmodule(entry) && onDisk && isFileOrLink(*onDisk) && comparison.isModified(entry, *onDisk)) {
             new_->markForReading(position);
         }
     }

@@ -25,8 +25,7 @@ class Repository {
 public:
     /// @param handle a repository that is not bare.
     /// @param indexFile empty for the repository's own.
-    Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot,
-               std::string indexFile = {});
+    Repository(RepositoryHandle handle, fl::filesystem::Path const& projectRoot, std::string indexFile = {});
 
     /// False if the repository was deleted or its configuration has changed: libgit2 reads the configuration
     /// once.

@@ -23,9 +23,7 @@ public:
 
     /// Whether a new index with an entry of this second would hide a change of its file from git, which
     /// compares whole seconds.
-    bool canHideChanges(std::int64_t seconds) const {
-        return seconds >= repository_.indexStamp().seconds;
-    }
+    bool canHideChanges(std::int64_t seconds) const { return seconds >= repository_.indexStamp().seconds; }
 
 private:
     bool isTouched(git_index_entry const& entry, struct stat const& onDisk) const;

@@ -43,8 +43,8 @@ public:
     ///
     /// Skips folders (git does not track them), files that do not exist, special files, and everything
     /// outside the project's folder, outside the work tree, beyond a symbolic link or in another repository
-    /// inside this one. Writes the index once (see Batch); does not write it if there is nothing to stage or if
-    /// anything fails.
+    /// inside this one. Writes the index once (see Batch); does not write it if there is nothing to stage or
+    /// if anything fails.
     /// @throws GitError if the index is locked (the error's file is the lock file) or cannot be written, if a
     ///         file cannot be read, or if a file needs a filter driver or another encoding, which only git
     ///         applies.
