@@ -9,10 +9,12 @@
 #include <gtest/gtest.h>
 
 #include "project/git/GitError.hpp"
+#include "project/metadata/FileChangeRequestListener.hpp"
 #include "project/session.hpp"
 #include "project/session/ToolAccess.hpp"
 #include "support/EventLog.hpp"
 #include "support/GitFolder.hpp"
+#include "support/ReplacementCount.hpp"
 #include "support/TemporaryFolder.hpp"
 
 namespace project::session {
@@ -353,6 +355,68 @@ TEST_F(SessionInRepository, rollsAnAddBackIfTheIndexIsLocked) {
     std::filesystem::remove(folder_.onDisk() / ".git" / "index.lock");
     session.project().getFileManager().add({file});
     EXPECT_EQ(status(), std::string(storeAdded) + "A  a\n");
+}
+
+TEST_F(SessionInRepository, writesGitsIndexOnceForEachChange) {
+    auto session = Session::create(folder_.root(), u"Engine");
+    auto& files = session.project().getFileManager();
+    auto const file = folder_.file(u"a");
+    test::ReplacementCount const replaced(folder_.onDisk() / ".git");
+    files.add({file, folder_.file(u"b")});
+    EXPECT_EQ(replaced.of("index"), 1);
+    files.remove({file});
+    EXPECT_EQ(replaced.of("index"), 1);
+    session.project().setName(u"Pump");
+    EXPECT_EQ(replaced.of("index"), 1);
+}
+
+/// A listener that is notified after the one of source control.
+class LaterListener : public metadata::FileChangeRequestListener {
+public:
+    explicit LaterListener(std::function<void()> action) : action_(std::move(action)) {}
+
+    void fileRemovalRequested(metadata::MetadataManager& /*store*/, Path const& /*metadataRoot*/,
+                              std::vector<Path> const& /*files*/) override {}
+
+    void fileAdditionRequested(metadata::MetadataManager& /*store*/,
+                               std::vector<Path> const& /*files*/) override {
+        std::exchange(action_, [] {})();
+    }
+
+    bool acceptsFileChangeRequests() override { return true; }
+
+private:
+    std::function<void()> action_;
+};
+
+TEST_F(SessionInRepository, leavesGitsIndexUnchangedAndUnlockedIfAnotherListenerRefusesTheChange) {
+    auto session = Session::create(folder_.root(), u"Engine");
+    git_.commitAll();
+    auto const file = folder_.file(u"a");
+    auto const refusal = std::make_shared<LaterListener>([] { throw std::out_of_range("refused"); });
+    session.project().subscribe(refusal);
+
+    EXPECT_THROW(session.project().getFileManager().add({file}), std::out_of_range);
+
+    EXPECT_FALSE(session.project().getFileManager().isFileInProject(file));
+    EXPECT_EQ(status(), "?? a\n");
+    EXPECT_FALSE(std::filesystem::exists(folder_.onDisk() / ".git" / "index.lock"));
+    session.project().getFileManager().add({file});
+    EXPECT_EQ(status(), "M  .projectdata/project.jsonl\nA  a\n");
+}
+
+TEST_F(SessionInRepository, doesNotLetGitTakeTheLockOfTheIndexUntilTheTextIsStaged) {
+    auto session = Session::create(folder_.root(), u"Engine");
+    auto const other = folder_.file(u"other");
+    auto const git = std::make_shared<LaterListener>([this] {
+        EXPECT_THROW(git_.run({"add", "other"}), std::runtime_error);
+    });
+    session.project().subscribe(git);
+
+    session.project().getFileManager().add({folder_.file(u"a")});
+
+    EXPECT_EQ(status(), std::string(storeAdded) + "A  a\n?? other\n");
+    EXPECT_EQ(staged(), onDisk());
 }
 
 TEST_F(SessionInRepository, stagesATextThatCouldNotBeStagedWithTheNextChange) {

@@ -2,55 +2,22 @@
 #include <chrono>
 #include <fstream>
 #include <functional>
+#include <set>
 #include <thread>
 
-#include <sys/inotify.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include "git/GitRepository.hpp"
 #include "project/git/GitError.hpp"
 #include "support/ChildProcess.hpp"
+#include "support/ReplacementCount.hpp"
 #include "support/Waiting.hpp"
 
 namespace project::git {
 namespace {
 
 using std::filesystem::perms;
-
-/// Counts the replacements of files in a folder.
-class ReplacementCount {
-public:
-    explicit ReplacementCount(std::filesystem::path const& folder)
-        : watch_(::inotify_init1(IN_NONBLOCK | IN_CLOEXEC)) {
-        if (::inotify_add_watch(watch_, folder.c_str(), IN_MOVED_TO | IN_CLOSE_WRITE) < 0) {
-            throw std::runtime_error("no watch on " + folder.string());
-        }
-    }
-
-    ~ReplacementCount() { ::close(watch_); }
-
-    ReplacementCount(ReplacementCount const&) = delete;
-    ReplacementCount& operator=(ReplacementCount const&) = delete;
-
-    /// The number of times that a file of that name was moved in or written since the last call.
-    int of(std::string const& name) const {
-        alignas(inotify_event) std::array<char, 65536> buffer{};
-        int result = 0;
-        ssize_t length = 0;
-        while ((length = ::read(watch_, buffer.data(), buffer.size())) > 0) {
-            for (char const* at = buffer.data(); at < buffer.data() + length;) {
-                auto const* const event = reinterpret_cast<inotify_event const*>(at);
-                result += event->len > 0 && name == event->name ? 1 : 0;
-                at += sizeof(inotify_event) + event->len;
-            }
-        }
-        return result;
-    }
-
-private:
-    int watch_;
-};
 
 class IndexWriting : public GitTest {
 protected:
@@ -159,7 +126,7 @@ TEST_F(IndexWriting, oneCallIsOneWrite) {
         repository.write(names.back());
     }
     repository.run({"update-index", "--refresh"});
-    ReplacementCount const replaced(repository.onDisk() / ".git");
+    test::ReplacementCount const replaced(repository.onDisk() / ".git");
     add(names);
     EXPECT_EQ(replaced.of("index"), 1);
     remove(names);
@@ -169,6 +136,151 @@ TEST_F(IndexWriting, oneCallIsOneWrite) {
     add({});
     EXPECT_EQ(replaced.of("index"), 0);
 }
+
+TEST_F(IndexWriting, aBatchIsOneWriteAndItsStatesAreSeenBefore) {
+    repository.write("old");
+    repository.commitAll();
+    repository.write("a");
+    repository.write("b");
+    test::ReplacementCount const replaced(repository.onDisk() / ".git");
+    GitAdapter::Batch batch(adapter);
+    add({"a"});
+    remove({"old"});
+    add({"b"});
+    EXPECT_EQ(stateOf("a"), 5);
+    EXPECT_EQ(stateOf("old"), 6);
+    EXPECT_EQ(replaced.of("index"), 0);
+    batch.publish();
+    EXPECT_EQ(replaced.of("index"), 1);
+    EXPECT_EQ(repository.statusStates(), (States{{"a", 5}, {"b", 5}, {"old", 6}}));
+    expectNothingLeftBehind();
+}
+
+TEST_F(IndexWriting, aFileThatIsStagedTwiceInABatchHasItsLastContent) {
+    repository.write("a", "1\n");
+    GitAdapter::Batch batch(adapter);
+    add({"a"});
+    repository.write("a", "2\n");
+    add({"a"});
+    batch.publish();
+    EXPECT_EQ(repository.run({"show", ":a"}), "2\n");
+}
+
+TEST_F(IndexWriting, aBatchThatIsNotPublishedChangesNothing) {
+    repository.write("old");
+    repository.commitAll();
+    repository.write("a");
+    auto const before = repository.index();
+    {
+        GitAdapter::Batch const batch(adapter);
+        add({"a"});
+        remove({"old"});
+    }
+    EXPECT_EQ(repository.index(), before);
+    EXPECT_EQ(stateOf("a"), 0);
+    EXPECT_EQ(stateOf("old"), 1);
+    expectNothingLeftBehind();
+    add({"a"});
+    EXPECT_EQ(stateOf("a"), 5);
+}
+
+TEST_F(IndexWriting, aBatchHoldsTheLockFromItsFirstChange) {
+    repository.write("a");
+    repository.write("b");
+    GitAdapter::Batch batch(adapter);
+    EXPECT_EQ(stateOf("a"), 0);
+    repository.run({"add", "b"});
+    EXPECT_EQ(stateOf("b"), 5);
+    add({"a"});
+    EXPECT_TRUE(std::filesystem::exists(lockFile()));
+    EXPECT_THROW(repository.run({"add", "b"}), std::runtime_error);
+    batch.publish();
+    EXPECT_EQ(stateOf("b"), 5);
+    expectNothingLeftBehind();
+}
+
+TEST_F(IndexWriting, aCallOfABatchThatFailsLeavesTheOthersPrepared) {
+    repository.write("a");
+    repository.write("b");
+    repository.write(".git./x"); // a name that an index must not contain
+    GitAdapter::Batch batch(adapter);
+    add({"a"});
+    EXPECT_THROW(add({"b", ".git./x"}), GitError);
+    batch.publish();
+    EXPECT_EQ(recordsOf(repository.run({"ls-files", "-z"})), std::vector<std::string>{"a"});
+}
+
+TEST_F(IndexWriting, anIndexWithAWrongChecksumIsReadAndNotWritten) {
+    commitFile("a");
+    repository.write("b");
+    auto const before = repository.index();
+    {
+        std::fstream file(repository.indexFile(), std::ios::binary | std::ios::in | std::ios::out);
+        file.seekp(-1, std::ios::end);
+        auto const last = file.peek();
+        file.seekp(-1, std::ios::end);
+        file.put(static_cast<char>(last ^ 1));
+    }
+    EXPECT_EQ(stateOf("a"), 1);
+    EXPECT_THROW(add({"b"}), GitError);
+    EXPECT_THROW(remove({"a"}), GitError);
+    expectNothingLeftBehind();
+    EXPECT_EQ(stateOf("b"), 0);
+}
+
+TEST_F(IndexWriting, anIndexWithoutAChecksumIsWritten) { // git writes zeros with index.skipHash
+    commitFile("a");
+    repository.write("b");
+    {
+        std::fstream file(repository.indexFile(), std::ios::binary | std::ios::in | std::ios::out);
+        file.seekp(-20, std::ios::end);
+        file.write(std::string(20, '\0').c_str(), 20);
+    }
+    add({"b"});
+    EXPECT_EQ(stateOf("b"), 5);
+}
+
+/// An index of one version, to which names are added and from which they are removed, some of them long and
+/// with a common beginning.
+class IndexVersions : public GitTest, public ::testing::WithParamInterface<char const*> {};
+
+TEST_P(IndexVersions, areWrittenAsGitReadsThem) {
+    std::vector<std::string> names{"a", "a.b", "a/b", "ab", "b/c/d", "b/c/e", "b/cd", "c", "d/f"};
+    names.push_back("long/" + std::string(200, 'n') + '/' + std::string(180, 'm') + "/file");
+    names.push_back("long/" + std::string(200, 'n') + '/' + std::string(180, 'm') + "/fill");
+    for (auto const length : {1U, 2U, 3U, 4U, 5U, 6U, 7U, 8U, 9U}) {
+        names.push_back("pad/" + std::string(length, 'x'));
+    }
+    std::erase(names, "a"); // there is a folder of that name
+    for (auto const& name : names) {
+        repository.write(name);
+    }
+    repository.write("hidden");
+    repository.run({"add", "--intent-to-add", "hidden"}); // has extended flags
+    repository.run({"update-index", "--index-version", GetParam()});
+    for (std::size_t step = 1; step < 8; ++step) {
+        for (std::size_t i = 0; i < names.size(); i += step) {
+            adapter.addToSourceControl({repository.path(names[i])});
+        }
+        for (std::size_t i = 1; i < names.size(); i += step) {
+            adapter.removeFromSourceControl({repository.path(names[i])});
+            repository.run({"fsck", "--strict"});
+        }
+        std::set<std::string> expected{"hidden"};
+        for (std::size_t i = 0; i < names.size(); ++i) {
+            expected.insert(names[i]);
+        }
+        adapter.addToSourceControl(repository.paths(names));
+        auto const tracked = recordsOf(repository.run({"ls-files", "-z"}));
+        EXPECT_EQ(tracked, std::vector<std::string>(expected.begin(), expected.end()));
+    }
+    auto const before = repository.index();
+    repository.run({"update-index", "--index-version", "2"}); // git reads and writes all entries
+    EXPECT_EQ(repository.index(), before);
+}
+
+INSTANTIATE_TEST_SUITE_P(All, IndexVersions, ::testing::Values("2", "3", "4"),
+                         [](auto const& version) { return std::string("v") + version.param; });
 
 TEST_F(IndexWriting, aRepositoryThatCannotBeWrittenIsAClearError) {
     repository.write("a");

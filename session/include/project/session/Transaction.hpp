@@ -38,7 +38,7 @@ public:
     /// Ends the transaction. A nested one leaves the rest to the outer one, which
     /// 1. writes all changes as one batch with one sync, passing all files to git in one call each for those
     ///    that are removed and those that are added,
-    /// 2. stages the project's text, if the session stages each change,
+    /// 2. writes git's index once, with the project's text if the session stages each change,
     /// 3. releases the guard and dispatches the events, in the order of the operations.
     ///
     /// Costs about as much as one of its operations with all files and labels.
