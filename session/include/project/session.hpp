@@ -48,8 +48,8 @@ struct Options {
 /// caller holds a guard of store()).
 ///
 /// A change takes git's lock of the index before it is committed, if it adds or removes files, and keeps it
-/// until git's index is written; a failure up to the commit rolls the change back. If the project's text cannot
-/// be staged after that, the change remains committed: observers are called, and then the error
+/// until git's index is written; a failure up to the commit rolls the change back. If the project's text
+/// cannot be staged after that, the change remains committed: observers are called, and then the error
 /// (git::GitError) is thrown to the caller. The next change stages the text again. If a slot throws
 /// as well, the caller gets the git error: until the text is staged, a commit would contain an old text.
 class PROJECT_SESSION_EXPORT Session {
