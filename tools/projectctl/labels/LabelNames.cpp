@@ -32,7 +32,7 @@ std::vector<Named> namesOf(std::vector<Thing> const& things) {
 } // namespace
 
 CategoryIdentifier LabelNames::category(std::string const& name) {
-    auto const wanted = textOf(name);
+    std::u16string const wanted = textOf(name);
     if (auto const found = find(wanted)) {
         return *found;
     }
@@ -44,7 +44,7 @@ CategoryIdentifier LabelNames::category(std::string const& name) {
 
 Label LabelNames::label(std::string const& category, std::string const& name) {
     auto const found = this->category(category);
-    auto const wanted = textOf(name);
+    std::u16string const wanted = textOf(name);
     if (auto const label = find(found, wanted)) {
         return {found, *label};
     }
@@ -56,8 +56,8 @@ Label LabelNames::label(std::string const& category, std::string const& name) {
 }
 
 Label LabelNames::labelEvenIfDeleted(std::string const& category, std::string const& name) {
-    auto const categoryUUID = textOf(category);
-    auto const labelUUID = textOf(name);
+    std::u16string const categoryUUID = textOf(category);
+    std::u16string const labelUUID = textOf(name);
     auto const known = find(categoryUUID);
     bool const isKnown = known && find(*known, labelUUID);
     if (isKnown || !isUUID(labelUUID) || (!known && !isUUID(categoryUUID))) {

@@ -64,7 +64,8 @@ private:
         if (category.isSingleValued()) {
             append("single-valued");
         }
-        if (auto const type = category.getDataType(); type != CategoryDefinition({}, {}).getDataType()) {
+        if (std::u16string const type = category.getDataType();
+            type != CategoryDefinition({}, {}).getDataType()) {
             std::string bytes;
             appendBytes(bytes, type);
             append("type " + withoutControls(bytes, false));

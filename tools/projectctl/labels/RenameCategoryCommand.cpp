@@ -35,7 +35,7 @@ public:
 private:
     /// Several categories may have the same name, but then the name no longer identifies any of them.
     void warnOfSharedName(std::vector<CategoryIdentifier> const& categories) const {
-        auto const name = textOf(*name_);
+        std::u16string const name = textOf(*name_);
         auto const count = std::ranges::count(categories, name, &CategoryIdentifier::getName);
         if (count > 1) {
             printError("warning: " + std::to_string(count) + " categories now have the name " +

@@ -34,7 +34,7 @@ public:
         ShownPaths shown(project.root());
         JsonRows rows;
         for (auto const& path : paths) {
-            auto const fromRoot = project::metadata::getRelativePath(project.root(), path);
+            std::u16string const fromRoot = project::metadata::getRelativePath(project.root(), path);
             for (auto const& label : labelsOf(project, path)) {
                 if (isJson_) {
                     writeJson(rows, fromRoot, label);

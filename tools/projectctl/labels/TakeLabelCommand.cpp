@@ -29,7 +29,7 @@ private:
         std::vector<Path> labelled;
         std::size_t most = 0;
         for (auto const& path : paths) {
-            if (auto const count = countOn(project, path, label); count > 0) {
+            if (std::size_t const count = countOn(project, path, label); count > 0) {
                 labelled.push_back(path);
                 most = std::max(most, count);
             }

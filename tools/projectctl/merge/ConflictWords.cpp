@@ -61,9 +61,9 @@ std::optional<std::string> nounFor(std::u16string_view head, std::u16string_view
 std::string described(MetadataPath const& address) {
     auto const& elements = address.getPath();
     auto const& leaf = address.leaf();
-    auto const head = elements.front().getType();
+    std::u16string const head = elements.front().getType();
     if (head == treeSchema::files::filesType) {
-        auto const file = "the file " + inQuotes(pathOf(address));
+        std::string const file = "the file " + inQuotes(pathOf(address));
         return leaf.getType() == treeSchema::files::fileType ? file : "the data of " + file;
     }
     if (elements.size() > 1) {
@@ -84,7 +84,7 @@ std::string describedNested(MergeConflict const& conflict) {
     for (auto step = conflict.nested.rbegin(); step != conflict.nested.rend(); ++step) {
         bool const isLabel = step->type == treeSchema::categories::labelType ||
                              step->type == treeSchema::categories::categoryType;
-        auto const noun = nounFor({}, step->type).value_or("the " + inQuotes(step->type));
+        std::string const noun = nounFor({}, step->type).value_or("the " + inQuotes(step->type));
         result += noun + ' ' + inQuotes(step->value) +
                   (isLabel && step + 1 != conflict.nested.rend() ? " of " : " on ");
     }
@@ -105,9 +105,9 @@ std::string removedAndChanged(MergeConflict const& conflict) {
 } // namespace
 
 std::string inWords(MergeConflict const& conflict) {
-    auto const subject = describedNested(conflict) + described(conflict.address);
-    auto const both = changeBy(conflict.values.ours, MergeSide::Ours) + " and " +
-                      changeBy(conflict.values.theirs, MergeSide::Theirs);
+    std::string const subject = describedNested(conflict) + described(conflict.address);
+    std::string const both = changeBy(conflict.values.ours, MergeSide::Ours) + " and " +
+                             changeBy(conflict.values.theirs, MergeSide::Theirs);
     switch (conflict.kind) {
     case MergeConflict::Kind::Key:
         return "the " + inQuotes(conflict.key) + " of " + subject + " is " + both;
@@ -118,7 +118,7 @@ std::string inWords(MergeConflict const& conflict) {
     case MergeConflict::Kind::Subtree:
         break;
     }
-    auto const isOther = !conflict.changed.empty() && conflict.changed.front() != conflict.address;
+    bool const isOther = !conflict.changed.empty() && conflict.changed.front() != conflict.address;
     return subject + removedAndChanged(conflict) +
            (isOther ? ", in " + described(conflict.changed.front()) : "");
 }

@@ -68,7 +68,7 @@ private:
 
     /// Replaces the content of a file as a whole: a full disk leaves the old content.
     static void replace(std::string const& name, std::string const& content) {
-        auto const next = name + ".merged";
+        std::string const next = name + ".merged";
         std::ofstream file(next, std::ios::binary | std::ios::trunc);
         file << content << std::flush;
         bool const isWritten = file.good();

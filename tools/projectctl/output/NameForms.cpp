@@ -43,7 +43,7 @@ void appendEscaped(std::string& out, char byte) {
 
 bool needsQuotes(std::string_view bytes) {
     for (std::size_t index = 0; index < bytes.size();) {
-        auto const length = characterLength(bytes, index);
+        std::size_t const length = characterLength(bytes, index);
         if (length == 0 || isControl(bytes, index) || bytes[index] == '"' || bytes[index] == '\\') {
             return true;
         }
@@ -55,7 +55,7 @@ bool needsQuotes(std::string_view bytes) {
 } // namespace
 
 void appendBytes(std::string& out, std::u16string_view name) {
-    auto const before = out.size();
+    std::size_t const before = out.size();
     out.resize(before + name.size());
     auto* to = out.data() + before;
     bool isAscii = true;
@@ -82,7 +82,7 @@ void appendQuoted(std::string& out, std::string_view bytes) {
     }
     out += '"';
     for (std::size_t index = 0; index < bytes.size();) {
-        auto const length = std::max<std::size_t>(characterLength(bytes, index), 1);
+        std::size_t const length = std::max<std::size_t>(characterLength(bytes, index), 1);
         bool const escaped = isControl(bytes, index) || characterLength(bytes, index) == 0;
         for (auto const byte : bytes.substr(index, length)) {
             if (escaped) {
@@ -111,7 +111,7 @@ std::string shown(fl::filesystem::Path const& path) {
 std::string withoutControls(std::string_view text, bool lineBreaks) {
     std::string result;
     for (std::size_t index = 0; index < text.size();) {
-        auto const length = std::max<std::size_t>(characterLength(text, index), 1);
+        std::size_t const length = std::max<std::size_t>(characterLength(text, index), 1);
         bool const stays = text[index] == '\t' || (lineBreaks && text[index] == '\n');
         for (auto const byte : text.substr(index, length)) {
             if (isControl(text, index) && !stays) {

@@ -64,7 +64,7 @@ Output& output() {
 
 void printError(std::string_view text) noexcept {
     try {
-        auto const line = "projectctl: " + withoutControls(text, false) + '\n';
+        std::string const line = "projectctl: " + withoutControls(text, false) + '\n';
         [[maybe_unused]] auto const written = write(STDERR_FILENO, line.data(), line.size());
     } catch (...) {
         // Without memory for the line, the exit code is the only report.

@@ -18,8 +18,8 @@ void draw(int descriptor, std::string_view text) {
 }
 
 std::string withThousands(std::size_t number) {
-    auto text = std::to_string(number);
-    for (auto place = text.size(); place > 3;) {
+    std::string text = std::to_string(number);
+    for (std::size_t place = text.size(); place > 3;) {
         place -= 3;
         text.insert(place, 1, ',');
     }

@@ -29,7 +29,7 @@ FileList::FileList(OpenProject& project) : project_(project), guard_(project.sto
 MetadataPath FileList::addressOf(Path const& path) const {
     auto result = MetadataPath::root().child(
         PathElement(treeSchema::files::filesType, treeSchema::files::fileListScope));
-    auto const relative = project::metadata::getRelativePath(project_.root(), path);
+    std::u16string const relative = project::metadata::getRelativePath(project_.root(), path);
     for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
         auto const name = fl::filesystem::detail::extract_first_element(rest);
         result = result.child(PathElement(treeSchema::files::fileType, std::u16string(name)));
@@ -60,7 +60,7 @@ void FileList::visit(Path const& path, Visitor const& visitor) const {
     if (!node) {
         return; // it is not in the project
     }
-    auto const relative = project::metadata::getRelativePath(project_.root(), path);
+    std::u16string const relative = project::metadata::getRelativePath(project_.root(), path);
     visitor({relative, 0, here.kind, *node});
     visitBelow(address, std::move(here), relative + u'/', 1, visitor);
 }

@@ -30,7 +30,7 @@ public:
     int run() override {
         auto const root = folder_ ? chosenFolder(*folder_) : workingFolder();
         requireNoProject(root);
-        auto const name = name_ ? textOf(*name_) : nameOf(root);
+        std::u16string const name = name_ ? textOf(*name_) : nameOf(root);
         OpenProject::create(root, name).stage();
         if (settings().sourceControl) {
             auto const setup = mergeSetupOf(root);

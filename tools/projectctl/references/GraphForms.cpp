@@ -138,7 +138,7 @@ void writeJson(ReferenceGraph const& graph) {
     out += ",\n\"cycles\": [";
     for (std::size_t index = 0; index < graph.cycles().size(); ++index) {
         out += index == 0 ? "\n[" : ",\n[";
-        for (auto const node : graph.cycles()[index]) {
+        for (std::size_t const node : graph.cycles()[index]) {
             out += out.back() == '[' ? "" : ", ";
             appendJsonString(out, graph.nodes()[node].folder.native());
         }

@@ -65,7 +65,7 @@ void ReferenceGraph::enter(std::size_t index) {
         auto references = projectReferences().manager(project).getReferences();
         std::ranges::stable_sort(references, std::less<>(), &FolderReference::getLocation);
         for (auto const& reference : references) {
-            auto const to = indexOf(followed(reference.getLocation()));
+            std::size_t const to = indexOf(followed(reference.getLocation()));
             nodes_[index].references.push_back({to, reference.getStoredPath(), reference.getType(), false});
         }
     } catch (std::exception const& error) {

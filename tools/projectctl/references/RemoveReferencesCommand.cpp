@@ -50,7 +50,7 @@ private:
     /// @throws Failure if there are none.
     std::vector<FolderReference> meantBy(std::string const& argument, OpenProject& project,
                                          std::vector<FolderReference> const& present) const {
-        auto const text = textOf(argument);
+        std::u16string const text = textOf(argument);
         if (isUUID(text) && isStored(project, text)) {
             return {FolderReference(Path(), {}, {}, text)};
         }
