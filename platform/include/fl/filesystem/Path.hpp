@@ -78,7 +78,9 @@ public:
     friend basic_path operator/(basic_path left, basic_path const& right) { return left /= right; }
 
     friend bool operator==(basic_path const& left, basic_path const& right) noexcept {
-        return left.native_ == right.native_;
+        // Most unequal paths differ in length. The comparison of the texts would compare their common
+        // beginning.
+        return left.native_.size() == right.native_.size() && left.native_ == right.native_;
     }
 
     friend bool operator<(basic_path const& left, basic_path const& right) noexcept {
