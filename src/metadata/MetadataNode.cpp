@@ -29,8 +29,8 @@ bool isEqual(MetadataNode const& left, MetadataNode const& right) {
         return false;
     }
     bool const hasEqualValues = isSpecification(left) && isSpecification(right)
-                                    ? static_cast<MetadataNodeSpecification const&>(left).values_ ==
-                                          static_cast<MetadataNodeSpecification const&>(right).values_
+                                    ? static_cast<MetadataNodeSpecification const&>(left).hasEqualValues(
+                                          static_cast<MetadataNodeSpecification const&>(right))
                                     : hasEqualValuesByKey(left, right);
     if (!hasEqualValues) {
         return false;

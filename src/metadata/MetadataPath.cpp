@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <atomic>
+#include <cstdint>
 #include <utility>
 
 #include "project/metadata/MetadataPathBuilder.hpp"
@@ -12,26 +13,37 @@ using Elements = std::vector<PathElement>;
 
 /// A step and a pointer to the step above it, shared by all addresses that contain both.
 struct MetadataPath::Step {
-    Step(std::shared_ptr<Step const> above, PathElement last)
-        : parent(std::move(above)), element(std::move(last)), depth(parent ? parent->depth + 1 : 1) {}
+    /// @param above a use that the new step takes over.
+    Step(Step const* above, PathElement last)
+        : depth(above != nullptr ? above->depth + 1 : 1), parent(above), element(std::move(last)) {}
 
     Step(Step const&) = delete;
     Step& operator=(Step const&) = delete;
 
-    /// Releases the steps above in a loop. Recursion through the pointers would overflow the stack for a very
-    /// long address.
-    ~Step() {
-        delete list.load(std::memory_order_relaxed);
-        auto above = std::move(parent);
-        while (above && above.use_count() == 1) {
-            auto next = above->parent;
-            above = std::move(next);
+    ~Step() { delete list.load(std::memory_order_relaxed); }
+
+    /// Adds a use. @return the step.
+    static Step const* use(Step const* step) noexcept {
+        if (step != nullptr) {
+            step->uses.fetch_add(1, std::memory_order_relaxed);
+        }
+        return step;
+    }
+
+    /// Removes a use, and deletes the step after the last one. Releases the steps above in a loop: recursion
+    /// would overflow the stack for a very long address.
+    static void release(Step const* step) noexcept {
+        while (step != nullptr && step->uses.fetch_sub(1, std::memory_order_acq_rel) == 1) {
+            auto const* const above = step->parent;
+            delete step;
+            step = above;
         }
     }
 
-    std::shared_ptr<Step const> parent;
+    mutable std::atomic<std::uint32_t> uses = 1;
+    std::uint32_t depth;
+    Step const* parent;
     PathElement element;
-    std::size_t depth;
     mutable std::atomic<Elements const*> list = nullptr;
 };
 
@@ -52,8 +64,8 @@ std::strong_ordering compareSteps(Step const* left, Step const* right) noexcept 
         if (std::is_neq(here)) {
             order = here; // the difference nearest to the root decides, and this loop ends at the root
         }
-        left = left->parent.get();
-        right = right->parent.get();
+        left = left->parent;
+        right = right->parent;
     }
     return order;
 }
@@ -61,27 +73,34 @@ std::strong_ordering compareSteps(Step const* left, Step const* right) noexcept 
 template <typename Step>
 Step const* ascend(Step const* step, std::size_t depth) noexcept {
     while (step != nullptr && step->depth > depth) {
-        step = step->parent.get();
+        step = step->parent;
     }
     return step;
 }
 
 } // namespace
 
-MetadataPath::MetadataPath(std::vector<PathElement> elements) {
+MetadataPath::MetadataPath(std::vector<PathElement> elements) : MetadataPath(root()) {
     for (auto& element : elements) {
-        step_ = std::make_shared<Step const>(std::move(step_), std::move(element));
+        step_ = new Step(step_, std::move(element));
     }
 }
 
-MetadataPath::MetadataPath(SharedSteps, std::shared_ptr<Step const> last) noexcept : step_(std::move(last)) {
+MetadataPath::MetadataPath(MetadataPath const& other) noexcept : step_(Step::use(other.step_)) {
 }
 
-MetadataPath::~MetadataPath() = default;
+MetadataPath& MetadataPath::operator=(MetadataPath const& other) noexcept {
+    Step::release(std::exchange(step_, Step::use(other.step_)));
+    return *this;
+}
+
+MetadataPath::~MetadataPath() {
+    Step::release(step_);
+}
 
 std::vector<PathElement> const& MetadataPath::getPath() const {
     static Elements const none;
-    if (!step_) {
+    if (step_ == nullptr) {
         return none;
     }
     if (auto const* list = step_->list.load(std::memory_order_acquire)) {
@@ -89,7 +108,7 @@ std::vector<PathElement> const& MetadataPath::getPath() const {
     }
     auto created = std::make_unique<Elements>();
     created->reserve(step_->depth);
-    for (auto const* step = step_.get(); step != nullptr; step = step->parent.get()) {
+    for (auto const* step = step_; step != nullptr; step = step->parent) {
         created->push_back(step->element);
     }
     std::reverse(created->begin(), created->end());
@@ -101,7 +120,7 @@ std::vector<PathElement> const& MetadataPath::getPath() const {
 }
 
 PathElement MetadataPath::getLeaf() const {
-    return step_ ? step_->element : PathElement(u"", u"");
+    return step_ != nullptr ? step_->element : PathElement(u"", u"");
 }
 
 PathElement const& MetadataPath::leaf() const noexcept {
@@ -109,39 +128,41 @@ PathElement const& MetadataPath::leaf() const noexcept {
 }
 
 PathElement const& MetadataPath::operator[](std::size_t index) const noexcept {
-    return ascend(step_.get(), index + 1)->element;
+    return ascend(step_, index + 1)->element;
 }
 
 void MetadataPath::listSteps(std::vector<PathElement const*>& steps) const {
     steps.resize(depth());
-    auto const* step = step_.get();
+    auto const* step = step_;
     for (auto place = steps.rbegin(); place != steps.rend(); ++place) {
         *place = &step->element;
-        step = step->parent.get();
+        step = step->parent;
     }
 }
 
 std::size_t MetadataPath::depth() const noexcept {
-    return step_ ? step_->depth : 0;
+    return step_ != nullptr ? step_->depth : 0;
 }
 
 MetadataPath MetadataPath::parent() const {
-    return step_ ? MetadataPath(SharedSteps(), step_->parent) : *this;
+    return step_ != nullptr ? MetadataPath(LastStep(), Step::use(step_->parent)) : root();
 }
 
 MetadataPath MetadataPath::child(PathElement element) const {
-    return MetadataPath(SharedSteps(), std::make_shared<Step const>(step_, std::move(element)));
+    auto above = *this;
+    auto const* const step = new Step(above.step_, std::move(element));
+    above.step_ = nullptr; // the step has its use
+    return MetadataPath(LastStep(), step);
 }
 
 bool MetadataPath::isWithin(MetadataPath const& other) const noexcept {
-    auto const* step = ascend(step_.get(), other.depth());
-    return depth() >= other.depth() && std::is_eq(compareSteps(step, other.step_.get()));
+    auto const* step = ascend(step_, other.depth());
+    return depth() >= other.depth() && std::is_eq(compareSteps(step, other.step_));
 }
 
 std::strong_ordering compare(MetadataPath const& left, MetadataPath const& right) noexcept {
     std::size_t const depth = std::min(left.depth(), right.depth());
-    std::strong_ordering const order =
-        compareSteps(ascend(left.step_.get(), depth), ascend(right.step_.get(), depth));
+    std::strong_ordering const order = compareSteps(ascend(left.step_, depth), ascend(right.step_, depth));
     return std::is_neq(order) ? order : left.depth() <=> right.depth();
 }
 

@@ -1,16 +1,21 @@
 #pragma once
 
-#include <map>
+#include <memory>
+#include <string>
+#include <vector>
 
 #include "project/metadata/MetadataNode.hpp"
 
 namespace project::metadata {
 
 /// The concrete node: callers build it to store it, and the store returns it.
+///
+/// A node without keys and nested nodes, whose type is empty or that of most nodes, takes no memory beside
+/// the object: a project has one for each file while it is added.
 class PROJECT_METADATA_EXPORT MetadataNodeSpecification : public MetadataNode {
 public:
     /// Creates a node without a type, keys and nested nodes.
-    MetadataNodeSpecification() = default;
+    MetadataNodeSpecification();
 
     explicit MetadataNodeSpecification(std::u16string type);
 
@@ -18,6 +23,7 @@ public:
     MetadataNodeSpecification(MetadataNode const& other);
     MetadataNodeSpecification(MetadataNodeSpecification const& other);
     MetadataNodeSpecification& operator=(MetadataNodeSpecification const&) = delete;
+    ~MetadataNodeSpecification() override;
 
     std::u16string const& get(std::u16string const& key) const override;
     void put(std::u16string key, std::u16string value) override;
@@ -30,11 +36,15 @@ public:
 private:
     friend PROJECT_METADATA_EXPORT bool isEqual(MetadataNode const& left, MetadataNode const& right);
 
-    void copyChildren(MetadataNode const& other);
+    struct Content;
 
-    std::map<std::u16string, std::u16string> values_;
-    std::vector<std::unique_ptr<MetadataNode>> children_;
-    std::u16string type_;
+    void copyValues(MetadataNode const& other);
+    bool hasEqualValues(MetadataNodeSpecification const& other) const;
+    Content& makeContent();
+    void setType(std::u16string type);
+
+    std::unique_ptr<Content> content_; ///< null as long as there is nothing to store in it
+    std::u16string const* type_;       ///< in the content, or one of the constants
 };
 
 } // namespace project::metadata

@@ -2,7 +2,7 @@
 
 #include <compare>
 #include <cstddef>
-#include <memory>
+#include <utility>
 #include <vector>
 
 #include "project/metadata/Export.hpp"
@@ -22,12 +22,19 @@ public:
     MetadataPath(std::vector<PathElement> elements);
 
     /// Returns the address of the tree's root.
-    static MetadataPath root() noexcept { return MetadataPath(SharedSteps(), nullptr); }
+    static MetadataPath root() noexcept { return MetadataPath(LastStep(), nullptr); }
 
-    MetadataPath(MetadataPath const&) = default;
-    MetadataPath& operator=(MetadataPath const&) = default;
-    MetadataPath(MetadataPath&&) noexcept = default;
-    MetadataPath& operator=(MetadataPath&&) noexcept = default;
+    MetadataPath(MetadataPath const& other) noexcept;
+    MetadataPath& operator=(MetadataPath const& other) noexcept;
+
+    /// Leaves the root's address in the other one.
+    MetadataPath(MetadataPath&& other) noexcept : step_(std::exchange(other.step_, nullptr)) {}
+
+    MetadataPath& operator=(MetadataPath&& other) noexcept {
+        std::swap(step_, other.step_);
+        return *this;
+    }
+
     ~MetadataPath();
 
     /// Returns the steps from the root down. The list is created at the first call and is valid as long as
@@ -68,11 +75,14 @@ private:
     struct Step;
 
     /// Selects the constructor below. With a pointer alone, MetadataPath({}) would be ambiguous.
-    struct SharedSteps {};
+    struct LastStep {};
 
-    MetadataPath(SharedSteps, std::shared_ptr<Step const> last) noexcept;
+    /// Takes over one use of a step.
+    MetadataPath(LastStep, Step const* last) noexcept : step_(last) {}
 
-    std::shared_ptr<Step const> step_;
+    /// One use of the last step, which counts its uses itself: an address is one pointer, and a step with the
+    /// usual kind of shared pointer would be a third larger. Null for the root.
+    Step const* step_;
 };
 
 PROJECT_METADATA_EXPORT std::strong_ordering compare(MetadataPath const& left,
