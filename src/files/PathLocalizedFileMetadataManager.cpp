@@ -1,5 +1,6 @@
 #include "files/PathLocalizedFileMetadataManager.hpp"
 
+#include <atomic>
 #include <utility>
 
 #include "project/metadata/Messages.hpp"
@@ -27,16 +28,83 @@ constexpr std::size_t headDepth = 1;
 
 FileMetadataManager::~FileMetadataManager() = default;
 
+class PathLocalizedFileMetadataManager::LastAddress {
+public:
+    explicit LastAddress(MetadataPath head) : head_(std::move(head)), address_(head_) {}
+
+    /// The address of a file. @param names its path relative to the root.
+    MetadataPath withNames(std::u16string_view names) {
+        if (isInUse_.exchange(true, std::memory_order_acquire)) {
+            return append(head_, names); // by another thread
+        }
+        Using const mark(isInUse_);
+        auto const depth = takeSharedNames(names);
+        auto near = address_;
+        while (near.depth() > depth) {
+            near = near.parent();
+        }
+        address_ = append(std::move(near), names);
+        return address_;
+    }
+
+private:
+    /// Ends the use of the address.
+    class Using {
+    public:
+        explicit Using(std::atomic<bool>& mark) : mark_(mark) {}
+
+        ~Using() { mark_.store(false, std::memory_order_release); }
+
+        Using(Using const&) = delete;
+        Using& operator=(Using const&) = delete;
+
+    private:
+        std::atomic<bool>& mark_;
+    };
+
+    /// Removes the first names that are also those of the address. @return their depth.
+    std::size_t takeSharedNames(std::u16string_view& names) {
+        address_.listSteps(steps_);
+        auto depth = head_.depth();
+        while (depth < steps_.size() && !names.empty() &&
+               steps_[depth]->getLocation() == fl::filesystem::detail::extract_first_element(names)) {
+            names = fl::filesystem::detail::move_down(names);
+            ++depth;
+        }
+        return depth;
+    }
+
+    static MetadataPath append(MetadataPath address, std::u16string_view names) {
+        for (; !names.empty(); names = fl::filesystem::detail::move_down(names)) {
+            auto const name = fl::filesystem::detail::extract_first_element(names);
+            address = address.child(PathElement(schema::files::fileType, std::u16string(name)));
+        }
+        return address;
+    }
+
+    MetadataPath const head_;
+    std::atomic<bool> isInUse_ = false;
+    MetadataPath address_;                  ///< the last one
+    std::vector<PathElement const*> steps_; ///< of it
+};
+
 PathLocalizedFileMetadataManager::PathLocalizedFileMetadataManager(
     Path root, std::shared_ptr<metadata::MetadataManager> metadataManager, std::u16string scope)
-    : root_(std::move(root)), metadataManager_(std::move(metadataManager)), scope_(std::move(scope)) {
+    : root_(std::move(root)),
+      metadataManager_(std::move(metadataManager)),
+      scope_(std::move(scope)),
+      lastAddress_(std::make_unique<LastAddress>(
+          MetadataPath::root().child(PathElement(schema::files::filesType, scope_)))) {
 }
+
+PathLocalizedFileMetadataManager::~PathLocalizedFileMetadataManager() = default;
 
 void PathLocalizedFileMetadataManager::setFileNodes(std::map<Path, std::shared_ptr<MetadataNode>> files) {
     auto const guard = metadataManager_->acquireWriteLock();
     std::map<MetadataPath, std::shared_ptr<MetadataNode>> batch;
-    for (auto& [file, node] : files) {
-        addFileNode(file, std::move(node), batch);
+    while (!files.empty()) { // each is released at once: there may be millions
+        auto file = files.extract(files.begin());
+        addFileNode(file.key(), std::move(file.mapped()), batch);
     }
     metadataManager_->setNodes(batch);
 }
@@ -104,16 +172,8 @@ std::vector<Path> PathLocalizedFileMetadataManager::getChildFiles(Path file) {
 }
 
 MetadataPath PathLocalizedFileMetadataManager::toMetadataPath(Path const& file) const {
-    MetadataPath result = MetadataPath::root().child(PathElement(schema::files::filesType, scope_));
-    if (file == root_) {
-        return result;
-    }
-    std::u16string const relative = metadata::getRelativePath(root_, file);
-    for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
-        std::u16string_view const element = fl::filesystem::detail::extract_first_element(rest);
-        result = result.child(PathElement(schema::files::fileType, std::u16string(element)));
-    }
-    return result;
+    std::u16string const relative = file == root_ ? u"" : metadata::getRelativePath(root_, file);
+    return lastAddress_->withNames(relative);
 }
 
 Path PathLocalizedFileMetadataManager::toFilePath(MetadataPath const& path) const {
@@ -143,8 +203,8 @@ void PathLocalizedFileMetadataManager::addFileNode(
     Path const& file, std::shared_ptr<MetadataNode> node,
     std::map<MetadataPath, std::shared_ptr<MetadataNode>>& batch) {
     auto const guard = metadataManager_->acquireWriteLock();
-    MetadataPath const path = toMetadataPath(file);
     // The files are in Path order, which is the order of their addresses, so the end is the best hint.
+    MetadataPath const path = toMetadataPath(file);
     batch.insert_or_assign(batch.end(), path, std::move(node));
     if (metadata::is_directory(file)) {
         MetadataPath marker =

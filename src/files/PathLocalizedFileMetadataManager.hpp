@@ -7,7 +7,7 @@
 namespace project::management {
 
 /// Stores the files of one scope in the metadata tree in the shape of the folders below the project's root.
-/// The address of a file's node is computed from its path; nothing is looked up or cached.
+/// The address of a file's node is computed from its path; nothing is looked up.
 ///
 /// The address is ("Files", scope), then ("File", name) for each element of the path relative to the root.
 class PathLocalizedFileMetadataManager : public FileMetadataManager {
@@ -18,6 +18,7 @@ public:
     /// Accesses neither the store nor the disk.
     PathLocalizedFileMetadataManager(Path root, std::shared_ptr<metadata::MetadataManager> metadataManager,
                                      std::u16string scope);
+    ~PathLocalizedFileMetadataManager() override;
 
     void setFileNodes(std::map<Path, std::shared_ptr<MetadataNode>> files) override;
     std::map<Path, std::unique_ptr<MetadataNode>> getAllFileNodes() override;
@@ -43,9 +44,14 @@ public:
                      std::map<MetadataPath, std::shared_ptr<MetadataNode>>& batch);
 
 private:
+    /// The last address that was computed. Most files are next to the previous one, and then all steps but
+    /// the last one are shared.
+    class LastAddress;
+
     Path root_;
     std::shared_ptr<metadata::MetadataManager> metadataManager_;
     std::u16string scope_;
+    std::unique_ptr<LastAddress> lastAddress_;
 };
 
 } // namespace project::management

@@ -1,5 +1,6 @@
 #include "files/PathSets.hpp"
 
+#include <algorithm>
 #include <iterator>
 #include <set>
 #include <utility>
@@ -10,25 +11,44 @@ namespace project::management {
 
 namespace {
 
-using PathSet = std::set<Path>;
-
-/// Moves the elements of the set to a list.
-std::vector<Path> toList(PathSet set) {
-    std::vector<Path> result;
-    result.reserve(set.size());
-    while (!set.empty()) {
-        result.push_back(std::move(set.extract(set.begin()).value()));
+/// Sorts the paths and removes duplicates. Most lists are sorted already.
+void makeSet(std::vector<Path>& paths) {
+    auto const isNotBefore = [](Path const& left, Path const& right) { return !(left < right); };
+    if (std::adjacent_find(paths.begin(), paths.end(), isNotBefore) != paths.end()) {
+        std::sort(paths.begin(), paths.end());
+        paths.erase(std::unique(paths.begin(), paths.end()), paths.end());
     }
-    return result;
 }
 
-/// Inserts a path near the end, which is where it belongs in a sorted list.
-/// @return false if the set contained the path.
-bool insertNearEnd(Path const& path, PathSet& result) {
-    std::size_t const before = result.size();
-    result.emplace_hint(result.end(), path);
-    return result.size() > before;
-}
+/// Paths in a list into which each is inserted directly after another one.
+class LinkedPaths {
+public:
+    /// The place before the first path.
+    static constexpr std::size_t front = 0;
+
+    /// @return the place of the path.
+    std::size_t insertAfter(std::size_t place, Path path) {
+        paths_.push_back({std::move(path), std::exchange(paths_[place].next, paths_.size())});
+        return paths_.size() - 1;
+    }
+
+    std::vector<Path> take() {
+        std::vector<Path> result;
+        result.reserve(paths_.size() - 1);
+        for (auto place = paths_[front].next; place != front; place = paths_[place].next) {
+            result.push_back(std::move(paths_[place].path));
+        }
+        return result;
+    }
+
+private:
+    struct Linked {
+        Path path;
+        std::size_t next; ///< the front at the end
+    };
+
+    std::vector<Linked> paths_{{Path(), front}};
+};
 
 } // namespace
 
@@ -37,51 +57,57 @@ bool isWithinFolder(Path const& folder, Path const& path) {
 }
 
 std::vector<Path> withParentFolders(std::vector<Path> const& files, Path const& root) {
-    PathSet result;
-    Path known = root; // a folder that the set contains with all folders above it, or the root
+    std::vector<Path> result;
+    result.reserve(files.size() + files.size() / 8);
+    std::set<Path> folders; // that the result contains
+    std::vector<Path> missing;
+    Path known = root; // a folder that the result contains with all folders above it, or the root
     for (auto const& file : files) {
-        if (!isWithinFolder(root, file)) {
-            result.insert(file);
+        if (file == root) {
             continue;
         }
-        if (file == root || !insertNearEnd(file, result)) {
-            continue;
+        if (isWithinFolder(root, file)) {
+            Path folder = metadata::getParentFolder(file);
+            for (Path path = folder; path != known && path != root && folders.insert(path).second;) {
+                missing.push_back(path);
+                path = metadata::getParentFolder(path);
+            }
+            std::move(missing.rbegin(), missing.rend(), std::back_inserter(result));
+            missing.clear();
+            known = std::move(folder);
         }
-        Path const folder = metadata::getParentFolder(file);
-        Path path = folder;
-        while (path != known && path != root && result.insert(path).second) {
-            path = metadata::getParentFolder(path);
-        }
-        known = folder;
+        result.push_back(file);
     }
-    return toList(std::move(result));
+    makeSet(result);
+    return result;
 }
 
 std::vector<Path> withDescendants(std::vector<Path> const& files,
                                   std::function<std::vector<Path>(Path const&)> const& getChildFiles) {
     struct Waiting {
         Path path;
-        PathSet::const_iterator folder; // the end for the given paths
+        std::size_t folder; ///< its place
     };
 
-    PathSet result;
+    LinkedPaths result;
     std::vector<Waiting> waiting;
     waiting.reserve(files.size());
     for (auto const& file : files) {
-        waiting.push_back({file, result.end()});
+        waiting.push_back({file, LinkedPaths::front});
     }
     while (!waiting.empty()) {
         Waiting next = std::move(waiting.back());
         waiting.pop_back();
         std::vector<Path> children = getChildFiles(next.path);
         // Children are popped from the last to the first, so each belongs directly after its folder.
-        auto const hint = next.folder == result.end() ? result.end() : std::next(next.folder);
-        auto const inserted = result.emplace_hint(hint, std::move(next.path));
+        auto const place = result.insertAfter(next.folder, std::move(next.path));
         for (auto& child : children) {
-            waiting.push_back({std::move(child), inserted});
+            waiting.push_back({std::move(child), place});
         }
     }
-    return toList(std::move(result));
+    auto paths = result.take();
+    makeSet(paths);
+    return paths;
 }
 
 } // namespace project::management
