@@ -37,12 +37,8 @@ int pathRank(char byte) noexcept {
 
 /// The steps of an address from the root down. They are valid as long as the address is.
 std::vector<metadata::PathElement const*> stepsOf(Address const& address) {
-    std::vector<metadata::PathElement const*> steps(address.depth());
-    Address above = address;
-    for (std::size_t i = steps.size(); i > 0; --i) {
-        steps[i - 1] = &above.leaf();
-        above = above.parent();
-    }
+    std::vector<metadata::PathElement const*> steps;
+    address.listSteps(steps);
     return steps;
 }
 
@@ -217,18 +213,19 @@ bool isWrittenAsPath(LineAddress const& address) noexcept {
     return names > 0;
 }
 
-AddressText::AddressText(Address const& address) : form_(LineAddress::Form::Steps) {
-    std::vector<metadata::PathElement const*> const steps = stepsOf(address);
-    if (areWrittenAsPath(steps)) {
-        form_ = LineAddress::Form::Names;
-        for (std::size_t i = 1; i < steps.size(); ++i) {
+void AddressText::assign(Address const& address) {
+    address.listSteps(steps_);
+    text_.clear();
+    form_ = areWrittenAsPath(steps_) ? LineAddress::Form::Names : LineAddress::Form::Steps;
+    if (form_ == LineAddress::Form::Names) {
+        for (std::size_t i = 1; i < steps_.size(); ++i) {
             text_ += i == 1 ? "" : "/";
-            bool const isMarker = i + 1 == steps.size() && steps[i]->getType() == markerType;
-            appendJsonContent(text_, isMarker ? std::u16string_view() : steps[i]->getLocation());
+            bool const isMarker = i + 1 == steps_.size() && steps_[i]->getType() == markerType;
+            appendJsonContent(text_, isMarker ? std::u16string_view() : steps_[i]->getLocation());
         }
         return;
     }
-    for (metadata::PathElement const* step : steps) {
+    for (metadata::PathElement const* step : steps_) {
         text_ += text_.empty() ? "" : ",";
         appendJsonString(text_, step->getType());
         text_ += ',';

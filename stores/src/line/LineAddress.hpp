@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "project/stores/Node.hpp"
 
@@ -76,13 +77,17 @@ bool isWrittenAsPath(LineAddress const& steps) noexcept;
 /// An address in canonical form, with its text.
 class AddressText {
 public:
-    explicit AddressText(Address const& address);
+    explicit AddressText(Address const& address) { assign(address); }
+
+    /// Replaces the address. Uses the memory of the earlier one again.
+    void assign(Address const& address);
 
     LineAddress view() const noexcept { return {form_, text_}; }
 
 private:
     std::string text_;
-    LineAddress::Form form_;
+    std::vector<metadata::PathElement const*> steps_; ///< of the address, while it is assigned
+    LineAddress::Form form_ = LineAddress::Form::Steps;
 };
 
 } // namespace project::stores

@@ -65,8 +65,7 @@ std::optional<std::size_t> TextBody::find(LineAddress const& wanted) const noexc
 }
 
 std::size_t TextBody::linesBefore(std::size_t offset) const noexcept {
-    auto const next = std::lower_bound(starts_.begin(), starts_.end(), offset);
-    auto const begun = static_cast<std::size_t>(next - starts_.begin());
+    std::size_t const begun = gallop(all(), [&](std::size_t i) noexcept { return starts_[i] < offset; });
     return begun == 0 ? 0 : begun - 1;
 }
 
@@ -121,12 +120,12 @@ void BodyWriter::copy(TextBody::Range run) {
         written_.bytes_.size() - first; // wraps around if lines move towards the beginning
     written_.bytes_.append(old_.bytes_, first, end - first);
     for (std::size_t i = run.begin; i < run.end; ++i) {
-        written_.starts_.push_back(old_.starts_[i] + moved);
+        written_.starts_.add(old_.starts_[i] + moved);
     }
 }
 
 void BodyWriter::add(std::string_view line) {
-    written_.starts_.push_back(written_.bytes_.size());
+    written_.starts_.add(written_.bytes_.size());
     written_.bytes_ += line;
     written_.bytes_ += '\n';
 }

@@ -8,6 +8,7 @@
 
 #include "line/LineAddress.hpp"
 #include "project/stores/Node.hpp"
+#include "text/LineStarts.hpp"
 
 namespace project::stores {
 
@@ -61,7 +62,7 @@ public:
 
     /// Adds a line, which must come after all lines added before. @param start the position of its first
     /// byte.
-    void addLine(std::size_t start) { starts_.push_back(start); }
+    void addLine(std::size_t start) { starts_.add(start); }
 
     void reserve(std::size_t lines) { starts_.reserve(lines); }
 
@@ -77,7 +78,7 @@ private:
     friend class BodyWriter;
 
     std::string bytes_;
-    std::vector<std::size_t> starts_;
+    LineStarts starts_;
     bool isGapless_ = false;
 };
 

@@ -118,6 +118,82 @@ private:
     std::size_t depth_;
 };
 
+/// Writes a body and the entries over it, which arrive sorted by address.
+class ContentWriter {
+public:
+    ContentWriter(TextBody const& body, std::size_t entries)
+        : body_(body), rest_(body.all()), writer_(body, entries * expectedLine) {}
+
+    /// @param node null for an address without a line of its own or without a node.
+    /// @return false if the address does not come after the previous one.
+    bool add(Address const& address, Node const& node, bool isCreated, bool isHiding) {
+        std::swap(address_, previous_);
+        address_.assign(address);
+        LineAddress const text = address_.view();
+        if (std::is_gteq(compare(previous_.view(), text))) {
+            return false;
+        }
+        std::size_t const found = body_.lowerBound(rest_, text);
+        writer_.copy({rest_.begin, found});
+        rest_.begin = found;
+        if (isHiding) {
+            rest_.begin = body_.endOf(rest_, text);
+        } else if (!rest_.empty() && std::is_eq(compare(body_.address(found), text))) {
+            ++rest_.begin;
+        }
+        if (node || isCreated) {
+            line_.clear();
+            appendNodeLine(line_, address_, node);
+            writer_.add(line_);
+        }
+        return true;
+    }
+
+    TextBody finish() && {
+        writer_.copy(rest_);
+        return std::move(writer_).finish();
+    }
+
+private:
+    static constexpr std::size_t expectedLine = 64;
+
+    TextBody const& body_;
+    TextBody::Range rest_; ///< the lines that are neither copied nor replaced yet
+    BodyWriter writer_;
+    AddressText address_{Address::root()};
+    AddressText previous_{Address::root()};
+    std::string line_;
+};
+
+/// Writes the entries of an overlay and over them the changes of a batch.
+/// @return false if the batch does not set each address once and in order. The batches of many addresses do;
+/// they can be written without a sorted copy.
+bool writeOver(ContentWriter& writer, Overlay const& overlay, Batch const& batch) {
+    auto entry = overlay.entries().begin();
+    auto const end = overlay.entries().end();
+    auto const writeEntry = [&] {
+        auto const& [address, content] = *entry++;
+        return writer.add(address, content.state.node, content.state.isCreated, content.isHiding);
+    };
+    for (Change const& change : batch) {
+        requireWritable(change);
+        while (entry != end && entry->first < change.address) {
+            writeEntry();
+        }
+        bool const isReplacing = entry != end && entry->first == change.address;
+        bool const isHiding = isReplacing && entry->second.isHiding;
+        entry = isReplacing ? std::next(entry) : entry;
+        if (change.kind == Change::Kind::Remove ||
+            !writer.add(change.address, change.node, change.kind == Change::Kind::Create, isHiding)) {
+            return false;
+        }
+    }
+    while (entry != end) {
+        writeEntry();
+    }
+    return true;
+}
+
 } // namespace
 
 void TextContent::children(Address const& parent, ChildSink& children) const {
@@ -219,33 +295,18 @@ void TextContent::finishJoining() {
 }
 
 TextBody TextContent::write(Batch const& batch) const {
+    ContentWriter writer(body_, overlay_.entries().size() + batch.size());
+    if (writeOver(writer, overlay_, batch)) {
+        return std::move(writer).finish();
+    }
     Overlay overlay = overlay_;
     for (Change const& change : batch) {
         requireWritable(change);
         overlay.apply(change);
     }
-    constexpr std::size_t expectedLine = 64;
-    BodyWriter writer(body_, overlay.entries().size() * expectedLine);
-    TextBody::Range rest = body_.all();
-    std::string line;
-    for (auto const& [address, entry] : overlay.entries()) {
-        AddressText const text(address);
-        std::size_t const found = body_.lowerBound(rest, text.view());
-        writer.copy({rest.begin, found});
-        rest.begin = found;
-        if (entry.isHiding) {
-            rest.begin = body_.endOf(rest, text.view());
-        } else if (!rest.empty() && std::is_eq(compare(body_.address(found), text.view()))) {
-            ++rest.begin;
-        }
-        if (entry.state) {
-            line.clear();
-            appendNodeLine(line, text, entry.state.node);
-            writer.add(line);
-        }
-    }
-    writer.copy(rest);
-    return std::move(writer).finish();
+    ContentWriter again(body_, overlay.entries().size());
+    writeOver(again, overlay, {});
+    return std::move(again).finish();
 }
 
 } // namespace project::stores

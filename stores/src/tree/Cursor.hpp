@@ -20,6 +20,7 @@ public:
     void begin(Address const& address) {
         address.listSteps(elements_);
         depth_ = 0;
+        isBelowInserted_ = false;
     }
 
     /// The number of steps that were found.
@@ -27,6 +28,10 @@ public:
 
     /// True if all steps of the address were found.
     bool isAtEnd() const noexcept { return depth_ == elements_.size(); }
+
+    /// True if this cursor has inserted the last step that was found, or one above it, and has stayed there
+    /// since. It may have inserted it even if this is false.
+    bool isBelowInserted() const noexcept { return isBelowInserted_; }
 
     /// The first element that was not found.
     metadata::PathElement const& next() const noexcept { return *elements_[depth_]; }
@@ -38,8 +43,11 @@ public:
             steps_.emplace_back();
         }
         auto& step = steps_[depth_];
-        auto const found = level.find(key, step.level == &level ? step.position : Level::Position());
-        step = {&level, found.position};
+        bool const isSameLevel = step.level == &level;
+        auto const found = level.find(key, isSameLevel ? step.position : Level::Position());
+        bool const isSame = isSameLevel && found.isFound && found.position == step.position;
+        step = {&level, found.position, isSame && step.isInserted};
+        isBelowInserted_ = isBelowInserted_ || step.isInserted;
         depth_ += found.isFound ? 1 : 0;
         return found.isFound;
     }
@@ -51,12 +59,18 @@ public:
         }
         auto& step = steps_[depth_];
         auto const position = level.empty() ? Level::Position() : step.position;
-        step = {&level, level.insert(position, element, std::move(place))};
+        step = {&level, level.insert(position, element, std::move(place)), true};
+        isBelowInserted_ = true;
         ++depth_;
     }
 
     /// Returns to a step above, for example because the steps below it were extracted.
-    void ascendTo(std::size_t depth) noexcept { depth_ = depth; }
+    void ascendTo(std::size_t depth) noexcept {
+        for (auto left = depth; left < steps_.size(); ++left) {
+            steps_[left].isInserted = false;
+        }
+        depth_ = depth;
+    }
 
     /// The level and the position of a found step; of the last one for depth().
     Level& level(std::size_t depth) const noexcept { return *steps_[depth - 1].level; }
@@ -73,10 +87,12 @@ private:
     struct Step {
         Level* level = nullptr;
         Level::Position position;
+        bool isInserted = false;
     };
 
     std::vector<metadata::PathElement const*> elements_; ///< of the address
     std::size_t depth_ = 0;
+    bool isBelowInserted_ = false;
     std::vector<Step> steps_; ///< those behind depth_ are hints
 };
 

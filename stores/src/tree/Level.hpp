@@ -22,6 +22,8 @@ public:
     struct Position {
         std::size_t chunk = 0;
         std::size_t entry = 0;
+
+        friend bool operator==(Position const&, Position const&) = default;
     };
 
     /// The position of an element, or the one at which it would be inserted.

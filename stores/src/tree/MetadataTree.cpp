@@ -36,11 +36,6 @@ struct MetadataTree::UndoSteps {
         Place place; ///< of Replaced, the earlier state; of Removed, the place that was extracted
     };
 
-    /// True if an address will be removed when the last step is undone, and needs no step of its own.
-    bool includes(Address const& address) const noexcept {
-        return !steps.empty() && steps.back().kind == Kind::Added && address.isWithin(steps.back().address);
-    }
-
     std::vector<Step> steps;
 };
 
@@ -155,17 +150,19 @@ void MetadataTree::set(Change const& change, Cursor& cursor, UndoSteps& undo) {
     using Kind = UndoSteps::Kind;
     auto const& address = change.address;
     bool const isCreated = change.kind == Change::Kind::Create;
-    bool const isIncluded = undo.includes(address);
-    if (moveTo(address, cursor)) {
+    bool const isThere = moveTo(address, cursor);
+    // Below an address that this batch has added, no step is needed: undoing that one removes everything.
+    bool const needsStep = !cursor.isBelowInserted();
+    if (isThere) {
         auto& level = cursor.level(cursor.depth());
         auto const at = cursor.position(cursor.depth());
-        if (!isIncluded) {
+        if (needsStep) {
             undo.steps.push_back({Kind::Replaced, address, {level.node(at), level.isCreated(at), {}}});
         }
         level.setState(at, change.node, isCreated);
         return;
     }
-    if (!isIncluded) {
+    if (needsStep) {
         undo.steps.push_back({Kind::Added, firstSteps(address, cursor.depth() + 1), {}});
     }
     while (cursor.depth() + 1 < address.depth()) {

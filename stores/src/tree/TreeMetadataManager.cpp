@@ -150,6 +150,7 @@ void TreeMetadataManager::setNodes(std::map<Address, std::shared_ptr<MetadataNod
     auto const guard = state_->lock.writeLock();
     state_->requireNotCommitting();
     Batch batch;
+    batch.reserve(nodes.size());
     for (auto const& [address, node] : nodes) {
         if (!node || address.depth() == 0) {
             throw std::invalid_argument(node ? "a node cannot be stored at the root of the metadata tree"
