@@ -96,6 +96,25 @@ protected:
         model_.addContents(folder);
     }
 
+    /// Adds, labels and removes files in one batch.
+    void runABatch() {
+        std::string commands;
+        for (std::size_t count = 1 + below(30); count > 0; --count) {
+            auto const file =
+                folderName(static_cast<int>(below(folders))) + "/made" + std::to_string(++made_);
+            auto const [category, label] = aLabel();
+            makeFile(file);
+            model_.add({file});
+            model_.put(category, label, file);
+            commands += "add " + file + "\nlabel put " + category + ' ' + label + " '" + file + "'\n";
+            if (below(3) == 0) {
+                commands += "remove " + file + '\n';
+                model_.remove(file);
+            }
+        }
+        succeed({"batch"}, commands);
+    }
+
     void removeFiles() {
         auto const files = someFiles(20);
         succeed({"remove", "-0"}, withZeros(files));
@@ -295,25 +314,16 @@ TEST_F(EndToEnd, everyCommandAgreesWithTheModel) {
     compareEverything();
 
     std::vector<std::function<void()>> const changes{
-        [this] { addNewFiles(); },
-        [this] { addAFolderAgain(); },
-        [this] { addFilesAgain(); },
-        [this] { addAFileAnew(); },
-        [this] { removeFiles(); },
-        [this] { removeAFolder(); },
-        [this] { deleteFromDisk(); },
-        [this] { putLabels(); },
-        [this] { putLabels(); },
-        [this] { takeLabels(); },
-        [this] { renameTheCategory(); },
-        [this] { createTheLabelAnew(); },
-        [this] { createTheCategoryAnew(); },
-        [this] { setAnEntry(); },
-        [this] { setAnEntry(); },
-        [this] { removeAnEntry(); },
-        [this] { renameTheGroup(); },
-        [this] { createTheGroupAnew(); },
-        [this] { addAndRemoveReferences(); },
+        [this] { addNewFiles(); },        [this] { addAFolderAgain(); },
+        [this] { addFilesAgain(); },      [this] { addAFileAnew(); },
+        [this] { runABatch(); },          [this] { removeFiles(); },
+        [this] { removeAFolder(); },      [this] { deleteFromDisk(); },
+        [this] { putLabels(); },          [this] { putLabels(); },
+        [this] { takeLabels(); },         [this] { renameTheCategory(); },
+        [this] { createTheLabelAnew(); }, [this] { createTheCategoryAnew(); },
+        [this] { setAnEntry(); },         [this] { setAnEntry(); },
+        [this] { removeAnEntry(); },      [this] { renameTheGroup(); },
+        [this] { createTheGroupAnew(); }, [this] { addAndRemoveReferences(); },
         [this] { changeTheTexts(); },
     };
     for (int step = 1; step <= steps && !HasFailure(); ++step) {
