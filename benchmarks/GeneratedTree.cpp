@@ -18,13 +18,30 @@ namespace {
 constexpr std::size_t filesInAFolder = 20;
 constexpr std::size_t foldersInAFolder = 50;
 
-std::string folderName(std::size_t number) {
-    return "module" + std::to_string(number / foldersInAFolder) + "/component" + std::to_string(number);
+constexpr std::size_t deepest = 100;
+
+std::filesystem::path folderOf(std::size_t file, std::size_t files, GeneratedTree::Shape shape) {
+    switch (shape) {
+    case GeneratedTree::Shape::Wide: {
+        auto const folder = file / filesInAFolder;
+        return "module" + std::to_string(folder / foldersInAFolder) + "/component" + std::to_string(folder);
+    }
+    case GeneratedTree::Shape::Flat:
+        return "folder";
+    case GeneratedTree::Shape::Deep: {
+        std::filesystem::path result = "level";
+        for (auto depth = file * deepest / files; depth > 0; --depth) {
+            result /= "level";
+        }
+        return result;
+    }
+    }
+    return {};
 }
 
 } // namespace
 
-GeneratedTree::GeneratedTree(std::size_t files) {
+GeneratedTree::GeneratedTree(std::size_t files, Shape shape) {
     auto pattern = (std::filesystem::temp_directory_path() / "project-benchmark-XXXXXX").string();
     if (mkdtemp(pattern.data()) == nullptr) {
         throw std::runtime_error("cannot create a temporary folder at " + pattern);
@@ -32,10 +49,12 @@ GeneratedTree::GeneratedTree(std::size_t files) {
     root_ = std::filesystem::canonical(pattern);
     rootPath_ = fl::filesystem::fromSystem(root_);
     std::fprintf(stderr, "creating %zu files in %s\n", files, root_.c_str());
+    std::filesystem::path lastFolder;
     for (std::size_t made = 0; made < files; ++made) {
-        auto const folder = root_ / folderName(made / filesInAFolder);
-        if (made % filesInAFolder == 0) {
+        auto const folder = root_ / folderOf(made, files, shape);
+        if (folder != lastFolder) {
             std::filesystem::create_directories(folder);
+            lastFolder = folder;
         }
         auto const file = folder / ("source_file_" + std::to_string(made) + ".cpp");
         std::ofstream(file).flush();
@@ -54,17 +73,24 @@ GeneratedTree const& GeneratedTree::large() {
 }
 
 fl::filesystem::Path GeneratedTree::createFile(std::string const& name) const {
-    auto const file = root_ / folderName(0) / name;
+    auto const file = fl::filesystem::toSystem(files_.front()).parent_path() / name;
     std::ofstream(file).flush();
     return fl::filesystem::fromSystem(file);
 }
 
-std::unique_ptr<management::ProjectManager> GeneratedTree::openProject() const {
+std::shared_ptr<stores::TreeMetadataManager> GeneratedTree::openStore() const {
     auto backend = std::make_unique<stores::TextBackend>(
         stores::makeSystemDisk(rootPath_, stores::TextBackend::folderName));
-    auto store = std::make_shared<stores::TreeMetadataManager>(
+    return std::make_shared<stores::TreeMetadataManager>(
         std::move(backend), rootPath_ / fl::filesystem::Path(stores::TextBackend::folderName));
-    return std::make_unique<management::ProjectManagerBase>(rootPath_, std::move(store));
+}
+
+std::unique_ptr<management::ProjectManager> GeneratedTree::openProject() const {
+    return std::make_unique<management::ProjectManagerBase>(rootPath_, openStore());
+}
+
+std::filesystem::path GeneratedTree::text() const {
+    return fl::filesystem::toSystem(stores::TextBackend::textPath(rootPath_));
 }
 
 void GeneratedTree::removeProject() const {

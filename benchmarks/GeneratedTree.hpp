@@ -7,13 +7,20 @@
 
 #include "fl/filesystem/Path.hpp"
 #include "project/core/ProjectManagerBase.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
 
 namespace project::benchmarks {
 
-/// A tree of folders with twenty empty files each, in a temporary folder. The destructor deletes it.
+/// A tree of folders with empty files, in a temporary folder. The destructor deletes it.
 class GeneratedTree {
 public:
-    explicit GeneratedTree(std::size_t files);
+    enum class Shape {
+        Wide, ///< folders of twenty files, fifty of them in a folder
+        Flat, ///< all files in one folder
+        Deep, ///< a hundred folders inside each other, with as many files in each
+    };
+
+    explicit GeneratedTree(std::size_t files, Shape shape = Shape::Wide);
     ~GeneratedTree();
     GeneratedTree(GeneratedTree const&) = delete;
     GeneratedTree& operator=(GeneratedTree const&) = delete;
@@ -28,11 +35,17 @@ public:
     /// The absolute paths of the files. Adding a file to a project also adds its folders.
     std::vector<fl::filesystem::Path> const& files() const { return files_; }
 
-    /// Creates one more file in the first folder.
+    /// Creates one more file in the folder of the first one.
     fl::filesystem::Path createFile(std::string const& name) const;
+
+    /// Opens the text store of the tree, like a new process.
+    std::shared_ptr<stores::TreeMetadataManager> openStore() const;
 
     /// Opens the project of the tree with the text store, like a new process.
     std::unique_ptr<management::ProjectManager> openProject() const;
+
+    /// The definition, whose time stamps each guard checks.
+    std::filesystem::path text() const;
 
     /// Deletes the project's definition.
     void removeProject() const;

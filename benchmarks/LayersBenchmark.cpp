@@ -4,7 +4,6 @@
 
 #include "GeneratedTree.hpp"
 #include "Process.hpp"
-#include "Ratios.hpp"
 #include "project/session.hpp"
 
 // The cost of source control and events compared with the managers alone, in a git repository: adding one
@@ -112,8 +111,8 @@ void addOneByGit(benchmark::State& state) {
         state.PauseTiming();
         std::ofstream(text, std::ios::app) << next;
         state.ResumeTiming();
-        runSilently(tree.onDisk(), {"git", "add", fl::filesystem::toSystem(files[next++]).string()});
-        runSilently(tree.onDisk(), {"git", "add", text.string()});
+        runSilently(tree.onDisk(),
+                    {"git", "add", fl::filesystem::toSystem(files[next++]).string(), text.string()});
     }
     for (auto const& file : files) {
         std::filesystem::remove(fl::filesystem::toSystem(file));
@@ -137,10 +136,10 @@ void addOneBare(benchmark::State& state) {
 
 [[maybe_unused]] bool const registered = [] {
     auto const once = [](benchmark::internal::Benchmark* made) {
-        made->Iterations(1)->Repetitions(3)->UseRealTime()->Unit(benchmark::kMillisecond);
+        made->Iterations(1)->UseRealTime()->Unit(benchmark::kMillisecond);
     };
     auto const often = [](benchmark::internal::Benchmark* made) {
-        made->Iterations(20)->Repetitions(3)->UseRealTime()->Unit(benchmark::kMillisecond);
+        made->Iterations(20)->UseRealTime()->Unit(benchmark::kMillisecond);
     };
     once(benchmark::RegisterBenchmark("layers/add-all/session", addAllInSession));
     once(benchmark::RegisterBenchmark("layers/add-all/bare", addAllBare));
@@ -151,15 +150,6 @@ void addOneBare(benchmark::State& state) {
     often(benchmark::RegisterBenchmark("layers/add-one/off", addOneInSession, SourceControl::Off));
     often(benchmark::RegisterBenchmark("layers/add-one/bare", addOneBare));
     often(benchmark::RegisterBenchmark("layers/add-one/git-add", addOneByGit));
-    Ratios::compare("100,000 files added in a session to the manager alone and git add",
-                    "layers/add-all/session", {"layers/add-all/bare", "layers/add-all/git-add"});
-    Ratios::compare("  the same to the manager alone", "layers/add-all/session", {"layers/add-all/bare"});
-    Ratios::compare("one file added in a session to the manager alone and git add of file and text",
-                    "layers/add-one/session", {"layers/add-one/bare", "layers/add-one/git-add"});
-    Ratios::compare("  the same to the manager alone", "layers/add-one/session", {"layers/add-one/bare"});
-    Ratios::compare("  the same with the text staged when asked", "layers/add-one/text-when-asked",
-                    {"layers/add-one/bare"});
-    Ratios::compare("  the same without source control", "layers/add-one/off", {"layers/add-one/bare"});
     return true;
 }();
 

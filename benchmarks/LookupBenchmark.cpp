@@ -1,8 +1,9 @@
+#include <sys/stat.h>
+
 #include <benchmark/benchmark.h>
 
 #include "GeneratedTree.hpp"
 #include "Process.hpp"
-#include "Ratios.hpp"
 #include "SqlitePeer.hpp"
 #include "project/core/FileManager.hpp"
 
@@ -23,6 +24,39 @@ void lookUpInProject(benchmark::State& state) {
     for (auto _ : state) {
         benchmark::DoNotOptimize(files.isFileInProject(tree.files()[next]));
         next = (next + stride) % tree.files().size();
+    }
+}
+
+void lookUpUnderAGuard(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillProject();
+    auto const store = tree.openStore();
+    management::ProjectManagerBase project(tree.root(), store);
+    auto const& files = project.getFileManager();
+    auto const guard = store->acquireReadLock();
+    benchmark::DoNotOptimize(files.getProjectFiles().size());
+    std::size_t next = 0;
+    for (auto _ : state) {
+        benchmark::DoNotOptimize(files.isFileInProject(tree.files()[next]));
+        next = (next + stride) % tree.files().size();
+    }
+}
+
+void statOnce(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillProject();
+    auto const text = tree.text();
+    for (auto _ : state) {
+        struct stat found;
+        benchmark::DoNotOptimize(::stat(text.c_str(), &found));
+    }
+}
+
+void nameByProcess(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    tree.fillProject();
+    for (auto _ : state) {
+        runSilently(tree.onDisk(), {PROJECTCTL, "name"});
     }
 }
 
@@ -64,15 +98,15 @@ void lookUpByGit(benchmark::State& state) {
 
 [[maybe_unused]] bool const registered = [] {
     benchmark::RegisterBenchmark("lookup/project", lookUpInProject)->UseRealTime();
+    benchmark::RegisterBenchmark("lookup/under-a-guard", lookUpUnderAGuard)->UseRealTime();
+    benchmark::RegisterBenchmark("lookup/stat", statOnce)->UseRealTime();
     benchmark::RegisterBenchmark("lookup/sqlite", lookUpInSqlite)->UseRealTime();
     auto const repeat = [](benchmark::internal::Benchmark* made) {
-        made->Iterations(5)->Repetitions(5)->UseRealTime()->Unit(benchmark::kMillisecond);
+        made->Iterations(5)->UseRealTime()->Unit(benchmark::kMillisecond);
     };
+    repeat(benchmark::RegisterBenchmark("name/projectctl", nameByProcess));
     repeat(benchmark::RegisterBenchmark("lookup/projectctl", lookUpByProcess));
     repeat(benchmark::RegisterBenchmark("lookup/git-ls-files", lookUpByGit));
-    Ratios::compare("isFileInProject to one SELECT by key", "lookup/project", {"lookup/sqlite"});
-    Ratios::compare("one file by a new projectctl to git ls-files of it", "lookup/projectctl",
-                    {"lookup/git-ls-files"});
     return true;
 }();
 
