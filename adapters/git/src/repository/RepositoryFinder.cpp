@@ -121,7 +121,12 @@ std::string RepositoryFinder::indexOfEnvironment() const {
     return file == nullptr ? std::string() : file;
 }
 
-RepositoryHandle RepositoryFinder::open() const {
+/// libgit2 is initialised here and not before, because it then reads the certificates of all authorities,
+/// even if it is never used: that takes longer than many a command of the tool.
+RepositoryHandle RepositoryFinder::open() {
+    if (!library_) {
+        library_.emplace();
+    }
     fl::filesystem::SystemName const root(root_);
     if (root.get() == nullptr) {
         return nullptr;

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <memory>
+#include <optional>
 
 #include "project/git/GitEnvironment.hpp"
 #include "repository/LibGit.hpp"
@@ -21,10 +22,10 @@ public:
     Repository* found() const noexcept { return repository_.get(); }
 
 private:
-    RepositoryHandle open() const;
+    RepositoryHandle open();
     std::string indexOfEnvironment() const;
 
-    LibGit library_; // outlives the repository
+    std::optional<LibGit> library_; ///< outlives the repository; initialised on first use
     fl::filesystem::Path root_;
     GitEnvironment environment_;
     std::unique_ptr<Repository> repository_;

@@ -34,7 +34,7 @@ public:
 
     class Batch;
 
-    /// Does not access the disk.
+    /// Does not access the disk, and does not initialise libgit2.
     /// @param root the folder of the project.
     explicit GitAdapter(Path const& root, GitEnvironment environment = GitEnvironment::Ignored);
     ~GitAdapter() override;
