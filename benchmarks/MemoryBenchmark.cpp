@@ -30,6 +30,7 @@ using project::stores::TextBackend;
 
 constexpr std::size_t filesInAFolder = 20;
 constexpr std::size_t foldersInAFolder = 50;
+constexpr double kibibyte = 1024;
 
 /// A value of this process in KiB, from the kernel's list: VmRSS now, or VmHWM at most.
 std::size_t memory(std::string const& name) {
@@ -97,41 +98,45 @@ std::vector<std::filesystem::path> createFiles(std::filesystem::path const& fold
     return files;
 }
 
+void print(std::size_t count, char const* work, std::size_t grown, double bytes, char const* of) {
+    std::printf("%10zu files, %-46s %9zu KiB, %5.2f times %s\n", count, work, grown,
+                static_cast<double>(grown) * kibibyte / bytes, of);
+}
+
 void measureAdding(std::filesystem::path const& folder, std::size_t count) {
     std::vector<Path> files;
     files.reserve(count);
-    std::size_t units = 0;
+    std::size_t bytes = 0; // all names are ASCII
     for (std::size_t number = 0; number < count; ++number) {
         files.push_back(fl::filesystem::fromSystem(folder / nameOf(number)));
-        units += files.back().native().size();
+        bytes += files.back().native().size();
     }
     Project project(folder);
     resetPeak();
     auto const before = memory("VmRSS");
     project.files().add(files);
-    auto const grown = memory("VmHWM") - before;
-    auto const bytes = static_cast<double>(units) * sizeof(char16_t) / 1024;
-    std::printf("%10zu  adding grows by at most %8zu KiB: %5.2f times the paths\n", count, grown,
-                static_cast<double>(grown) / bytes);
-    auto const left = memory("VmRSS") - before;
-    malloc_trim(0);
-    std::printf("%10zu  adding leaves %8zu KiB, %8zu KiB trimmed\n", count, left, memory("VmRSS") - before);
+    print(count, "adding them, at most", memory("VmHWM") - before, static_cast<double>(bytes), "the paths");
 }
 
+/// The growth includes the text and the tree. A list of all files is measured after that: the heap keeps most
+/// of its pages when it has been deleted, until malloc_trim returns them.
 void measureOpened(std::filesystem::path const& folder, std::size_t count) {
-    auto const text = std::filesystem::file_size(folder / ".projectdata" / "project.jsonl");
+    auto const text =
+        static_cast<double>(std::filesystem::file_size(folder / ".projectdata" / "project.jsonl"));
     Project project(folder);
     auto const before = memory("VmRSS");
+    for (std::size_t number = 0; number < count; ++number) {
+        if (!project.files().isFileInProject(fl::filesystem::fromSystem(folder / nameOf(number)))) {
+            throw std::runtime_error("a file is missing");
+        }
+    }
+    print(count, "opened, each queried", memory("VmRSS") - before, text, "the text");
     if (project.files().getProjectFiles().size() < count) {
         throw std::runtime_error("files are missing");
     }
-    auto const grown = memory("VmRSS") - before;
+    print(count, "then listed, the list deleted", memory("VmRSS") - before, text, "the text");
     malloc_trim(0);
-    auto const trimmed = memory("VmRSS") - before;
-    std::printf(
-        "%10zu  opened and listed: %8zu KiB: %5.2f times the text; without the heap's free pages: %5.2f\n",
-        count, grown, static_cast<double>(grown) * 1024 / static_cast<double>(text),
-        static_cast<double>(trimmed) * 1024 / static_cast<double>(text));
+    print(count, "then the heap's free pages returned", memory("VmRSS") - before, text, "the text");
 }
 
 void measure(std::size_t count) {
