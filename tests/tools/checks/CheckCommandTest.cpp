@@ -187,6 +187,9 @@ TEST_F(CheckCommand, notesANameWithABackslash) {
     EXPECT_THAT(linesOf(result.output),
                 UnorderedElementsAre(reports(R"(note: "back\slash" has a backslash in its name)"),
                                      reports(R"(note: "sub\folder" has a backslash in its name)")));
+    EXPECT_THAT(linesOf(tool({"status"}).output),
+                UnorderedElementsAre(StartsWith(R"(note "back\slash" has a backslash in its name)"),
+                                     StartsWith(R"(note "sub\folder" has a backslash in its name)")));
 }
 
 TEST_F(CheckCommand, findsLabelsOnFilesThatDoNotExist) {
