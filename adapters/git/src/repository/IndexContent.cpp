@@ -89,7 +89,7 @@ std::size_t IndexContent::readEntry(std::size_t offset) {
     if (version_ == 4) {
         return readName(name);
     }
-    auto const length = flags & nameLengthMask;
+    std::size_t const length = std::size_t{flags} & nameLengthMask;
     auto const zero = length < nameLengthMask ? name + length : endOfName(name);
     requireFormat(zero < end && bytes_[zero] == '\0');
     auto const next = offset + ((zero - offset + 8) & ~std::size_t{7});
