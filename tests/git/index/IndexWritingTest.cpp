@@ -1,10 +1,12 @@
 #include <array>
 #include <chrono>
+#include <csignal>
 #include <fstream>
 #include <functional>
 #include <set>
 #include <thread>
 
+#include <sys/resource.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -208,6 +210,44 @@ TEST_F(IndexWriting, aCallOfABatchThatFailsLeavesTheOthersPrepared) {
     EXPECT_THROW(add({"b", ".git./x"}), GitError);
     batch.publish();
     EXPECT_EQ(recordsOf(repository.run({"ls-files", "-z"})), std::vector<std::string>{"a"});
+}
+
+/// Limits the size of the files that this process may write.
+class FileSizeLimit {
+public:
+    explicit FileSizeLimit(rlim_t size) : earlierHandler_(std::signal(SIGXFSZ, SIG_IGN)) {
+        ::getrlimit(RLIMIT_FSIZE, &earlier_);
+        rlimit const limit{size, earlier_.rlim_max};
+        ::setrlimit(RLIMIT_FSIZE, &limit);
+    }
+
+    ~FileSizeLimit() {
+        ::setrlimit(RLIMIT_FSIZE, &earlier_);
+        std::signal(SIGXFSZ, earlierHandler_);
+    }
+
+    FileSizeLimit(FileSizeLimit const&) = delete;
+    FileSizeLimit& operator=(FileSizeLimit const&) = delete;
+
+private:
+    rlimit earlier_{};
+    void (*earlierHandler_)(int);
+};
+
+TEST_F(IndexWriting, anIndexForWhichThereIsNoSpaceFailsBeforeTheBatchIsPublished) {
+    std::vector<std::string> names;
+    for (int i = 0; i < 50; ++i) {
+        names.push_back("f" + std::to_string(i));
+        repository.write(names.back());
+    }
+    GitAdapter::Batch batch(adapter);
+    {
+        FileSizeLimit const limit(1000); // enough for each content, but not for the index
+        EXPECT_THROW(add(names), GitError);
+    }
+    batch.publish();
+    EXPECT_EQ(repository.index(), "");
+    expectNothingLeftBehind();
 }
 
 TEST_F(IndexWriting, anIndexWithAWrongChecksumIsReadAndNotWritten) {

@@ -82,8 +82,8 @@ IndexLock::~IndexLock() {
 
 void IndexLock::reserve(std::size_t size) const {
     Descriptor const file(newIndex_);
-    if (::fallocate(file.get(), 0, 0, static_cast<off_t>(size)) != 0 && errno != EOPNOTSUPP &&
-        errno != ENOSYS) {
+    bool const isReserved = ::fallocate(file.get(), 0, 0, static_cast<off_t>(size)) == 0;
+    if (!isReserved && (errno == ENOSPC || errno == EDQUOT || errno == EFBIG)) {
         throwUnwritable(newIndex_, errno);
     }
 }
