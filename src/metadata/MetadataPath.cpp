@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <atomic>
 #include <cstdint>
+#include <memory>
 #include <utility>
 
 #include "project/metadata/MetadataPathBuilder.hpp"
