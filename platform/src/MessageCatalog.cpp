@@ -44,6 +44,12 @@ std::string packageOf(std::string const& catalogName) {
     return found == all.packages.end() ? std::string() : found->second;
 }
 
+/// Whether ICU has written a text with its final zero. A text that just fits is written without it, and that
+/// is only a warning.
+bool isComplete(UErrorCode status) {
+    return U_SUCCESS(status) && status != U_STRING_NOT_TERMINATED_WARNING;
+}
+
 /// The name of ICU's bundle for a locale identifier, without keywords. Empty for any other text: a bundle is
 /// opened by this name, which must not be a path.
 std::string bundleName(std::string const& locale) {
@@ -51,8 +57,11 @@ std::string bundleName(std::string const& locale) {
     std::array<char, ULOC_FULLNAME_CAPACITY> base{};
     UErrorCode status = U_ZERO_ERROR;
     uloc_canonicalize(locale.c_str(), canonical.data(), canonical.size(), &status);
+    if (!isComplete(status)) {
+        return {};
+    }
     uloc_getBaseName(canonical.data(), base.data(), base.size(), &status);
-    if (U_FAILURE(status) || status == U_STRING_NOT_TERMINATED_WARNING) {
+    if (!isComplete(status)) {
         return {};
     }
     std::string name(base.data());
