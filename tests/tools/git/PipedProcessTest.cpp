@@ -1,5 +1,6 @@
 #include "git/PipedProcess.hpp"
 
+#include <cerrno>
 #include <csignal>
 #include <system_error>
 
