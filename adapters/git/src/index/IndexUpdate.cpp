@@ -5,6 +5,7 @@
 #include "index/IndexPatch.hpp"
 #include "project/git/GitError.hpp"
 #include "repository/DiskEntry.hpp"
+#include "repository/TrackedFiles.hpp"
 #include "states/EntryComparison.hpp"
 
 namespace project::git {
