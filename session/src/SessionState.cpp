@@ -18,7 +18,6 @@ using git::GitEnvironment;
 using management::CMAwareProjectManager;
 using management::DispatchableProjectEventBroadcaster;
 using management::EventBroadcastingProjectManager;
-using management::ProjectManager;
 using management::ProjectManagerBase;
 using metadata::MetadataPath;
 using stores::StoreError;

@@ -91,7 +91,8 @@ MetadataPath::MetadataPath(MetadataPath const& other) noexcept : step_(Step::use
 }
 
 MetadataPath& MetadataPath::operator=(MetadataPath const& other) noexcept {
-    Step::release(std::exchange(step_, Step::use(other.step_)));
+    MetadataPath copy(other);
+    std::swap(step_, copy.step_);
     return *this;
 }
 
