@@ -9,13 +9,14 @@ namespace {
 
 struct Position {
     std::size_t segment;
+    std::size_t size; ///< of the segment
     std::size_t offset;
 };
 
 Position positionOf(TypeTable::Index index) noexcept {
     std::size_t const number = std::size_t{index} + 1;
-    auto const segment = static_cast<std::size_t>(std::bit_width(number)) - 1;
-    return {segment, number - (std::size_t{1} << segment)};
+    std::size_t const size = std::bit_floor(number);
+    return {static_cast<std::size_t>(std::countr_zero(size)), size, number - size};
 }
 
 } // namespace
@@ -25,13 +26,13 @@ TypeTable::Index TypeTable::index(std::u16string_view type) {
         return found->second;
     }
     auto const index = static_cast<Index>(indexes_.size());
-    auto const [segment, offset] = positionOf(index);
+    auto const [segment, size, offset] = positionOf(index);
     if (segment == segmentCount) {
         throw std::length_error("the metadata tree has too many types");
     }
     auto& types = segments_[segment];
     if (!types) {
-        types = std::make_unique<std::u16string[]>(std::size_t{1} << segment);
+        types = std::make_unique<std::u16string[]>(size);
     }
     types[offset] = type;
     indexes_.emplace(types[offset], index);
@@ -39,8 +40,8 @@ TypeTable::Index TypeTable::index(std::u16string_view type) {
 }
 
 std::u16string const& TypeTable::operator[](Index index) const noexcept {
-    auto const [segment, offset] = positionOf(index);
-    return segments_[segment][offset];
+    auto const at = positionOf(index);
+    return segments_[at.segment][at.offset];
 }
 
 } // namespace project::stores
