@@ -139,6 +139,10 @@ bool ProjectText::append(std::string_view lines) {
     return tail.has_value();
 }
 
+std::string const& ProjectText::sum() const {
+    return state_->nextAfter();
+}
+
 std::string ProjectText::tailFor(Batch const& batch) const {
     return writeBatch(batch, state_->nextAfter());
 }

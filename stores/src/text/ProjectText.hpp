@@ -44,6 +44,10 @@ public:
     /// The same without differences, for a batch of this process. @return false if the text is unchanged.
     bool append(std::string_view lines);
 
+    /// The checksum to which the next batch chains: that of the last batch, or of the lines of the body. The
+    /// first call for a body takes time proportional to it.
+    std::string const& sum() const;
+
     /// The lines of a batch, including its closing line, to be appended to this text.
     /// @throws StoreError if an address or a node is too deep for the text.
     std::string tailFor(Batch const& batch) const;

@@ -233,4 +233,14 @@ std::string writeBatch(Batch const& batch, std::string_view after) {
     return text;
 }
 
+std::string_view closingSum(std::string_view lines) {
+    if (!lines.ends_with('\n')) {
+        return {};
+    }
+    lines.remove_suffix(1);
+    std::size_t const lineEnd = lines.rfind('\n');
+    auto const closing = readClosing(lines.substr(lineEnd == std::string_view::npos ? 0 : lineEnd + 1));
+    return closing ? closing->sum : std::string_view();
+}
+
 } // namespace project::stores

@@ -43,4 +43,7 @@ void applyTail(TextContent& content, TailReading const& tail);
 /// @throws StoreError if an address or a node of the batch is too deep for the text.
 std::string writeBatch(Batch const& batch, std::string_view after);
 
+/// The checksum in the closing line with which some lines end; empty if they do not end with one.
+std::string_view closingSum(std::string_view lines);
+
 } // namespace project::stores

@@ -29,6 +29,7 @@ int exitCodeFor(std::exception const& error) {
     case StoreError::Kind::Conflict:
         return exit_code::conflict;
     case StoreError::Kind::DiskFailed:
+    case StoreError::Kind::Unreachable:
         return exit_code::diskFailed;
     case StoreError::Kind::OutcomeUnknown:
         return exit_code::outcomeUnknown;

@@ -19,10 +19,11 @@ namespace project::stores {
 /// connection is lost; a lock that was lost with the connection is taken again before the next append. Every
 /// wait is bounded. The journal passes on what the server contains; JournalBackend verifies it.
 ///
-/// All operations throw StoreError. Its file() is name(). The kind is DiskFailed if the server or the network
-/// failed, Refused if a right is missing, the project does not exist on the server, the log has a later
-/// format, or the process is a fork of the one that opened the journal, and otherwise as each operation says.
-/// One thread at a time, except for awaitChange.
+/// All operations throw StoreError. Its file() is name(). The kind is Unreachable if the server cannot be
+/// reached or does not answer in time, DiskFailed if the server reports a failure of its own, such as a full
+/// disk, and Refused if a right is missing, the project does not exist on the server, the log has a later
+/// format, or the process is a fork of the one that opened the journal. Each operation lists further kinds.
+/// One thread at a time, except for awaitChange and wake.
 class PROJECT_STORES_EXPORT Journal {
 public:
     /// A server accepts no batch with more bytes. A longer one is committed with a body.
@@ -77,11 +78,14 @@ public:
     ///         any other kind it is not stored and never will be.
     virtual Appended append(NewJournalEntry const& entry) = 0;
 
-    /// Waits until another client has appended an entry. It may return early, and it may miss an entry: it
-    /// tells the caller when to check for changes and does not replace the check. The only operation that may
-    /// be called while another thread calls others. Returns early when the connection is lost.
+    /// Waits until another client has appended an entry. It may return early, for example when the connection
+    /// is lost, and it may miss an entry: it shows when to check for changes and does not replace the check.
+    /// May be called by one thread while another one calls other operations.
     /// @return false if the time has run out.
     virtual bool awaitChange(std::chrono::milliseconds time) = 0;
+
+    /// Makes awaitChange return, and the next call of it if none is waiting. May be called by any thread.
+    virtual void wake() noexcept = 0;
 
     /// Author and time of entries, the newest first. One round trip.
     /// @param before only entries with a smaller version; empty for the newest.

@@ -18,11 +18,12 @@ public:
     /// failed operation is not in the project.
     enum class Kind {
         Refused,    ///< not possible with these arguments, in this process or with this version; do not retry
-        Busy,       ///< another process holds the lock, or another program changed the text just now; retry
+        Busy,       ///< another process holds the lock, or changed the project just now; retry
         Damaged,    ///< the text is unreadable or incomplete, or something else is in the place of a store's
                     ///< file
         Conflict,   ///< the text contains conflict markers
         DiskFailed, ///< a system call failed: no space, no permission, an input/output error
+        Unreachable,   ///< the server of a shared project does not answer, or is starting; retry later
         OutcomeUnknown ///< the batch may be in the project or not; reopen the project and check
     };
 
