@@ -20,6 +20,7 @@ ROOMS = {
         "text": ["line", "node"],
         "merge": ["line", "node", "text"],
         "writing": ["line", "node", "text"],
+        "journal": ["line", "node", "text"],
     },
     "adapters/git/src": {
         "repository": [],

@@ -190,6 +190,11 @@ std::vector<Fault> const& ProjectText::faults() const noexcept {
     return state_->reading().faults;
 }
 
+bool ProjectText::hasFault(Fault::Kind kind) const noexcept {
+    return std::any_of(faults().begin(), faults().end(),
+                       [kind](Fault const& fault) { return fault.kind == kind; });
+}
+
 std::string ProjectText::damagedLines() const {
     std::string lines;
     for (auto const& [number, line] : state_->reading().damage) {

@@ -74,6 +74,7 @@ public:
 
     /// By line.
     std::vector<Fault> const& faults() const noexcept;
+    bool hasFault(Fault::Kind kind) const noexcept;
 
     /// The bytes of the damaged lines and batches, with their line ends.
     std::string damagedLines() const;

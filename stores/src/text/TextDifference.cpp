@@ -1,6 +1,8 @@
 #include "text/TextDifference.hpp"
 
 #include <algorithm>
+#include <iterator>
+#include <utility>
 #include <vector>
 
 #include "line/JsonText.hpp"
@@ -94,6 +96,12 @@ std::vector<Difference> differences(TextContent const& before, TextContent const
         addIfDifferent(found, address, before.at(address), after.at(address));
     }
     return found;
+}
+
+void addChanges(Changes& earlier, Changes later) {
+    earlier.everything = earlier.everything || later.everything;
+    earlier.differences.insert(earlier.differences.end(), std::make_move_iterator(later.differences.begin()),
+                               std::make_move_iterator(later.differences.end()));
 }
 
 } // namespace project::stores

@@ -15,4 +15,7 @@ std::vector<Difference> differences(TextContent const& before, TextContent const
 void addIfDifferent(std::vector<Difference>& found, Address const& address, AddressState const& before,
                     AddressState const& after);
 
+/// Appends later changes to earlier ones.
+void addChanges(Changes& earlier, Changes later);
+
 } // namespace project::stores

@@ -13,6 +13,9 @@
 
 namespace project::stores {
 
+/// No line of a batch is shorter than this: a name of one character in quotes, and the line's end.
+constexpr std::size_t shortestLine = 4;
+
 /// One valid batch of a tail.
 struct TailBatch {
     Batch changes;

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "project/stores/StoreError.hpp"
+#include "text/TextDifference.hpp"
 #include "writing/StoreFiles.hpp"
 
 namespace project::stores {
@@ -137,12 +138,6 @@ void SeenText::distrust() noexcept {
     if (seen_) {
         seen_->isReliable = false;
     }
-}
-
-void addChanges(Changes& earlier, Changes later) {
-    earlier.everything = earlier.everything || later.everything;
-    earlier.differences.insert(earlier.differences.end(), std::make_move_iterator(later.differences.begin()),
-                               std::make_move_iterator(later.differences.end()));
 }
 
 } // namespace project::stores

@@ -68,7 +68,4 @@ private:
     bool staysInFolder_ = false;
 };
 
-/// Appends later changes to earlier ones.
-void addChanges(Changes& earlier, Changes later);
-
 } // namespace project::stores

@@ -6,6 +6,8 @@
 
 #include "project/stores/StoreError.hpp"
 #include "text/ProjectText.hpp"
+#include "text/TextDifference.hpp"
+#include "text/TextTail.hpp"
 #include "writing/Leftovers.hpp"
 #include "writing/NewStore.hpp"
 #include "writing/SeenText.hpp"
@@ -25,15 +27,8 @@ Path TextBackend::textPath(Path const& projectRoot) {
 
 namespace {
 
-/// No line of a batch is shorter than this: a name of one character in quotes, and the line's end.
-constexpr std::size_t shortestLine = 4;
-
 char const* const resolveTheConflict =
     "Resolve the conflict with \"projectctl resolve\" or in an editor, and try again.";
-
-bool hasFault(ProjectText const& text, Fault::Kind kind) {
-    return std::ranges::find(text.faults(), kind, &Fault::kind) != text.faults().end();
-}
 
 /// A batch between write and keep: either the lines to append, or the new text.
 struct Pending {
@@ -318,14 +313,14 @@ std::string TextBackend::State::repair() {
 
 void TextBackend::State::resolve(std::string resolved) {
     auto const next = ProjectText::read(std::move(resolved), pathOfText());
-    if (!next || hasFault(*next, Fault::Kind::Damage) || hasFault(*next, Fault::Kind::Conflict)) {
+    if (!next || next->hasFault(Fault::Kind::Damage) || next->hasFault(Fault::Kind::Conflict)) {
         throw StoreError(StoreError::Kind::Refused, pathOfText(), 0,
                          "the new text is incomplete, damaged or contains conflict markers", "");
     }
     Unlocking const unlocking(*this);
     seen_.distrust();
     bool const isThere = lockAndCheck(options_.patience);
-    if (!isThere || !hasFault(seen_.text(), Fault::Kind::Conflict)) {
+    if (!isThere || !seen_.text().hasFault(Fault::Kind::Conflict)) {
         throw StoreError(StoreError::Kind::Refused, pathOfText(), 0, "the text contains no conflict markers",
                          "");
     }

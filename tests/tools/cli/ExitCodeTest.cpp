@@ -18,8 +18,9 @@ using ::testing::HasSubstr;
 
 TEST(ExitCode, differsForEachKindOfStoreError) {
     using Kind = StoreError::Kind;
-    std::map<Kind, int> const expected{{Kind::Refused, 1},  {Kind::Busy, 4},       {Kind::Damaged, 5},
-                                       {Kind::Conflict, 6}, {Kind::DiskFailed, 7}, {Kind::Unreachable, 7}, {Kind::OutcomeUnknown, 8}};
+    std::map<Kind, int> const expected{
+        {Kind::Refused, 1},    {Kind::Busy, 4},        {Kind::Damaged, 5},       {Kind::Conflict, 6},
+        {Kind::DiskFailed, 7}, {Kind::Unreachable, 7}, {Kind::OutcomeUnknown, 8}};
     for (auto const& [kind, code] : expected) {
         EXPECT_EQ(exitCodeFor(StoreError(kind, "file", 1, "problem", "Remedy.")), code);
     }

@@ -29,18 +29,16 @@ struct JournalPosition {
 /// lines of that batch too: a reader that has the state before applies them and computes the body, instead of
 /// fetching it.
 struct JournalEntry {
-    enum class Kind { Body, Batch };
-
     JournalPosition position;
-    Kind kind = Kind::Batch;
-    std::string after; ///< the sum of the entry before; empty for version 1
-    std::string lines; ///< with line ends; empty for a body without a batch, and where look leaves it out
+    bool isBody = false; ///< otherwise it is a batch
+    std::string after;   ///< the sum of the entry before; empty for version 1
+    std::string lines;   ///< with line ends; empty for a body without a batch, and where look leaves it out
 };
 
 /// An entry to be appended. The views are valid during the call that receives it.
 struct NewJournalEntry {
     JournalPosition position;
-    JournalEntry::Kind kind = JournalEntry::Kind::Batch;
+    bool isBody = false;
     std::string_view after;
     std::string_view lines; ///< at most Journal::longestBatch bytes
     std::string_view body;  ///< of a body, otherwise empty
@@ -49,7 +47,7 @@ struct NewJournalEntry {
 /// The author and time of an entry, for people.
 struct JournalRecord {
     JournalPosition position;
-    JournalEntry::Kind kind = JournalEntry::Kind::Batch;
+    bool isBody = false;
     std::string author;                         ///< the user as the server authenticated it
     std::string host;                           ///< as the author's client reported it; may be empty
     std::chrono::system_clock::time_point time; ///< by the server's clock
