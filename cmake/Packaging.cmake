@@ -9,6 +9,11 @@ install(EXPORT project_management NAMESPACE project:: DESTINATION "${package_fol
   FILE project_managementTargets.cmake)
 install(DIRECTORY platform/include/ include/ stores/include/ adapters/git/include/ session/include/
   DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+if(TARGET project_postgresql)
+  install(TARGETS project_postgresql EXPORT project_management LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}")
+  install(DIRECTORY adapters/postgresql/include/ DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
+  install(FILES adapters/postgresql/sql/setup.sql DESTINATION "${CMAKE_INSTALL_DATADIR}/project-management")
+endif()
 
 configure_package_config_file(packaging/project_managementConfig.cmake.in
   "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfig.cmake" INSTALL_DESTINATION "${package_folder}")

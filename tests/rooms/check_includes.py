@@ -28,6 +28,10 @@ ROOMS = {
         "states": ["repository", "rules"],
         "index": ["repository", "rules", "states"],
     },
+    "adapters/postgresql/src": {
+        "connection": [],
+        "journal": ["connection"],
+    },
     "tools/projectctl": {
         "output": [],
         "cli": ["output"],
