@@ -1,124 +1,21 @@
 #include <algorithm>
 #include <array>
-#include <optional>
 #include <ostream>
-#include <stdexcept>
-#include <tuple>
 #include <utility>
 
 #include <rapidcheck.h>
 
-#include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 #include "support/TextGenerators.hpp"
 #include "support/TextStore.hpp"
+#include "support/TreeModel.hpp"
 
 namespace project::test {
 
 namespace {
 
-using metadata::MetadataNode;
-using metadata::MetadataNodeSpecification;
 using stores::Node;
 using stores::TreeMetadataManager;
-using stores::samples::described;
-
-/// Fails the case, inside of rapidcheck and outside.
-void require(bool holds, char const* law) {
-    if (!holds) {
-        throw std::logic_error(law);
-    }
-}
-
-std::string firstDifference(Content const& wanted, Content const& found) {
-    for (auto const& [from, other, meaning] :
-         {std::tuple(&wanted, &found, "it lacks "), std::tuple(&found, &wanted, "it has ")}) {
-        for (auto const& entry : *from) {
-            if (auto const same = other->find(entry.first); same == other->end() || *same != entry) {
-                return meaning + testing::PrintToString(entry);
-            }
-        }
-    }
-    return "nothing differs";
-}
-
-/// The expected content of a store, as a plain map.
-class Model {
-public:
-    void set(std::map<Address, Node> const& nodes) {
-        for (auto const& [address, node] : nodes) {
-            content_[address] = described(node);
-        }
-    }
-
-    void remove(std::vector<Address> const& addresses) {
-        std::erase_if(content_, [&](auto const& entry) {
-            return std::any_of(addresses.begin(), addresses.end(),
-                               [&](Address const& address) { return entry.first.isWithin(address); });
-        });
-    }
-
-    void create(std::vector<Address> const& addresses) {
-        auto after = content_;
-        for (auto const& address : addresses) {
-            if (!exists(address)) {
-                after.emplace(address, "created");
-            }
-        }
-        content_ = std::move(after);
-    }
-
-    bool exists(Address const& address) const {
-        return std::any_of(content_.begin(), content_.end(),
-                           [&](auto const& entry) { return entry.first.isWithin(address); });
-    }
-
-    Content const& content() const { return content_; }
-
-private:
-    Content content_;
-};
-
-/// Collects all answers of a tree to the questions that managers ask.
-void ask(TreeMetadataManager& tree, Address const& address, Content& content) {
-    for (auto const& child : tree.getChildNodes(address)) {
-        require(tree.pathExists(child), "a child does not exist");
-        auto const node = tree.getNode(child);
-        require((node != nullptr) == tree.hasNode(child), "hasNode and getNode differ");
-        auto const before = content.size();
-        ask(tree, child, content);
-        if (node) {
-            content.emplace(child, described(*node));
-        } else if (content.size() == before) {
-            content.emplace(child, "created"); // it has no node and nothing below it
-        }
-    }
-}
-
-/// The content as ask collects it: an address that was created without a node is not in it if there is
-/// something below.
-Content visible(Content const& content) {
-    Content result;
-    for (auto entry = content.begin(); entry != content.end(); ++entry) {
-        auto const next = std::next(entry);
-        bool const isAbove = next != content.end() && next->first.isWithin(entry->first);
-        if (entry->second != "created" || !isAbove) {
-            result.insert(*entry);
-        }
-    }
-    return result;
-}
-
-/// A write in a transaction.
-struct PartialWrite {
-    enum class Kind { Set, Remove, Create };
-
-    Kind kind = Kind::Set;
-    std::map<Address, Node> nodes{};
-    std::vector<Address> addresses{};
-    bool isNested = false; ///< in a transaction of its own
-    bool isKept = true;    ///< otherwise the nested transaction is rolled back
-};
 
 struct Step {
     enum class Kind { Set, Remove, Create, Transaction, Reopen, Tidy, Check, PowerCut };
@@ -133,16 +30,6 @@ struct Step {
     std::size_t callsBefore = 0; ///< the calls before the fault
 };
 
-void showWrite(std::map<Address, Node> const& nodes, std::vector<Address> const& addresses,
-               std::ostream& out) {
-    for (auto const& [address, node] : nodes) {
-        out << "\n    " << testing::PrintToString(address) << " = " << described(node);
-    }
-    for (auto const& address : addresses) {
-        out << "\n    " << testing::PrintToString(address);
-    }
-}
-
 void showValue(Step const& step, std::ostream& out) {
     constexpr char const* kinds[] = {"Set",    "Remove", "Create", "Transaction",
                                      "Reopen", "Tidy",   "Check",  "PowerCut"};
@@ -153,29 +40,9 @@ void showValue(Step const& step, std::ostream& out) {
     }
     showWrite(step.nodes, step.addresses, out);
     for (auto const& write : step.writes) {
-        constexpr char const* writeKinds[] = {"Set", "Remove", "Create"};
-        out << "\n  " << writeKinds[static_cast<int>(write.kind)] << (write.isNested ? ", nested" : "")
-            << (write.isNested && !write.isKept ? ", rolled back" : "");
-        showWrite(write.nodes, write.addresses, out);
+        showValue(write, out);
     }
     out << (step.isCommitted ? "\n" : "\n  rolled back\n");
-}
-
-rc::Gen<std::map<Address, Node>> anyNodes() {
-    return rc::gen::map(
-        stores::samples::fewOf(6, rc::gen::pair(stores::samples::anyAddress(), stores::samples::anyNode())),
-        [](auto const& pairs) { return std::map<Address, Node>(pairs.begin(), pairs.end()); });
-}
-
-rc::Gen<PartialWrite> anyPartialWrite() {
-    using Kind = PartialWrite::Kind;
-    return rc::gen::build<PartialWrite>(
-        rc::gen::set(&PartialWrite::kind,
-                     rc::gen::weightedElement<Kind>({{4, Kind::Set}, {3, Kind::Remove}, {1, Kind::Create}})),
-        rc::gen::set(&PartialWrite::nodes, anyNodes()),
-        rc::gen::set(&PartialWrite::addresses, stores::samples::fewOf(3, stores::samples::anyAddress())),
-        rc::gen::set(&PartialWrite::isNested, rc::gen::arbitrary<bool>()),
-        rc::gen::set(&PartialWrite::isKept, rc::gen::arbitrary<bool>()));
 }
 
 rc::Gen<Step> anyStep() {
@@ -214,7 +81,7 @@ public:
     void take(Step const& step) {
         volume_->advance(3'000'000); // so that some steps share a tick and some do not
         volume_->plan(step.fault, step.callsBefore);
-        Model after = model_;
+        TreeModel after = model_;
         bool isDone = false;
         bool hasDied = false;
         bool isUnknown = false;
@@ -280,7 +147,7 @@ private:
             std::make_unique<TreeMetadataManager>(std::move(backend), u"/project/.projectdata");
     }
 
-    void perform(Step const& step, Model& after) {
+    void perform(Step const& step, TreeModel& after) {
         auto& tree = *trees_.at(step.process);
         switch (step.kind) {
         case Step::Kind::Set:
@@ -293,7 +160,7 @@ private:
             write(tree, {.kind = PartialWrite::Kind::Create, .addresses = step.addresses}, after);
             break;
         case Step::Kind::Transaction:
-            runTransaction(tree, step, after);
+            runTransaction(tree, step.writes, step.isCommitted, after);
             break;
         case Step::Kind::Reopen:
             reopen(step.process);
@@ -307,59 +174,6 @@ private:
         case Step::Kind::PowerCut:
             break;
         }
-    }
-
-    /// Changes the model first: the write may fail when it is already in the project.
-    static void write(TreeMetadataManager& tree, PartialWrite const& step, Model& after) {
-        auto addresses = step.addresses;
-        switch (step.kind) {
-        case PartialWrite::Kind::Set: {
-            std::map<Address, std::shared_ptr<MetadataNode>> nodes;
-            for (auto const& [address, node] : step.nodes) {
-                nodes.emplace(address, std::make_shared<MetadataNodeSpecification>(*node));
-            }
-            after.set(step.nodes);
-            tree.setNodes(nodes);
-            break;
-        }
-        case PartialWrite::Kind::Remove:
-            after.remove(step.addresses);
-            tree.removeNodes(addresses);
-            break;
-        case PartialWrite::Kind::Create:
-            after.create(step.addresses);
-            tree.createPaths(addresses);
-            break;
-        }
-    }
-
-    static void runTransaction(TreeMetadataManager& tree, Step const& step, Model& after) {
-        auto const before = after;
-        auto transaction = tree.transaction();
-        for (auto const& part : step.writes) {
-            auto const beforePart = after;
-            auto nested = part.isNested ? std::optional(tree.transaction()) : std::nullopt;
-            write(tree, part, after);
-            if (nested && part.isKept) {
-                nested->commit();
-            } else if (nested) {
-                after = beforePart;
-            }
-            nested.reset();
-            require(contentOf(tree) == visible(after.content()),
-                    "an operation in a transaction does not see the effects of the earlier ones");
-        }
-        if (step.isCommitted) {
-            transaction.commit();
-        } else {
-            after = before;
-        }
-    }
-
-    static Content contentOf(TreeMetadataManager& tree) {
-        Content content;
-        ask(tree, Address::root(), content);
-        return content;
     }
 
     /// A committed batch is durable, with one exception, which the store does not promise: it was appended
@@ -383,10 +197,10 @@ private:
 
     /// After the death of a process its batch is in the project or not, and all processes see the same. Until
     /// the next committed batch, a power cut may restore the other state.
-    void acceptOutcome(Model const& after) {
-        auto const found = visibleTo(0);
-        bool const isBefore = found == visible(model_.content());
-        require(isBefore || found == visible(after.content()),
+    void acceptOutcome(TreeModel const& after) {
+        auto const found = contentOf(*trees_[0]);
+        bool const isBefore = found == model_.visible();
+        require(isBefore || found == after.visible(),
                 "the project equals neither the state before the step nor the one after it");
         notDurable_.push_back(isBefore ? after : model_);
         if (!isBefore) {
@@ -394,7 +208,7 @@ private:
         }
     }
 
-    void cutPower(Model const& after) {
+    void cutPower(TreeModel const& after) {
         volume_->powerCut();
         hadPowerCut_ = true;
         mayLackName_ = false;
@@ -403,36 +217,23 @@ private:
         auto possible = std::exchange(notDurable_, {});
         possible.push_back(after);
         possible.push_back(model_);
-        auto const found = visibleTo(0);
-        auto const match = std::find_if(possible.begin(), possible.end(), [&](Model const& model) {
-            return found == visible(model.content());
-        });
+        auto const found = contentOf(*trees_[0]);
+        auto const match = std::find_if(possible.begin(), possible.end(),
+                                        [&](TreeModel const& model) { return found == model.visible(); });
         require(match != possible.end(), "the power cut lost a committed batch, or left a part of one");
         model_ = *match;
     }
 
-    Content visibleTo(std::size_t process) {
-        auto& tree = *trees_.at(process);
-        auto const guard = tree.acquireReadLock(); // one check for changes for all questions
-        return contentOf(tree);
-    }
-
-    void check(std::size_t process) {
-        auto const content = visibleTo(process);
-        auto const wanted = visible(model_.content());
-        if (content != wanted) {
-            throw std::logic_error("the project differs from the model: " + firstDifference(wanted, content));
-        }
-    }
+    void check(std::size_t process) { requireEqual(*trees_.at(process), model_); }
 
     TextBackend::Options const options_;
     std::shared_ptr<CrashingVolume> const volume_;
     std::array<TextBackend*, 2> backends_{};
     std::array<std::unique_ptr<TreeMetadataManager>, 2> trees_;
-    Model model_;
+    TreeModel model_;
     bool hadPowerCut_ = false;
     bool mayLackName_ = false; ///< a disk that failed for good could sync neither the folder nor a new text
-    std::vector<Model> notDurable_; ///< contents that a power cut may restore
+    std::vector<TreeModel> notDurable_; ///< contents that a power cut may restore
 };
 
 TEST(TextBackendModel, afterAnyHistoryOfTwoProcessesAProjectEqualsAPlainMap) {
