@@ -48,6 +48,8 @@ JournalServer::Entry& JournalServer::entry(std::uint64_t version) {
 }
 
 void JournalServer::resetTo(std::uint64_t version) {
+    dropConnections();
+    delayed_.reset();
     while (!entries_.empty() && entries_.back().read.position.version > version) {
         entries_.pop_back();
     }
@@ -151,7 +153,7 @@ JournalServer::InjectedFault JournalServer::nextFault(std::string const& call) {
 void JournalServer::delay(Entry const& entry) {
     std::lock_guard const guard(mutex_);
     delayed_ = entry;
-    delay_ = 1;
+    delay_ = callsBeforeLate;
 }
 
 void JournalServer::runDelayed() {

@@ -25,7 +25,7 @@ public:
         LostAfter,   ///< the connection is lost before the client gets the answer; the client connects again
         Unreachable, ///< the server gets neither this call nor a later one, until the plan is cancelled
         Stalls, ///< the server does the call, but the answer does not arrive, nor does that of a later call
-        StallsLate, ///< the same, and the server does an insert only after it has answered the next call
+        StallsLate, ///< the same, and the server does an insert only before a later call
         DiskFull,   ///< the server reports a failure, and the call has no effect
         DiesBefore, ///< the process of the client dies before the call
         DiesAfter,  ///< the process of the client dies after the call
@@ -44,6 +44,9 @@ public:
 
     /// Called before each call, to act as another client.
     std::function<void(std::string const& call)> beforeCall;
+
+    /// The calls that the server does before an insert that is late.
+    std::size_t callsBeforeLate = 1;
 
     /// Plans a fault for one call, after a number of others. Those that the client's process or the network
     /// does not survive last until the plan is cancelled.

@@ -46,9 +46,20 @@ void SeenLog::follow(JournalLook const& look, Changes& changes) {
     } else {
         bool const isCleaned =
             !look.entries.empty() && look.entries.front().position.version > position_.version;
-        std::uint64_t const seen = position_.version;
-        readAll(journal_.look(std::nullopt), changes);
-        noteLoss({isCleaned ? HistoryLoss::Kind::Cleaned : HistoryLoss::Kind::Reset, seen, newest_.version});
+        readAgain(isCleaned ? HistoryLoss::Kind::Cleaned : HistoryLoss::Kind::Reset, changes);
+    }
+}
+
+/// Reads a log that has lost the entry that was seen.
+void SeenLog::readAgain(HistoryLoss::Kind kind, Changes& changes) {
+    SeenLog now(journal_);
+    Changes ignored;
+    now.readAll(journal_.look(std::nullopt), ignored);
+    noteLoss({kind, position_.version, now.newest_.version});
+    newest_ = now.newest_;
+    damage_ = now.damage_;
+    if (now.hasRead_) {
+        replaceText(std::move(now.text_), now.position_, changes);
     }
 }
 

@@ -72,6 +72,7 @@ private:
     };
 
     void readAll(JournalLook const& look, Changes& changes);
+    void readAgain(HistoryLoss::Kind kind, Changes& changes);
     void readEarlier(JournalPosition const& damaged, Changes& changes);
     void apply(std::span<JournalEntry const> entries, Changes& changes);
     std::string applyBatch(JournalEntry const& entry, Changes& changes);

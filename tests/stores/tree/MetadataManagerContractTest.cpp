@@ -6,11 +6,13 @@
 
 #include "platform/LockTestThreads.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
+#include "project/stores/JournalBackend.hpp"
 #include "project/stores/MemoryBackend.hpp"
 #include "project/stores/StoreError.hpp"
 #include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
+#include "support/MemoryJournal.hpp"
 #include "support/TemporaryFolder.hpp"
 
 // The contract of every store: one suite that runs over each of them.
@@ -31,6 +33,18 @@ struct StoreKind {
     std::string name;
     std::function<std::unique_ptr<Backend>(Path const& root)> makeBackend;
 };
+
+/// A client of the server that has the project with this root.
+std::unique_ptr<Backend> makeJournalBackend(Path const& root, JournalBackend::Options options) {
+    static std::map<std::u16string, std::weak_ptr<test::JournalServer>> servers;
+    auto server = servers[root.native()].lock();
+    if (!server) {
+        server = std::make_shared<test::JournalServer>();
+        servers[root.native()] = server;
+    }
+    return std::make_unique<JournalBackend>(std::make_unique<test::MemoryJournal>(std::move(server)),
+                                            options);
+}
 
 MetadataPath at(std::vector<PathElement> elements) {
     return MetadataPath(std::move(elements));
@@ -425,7 +439,10 @@ INSTANTIATE_TEST_SUITE_P(
                               [](Path const& root) {
                                   return std::make_unique<TextBackend>(
                                       makeSystemDisk(root, stores::TextBackend::folderName));
-                              }}),
+                              }},
+                    StoreKind{"journal", [](Path const& root) { return makeJournalBackend(root, {}); }},
+                    StoreKind{"journalOfBodies",
+                              [](Path const& root) { return makeJournalBackend(root, {.shortTail = 0}); }}),
     [](auto const& kind) { return kind.param.name; });
 
 } // namespace

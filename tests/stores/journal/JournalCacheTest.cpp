@@ -1,0 +1,102 @@
+#include "support/JournalStore.hpp"
+
+namespace project::test {
+
+namespace {
+
+using stores::HistoryLoss;
+using testing::ElementsAre;
+
+/// A client that keeps the text between processes.
+class JournalCacheTest : public JournalStore {
+protected:
+    void SetUp() override {
+        prepare({u"a"});
+        contentOf(*openCached());
+        calls();
+    }
+
+    std::unique_ptr<JournalBackend> openCached(Options options = appending()) const {
+        return open(options, saved_);
+    }
+
+    std::shared_ptr<SavedText> const saved_ = std::make_shared<SavedText>();
+};
+
+TEST_F(JournalCacheTest, theNextProcessFetchesOnlyTheNewEntries) {
+    commit(*open(), {set(fileAddress(u"b"))});
+    auto const looked = server->entries().size();
+    auto const client = openCached();
+    calls();
+
+    EXPECT_EQ(contentOf(*client), files({u"a", u"b"}));
+
+    EXPECT_THAT(calls(), ElementsAre("look"));
+    EXPECT_EQ(looked, 2U);
+    EXPECT_EQ(saved_->cached->position.version, 1U) << "it is stored when the client closes";
+}
+
+TEST_F(JournalCacheTest, theFirstGuardSaysThatEverythingIsNew) {
+    auto const client = openCached();
+    EXPECT_TRUE(Entered(*client).changes().everything);
+}
+
+TEST_F(JournalCacheTest, bodyAndTailAreStoredWhenTheClientCloses) {
+    commit(*openCached(), {set(fileAddress(u"b"))});
+    EXPECT_EQ(saved_->cached->position, server->entry(2).read.position);
+    EXPECT_EQ(saved_->cached->text, textOf(addFiles({u"a"}), {addFiles({u"b"})}));
+
+    auto const& unchanged = saved_->cached->text;
+    auto const* const bytes = unchanged.data();
+    contentOf(*openCached());
+    EXPECT_EQ(saved_->cached->text.data(), bytes) << "an unchanged text is not stored again";
+}
+
+TEST_F(JournalCacheTest, aWrongCacheIsIgnored) {
+    commit(*openCached(), {set(fileAddress(u"b"))});
+    auto const right = *saved_->cached;
+    auto const expectIgnored = [&] {
+        EXPECT_EQ(contentOf(*openCached()), files({u"a", u"b"}));
+        EXPECT_FALSE(openCached()->takeHistoryLoss());
+    };
+    for (std::size_t position = 0; position < right.text.size(); ++position) {
+        saved_->cached = right;
+        saved_->cached->text[position] ^= 1;
+        expectIgnored();
+    }
+    saved_->cached = right;
+    saved_->cached->text.clear();
+    expectIgnored();
+    saved_->cached = right;
+    saved_->cached->position.sum = std::string(32, '0');
+    expectIgnored();
+    saved_->cached = right;
+    saved_->cached->position.version = 0;
+    expectIgnored();
+}
+
+TEST_F(JournalCacheTest, aResetOfTheServerBetweenTwoProcessesIsReported) {
+    commit(*openCached(), {set(fileAddress(u"b"))});
+    server->resetTo(1);
+    auto const client = openCached();
+
+    EXPECT_EQ(contentOf(*client), files({u"a"}));
+
+    auto const loss = client->takeHistoryLoss();
+    ASSERT_TRUE(loss);
+    EXPECT_EQ(loss->kind, HistoryLoss::Kind::Reset);
+    EXPECT_EQ(loss->seen, 2U);
+    EXPECT_EQ(loss->found, 1U);
+}
+
+TEST_F(JournalCacheTest, theCachedStateIsShownWhileTheServerIsUnreachableIfThatIsWanted) {
+    server->plan(Fault::Unreachable, 0);
+    EXPECT_EQ(errorOf([&] { contentOf(*openCached()); }).kind(), StoreError::Kind::Unreachable);
+    auto const client = openCached({.readsLastState = true});
+    EXPECT_EQ(contentOf(*client), files({u"a"}));
+    EXPECT_TRUE(client->isShowingLastState());
+}
+
+} // namespace
+
+} // namespace project::test
