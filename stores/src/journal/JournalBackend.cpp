@@ -76,7 +76,7 @@ private:
     void checkForReading();
     void checkForChanges();
     void lockAndCheck();
-    void follow(JournalLook const& look);
+    void follow(JournalLook look);
     void requireRead() const;
     void requireUndamaged() const;
     void requireNoReset();
@@ -155,15 +155,15 @@ void JournalBackend::State::checkForChanges() {
 
 void JournalBackend::State::lockAndCheck() {
     beginFromCache();
-    JournalLook const look = journal->lock(options_.patience, seen_.version());
+    JournalLook look = journal->lock(options_.patience, seen_.version());
     isLocked_ = true;
     isShowingLastState_ = false;
-    follow(look);
+    follow(std::move(look));
 }
 
-void JournalBackend::State::follow(JournalLook const& look) {
+void JournalBackend::State::follow(JournalLook look) {
     lastCheck_.reset();
-    seen_.follow(look, unreported_);
+    seen_.follow(std::move(look), unreported_);
     lastCheck_ = Clock::now();
 }
 

@@ -36,9 +36,9 @@ std::optional<std::uint64_t> SeenLog::version() const {
     return position_.version > 0 ? std::optional(position_.version) : std::nullopt;
 }
 
-void SeenLog::follow(JournalLook const& look, Changes& changes) {
+void SeenLog::follow(JournalLook look, Changes& changes) {
     if (position_.version == 0) {
-        readAll(look, changes);
+        readAll(std::move(look), changes);
     } else if (!look.entries.empty() && look.entries.front().position == position_) {
         newest_ = look.entries.back().position;
         damage_.reset();
@@ -92,7 +92,7 @@ void SeenLog::replaced(ProjectText text, JournalPosition position) {
 }
 
 /// Reads the result of a look without a version.
-void SeenLog::readAll(JournalLook const& look, Changes& changes) {
+void SeenLog::readAll(JournalLook look, Changes& changes) {
     damage_.reset();
     newest_ = look.entries.empty() ? JournalPosition() : look.entries.back().position;
     if (look.entries.empty()) {
@@ -106,7 +106,7 @@ void SeenLog::readAll(JournalLook const& look, Changes& changes) {
     if (!first.isBody) {
         body.problem = "no body precedes it";
     } else {
-        body = look.body ? readBody(*look.body, first.position) : fetchBody(first.position);
+        body = look.body ? readBody(*std::move(look.body), first.position) : fetchBody(first.position);
     }
     if (body.text) {
         replaceText(*std::move(body.text), first.position, changes);

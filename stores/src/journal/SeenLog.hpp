@@ -38,7 +38,7 @@ public:
 
     /// Applies the entries of a look from version(), and adds the differences to the changes. If it throws,
     /// the entries before the failure are applied.
-    void follow(JournalLook const& look, Changes& changes);
+    void follow(JournalLook look, Changes& changes);
 
     /// False until a text, perhaps an empty one, has been read.
     bool hasRead() const noexcept { return hasRead_; }
@@ -71,7 +71,7 @@ private:
         std::string problem;
     };
 
-    void readAll(JournalLook const& look, Changes& changes);
+    void readAll(JournalLook look, Changes& changes);
     void readAgain(HistoryLoss::Kind kind, Changes& changes);
     void readEarlier(JournalPosition const& damaged, Changes& changes);
     void apply(std::span<JournalEntry const> entries, Changes& changes);
