@@ -92,6 +92,7 @@ public:
     }
 
     void take(Step const& step) {
+        newestBefore_ = newestVersion();
         server_->plan(step.fault, step.callsBefore);
         TreeModel after = model_;
         Outcome outcome = Outcome::Failed;
@@ -197,6 +198,7 @@ private:
         auto const oldest = server_->entries().empty() ? 0 : server_->entries().front().read.position.version;
         auto const version = std::max<std::uint64_t>(newest - std::min<std::uint64_t>(newest, lost), oldest);
         server_->resetTo(version);
+        newestBefore_ = version;
         model_ = contents_[version];
         mayComeLate_.reset();
     }
@@ -272,7 +274,7 @@ private:
         if (loss) {
             ++losses_;
             require(loss->kind == *expected, "another loss is reported");
-            require(loss->found == newestVersion() || (mayHaveWritten && loss->found < newestVersion()),
+            require(loss->found >= newestBefore_ && loss->found <= newestVersion(),
                     "another version is reported");
         }
         auto const changes = tree.takeOthersChanges();
@@ -318,6 +320,7 @@ private:
     std::optional<TreeModel> mayComeLate_;        ///< the content if a batch is still stored
     std::map<std::uint64_t, TreeModel> contents_; ///< by version
     std::set<std::string> ids_;
+    std::uint64_t newestBefore_ = 0; ///< the newest version before the current step
     std::size_t batches_ = 0;
     std::size_t bodies_ = 0;
     std::size_t losses_ = 0;
