@@ -47,7 +47,7 @@ public:
 
     std::filesystem::path data() const { return folder() / "data"; }
 
-    /// A connection string. All users have the password `secret`.
+    /// A connection string. All users have the password `secret`; the user swift needs none.
     std::string connection(std::string const& user, std::string const& database = "projects") const;
 
     /// The same for a proxy in front of the server.
@@ -60,12 +60,16 @@ public:
     /// Runs a program of the server as its user. @throws std::runtime_error if it fails.
     void runProgram(std::vector<std::string> const& command) const;
 
+    /// Starts a program as the server's user. It ends with the result.
+    std::unique_ptr<RunningProgram> startProgram(std::vector<std::string> const& command) const;
+
     /// The full name of a program of the server.
     static std::string program(std::string const& name);
 
     static constexpr char const* superuser = "admin";
 
 private:
+    void allowWithoutPassword(std::string const& user);
     void configure(std::vector<std::string> const& settings);
     void awaitStart();
 

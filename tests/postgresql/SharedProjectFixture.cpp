@@ -32,7 +32,7 @@ test::PostgresServer& sharedServer() {
 void prepare(test::PostgresServer& server) {
     server.query("CREATE ROLE owner LOGIN CREATEROLE PASSWORD 'secret'");
     server.query("GRANT CREATE ON DATABASE projects TO owner");
-    for (auto const* user : {"anna", "ben", "rita", "eve"}) {
+    for (auto const* user : {"anna", "ben", "swift", "rita", "eve"}) {
         server.query("CREATE ROLE " + std::string(user) + " LOGIN PASSWORD 'secret'");
     }
     server.runProgram({test::PostgresServer::program("psql"), "--no-psqlrc", "--quiet", "--set",
@@ -61,7 +61,8 @@ SharedProject createProject(test::PostgresServer& server) {
     project.reader = "r_" + project.id;
     project.writer = "w_" + project.id;
     SharedProjects(settingsFor(server.connection("owner"))).create(project);
-    server.query("GRANT \"" + project.writer + "\" TO anna, ben; GRANT \"" + project.reader + "\" TO rita");
+    server.query("GRANT \"" + project.writer + "\" TO anna, ben, swift; GRANT \"" + project.reader +
+                 "\" TO rita");
     return project;
 }
 

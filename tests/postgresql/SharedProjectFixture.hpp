@@ -22,7 +22,7 @@ using stores::NewJournalEntry;
 using stores::StoreError;
 
 /// The server that all tests of the program share, with a database that setup.sql prepared for the user
-/// `owner`. The users anna, ben and rita exist, without any role.
+/// `owner`. The users anna, ben, swift, rita and eve exist, without any role.
 test::PostgresServer& sharedServer();
 
 /// Prepares the database `projects` of a server in the same way.
@@ -34,7 +34,7 @@ std::string newId();
 /// Settings with short limits.
 ServiceSettings settingsFor(std::string const& connection);
 
-/// A project in the database of a server, with roles of its own: anna and ben write, rita reads.
+/// A project in the database of a server, with roles of its own: anna, ben and swift write, rita reads.
 SharedProject createProject(test::PostgresServer& server);
 
 /// An entry that owns its texts.

@@ -95,13 +95,11 @@ std::vector<Result> Connection::run(std::vector<Call> const& calls, Limits const
         throwLost();
     }
     flush(limits);
-    auto results = receive(limits);
-    for (auto const& result : results) {
-        if (PQresultStatus(result.handle()) == PGRES_FATAL_ERROR) {
-            throwStatementError(where_, result.handle());
-        }
+    auto answers = receive(limits);
+    if (answers.failure) {
+        throwStatementError(where_, answers.failure->handle());
     }
-    return results;
+    return std::move(answers.results);
 }
 
 bool Connection::post(std::vector<Call> const& calls) noexcept {
@@ -178,13 +176,13 @@ bool Connection::sendOne(Call const& call) {
                                1) == 1;
 }
 
-std::vector<Result> Connection::receive(Limits const& limits) {
-    std::vector<Result> results;
+Connection::Answers Connection::receive(Limits const& limits) {
+    Answers answers;
     for (;;) {
         Result result(nextResult(limits));
         auto const status = PQresultStatus(result.handle());
         if (status == PGRES_PIPELINE_SYNC) {
-            return results;
+            return answers;
         }
         if (expected_.empty()) {
             throwLost();
@@ -192,10 +190,13 @@ std::vector<Result> Connection::receive(Limits const& limits) {
         char const* const preparedName = expected_.front();
         expected_.pop_front();
         bool const isError = status != PGRES_COMMAND_OK && status != PGRES_TUPLES_OK;
-        if (preparedName == nullptr) {
-            results.push_back(std::move(result));
-        } else if (isError) { // the statement itself reports an error, too
+        if (preparedName != nullptr && isError) {
             prepared_.erase(preparedName);
+        }
+        if (status == PGRES_FATAL_ERROR && !answers.failure) {
+            answers.failure = std::move(result);
+        } else if (preparedName == nullptr) {
+            answers.results.push_back(std::move(result));
         }
     }
 }

@@ -68,7 +68,13 @@ private:
     /// Sends calls and the end of their transaction. @return false if the connection was lost.
     bool send(std::vector<Call> const& calls, Limits const* limits);
     bool sendOne(Call const& call);
-    std::vector<Result> receive(Limits const& limits);
+
+    struct Answers {
+        std::vector<Result> results;
+        std::optional<Result> failure; ///< of the first statement that failed; the others were not executed
+    };
+
+    Answers receive(Limits const& limits);
     PGresult* nextResult(Limits const& limits);
     void flush(Limits const& limits);
     void waitFor(short events, Limits const& limits);

@@ -106,7 +106,7 @@ void throwConnectError(std::string const& where, std::string_view message) {
     if (!code.empty() && !isPassing(code)) {
         throwMeaning(where, code, shown);
     }
-    if (shown.find("certificate") != std::string::npos) {
+    if (shown.find("certificate") != std::string::npos || shown.find("support SSL") != std::string::npos) {
         throw StoreError(StoreError::Kind::Refused, where, 0, "the connection is not secure: " + shown,
                          "Check the certificates, and sslrootcert in libpq's configuration.");
     }
