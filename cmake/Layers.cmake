@@ -12,14 +12,17 @@ endif()
 
 find_package(Threads REQUIRED)
 
-# project_add_layer(<name> DEPENDS <targets>...)
+# project_add_layer(<name> DEPENDS <targets>... [LINK <targets>...])
 #
-# Creates a layer from the sources that its folders add to project_<name>_compiled:
+# Creates a layer from the sources that its folders add to project_<name>_compiled. DEPENDS lists the targets that its
+# public headers include, LINK those that its sources alone use.
 #   project_<name>_compiled  the objects, with hidden visibility
 #   project_<name>           the shared library of them, also as project::<name>
+#   project_<name>_static    an archive of them, for the tool: a program that is started for each command cannot wait
+#                            for the loader to bind a library for each layer
 #   project_<name>_objects   the same objects for tests, which may include headers of src/
 function(project_add_layer name)
-  cmake_parse_arguments(layer "" "" "DEPENDS;TEST_INCLUDES" ${ARGN})
+  cmake_parse_arguments(layer "" "" "DEPENDS;LINK;TEST_INCLUDES" ${ARGN})
   set(include_root "${CMAKE_CURRENT_SOURCE_DIR}/include")
   if(NOT EXISTS "${include_root}")
     set(include_root "${CMAKE_CURRENT_SOURCE_DIR}/../include") # the public headers of src/ are beside it
@@ -31,7 +34,7 @@ function(project_add_layer name)
     CXX_VISIBILITY_PRESET hidden VISIBILITY_INLINES_HIDDEN ON)
   target_include_directories(project_${name}_compiled
     PUBLIC "$<BUILD_INTERFACE:${include_root}>" PRIVATE ${layer_TEST_INCLUDES})
-  target_link_libraries(project_${name}_compiled PUBLIC ${layer_DEPENDS} PRIVATE project_build_options)
+  target_link_libraries(project_${name}_compiled PUBLIC ${layer_DEPENDS} PRIVATE ${layer_LINK} project_build_options)
 
   add_library(project_${name} SHARED "$<TARGET_OBJECTS:project_${name}_compiled>")
   add_library(project::${name} ALIAS project_${name})
@@ -40,8 +43,15 @@ function(project_add_layer name)
     INSTALL_RPATH "$ORIGIN") # installed libraries find each other in any folder
   target_include_directories(project_${name}
     PUBLIC "$<BUILD_INTERFACE:${include_root}>" "$<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>")
-  target_link_libraries(project_${name} PUBLIC ${layer_DEPENDS})
+  target_link_libraries(project_${name} PUBLIC ${layer_DEPENDS} PRIVATE ${layer_LINK})
   target_compile_features(project_${name} PUBLIC cxx_std_20)
+
+  list(TRANSFORM layer_DEPENDS REPLACE "^(project_.*)$" "\\1_static" OUTPUT_VARIABLE static_depends)
+  add_library(project_${name}_static STATIC EXCLUDE_FROM_ALL "$<TARGET_OBJECTS:project_${name}_compiled>")
+  set_target_properties(project_${name}_static PROPERTIES LINKER_LANGUAGE CXX)
+  target_include_directories(project_${name}_static PUBLIC "${include_root}")
+  target_link_libraries(project_${name}_static PUBLIC ${static_depends} PRIVATE ${layer_LINK})
+  target_compile_features(project_${name}_static PUBLIC cxx_std_20)
 endfunction()
 
 # project_add_objects(<name> LAYERS <layers>... DEPENDS <targets>... INCLUDES <folders>...)

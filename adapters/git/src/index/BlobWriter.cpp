@@ -15,18 +15,18 @@ namespace {
 constexpr auto action = "the file cannot be staged";
 constexpr off_t tooLargeForMemory = off_t{64} << 20;
 
-using FilterHandle = std::unique_ptr<git_filter_list, FreedBy<git_filter_list_free>>;
+using FilterHandle = std::unique_ptr<git_filter_list, FreedBy<&LibGitFunctions::git_filter_list_free>>;
 
 } // namespace
 
 BlobWriter::BlobWriter(Repository const& repository) : repository_(repository) {
-    std::string const folder = git_repository_commondir(repository.get()) + std::string("objects");
+    std::string const folder = libgit().git_repository_commondir(repository.get()) + std::string("objects");
     git_odb* objects = nullptr;
     git_odb_backend* backend = nullptr;
-    require(git_odb_new(&objects), folder, action);
+    require(libgit().git_odb_new(&objects), folder, action);
     objects_.reset(objects);
-    require(git_odb_backend_loose(&backend, folder.c_str(), -1, 0, 0, 0), folder, action);
-    if (auto const code = git_odb_add_backend(objects, backend, 1); code < 0) {
+    require(libgit().git_odb_backend_loose(&backend, folder.c_str(), -1, 0, 0, 0), folder, action);
+    if (auto const code = libgit().git_odb_add_backend(objects, backend, 1); code < 0) {
         backend->free(backend);
         require(code, folder, action);
     }
@@ -35,7 +35,7 @@ BlobWriter::BlobWriter(Repository const& repository) : repository_(repository) {
 bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isConverted, git_oid& id) {
     std::string const name = repository_.workTree().onDisk(path);
     if (S_ISREG(onDisk.st_mode) && onDisk.st_size > tooLargeForMemory) {
-        auto const code = git_blob_create_from_workdir(&id, repository_.get(), path.c_str());
+        auto const code = libgit().git_blob_create_from_workdir(&id, repository_.get(), path.c_str());
         require(code == GIT_ENOTFOUND ? 0 : code, name, action);
         return code == 0;
     }
@@ -57,20 +57,21 @@ bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isC
 std::string BlobWriter::convert(TreePath const& path, std::string const& content) const {
     std::string const name = repository_.workTree().onDisk(path);
     git_filter_list* filters = nullptr;
-    require(git_filter_list_load(&filters, repository_.get(), nullptr, path.c_str(), GIT_FILTER_TO_ODB,
-                                 GIT_FILTER_DEFAULT),
+    require(libgit().git_filter_list_load(&filters, repository_.get(), nullptr, path.c_str(),
+                                          GIT_FILTER_TO_ODB, GIT_FILTER_DEFAULT),
             name, action);
     FilterHandle const owned(filters);
     git_buf converted = GIT_BUF_INIT;
-    auto const code = git_filter_list_apply_to_buffer(&converted, filters, content.data(), content.size());
+    auto const code =
+        libgit().git_filter_list_apply_to_buffer(&converted, filters, content.data(), content.size());
     std::string result(converted.ptr == nullptr ? "" : converted.ptr, converted.size);
-    git_buf_dispose(&converted);
+    libgit().git_buf_dispose(&converted);
     require(code, name, action);
     return result;
 }
 
 void BlobWriter::store(TreePath const& path, std::string const& content, git_oid& id) const {
-    require(git_odb_write(&id, objects_.get(), content.data(), content.size(), GIT_OBJECT_BLOB),
+    require(libgit().git_odb_write(&id, objects_.get(), content.data(), content.size(), GIT_OBJECT_BLOB),
             repository_.workTree().onDisk(path), action);
 }
 

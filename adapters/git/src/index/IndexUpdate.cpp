@@ -62,12 +62,12 @@ void IndexUpdate::publish() {
 /// libgit2 checks the names: an index must not contain some that other systems treat as ".git".
 void IndexUpdate::requireValidNames(IndexChanges const& changes) const {
     git_index* created = nullptr;
-    require(git_index_new(&created), repository_.indexFile(), "the index cannot be written");
+    require(libgit().git_index_new(&created), repository_.indexFile(), "the index cannot be written");
     IndexHandle const checked(created);
     for (auto const& [path, staged] : changes.staged) {
         auto entry = staged;
         entry.path = path.c_str();
-        require(git_index_add(created, &entry), repository_.workTree().onDisk(path),
+        require(libgit().git_index_add(created, &entry), repository_.workTree().onDisk(path),
                 "the index cannot contain the file");
     }
 }

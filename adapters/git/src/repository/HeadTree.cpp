@@ -10,7 +10,7 @@ constexpr auto unreadable = "the last commit cannot be read";
 
 void HeadTree::refresh() {
     git_reference* head = nullptr;
-    auto const code = git_repository_head(&head, repository_);
+    auto const code = libgit().git_repository_head(&head, repository_);
     ReferenceHandle const owned(head);
     if (code == GIT_EUNBORNBRANCH || code == GIT_ENOTFOUND) {
         folders_.clear();
@@ -18,13 +18,14 @@ void HeadTree::refresh() {
         root_ = {};
         return;
     }
-    require(code, git_repository_path(repository_), unreadable);
+    require(code, libgit().git_repository_path(repository_), unreadable);
     git_object* found = nullptr;
-    require(git_reference_peel(&found, head, GIT_OBJECT_TREE), git_repository_path(repository_), unreadable);
+    require(libgit().git_reference_peel(&found, head, GIT_OBJECT_TREE),
+            libgit().git_repository_path(repository_), unreadable);
     TreeHandle tree(reinterpret_cast<git_tree*>(found));
-    if (folders_.empty() || git_oid_equal(git_tree_id(tree.get()), &root_) == 0) {
+    if (folders_.empty() || libgit().git_oid_equal(libgit().git_tree_id(tree.get()), &root_) == 0) {
         folders_.clear();
-        root_ = *git_tree_id(tree.get());
+        root_ = *libgit().git_tree_id(tree.get());
         folders_.try_emplace(TreePath(), std::move(tree));
     }
 }
@@ -32,8 +33,8 @@ void HeadTree::refresh() {
 git_tree_entry const* HeadTree::find(TreePath const& path) {
     auto* const tree = folder(parentOf(path));
     auto const* const entry =
-        tree == nullptr ? nullptr : git_tree_entry_byname(tree, std::string(nameOf(path)).c_str());
-    return entry == nullptr || git_tree_entry_type(entry) == GIT_OBJECT_TREE ? nullptr : entry;
+        tree == nullptr ? nullptr : libgit().git_tree_entry_byname(tree, std::string(nameOf(path)).c_str());
+    return entry == nullptr || libgit().git_tree_entry_type(entry) == GIT_OBJECT_TREE ? nullptr : entry;
 }
 
 git_tree* HeadTree::folder(TreePath const& path) {
@@ -47,13 +48,13 @@ git_tree* HeadTree::folder(TreePath const& path) {
 TreeHandle HeadTree::load(TreePath const& path) {
     auto* const above = folder(parentOf(path));
     auto const* const entry =
-        above == nullptr ? nullptr : git_tree_entry_byname(above, std::string(nameOf(path)).c_str());
-    if (entry == nullptr || git_tree_entry_type(entry) != GIT_OBJECT_TREE) {
+        above == nullptr ? nullptr : libgit().git_tree_entry_byname(above, std::string(nameOf(path)).c_str());
+    if (entry == nullptr || libgit().git_tree_entry_type(entry) != GIT_OBJECT_TREE) {
         return nullptr;
     }
     git_tree* tree = nullptr;
-    require(git_tree_lookup(&tree, repository_, git_tree_entry_id(entry)), git_repository_path(repository_),
-            unreadable);
+    require(libgit().git_tree_lookup(&tree, repository_, libgit().git_tree_entry_id(entry)),
+            libgit().git_repository_path(repository_), unreadable);
     return TreeHandle(tree);
 }
 

@@ -161,7 +161,7 @@ git_index_entry IndexContent::at(std::size_t position) const noexcept {
     result.uid = number(7);
     result.gid = number(8);
     result.file_size = number(9);
-    git_oid_fromraw(&result.id, reinterpret_cast<unsigned char const*>(entry + 40));
+    libgit().git_oid_fromraw(&result.id, reinterpret_cast<unsigned char const*>(entry + 40));
     result.flags = flagsAt(entry + flagsOffset);
     result.flags_extended = (result.flags & isExtended) != 0 ? flagsAt(entry + entrySize) : std::uint16_t{0};
     result.path = pathAt(position);

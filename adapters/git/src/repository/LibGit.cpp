@@ -15,30 +15,30 @@ namespace {
 /// user, for example after `su` without a login.
 void ignoreUnreadable(git_config_level_t level, char const* file) {
     git_buf folder = GIT_BUF_INIT;
-    if (git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, level, &folder) != 0) {
+    if (libgit().git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, level, &folder) != 0) {
         return;
     }
     auto const name = std::string(folder.ptr, folder.size) + '/' + file;
     if (folder.size > 0 && access(name.c_str(), R_OK) != 0 && errno == EACCES) {
-        git_libgit2_opts(GIT_OPT_SET_SEARCH_PATH, level, "");
+        libgit().git_libgit2_opts(GIT_OPT_SET_SEARCH_PATH, level, "");
     }
-    git_buf_dispose(&folder);
+    libgit().git_buf_dispose(&folder);
 }
 
 } // namespace
 
 LibGit::LibGit() {
-    require(git_libgit2_init(), "", "libgit2 cannot be used");
+    require(libgit().git_libgit2_init(), "", "libgit2 cannot be used");
     ignoreUnreadable(GIT_CONFIG_LEVEL_GLOBAL, ".gitconfig");
     ignoreUnreadable(GIT_CONFIG_LEVEL_XDG, "config");
 }
 
 LibGit::~LibGit() {
-    git_libgit2_shutdown();
+    libgit().git_libgit2_shutdown();
 }
 
 void throwLibGitError(std::string const& file, std::string const& action, std::string const& remedy) {
-    auto const* const error = git_error_last();
+    auto const* const error = libgit().git_error_last();
     throw GitError(GitError::Kind::Failed, file,
                    action + (error == nullptr ? "" : ": " + std::string(error->message)), remedy);
 }
@@ -51,8 +51,8 @@ void require(int code, std::string const& file, char const* action) {
 
 bool isRepositoryFound(std::string const& folder, std::string const& ceiling) {
     git_buf found = GIT_BUF_INIT;
-    bool const isFound = git_repository_discover(&found, folder.c_str(), 0, ceiling.c_str()) == 0;
-    git_buf_dispose(&found);
+    bool const isFound = libgit().git_repository_discover(&found, folder.c_str(), 0, ceiling.c_str()) == 0;
+    libgit().git_buf_dispose(&found);
     return isFound;
 }
 

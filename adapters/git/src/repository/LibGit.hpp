@@ -5,6 +5,8 @@
 
 #include <git2.h>
 
+#include "repository/LibGitFunctions.hpp"
+
 namespace project::git {
 
 /// Initialises libgit2 for its lifetime. Several objects may exist: libgit2 counts them.
@@ -20,18 +22,18 @@ template <auto Free>
 struct FreedBy {
     template <typename T>
     void operator()(T* object) const noexcept {
-        Free(object);
+        (libgit().*Free)(object);
     }
 };
 
-using RepositoryHandle = std::unique_ptr<git_repository, FreedBy<git_repository_free>>;
-using IndexHandle = std::unique_ptr<git_index, FreedBy<git_index_free>>;
-using ConfigHandle = std::unique_ptr<git_config, FreedBy<git_config_free>>;
-using ReferenceHandle = std::unique_ptr<git_reference, FreedBy<git_reference_free>>;
-using ObjectHandle = std::unique_ptr<git_object, FreedBy<git_object_free>>;
-using OdbHandle = std::unique_ptr<git_odb, FreedBy<git_odb_free>>;
-using BlobHandle = std::unique_ptr<git_blob, FreedBy<git_blob_free>>;
-using TreeHandle = std::unique_ptr<git_tree, FreedBy<git_tree_free>>;
+using RepositoryHandle = std::unique_ptr<git_repository, FreedBy<&LibGitFunctions::git_repository_free>>;
+using IndexHandle = std::unique_ptr<git_index, FreedBy<&LibGitFunctions::git_index_free>>;
+using ConfigHandle = std::unique_ptr<git_config, FreedBy<&LibGitFunctions::git_config_free>>;
+using ReferenceHandle = std::unique_ptr<git_reference, FreedBy<&LibGitFunctions::git_reference_free>>;
+using ObjectHandle = std::unique_ptr<git_object, FreedBy<&LibGitFunctions::git_object_free>>;
+using OdbHandle = std::unique_ptr<git_odb, FreedBy<&LibGitFunctions::git_odb_free>>;
+using BlobHandle = std::unique_ptr<git_blob, FreedBy<&LibGitFunctions::git_blob_free>>;
+using TreeHandle = std::unique_ptr<git_tree, FreedBy<&LibGitFunctions::git_tree_free>>;
 
 /// Throws a GitError with the message of libgit2's last error.
 /// @param file the file or folder concerned.

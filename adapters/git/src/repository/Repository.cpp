@@ -14,7 +14,7 @@ namespace {
 
 ConfigHandle configOf(git_repository* repository) {
     git_config* config = nullptr;
-    require(git_repository_config(&config, repository), git_repository_path(repository),
+    require(libgit().git_repository_config(&config, repository), libgit().git_repository_path(repository),
             "the configuration cannot be read");
     return ConfigHandle(config);
 }
@@ -25,10 +25,10 @@ Repository::Repository(RepositoryHandle handle, fl::filesystem::Path const& proj
                        std::string indexFile)
     : handle_(std::move(handle)),
       config_(configOf(handle_.get())),
-      indexFile_(indexFile.empty() ? git_repository_path(handle_.get()) + std::string("index")
+      indexFile_(indexFile.empty() ? libgit().git_repository_path(handle_.get()) + std::string("index")
                                    : std::move(indexFile)),
       head_(handle_.get()),
-      workTree_(git_repository_workdir(handle_.get()), projectRoot),
+      workTree_(libgit().git_repository_workdir(handle_.get()), projectRoot),
       configuration_(stampConfiguration()) {
     addWorkTreeConfiguration();
     settings_ = {isSet("core.fileMode", true), isSet("core.symlinks", true),
@@ -36,16 +36,17 @@ Repository::Repository(RepositoryHandle handle, fl::filesystem::Path const& proj
 }
 
 std::array<FileStamp, 2> Repository::stampConfiguration() const {
-    return {FileStamp::of(git_repository_commondir(get()) + std::string("config")),
-            FileStamp::of(git_repository_path(get()) + std::string("config.worktree"))};
+    return {FileStamp::of(libgit().git_repository_commondir(get()) + std::string("config")),
+            FileStamp::of(libgit().git_repository_path(get()) + std::string("config.worktree"))};
 }
 
 // git stores the settings of a sparse checkout in a file that libgit2 does not read before version 1.8.
 void Repository::addWorkTreeConfiguration() {
-    std::string const file = git_repository_path(get()) + std::string("config.worktree");
+    std::string const file = libgit().git_repository_path(get()) + std::string("config.worktree");
     if (isSet("extensions.worktreeConfig", false) && FileStamp::of(file) != FileStamp()) {
-        require(git_config_add_file_ondisk(config_.get(), file.c_str(), GIT_CONFIG_LEVEL_APP, get(), 1), file,
-                "the configuration cannot be read");
+        require(
+            libgit().git_config_add_file_ondisk(config_.get(), file.c_str(), GIT_CONFIG_LEVEL_APP, get(), 1),
+            file, "the configuration cannot be read");
     }
 }
 
@@ -83,24 +84,26 @@ void Repository::showIndex(std::shared_ptr<IndexContent const> content, FileStam
 
 bool Repository::isSet(std::string const& name, bool isSetByDefault) const {
     int value = 0;
-    return git_config_get_bool(&value, config_.get(), name.c_str()) == 0 ? value != 0 : isSetByDefault;
+    return libgit().git_config_get_bool(&value, config_.get(), name.c_str()) == 0 ? value != 0
+                                                                                  : isSetByDefault;
 }
 
 std::string Repository::configured(std::string const& name) const {
-    return textOf(name, git_config_get_string_buf);
+    return textOf(name, libgit().git_config_get_string_buf);
 }
 
 std::string Repository::configuredPath(std::string const& name) const {
-    return textOf(name, git_config_get_path);
+    return textOf(name, libgit().git_config_get_path);
 }
 
 std::string Repository::usersFile(char const* name) const {
     git_buf folder = GIT_BUF_INIT;
     std::string result;
-    if (git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, GIT_CONFIG_LEVEL_XDG, &folder) == 0 && folder.size > 0) {
+    if (libgit().git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, GIT_CONFIG_LEVEL_XDG, &folder) == 0 &&
+        folder.size > 0) {
         result = std::string(folder.ptr, folder.size) + '/' + name;
     }
-    git_buf_dispose(&folder);
+    libgit().git_buf_dispose(&folder);
     return result;
 }
 
@@ -110,13 +113,13 @@ std::string Repository::contentOf(TreePath const& path) const {
     }
     auto const entry = trackedAt(index(), path);
     git_blob* blob = nullptr;
-    if (!entry || git_index_entry_is_conflict(&*entry) != 0 ||
-        git_blob_lookup(&blob, get(), &entry->id) != 0) {
+    if (!entry || libgit().git_index_entry_is_conflict(&*entry) != 0 ||
+        libgit().git_blob_lookup(&blob, get(), &entry->id) != 0) {
         return {};
     }
     BlobHandle const owned(blob);
-    return {static_cast<char const*>(git_blob_rawcontent(blob)),
-            static_cast<std::size_t>(git_blob_rawsize(blob))};
+    return {static_cast<char const*>(libgit().git_blob_rawcontent(blob)),
+            static_cast<std::size_t>(libgit().git_blob_rawsize(blob))};
 }
 
 std::string Repository::textOf(std::string const& name, TextGetter read) const {
@@ -125,7 +128,7 @@ std::string Repository::textOf(std::string const& name, TextGetter read) const {
     if (read(&value, config_.get(), name.c_str()) == 0) {
         result.assign(value.ptr, value.size);
     }
-    git_buf_dispose(&value);
+    libgit().git_buf_dispose(&value);
     return result;
 }
 

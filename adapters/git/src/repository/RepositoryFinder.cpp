@@ -4,8 +4,6 @@
 #include <filesystem>
 #include <utility>
 
-#include <git2/sys/repository.h>
-
 #include "fl/filesystem/SystemName.hpp"
 #include "project/git/GitError.hpp"
 
@@ -23,7 +21,7 @@ namespace {
 /// @return null if there is none.
 RepositoryHandle openAround(char const* root) {
     git_repository* found = nullptr;
-    auto const code = git_repository_open_ext(&found, root, 0, nullptr);
+    auto const code = libgit().git_repository_open_ext(&found, root, 0, nullptr);
     // libgit2 1.5.1 reports a repository of another user as missing, unless the configuration has a
     // `safe.directory` for some other repository.
     if (code == GIT_EOWNER || (code == GIT_ENOTFOUND && isRepositoryFound(root))) {
@@ -38,18 +36,18 @@ RepositoryHandle openAround(char const* root) {
 RepositoryHandle openNamed(char const* repository) {
     git_repository* found = nullptr;
     auto const flags = GIT_REPOSITORY_OPEN_NO_SEARCH | GIT_REPOSITORY_OPEN_NO_DOTGIT;
-    require(git_repository_open_ext(&found, repository, flags, nullptr), repository,
+    require(libgit().git_repository_open_ext(&found, repository, flags, nullptr), repository,
             "the repository that GIT_DIR names cannot be opened");
     return RepositoryHandle(found);
 }
 
 void setWorkTreeTo(git_repository* repository, std::filesystem::path const& folder) {
-    auto const* const current = git_repository_workdir(repository);
+    auto const* const current = libgit().git_repository_workdir(repository);
     std::error_code missing;
     if (current != nullptr && std::filesystem::equivalent(current, folder, missing)) {
         return; // libgit2 1.5.1 leaks memory when it is given the folder that it already has
     }
-    require(git_repository_set_workdir(repository, folder.c_str(), 0), folder,
+    require(libgit().git_repository_set_workdir(repository, folder.c_str(), 0), folder,
             "the work tree cannot be used");
 }
 
@@ -61,14 +59,14 @@ void setWorkTree(git_repository* repository) {
         return;
     }
     git_config* config = nullptr;
-    require(git_repository_config(&config, repository), git_repository_path(repository),
+    require(libgit().git_repository_config(&config, repository), libgit().git_repository_path(repository),
             "the configuration cannot be read");
     ConfigHandle const owned(config);
     git_config_entry* entry = nullptr;
     int isBare = 0;
-    bool const isConfigured = git_config_get_entry(&entry, config, "core.worktree") == 0;
-    git_config_entry_free(entry);
-    if (!isConfigured && (git_config_get_bool(&isBare, config, "core.bare") != 0 || isBare == 0)) {
+    bool const isConfigured = libgit().git_config_get_entry(&entry, config, "core.worktree") == 0;
+    libgit().git_config_entry_free(entry);
+    if (!isConfigured && (libgit().git_config_get_bool(&isBare, config, "core.bare") != 0 || isBare == 0)) {
         setWorkTreeTo(repository, std::filesystem::current_path());
     }
 }
@@ -76,9 +74,9 @@ void setWorkTree(git_repository* repository) {
 /// For libgit2, which reads attributes from the index.
 void setIndex(git_repository* repository, char const* file) {
     git_index* index = nullptr;
-    require(git_index_open(&index, file), file, "the index cannot be read");
+    require(libgit().git_index_open(&index, file), file, "the index cannot be read");
     IndexHandle const owned(index);
-    require(git_repository_set_index(repository, index), file, "the index cannot be used");
+    require(libgit().git_repository_set_index(repository, index), file, "the index cannot be used");
 }
 
 /// libgit2 1.5 can read these variables itself, but returns an error if GIT_WORK_TREE is set.
@@ -105,7 +103,7 @@ Repository* RepositoryFinder::find() {
     if (repository_ == nullptr || !repository_->isAsOpened()) {
         repository_ = nullptr;
         auto handle = open();
-        if (handle == nullptr || git_repository_workdir(handle.get()) == nullptr) {
+        if (handle == nullptr || libgit().git_repository_workdir(handle.get()) == nullptr) {
             return nullptr;
         }
         repository_ = std::make_unique<Repository>(std::move(handle), root_, indexOfEnvironment());

@@ -18,7 +18,7 @@ std::vector<AttributeLine> readLines(std::string const& file) {
 AttributeRules::AttributeRules(Repository const& repository)
     : repository_(repository),
       isCaseIgnored_(repository.isSet("core.ignoreCase", false)),
-      own_(readLines(git_repository_commondir(repository.get()) + std::string("info/attributes"))) {
+      own_(readLines(libgit().git_repository_commondir(repository.get()) + std::string("info/attributes"))) {
     std::string const configured = repository.configuredPath("core.attributesFile");
     general_ = {readLines(configured.empty() ? repository.usersFile("attributes") : configured),
                 readLines(ofSystem), readAttributeLines(builtIn)};

@@ -20,7 +20,7 @@ AttributeValue valueOf(AttributeRules::Values const& values, std::string_view na
 
 /// From libgit2's form.
 AttributeValue valueFrom(char const* attribute) {
-    switch (git_attr_value(attribute)) {
+    switch (libgit().git_attr_value(attribute)) {
     case GIT_ATTR_VALUE_TRUE:
         return {AttributeValue::Kind::Set};
     case GIT_ATTR_VALUE_FALSE:
@@ -63,8 +63,8 @@ Conversion ContentRules::conversionOf(TreePath const& path) {
 bool ContentRules::isKnownToLibGit(TreePath const& path, AttributeRules::Values const& values) const {
     auto names = converting;
     std::array<char const*, converting.size()> found{};
-    require(git_attr_get_many(found.data(), repository_.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX, path.c_str(),
-                              names.size(), names.data()),
+    require(libgit().git_attr_get_many(found.data(), repository_.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX,
+                                       path.c_str(), names.size(), names.data()),
             repository_.workTree().onDisk(path), "the attributes of the file cannot be read");
     bool const isTextGiven = valueOf(values, "text") != AttributeValue();
     return std::equal(names.begin(), names.end(), found.begin(),

@@ -52,8 +52,8 @@ std::optional<IgnoreLine> IgnoreLine::read(std::string_view line) {
 IgnoreRules::IgnoreRules(Repository const& repository)
     : repository_(repository), isCaseIgnored_(repository.isSet("core.ignoreCase", false)) {
     std::string const configured = repository.configuredPath("core.excludesFile");
-    general_.push_back(
-        readLines(git_repository_commondir(repository.get()) + std::string("info/exclude"), Links::Followed));
+    general_.push_back(readLines(
+        libgit().git_repository_commondir(repository.get()) + std::string("info/exclude"), Links::Followed));
     general_.push_back(
         readLines(configured.empty() ? repository.usersFile("ignore") : configured, Links::Followed));
 }

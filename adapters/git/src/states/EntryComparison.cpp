@@ -34,7 +34,7 @@ bool isAsYoungAs(git_index_entry const& entry, FileStamp const& index) {
 /// @return false if it cannot be read.
 bool hashLink(git_oid& result, std::string const& name) {
     auto const target = readLink(name);
-    return target && git_odb_hash(&result, target->data(), target->size(), GIT_OBJECT_BLOB) == 0;
+    return target && libgit().git_odb_hash(&result, target->data(), target->size(), GIT_OBJECT_BLOB) == 0;
 }
 
 } // namespace
@@ -68,10 +68,10 @@ bool EntryComparison::isContentModified(git_index_entry const& entry, struct sta
     if (S_ISLNK(onDisk.st_mode)) {
         isRead = hashLink(content, name);
     } else if (rules_.conversionOf(entry.path).foreign.empty()) {
-        isRead = git_repository_hashfile(&content, repository_.get(), name.c_str(), GIT_OBJECT_BLOB,
-                                         entry.path) == 0;
+        isRead = libgit().git_repository_hashfile(&content, repository_.get(), name.c_str(), GIT_OBJECT_BLOB,
+                                                  entry.path) == 0;
     }
-    return !isRead || git_oid_equal(&content, &entry.id) == 0;
+    return !isRead || libgit().git_oid_equal(&content, &entry.id) == 0;
 }
 
 std::uint32_t modeOf(struct stat const& onDisk, git_index_entry const* tracked,

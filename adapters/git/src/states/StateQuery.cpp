@@ -25,7 +25,7 @@ LocalStatus StateQuery::stateOf(fl::filesystem::Path const& path) {
 }
 
 LocalStatus StateQuery::trackedState(git_index_entry const& entry) {
-    if (git_index_entry_is_conflict(&entry) != 0) {
+    if (libgit().git_index_entry_is_conflict(&entry) != 0) {
         return LocalStatus::Conflicted;
     }
     auto const onDisk = reachableEntry(entry.path);
@@ -38,13 +38,13 @@ LocalStatus StateQuery::trackedState(git_index_entry const& entry) {
     if (committed == nullptr) {
         return LocalStatus::Added;
     }
-    auto const committedMode = git_tree_entry_filemode(committed);
+    auto const committedMode = libgit().git_tree_entry_filemode(committed);
     if (!isOfSameType(committedMode, entry.mode)) {
         return LocalStatus::Renamed;
     }
     auto const state = isLeftOut ? LocalStatus::Unmodified : presentState(entry, *onDisk);
-    bool const isStaged =
-        committedMode != entry.mode || git_oid_equal(git_tree_entry_id(committed), &entry.id) == 0;
+    bool const isStaged = committedMode != entry.mode ||
+                          libgit().git_oid_equal(libgit().git_tree_entry_id(committed), &entry.id) == 0;
     return state == LocalStatus::Unmodified && isStaged ? LocalStatus::Modified : state;
 }
 
@@ -66,13 +66,14 @@ LocalStatus StateQuery::submoduleState(git_index_entry const& entry, struct stat
     std::string const folder = repository_.workTree().onDisk(entry.path);
     git_repository* opened = nullptr;
     auto const code =
-        git_repository_open_ext(&opened, folder.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
+        libgit().git_repository_open_ext(&opened, folder.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
     RepositoryHandle const submodule(opened);
     git_oid checkedOut{};
-    if (code != 0 || git_reference_name_to_id(&checkedOut, opened, "HEAD") != 0) {
+    if (code != 0 || libgit().git_reference_name_to_id(&checkedOut, opened, "HEAD") != 0) {
         return LocalStatus::Unmodified; // not checked out
     }
-    return git_oid_equal(&checkedOut, &entry.id) != 0 ? LocalStatus::Unmodified : LocalStatus::Modified;
+    return libgit().git_oid_equal(&checkedOut, &entry.id) != 0 ? LocalStatus::Unmodified
+                                                               : LocalStatus::Modified;
 }
 
 LocalStatus StateQuery::untrackedState(TreePath const& path) {

@@ -1,0 +1,48 @@
+#include "repository/LibGitFunctions.hpp"
+
+#include <string>
+
+#include <dlfcn.h>
+
+#include "project/git/GitError.hpp"
+
+namespace project::git {
+
+namespace {
+
+char const* const libraryName = PROJECT_GIT_LIBGIT2_SONAME;
+
+[[noreturn]] void throwNotLoaded() {
+    auto const* const reason = dlerror();
+    throw GitError(GitError::Kind::Failed, libraryName,
+                   "libgit2 cannot be loaded" + (reason == nullptr ? "" : ": " + std::string(reason)),
+                   "Install the package of libgit2, or turn source control off.");
+}
+
+void* openLibrary() {
+    auto* const result = dlopen(libraryName, RTLD_LAZY | RTLD_LOCAL);
+    if (result == nullptr) {
+        throwNotLoaded();
+    }
+    return result;
+}
+
+} // namespace
+
+LibGitFunctions::LibGitFunctions() : library_(openLibrary()) {
+}
+
+LibGitFunctions::Symbol LibGitFunctions::symbol(char const* name) const {
+    auto* const address = dlsym(library_, name);
+    if (address == nullptr) {
+        throwNotLoaded();
+    }
+    return Symbol(address);
+}
+
+LibGitFunctions const& libgit() {
+    static LibGitFunctions const functions;
+    return functions;
+}
+
+} // namespace project::git
