@@ -50,8 +50,7 @@ void checkLine(std::string const& line) {
                 "a canonical line has its node");
     }
     std::string const ended = line + '\n';
-    if (std::size_t const length = project::stores::plainPathLength(ended.data());
-        length + 2 == line.size()) {
+    if (std::size_t const length = project::stores::plainPathLength(ended); length + 2 == line.size()) {
         require(canonical && canonical->text.size() == length, "the fast path accepts only canonical lines");
     }
 }

@@ -2,8 +2,10 @@
 
 #include <cerrno>
 #include <csignal>
+#include <cstdint>
 #include <ctime>
 
+#include <sys/mman.h>
 #include <unistd.h>
 
 #include "disk/SystemError.hpp"
@@ -50,6 +52,18 @@ void requireReadableLength(std::uint64_t length, std::string const& name) {
         throw StoreError(StoreError::Kind::Damaged, name, 0,
                          "is longer than 1 GiB, the limit for a project's text",
                          "Move it away, and restore the project's own file.");
+    }
+}
+
+/// Reserves memory. For a large text, the system provides all pages in one call; without it, each page would
+/// be provided by a fault of its own, which takes as long as reading the text.
+void reserveAtOnce(std::string& bytes, std::size_t size) {
+    bytes.reserve(size);
+    auto const page = static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
+    auto const begin = reinterpret_cast<std::uintptr_t>(bytes.data()) / page * page;
+    auto const end = reinterpret_cast<std::uintptr_t>(bytes.data()) + size;
+    if (size >= 64 * page) {
+        ::madvise(reinterpret_cast<void*>(begin), end - begin, MADV_POPULATE_WRITE); // older systems refuse
     }
 }
 
@@ -102,7 +116,9 @@ std::string readFrom(int file, std::uint64_t offset, std::uint64_t expectedSize,
     requireReadableLength(expectedSize, name);
     std::string bytes;
     // One byte more than expected, so that the first call finds the end too.
-    bytes.resize(expectedSize > offset ? expectedSize - offset + 1 : 1);
+    std::size_t const firstSize = expectedSize > offset ? expectedSize - offset + 1 : 1;
+    reserveAtOnce(bytes, firstSize);
+    bytes.resize(firstSize);
     std::size_t length = 0;
     for (;;) {
         auto const count = repeatWhenInterrupted([&] {

@@ -1,6 +1,10 @@
 #include "line/CanonicalLine.hpp"
 
 #include <array>
+#include <bit>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
 
 #include "line/JsonText.hpp"
 #include "line/NodeLine.hpp"
@@ -15,13 +19,29 @@ constexpr ConstantContent plainNodeTypeContent{plainNodeType};
 
 constexpr std::size_t longestSurelyShallowPath = deepestAddress;
 
-constexpr std::array<bool, 256> plainCharacters = [] {
-    std::array<bool, 256> plain{};
-    for (std::size_t c = 0x20; c < 0x80; ++c) {
-        plain[c] = c != '"' && c != '\\' && c != '/';
-    }
-    return plain;
-}();
+constexpr std::size_t blockLength = 16;
+using Block = signed char __attribute__((vector_size(blockLength)));
+
+Block blockAt(char const* bytes) noexcept {
+    Block result;
+    std::memcpy(&result, bytes, sizeof result);
+    return result;
+}
+
+/// Whether a plain path ends in a block: at a quote, a backslash, a control character, a byte that is not
+/// ASCII (it is negative), or an empty name. @param block not at the beginning of the text.
+bool hasPathEnd(char const* block) noexcept {
+    Block const bytes = blockAt(block);
+    Block const before = blockAt(block - 1);
+    Block const ends = (bytes < 0x20) | (bytes == '"') | (bytes == '\\') | ((bytes == '/') & (before == '/'));
+    auto const halves = std::bit_cast<std::array<std::uint64_t, 2>>(ends);
+    return (halves[0] | halves[1]) != 0;
+}
+
+bool isPathEnd(char const* byte) noexcept {
+    return static_cast<signed char>(*byte) < 0x20 || *byte == '"' || *byte == '\\' ||
+           (*byte == '/' && byte[-1] == '/');
+}
 
 /// Reads a line in the one form and order in which it is written.
 class Scanner {
@@ -170,20 +190,19 @@ LineAddress addressOfCanonical(std::string_view line) noexcept {
     return {LineAddress::Form::Names, line.substr(pathOpening.size(), end - pathOpening.size())};
 }
 
-std::size_t plainPathLength(char const* line) noexcept {
-    char const* const begin = line + 1;
-    char const* at = begin;
-    do {
-        char const* const name = at;
-        while (plainCharacters[static_cast<unsigned char>(*at)]) {
-            ++at;
-        }
-        if (at == name && (*at == '/' || at == begin)) {
-            return 0;
-        }
-    } while (*at == '/' && ++at);
-    auto const length = static_cast<std::size_t>(at - begin);
-    return *line == '"' && *at == '"' && length <= longestSurelyShallowPath ? length : 0;
+std::size_t plainPathLength(std::string_view text) noexcept {
+    if (!text.starts_with('"') || text.starts_with("\"/")) {
+        return 0;
+    }
+    std::size_t at = 1;
+    while (at + blockLength <= text.size() && !hasPathEnd(text.data() + at)) {
+        at += blockLength;
+    }
+    while (at < text.size() && !isPathEnd(text.data() + at)) {
+        ++at;
+    }
+    bool const isComplete = at < text.size() && text[at] == '"';
+    return isComplete && at - 1 <= longestSurelyShallowPath ? at - 1 : 0;
 }
 
 } // namespace project::stores

@@ -16,9 +16,9 @@ std::optional<LineAddress> canonicalAddress(std::string_view line) noexcept;
 /// The address of a line that canonicalAddress accepted.
 LineAddress addressOfCanonical(std::string_view line) noexcept;
 
-/// The length of the path if a line is a path of plain ASCII characters in quotes; 0 for every other line.
-/// This is the fast path of reading: canonicalAddress accepts all of these lines, and others.
-/// @param line the first byte of the line, followed somewhere by a byte that is not a plain character.
-std::size_t plainPathLength(char const* line) noexcept;
+/// The length of the path if a text begins with a path of plain ASCII characters in quotes; 0 for every other
+/// text. This is the fast path of reading: canonicalAddress accepts all lines that are such a path, and
+/// others.
+std::size_t plainPathLength(std::string_view text) noexcept;
 
 } // namespace project::stores

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <cstring>
 
+#include "fl/i18n/Ascii.hpp"
 #include "fl/i18n/CodePoints.hpp"
 
 namespace project::stores {
@@ -167,10 +168,8 @@ std::u16string decodeJsonContent(std::string_view content) {
 }
 
 void decodeJsonContent(std::string_view content, std::u16string& text) {
-    bool const isPlain = std::all_of(content.begin(), content.end(),
-                                     [](char c) { return static_cast<signed char>(c) >= 0 && c != '\\'; });
-    if (isPlain) {
-        text.assign(content.begin(), content.end());
+    text.resize(content.size());
+    if (content.find('\\') == content.npos && fl::i18n::widenAscii(content, text.data())) {
         return;
     }
     text.clear();

@@ -42,6 +42,13 @@ public:
     /// The content of the step's location.
     std::string_view location() const noexcept { return location_; }
 
+    /// These steps in another line, whose address begins with the same text.
+    LineSteps continuedIn(LineAddress const& address) const noexcept {
+        LineSteps result = *this;
+        result.address_ = address;
+        return result;
+    }
+
     /// The address that ends with this step. It may not be canonical, but isWithin accepts it.
     LineAddress prefix() const noexcept;
 

@@ -239,7 +239,7 @@ ParsedLine parseBodyLine(std::string_view line) {
 }
 
 AddressState stateOfLine(std::string_view line) {
-    if (line.starts_with('"')) {
+    if (isPlainPath(line)) {
         return {plainNode()};
     }
     LineParser parser(line);

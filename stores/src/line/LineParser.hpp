@@ -20,6 +20,11 @@ ParsedLine parseLine(std::string_view line);
 /// Reads a line of a body, which cannot contain removals.
 ParsedLine parseBodyLine(std::string_view line);
 
+/// True for a readable line that is a path alone, so that its address has the plain node.
+inline bool isPlainPath(std::string_view line) noexcept {
+    return line.starts_with('"');
+}
+
 /// The state that a readable line of a body gives to its address.
 AddressState stateOfLine(std::string_view line);
 

@@ -1,6 +1,8 @@
 #include "text/TextBody.hpp"
 
 #include <algorithm>
+#include <array>
+#include <optional>
 #include <utility>
 
 #include "line/CanonicalLine.hpp"
@@ -17,12 +19,15 @@ namespace {
 template <typename Condition>
 std::size_t gallop(TextBody::Range range, Condition const& holds) noexcept(noexcept(holds(0))) {
     std::size_t low = range.begin;
-    std::size_t step = 1;
-    while (low < range.end && holds(std::min(low + step, range.end) - 1)) {
-        low = std::min(low + step, range.end);
-        step *= 2;
+    std::size_t high = range.end; // the condition does not hold from there on
+    for (std::size_t step = 1; low < range.end; step *= 2) {
+        std::size_t const probe = std::min(low + step, range.end) - 1;
+        if (!holds(probe)) {
+            high = probe;
+            break;
+        }
+        low = probe + 1;
     }
-    std::size_t high = std::min(low + step, range.end);
     while (low < high) {
         std::size_t const middle = low + (high - low) / 2;
         if (holds(middle)) {
@@ -34,11 +39,36 @@ std::size_t gallop(TextBody::Range range, Condition const& holds) noexcept(noexc
     return low;
 }
 
+/// The steps of lines that are all below one address, from that address on. In each form of a line the
+/// address has the same text, so it is walked once for each form.
+class StepsBelow {
+public:
+    /// @param depth the number of steps of the address.
+    explicit StepsBelow(std::size_t depth) : depth_(depth) {}
+
+    LineSteps of(LineAddress const& line) {
+        auto& above = above_[line.form == LineAddress::Form::Names ? 0 : 1];
+        if (!above) {
+            above.emplace(line);
+            for (std::size_t i = 0; i < depth_; ++i) {
+                above->next();
+            }
+        }
+        return above->continuedIn(line);
+    }
+
+private:
+    std::size_t depth_;
+    std::array<std::optional<LineSteps>, 2> above_;
+};
+
 } // namespace
 
 std::string_view TextBody::line(std::size_t index) const noexcept {
     std::size_t const begin = starts_[index];
-    return {bytes_.data() + begin, bytes_.find('\n', begin) - begin};
+    bool const isEndKnown = isGapless_ && index + 1 < starts_.size();
+    std::size_t const end = isEndKnown ? starts_[index + 1] - 1 : bytes_.find('\n', begin);
+    return {bytes_.data() + begin, end - begin};
 }
 
 LineAddress TextBody::address(std::size_t index) const noexcept {
@@ -54,7 +84,10 @@ std::size_t TextBody::endOf(Range range, LineAddress const& wanted) const noexce
 }
 
 TextBody::Range TextBody::within(LineAddress const& wanted) const noexcept {
-    std::size_t const begin = lowerBound(all(), wanted);
+    std::size_t const hint = std::min(lastFound_.get(), size());
+    bool const isBehind = hint > 0 && std::is_lt(compare(address(hint - 1), wanted));
+    std::size_t const begin = lowerBound({isBehind ? hint : 0, size()}, wanted);
+    lastFound_.set(begin);
     return {begin, endOf({begin, size()}, wanted)};
 }
 
@@ -70,24 +103,31 @@ std::size_t TextBody::linesBefore(std::size_t offset) const noexcept {
 }
 
 void TextBody::children(Range below, std::size_t depth, ChildSink& children) const {
+    StepsBelow start(depth);
     std::u16string type;
+    std::string_view typeContent;
     std::u16string location;
     while (!below.empty()) {
-        LineSteps steps(address(below.begin));
-        for (std::size_t i = 0; i <= depth; ++i) {
-            steps.next();
+        std::string_view const first = line(below.begin);
+        LineSteps steps = start.of(addressOfCanonical(first));
+        steps.next();
+        if (typeContent != steps.type()) {
+            typeContent = steps.type();
+            decodeJsonContent(typeContent, type);
         }
-        decodeJsonContent(steps.type(), type);
         decodeJsonContent(steps.location(), location);
         LineAddress const prefix = steps.prefix();
-        AddressState state;
-        if (!steps.next()) {
-            state = stateOfLine(line(below.begin));
-            ++below.begin;
-        }
+        bool const hasOwnLine = !steps.next();
+        below.begin += hasOwnLine ? 1 : 0;
         std::size_t const end = endOf(below, prefix);
-        children.add({type, location, state.node, state.isCreated, end > below.begin});
+        bool const hasChildren = end > below.begin;
         below.begin = end;
+        if (hasOwnLine && isPlainPath(first)) {
+            children.add({type, location, plainNode(), false, hasChildren}); // most children
+        } else {
+            AddressState const state = hasOwnLine ? stateOfLine(first) : AddressState();
+            children.add({type, location, state.node, state.isCreated, hasChildren});
+        }
     }
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <atomic>
 #include <cstddef>
 #include <optional>
 #include <string>
@@ -77,7 +78,29 @@ public:
 private:
     friend class BodyWriter;
 
+    /// Where the previous search ended. Visits of a tree search in the order of the lines, so the next search
+    /// begins there; a wrong hint only costs time.
+    class Hint {
+    public:
+        Hint() = default;
+
+        Hint(Hint const& other) noexcept : line_(other.get()) {}
+
+        Hint& operator=(Hint const& other) noexcept {
+            set(other.get());
+            return *this;
+        }
+
+        std::size_t get() const noexcept { return line_.load(std::memory_order_relaxed); }
+
+        void set(std::size_t line) noexcept { line_.store(line, std::memory_order_relaxed); }
+
+    private:
+        std::atomic<std::size_t> line_ = 0;
+    };
+
     std::string bytes_;
+    mutable Hint lastFound_; ///< several threads may search
     LineStarts starts_;
     bool isGapless_ = false;
 };

@@ -55,7 +55,7 @@ private:
     Outcome readBody() {
         std::string const& bytes = body_.bytes();
         while (offset_ < bytes.size()) {
-            std::size_t const length = plainPathLength(bytes.data() + offset_);
+            std::size_t const length = plainPathLength(std::string_view(bytes).substr(offset_));
             LineAddress const path{LineAddress::Form::Names, {bytes.data() + offset_ + 1, length}};
             constexpr std::size_t quotes = 2;
             if (length > 0 && bytes[offset_ + length + quotes] == '\n' && std::is_lt(compare(last_, path))) {

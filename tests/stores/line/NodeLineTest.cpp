@@ -113,12 +113,24 @@ RC_GTEST_PROP(NodeLine, theFastPathAcceptsOnlyCanonicalPaths, ()) {
     auto const content = *rc::gen::scale(0.2, rc::gen::container<std::string>(rc::gen::element(
                                                   'a', 'b', '/', '.', '"', '\\', '\n', '\0', '\xC3')));
     std::string const line = '"' + content + '"';
-    std::size_t const length = plainPathLength(line.c_str());
+    std::size_t const length = plainPathLength(line);
     if (length > 0) {
         RC_ASSERT(canonicalAddress(line.substr(0, length + 2)).has_value());
     }
     bool const plain = canonicalAddress(line) && content.find_first_of("\\\xC3") == std::string::npos;
     RC_ASSERT(!plain || length == content.size());
+}
+
+TEST(NodeLine, theFastPathChecksEveryByteOfAPath) {
+    std::string const path = "folder/sub folder/file_of_some_length.cpp";
+    for (std::size_t at = 0; at < path.size(); ++at) {
+        for (int byte = 0; byte < 256; ++byte) {
+            std::string line = '"' + path + '"';
+            line[at + 1] = static_cast<char>(byte);
+            bool const isPlain = byte >= 0x20 && byte < 0x80 && byte != '\\' && canonicalAddress(line);
+            EXPECT_EQ(plainPathLength(line) == path.size(), isPlain) << "byte " << byte << " at " << at;
+        }
+    }
 }
 
 TEST(NodeLine, linesOfOtherProgramsAreReadAlthoughTheyAreNotCanonical) {
@@ -240,7 +252,7 @@ TEST(NodeLine, pathsAreReadDownToTheSameLimit) {
     EXPECT_TRUE(canonicalAddress(path + '"').has_value());
     EXPECT_FALSE(parseLine(path + "/a\"").change.has_value());
     EXPECT_FALSE(canonicalAddress(path + "/a\"").has_value());
-    EXPECT_EQ(plainPathLength((path + "/a\"").c_str()), 0U);
+    EXPECT_EQ(plainPathLength(path + "/a\""), 0U);
 }
 
 Node nestedNode(std::size_t levels) {

@@ -68,8 +68,9 @@ std::vector<Difference> changesOfTransaction(OpenProject& project) {
     while (!waiting.empty()) {
         auto const address = std::move(waiting.back());
         waiting.pop_back();
-        LevelComparison(address, result, waiting)
-            .run(project.text().load(address), project.childrenOf(address));
+        project::stores::ChildCollector after;
+        project.loadChildren(address, after);
+        LevelComparison(address, result, waiting).run(project.text().load(address), after.take());
     }
     std::ranges::sort(result,
                       [](auto const& left, auto const& right) { return left.address < right.address; });

@@ -1,23 +1,21 @@
 #include "checks/StatusScan.hpp"
 
+#include <cstddef>
+#include <string>
 #include <system_error>
 
 namespace projectctl {
 
-using project::stores::Child;
-
 namespace {
 
-using Listed = project::stores::Children::const_iterator;
-using Found = std::vector<DiskEntry>::const_iterator;
-
-/// Compares the next names of two sorted lists: less than 0 if the first list has the smaller one, greater
-/// than 0 if the second has, 0 if they are equal.
-int orderOf(Listed file, Listed lastFile, Found entry, Found lastEntry) {
-    if (file == lastFile || entry == lastEntry) {
-        return file == lastFile ? 1 : -1;
+/// Compares the next names of two sorted lists, of which one may be at its end: less than 0 if the list of
+/// the project has the smaller one, greater than 0 if the disk has, 0 if they are equal.
+int orderOf(FileList::Level const& listed, std::size_t file, std::vector<DiskEntry> const& onDisk,
+            std::size_t entry) {
+    if (file == listed.files.size() || entry == onDisk.size()) {
+        return file == listed.files.size() ? 1 : -1;
     }
-    return file->element.getLocation().compare(entry->name);
+    return listed.nameOf(listed.files[file]).compare(onDisk[entry].name);
 }
 
 } // namespace
@@ -27,10 +25,10 @@ StatusScan::StatusScan(OpenProject& project) : root_(project.root()), list_(proj
 
 void StatusScan::run(Progress& progress) {
     auto const address = list_.addressOf(root_);
-    compare(root_, address, list_.level(address).files, progress);
+    compare(root_, address, list_.level(address), progress);
 }
 
-void StatusScan::compare(Path const& folder, Address const& address, project::stores::Children const& listed,
+void StatusScan::compare(Path const& folder, Address const& address, FileList::Level const& listed,
                          Progress& progress) {
     std::vector<DiskEntry> onDisk;
     try {
@@ -38,40 +36,49 @@ void StatusScan::compare(Path const& folder, Address const& address, project::st
     } catch (std::system_error const& error) {
         unreadable_.emplace_back(error.what());
     }
-    auto file = listed.cbegin();
-    auto entry = onDisk.cbegin();
-    while (file != listed.end() || entry != onDisk.end()) { // both are sorted by name
+    std::size_t nextFile = 0;
+    std::size_t nextEntry = 0;
+    while (nextFile < listed.files.size() || nextEntry < onDisk.size()) { // both are sorted by name
         progress.reach(++seen_);
-        auto const order = orderOf(file, listed.end(), entry, onDisk.end());
+        auto const order = orderOf(listed, nextFile, onDisk, nextEntry);
         if (order < 0) {
-            lookFor(folder, address, *file);
-        } else if (order > 0 || !file->node) {
-            takeAdded(folder, *entry);
-        } else if (entry->kind == Kind::Folder) {
-            auto const below = address.child(file->element);
-            compare(folder / Path(entry->name), below, list_.level(below).files, progress);
+            lookFor(folder, address, listed, listed.files[nextFile]);
+        } else if (order > 0 || !listed.files[nextFile].node) {
+            takeAdded(folder, onDisk[nextEntry]);
         } else {
-            compareListed(folder / Path(entry->name), address.child(file->element));
+            compareBoth(folder, address, listed.files[nextFile], onDisk[nextEntry], progress);
         }
-        file += order <= 0 ? 1 : 0;
-        entry += order >= 0 ? 1 : 0;
+        nextFile += order <= 0 ? 1 : 0;
+        nextEntry += order >= 0 ? 1 : 0;
+    }
+}
+
+void StatusScan::compareBoth(Path const& folder, Address const& address, FileList::Entry const& file,
+                             DiskEntry const& entry, Progress& progress) {
+    if (entry.kind == Kind::Folder) {
+        auto const below = FileList::below(address, entry.name);
+        compare(folder / Path(entry.name), below, list_.level(below), progress);
+    } else if (file.hasChildren) {
+        compareListed(folder / Path(entry.name), FileList::below(address, entry.name));
     }
 }
 
 void StatusScan::compareListed(Path const& path, Address const& address) {
-    for (auto const& file : list_.level(address).files) {
-        lookFor(path, address, file);
+    auto const listed = list_.level(address);
+    for (auto const& file : listed.files) {
+        lookFor(path, address, listed, file);
     }
 }
 
-void StatusScan::lookFor(Path const& folder, Address const& address, Child const& file) {
-    auto const& name = file.element.getLocation();
-    auto const path = folder / Path(name);
+void StatusScan::lookFor(Path const& folder, Address const& address, FileList::Level const& listed,
+                         FileList::Entry const& file) {
     if (!file.node) {
         return; // it is not in the project
     }
+    std::u16string const name(listed.nameOf(file));
+    auto const path = folder / Path(name);
     if (isOnDisk(folder, name)) {
-        compareListed(path, address.child(file.element)); // scans leave out its kind, but a user added it
+        compareListed(path, FileList::below(address, name)); // scans leave out its kind, but a user added it
     } else {
         takeGone(path);
     }

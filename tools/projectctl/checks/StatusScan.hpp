@@ -36,10 +36,13 @@ public:
 private:
     using Address = project::metadata::MetadataPath;
 
-    void compare(Path const& folder, Address const& address, project::stores::Children const& listed,
+    void compare(Path const& folder, Address const& address, FileList::Level const& listed,
                  Progress& progress);
+    void compareBoth(Path const& folder, Address const& address, FileList::Entry const& file,
+                     DiskEntry const& entry, Progress& progress);
     void compareListed(Path const& path, Address const& address);
-    void lookFor(Path const& folder, Address const& address, project::stores::Child const& file);
+    void lookFor(Path const& folder, Address const& address, FileList::Level const& listed,
+                 FileList::Entry const& file);
     void takeAdded(Path const& folder, DiskEntry const& entry);
     void takeGone(Path const& path);
 

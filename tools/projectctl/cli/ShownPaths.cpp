@@ -13,7 +13,8 @@ using fl::filesystem::Path;
 ShownPaths::ShownPaths(Path root) : ShownPaths(root, settings().showsFullNames ? root : workingFolder()) {
 }
 
-ShownPaths::ShownPaths(Path root, Path from) : root_(std::move(root)), from_(std::move(from)) {
+ShownPaths::ShownPaths(Path root, Path from)
+    : root_(std::move(root)), from_(std::move(from)), isFromRoot_(from_ == root_) {
 }
 
 ShownPaths ShownPaths::fromRoot(Path root) {
@@ -22,7 +23,7 @@ ShownPaths ShownPaths::fromRoot(Path root) {
 }
 
 std::u16string_view ShownPaths::of(std::u16string_view path) {
-    if (path.starts_with(u'/') || (from_ == root_ && !path.empty())) {
+    if (path.starts_with(u'/') || (isFromRoot_ && !path.empty())) {
         return path;
     }
     return ofAbsolute(root_ / Path(std::u16string(path)));

@@ -35,7 +35,8 @@ private:
 
     fl::filesystem::Path root_;
     fl::filesystem::Path from_; ///< the folder that shown paths are relative to
-    std::u16string shown_;      ///< the most recent result
+    bool isFromRoot_;
+    std::u16string shown_; ///< the most recent result
 };
 
 } // namespace projectctl

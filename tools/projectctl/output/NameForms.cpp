@@ -4,6 +4,7 @@
 #include <cstddef>
 
 #include "fl/filesystem/SystemName.hpp"
+#include "fl/i18n/Ascii.hpp"
 #include "fl/i18n/CodePoints.hpp"
 #include "fl/i18n/JsonString.hpp"
 #include "fl/i18n/Utf8.hpp"
@@ -57,13 +58,7 @@ bool needsQuotes(std::string_view bytes) {
 void appendBytes(std::string& out, std::u16string_view name) {
     std::size_t const before = out.size();
     out.resize(before + name.size());
-    auto* to = out.data() + before;
-    bool isAscii = true;
-    for (auto const unit : name) { // without an early exit, so that the loop is vectorised
-        isAscii = isAscii && unit != 0 && unit < 0x80;
-        *to++ = static_cast<char>(unit);
-    }
-    if (isAscii) {
+    if (fl::i18n::narrowAscii(name, out.data() + before)) {
         return;
     }
     out.resize(before);

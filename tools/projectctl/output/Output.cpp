@@ -13,7 +13,7 @@ namespace projectctl {
 
 namespace {
 
-constexpr std::size_t bufferSize = std::size_t(256) * 1024;
+constexpr std::size_t bufferSize = std::size_t(64) * 1024;
 
 } // namespace
 

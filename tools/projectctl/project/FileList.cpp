@@ -13,12 +13,42 @@ namespace treeSchema = project::metadata::schema;
 
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
-using project::stores::Child;
+using project::stores::LoadedChild;
+
+namespace {
+
+/// Collects the entries of one address.
+class LevelReader : public project::stores::ChildSink {
+public:
+    void add(LoadedChild const& child) override {
+        if (child.type == treeSchema::files::markerType) {
+            level_.kind = Kind::Folder;
+        } else if (child.type == treeSchema::files::fileType) {
+            if (level_.files.empty()) {
+                level_.files.reserve(usualFiles);
+                level_.names.reserve(usualFiles * usualName);
+            }
+            level_.files.push_back(
+                {level_.names.size(), child.location.size(), child.node, child.hasChildren});
+            level_.names += child.location;
+        }
+    }
+
+    FileList::Level take() { return std::move(level_); }
+
+private:
+    static constexpr std::size_t usualFiles = 16;
+    static constexpr std::size_t usualName = 16;
+
+    FileList::Level level_;
+};
+
+} // namespace
 
 /// A folder that is being visited.
 struct FileList::Open {
     MetadataPath address;
-    project::stores::Children files;
+    Level level;
     std::size_t next;
     std::size_t pathLength; ///< of the folder, including the separator
 };
@@ -32,21 +62,19 @@ MetadataPath FileList::addressOf(Path const& path) const {
     std::u16string const relative = project::metadata::getRelativePath(project_.root(), path);
     for (std::u16string_view rest = relative; !rest.empty(); rest = fl::filesystem::detail::move_down(rest)) {
         auto const name = fl::filesystem::detail::extract_first_element(rest);
-        result = result.child(PathElement(treeSchema::files::fileType, std::u16string(name)));
+        result = below(result, name);
     }
     return result;
 }
 
+MetadataPath FileList::below(MetadataPath const& address, std::u16string_view name) {
+    return address.child(PathElement(treeSchema::files::fileType, std::u16string(name)));
+}
+
 FileList::Level FileList::level(MetadataPath const& address) const {
-    Level result;
-    result.files = project_.childrenOf(address);
-    std::erase_if(result.files, [&result](Child const& child) {
-        if (child.element.getType() == treeSchema::files::markerType) {
-            result.kind = Kind::Folder;
-        }
-        return child.element.getType() != treeSchema::files::fileType;
-    });
-    return result;
+    LevelReader reader;
+    project_.loadChildren(address, reader);
+    return reader.take();
 }
 
 void FileList::visit(Path const& path, Visitor const& visitor) const {
@@ -69,28 +97,29 @@ void FileList::visitBelow(MetadataPath start, Level level, std::u16string path, 
                           Visitor const& visitor) const {
     // Not recursive: a text from another source may contain a tree of any depth.
     std::vector<Open> open;
-    open.push_back({std::move(start), std::move(level.files), 0, path.size()});
+    open.push_back({std::move(start), std::move(level), 0, path.size()});
     while (!open.empty()) {
         auto& folder = open.back();
         path.resize(folder.pathLength);
-        if (folder.next == folder.files.size()) {
+        if (folder.next == folder.level.files.size()) {
             open.pop_back();
             continue;
         }
-        auto const& file = folder.files[folder.next++];
+        auto const& file = folder.level.files[folder.next++];
         if (!file.node) {
             continue;
         }
-        path += file.element.getLocation();
+        auto const name = folder.level.nameOf(file);
+        path += name;
         if (!file.hasChildren) {
             visitor({path, depth + open.size() - 1, Kind::File, *file.node});
             continue;
         }
-        auto address = folder.address.child(file.element);
+        auto address = below(folder.address, name);
         auto content = this->level(address);
         visitor({path, depth + open.size() - 1, content.kind, *file.node});
         path += u'/';
-        open.push_back({std::move(address), std::move(content.files), 0, path.size()});
+        open.push_back({std::move(address), std::move(content), 0, path.size()});
     }
 }
 

@@ -2,6 +2,8 @@
 
 #include <functional>
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include "output/Kind.hpp"
 #include "project/OpenProject.hpp"
@@ -17,11 +19,28 @@ class FileList {
 public:
     explicit FileList(OpenProject& project);
 
+    /// An entry directly below an address.
+    struct Entry {
+        std::size_t nameBegin; ///< in the names of its level
+        std::size_t nameLength;
+        project::stores::Node node; ///< null if the entry is not in the project
+        bool hasChildren;
+    };
+
     /// The content of one address of the list.
     struct Level {
-        Kind kind = Kind::File;          ///< of the entry at the address
-        project::stores::Children files; ///< the entries directly below it, by name in code units
+        Kind kind = Kind::File; ///< of the entry at the address
+        std::u16string names;
+        std::vector<Entry> files; ///< the entries directly below it, by name in code units
+
+        std::u16string_view nameOf(Entry const& file) const {
+            return std::u16string_view(names).substr(file.nameBegin, file.nameLength);
+        }
     };
+
+    /// The address of an entry below an address.
+    static project::metadata::MetadataPath below(project::metadata::MetadataPath const& address,
+                                                 std::u16string_view name);
 
     /// The address of a file. @param path absolute, the project's root or below it.
     project::metadata::MetadataPath addressOf(Path const& path) const;

@@ -60,18 +60,18 @@ void OpenProject::requireInProject(Path const& path) {
     }
 }
 
-project::stores::Children OpenProject::childrenOf(MetadataPath const& address) {
+void OpenProject::loadChildren(MetadataPath const& address, project::stores::ChildSink& children) {
     if (openTransactions_ == 0) {
-        return text().load(address);
+        text().load(address, children);
+        return;
     }
-    project::stores::Children result;
     for (auto const& child : store().getChildNodes(address)) {
-        auto node = project::stores::Node(store().getNode(child));
+        auto const node = project::stores::Node(store().getNode(child));
         bool const hasChildren = !store().getChildNodes(child).empty();
         bool const isCreated = !node && !hasChildren;
-        result.push_back({child.leaf(), std::move(node), isCreated, hasChildren});
+        auto const element = child.leaf();
+        children.add({element.getType(), element.getLocation(), node, isCreated, hasChildren});
     }
-    return result;
 }
 
 std::vector<Fault> const& OpenProject::faultsOfText() {

@@ -51,9 +51,9 @@ public:
     /// called while a guard of the store is open.
     project::stores::TextBackend& text() noexcept { return access_.text(); }
 
-    /// The addresses directly below one address, as `load` of the text returns them, with the changes of a
+    /// Passes on the addresses directly below one address, as `load` of the text does, with the changes of a
     /// transaction. Call it with a guard of the store open.
-    project::stores::Children childrenOf(project::metadata::MetadataPath const& address);
+    void loadChildren(project::metadata::MetadataPath const& address, project::stores::ChildSink& children);
 
     /// The faults of the text. In a transaction, those that were found before it: reading the text again
     /// would show the changes of other programs in the middle of it. Otherwise call this without an open
