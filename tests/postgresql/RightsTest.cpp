@@ -155,6 +155,22 @@ TEST_F(RightsTest, onlyTheOwnerCreatesAndDeletesProjects) {
     EXPECT_FALSE(asOwner.remove(newId()));
 }
 
+TEST_F(RightsTest, anAdministratorCreatesAProjectWithPlainStatements) {
+    auto const id = newId();
+    EXPECT_EQ(attempt("owner", "CREATE ROLE meadow_reader NOLOGIN IN ROLE pm_reader;"
+                               "CREATE ROLE meadow_writer NOLOGIN IN ROLE pm_writer, meadow_reader;"
+                               "GRANT meadow_writer TO anna;"
+                               "INSERT INTO pm.project (project, name, reader, writer) VALUES ('" +
+                                   id + "', 'meadow', 'meadow_reader', 'meadow_writer');" +
+                                   "INSERT INTO pm.barrier (project) VALUES ('" + id + "')"),
+              "1");
+    PostgresJournal journal(settingsFor(sharedServer().connection("anna")), id);
+    auto const first = body(1, "text\n");
+    EXPECT_EQ(append(journal, *first), Journal::Appended::Stored);
+    EXPECT_EQ(append(journal, *first), Journal::Appended::Stored) << "passes the barrier";
+    SharedProjects(settingsFor(sharedServer().connection("owner"))).remove(id);
+}
+
 TEST_F(RightsTest, anEntryThatIsNotWellFormedIsRefused) {
     std::string const tooLong(Journal::longestBatch + 1, 'x');
     anna->lock(seconds(5), std::nullopt);
