@@ -10,6 +10,8 @@ namespace project::metadata {
 
 namespace {
 
+using Values = std::map<std::u16string, std::u16string>;
+
 std::u16string const& noText() {
     static std::u16string const text;
     return text;
@@ -20,10 +22,45 @@ std::u16string const& usualType() {
     return type;
 }
 
+std::vector<std::u16string> keysOf(Values const& values) {
+    std::vector<std::u16string> keys;
+    keys.reserve(values.size());
+    for (auto const& [key, value] : values) {
+        keys.push_back(key);
+    }
+    return keys;
+}
+
 } // namespace
 
 struct MetadataNodeSpecification::Content {
-    std::map<std::u16string, std::u16string> values;
+    bool hasValues() const noexcept { return (own && !own->empty()) || shared; }
+
+    /// The value of a key; null if there is none.
+    std::u16string const* find(std::u16string const& key) const {
+        auto const* const found = find(own.get(), key);
+        return found != nullptr ? found : find(shared.get(), key);
+    }
+
+    /// Own values and shared ones. The node must have values.
+    Values allValues() const {
+        Values all = own ? *own : Values();
+        if (shared) {
+            all.insert(shared->begin(), shared->end()); // keeps the own ones
+        }
+        return all;
+    }
+
+    static std::u16string const* find(Values const* values, std::u16string const& key) {
+        if (values == nullptr) {
+            return nullptr;
+        }
+        auto const found = values->find(key);
+        return found != values->end() ? &found->second : nullptr;
+    }
+
+    std::unique_ptr<Values> own;          ///< put after the node was created; null if there are none
+    std::shared_ptr<Values const> shared; ///< with copies of the node; null if there are none
     std::vector<std::unique_ptr<MetadataNode>> children;
     std::u16string type; ///< unless it is one of the constants
 };
@@ -46,25 +83,44 @@ MetadataNodeSpecification::MetadataNodeSpecification(MetadataNode const& other) 
 MetadataNodeSpecification::~MetadataNodeSpecification() = default;
 
 void MetadataNodeSpecification::copyValues(MetadataNode const& other) {
-    if (typeid(other) == typeid(MetadataNodeSpecification)) {
-        auto const& content = static_cast<MetadataNodeSpecification const&>(other).content_;
-        if (content && !content->values.empty()) {
-            makeContent().values = content->values; // much faster than key by key
+    if (typeid(other) != typeid(MetadataNodeSpecification)) {
+        for (auto& key : other.getKeys()) {
+            put(key, other.get(key));
         }
+        shareValues();
         return;
     }
-    for (auto& key : other.getKeys()) {
-        auto& values = makeContent().values;
-        values.emplace_hint(values.end(), key, other.get(key));
+    auto const& content = static_cast<MetadataNodeSpecification const&>(other).content_;
+    if (content && content->hasValues()) {
+        makeContent().shared =
+            content->own ? std::make_shared<Values const>(content->allValues()) : content->shared;
+    }
+}
+
+void MetadataNodeSpecification::shareValues() {
+    if (!content_) {
+        return;
+    }
+    if (content_->own) {
+        content_->shared = std::make_shared<Values const>(content_->shared ? content_->allValues()
+                                                                           : std::move(*content_->own));
+        content_->own.reset();
+    }
+    for (auto const& child : content_->children) {
+        static_cast<MetadataNodeSpecification&>(*child).shareValues(); // created by this class
     }
 }
 
 bool MetadataNodeSpecification::hasEqualValues(MetadataNodeSpecification const& other) const {
-    if (content_ && other.content_) {
-        return content_->values == other.content_->values;
+    auto const* left = content_ && content_->hasValues() ? content_.get() : nullptr;
+    auto const* right = other.content_ && other.content_->hasValues() ? other.content_.get() : nullptr;
+    if (left == nullptr || right == nullptr) {
+        return left == right;
     }
-    auto const& only = content_ ? content_ : other.content_;
-    return !only || only->values.empty();
+    if (!left->own && !right->own) {
+        return left->shared == right->shared || *left->shared == *right->shared;
+    }
+    return left->allValues() == right->allValues();
 }
 
 MetadataNodeSpecification::Content& MetadataNodeSpecification::makeContent() {
@@ -88,27 +144,26 @@ MetadataNodeSpecification::MetadataNodeSpecification(MetadataNodeSpecification c
 }
 
 std::u16string const& MetadataNodeSpecification::get(std::u16string const& key) const {
-    if (!content_) {
-        return noText();
-    }
-    auto const found = content_->values.find(key);
-    return found == content_->values.end() ? noText() : found->second;
+    auto const* const found = content_ ? content_->find(key) : nullptr;
+    return found != nullptr ? *found : noText();
 }
 
 void MetadataNodeSpecification::put(std::u16string key, std::u16string value) {
-    makeContent().values.insert_or_assign(std::move(key), std::move(value));
+    auto& own = makeContent().own;
+    if (!own) {
+        own = std::make_unique<Values>();
+    }
+    own->insert_or_assign(std::move(key), std::move(value));
 }
 
 std::vector<std::u16string> MetadataNodeSpecification::getKeys() const {
-    std::vector<std::u16string> keys;
-    if (!content_) {
-        return keys;
+    if (!content_ || !content_->hasValues()) {
+        return {};
     }
-    keys.reserve(content_->values.size());
-    for (auto const& [key, value] : content_->values) {
-        keys.push_back(key);
+    if (content_->own && content_->shared) {
+        return keysOf(content_->allValues());
     }
-    return keys;
+    return keysOf(content_->own ? *content_->own : *content_->shared);
 }
 
 std::u16string const& MetadataNodeSpecification::getType() const {

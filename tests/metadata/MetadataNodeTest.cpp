@@ -61,6 +61,63 @@ TEST(MetadataNode, aCopyIsDeep) {
     EXPECT_EQ(node.getChildren()[0]->get(u"key"), u"");
 }
 
+TEST(MetadataNode, copiesThatShareValuesChangeIndependently) {
+    MetadataNodeSpecification node(u"Info");
+    node.put(u"a", u"1");
+    node.put(u"b", u"1");
+    node.addChild(u"child")->put(u"key", u"nested");
+    node.shareValues();
+    MetadataNodeSpecification changed(node);
+    MetadataNodeSpecification const other(node);
+    changed.put(u"b", u"2");
+    changed.put(u"c", u"2");
+    changed.getChildren()[0]->put(u"key", u"changed");
+    EXPECT_THAT(changed.getKeys(), ElementsAre(u"a", u"b", u"c"));
+    EXPECT_EQ(changed.get(u"a"), u"1");
+    EXPECT_EQ(changed.get(u"b"), u"2");
+    EXPECT_EQ(changed.getChildren()[0]->get(u"key"), u"changed");
+    EXPECT_EQ(other.get(u"b"), u"1");
+    EXPECT_EQ(other.getChildren()[0]->get(u"key"), u"nested");
+    EXPECT_TRUE(isEqual(node, other));
+    EXPECT_FALSE(isEqual(node, changed));
+}
+
+TEST(MetadataNode, aCopyOfAChangedCopyHasAllValues) {
+    MetadataNodeSpecification node(u"Info");
+    node.put(u"a", u"1");
+    node.put(u"b", u"1");
+    MetadataNodeSpecification changed(node);
+    changed.put(u"b", u"2");
+    MetadataNodeSpecification const copy(changed);
+    EXPECT_TRUE(isEqual(changed, copy));
+    EXPECT_THAT(copy.getKeys(), ElementsAre(u"a", u"b"));
+    EXPECT_EQ(copy.get(u"b"), u"2");
+}
+
+TEST(MetadataNode, nodesWithTheSameValuesAreEqualWhicheverOfThemAreShared) {
+    MetadataNodeSpecification node(u"Info");
+    node.put(u"a", u"1");
+    MetadataNodeSpecification changed(node);
+    changed.put(u"b", u"2");
+    node.put(u"b", u"2");
+    EXPECT_TRUE(isEqual(node, changed));
+    node.shareValues();
+    changed.shareValues();
+    EXPECT_TRUE(isEqual(node, changed));
+    EXPECT_FALSE(isEqual(node, MetadataNodeSpecification(u"Info")));
+}
+
+TEST(MetadataNode, aReferenceToAValueOutlivesOtherNodesWithTheValue) {
+    auto node = std::make_unique<MetadataNodeSpecification>(u"Info");
+    node->put(u"a", u"a text that is too long to be stored in the string itself");
+    node->shareValues();
+    MetadataNodeSpecification copy(*node);
+    auto const& text = copy.get(u"a");
+    copy.put(u"b", u"2");
+    node.reset();
+    EXPECT_EQ(text, u"a text that is too long to be stored in the string itself");
+}
+
 /// A node that an application implements itself, with one key.
 class OwnNode : public MetadataNode {
 public:

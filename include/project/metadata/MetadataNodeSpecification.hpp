@@ -11,7 +11,8 @@ namespace project::metadata {
 /// The concrete node: callers build it to store it, and the store returns it.
 ///
 /// A node without keys and nested nodes, whose type is empty or that of most nodes, takes no memory beside
-/// the object: a project has one for each file while it is added.
+/// the object: a project has one for each file while it is added. A copy has the values of its original in
+/// common with other copies; only values that were put since are its own.
 class PROJECT_METADATA_EXPORT MetadataNodeSpecification : public MetadataNode {
 public:
     /// Creates a node without a type, keys and nested nodes.
@@ -32,6 +33,11 @@ public:
     std::vector<std::unique_ptr<MetadataNode>> const& getChildren() const override;
     MetadataNode* addChild(std::u16string type) override;
     void removeChild(MetadataNode* child) override;
+
+    /// Lets copies of this node share its values and those of its nested nodes. For a node that is copied
+    /// more than once: otherwise, each copy copies the values that were put into this node. References to
+    /// values become invalid.
+    void shareValues();
 
 private:
     friend PROJECT_METADATA_EXPORT bool isEqual(MetadataNode const& left, MetadataNode const& right);

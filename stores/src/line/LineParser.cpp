@@ -48,6 +48,7 @@ Node buildNode(WrittenNode&& written) {
     }
     auto node = std::make_shared<MetadataNodeSpecification>(std::move(type));
     fill(*node, std::move(written));
+    node->shareValues(); // every query copies the node
     return node;
 }
 
