@@ -82,7 +82,7 @@ bool FileManagerBase::isMetadataFile(Path const& path) const {
 
 bool FileManagerBase::isFileInProject(Path const& path) const {
     auto const guard = metadataManager_->acquireReadLock();
-    return path == projectRoot_ || fileStore_->hasFileNode(path);
+    return path == projectRoot_ || fileStore_->isFile(path);
 }
 
 std::vector<Path> FileManagerBase::remove(std::vector<Path> const& files) {
@@ -128,7 +128,7 @@ void FileManagerBase::removeFromEveryScope(std::vector<Path> const& files) {
 
 std::vector<Path> FileManagerBase::getChildProjectFiles(Path const& path) const {
     auto const guard = metadataManager_->acquireReadLock();
-    return fileStore_->getChildFiles(path);
+    return fileStore_->childFiles(path);
 }
 
 std::vector<Path> FileManagerBase::withAllDescendants(std::vector<Path> const& files) const {

@@ -1,6 +1,9 @@
 #include "files/PathLocalizedFileMetadataManager.hpp"
 
+#include <algorithm>
 #include <atomic>
+#include <iterator>
+#include <span>
 #include <utility>
 
 #include "project/metadata/Messages.hpp"
@@ -32,18 +35,15 @@ class PathLocalizedFileMetadataManager::LastAddress {
 public:
     explicit LastAddress(MetadataPath head) : head_(std::move(head)), address_(head_) {}
 
-    /// The address of a file. @param names its path relative to the root.
-    MetadataPath withNames(std::u16string_view names) {
+    /// The address of a file. @param path its path relative to the root, with single separators.
+    MetadataPath withNames(std::u16string_view path) {
         if (isInUse_.exchange(true, std::memory_order_acquire)) {
-            return append(head_, names); // by another thread
+            return LastAddress(head_).withNames(path); // it is in use by another thread
         }
         Using const mark(isInUse_);
-        auto const depth = takeSharedNames(names);
-        auto near = address_;
-        while (near.depth() > depth) {
-            near = near.parent();
-        }
-        address_ = append(std::move(near), names);
+        splitNames(path);
+        auto const shared = countSharedNames();
+        address_.replaceSteps(headDepth + shared, schema::files::fileType, std::span(names_).subspan(shared));
         return address_;
     }
 
@@ -62,30 +62,34 @@ private:
         std::atomic<bool>& mark_;
     };
 
-    /// Removes the first names that are also those of the address. @return their depth.
-    std::size_t takeSharedNames(std::u16string_view& names) {
-        address_.listSteps(steps_);
-        auto depth = head_.depth();
-        while (depth < steps_.size() && !names.empty() &&
-               steps_[depth]->getLocation() == fl::filesystem::detail::extract_first_element(names)) {
-            names = fl::filesystem::detail::move_down(names);
-            ++depth;
+    void splitNames(std::u16string_view path) {
+        names_.clear();
+        while (!path.empty()) {
+            auto const name = path.substr(0, path.find(u'/'));
+            names_.push_back(name);
+            path.remove_prefix(std::min(name.size() + 1, path.size()));
         }
-        return depth;
     }
 
-    static MetadataPath append(MetadataPath address, std::u16string_view names) {
-        for (; !names.empty(); names = fl::filesystem::detail::move_down(names)) {
-            auto const name = fl::filesystem::detail::extract_first_element(names);
-            address = address.child(PathElement(schema::files::fileType, std::u16string(name)));
-        }
-        return address;
+    /// The number of first names that are also those of the last address.
+    std::size_t countSharedNames() {
+        address_.listSteps(steps_);
+        auto const& names = names_;
+        auto const isShared = [](PathElement const* step, std::u16string_view name) {
+            return step->getLocation() == name;
+        };
+        auto const different = std::mismatch(std::next(steps_.begin(), headDepth), steps_.end(),
+                                             names.begin(), names.end(), isShared);
+        return static_cast<std::size_t>(different.second - names.begin());
     }
 
     MetadataPath const head_;
     std::atomic<bool> isInUse_ = false;
-    MetadataPath address_;                  ///< the last one
-    std::vector<PathElement const*> steps_; ///< of it
+    MetadataPath address_; ///< the last one
+
+    // Of the last call, and members only because they keep their memory.
+    std::vector<std::u16string_view> names_;
+    std::vector<PathElement const*> steps_;
 };
 
 PathLocalizedFileMetadataManager::PathLocalizedFileMetadataManager(
@@ -140,8 +144,12 @@ std::unique_ptr<MetadataNode> PathLocalizedFileMetadataManager::getFileNode(Path
 }
 
 bool PathLocalizedFileMetadataManager::hasFileNode(Path file) {
+    return isFile(file);
+}
+
+bool PathLocalizedFileMetadataManager::isFile(Path const& path) {
     auto const guard = metadataManager_->acquireReadLock();
-    return isFileMetadataPath(toMetadataPath(file));
+    return isFileMetadataPath(toMetadataPath(path));
 }
 
 void PathLocalizedFileMetadataManager::removeFileNodes(std::vector<Path> files) {
@@ -159,6 +167,10 @@ std::vector<Path> PathLocalizedFileMetadataManager::getExtraEntries() {
 }
 
 std::vector<Path> PathLocalizedFileMetadataManager::getChildFiles(Path file) {
+    return childFiles(file);
+}
+
+std::vector<Path> PathLocalizedFileMetadataManager::childFiles(Path const& file) {
     auto const guard = metadataManager_->acquireReadLock();
     std::vector<Path> result;
     auto const children = metadataManager_->getChildNodes(toMetadataPath(file));
@@ -172,8 +184,11 @@ std::vector<Path> PathLocalizedFileMetadataManager::getChildFiles(Path file) {
 }
 
 MetadataPath PathLocalizedFileMetadataManager::toMetadataPath(Path const& file) const {
-    std::u16string const relative = file == root_ ? u"" : metadata::getRelativePath(root_, file);
-    return lastAddress_->withNames(relative);
+    if (file == root_) {
+        return lastAddress_->withNames({});
+    }
+    auto const below = metadata::textBelow(root_, file);
+    return lastAddress_->withNames(below ? *below : metadata::getRelativePath(root_, file));
 }
 
 Path PathLocalizedFileMetadataManager::toFilePath(MetadataPath const& path) const {
@@ -196,7 +211,7 @@ bool PathLocalizedFileMetadataManager::isFileMetadataPath(MetadataPath const& pa
         return false;
     }
     std::u16string const& type = path.leaf().getType();
-    return type == schema::files::filesType || type == schema::files::fileType;
+    return type == schema::files::fileType || type == schema::files::filesType;
 }
 
 void PathLocalizedFileMetadataManager::addFileNode(

@@ -28,6 +28,12 @@ public:
     std::vector<Path> getExtraEntries() override;
     std::vector<Path> getChildFiles(Path file) override;
 
+    /// Returns the same as hasFileNode, and does not copy the path. Takes the read lock.
+    bool isFile(Path const& path);
+
+    /// Returns the same as getChildFiles, and does not copy the path. Takes the read lock.
+    std::vector<Path> childFiles(Path const& file);
+
     /// Returns the address of a file, from the text alone, without lock or check. The address of a path
     /// outside the root has a step for each ".." of its relative form.
     MetadataPath toMetadataPath(Path const& file) const;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <cstring>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -51,14 +52,30 @@ Text takeName(Text& names) {
 
 /// True for one or more names with single separators between them and none at either end.
 bool isPlain(Text names) {
-    return !names.empty() && names.front() != separator && names.back() != separator &&
-           names.find(u"//") == Text::npos;
+    if (names.empty() || names.front() == separator || names.back() == separator) {
+        return false;
+    }
+    bool isAfterSeparator = false;
+    for (char16_t const unit : names) {
+        bool const isSeparator = unit == separator;
+        if (isSeparator && isAfterSeparator) {
+            return false;
+        }
+        isAfterSeparator = isSeparator;
+    }
+    return true;
+}
+
+/// The same as starts_with, which compares one code unit after the other.
+bool startsWith(Text text, Text beginning) {
+    return text.size() >= beginning.size() &&
+           std::memcmp(text.data(), beginning.data(), beginning.size() * sizeof(char16_t)) == 0;
 }
 
 /// The part of the target's text below the base. Nothing if the target is not below the base, or if repeated
 /// or trailing separators in either text need the general algorithm.
 std::optional<Text> plainTextBelow(Text base, Text target) {
-    if (!target.starts_with(base)) {
+    if (!startsWith(target, base)) {
         return std::nullopt;
     }
     Text rest = target.substr(base.size());
@@ -144,8 +161,12 @@ Path getParentFolder(Path const& path) {
     return std::u16string(parent.empty() && isAbsolute(text) ? text.substr(0, 1) : parent);
 }
 
+std::optional<std::u16string_view> textBelow(Path const& base, Path const& target) noexcept {
+    return plainTextBelow(base.native(), target.native());
+}
+
 std::u16string getRelativePath(Path const& base, Path const& target) {
-    if (auto const below = plainTextBelow(base.native(), target.native())) {
+    if (auto const below = textBelow(base, target)) {
         return std::u16string(*below);
     }
     Parting const parting(base.native(), target.native());

@@ -157,6 +157,33 @@ MetadataPath MetadataPath::child(PathElement element) const {
     return MetadataPath(LastStep(), step);
 }
 
+void MetadataPath::replaceSteps(std::size_t kept, std::u16string_view type,
+                                std::span<std::u16string_view const> locations) {
+    std::size_t const wanted = kept + locations.size();
+    bool const canReuse = isAloneBehind(kept);
+    while (depth() > (canReuse ? wanted : kept)) {
+        *this = parent();
+    }
+    std::size_t const reused = depth() - kept;
+    auto* step = const_cast<Step*>(step_); // no step is created constant
+    for (std::size_t place = reused; place > 0; --place) {
+        step->element.assign(type, locations[place - 1]);
+        delete step->list.exchange(nullptr, std::memory_order_relaxed);
+        step = const_cast<Step*>(step->parent);
+    }
+    for (auto const& location : locations.subspan(reused)) {
+        *this = child(PathElement(std::u16string(type), std::u16string(location)));
+    }
+}
+
+bool MetadataPath::isAloneBehind(std::size_t first) const noexcept {
+    auto const* step = step_;
+    while (step != nullptr && step->depth > first && step->uses.load(std::memory_order_acquire) == 1) {
+        step = step->parent;
+    }
+    return step == nullptr || step->depth <= first;
+}
+
 bool MetadataPath::isWithin(MetadataPath const& other) const noexcept {
     auto const* step = ascend(step_, other.depth());
     return depth() >= other.depth() && std::is_eq(compareSteps(step, other.step_));

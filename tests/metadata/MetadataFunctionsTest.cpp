@@ -10,6 +10,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
 #include "support/TemporaryFolder.hpp"
@@ -90,6 +91,11 @@ TEST(GetRelativePath, isTheTargetBelowTheBase) {
     EXPECT_EQ(getRelativePath(u"/", u"/a/b"), u"a/b");
     EXPECT_EQ(getRelativePath(u"a", u"a/b"), u"b");
     EXPECT_EQ(getRelativePath(u"", u"a/b"), u"a/b");
+    EXPECT_EQ(textBelow(u"/a", u"/a/b/c.txt"), u"b/c.txt");
+    EXPECT_EQ(textBelow(u"/", u"/a/b"), u"a/b");
+    for (auto const* other : {u"/a", u"/a/", u"/ab", u"/a//b", u"/a/b//c", u"/a/b/", u"/b"}) {
+        EXPECT_EQ(textBelow(u"/a", other), std::nullopt);
+    }
 }
 
 TEST(GetRelativePath, isEmptyForTheSameElements) {

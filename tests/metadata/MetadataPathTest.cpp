@@ -43,6 +43,42 @@ TEST(MetadataPath, theListIsTheSameAtEachCallAndSafeForTwoThreads) {
     EXPECT_THAT(lists, testing::Each(&path.getPath()));
 }
 
+/// The address with the first steps of another one and further steps of the type "t".
+MetadataPath replaced(MetadataPath path, std::size_t kept,
+                      std::vector<std::u16string_view> const& locations) {
+    path.replaceSteps(kept, u"t", locations);
+    return path;
+}
+
+TEST(MetadataPath, theStepsBehindTheFirstOnesAreReplaced) {
+    MetadataPath const path({PathElement(u"a", u"1"), PathElement(u"b", u"2"), PathElement(u"c", u"3")});
+    EXPECT_EQ(replaced(path, 1, {u"x"}), MetadataPath({PathElement(u"a", u"1"), PathElement(u"t", u"x")}));
+    EXPECT_EQ(replaced(path, 3, {u"x"}), path.child(PathElement(u"t", u"x")));
+    EXPECT_EQ(replaced(path, 2, {}), path.parent());
+    EXPECT_EQ(replaced(path, 0, {u"x"}), MetadataPath({PathElement(u"t", u"x")}));
+    EXPECT_EQ(path,
+              MetadataPath({PathElement(u"a", u"1"), PathElement(u"b", u"2"), PathElement(u"c", u"3")}));
+}
+
+TEST(MetadataPath, anAddressWhoseStepsAreReplacedDoesNotChangeOthers) {
+    auto path = MetadataPath({PathElement(u"t", u"1"), PathElement(u"t", u"2"), PathElement(u"t", u"3")});
+    auto const above = path.parent();
+    auto const copy = path;
+    path.replaceSteps(1, u"t", std::vector<std::u16string_view>{u"x", u"y", u"z"});
+    EXPECT_EQ(path.getPath().size(), 4U);
+    EXPECT_EQ(above, MetadataPath({PathElement(u"t", u"1"), PathElement(u"t", u"2")}));
+    EXPECT_EQ(copy, above.child(PathElement(u"t", u"3")));
+
+    // Now it alone contains the steps, and changes them in place.
+    path.replaceSteps(1, u"s", std::vector<std::u16string_view>{u"p", u"q"});
+    EXPECT_THAT(path.getPath(),
+                ElementsAre(PathElement(u"t", u"1"), PathElement(u"s", u"p"), PathElement(u"s", u"q")));
+    auto const child = path.child(PathElement(u"t", u"c"));
+    path.replaceSteps(0, u"t", std::vector<std::u16string_view>{u"m", u"n", u"o"});
+    EXPECT_EQ(child.parent().getLeaf(), PathElement(u"s", u"q"));
+    EXPECT_EQ(path[0], PathElement(u"t", u"m"));
+}
+
 TEST(MetadataPath, anAddressIsWithinItselfAndThoseAboveIt) {
     MetadataPath const above({PathElement(u"a", u"1")});
     auto const below = MetadataPath({PathElement(u"a", u"1"), PathElement(u"b", u"2")});

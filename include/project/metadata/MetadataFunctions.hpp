@@ -1,6 +1,8 @@
 #pragma once
 
+#include <optional>
 #include <string>
+#include <string_view>
 
 #include "fl/filesystem/Path.hpp"
 #include "project/metadata/Export.hpp"
@@ -24,6 +26,11 @@ PROJECT_METADATA_EXPORT Path getParentFolder(Path const& path);
 /// Returns the target relative to the base, from the text alone, with "/" between elements. The result is
 /// empty if both have the same elements, and begins with ".." if the target is neither the base nor below it.
 PROJECT_METADATA_EXPORT std::u16string getRelativePath(Path const& base, Path const& target);
+
+/// Returns the same as getRelativePath, as a part of the target's text. Nothing if the target is not below
+/// the base, or if its text is not such a part: for example, if separators are repeated.
+PROJECT_METADATA_EXPORT std::optional<std::u16string_view> textBelow(Path const& base,
+                                                                     Path const& target) noexcept;
 
 /// Returns true if the path is below the folder, from the text alone. A path is not below itself.
 PROJECT_METADATA_EXPORT bool isParent(Path const& path, Path const& folder);

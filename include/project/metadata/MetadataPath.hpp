@@ -2,6 +2,8 @@
 
 #include <compare>
 #include <cstddef>
+#include <span>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -12,7 +14,7 @@ namespace project::metadata {
 
 /// An address in the metadata tree: the steps from the tree's root down to one position.
 ///
-/// An immutable value. Addresses share common steps: a copy increments one counter, a child is one
+/// A value. Addresses share common steps: a copy increments one counter, a child is one
 /// allocation, and a comparison stops at the first shared step. Several threads may read one value at the
 /// same time.
 class PROJECT_METADATA_EXPORT MetadataPath {
@@ -64,6 +66,14 @@ public:
     /// Returns the address one step below.
     MetadataPath child(PathElement element) const;
 
+    /// Keeps the first steps of this address, and replaces those behind them by steps of one type. Reuses the
+    /// memory of steps that no other address contains: an address that is changed again and again costs
+    /// almost no allocations.
+    /// @param kept at most depth().
+    /// @param locations of the new steps, in texts of others.
+    void replaceSteps(std::size_t kept, std::u16string_view type,
+                      std::span<std::u16string_view const> locations);
+
     /// Returns true if this address is the other one or below it.
     bool isWithin(MetadataPath const& other) const noexcept;
 
@@ -76,6 +86,9 @@ private:
 
     /// Selects the constructor below. With a pointer alone, MetadataPath({}) would be ambiguous.
     struct LastStep {};
+
+    /// True if no other address contains any of the steps behind the first ones.
+    bool isAloneBehind(std::size_t first) const noexcept;
 
     /// Takes over one use of a step.
     MetadataPath(LastStep, Step const* last) noexcept : step_(last) {}

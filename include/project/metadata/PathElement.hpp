@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <string_view>
 #include <utility>
 
 namespace project::metadata {
@@ -17,6 +18,14 @@ public:
     /// Returns the location, which distinguishes the step from its siblings: a file's name, a UUID, or a
     /// constant such as "Root".
     std::u16string const& getLocation() const noexcept { return location_; }
+
+    /// Replaces both. Reuses the memory of the earlier ones.
+    void assign(std::u16string_view type, std::u16string_view location) {
+        if (type_ != type) {
+            type_ = type;
+        }
+        location_ = location;
+    }
 
     friend bool operator==(PathElement const&, PathElement const&) = default;
 
