@@ -28,9 +28,18 @@ void makeRoom(std::pmr::vector<Element>& elements, std::size_t more) {
 
 } // namespace
 
-StoredName Chunk::name(std::size_t index) const noexcept {
-    auto const from = begin(index);
-    return {{names_.data() + from, entries_[index].end - from}, has(index, wide)};
+Chunk::Found Chunk::find(ElementKey const& key) const noexcept {
+    std::size_t low = 0;
+    std::size_t high = size();
+    while (low < high) {
+        std::size_t const middle = low + (high - low) / 2;
+        auto const order = compare(key, middle);
+        if (std::is_eq(order)) {
+            return {middle, true};
+        }
+        std::is_gt(order) ? low = middle + 1 : high = middle;
+    }
+    return {low, false};
 }
 
 Node const& Chunk::node(std::size_t index) const noexcept {
@@ -169,7 +178,11 @@ Chunk Chunk::takeTrimmed(std::pmr::memory_resource* memory) {
 }
 
 std::pmr::vector<Chunk::Record>::const_iterator Chunk::recordAt(std::size_t index) const noexcept {
-    return std::partition_point(records_.begin(), records_.end(),
+    // All entries before it have records, except for those without.
+    auto const without = entries_.size() - records_.size();
+    auto const from = static_cast<std::ptrdiff_t>(index - std::min(index, without));
+    auto const to = static_cast<std::ptrdiff_t>(std::min(index, records_.size()));
+    return std::partition_point(std::next(records_.begin(), from), std::next(records_.begin(), to),
                                 [index](Record const& record) { return record.index < index; });
 }
 

@@ -46,12 +46,23 @@ public:
 
     TypeTable::Index type(std::size_t index) const noexcept { return entries_[index].bits >> typeShift; }
 
-    StoredName name(std::size_t index) const noexcept;
+    StoredName name(std::size_t index) const noexcept {
+        auto const from = begin(index);
+        return {{names_.data() + from, entries_[index].end - from}, has(index, wide)};
+    }
 
     /// The order of an element and an entry.
     std::strong_ordering compare(ElementKey const& key, std::size_t index) const noexcept {
         return key.compareWith(type(index), name(index));
     }
+
+    /// The index of an element, or the one at which it would be inserted.
+    struct Found {
+        std::size_t index;
+        bool isFound;
+    };
+
+    Found find(ElementKey const& key) const noexcept;
 
     Node const& node(std::size_t index) const noexcept;
 

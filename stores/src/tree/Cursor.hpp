@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <cstddef>
 #include <utility>
 #include <vector>
@@ -23,6 +24,18 @@ public:
         isBelowInserted_ = false;
     }
 
+    /// Begins a search at the last step that the address shares with the address of the previous search,
+    /// which must still exist.
+    void beginBeside(Address const& address) {
+        std::swap(elements_, previous_);
+        address.listSteps(elements_);
+        std::size_t const most = std::min(depth_, elements_.size());
+        isBelowInserted_ = false;
+        for (depth_ = 0; depth_ < most && elements_[depth_] == previous_[depth_]; ++depth_) {
+            isBelowInserted_ = isBelowInserted_ || steps_[depth_].isInserted;
+        }
+    }
+
     /// The number of steps that were found.
     std::size_t depth() const noexcept { return depth_; }
 
@@ -44,7 +57,7 @@ public:
         }
         auto& step = steps_[depth_];
         bool const isSameLevel = step.level == &level;
-        auto const found = level.find(key, isSameLevel ? step.position : Level::Position());
+        auto const found = isSameLevel ? level.findNear(key, step.position) : level.find(key);
         bool const isSame = isSameLevel && found.isFound && found.position == step.position;
         step = {&level, found.position, isSame && step.isInserted};
         isBelowInserted_ = isBelowInserted_ || step.isInserted;
@@ -81,6 +94,7 @@ public:
         depth_ = 0;
         steps_.clear();
         elements_.clear();
+        previous_.clear();
     }
 
 private:
@@ -91,6 +105,7 @@ private:
     };
 
     std::vector<metadata::PathElement const*> elements_; ///< of the address
+    std::vector<metadata::PathElement const*> previous_; ///< of the previous one, only in beginBeside
     std::size_t depth_ = 0;
     bool isBelowInserted_ = false;
     std::vector<Step> steps_; ///< those behind depth_ are hints

@@ -20,7 +20,7 @@ public:
     std::u16string_view location() const noexcept { return name_.text(); }
 
     bool isEqual(TypeTable::Index type, StoredName const& name) const noexcept {
-        return name_.isEqual(name) && type_ == types_[type];
+        return name_.isEqual(name) && std::is_eq(compareTypes(type));
     }
 
     /// The order of this element and an entry: by type, then by location, each by code units.

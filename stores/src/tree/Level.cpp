@@ -1,6 +1,7 @@
 #include "tree/Level.hpp"
 
 #include <algorithm>
+#include <iterator>
 #include <new>
 #include <utility>
 
@@ -14,12 +15,11 @@ std::size_t Level::size() const noexcept {
     return size;
 }
 
-Level::Found Level::find(ElementKey const& key, Position hint) const noexcept {
+Level::Found Level::findNear(ElementKey const& key, Position hint) const noexcept {
     if (!isEntry(hint)) {
-        return search(key);
+        return find(key);
     }
-    auto const& likely = chunks_[hint.chunk];
-    if (key.isEqual(likely.type(hint.entry), likely.name(hint.entry))) {
+    if (isEqual(key, hint)) {
         return {hint, true};
     }
     auto const order = compare(key, hint);
@@ -39,30 +39,21 @@ Level::Found Level::find(ElementKey const& key, Position hint) const noexcept {
                         : Position{neighbour.chunk, neighbour.entry + 1},
                 false};
     }
-    return search(key);
+    return find(key);
 }
 
-Level::Found Level::search(ElementKey const& key) const noexcept {
-    auto const behind = std::partition_point(chunks_.begin(), chunks_.end(), [&key](Chunk const& candidate) {
-        return std::is_gteq(candidate.compare(key, 0));
-    });
-    if (behind == chunks_.begin()) {
+Level::Found Level::find(ElementKey const& key) const noexcept {
+    if (chunks_.empty()) {
         return {{0, 0}, false};
     }
-    auto const& chunk = *std::prev(behind);
-    std::size_t low = 0;
-    std::size_t high = chunk.size();
-    auto order = std::strong_ordering::greater;
-    while (low < high) {
-        std::size_t const middle = low + (high - low) / 2;
-        order = chunk.compare(key, middle);
-        if (std::is_eq(order)) {
-            low = middle;
-            break;
-        }
-        std::is_gt(order) ? low = middle + 1 : high = middle;
-    }
-    return {{static_cast<std::size_t>(behind - chunks_.begin()) - 1, low}, std::is_eq(order)};
+    // An element before all entries belongs to the first chunk too.
+    auto const behind =
+        std::partition_point(std::next(chunks_.begin()), chunks_.end(), [&key](Chunk const& candidate) {
+            return std::is_gteq(candidate.compare(key, 0));
+        });
+    auto const chunk = std::prev(behind);
+    auto const found = chunk->find(key);
+    return {{static_cast<std::size_t>(chunk - chunks_.begin()), found.index}, found.isFound};
 }
 
 metadata::PathElement Level::element(TypeTable const& types, Position at) const {

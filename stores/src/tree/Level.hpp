@@ -47,8 +47,10 @@ public:
 
     std::size_t size() const noexcept;
 
+    Found find(ElementKey const& key) const noexcept;
+
     /// @param hint where the element is likely to be, or next to it; any position.
-    Found find(ElementKey const& key, Position hint) const noexcept;
+    Found findNear(ElementKey const& key, Position hint) const noexcept;
 
     /// Calls a function with each position, in order.
     template <typename Function>
@@ -88,6 +90,11 @@ public:
     void trim() { chunks_.shrink_to_fit(); }
 
 private:
+    bool isEqual(ElementKey const& key, Position at) const noexcept {
+        auto const& chunk = chunks_[at.chunk];
+        return key.isEqual(chunk.type(at.entry), chunk.name(at.entry));
+    }
+
     std::strong_ordering compare(ElementKey const& key, Position at) const noexcept {
         return chunks_[at.chunk].compare(key, at.entry);
     }
@@ -110,7 +117,6 @@ private:
                             : Position{at.chunk - 1, chunks_[at.chunk - 1].size() - 1};
     }
 
-    Found search(ElementKey const& key) const noexcept;
     Position split(Position at);
     void mergeIfSmall(std::size_t chunk) noexcept;
 

@@ -46,18 +46,19 @@ MetadataTree::~MetadataTree() = default;
 
 Node MetadataTree::node(Address const& address) const {
     Cursors::Use use(cursors_);
-    auto& cursor = *use;
-    if (!moveTo(address, cursor) || cursor.depth() == 0) {
-        return nullptr;
-    }
-    return cursor.level(cursor.depth()).node(cursor.position(cursor.depth()));
+    return moveTo(address, *use) ? nodeAt(*use) : nullptr;
 }
 
 bool MetadataTree::hasNode(Address const& address) const {
     Cursors::Use use(cursors_);
-    auto& cursor = *use;
-    return moveTo(address, cursor) && cursor.depth() > 0 &&
-           cursor.level(cursor.depth()).node(cursor.position(cursor.depth()));
+    return moveTo(address, *use) && nodeAt(*use);
+}
+
+/// The node at the last step of a cursor; null if none is stored there, as at the root.
+Node const& MetadataTree::nodeAt(Cursor const& cursor) noexcept {
+    static Node const none;
+    auto const depth = cursor.depth();
+    return depth == 0 ? none : cursor.level(depth).node(cursor.position(depth));
 }
 
 bool MetadataTree::exists(Address const& address) const {
@@ -84,8 +85,18 @@ std::vector<Address> MetadataTree::children(Address const& address) const {
     return result;
 }
 
+Node const& MetadataTree::Search::node(Address const& address) {
+    static Node const none;
+    cursor_.beginBeside(address);
+    return tree_.descend(address, cursor_) ? nodeAt(cursor_) : none;
+}
+
 bool MetadataTree::moveTo(Address const& address, Cursor& cursor, Loading loading) const {
     cursor.begin(address);
+    return descend(address, cursor, loading);
+}
+
+bool MetadataTree::descend(Address const& address, Cursor& cursor, Loading loading) const {
     while (!cursor.isAtEnd()) {
         auto* const level = levelBelow(cursor, address, loading);
         if (level == nullptr || !cursor.stepDown(*level, types_)) {
@@ -150,7 +161,8 @@ void MetadataTree::set(Change const& change, Cursor& cursor, UndoSteps& undo) {
     using Kind = UndoSteps::Kind;
     auto const& address = change.address;
     bool const isCreated = change.kind == Change::Kind::Create;
-    bool const isThere = moveTo(address, cursor);
+    cursor.beginBeside(address);
+    bool const isThere = descend(address, cursor);
     // Below an address that this batch has added, no step is needed: undoing that one removes everything.
     bool const needsStep = !cursor.isBelowInserted();
     if (isThere) {
@@ -186,7 +198,8 @@ void MetadataTree::insertBelow(Cursor& cursor, Place place) {
 }
 
 void MetadataTree::remove(Address const& address, Cursor& cursor, UndoSteps& undo) {
-    if (!moveTo(address, cursor)) {
+    cursor.beginBeside(address);
+    if (!descend(address, cursor)) {
         return;
     }
     // An address above that has no node, was not created, and has no other children is deleted too.
@@ -217,7 +230,8 @@ void MetadataTree::undo(Undo undo) noexcept {
     Cursor cursor;
     for (auto step = undo->steps.rbegin(); step != undo->steps.rend(); ++step) {
         auto const& address = step->address;
-        bool const isThere = moveTo(address, cursor); // not for a change that threw
+        cursor.beginBeside(address);
+        bool const isThere = descend(address, cursor); // not for a change that threw
         switch (step->kind) {
         case UndoSteps::Kind::Added:
             if (isThere) {
@@ -280,7 +294,8 @@ void MetadataTree::reload(LevelBelow& below, Address const& address) {
             return;
         }
         auto const element = reloaded->element(types_, at);
-        auto const found = earlier.find(ElementKey(types_, element.getType(), element.getLocation()), hint);
+        auto const found =
+            earlier.findNear(ElementKey(types_, element.getType(), element.getLocation()), hint);
         hint = found.position;
         auto* const known = found.isFound ? earlier.below(found.position) : nullptr;
         if (known != nullptr && known->loaded() != nullptr && !known->loaded()->empty()) {

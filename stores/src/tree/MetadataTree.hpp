@@ -40,6 +40,20 @@ public:
     struct UndoSteps;
     using Undo = std::shared_ptr<UndoSteps>;
 
+    /// Queries for many addresses, which must all exist until the last query. Each search begins at the last
+    /// step that an address shares with the previous one. The tree must not change in the meantime.
+    class Search {
+    public:
+        explicit Search(MetadataTree const& tree) : tree_(tree) {}
+
+        /// The node at an address; null if none is stored there.
+        Node const& node(Address const& address);
+
+    private:
+        MetadataTree const& tree_;
+        Cursor cursor_;
+    };
+
     explicit MetadataTree(Loader loader);
     ~MetadataTree();
     MetadataTree(MetadataTree const&) = delete;
@@ -72,6 +86,10 @@ private:
 
     /// Moves a cursor to an address, or to the last step above it that exists. @return true if it exists.
     bool moveTo(Address const& address, Cursor& cursor, Loading loading = Loading::OnRequest) const;
+
+    /// Moves a cursor from a step on the way to its address.
+    bool descend(Address const& address, Cursor& cursor, Loading loading = Loading::OnRequest) const;
+    static Node const& nodeAt(Cursor const& cursor) noexcept;
 
     /// The level below the last step of a cursor, which is on the way to an address. Null if there is none.
     Level* levelBelow(Cursor const& cursor, Address const& address, Loading loading) const;

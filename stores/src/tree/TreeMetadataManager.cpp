@@ -151,12 +151,13 @@ void TreeMetadataManager::setNodes(std::map<Address, std::shared_ptr<MetadataNod
     state_->requireNotCommitting();
     Batch batch;
     batch.reserve(nodes.size());
+    MetadataTree::Search search(state_->tree);
     for (auto const& [address, node] : nodes) {
         if (!node || address.depth() == 0) {
             throw std::invalid_argument(node ? "a node cannot be stored at the root of the metadata tree"
                                              : "a null node was given to the metadata store");
         }
-        auto const before = state_->tree.node(address);
+        auto const& before = search.node(address);
         if (!before || !isEqual(*before, *node)) {
             batch.push_back({Change::Kind::Set, address, copyOf(*node)});
         }

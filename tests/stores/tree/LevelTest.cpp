@@ -41,7 +41,7 @@ protected:
     };
 
     Level::Found find(PathElement const& element) {
-        auto found = level->find(ElementKey(types, element.getType(), element.getLocation()), hint);
+        auto found = level->findNear(ElementKey(types, element.getType(), element.getLocation()), hint);
         hint = found.position;
         return found;
     }
@@ -94,8 +94,10 @@ protected:
             auto const* const below = level->below(at);
             EXPECT_EQ(below == nullptr ? nullptr : below->loaded(), known->second.below);
             ElementKey const key(types, known->first.getType(), known->first.getLocation());
+            EXPECT_TRUE(level->find(key).isFound);
+            EXPECT_EQ(level->find(key).position, at);
             for (auto const& from : {hint, at, Level::Position{}, Level::Position{at.chunk, at.entry + 1}}) {
-                auto const found = level->find(key, from);
+                auto const found = level->findNear(key, from);
                 EXPECT_TRUE(found.isFound);
                 EXPECT_EQ(level->element(types, found.position), known->first);
             }

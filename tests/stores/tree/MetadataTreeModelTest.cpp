@@ -3,6 +3,7 @@
 #include "tree/MetadataTree.hpp"
 
 #include <algorithm>
+#include <iterator>
 #include <map>
 #include <numeric>
 #include <random>
@@ -91,6 +92,9 @@ public:
             undoAll();
             forgetAll();
             break;
+        case 7:
+            search();
+            break;
         default:
             query(drawAddress());
         }
@@ -115,11 +119,16 @@ private:
         return {types[draw(3) == 0 ? draw(types.size()) : 0], names[draw(names.size())]};
     }
 
+    /// Half of the addresses share steps with the one before.
     Address drawAddress() {
-        auto address = Address::root();
+        auto address = draw(2) == 0 ? Address::root() : drawn_;
+        for (auto shared = draw(3); address.depth() > shared;) {
+            address = address.parent();
+        }
         for (auto depth = draw(4) + 1; depth > 0; --depth) {
             address = address.child(drawElement());
         }
+        drawn_ = address;
         return address;
     }
 
@@ -220,12 +229,27 @@ private:
         EXPECT_EQ(tree_.children(address), children);
     }
 
+    /// Queries for several addresses in one search.
+    void search() {
+        std::vector<Address> addresses;
+        std::generate_n(std::back_inserter(addresses), 8, [this] { return drawAddress(); });
+        addresses.push_back(Address::root());
+        MetadataTree::Search search(tree_);
+        for (auto const& address : addresses) {
+            auto const expected = current_.node(address);
+            auto const& node = search.node(address);
+            EXPECT_EQ(node == nullptr, expected == nullptr);
+            EXPECT_TRUE(!node || !expected || isEqual(*node, *expected));
+        }
+    }
+
     struct Undone {
         MetadataTree::Undo undo;
         States before;
     };
 
     std::mt19937 random_;
+    Address drawn_ = Address::root();
     States stored_;  ///< of the backend: without the batches that can be undone
     States current_; ///< of the tree
     MetadataTree tree_{[this](Address const& address, ChildSink& sink) {
