@@ -1,6 +1,7 @@
 #include <benchmark/benchmark.h>
 
 #include "GeneratedTree.hpp"
+#include "LmdbPeer.hpp"
 #include "SqlitePeer.hpp"
 #include "project/core/FileManager.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
@@ -53,6 +54,22 @@ void addToSqlite(benchmark::State& state) {
     }
 }
 
+void addToLmdb(benchmark::State& state) {
+    auto const& tree = GeneratedTree::large();
+    auto const paths = rows(tree);
+    auto const folder = tree.onDisk() / ".peer.lmdb";
+    for (auto _ : state) {
+        state.PauseTiming();
+        std::filesystem::remove_all(folder);
+        auto peer = std::make_unique<LmdbPeer>(folder);
+        state.ResumeTiming();
+        peer->insert(paths);
+        state.PauseTiming();
+        peer.reset();
+        state.ResumeTiming();
+    }
+}
+
 void statTwice(benchmark::State& state) {
     auto const& tree = GeneratedTree::large();
     for (auto _ : state) {
@@ -69,6 +86,7 @@ void statTwice(benchmark::State& state) {
     };
     repeat(benchmark::RegisterBenchmark("add/project", addToProject));
     repeat(benchmark::RegisterBenchmark("add/sqlite", addToSqlite));
+    repeat(benchmark::RegisterBenchmark("add/lmdb", addToLmdb));
     repeat(benchmark::RegisterBenchmark("add/two-stats-a-file", statTwice));
     return true;
 }();

@@ -1,5 +1,6 @@
 #include "GeneratedTree.hpp"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstdlib>
 #include <fstream>
@@ -20,20 +21,47 @@ constexpr std::size_t foldersInAFolder = 50;
 
 constexpr std::size_t deepest = 100;
 
-std::filesystem::path folderOf(std::size_t file, std::size_t files, GeneratedTree::Shape shape) {
+std::filesystem::path nameOf(std::size_t file) {
+    return "source_file_" + std::to_string(file) + ".cpp";
+}
+
+/// The files below /usr, relative to it, folder by folder.
+std::vector<std::filesystem::path> const& filesOfThisMachine() {
+    static std::vector<std::filesystem::path> const files = [] {
+        std::filesystem::path const top("/usr");
+        std::vector<std::filesystem::path> found;
+        auto const options = std::filesystem::directory_options::skip_permission_denied;
+        for (auto const& entry : std::filesystem::recursive_directory_iterator(top, options)) {
+            if (entry.is_regular_file() && !entry.is_symlink()) {
+                found.push_back(entry.path().lexically_relative(top));
+            }
+        }
+        std::ranges::sort(found);
+        return found;
+    }();
+    return files;
+}
+
+std::filesystem::path pathOf(std::size_t file, std::size_t files, GeneratedTree::Shape shape) {
     switch (shape) {
     case GeneratedTree::Shape::Wide: {
         auto const folder = file / filesInAFolder;
-        return "module" + std::to_string(folder / foldersInAFolder) + "/component" + std::to_string(folder);
+        return std::filesystem::path("module" + std::to_string(folder / foldersInAFolder)) /
+               ("component" + std::to_string(folder)) / nameOf(file);
     }
     case GeneratedTree::Shape::Flat:
-        return "folder";
+        return "folder" / nameOf(file);
     case GeneratedTree::Shape::Deep: {
         std::filesystem::path result = "level";
         for (auto depth = file * deepest / files; depth > 0; --depth) {
             result /= "level";
         }
-        return result;
+        return result / nameOf(file);
+    }
+    case GeneratedTree::Shape::Real: {
+        auto const& names = filesOfThisMachine();
+        return std::filesystem::path("copy" + std::to_string(file / names.size())) /
+               names[file % names.size()];
     }
     }
     return {};
@@ -51,12 +79,11 @@ GeneratedTree::GeneratedTree(std::size_t files, Shape shape) {
     std::fprintf(stderr, "creating %zu files in %s\n", files, root_.c_str());
     std::filesystem::path lastFolder;
     for (std::size_t made = 0; made < files; ++made) {
-        auto const folder = root_ / folderOf(made, files, shape);
-        if (folder != lastFolder) {
-            std::filesystem::create_directories(folder);
-            lastFolder = folder;
+        auto const file = root_ / pathOf(made, files, shape);
+        if (file.parent_path() != lastFolder) {
+            lastFolder = file.parent_path();
+            std::filesystem::create_directories(lastFolder);
         }
-        auto const file = folder / ("source_file_" + std::to_string(made) + ".cpp");
         std::ofstream(file).flush();
         files_.push_back(fl::filesystem::fromSystem(file));
     }

@@ -18,6 +18,7 @@ public:
         Wide, ///< folders of twenty files, fifty of them in a folder
         Flat, ///< all files in one folder
         Deep, ///< a hundred folders inside each other, with as many files in each
+        Real, ///< the names below /usr, in copies of it if there are not enough of them
     };
 
     explicit GeneratedTree(std::size_t files, Shape shape = Shape::Wide);

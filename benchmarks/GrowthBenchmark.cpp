@@ -87,7 +87,7 @@ void addOne(benchmark::State& state, Shape shape, std::size_t files) {
         {"look-up", {lookUp, 2'000}}, {"add-one", {addOne, 50}},
     };
     std::map<std::string, Shape> const shapes{
-        {"wide", Shape::Wide}, {"flat", Shape::Flat}, {"deep", Shape::Deep}};
+        {"wide", Shape::Wide}, {"flat", Shape::Flat}, {"deep", Shape::Deep}, {"real", Shape::Real}};
     for (auto const& [shapeName, shape] : shapes) {
         for (std::size_t const files : {1'000, 10'000, 100'000, 1'000'000}) {
             for (auto const& [workName, work] : works) {

@@ -3,6 +3,7 @@
 #include <benchmark/benchmark.h>
 
 #include "GeneratedTree.hpp"
+#include "LmdbPeer.hpp"
 #include "Process.hpp"
 #include "SqlitePeer.hpp"
 #include "project/core/FileManager.hpp"
@@ -60,14 +61,19 @@ void nameByProcess(benchmark::State& state) {
     }
 }
 
-void lookUpInSqlite(benchmark::State& state) {
-    auto const& tree = GeneratedTree::large();
+std::vector<std::string> relativeFiles(GeneratedTree const& tree) {
     std::vector<std::string> paths;
     for (auto const& file : tree.files()) {
         paths.push_back(fl::filesystem::toSystem(file).lexically_relative(tree.onDisk()).string());
     }
-    auto const file = tree.onDisk() / ".lookup.db";
-    SqlitePeer peer(file);
+    return paths;
+}
+
+template <typename Peer>
+void lookUpInPeer(benchmark::State& state, char const* name) {
+    auto const& tree = GeneratedTree::large();
+    auto const paths = relativeFiles(tree);
+    Peer peer(tree.onDisk() / name);
     peer.insert(paths);
     std::size_t next = 0;
     for (auto _ : state) {
@@ -100,7 +106,8 @@ void lookUpByGit(benchmark::State& state) {
     benchmark::RegisterBenchmark("lookup/project", lookUpInProject)->UseRealTime();
     benchmark::RegisterBenchmark("lookup/under-a-guard", lookUpUnderAGuard)->UseRealTime();
     benchmark::RegisterBenchmark("lookup/stat", statOnce)->UseRealTime();
-    benchmark::RegisterBenchmark("lookup/sqlite", lookUpInSqlite)->UseRealTime();
+    benchmark::RegisterBenchmark("lookup/sqlite", lookUpInPeer<SqlitePeer>, ".lookup.db")->UseRealTime();
+    benchmark::RegisterBenchmark("lookup/lmdb", lookUpInPeer<LmdbPeer>, ".lookup.lmdb")->UseRealTime();
     auto const repeat = [](benchmark::internal::Benchmark* made) {
         made->Iterations(5)->UseRealTime()->Unit(benchmark::kMillisecond);
     };
