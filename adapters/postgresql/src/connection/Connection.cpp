@@ -1,5 +1,6 @@
 #include "connection/Connection.hpp"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
 #include <memory>
@@ -234,8 +235,9 @@ void Connection::flush(Limits const& limits) {
 }
 
 void Connection::waitFor(short events, Limits const& limits) {
-    if (!awaitDescriptor(PQsocket(handle_), events, limits.whole.within(limits.silence))) {
-        throw ConnectionLost(where_, "no answer in " + inSeconds(limits.silence));
+    auto const limit = std::min(limits.whole.remaining(), limits.silence);
+    if (!awaitDescriptor(PQsocket(handle_), events, Deadline(limit))) {
+        throw ConnectionLost(where_, "no answer in " + inSeconds(limit));
     }
 }
 
