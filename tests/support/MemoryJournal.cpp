@@ -9,7 +9,6 @@
 
 namespace project::test {
 
-using stores::JournalEntry;
 using stores::JournalLook;
 using stores::JournalPosition;
 using stores::JournalRecord;

@@ -51,7 +51,7 @@ public:
     std::optional<SetAside> repair();
     void storeInCache() noexcept;
 
-    std::optional<HistoryLoss> takeHistoryLoss() { return std::exchange(seen_.loss(), std::nullopt); }
+    std::optional<HistoryLoss> takeHistoryLoss() { return seen_.takeLoss(); }
 
     bool isShowingLastState() const noexcept { return isShowingLastState_; }
 
@@ -79,7 +79,7 @@ private:
     void follow(JournalLook look);
     void requireRead() const;
     void requireUndamaged() const;
-    void requireNoReset();
+    void requireNoReset() const;
     StoreError damageError() const;
     std::string problemOf(SeenLog const& log) const;
     PendingEntry prepare(Batch const& batch) const;
@@ -197,7 +197,7 @@ void JournalBackend::State::requireUndamaged() const {
     }
 }
 
-void JournalBackend::State::requireNoReset() {
+void JournalBackend::State::requireNoReset() const {
     auto const& loss = seen_.loss();
     if (loss && loss->kind == HistoryLoss::Kind::Reset) {
         throw StoreError(StoreError::Kind::Refused, journal->name(), 0,

@@ -5,6 +5,7 @@
 #include <span>
 #include <string>
 #include <string_view>
+#include <utility>
 
 #include "project/stores/Change.hpp"
 #include "project/stores/HistoryLoss.hpp"
@@ -54,7 +55,9 @@ public:
     std::optional<DamagedEntry> const& damage() const noexcept { return damage_; }
 
     /// The loss of history that was found and not taken.
-    std::optional<HistoryLoss>& loss() noexcept { return loss_; }
+    std::optional<HistoryLoss> const& loss() const noexcept { return loss_; }
+
+    std::optional<HistoryLoss> takeLoss() noexcept { return std::exchange(loss_, std::nullopt); }
 
     /// Reads the text from a body in the history, with all entries after it. @return false if the body is
     /// unreadable.
