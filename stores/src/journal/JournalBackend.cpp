@@ -363,17 +363,14 @@ std::optional<JournalBackend::SetAside> JournalBackend::State::repair() {
     if (!log.damage()) {
         return std::nullopt;
     }
-    bool const isNothingLost = seen_.hasRead() && !seen_.damage();
-    if (!isNothingLost && !log.hasRead()) {
+    if (!seen_.hasRead()) {
         throw StoreError(StoreError::Kind::Damaged, journal->name(), 0,
                          problemOf(log) + "; nothing before it is readable",
                          "Replace the definition by a copy.");
     }
-    SetAside const result{log.damage()->version, log.newest().version, isNothingLost};
-    ProjectText body = (isNothingLost ? seen_ : log).text().rewrittenWith({});
-    auto differences = seen_.text().differencesTo(body);
-    appendBody(std::move(body), {});
-    addChanges(unreported_, {false, std::move(differences)});
+    // This client has read at least as much as is readable now, and perhaps more, before it was damaged.
+    SetAside const result{log.damage()->version, log.newest().version, !seen_.damage()};
+    appendBody(seen_.text().rewrittenWith({}), {});
     return result;
 }
 

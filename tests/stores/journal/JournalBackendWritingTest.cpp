@@ -219,6 +219,18 @@ TEST_F(JournalBackendWriting, anAnswerThatDoesNotArriveLeavesTheOutcomeUnknownAn
     }
 }
 
+TEST_F(JournalBackendWriting, afterAnUnknownOutcomeTheNextReaderChecksWhateverTheFreshness) {
+    prepare({u"a"});
+    auto const writer = open({.freshness = std::chrono::hours(1)});
+    contentOf(*writer);
+    server->plan(Fault::Stalls, 1);
+    EXPECT_EQ(errorOf([&] { commit(*writer, {set(fileAddress(u"b"))}); }).kind(),
+              StoreError::Kind::OutcomeUnknown);
+    server->cancelPlan();
+
+    EXPECT_EQ(contentOf(*writer), files({u"a", u"b"}));
+}
+
 TEST_F(JournalBackendWriting, aBatchThatTheServerStoresLateIsShownWhenItIsThereAndOnlyOnce) {
     prepare({u"a"});
     auto const writer = open();

@@ -119,6 +119,55 @@ TEST_F(JournalDamage, eachDamagedByteOfABodyIsNoticed) {
     }
 }
 
+TEST_F(JournalDamage, aBodyWithOtherLineEndsIsDamageAlthoughChecksumsDoNotCoverThem) {
+    std::string const bytes = server->pieces().at(server->entry(1).read.position.id);
+    auto const firstEnd = bytes.find('\n');
+    for (auto const& wrong : {bytes.substr(0, firstEnd) + bytes.substr(firstEnd + 1),
+                              bytes.substr(0, firstEnd) + "\r" + bytes.substr(firstEnd)}) {
+        ASSERT_EQ(stores::samples::sumOf(bytes.substr(0, firstEnd + 1)),
+                  stores::samples::sumOf(bytes.substr(0, firstEnd) + "\r\n"));
+        server->pieces().at(server->entry(1).read.position.id) = wrong;
+        EXPECT_EQ(errorOf([&] { contentOf(*open()); }).kind(), StoreError::Kind::Damaged);
+    }
+}
+
+TEST_F(JournalDamage, anEntryWithAnotherNumberIsDamage) {
+    server->entry(4).read.position.version = 5;
+    expectDamage(5, {u"a", u"b", u"c"});
+}
+
+/// An entry with a body and a batch that contradict each other.
+class JournalContradiction : public JournalDamage {
+protected:
+    void SetUp() override {
+        JournalDamage::SetUp();
+        contentOf(*reader_);
+        commit(*open({.shortTail = 150}), {set(fileAddress(u"e"))});
+        auto& entry = server->entry(5);
+        ASSERT_TRUE(entry.read.isBody);
+        ASSERT_FALSE(entry.read.lines.empty());
+        auto const other = textOf(addFiles({u"a", u"b", u"c", u"x"}));
+        entry.read.position.sum = stores::samples::sumOf(other);
+        server->pieces().at(entry.read.position.id) = other;
+    }
+
+    std::unique_ptr<JournalBackend> const reader_ = open();
+};
+
+TEST_F(JournalContradiction, isReadAsTheBody) {
+    Entered const guard(*reader_);
+    EXPECT_THAT(addressesOf(guard.changes().differences), ElementsAre(fileAddress(u"d"), fileAddress(u"x")));
+    EXPECT_EQ(loadAll(*reader_), files({u"a", u"b", u"c", u"x"}));
+}
+
+TEST_F(JournalContradiction, isDamageIfTheBodyIsMissing) {
+    server->pieces().erase(server->entry(5).read.position.id);
+    Entered const guard(*reader_);
+    EXPECT_THAT(guard.changes().differences, IsEmpty());
+    EXPECT_EQ(loadAll(*reader_), files({u"a", u"b", u"c", u"d"}));
+    expectDamage(5, {u"a", u"b", u"c", u"d"});
+}
+
 TEST_F(JournalDamage, aLogWithoutABodyIsDamage) {
     server->entries().pop_front();
     auto const error = errorOf([&] { contentOf(*open()); });
@@ -162,6 +211,21 @@ TEST_F(JournalDamage, aClientThatReadTheEntriesBeforeTheyWereDamagedRepairsThemW
     EXPECT_TRUE(aside->isNothingLost);
     EXPECT_EQ(stored(), files({u"a", u"b", u"c", u"d"}));
     EXPECT_FALSE(healthy_->repair());
+}
+
+TEST_F(JournalDamage, aClientThatReadSomeOfTheEntriesBeforeTheyWereDamagedLosesOnlyTheOthers) {
+    commit(*open(), {set(fileAddress(u"e"))});
+    corrupt(server->entry(2).read.lines);
+    corrupt(server->entry(5).read.lines);
+
+    auto const aside = healthy_->repair();
+
+    ASSERT_TRUE(aside);
+    EXPECT_EQ(aside->first, 2U);
+    EXPECT_EQ(aside->last, 5U);
+    EXPECT_FALSE(aside->isNothingLost);
+    EXPECT_EQ(stored(), files({u"a", u"b", u"c", u"d"}));
+    EXPECT_EQ(contentOf(*healthy_), stored());
 }
 
 TEST_F(JournalDamage, anyOtherClientSetsTheDamagedEntriesAsideAndTheyStayInTheLog) {

@@ -94,6 +94,17 @@ TEST_F(JournalHistory, writesAreRefusedUntilTheResetWasTaken) {
     EXPECT_EQ(stored(), files({u"a", u"d"}));
 }
 
+TEST_F(JournalHistory, theDamageOfAServerThatWasResetIsFoundToo) {
+    server->resetTo(2);
+    server->entry(2).read.lines.clear();
+
+    EXPECT_EQ(contentOf(*client_), files({u"a"}));
+
+    EXPECT_TRUE(client_->takeHistoryLoss());
+    Entered const guard(*client_, Access::Write);
+    EXPECT_EQ(errorOf([&] { client_->write({set(fileAddress(u"d"))}); }).kind(), StoreError::Kind::Damaged);
+}
+
 TEST_F(JournalHistory, aResetDuringAWriteLeavesTheBatchUnstored) {
     Entered const guard(*client_, Access::Write);
     client_->write({set(fileAddress(u"d"))});
@@ -164,11 +175,13 @@ TEST_F(JournalHistory, onlyTheOwnerDeletesHistory) {
 
 TEST_F(JournalHistory, nothingIsDeletedIfTheEntriesThatWouldStayAreDamaged) {
     writer_->tidy();
-    server->pieces().erase(server->entry(4).read.position.id);
-
+    commit(*writer_, {set(fileAddress(u"d"))});
+    std::string const lines = std::exchange(server->entry(5).read.lines, "");
     EXPECT_EQ(errorOf([&] { writer_->deleteHistory(); }).kind(), StoreError::Kind::Damaged);
-
-    EXPECT_EQ(server->entries().size(), 4U);
+    server->entry(5).read.lines = lines;
+    server->pieces().erase(server->entry(4).read.position.id);
+    EXPECT_EQ(errorOf([&] { writer_->deleteHistory(); }).kind(), StoreError::Kind::Damaged);
+    EXPECT_EQ(server->entries().size(), 5U);
 }
 
 TEST_F(JournalHistory, theRecordsShowWhoWroteWhichEntry) {
