@@ -10,7 +10,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <gtest/gtest.h>
+#include <gmock/gmock.h>
 #include <rapidcheck/gtest.h>
 
 #include "support/TemporaryFolder.hpp"
