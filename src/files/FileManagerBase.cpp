@@ -1,5 +1,6 @@
 #include "files/FileManagerBase.hpp"
 
+#include <algorithm>
 #include <set>
 #include <utility>
 
@@ -106,9 +107,12 @@ void FileManagerBase::requireRemovable(std::vector<Path> const& files) const {
 }
 
 void FileManagerBase::removeEntryPointsOf(std::vector<Path> const& files) {
-    std::set<Path> entryPointFiles;
+    std::set<Path> entryPointFiles; // of these files: most of the project's are elsewhere
     for (auto const& entryPoint : entryPointManager_->getEntryPoints()) {
-        entryPointFiles.insert(entryPoint->getFile());
+        Path file = entryPoint->getFile();
+        if (std::binary_search(files.begin(), files.end(), file)) {
+            entryPointFiles.insert(std::move(file));
+        }
     }
     for (auto const& path : files) {
         if (entryPointFiles.contains(path)) {

@@ -50,6 +50,8 @@ private:
     void requireAddable(Path const& path) const;
     void requireRemovable(std::vector<Path> const& files) const;
     std::vector<Path> withAllDescendants(std::vector<Path> const& files) const;
+
+    /// @param files in Path order.
     void removeEntryPointsOf(std::vector<Path> const& files);
     void removeFromEveryScope(std::vector<Path> const& files);
 

@@ -1,5 +1,7 @@
 #include "project/metadata/MetadataNodeSpecification.hpp"
 
+#include <algorithm>
+#include <iterator>
 #include <map>
 #include <typeinfo>
 #include <utility>
@@ -12,6 +14,19 @@ namespace {
 
 using Values = std::map<std::u16string, std::u16string>;
 
+/// Values that never change, sorted by key: less memory than a map, and all in one place.
+using SharedValues = std::vector<std::pair<std::u16string, std::u16string>>;
+
+std::u16string const* find(Values const& values, std::u16string const& key) {
+    auto const found = values.find(key);
+    return found != values.end() ? &found->second : nullptr;
+}
+
+std::u16string const* find(SharedValues const& values, std::u16string const& key) {
+    auto const found = std::ranges::lower_bound(values, key, {}, &SharedValues::value_type::first);
+    return found != values.end() && found->first == key ? &found->second : nullptr;
+}
+
 std::u16string const& noText() {
     static std::u16string const text;
     return text;
@@ -22,7 +37,8 @@ std::u16string const& usualType() {
     return type;
 }
 
-std::vector<std::u16string> keysOf(Values const& values) {
+template <typename AnyValues>
+std::vector<std::u16string> keysOf(AnyValues const& values) {
     std::vector<std::u16string> keys;
     keys.reserve(values.size());
     for (auto const& [key, value] : values) {
@@ -38,11 +54,11 @@ struct MetadataNodeSpecification::Content {
 
     /// The value of a key; null if there is none.
     std::u16string const* find(std::u16string const& key) const {
-        auto const* const found = find(own.get(), key);
-        return found != nullptr ? found : find(shared.get(), key);
+        auto const* const found = own ? metadata::find(*own, key) : nullptr;
+        return found == nullptr && shared ? metadata::find(*shared, key) : found;
     }
 
-    /// Own values and shared ones. The node must have values.
+    /// Own values and shared ones.
     Values allValues() const {
         Values all = own ? *own : Values();
         if (shared) {
@@ -51,16 +67,18 @@ struct MetadataNodeSpecification::Content {
         return all;
     }
 
-    static std::u16string const* find(Values const* values, std::u16string const& key) {
-        if (values == nullptr) {
-            return nullptr;
+    /// The same, for copies of the node. The node must have values.
+    std::shared_ptr<SharedValues const> valuesToShare() const {
+        if (!own) {
+            return shared;
         }
-        auto const found = values->find(key);
-        return found != values->end() ? &found->second : nullptr;
+        auto all = allValues();
+        return std::make_shared<SharedValues const>(std::move_iterator(all.begin()),
+                                                    std::move_iterator(all.end()));
     }
 
-    std::unique_ptr<Values> own;          ///< put after the node was created; null if there are none
-    std::shared_ptr<Values const> shared; ///< with copies of the node; null if there are none
+    std::unique_ptr<Values> own;                ///< put after the node was created; null if there are none
+    std::shared_ptr<SharedValues const> shared; ///< with copies of the node; null if there are none
     std::vector<std::unique_ptr<MetadataNode>> children;
     std::u16string type; ///< unless it is one of the constants
 };
@@ -92,8 +110,7 @@ void MetadataNodeSpecification::copyValues(MetadataNode const& other) {
     }
     auto const& content = static_cast<MetadataNodeSpecification const&>(other).content_;
     if (content && content->hasValues()) {
-        makeContent().shared =
-            content->own ? std::make_shared<Values const>(content->allValues()) : content->shared;
+        makeContent().shared = content->valuesToShare();
     }
 }
 
@@ -101,9 +118,8 @@ void MetadataNodeSpecification::shareValues() {
     if (!content_) {
         return;
     }
-    if (content_->own) {
-        content_->shared = std::make_shared<Values const>(content_->shared ? content_->allValues()
-                                                                           : std::move(*content_->own));
+    if (content_->hasValues()) {
+        content_->shared = content_->valuesToShare();
         content_->own.reset();
     }
     for (auto const& child : content_->children) {
@@ -160,10 +176,7 @@ std::vector<std::u16string> MetadataNodeSpecification::getKeys() const {
     if (!content_ || !content_->hasValues()) {
         return {};
     }
-    if (content_->own && content_->shared) {
-        return keysOf(content_->allValues());
-    }
-    return keysOf(content_->own ? *content_->own : *content_->shared);
+    return content_->own ? keysOf(content_->allValues()) : keysOf(*content_->shared);
 }
 
 std::u16string const& MetadataNodeSpecification::getType() const {
