@@ -104,6 +104,7 @@ private:
     SystemFolder folder_;
     ForkSafeDescriptor written_; ///< the file that sync makes durable
     std::string writtenName_;
+    std::string identifiedPath_; ///< kept for its memory: every guard identifies the text
 };
 
 bool SystemDisk::lock(std::chrono::milliseconds patience) {
@@ -122,8 +123,8 @@ std::string SystemDisk::lockHolder() {
 
 std::optional<FileIdentity> SystemDisk::identifyByPath(std::string const& name) {
     folder_.requireOwnProcess();
-    std::string const path = folder_.pathOf(name);
-    return identifyIn(AT_FDCWD, path, path);
+    identifiedPath_.assign(folder_.path()).append("/").append(name);
+    return identifyIn(AT_FDCWD, identifiedPath_, identifiedPath_);
 }
 
 std::optional<FileIdentity> SystemDisk::identify(std::string const& name) {

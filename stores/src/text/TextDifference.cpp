@@ -100,6 +100,9 @@ std::vector<Difference> differences(TextContent const& before, TextContent const
 
 void addChanges(Changes& earlier, Changes later) {
     earlier.everything = earlier.everything || later.everything;
+    if (later.differences.empty()) {
+        return; // as after nearly every check
+    }
     earlier.differences.insert(earlier.differences.end(), std::make_move_iterator(later.differences.begin()),
                                std::make_move_iterator(later.differences.end()));
 }
