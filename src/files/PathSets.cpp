@@ -53,7 +53,7 @@ private:
 } // namespace
 
 bool isWithinFolder(Path const& folder, Path const& path) {
-    return !metadata::getRelativePath(folder, path).starts_with(u"..");
+    return !metadata::leadsUpward(folder, path);
 }
 
 std::vector<Path> withParentFolders(std::vector<Path> const& files, Path const& root) {

@@ -165,6 +165,11 @@ std::optional<std::u16string_view> textBelow(Path const& base, Path const& targe
     return plainTextBelow(base.native(), target.native());
 }
 
+bool leadsUpward(Path const& base, Path const& target) noexcept {
+    Parting const parting(base.native(), target.native());
+    return !parting.isRootShared || !parting.base.empty() || parting.target.starts_with(upward);
+}
+
 std::u16string getRelativePath(Path const& base, Path const& target) {
     if (auto const below = textBelow(base, target)) {
         return std::u16string(*below);

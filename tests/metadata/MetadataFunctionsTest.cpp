@@ -149,6 +149,7 @@ RC_GTEST_PROP(GetRelativePath, isTheResultOfThePlainAlgorithm, ()) {
     auto const target = anyPath();
 
     RC_ASSERT(getRelativePath(base, target) == relativeByHand(base, target));
+    RC_ASSERT(leadsUpward(base, target) == relativeByHand(base, target).starts_with(u".."));
 }
 
 RC_GTEST_PROP(GetRelativePath, isTheSameForPlainPathsBelowTheBase, ()) {
@@ -156,6 +157,7 @@ RC_GTEST_PROP(GetRelativePath, isTheSameForPlainPathsBelowTheBase, ()) {
     auto const target = base + u"/" + anyPath();
 
     RC_ASSERT(getRelativePath(base, target) == relativeByHand(base, target));
+    RC_ASSERT(leadsUpward(base, target) == relativeByHand(base, target).starts_with(u".."));
 }
 
 RC_GTEST_PROP(GetRelativePath, doesNotDependOnHowTheBaseSeparatesItsElements, ()) {

@@ -27,6 +27,9 @@ PROJECT_METADATA_EXPORT Path getParentFolder(Path const& path);
 /// empty if both have the same elements, and begins with ".." if the target is neither the base nor below it.
 PROJECT_METADATA_EXPORT std::u16string getRelativePath(Path const& base, Path const& target);
 
+/// Returns true if the target relative to the base begins with "..", without creating that text.
+PROJECT_METADATA_EXPORT bool leadsUpward(Path const& base, Path const& target) noexcept;
+
 /// Returns the same as getRelativePath, as a part of the target's text. Nothing if the target is not below
 /// the base, or if its text is not such a part: for example, if separators are repeated.
 PROJECT_METADATA_EXPORT std::optional<std::u16string_view> textBelow(Path const& base,
