@@ -18,6 +18,7 @@ using stores::JournalBackend;
 /// A cache in memory that outlives the process that uses it.
 struct SavedText {
     std::optional<stores::CachedText> cached;
+    std::size_t times = 0; ///< that a text was stored
     bool isFrozen = false; ///< the process has died, and stores nothing any more
 };
 
@@ -30,6 +31,7 @@ public:
     void store(stores::CachedText const& cached) noexcept override {
         if (!saved_->isFrozen) {
             saved_->cached = cached;
+            ++saved_->times;
         }
     }
 

@@ -96,7 +96,7 @@ void SeenLog::readAll(JournalLook look, Changes& changes) {
     damage_.reset();
     newest_ = look.entries.empty() ? JournalPosition() : look.entries.back().position;
     if (look.entries.empty()) {
-        if (!hasRead_ || position_.version > 0) {
+        if (!hasRead_) {
             replaceText(ProjectText::empty(), {}, changes);
         }
         return;

@@ -172,7 +172,9 @@ TEST_F(JournalBackendReading, theLastStateIsShownWhileTheServerIsUnreachableIfTh
               StoreError::Kind::Unreachable);
 
     server->cancelPlan();
-    EXPECT_EQ(contentOf(*reader), files({u"a", u"b"}));
+    commit(*reader, {set(fileAddress(u"c"))});
+    EXPECT_FALSE(reader->isShowingLastState());
+    EXPECT_EQ(contentOf(*reader), files({u"a", u"b", u"c"}));
     EXPECT_FALSE(reader->isShowingLastState());
 }
 

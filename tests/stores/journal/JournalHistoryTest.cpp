@@ -98,11 +98,11 @@ TEST_F(JournalHistory, theDamageOfAServerThatWasResetIsFoundToo) {
     server->resetTo(2);
     server->entry(2).read.lines.clear();
 
-    EXPECT_EQ(contentOf(*client_), files({u"a"}));
-
-    EXPECT_TRUE(client_->takeHistoryLoss());
     Entered const guard(*client_, Access::Write);
+
+    EXPECT_EQ(loadAll(*client_), files({u"a"}));
     EXPECT_EQ(errorOf([&] { client_->write({set(fileAddress(u"d"))}); }).kind(), StoreError::Kind::Damaged);
+    EXPECT_TRUE(client_->takeHistoryLoss());
 }
 
 TEST_F(JournalHistory, aResetDuringAWriteLeavesTheBatchUnstored) {
@@ -151,6 +151,16 @@ TEST_F(JournalHistory, aClientThatMissedTheDeletedHistoryReportsItAndMayWrite) {
 
     expectLoss(*client_, HistoryLoss::Kind::Cleaned, 3, 6);
     EXPECT_EQ(stored(), files({u"b", u"c", u"d"}));
+}
+
+TEST_F(JournalHistory, aClientThatMissedTheDeletedHistoryMayReplaceTheDefinition) {
+    writer_->tidy();
+    writer_->deleteHistory();
+
+    client_->replace(textOf(addFiles({u"x"})));
+
+    EXPECT_EQ(stored(), files({u"x"}));
+    expectLoss(*client_, HistoryLoss::Kind::Cleaned, 3, 4);
 }
 
 TEST_F(JournalHistory, aResetThatFollowsAnotherLossIsReportedAsAReset) {
