@@ -93,6 +93,45 @@ TEST_P(SessionConcurrency, threadsThatChangeTheProjectStageTheLastState) {
     EXPECT_THAT(onDisk, AllOf(HasSubstr("Valve"), HasSubstr("two")));
 }
 
+TEST_P(SessionConcurrency, otherThreadsSeeATransactionWhollyOrNotAtAll) {
+    constexpr int rounds = 20;
+    auto const file = folder_.file(u"a");
+    files().add({file});
+    project().setDescription(u"Engine");
+    std::atomic<bool> isFinished = false;
+    auto const read = [&] {
+        while (!isFinished) {
+            auto const guard = session_.store().acquireReadLock();
+            EXPECT_EQ(project().getName(), project().getDescription());
+        }
+    };
+
+    runTogether({[&] {
+                     for (int round = 0; round < rounds; ++round) {
+                         auto transaction = session_.transaction();
+                         auto const name = round % 2 == 0 ? u"Pump" : u"Valve";
+                         project().setName(name);
+                         project().setDescription(name);
+                         if (round % 5 != 0) {
+                             transaction.commit(); // the others are rolled back
+                         }
+                     }
+                     isFinished = true;
+                 },
+                 [&] {
+                     for (int round = 0; round < rounds; ++round) {
+                         EntryPointDefinition point(file);
+                         project().getEntryPointManager().setEntryPoint(point);
+                         project().getEntryPointManager().removeEntryPoint(file);
+                     }
+                 },
+                 read, read});
+    session_.stage();
+
+    EXPECT_EQ(project().getName(), u"Valve");
+    EXPECT_EQ(stagedText(), textOnDisk());
+}
+
 TEST_P(SessionConcurrency, oneThreadAddsAndRemovesWhileOthersSetNamesLabelsAndEntryPoints) {
     constexpr int rounds = 15;
     auto const labelled = folder_.file(u"labelled");
