@@ -1,6 +1,7 @@
-#include <algorithm>
 #include <future>
+#include <iostream>
 #include <string>
+#include <thread>
 
 #include <gmock/gmock.h>
 
@@ -67,6 +68,25 @@ TEST_F(ServerDeathTest, noAcknowledgedBatchIsLostWhenTheServerIsKilledWhileTwelv
     EXPECT_THAT(writers.unexpectedErrors(), IsEmpty());
     writers.expectAllIn(reader->look(1));
     RecordProperty("acknowledged", static_cast<int>(writers.acknowledged()));
+}
+
+TEST_F(ServerDeathTest, allClientsGetTheSameShareOfTheWrites) {
+    test::PostgresServer server;
+    prepare(server);
+    auto const project = createProject(server);
+    auto const reader = open(server.connection("anna"), project);
+    appendFirst(*reader);
+    int const clients = isNightly() ? 100 : 10;
+    WriterThreads writers(clients, [&] { return open(server.connection("anna"), project); });
+    // Not all begin at the same time; after that, the lock goes round.
+    EXPECT_TRUE(writers.await(isNightly() ? 0 : 300));
+    std::this_thread::sleep_for(seconds(isNightly() ? 60 : 0));
+    writers.finish();
+    EXPECT_THAT(writers.unexpectedErrors(), IsEmpty());
+    writers.expectAllIn(reader->look(1));
+    auto const [fewest, most] = writers.sharesOfClients();
+    EXPECT_GE(fewest * 10 + 50, most * 9) << "from " << fewest << " to " << most;
+    std::cout << writers.acknowledged() << " batches, each client from " << fewest << " to " << most << '\n';
 }
 
 TEST_F(ServerDeathTest, noAcknowledgedBatchIsLostWhenASynchronousStandbyIsPromotedWhileTwentyClientsWrite) {

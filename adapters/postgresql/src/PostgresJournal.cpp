@@ -89,7 +89,8 @@ public:
         Deadline const lockDeadline(patience);
         try {
             return run(deadline, [&] {
-                auto const answers = lock_.take(lockDeadline.remaining(), rows.calls(), deadline);
+                auto const answers =
+                    lock_.take(lockDeadline.remaining(), rows.calls(), limitOf(rows, deadline));
                 auto result = rows.read(answers, where_);
                 return result ? std::move(*result) : lookNow(rows, deadline);
             });
@@ -113,7 +114,7 @@ public:
         auto const answers = run(deadline, [&] {
             return session_.run(
                 {{piecesOfEntry, {{project_}, {version}, {entry.id}}}, {allPieces, {{project_}, {entry.id}}}},
-                deadline);
+                session_.transferDeadline());
         });
         bool const isThere = answers[0].rows() == 1;
         auto bytes = isThere ? readPieces(answers[1], answers[0].number(0, 0)) : std::nullopt;
@@ -146,6 +147,7 @@ public:
             return session_.run({{newestRecords, {{project_}, {end}, {limit}}}}, deadline);
         });
         std::vector<JournalRecord> records;
+        records.reserve(static_cast<std::size_t>(answers[0].rows()));
         for (int row = 0; row < answers[0].rows(); ++row) {
             records.push_back(recordAt(answers[0], row));
         }
@@ -165,9 +167,13 @@ public:
     }
 
 private:
+    Deadline limitOf(LookRows const& rows, Deadline const& deadline) const {
+        return rows.hasBody() ? session_.transferDeadline() : deadline;
+    }
+
     JournalLook lookNow(LookRows const& rows, Deadline const& deadline) {
         for (;;) {
-            auto const answers = session_.run(rows.calls(), deadline);
+            auto const answers = session_.run(rows.calls(), limitOf(rows, deadline));
             auto result = rows.read(answers, where_);
             session_.requireProcess(LookRows::process(answers));
             if (result) {

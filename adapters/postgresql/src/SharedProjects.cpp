@@ -59,6 +59,7 @@ std::vector<SharedProject> SharedProjects::list() const {
     auto const answers = session.run({{listProjects, {}}});
     auto const& rows = answers.front();
     std::vector<SharedProject> projects;
+    projects.reserve(static_cast<std::size_t>(rows.rows()));
     for (int row = 0; row < rows.rows(); ++row) {
         projects.push_back({rows.text(row, 0), rows.text(row, 1), static_cast<int>(rows.number(row, 2)),
                             rows.text(row, 3), rows.text(row, 4), rows.number(row, 5) != 0});

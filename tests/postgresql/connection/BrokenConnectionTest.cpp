@@ -16,7 +16,6 @@ namespace {
 
 using Fault = test::FaultyProxy::Fault;
 using std::chrono::seconds;
-using ::testing::HasSubstr;
 
 /// A client behind a proxy. The one that checks is connected directly.
 class BrokenConnectionTest : public SharedProjectTest {
@@ -233,6 +232,25 @@ TEST_F(BrokenConnectionTest, aSlowConnectionIsNotALostOne) {
     proxy->delay(milliseconds(20));
     write(*journal);
     expectStored();
+    EXPECT_EQ(proxy->connections(), 1);
+}
+
+TEST_F(BrokenConnectionTest, aLargeBodyMayTakeLongerThanAnOperation) {
+    auto settings = withSilence(seconds(10));
+    settings.operationLimit = milliseconds(500);
+    auto const journal = openBehindProxy(settings);
+    std::mt19937 random(7);
+    std::string text(4'000'000, '\0');
+    for (auto& byte : text) {
+        byte = static_cast<char>(random());
+    }
+    auto const own = body(2, text);
+    journal->lock(seconds(5), 1);
+    proxy->delay(milliseconds(20));
+    EXPECT_EQ(journal->append(own->entry), Journal::Appended::Stored);
+    journal->unlock();
+    EXPECT_TRUE(journal->look(std::nullopt).body == text);
+    EXPECT_TRUE(journal->body(own->entry.position) == text);
     EXPECT_EQ(proxy->connections(), 1);
 }
 

@@ -56,6 +56,7 @@ EntryAppender::EntryAppender(ServerSession& session, ProjectLock& lock, std::str
       project_(project),
       entry_(entry),
       version_(std::to_string(entry.position.version)),
+      pieces_(entry.isBody ? cutBody(entry.body) : std::vector<std::string>()),
       deadline_(session.deadline()) {
 }
 
@@ -89,8 +90,7 @@ Appended EntryAppender::attempt() {
 
 /// @return the number of entries that were stored.
 std::size_t EntryAppender::insert() {
-    auto const pieces = entry_.isBody ? cutBody(entry_.body) : std::vector<std::string>();
-    auto const count = std::to_string(pieces.size());
+    auto const count = std::to_string(pieces_.size());
     auto const host = hostName();
     auto const& [version, id, sum] = entry_.position;
     std::vector<Call> calls{{version == 1 ? insertFirst : insertNext,
@@ -104,13 +104,15 @@ std::size_t EntryAppender::insert() {
                               {count},
                               {host}}}};
     std::vector<std::string> numbers;
-    numbers.reserve(pieces.size());
-    for (auto const& piece : pieces) {
+    numbers.reserve(pieces_.size());
+    for (auto const& piece : pieces_) {
         auto const& number = numbers.emplace_back(std::to_string(numbers.size() + 1));
         calls.push_back({insertPiece, {{project_}, {id}, {number}, {piece, true}, {version_}}});
     }
     try {
-        return session_.run(calls, deadline_).front().affected();
+        return session_.run(calls, entry_.isBody ? session_.transferDeadline() : deadline_)
+            .front()
+            .affected();
     } catch (ConnectionLost const&) {
         throw;
     } catch (StoreError const&) { // the transaction failed as a whole

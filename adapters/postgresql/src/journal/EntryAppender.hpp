@@ -3,6 +3,7 @@
 #include <cstddef>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "journal/ProjectLock.hpp"
 #include "journal/ServerSession.hpp"
@@ -31,6 +32,7 @@ private:
     std::string const& project_;
     stores::NewJournalEntry const& entry_;
     std::string version_;
+    std::vector<std::string> pieces_; ///< of a body
     Deadline deadline_;
     bool isUncertain_ = false; ///< the entry was sent, and may be stored
 };

@@ -17,6 +17,9 @@ public:
     /// @param project a UUID.
     LookRows(std::string const& project, std::optional<std::uint64_t> seen);
 
+    /// Whether the answers contain a body.
+    bool hasBody() const { return !seen_; }
+
     /// The calls refer to this object.
     std::vector<Call> calls() const;
 

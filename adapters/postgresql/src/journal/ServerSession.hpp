@@ -61,6 +61,9 @@ public:
 
     Deadline deadline() const { return Deadline(settings_.operationLimit); }
 
+    /// The end of a run that sends or receives a body.
+    Deadline transferDeadline() const { return Deadline(settings_.transferLimit); }
+
     /// The process on the server that serves the current connection; 0 if there is none.
     int process() const { return connection_ ? current_.process : 0; }
 

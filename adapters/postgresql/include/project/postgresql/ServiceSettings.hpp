@@ -21,8 +21,13 @@ struct ServiceSettings {
     /// How long the server may be silent while an answer is due. After that, the connection counts as lost.
     std::chrono::milliseconds silenceLimit = std::chrono::seconds(10);
 
-    /// The time for a whole operation with all its attempts, apart from the wait for the lock.
+    /// The time for a whole operation with all its attempts, apart from the wait for the lock. No attempt
+    /// begins later.
     std::chrono::milliseconds operationLimit = std::chrono::seconds(30);
+
+    /// The time in which a body is sent or received, as long as its bytes keep coming. A large body over a
+    /// slow network takes longer than an operation.
+    std::chrono::milliseconds transferLimit = std::chrono::minutes(5);
 
     /// The server ends a session that holds the lock and is idle for longer, so that a stopped process does
     /// not block the others forever.
