@@ -31,8 +31,8 @@ public:
 
     enum class Appended {
         Stored,     ///< the entry is durable, and stored once, however often it was sent
-        Superseded, ///< another entry follows the position before it; this one is not stored and never will
-                    ///< be
+        Superseded, ///< the newest entry is not the one before it: another client has written, or the server
+                    ///< was reset. The entry is not stored and never will be
     };
 
     virtual ~Journal() = default;
