@@ -9,8 +9,10 @@ install(EXPORT project_management NAMESPACE project:: DESTINATION "${package_fol
   FILE project_managementTargets.cmake)
 install(DIRECTORY platform/include/ include/ stores/include/ adapters/git/include/ session/include/
   DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
-if(TARGET project_postgresql)
-  install(TARGETS project_postgresql EXPORT project_management LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}")
+if(TARGET project_postgresql) # with an export of its own, so that it can be left out of an installation
+  install(TARGETS project_postgresql EXPORT project_management_postgresql LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}")
+  install(EXPORT project_management_postgresql NAMESPACE project:: DESTINATION "${package_folder}"
+    FILE project_management_postgresqlTargets.cmake)
   install(DIRECTORY adapters/postgresql/include/ DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}")
   install(FILES adapters/postgresql/sql/setup.sql DESTINATION "${CMAKE_INSTALL_DATADIR}/project-management")
 endif()
