@@ -24,8 +24,10 @@ using ZEPHRA::project::management::FileNotInProject;
 
 namespace {
 
-MetadataPath entryPointsHead() {
-    return MetadataPathBuilder().add(schema::entrypoints::entryPointsType, schema::rootLocation).build();
+MetadataPath const& entryPointsHead() {
+    static MetadataPath const head =
+        MetadataPathBuilder().add(schema::entrypoints::entryPointsType, schema::rootLocation).build();
+    return head;
 }
 
 MetadataPath entryPointPath(std::u16string const& uuid) {
@@ -137,7 +139,7 @@ std::u16string EntryPointManagerBase::storedFile(Path const& file) const {
 }
 
 std::vector<MetadataPath> EntryPointManagerBase::getEntryPointNodes() const {
-    MetadataPath const head = entryPointsHead();
+    MetadataPath const& head = entryPointsHead();
     if (!metadataManager_->pathExists(head)) {
         return {};
     }

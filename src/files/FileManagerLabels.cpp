@@ -109,7 +109,7 @@ std::vector<FileLabel> FileManagerBase::addLabels(std::vector<Path> const& files
                 std::ranges::move(addLabelToNode(*node, label, file), std::back_inserter(displaced));
             }
         }
-        batch.insert_or_assign(file, std::move(node));
+        batch.insert_or_assign(batch.end(), file, std::move(node)); // most lists are sorted
     }
     if (!batch.empty()) {
         fileStore_->setFileNodes(std::move(batch));
@@ -169,8 +169,8 @@ void FileManagerBase::removeLabels(std::vector<Path> const& files, std::vector<L
         for (auto const& label : labels) {
             hasRemovedData |= removeLabel(*node, *dataNode, label);
         }
-        batch.insert_or_assign(file, std::move(node));
-        dataBatch.insert_or_assign(file, std::move(dataNode));
+        batch.insert_or_assign(batch.end(), file, std::move(node)); // most lists are sorted
+        dataBatch.insert_or_assign(dataBatch.end(), file, std::move(dataNode));
     }
     fileStore_->setFileNodes(std::move(batch));
     if (hasRemovedData) {
@@ -220,7 +220,7 @@ void FileManagerBase::removeCategory(std::vector<Path> const& files, CategoryIde
         if (MetadataNode* const categoryNode = findCategory(*node, uuid)) {
             node->removeChild(categoryNode);
         }
-        batch.insert_or_assign(file, std::move(node));
+        batch.insert_or_assign(batch.end(), file, std::move(node)); // most lists are sorted
     }
     fileStore_->setFileNodes(std::move(batch));
 }
@@ -240,7 +240,7 @@ void FileManagerBase::writeLabelDataNodes(FileNodes const& nodes) {
     auto const guard = metadataManager_->acquireWriteLock();
     std::map<MetadataPath, std::shared_ptr<MetadataNode>> batch;
     for (auto const& [file, node] : nodes) {
-        batch.insert_or_assign(getLabelDataPath(file), node);
+        batch.insert_or_assign(batch.end(), getLabelDataPath(file), node);
     }
     metadataManager_->setNodes(batch);
 }

@@ -28,8 +28,10 @@ using ZEPHRA::project::management::LabelExistsByName;
 
 namespace {
 
-MetadataPath getCategoriesPath() {
-    return MetadataPathBuilder().add(schema::categories::categoriesType, schema::rootLocation).build();
+MetadataPath const& getCategoriesPath() {
+    static MetadataPath const path =
+        MetadataPathBuilder().add(schema::categories::categoriesType, schema::rootLocation).build();
+    return path;
 }
 
 MetadataPath getCategoryPath(std::u16string const& uuid) {

@@ -201,6 +201,10 @@ MetadataPathBuilder& MetadataPathBuilder::add(std::u16string const& type, std::u
 }
 
 MetadataPathBuilder& MetadataPathBuilder::add(MetadataPath const& path) {
+    if (path_.depth() == 0) {
+        path_ = path; // and shares its steps
+        return *this;
+    }
     for (auto const& element : path.getPath()) {
         path_ = path_.child(element);
     }
