@@ -143,8 +143,8 @@ std::string const& ProjectText::sum() const {
     return state_->nextAfter();
 }
 
-std::string ProjectText::tailFor(Batch const& batch) const {
-    return writeBatch(batch, state_->nextAfter());
+std::string ProjectText::tailFor(Batch const& batch, std::size_t most) const {
+    return writeBatch(batch, state_->nextAfter(), most);
 }
 
 ProjectText ProjectText::rewrittenWith(Batch const& batch) const {

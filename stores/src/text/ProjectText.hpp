@@ -48,9 +48,10 @@ public:
     /// first call for a body takes time proportional to it.
     std::string const& sum() const;
 
-    /// The lines of a batch, including its closing line, to be appended to this text.
+    /// The lines of a batch, including its closing line, to be appended to this text. Empty if they have more
+    /// bytes than permitted.
     /// @throws StoreError if an address or a node is too deep for the text.
-    std::string tailFor(Batch const& batch) const;
+    std::string tailFor(Batch const& batch, std::size_t most = std::string::npos) const;
 
     /// This text with a batch (possibly an empty one), as a body without a tail. Damaged lines are omitted.
     /// @throws StoreError as tailFor does.

@@ -217,7 +217,7 @@ void applyTail(TextContent& content, TailReading const& tail) {
     }
 }
 
-std::string writeBatch(Batch const& batch, std::string_view after) {
+std::string writeBatch(Batch const& batch, std::string_view after, std::size_t most) {
     std::string text;
     TextSum sum;
     for (Change const& change : batch) {
@@ -226,11 +226,14 @@ std::string writeBatch(Batch const& batch, std::string_view after) {
         appendChangeLine(text, change);
         sum.add(std::string_view(text).substr(begin));
         text += '\n';
+        if (text.size() > most) {
+            return {};
+        }
     }
     sum.add(after);
     text += writeClosing(batch.size(), after, sum.hex());
     text += '\n';
-    return text;
+    return text.size() > most ? std::string() : text;
 }
 
 std::string_view closingSum(std::string_view lines) {

@@ -41,10 +41,10 @@ TailReading readTail(std::vector<TextLine> const& lines, std::string after);
 /// it.
 void applyTail(TextContent& content, TailReading const& tail);
 
-/// The lines of a batch, including its closing line.
+/// The lines of a batch, including its closing line. Empty if they have more bytes than permitted.
 /// @param after the checksum that precedes the batch.
 /// @throws StoreError if an address or a node of the batch is too deep for the text.
-std::string writeBatch(Batch const& batch, std::string_view after);
+std::string writeBatch(Batch const& batch, std::string_view after, std::size_t most);
 
 /// The checksum in the closing line with which some lines end; empty if they do not end with one.
 std::string_view closingSum(std::string_view lines);

@@ -249,8 +249,7 @@ std::string TextBackend::State::linesToAppend(Batch const& batch) const {
         text.tailSize() + batch.size() * shortestLine > room) {
         return {};
     }
-    auto lines = text.tailFor(batch);
-    return text.tailSize() + lines.size() <= room ? lines : std::string();
+    return text.tailFor(batch, room - text.tailSize());
 }
 
 void TextBackend::State::keep() {

@@ -1,5 +1,7 @@
 #include "text/ProjectText.hpp"
 
+#include <gmock/gmock.h>
+
 #include "project/stores/StoreError.hpp"
 #include "support/ProjectTextSamples.hpp"
 
@@ -215,6 +217,16 @@ TEST(TextTail, appendedBatchesAreAccepted) {
     EXPECT_EQ(contentOf(text), contentOf(readWhole(body + one + two)));
     EXPECT_EQ(text.tailFor({set(fileAddress(u"e"))}),
               readWhole(body + one + two).tailFor({set(fileAddress(u"e"))}));
+}
+
+TEST(TextTail, aBatchWithMoreBytesThanPermittedHasNoLines) {
+    ProjectText const text = readWhole(body);
+    Batch const batch{set(fileAddress(u"d")), set(fileAddress(u"e"))};
+    std::string const lines = text.tailFor(batch);
+    EXPECT_EQ(text.tailFor(batch, lines.size()), lines);
+    for (std::size_t const most : {lines.size() - 1, std::size_t{10}, std::size_t{0}}) {
+        EXPECT_EQ(text.tailFor(batch, most), "");
+    }
 }
 
 TEST(TextTail, nothingElseIsAcceptedAndTheTextIsUnchanged) {
