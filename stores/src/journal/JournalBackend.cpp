@@ -227,10 +227,7 @@ PendingEntry JournalBackend::State::prepare(Batch const& batch) const {
     std::size_t const longest = std::min(room, Journal::longestBatch);
     PendingEntry pending{{}, {}, std::nullopt, true};
     if (seen_.position().version > 0 && batch.size() * shortestLine <= longest) {
-        pending.lines = text.tailFor(batch);
-        if (pending.lines.size() > longest) {
-            pending.lines.clear();
-        }
+        pending.lines = text.tailFor(batch, longest);
     }
     pending.isBody = pending.lines.empty() || text.tailSize() + pending.lines.size() > room;
     if (pending.isBody) {
