@@ -1,13 +1,17 @@
 #include "project/session.hpp"
 
+#include <algorithm>
 #include <utility>
 
 #include "ChangeStep.hpp"
+#include "NewSharedProject.hpp"
 #include "SessionState.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
 
 namespace project::session {
+
+using std::chrono::milliseconds;
 
 Session Session::open(Path const& root, Options options) {
     Session result(std::make_unique<State>(root, options));
@@ -28,6 +32,16 @@ Session Session::create(Path const& root, std::u16string const& name, Options op
 Session Session::openOrCreate(Path const& root, std::u16string const& name, Options options) {
     Session result(std::make_unique<State>(root, options));
     result.state_->createProject(name);
+    return result;
+}
+
+Session Session::createShared(Path const& root, std::u16string const& name, SharedStore const& shared,
+                              Options options) {
+    NewSharedProject project(root, name, shared);
+    Session result(std::make_unique<State>(root, options));
+    result.state_->createProject(name);
+    result.state_->stageNew(project.files());
+    project.keep();
     return result;
 }
 
@@ -58,6 +72,30 @@ Path const& Session::root() const noexcept {
 
 bool Session::refresh() {
     return state_->refresh();
+}
+
+bool Session::watch(milliseconds time) {
+    auto const deadline = std::chrono::steady_clock::now() + time;
+    milliseconds const interval = isShared() ? std::chrono::seconds(30) : milliseconds(500);
+    while (!refresh()) {
+        auto const rest = std::chrono::ceil<milliseconds>(deadline - std::chrono::steady_clock::now());
+        if (rest <= milliseconds(0) || !state_->awaitChange(std::min(rest, interval))) {
+            return false;
+        }
+    }
+    return true;
+}
+
+void Session::wake() noexcept {
+    state_->wake();
+}
+
+bool Session::isShared() const noexcept {
+    return state_->stored.log() != nullptr;
+}
+
+std::optional<stores::HistoryLoss> Session::takeHistoryLoss() {
+    return isShared() ? state_->stored.log()->takeHistoryLoss() : std::nullopt;
 }
 
 metadata::MetadataManager& Session::store() noexcept {

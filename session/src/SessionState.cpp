@@ -1,7 +1,6 @@
 #include "SessionState.hpp"
 
 #include <filesystem>
-#include <limits>
 #include <system_error>
 #include <utility>
 
@@ -9,7 +8,6 @@
 #include "SessionProjectManager.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
-#include "project/stores/SystemDisk.hpp"
 
 namespace project::session {
 
@@ -20,6 +18,7 @@ using management::DispatchableProjectEventBroadcaster;
 using management::EventBroadcastingProjectManager;
 using management::ProjectManagerBase;
 using metadata::MetadataPath;
+using std::chrono::milliseconds;
 using stores::StoreError;
 using stores::TextBackend;
 using stores::TreeMetadataManager;
@@ -34,21 +33,13 @@ std::unique_ptr<GitAdapter> makeAdapter(Path const& root, Options options) {
                                                                          : GitEnvironment::Ignored);
 }
 
-TextBackend::Options textOptions(Options options) {
-    TextBackend::Options result;
-    if (options.sourceControl == SourceControl::EachChange) {
-        result.alwaysRewritten = std::numeric_limits<std::size_t>::max(); // a staged text has no tail
-    }
-    return result;
-}
-
 } // namespace
 
 Session::State::State(Path const& folder, Options options)
     : root(fl::filesystem::canonical(folder, Path())),
-      text(nullptr),
       adapter(makeAdapter(root, options)),
-      store(makeStore(options)),
+      stored(root, options),
+      store(stored.tree()),
       stager(makeStager()),
       events(std::make_shared<DispatchableProjectEventBroadcaster>()),
       managers(makeManagers()),
@@ -60,18 +51,11 @@ Session::State::State(Path const& folder, Options options)
       project(std::make_unique<SessionProjectManager>(std::move(managers.outermost), executor)) {
 }
 
-std::shared_ptr<TreeMetadataManager> Session::State::makeStore(Options options) {
-    auto backend = std::make_unique<TextBackend>(stores::makeSystemDisk(root, TextBackend::folderName),
-                                                 textOptions(options));
-    text = backend.get();
-    return std::make_shared<TreeMetadataManager>(std::move(backend), root / TextBackend::folderName);
-}
-
 std::unique_ptr<DefinitionStager> Session::State::makeStager() {
     if (!adapter) {
         return nullptr;
     }
-    return std::make_unique<DefinitionStager>(*store, *adapter, TextBackend::textPath(root));
+    return std::make_unique<DefinitionStager>(*store, *adapter, stored.file());
 }
 
 Session::State::Managers Session::State::makeManagers() {
@@ -87,9 +71,8 @@ Session::State::Managers Session::State::makeManagers() {
 }
 
 void Session::State::requireProject() const {
-    std::error_code error; // a text that cannot be seen may exist: the store reports why it cannot read it
-    auto const status =
-        std::filesystem::symlink_status(fl::filesystem::toSystem(TextBackend::textPath(root)), error);
+    std::error_code error; // a file that cannot be seen may exist: the store reports why it cannot read it
+    auto const status = std::filesystem::symlink_status(fl::filesystem::toSystem(stored.file()), error);
     if (status.type() == std::filesystem::file_type::not_found) {
         throw StoreError(StoreError::Kind::Refused, fl::i18n::toUtf8(root.native()), 0,
                          "there is no project in this folder", "Check the path, or create a project there.");
@@ -119,8 +102,38 @@ bool Session::State::isStoreEmpty() const {
 
 void Session::State::stage() {
     if (stager && stager->isDue()) {
-        text->tidy();
+        if (stored.text() != nullptr) {
+            stored.text()->tidy(); // a staged text has no tail
+        }
         stager->stageIfWritten();
+    }
+}
+
+void Session::State::stageNew(std::vector<Path> const& created) {
+    if (adapter) {
+        auto const guard = store->acquireWriteLock(); // only one thread at a time may use the adapter
+        adapter->addToSourceControl(created);
+    }
+}
+
+bool Session::State::awaitChange(milliseconds time) {
+    if (stored.log() != nullptr) {
+        stored.log()->journal().awaitChange(time);
+        return !isWoken_.exchange(false);
+    }
+    std::unique_lock lock(wakingMutex_);
+    waking_.wait_for(lock, time, [this] { return isWoken_.load(); });
+    return !isWoken_.exchange(false);
+}
+
+void Session::State::wake() noexcept {
+    {
+        std::lock_guard const lock(wakingMutex_); // a thread between its test and its wait must not miss it
+        isWoken_ = true;
+    }
+    waking_.notify_all();
+    if (stored.log() != nullptr) {
+        stored.log()->journal().wake();
     }
 }
 

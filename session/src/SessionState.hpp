@@ -1,19 +1,22 @@
 #pragma once
 
+#include <atomic>
+#include <chrono>
+#include <condition_variable>
 #include <deque>
 #include <memory>
 #include <mutex>
 #include <optional>
+#include <vector>
 
 #include "ChangeExecutor.hpp"
 #include "DefinitionStager.hpp"
 #include "EventQueue.hpp"
+#include "SessionStore.hpp"
 #include "TransactionFiles.hpp"
 #include "project/cm/CMAwareProjectManager.hpp"
 #include "project/git/GitAdapter.hpp"
 #include "project/session.hpp"
-#include "project/stores/TextBackend.hpp"
-#include "project/stores/TreeMetadataManager.hpp"
 
 namespace project::session {
 
@@ -37,13 +40,23 @@ public:
     bool createProject(std::u16string const& name);
 
     void stage();
+
+    /// Stages files of the store that the session has created.
+    void stageNew(std::vector<Path> const& files);
+
     bool refresh();
 
+    /// Waits until others may have changed a shared project, or the time has run out, or wake was called.
+    /// @return false if wake was called.
+    bool awaitChange(std::chrono::milliseconds time);
+
+    void wake() noexcept;
+
     Path const root;
-    stores::TextBackend* text;                ///< owned by the store
     std::unique_ptr<git::GitAdapter> adapter; ///< null if source control is off
-    std::shared_ptr<stores::TreeMetadataManager> store;
-    std::unique_ptr<DefinitionStager> stager; ///< null if source control is off
+    SessionStore stored;
+    std::shared_ptr<stores::TreeMetadataManager> const store; ///< of stored
+    std::unique_ptr<DefinitionStager> stager;                 ///< null if source control is off
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> events;
     EventQueue raised; ///< by the managers
     Managers managers;
@@ -52,13 +65,15 @@ public:
     std::unique_ptr<management::ProjectManager> project;
 
 private:
-    std::shared_ptr<stores::TreeMetadataManager> makeStore(Options options);
     std::unique_ptr<DefinitionStager> makeStager();
     Managers makeManagers();
     bool isStoreEmpty() const;
     void queueEventsOfOthers();
     std::optional<Event> nextEventOfOthers();
 
+    std::mutex wakingMutex_;
+    std::condition_variable waking_;
+    std::atomic<bool> isWoken_ = false;
     std::mutex eventsOfOthersMutex_;
     std::deque<Event> eventsOfOthers_; ///< to be dispatched by refresh
 };

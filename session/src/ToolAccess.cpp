@@ -1,14 +1,21 @@
 #include "project/session/ToolAccess.hpp"
 
 #include "SessionState.hpp"
+#include "fl/i18n/Utf8.hpp"
+#include "project/stores/StoreError.hpp"
 
 namespace project::session {
 
 ToolAccess::ToolAccess(Session& session) noexcept : state_(*session.state_) {
 }
 
-stores::TextBackend& ToolAccess::text() noexcept {
-    return *state_.text;
+stores::TextBackend& ToolAccess::text() {
+    if (state_.stored.text() == nullptr) {
+        throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(state_.root.native()), 0,
+                                 "is stored on a server, and this works on a text only",
+                                 "Use the session of an application.");
+    }
+    return *state_.stored.text();
 }
 
 void ToolAccess::markTextForStaging() noexcept {

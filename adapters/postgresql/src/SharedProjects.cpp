@@ -4,6 +4,7 @@
 
 #include "journal/ProjectId.hpp"
 #include "journal/ServerSession.hpp"
+#include "project/postgresql/PostgresJournal.hpp"
 
 namespace project::postgresql {
 
@@ -96,4 +97,14 @@ bool SharedProjects::remove(std::string const& id) const {
     return answers.front().affected() > 0;
 }
 
+std::unique_ptr<stores::Journal> SharedProjects::open(std::string const& id) const {
+    return std::make_unique<PostgresJournal>(settings_, id);
+}
+
 } // namespace project::postgresql
+
+project::stores::SharedServer* project_make_shared_server(char const* service) {
+    project::postgresql::ServiceSettings settings;
+    settings.service = service;
+    return new project::postgresql::SharedProjects(std::move(settings)); // owned by the caller
+}

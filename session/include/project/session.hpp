@@ -1,11 +1,15 @@
 #pragma once
 
+#include <chrono>
 #include <memory>
+#include <optional>
 #include <string>
 
 #include "project/management.hpp"
 #include "project/session/Export.hpp"
 #include "project/session/Transaction.hpp"
+#include "project/stores/HistoryLoss.hpp"
+#include "project/stores/SharedServer.hpp"
 
 namespace project::session {
 
@@ -35,6 +39,22 @@ struct Options {
     /// Whether GIT_DIR and the other variables of git's environment apply, as they do for the git command.
     /// A library should not read the environment unless it is asked to.
     bool honoursEnvironment = false;
+
+    /// For a shared project: a read guard checks for changes only if the last check is at least this long
+    /// ago. By default every guard checks, which takes a round trip to the server.
+    std::chrono::milliseconds freshness = std::chrono::milliseconds(0);
+
+    /// For a shared project: whether reading continues with the last state while the server is unreachable.
+    /// Otherwise it throws. Changes always need the server.
+    bool readsLastState = false;
+};
+
+/// Where to create a project that a team shares: on a server, whose library must be installed.
+struct SharedStore {
+    std::string service; ///< the name of a service in the configuration of the server's client library
+    std::string reader;  ///< the role whose members may read the project; created if it does not exist
+    std::string writer;  ///< the role whose members may write it
+    std::string kind = stores::usualServerKind; ///< of the server
 };
 
 /// An open project with everything that an application needs: the text store in the project's folder,
@@ -68,6 +88,13 @@ public:
     /// @param name the name of a project that is created.
     static Session openOrCreate(Path const& root, std::u16string const& name, Options options = {});
 
+    /// Creates a project that a team shares: on the server, and a file in the folder that leads to it, which
+    /// is staged and belongs into source control. Every session that opens the folder uses the server.
+    /// @throws stores::StoreError if the folder already contains a project, the server is unreachable, or the
+    ///         user may not create projects. Nothing stays behind.
+    static Session createShared(Path const& root, std::u16string const& name, SharedStore const& shared,
+                                Options options = {});
+
     Session(Session&& other) noexcept;
     Session& operator=(Session&& other) noexcept;
 
@@ -99,6 +126,26 @@ public:
     /// @return true if events were dispatched.
     /// @throws stores::StoreError if the text cannot be read, or remains incomplete.
     bool refresh();
+
+    /// Waits until other programs have changed the project, and reports the changes as refresh does. A server
+    /// announces changes of a shared project. For a text, and in case an announcement is lost, it checks from
+    /// time to time: twice a second, and every half minute.
+    /// @param time how long to wait.
+    /// @return true if events were dispatched; false if the time has run out or wake was called.
+    /// @throws as refresh does.
+    bool watch(std::chrono::milliseconds time);
+
+    /// Makes watch return, and the next call of it if none is waiting. May be called by any thread, while the
+    /// session is neither moved nor destroyed.
+    void wake() noexcept;
+
+    /// True if a server stores the project.
+    bool isShared() const noexcept;
+
+    /// For a shared project: a loss of history that a check for changes has found since the last call, for
+    /// example because the server was restored from a backup. Until a reset is taken note of with this call,
+    /// changes are refused. Call it with no guard open.
+    std::optional<stores::HistoryLoss> takeHistoryLoss();
 
     /// The broadcaster that observers connect to. An application may dispatch its own events on it. It may
     /// outlive the session.

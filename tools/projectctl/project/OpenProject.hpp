@@ -49,7 +49,7 @@ public:
 
     /// The backend of the store, which does not contain the changes of a transaction. Its `load` may be
     /// called while a guard of the store is open.
-    project::stores::TextBackend& text() noexcept { return access_.text(); }
+    project::stores::TextBackend& text() { return access_.text(); }
 
     /// Passes on the addresses directly below one address, as `load` of the text does, with the changes of a
     /// transaction. Call it with a guard of the store open.

@@ -18,7 +18,8 @@ public:
     explicit ToolAccess(Session& session) noexcept;
 
     /// The store's text. A change made through it is not staged; see markTextForStaging.
-    stores::TextBackend& text() noexcept;
+    /// @throws stores::StoreError with the kind Refused if the project is shared.
+    stores::TextBackend& text();
 
     /// Lets the next call of Session::stage stage the text, although the store did not write it: for
     /// changes made through text().

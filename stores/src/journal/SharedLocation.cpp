@@ -1,0 +1,136 @@
+#include "project/stores/SharedLocation.hpp"
+
+#include <string_view>
+
+#include "fl/filesystem/SystemName.hpp"
+#include "fl/i18n/Utf8.hpp"
+#include "journal/EntryId.hpp"
+#include "line/JsonReader.hpp"
+#include "project/stores/StoreError.hpp"
+#include "project/stores/TextBackend.hpp"
+
+namespace project::stores {
+
+char16_t const* const SharedLocation::fileName = u"store.json";
+
+namespace {
+
+constexpr std::string_view ignoredContent = "/cache/\n/store.json.tmp\n";
+constexpr char const* locationName = "store.json";
+constexpr char const* ignoredName = ".gitignore";
+constexpr char const* temporaryName = "store.json.tmp";
+
+[[noreturn]] void throwDamaged(Disk const& disk, std::string const& problem) {
+    throw StoreError(StoreError::Kind::Damaged, disk.folder() + '/' + locationName, 0, problem,
+                     "Restore the file from source control.");
+}
+
+/// Reads one member, whose value is a string.
+bool readMember(JsonReader& json, std::string_view name, std::string& value) {
+    std::string_view found;
+    std::string_view content;
+    bool const isRead = json.string(found) && (found == name || json.fail("an unknown member")) &&
+                        json.expect(':') && json.string(content);
+    if (isRead) {
+        value = fl::i18n::toUtf8(decodeJsonContent(content));
+    }
+    return isRead;
+}
+
+bool readVersion(JsonReader& json, unsigned long& version) {
+    std::string_view found;
+    return json.string(found) && (found == "version" || json.fail("an unknown member")) && json.expect(':') &&
+           json.number(version);
+}
+
+SharedLocation parse(Disk const& disk, std::string_view bytes) {
+    JsonReader json(bytes);
+    SharedLocation result;
+    std::string format;
+    unsigned long version = 0;
+    if (!json.expect('{') || !readMember(json, "format", format) || format != "project-store" ||
+        !json.expect(',') || !readVersion(json, version)) {
+        throwDamaged(disk, "is not the location of a shared project");
+    }
+    if (version != 1) {
+        throw StoreError(StoreError::Kind::Refused, disk.folder() + '/' + locationName, 0,
+                         "has the later format " + std::to_string(version),
+                         "Use a later version of this program.");
+    }
+    bool const isRead = json.expect(',') && readMember(json, "kind", result.kind) && json.expect(',') &&
+                        readMember(json, "service", result.service) && json.expect(',') &&
+                        readMember(json, "project", result.project) && json.expect('}') && json.end();
+    if (!isRead) {
+        throwDamaged(disk, std::string("is unreadable: ") + json.problem());
+    }
+    return result;
+}
+
+std::string contentOf(SharedLocation const& location) {
+    std::string result = R"({"format":"project-store","version":1,"kind":)";
+    appendJsonString(result, fl::i18n::fromUtf8(location.kind));
+    result += R"(,"service":)";
+    appendJsonString(result, fl::i18n::fromUtf8(location.service));
+    result += R"(,"project":)";
+    appendJsonString(result, fl::i18n::fromUtf8(location.project));
+    return result + "}\n";
+}
+
+std::string textName() {
+    return fl::i18n::toUtf8(TextBackend::textName);
+}
+
+/// Creates a file that is complete as soon as it has its name. @return false if the name is taken.
+bool createFile(Disk& disk, char const* name, std::string_view content, FileChanges& created) {
+    disk.remove(temporaryName);
+    disk.create(temporaryName, content, std::nullopt);
+    disk.sync();
+    if (!disk.renameToFree(temporaryName, name)) {
+        disk.remove(temporaryName);
+        return false;
+    }
+    created.added.push_back(fl::filesystem::fromSystem(disk.folder()) /
+                            fl::filesystem::fromSystem(std::string(name)));
+    return true;
+}
+
+[[noreturn]] void throwTaken(Disk const& disk) {
+    throw StoreError(StoreError::Kind::Refused, disk.folder(), 0, "contains a project already",
+                     "Open it, or choose another folder.");
+}
+
+} // namespace
+
+std::string newSharedProjectId() {
+    return newEntryId();
+}
+
+std::optional<SharedLocation> readSharedLocation(Disk& disk) {
+    if (!disk.openFolder()) {
+        return std::nullopt;
+    }
+    auto const content = disk.read(locationName, 0);
+    if (!content) {
+        return std::nullopt;
+    }
+    if (disk.identify(textName())) {
+        throwDamaged(disk, "says that the project is stored on a server, and there is a text beside it");
+    }
+    return parse(disk, content->bytes);
+}
+
+FileChanges createSharedLocation(Disk& disk, SharedLocation const& location) {
+    disk.makeFolder();
+    if (!disk.openFolder() || disk.identify(textName())) {
+        throwTaken(disk);
+    }
+    FileChanges created;
+    createFile(disk, ignoredName, ignoredContent, created);
+    if (!createFile(disk, locationName, contentOf(location), created)) {
+        throwTaken(disk);
+    }
+    disk.syncFolder();
+    return created;
+}
+
+} // namespace project::stores
