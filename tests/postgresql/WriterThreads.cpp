@@ -52,11 +52,22 @@ void WriterThreads::expectAllIn(stores::JournalLook const& look) const {
     }
 }
 
+bool WriterThreads::awaitAll() {
+    bool const haveAllBegun = test::comesTrue([this] {
+        return std::ranges::all_of(clients_, [](auto const& client) { return client->count > 0; });
+    });
+    for (auto const& client : clients_) {
+        client->notCounted = client->count;
+    }
+    return haveAllBegun;
+}
+
 std::pair<std::size_t, std::size_t> WriterThreads::sharesOfClients() const {
     std::pair<std::size_t, std::size_t> shares{std::numeric_limits<std::size_t>::max(), 0};
     for (auto const& client : clients_) {
-        shares.first = std::min(shares.first, client->stored.size());
-        shares.second = std::max(shares.second, client->stored.size());
+        std::size_t const share = client->count - client->notCounted;
+        shares.first = std::min(shares.first, share);
+        shares.second = std::max(shares.second, share);
     }
     return shares;
 }
@@ -81,6 +92,7 @@ void WriterThreads::writeOne(Client& client, PostgresJournal& journal) {
     try {
         if (journal.append(own->entry) == Journal::Appended::Stored) {
             client.stored.insert(id);
+            ++client.count;
             ++acknowledged_;
         } else {
             client.notStored.insert(id);

@@ -34,6 +34,9 @@ public:
     /// stored.
     void expectAllIn(stores::JournalLook const& look) const;
 
+    /// Waits until every client has appended a batch, and counts the shares from then on.
+    bool awaitAll();
+
     /// The fewest and the most batches of one client.
     std::pair<std::size_t, std::size_t> sharesOfClients() const;
 
@@ -43,6 +46,8 @@ private:
         std::set<std::string> stored; ///< identities of batches
         std::set<std::string> notStored;
         std::vector<std::string> errors;
+        std::atomic<std::size_t> count = 0; ///< of stored, for other threads
+        std::size_t notCounted = 0;         ///< at the beginning of its share
     };
 
     void write(Client& client, PostgresJournal& journal);

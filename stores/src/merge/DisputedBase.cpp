@@ -19,13 +19,21 @@ using metadata::MetadataNodeSpecification;
 
 namespace {
 
+/// True for a key whose change would give a nested node another identity: the identifying key, and also an
+/// empty UUID, which leaves the identity to the name.
+bool isOfIdentity(MetadataNode const& node, std::u16string const& key) {
+    return key == u"UUID" || key == identifyingKey(node);
+}
+
 /// True if a nested node has a key or a nested node that a merge can find changed.
 bool hasMoreThanIdentity(MetadataNode const& node) {
+    auto const keys = node.getKeys();
     auto const& nested = node.getChildren();
     return identifyingKey(node) &&
-           (node.getKeys().size() > 1 || std::any_of(nested.begin(), nested.end(), [](auto const& child) {
-                return hasMoreThanIdentity(*child);
-            }));
+           (std::any_of(keys.begin(), keys.end(),
+                        [&node](auto const& key) { return !isOfIdentity(node, key); }) ||
+            std::any_of(nested.begin(), nested.end(),
+                        [](auto const& child) { return hasMoreThanIdentity(*child); }));
 }
 
 class Dispute {
@@ -78,7 +86,7 @@ private:
         }
         auto& node = *target.addChild(present.getType());
         for (auto const& key : present.getKeys()) {
-            node.put(key, key == identifyingKey(present) ? present.get(key) : disputed_);
+            node.put(key, isOfIdentity(present, key) ? present.get(key) : disputed_);
         }
         for (auto const& child : present.getChildren()) {
             addDisputed(node, *child);

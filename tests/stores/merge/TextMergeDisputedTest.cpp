@@ -136,6 +136,35 @@ TEST(DisputedNestedNode, withNothingButItsIdentityIsKept) {
     EXPECT_EQ(merged(base, bodyOf({labelled(two)}), both), both);
 }
 
+TEST(DisputedNestedNode, withAnEmptyUuidIsIdentifiedByItsName) {
+    auto const node = [](std::string const& value) {
+        return bodyOf({R"({"file":"a","children":[{"type":"E","keys":{"Name":"n","UUID":"","V":")" + value +
+                       R"("}}]})"});
+    };
+    std::string const none = bodyOf({R"("a")"});
+    std::string const base = unfinished(node("1"), node("2"), none);
+    EXPECT_EQ(merged(base, node("2"), none), "Nested at a in E n, removed by theirs");
+    EXPECT_EQ(merged(base, none, node("2")), "Nested at a in E n, removed by ours");
+    EXPECT_EQ(merged(base, node("2"), node("2")), node("2"));
+}
+
+TEST(DisputedNestedNode, thatIsThereTwiceIsKeptOnce) {
+    auto const labelled = [](std::string const& labels) {
+        return R"({"file":"a","children":[)" + labels + "]}";
+    };
+    std::string const one = R"({"type":"Label","keys":{"UUID":"1"}})";
+    std::string const two = R"({"type":"Label","keys":{"UUID":"2"}})";
+    std::string const changed = R"({"type":"Label","keys":{"UUID":"2","k":"2"}})";
+    std::string const twins = labelled(changed + ',' + one + ',' + two);
+    std::string const base =
+        bodyOf({"<<<<<<< ours", labelled(one + ',' + two), "=======", twins, ">>>>>>> theirs"});
+
+    TextMerge const merge = mergeTexts(base, bodyOf({twins}), bodyOf({R"("a")"}));
+
+    EXPECT_EQ(merge.conflicts().size(), 1U); // the one with a key; the other one is a plain addition
+    EXPECT_EQ(merge.text({MergeSide::Theirs}), bodyOf({labelled(two)}));
+}
+
 TEST(DisputedBase, isMergedEvenIfASideContainsTheTextForDisputedValues) {
     std::string const base = unfinished(keyed("1"), keyed("2"), keyed("3"));
     EXPECT_EQ(merged(base, keyed("(disputed)"), keyed("(disputed))")), "Key k at a");
