@@ -20,8 +20,6 @@ using management::ProjectManagerBase;
 using metadata::MetadataPath;
 using std::chrono::milliseconds;
 using stores::StoreError;
-using stores::TextBackend;
-using stores::TreeMetadataManager;
 
 namespace {
 

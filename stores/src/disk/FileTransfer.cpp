@@ -60,10 +60,9 @@ void requireReadableLength(std::uint64_t length, std::string const& name) {
 void reserveAtOnce(std::string& bytes, std::size_t size) {
     bytes.reserve(size);
     auto const page = static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
-    auto const begin = reinterpret_cast<std::uintptr_t>(bytes.data()) / page * page;
-    auto const end = reinterpret_cast<std::uintptr_t>(bytes.data()) + size;
+    std::size_t const inPage = reinterpret_cast<std::uintptr_t>(bytes.data()) % page;
     if (size >= 64 * page) {
-        ::madvise(reinterpret_cast<void*>(begin), end - begin, MADV_POPULATE_WRITE); // older systems refuse
+        ::madvise(bytes.data() - inPage, inPage + size, MADV_POPULATE_WRITE); // older systems refuse
     }
 }
 
