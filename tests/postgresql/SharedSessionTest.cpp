@@ -1,4 +1,3 @@
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <thread>
@@ -10,6 +9,7 @@
 #include "project/stores/SharedLocation.hpp"
 #include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
+#include "support/EnvironmentVariable.hpp"
 #include "support/GitFolder.hpp"
 #include "support/TemporaryFolder.hpp"
 
@@ -31,10 +31,7 @@ protected:
         }
         std::ofstream services(configuration_.onDisk() / "services");
         services << serviceSection("engine", "owner") << serviceSection("other", "rita");
-        setenv("PGSERVICEFILE", (configuration_.onDisk() / "services").c_str(), 1);
     }
-
-    void TearDown() override { unsetenv("PGSERVICEFILE"); }
 
     static std::string serviceSection(std::string const& name, std::string const& user) {
         std::string lines = sharedServer().connection(user);
@@ -59,6 +56,7 @@ protected:
     }
 
     test::TemporaryFolder const configuration_;
+    test::EnvironmentVariable const serviceFile_{"PGSERVICEFILE", configuration_.onDisk() / "services"};
     test::TemporaryFolder const here_;
     test::TemporaryFolder const elsewhere_;
 };

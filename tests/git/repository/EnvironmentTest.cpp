@@ -1,24 +1,9 @@
-#include <cstdlib>
-
 #include "git/RepositoriesFixture.hpp"
 #include "project/git/GitError.hpp"
+#include "support/EnvironmentVariable.hpp"
 
 namespace project::git {
 namespace {
-
-/// Sets a variable of this process for the lifetime of the object.
-class Variable {
-public:
-    Variable(char const* name, std::string const& value) : name_(name) { ::setenv(name, value.c_str(), 1); }
-
-    ~Variable() { ::unsetenv(name_); }
-
-    Variable(Variable const&) = delete;
-    Variable& operator=(Variable const&) = delete;
-
-private:
-    char const* name_;
-};
 
 class WorkingFolder {
 public:
@@ -41,7 +26,7 @@ TEST_F(Environment, aRepositoryWithAWorkTreeInItsConfigurationKeepsIt) {
     auto const work = folder.addFolder("work");
     meta.run({"config", "core.worktree", work.string()});
     std::filesystem::rename(meta.onDisk() / "kept", work / "kept");
-    Variable const gitDir("GIT_DIR", meta.onDisk() / ".git");
+    test::EnvironmentVariable const gitDir("GIT_DIR", meta.onDisk() / ".git");
     GitRepository const repository(work, {{"GIT_DIR", meta.onDisk() / ".git"}});
     GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
     expectAgreement(repository, adapter);
@@ -50,9 +35,9 @@ TEST_F(Environment, aRepositoryWithAWorkTreeInItsConfigurationKeepsIt) {
 TEST_F(Environment, namesRepositoryWorkTreeAndIndex) {
     auto const meta = committed("meta");
     auto const work = folder.addFolder("work");
-    Variable const gitDir("GIT_DIR", meta.onDisk() / ".git");
-    Variable const workTree("GIT_WORK_TREE", work);
-    Variable const index("GIT_INDEX_FILE", folder.onDisk() / "index");
+    test::EnvironmentVariable const gitDir("GIT_DIR", meta.onDisk() / ".git");
+    test::EnvironmentVariable const workTree("GIT_WORK_TREE", work);
+    test::EnvironmentVariable const index("GIT_INDEX_FILE", folder.onDisk() / "index");
     GitRepository const repository(work, {{"GIT_DIR", meta.onDisk() / ".git"},
                                           {"GIT_WORK_TREE", work},
                                           {"GIT_INDEX_FILE", folder.onDisk() / "index"}});
@@ -68,7 +53,7 @@ TEST_F(Environment, withARepositoryAloneTheWorkingFolderIsTheWorkTree) {
     auto const meta = committed("meta");
     GitRepository const repository(folder.addFolder("work"), {{"GIT_DIR", meta.onDisk() / ".git"}});
     repository.write("kept");
-    Variable const gitDir("GIT_DIR", meta.onDisk() / ".git");
+    test::EnvironmentVariable const gitDir("GIT_DIR", meta.onDisk() / ".git");
     WorkingFolder const here(repository.onDisk());
     GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
     expectAgreement(repository, adapter);
@@ -76,7 +61,7 @@ TEST_F(Environment, withARepositoryAloneTheWorkingFolderIsTheWorkTree) {
 
 TEST_F(Environment, withSomethingElseInPlaceOfARepositoryIsAnError) {
     auto const repository = committed("work");
-    Variable const gitDir("GIT_DIR", folder.onDisk() / "work/d");
+    test::EnvironmentVariable const gitDir("GIT_DIR", folder.onDisk() / "work/d");
     GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
     EXPECT_THROW(repository.adapterStates(adapter, {"kept"}), GitError);
 }
@@ -84,8 +69,8 @@ TEST_F(Environment, withSomethingElseInPlaceOfARepositoryIsAnError) {
 TEST_F(Environment, countsOnlyWhereItIsAskedFor) {
     auto const meta = committed("meta");
     auto const repository = committed("work");
-    Variable const gitDir("GIT_DIR", meta.onDisk() / ".git");
-    Variable const workTree("GIT_WORK_TREE", meta.onDisk());
+    test::EnvironmentVariable const gitDir("GIT_DIR", meta.onDisk() / ".git");
+    test::EnvironmentVariable const workTree("GIT_WORK_TREE", meta.onDisk());
     GitAdapter ignoring(repository.root());
     EXPECT_EQ(repository.adapterStates(ignoring, {"kept"}).at("kept"), 1);
     GitAdapter honouring(repository.root(), GitEnvironment::Honoured);
@@ -102,7 +87,7 @@ TEST_F(Environment, withoutItsVariablesTheRepositoryAroundTheProjectCounts) {
 TEST_F(Environment, mayNameTheIndexAlone) {
     auto const repository = committed("work");
     auto const before = repository.index();
-    Variable const index("GIT_INDEX_FILE", folder.onDisk() / "index");
+    test::EnvironmentVariable const index("GIT_INDEX_FILE", folder.onDisk() / "index");
     GitRepository const other(repository.onDisk(), {{"GIT_INDEX_FILE", folder.onDisk() / "index"}});
     other.run({"read-tree", "HEAD"});
     GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
@@ -115,7 +100,7 @@ TEST_F(Environment, mayNameTheWorkTreeAlone) {
     auto const elsewhere = folder.addFolder("elsewhere");
     std::filesystem::rename(repository.onDisk() / "kept", elsewhere / "kept");
     std::filesystem::create_directory(elsewhere / "d");
-    Variable const workTree("GIT_WORK_TREE", elsewhere);
+    test::EnvironmentVariable const workTree("GIT_WORK_TREE", elsewhere);
     GitAdapter adapter(repository.root(), GitEnvironment::Honoured);
     GitRepository const files(elsewhere);
     EXPECT_EQ(files.adapterStates(adapter, {"kept", "d/kept"}), (States{{"kept", 1}, {"d/kept", 3}}));
@@ -125,7 +110,7 @@ TEST_F(Environment, mayNameTheWorkTreeAlone) {
 TEST_F(Environment, withABareRepositoryAloneThereIsNoWorkTree) {
     runGit(folder.onDisk(), {"init", "-q", "--bare", "bare.git"});
     GitRepository const files(folder.addFolder("work"));
-    Variable const gitDir("GIT_DIR", folder.onDisk() / "bare.git");
+    test::EnvironmentVariable const gitDir("GIT_DIR", folder.onDisk() / "bare.git");
     WorkingFolder const here(files.onDisk());
     GitAdapter adapter(files.root(), GitEnvironment::Honoured);
     expectNoRepository(files, adapter);
@@ -133,8 +118,8 @@ TEST_F(Environment, withABareRepositoryAloneThereIsNoWorkTree) {
 
 TEST_F(Environment, namesNothingWhereThereIsNoRepository) {
     GitRepository const files(folder.addFolder("work"));
-    Variable const workTree("GIT_WORK_TREE", files.onDisk());
-    Variable const index("GIT_INDEX_FILE", folder.onDisk() / "index");
+    test::EnvironmentVariable const workTree("GIT_WORK_TREE", files.onDisk());
+    test::EnvironmentVariable const index("GIT_INDEX_FILE", folder.onDisk() / "index");
     GitAdapter adapter(files.root(), GitEnvironment::Honoured);
     expectNoRepository(files, adapter);
 }

@@ -10,6 +10,7 @@
 
 #include "postgresql/SharedProjectFixture.hpp"
 #include "support/ChildProcess.hpp"
+#include "support/EnvironmentVariable.hpp"
 
 namespace project::postgresql {
 
@@ -30,20 +31,6 @@ protected:
     }
 };
 
-/// Sets a variable of the environment for the lifetime of the object.
-class Variable {
-public:
-    Variable(char const* name, std::string const& value) : name_(name) { ::setenv(name, value.c_str(), 1); }
-
-    ~Variable() { ::unsetenv(name_); }
-
-    Variable(Variable const&) = delete;
-    Variable& operator=(Variable const&) = delete;
-
-private:
-    char const* name_;
-};
-
 } // namespace
 
 TEST_F(ServiceTest, aServiceFileAndAPasswordFileAreEnough) {
@@ -53,8 +40,8 @@ TEST_F(ServiceTest, aServiceFileAndAPasswordFileAreEnough) {
                                        "\ndbname=projects\nuser=anna\nsslmode=disable\n");
     auto const passwords = folder.addFile("passwords", "*:*:projects:anna:secret\n");
     std::filesystem::permissions(passwords, std::filesystem::perms::owner_read);
-    Variable const serviceFile("PGSERVICEFILE", services);
-    Variable const passwordFile("PGPASSFILE", passwords);
+    test::EnvironmentVariable const serviceFile("PGSERVICEFILE", services);
+    test::EnvironmentVariable const passwordFile("PGPASSFILE", passwords);
     PostgresJournal journal(settingsFor("garden"), project.id);
     EXPECT_TRUE(journal.look(std::nullopt).entries.empty());
     EXPECT_EQ(journal.name(), "garden, project " + project.id);
@@ -82,7 +69,7 @@ TEST_F(ServiceTest, aWrongPasswordIsRefused) {
 }
 
 TEST_F(ServiceTest, aMissingPasswordIsRefused) {
-    Variable const none("PGPASSFILE", "/nonexistent");
+    test::EnvironmentVariable const none("PGPASSFILE", "/nonexistent");
     auto const error = errorWith("host=127.0.0.1 sslmode=disable user=anna dbname=projects port=" +
                                  std::to_string(sharedServer().port()));
     EXPECT_EQ(error.kind(), StoreError::Kind::Refused);
