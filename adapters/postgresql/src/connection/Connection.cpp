@@ -242,10 +242,7 @@ void Connection::waitFor(short events, Limits const& limits) {
 }
 
 void Connection::requireOwnProcess() const {
-    if (::getpid() != process_) {
-        throw StoreError(StoreError::Kind::Refused, where_, 0, "the connection belongs to the parent process",
-                         "Open the project again after a fork.");
-    }
+    refuseAfterFork(process_, where_);
 }
 
 void Connection::throwLost() const {

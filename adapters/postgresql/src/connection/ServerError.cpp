@@ -4,6 +4,8 @@
 #include <array>
 #include <cctype>
 
+#include <unistd.h>
+
 namespace project::postgresql {
 
 namespace {
@@ -144,6 +146,13 @@ void throwStatementError(std::string const& where, PGresult const* result) {
         throw ConnectionLost(where, message);
     }
     throwMeaning(where, code, message);
+}
+
+void refuseAfterFork(pid_t owner, std::string const& where) {
+    if (::getpid() != owner) {
+        throw StoreError(StoreError::Kind::Refused, where, 0, "the connection belongs to the parent process",
+                         "Open the project again after a fork.");
+    }
 }
 
 std::string_view codeOf(PGresult const* result) {

@@ -4,6 +4,7 @@
 #include <string_view>
 
 #include <libpq-fe.h>
+#include <sys/types.h>
 
 #include "project/stores/StoreError.hpp"
 
@@ -28,6 +29,10 @@ std::string shownMessage(std::string_view message);
 
 /// Throws the error for a statement that failed.
 [[noreturn]] void throwStatementError(std::string const& where, PGresult const* result);
+
+/// Throws a StoreError with the kind Refused in a fork of the process that opened a connection.
+/// @param owner that process.
+void refuseAfterFork(pid_t owner, std::string const& where);
 
 /// The code of a failed statement; empty if it failed because the connection was lost.
 std::string_view codeOf(PGresult const* result);

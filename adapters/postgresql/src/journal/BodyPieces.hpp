@@ -7,7 +7,8 @@
 
 namespace project::postgresql {
 
-/// Cuts a body into pieces and compresses each on its own. None has more than 1 MiB, whatever it contains.
+/// Cuts a body into pieces and compresses each on its own. A piece has at most 1 MiB, also if its content
+/// cannot be compressed.
 std::vector<std::string> cutBody(std::string_view body);
 
 /// Appends the content of a piece to a body.

@@ -41,10 +41,7 @@ ServerSession::ServerSession(ServiceSettings const& settings, std::string where)
 }
 
 void ServerSession::connect(Deadline const& deadline) {
-    if (::getpid() != owner_) {
-        throw StoreError(StoreError::Kind::Refused, where_, 0, "the connection belongs to the parent process",
-                         "Open the project again after a fork.");
-    }
+    refuseAfterFork(owner_, where_);
     if (connection_) {
         return;
     }

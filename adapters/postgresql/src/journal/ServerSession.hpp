@@ -45,7 +45,8 @@ public:
         }
     }
 
-    /// Connects if there is no connection, and ends the former processes on the server.
+    /// Does nothing if the session is connected. Otherwise connects, and terminates the processes on the
+    /// server that served earlier connections.
     void connect(Deadline const& deadline);
 
     /// Closes the connection, whose process on the server is ended at the next one.
