@@ -28,19 +28,19 @@ Block blockAt(char const* bytes) noexcept {
     return result;
 }
 
-/// Whether a plain path ends in a block: at a quote, a backslash, a control character, a byte that is not
-/// ASCII (it is negative), or an empty name. @param block not at the beginning of the text.
-bool hasPathEnd(char const* block) noexcept {
-    Block const bytes = blockAt(block);
-    Block const before = blockAt(block - 1);
-    Block const ends = (bytes < 0x20) | (bytes == '"') | (bytes == '\\') | ((bytes == '/') & (before == '/'));
-    auto const halves = std::bit_cast<std::array<std::uint64_t, 2>>(ends);
-    return (halves[0] | halves[1]) != 0;
+/// Whether a plain path ends at a byte, for one byte or for each byte of a block: at a quote, a backslash, a
+/// control character, a byte that is not ASCII (it is negative), or an empty name.
+/// @param before the byte before it.
+template <typename Bytes>
+auto isPathEnd(Bytes bytes, Bytes before) noexcept {
+    return (bytes < 0x20) | (bytes == '"') | (bytes == '\\') | ((bytes == '/') & (before == '/'));
 }
 
-bool isPathEnd(char const* byte) noexcept {
-    return static_cast<signed char>(*byte) < 0x20 || *byte == '"' || *byte == '\\' ||
-           (*byte == '/' && byte[-1] == '/');
+/// @param bytes not at the beginning of the text.
+bool hasPathEnd(char const* bytes) noexcept {
+    Block const ends = isPathEnd(blockAt(bytes), blockAt(bytes - 1));
+    auto const halves = std::bit_cast<std::array<std::uint64_t, 2>>(ends);
+    return (halves[0] | halves[1]) != 0;
 }
 
 /// Reads a line in the one form and order in which it is written.
@@ -198,7 +198,8 @@ std::size_t plainPathLength(std::string_view text) noexcept {
     while (at + blockLength <= text.size() && !hasPathEnd(text.data() + at)) {
         at += blockLength;
     }
-    while (at < text.size() && !isPathEnd(text.data() + at)) {
+    while (at < text.size() &&
+           !isPathEnd(static_cast<signed char>(text[at]), static_cast<signed char>(text[at - 1]))) {
         ++at;
     }
     bool const isComplete = at < text.size() && text[at] == '"';

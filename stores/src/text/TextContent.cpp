@@ -165,7 +165,7 @@ private:
     std::string line_;
 };
 
-/// Writes the entries of an overlay and over them the changes of a batch.
+/// Writes the entries of an overlay and over them the changes of a batch without removals.
 /// @return false if the batch does not set each address once and in order. The batches of many addresses do;
 /// they can be written without a sorted copy.
 bool writeOver(ContentWriter& writer, Overlay const& overlay, Batch const& batch) {
@@ -183,8 +183,7 @@ bool writeOver(ContentWriter& writer, Overlay const& overlay, Batch const& batch
         bool const isReplacing = entry != end && entry->first == change.address;
         bool const isHiding = isReplacing && entry->second.isHiding;
         entry = isReplacing ? std::next(entry) : entry;
-        if (change.kind == Change::Kind::Remove ||
-            !writer.add(change.address, change.node, change.kind == Change::Kind::Create, isHiding)) {
+        if (!writer.add(change.address, change.node, change.kind == Change::Kind::Create, isHiding)) {
             return false;
         }
     }
@@ -295,9 +294,12 @@ void TextContent::finishJoining() {
 }
 
 TextBody TextContent::write(Batch const& batch) const {
-    ContentWriter writer(body_, overlay_.entries().size() + batch.size());
-    if (writeOver(writer, overlay_, batch)) {
-        return std::move(writer).finish();
+    auto const isRemoval = [](Change const& change) { return change.kind == Change::Kind::Remove; };
+    if (std::none_of(batch.begin(), batch.end(), isRemoval)) {
+        ContentWriter writer(body_, overlay_.entries().size() + batch.size());
+        if (writeOver(writer, overlay_, batch)) {
+            return std::move(writer).finish();
+        }
     }
     Overlay overlay = overlay_;
     for (Change const& change : batch) {
