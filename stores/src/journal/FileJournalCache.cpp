@@ -12,7 +12,8 @@ namespace {
 constexpr char const* fileName = "text";
 constexpr char const* temporaryName = "text.tmp";
 
-/// Removes the part of a line before a separator. @return that part; empty if there is no separator.
+/// Removes the beginning of a line up to a separator. @return it without the separator; empty if the line
+/// does not contain one.
 std::string_view takeUntil(std::string_view& line, char separator) {
     std::size_t const end = line.find(separator);
     if (end == std::string_view::npos) {

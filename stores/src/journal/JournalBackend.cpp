@@ -3,9 +3,10 @@
 #include <algorithm>
 #include <utility>
 
+#include "fl/i18n/Utf8.hpp"
 #include "journal/BodySearch.hpp"
-#include "journal/EntryId.hpp"
 #include "journal/SeenLog.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
 #include "project/stores/StoreError.hpp"
 #include "text/ProjectText.hpp"
 #include "text/TextDifference.hpp"
@@ -81,6 +82,7 @@ private:
     void requireUndamaged() const;
     void requireNoReset() const;
     StoreError damageError() const;
+    SeenLog readAgain() const;
     std::string problemOf(SeenLog const& log) const;
     PendingEntry prepare(Batch const& batch) const;
     JournalPosition append(JournalPosition const& after, std::string_view lines, ProjectText const* body,
@@ -262,7 +264,7 @@ void JournalBackend::State::appendBody(ProjectText body, std::string_view lines)
 JournalPosition JournalBackend::State::append(JournalPosition const& after, std::string_view lines,
                                               ProjectText const* body, std::string_view sum) {
     NewJournalEntry entry;
-    entry.position = {after.version + 1, newEntryId(), std::string(sum)};
+    entry.position = {after.version + 1, fl::i18n::toUtf8(metadata::generateUUID()), std::string(sum)};
     entry.isBody = body != nullptr;
     entry.after = after.sum;
     entry.lines = lines;
@@ -340,10 +342,16 @@ std::size_t JournalBackend::State::deleteHistory(std::uint64_t version) {
     return journal->deleteBefore(body->version);
 }
 
-std::vector<Fault> JournalBackend::State::check() {
+/// The log from its newest body on, as a new client reads it.
+SeenLog JournalBackend::State::readAgain() const {
     SeenLog log(*journal);
     Changes ignored;
     log.follow(journal->look(std::nullopt), ignored);
+    return log;
+}
+
+std::vector<Fault> JournalBackend::State::check() {
+    SeenLog const log = readAgain();
     if (!log.damage()) {
         return {};
     }
@@ -354,9 +362,7 @@ std::optional<JournalBackend::SetAside> JournalBackend::State::repair() {
     Unlocking const unlocking(*this);
     lockAndCheck();
     requireNoReset();
-    SeenLog log(*journal);
-    Changes ignored;
-    log.follow(journal->look(std::nullopt), ignored);
+    SeenLog const log = readAgain();
     if (!log.damage()) {
         return std::nullopt;
     }

@@ -4,8 +4,8 @@
 
 #include "fl/filesystem/SystemName.hpp"
 #include "fl/i18n/Utf8.hpp"
-#include "journal/EntryId.hpp"
 #include "line/JsonReader.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
 #include "project/stores/StoreError.hpp"
 #include "project/stores/TextBackend.hpp"
 
@@ -102,7 +102,7 @@ bool createFile(Disk& disk, char const* name, std::string_view content, FileChan
 } // namespace
 
 std::string newSharedProjectId() {
-    return newEntryId();
+    return fl::i18n::toUtf8(metadata::generateUUID());
 }
 
 std::optional<SharedLocation> readSharedLocation(Disk& disk) {

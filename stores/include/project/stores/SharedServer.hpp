@@ -36,7 +36,7 @@ public:
     virtual void create(SharedProject const& project) const = 0;
 
     /// Deletes a project with its entries. The roles stay.
-    /// @return false if there is no such project.
+    /// @return false if the project does not exist.
     /// @throws StoreError with the kind Refused if the user is not the owner.
     virtual bool remove(std::string const& id) const = 0;
 
