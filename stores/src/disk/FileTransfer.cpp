@@ -55,15 +55,26 @@ void requireReadableLength(std::uint64_t length, std::string const& name) {
     }
 }
 
-/// Reserves memory. For a large text, the system provides all pages in one call; without it, each page would
-/// be provided by a fault of its own, which takes as long as reading the text.
+/// Reserves memory. For a large text, the system provides it in huge pages where it has them, and otherwise
+/// all pages in one call; without that, each page would be provided by a fault of its own, which takes as
+/// long as reading the text.
 void reserveAtOnce(std::string& bytes, std::size_t size) {
-    bytes.reserve(size);
+    constexpr std::size_t hugePage = 2 << 20;
     auto const page = static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
-    std::size_t const inPage = reinterpret_cast<std::uintptr_t>(bytes.data()) % page;
-    if (size >= 64 * page) {
-        ::madvise(bytes.data() - inPage, inPage + size, MADV_POPULATE_WRITE); // older systems refuse
+    if (size < 64 * page) {
+        bytes.reserve(size);
+        return;
     }
+    // A mapping whose length is a multiple of a huge page's begins at such a page; the allocator adds a
+    // header.
+    std::size_t const wholePages = (size + page + hugePage - 1) / hugePage * hugePage - page;
+    bytes.reserve(size < hugePage ? size : wholePages);
+    std::size_t const inPage = reinterpret_cast<std::uintptr_t>(bytes.data()) % page;
+    char* const begin = bytes.data() - inPage;
+    if (size >= hugePage) {
+        ::madvise(begin, inPage + bytes.capacity(), MADV_HUGEPAGE);
+    }
+    ::madvise(begin, inPage + size, MADV_POPULATE_WRITE); // older systems refuse
 }
 
 /// The fine clock's time, changed by a nanosecond if it is equal to the coarse clock's.

@@ -36,11 +36,17 @@ auto isPathEnd(Bytes bytes, Bytes before) noexcept {
     return (bytes < 0x20) | (bytes == '"') | (bytes == '\\') | ((bytes == '/') & (before == '/'));
 }
 
+/// The first byte of a block at which a plain path ends, or blockLength.
 /// @param bytes not at the beginning of the text.
-bool hasPathEnd(char const* bytes) noexcept {
-    Block const ends = isPathEnd(blockAt(bytes), blockAt(bytes - 1));
+std::size_t pathEndInBlock(char const* bytes) noexcept {
+    Block const ends = isPathEnd(blockAt(bytes), blockAt(bytes - 1)); // the bytes at an end have all bits set
     auto const halves = std::bit_cast<std::array<std::uint64_t, 2>>(ends);
-    return (halves[0] | halves[1]) != 0;
+    constexpr std::size_t halfLength = blockLength / 2;
+    auto const firstByte = [](std::uint64_t half) {
+        bool const isLittle = std::endian::native == std::endian::little;
+        return static_cast<std::size_t>(isLittle ? std::countr_zero(half) : std::countl_zero(half)) / 8;
+    };
+    return halves[0] != 0 ? firstByte(halves[0]) : halfLength + firstByte(halves[1]);
 }
 
 /// Reads a line in the one form and order in which it is written.
@@ -195,10 +201,14 @@ std::size_t plainPathLength(std::string_view text) noexcept {
         return 0;
     }
     std::size_t at = 1;
-    while (at + blockLength <= text.size() && !hasPathEnd(text.data() + at)) {
-        at += blockLength;
+    while (at + blockLength <= text.size()) {
+        std::size_t const end = pathEndInBlock(text.data() + at);
+        at += end;
+        if (end < blockLength) {
+            break;
+        }
     }
-    while (at < text.size() &&
+    while (at < text.size() && // the last bytes of the text
            !isPathEnd(static_cast<signed char>(text[at]), static_cast<signed char>(text[at - 1]))) {
         ++at;
     }

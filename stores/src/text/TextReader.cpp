@@ -19,7 +19,7 @@ namespace {
 class Reader {
 public:
     explicit Reader(std::string bytes) : body_(reading_.content.body()) {
-        constexpr std::size_t usualLine = 40;
+        constexpr std::size_t usualLine = 32;
         body_ = TextBody(std::move(bytes));
         body_.reserve(body_.bytes().size() / usualLine);
         reading_.isCanonical = true;
