@@ -25,10 +25,11 @@ public:
     void keep() noexcept { isKept_ = true; }
 
 private:
-    void remove() const noexcept;
+    void removeFiles() const noexcept;
 
     std::unique_ptr<stores::SharedServer> server_;
     std::string id_;
+    Path folder_; ///< of the location
     std::vector<Path> files_;
     bool isKept_ = false;
 };

@@ -16,13 +16,6 @@ using stores::JournalBackend;
 using stores::SharedLocation;
 using stores::TextBackend;
 
-namespace {
-
-/// In the folder of the location.
-constexpr char16_t const* cacheFolder = u"cache";
-
-} // namespace
-
 SessionStore::SessionStore(Path const& root, Options const& options)
     : tree_(std::make_shared<stores::TreeMetadataManager>(makeBackend(root, options),
                                                           root / TextBackend::folderName)) {
@@ -53,7 +46,7 @@ std::unique_ptr<Backend> SessionStore::makeLog(Path const& root, SharedLocation 
     logOptions.readsLastState = options.readsLastState;
     auto journal = stores::connectTo(location.kind, location.service)->open(location.project);
     auto cache = std::make_unique<stores::FileJournalCache>(
-        stores::makeSystemDisk(root / TextBackend::folderName, cacheFolder));
+        stores::makeSystemDisk(root / TextBackend::folderName, SharedLocation::cacheName), location.project);
     auto backend = std::make_unique<JournalBackend>(std::move(journal), logOptions, std::move(cache));
     log_ = backend.get();
     file_ = root / TextBackend::folderName / SharedLocation::fileName;

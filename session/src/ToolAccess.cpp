@@ -9,11 +9,22 @@ namespace project::session {
 ToolAccess::ToolAccess(Session& session) noexcept : state_(*session.state_) {
 }
 
+stores::Backend& ToolAccess::backend() noexcept {
+    if (state_.stored.log() != nullptr) {
+        return *state_.stored.log();
+    }
+    return *state_.stored.text();
+}
+
+stores::JournalBackend* ToolAccess::log() noexcept {
+    return state_.stored.log();
+}
+
 stores::TextBackend& ToolAccess::text() {
     if (state_.stored.text() == nullptr) {
         throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(state_.root.native()), 0,
                                  "is stored on a server, and this works on a text only",
-                                 "Use the session of an application.");
+                                 "\"projectctl shared\" has the commands for such a project.");
     }
     return *state_.stored.text();
 }

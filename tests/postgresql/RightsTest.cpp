@@ -155,6 +155,12 @@ TEST_F(RightsTest, onlyTheOwnerCreatesAndDeletesProjects) {
     EXPECT_FALSE(asOwner.remove(newId()));
 }
 
+TEST_F(RightsTest, aWriterIsNotTheOwner) {
+    EXPECT_EQ(errorOf([&] { anna->requireOwner(); }).kind(), StoreError::Kind::Refused);
+    EXPECT_EQ(errorOf([&] { open("rita")->requireOwner(); }).kind(), StoreError::Kind::Refused);
+    open("owner")->requireOwner();
+}
+
 TEST_F(RightsTest, anAdministratorCreatesAProjectWithPlainStatements) {
     auto const id = newId();
     EXPECT_EQ(attempt("owner", "CREATE ROLE meadow_reader NOLOGIN IN ROLE pm_reader;"

@@ -379,6 +379,15 @@ std::vector<JournalRecord> MemoryJournal::records(std::optional<std::uint64_t> b
     });
 }
 
+void MemoryJournal::requireOwner() {
+    callAgain("owner", [&](auto&) {
+        if (user_ != server_->owner_) {
+            throw error(StoreError::Kind::Refused, "only the owner of the project may do this");
+        }
+        return true;
+    });
+}
+
 std::size_t MemoryJournal::deleteBefore(std::uint64_t version) {
     return callAgain("delete", [&](auto&) {
         if (user_ != server_->owner_) {

@@ -122,6 +122,7 @@ public:
     void wake() noexcept override;
     std::vector<stores::JournalRecord> records(std::optional<std::uint64_t> before,
                                                std::size_t count) override;
+    void requireOwner() override;
     std::size_t deleteBefore(std::uint64_t version) override;
 
 private:

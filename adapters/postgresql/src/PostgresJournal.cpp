@@ -37,6 +37,10 @@ constexpr Statement newestRecords{
         " WHERE project = $1::uuid AND ($2::text = '' OR version < $2::text::bigint)"
         " ORDER BY version DESC LIMIT $3::bigint"};
 
+// The role that ran setup.sql owns the tables, and every project in them.
+constexpr Statement isOwner{"", "SELECT coalesce(pg_has_role(c.relowner, 'USAGE'), false) FROM pg_class c"
+                                " WHERE c.oid = to_regclass('pm.entry')"};
+
 constexpr Statement deleteEntries{
     "", "DELETE FROM pm.entry WHERE project = $1::uuid AND version < $2::bigint AND EXISTS"
         " (SELECT FROM pm.entry WHERE project = $1::uuid AND version = $2::bigint AND kind = 'b')"};
@@ -154,6 +158,15 @@ public:
         return records;
     }
 
+    void requireOwner() {
+        auto const deadline = session_.deadline();
+        auto const answers = run(deadline, [&] { return session_.run({{isOwner, {}}}, deadline); });
+        if (answers[0].rows() == 0 || answers[0].number(0, 0) == 0) {
+            throw StoreError(StoreError::Kind::Refused, where_, 0,
+                             "only the owner of the project may do this", "Ask the owner.");
+        }
+    }
+
     std::size_t deleteBefore(std::uint64_t version) {
         lock_.require();
         auto const end = std::to_string(version);
@@ -237,6 +250,10 @@ void PostgresJournal::wake() noexcept {
 
 std::vector<JournalRecord> PostgresJournal::records(std::optional<std::uint64_t> before, std::size_t count) {
     return implementation_->records(before, count);
+}
+
+void PostgresJournal::requireOwner() {
+    implementation_->requireOwner();
 }
 
 std::size_t PostgresJournal::deleteBefore(std::uint64_t version) {

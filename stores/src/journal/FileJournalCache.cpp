@@ -9,9 +9,6 @@ namespace project::stores {
 
 namespace {
 
-constexpr char const* fileName = "text";
-constexpr char const* temporaryName = "text.tmp";
-
 /// Removes the beginning of a line up to a separator. @return it without the separator; empty if the line
 /// does not contain one.
 std::string_view takeUntil(std::string_view& line, char separator) {
@@ -39,7 +36,8 @@ std::optional<CachedText> parse(std::string_view bytes) {
 
 } // namespace
 
-FileJournalCache::FileJournalCache(std::unique_ptr<Disk> disk) : disk_(std::move(disk)) {
+FileJournalCache::FileJournalCache(std::unique_ptr<Disk> disk, std::string name)
+    : disk_(std::move(disk)), name_(std::move(name)) {
 }
 
 std::optional<CachedText> FileJournalCache::load() noexcept {
@@ -47,7 +45,7 @@ std::optional<CachedText> FileJournalCache::load() noexcept {
         if (!disk_->openFolder()) {
             return std::nullopt;
         }
-        auto const content = disk_->read(fileName, 0);
+        auto const content = disk_->read(name_, 0);
         return content ? parse(content->bytes) : std::nullopt;
     } catch (...) {
         return std::nullopt;
@@ -57,13 +55,14 @@ std::optional<CachedText> FileJournalCache::load() noexcept {
 void FileJournalCache::store(CachedText const& cached) noexcept {
     try {
         JournalPosition const& position = cached.position;
+        std::string const temporary = name_ + ".tmp";
         disk_->makeFolder();
-        disk_->remove(temporaryName);
-        disk_->create(temporaryName,
+        disk_->remove(temporary);
+        disk_->create(temporary,
                       std::to_string(position.version) + " " + position.id + " " + position.sum + "\n" +
                           cached.text,
                       std::nullopt);
-        disk_->rename(temporaryName, fileName);
+        disk_->rename(temporary, name_);
     } catch (...) {
         // the next process reads the log
     }

@@ -49,10 +49,13 @@ public:
     bool tidy();
     std::size_t deleteHistory(std::uint64_t version);
     std::vector<Fault> check();
+    std::vector<Fault> faults();
     std::optional<SetAside> repair();
     void storeInCache() noexcept;
 
     std::optional<HistoryLoss> takeHistoryLoss() { return seen_.takeLoss(); }
+
+    std::optional<HistoryLoss> historyLoss() const noexcept { return seen_.loss(); }
 
     bool isShowingLastState() const noexcept { return isShowingLastState_; }
 
@@ -83,6 +86,7 @@ private:
     void requireNoReset() const;
     StoreError damageError() const;
     SeenLog readAgain() const;
+    std::vector<Fault> faultsOf(SeenLog const& log) const;
     std::string problemOf(SeenLog const& log) const;
     PendingEntry prepare(Batch const& batch) const;
     JournalPosition append(JournalPosition const& after, std::string_view lines, ProjectText const* body,
@@ -205,7 +209,7 @@ void JournalBackend::State::requireNoReset() const {
         throw StoreError(StoreError::Kind::Refused, journal->name(), 0,
                          "the server was reset to an earlier state: version " + std::to_string(loss->seen) +
                              " was seen, and the newest version is now " + std::to_string(loss->found),
-                         "Nothing is written until this loss was reported. Check which changes are missing.");
+                         "Check which changes are missing. \"projectctl shared status\" accepts the loss.");
     }
 }
 
@@ -351,7 +355,17 @@ SeenLog JournalBackend::State::readAgain() const {
 }
 
 std::vector<Fault> JournalBackend::State::check() {
-    SeenLog const log = readAgain();
+    return faultsOf(readAgain());
+}
+
+std::vector<Fault> JournalBackend::State::faults() {
+    if (!seen_.hasRead()) {
+        checkForChanges();
+    }
+    return faultsOf(seen_);
+}
+
+std::vector<Fault> JournalBackend::State::faultsOf(SeenLog const& log) const {
     if (!log.damage()) {
         return {};
     }
@@ -366,6 +380,7 @@ std::optional<JournalBackend::SetAside> JournalBackend::State::repair() {
     if (!log.damage()) {
         return std::nullopt;
     }
+    journal->requireOwner();
     if (!seen_.hasRead()) {
         throw StoreError(StoreError::Kind::Damaged, journal->name(), 0,
                          problemOf(log) + "; nothing before it is readable",
@@ -378,7 +393,8 @@ std::optional<JournalBackend::SetAside> JournalBackend::State::repair() {
 }
 
 void JournalBackend::State::storeInCache() noexcept {
-    if (!cache_ || !seen_.version() || seen_.position() == cached_) {
+    bool const isReset = seen_.loss() && seen_.loss()->kind == HistoryLoss::Kind::Reset;
+    if (!cache_ || !seen_.version() || seen_.position() == cached_ || isReset) {
         return;
     }
     try {
@@ -430,6 +446,10 @@ std::optional<HistoryLoss> JournalBackend::takeHistoryLoss() {
     return state_->takeHistoryLoss();
 }
 
+std::optional<HistoryLoss> JournalBackend::historyLoss() const noexcept {
+    return state_->historyLoss();
+}
+
 bool JournalBackend::isShowingLastState() const noexcept {
     return state_->isShowingLastState();
 }
@@ -452,6 +472,10 @@ bool JournalBackend::tidy() {
 
 std::size_t JournalBackend::deleteHistory(std::uint64_t version) {
     return state_->deleteHistory(version);
+}
+
+std::vector<Fault> JournalBackend::faults() {
+    return state_->faults();
 }
 
 std::vector<Fault> JournalBackend::check() {

@@ -4,6 +4,7 @@
 
 #include "fl/filesystem/SystemName.hpp"
 #include "fl/i18n/Utf8.hpp"
+#include "journal/LocationFile.hpp"
 #include "line/JsonReader.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/stores/StoreError.hpp"
@@ -12,16 +13,12 @@
 namespace project::stores {
 
 char16_t const* const SharedLocation::fileName = u"store.json";
+char16_t const* const SharedLocation::cacheName = u"cache";
 
 namespace {
 
-constexpr std::string_view ignoredContent = "/cache/\n/store.json.tmp\n";
-constexpr char const* locationName = "store.json";
-constexpr char const* ignoredName = ".gitignore";
-constexpr char const* temporaryName = "store.json.tmp";
-
 [[noreturn]] void throwDamaged(Disk const& disk, std::string const& problem) {
-    throw StoreError(StoreError::Kind::Damaged, disk.folder() + '/' + locationName, 0, problem,
+    throw StoreError(StoreError::Kind::Damaged, disk.folder() + '/' + LocationFile::name, 0, problem,
                      "Restore the file from source control.");
 }
 
@@ -53,7 +50,7 @@ SharedLocation parse(Disk const& disk, std::string_view bytes) {
         throwDamaged(disk, "is not the location of a shared project");
     }
     if (version != 1) {
-        throw StoreError(StoreError::Kind::Refused, disk.folder() + '/' + locationName, 0,
+        throw StoreError(StoreError::Kind::Refused, disk.folder() + '/' + LocationFile::name, 0,
                          "has the later format " + std::to_string(version),
                          "Use a later version of this program.");
     }
@@ -66,27 +63,17 @@ SharedLocation parse(Disk const& disk, std::string_view bytes) {
     return result;
 }
 
-std::string contentOf(SharedLocation const& location) {
-    std::string result = R"({"format":"project-store","version":1,"kind":)";
-    appendJsonString(result, fl::i18n::fromUtf8(location.kind));
-    result += R"(,"service":)";
-    appendJsonString(result, fl::i18n::fromUtf8(location.service));
-    result += R"(,"project":)";
-    appendJsonString(result, fl::i18n::fromUtf8(location.project));
-    return result + "}\n";
-}
-
 std::string textName() {
     return fl::i18n::toUtf8(TextBackend::textName);
 }
 
 /// Creates a file that is complete as soon as it has its name. @return false if the name is taken.
 bool createFile(Disk& disk, char const* name, std::string_view content, FileChanges& created) {
-    disk.remove(temporaryName);
-    disk.create(temporaryName, content, std::nullopt);
+    disk.remove(LocationFile::temporary);
+    disk.create(LocationFile::temporary, content, std::nullopt);
     disk.sync();
-    if (!disk.renameToFree(temporaryName, name)) {
-        disk.remove(temporaryName);
+    if (!disk.renameToFree(LocationFile::temporary, name)) {
+        disk.remove(LocationFile::temporary);
         return false;
     }
     created.added.push_back(fl::filesystem::fromSystem(disk.folder()) /
@@ -101,6 +88,16 @@ bool createFile(Disk& disk, char const* name, std::string_view content, FileChan
 
 } // namespace
 
+std::string LocationFile::contentOf(SharedLocation const& location) {
+    std::string result = R"({"format":"project-store","version":1,"kind":)";
+    appendJsonString(result, fl::i18n::fromUtf8(location.kind));
+    result += R"(,"service":)";
+    appendJsonString(result, fl::i18n::fromUtf8(location.service));
+    result += R"(,"project":)";
+    appendJsonString(result, fl::i18n::fromUtf8(location.project));
+    return result + "}\n";
+}
+
 std::string newSharedProjectId() {
     return fl::i18n::toUtf8(metadata::generateUUID());
 }
@@ -109,7 +106,7 @@ std::optional<SharedLocation> readSharedLocation(Disk& disk) {
     if (!disk.openFolder()) {
         return std::nullopt;
     }
-    auto const content = disk.read(locationName, 0);
+    auto const content = disk.read(LocationFile::name, 0);
     if (!content) {
         return std::nullopt;
     }
@@ -125,8 +122,8 @@ FileChanges createSharedLocation(Disk& disk, SharedLocation const& location) {
         throwTaken(disk);
     }
     FileChanges created;
-    createFile(disk, ignoredName, ignoredContent, created);
-    if (!createFile(disk, locationName, contentOf(location), created)) {
+    createFile(disk, LocationFile::ignored, LocationFile::ignoredContent, created);
+    if (!createFile(disk, LocationFile::name, LocationFile::contentOf(location), created)) {
         throwTaken(disk);
     }
     disk.syncFolder();

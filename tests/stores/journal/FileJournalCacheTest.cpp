@@ -40,6 +40,15 @@ TEST_F(FileJournalCacheTest, theNextProcessLoadsTheStoredText) {
     EXPECT_THAT(volume_->names(), ElementsAre("text"));
 }
 
+TEST_F(FileJournalCacheTest, theCacheOfAnotherProjectIsNotLoaded) {
+    FileJournalCache other(std::make_unique<CrashingDisk>(volume_), "another-project");
+    other.store(sample_);
+
+    EXPECT_FALSE(cache()->load());
+    EXPECT_TRUE(other.load());
+    EXPECT_THAT(volume_->names(), ElementsAre("another-project"));
+}
+
 TEST_F(FileJournalCacheTest, withoutAFolderNothingIsLoadedAndNothingCreated) {
     EXPECT_FALSE(cache()->load());
     EXPECT_FALSE(volume_->hasFolder());

@@ -93,6 +93,21 @@ TEST_F(JournalCacheTest, aResetOfTheServerBetweenTwoProcessesIsReported) {
     EXPECT_EQ(loss->found, 1U);
 }
 
+TEST_F(JournalCacheTest, aResetIsReportedByEachProcessUntilItIsTaken) {
+    commit(*openCached(), {set(fileAddress(u"b"))});
+    server->resetTo(1);
+
+    contentOf(*openCached());
+
+    auto const refused = openCached();
+    EXPECT_EQ(errorOf([&] { commit(*refused, {set(fileAddress(u"c"))}); }).kind(), StoreError::Kind::Refused);
+    ASSERT_TRUE(refused->historyLoss());
+    EXPECT_EQ(refused->takeHistoryLoss()->kind, HistoryLoss::Kind::Reset);
+    EXPECT_FALSE(refused->historyLoss());
+    commit(*refused, {set(fileAddress(u"c"))});
+    EXPECT_EQ(stored(), files({u"a", u"c"}));
+}
+
 TEST_F(JournalCacheTest, theCachedStateIsShownWhileTheServerIsUnreachableIfThatIsWanted) {
     server->plan(Fault::Unreachable, 0);
     EXPECT_EQ(errorOf([&] { contentOf(*openCached()); }).kind(), StoreError::Kind::Unreachable);

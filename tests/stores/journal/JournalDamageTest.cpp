@@ -228,6 +228,17 @@ TEST_F(JournalDamage, aClientThatReadSomeOfTheEntriesBeforeTheyWereDamagedLosesO
     EXPECT_EQ(contentOf(*healthy_), stored());
 }
 
+TEST_F(JournalDamage, onlyTheOwnerSetsEntriesAside) {
+    corrupt(server->entry(3).read.lines);
+    JournalBackend client(std::make_unique<MemoryJournal>(server, "anna"), appending());
+    contentOf(client);
+
+    EXPECT_EQ(errorOf([&] { client.repair(); }).kind(), StoreError::Kind::Refused);
+
+    EXPECT_EQ(stored(), files({u"a", u"b"})) << "the damage stays";
+    EXPECT_TRUE(open()->repair());
+}
+
 TEST_F(JournalDamage, anyOtherClientSetsTheDamagedEntriesAsideAndTheyStayInTheLog) {
     corrupt(server->entry(3).read.lines);
     auto const client = open();

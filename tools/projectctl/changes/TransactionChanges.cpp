@@ -70,7 +70,7 @@ std::vector<Difference> changesOfTransaction(OpenProject& project) {
         waiting.pop_back();
         project::stores::ChildCollector after;
         project.loadChildren(address, after);
-        LevelComparison(address, result, waiting).run(project.text().load(address), after.take());
+        LevelComparison(address, result, waiting).run(project.backend().load(address), after.take());
     }
     std::ranges::sort(result,
                       [](auto const& left, auto const& right) { return left.address < right.address; });

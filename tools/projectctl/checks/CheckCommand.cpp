@@ -33,9 +33,9 @@ public:
         }
         Progress progress("Checking the project");
         std::size_t faults = 0;
-        std::string const file = project.textFile();
-        auto const& faultsOfText = project.faultsOfText();
-        for (auto const& fault : faultsOfText) {
+        std::string const file = project.definition();
+        auto const faultsOfDefinition = project.log() == nullptr ? project.faults() : project.log()->check();
+        for (auto const& fault : faultsOfDefinition) {
             ++faults;
             std::string const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
             report(file + line + ": " + fault.problem);
@@ -46,7 +46,9 @@ public:
             report(file + (isFault ? ": " : ": note: ") + finding.text);
         }
         Findings ofSetup;
-        checkMergeSetup(project.root(), ofSetup);
+        if (project.log() == nullptr) { // git merges no log
+            checkMergeSetup(project.root(), ofSetup);
+        }
         std::size_t const faultsOfProject = faults;
         for (auto const& finding : ofSetup) {
             bool const isFault = finding.weight == Finding::Weight::Fault;
@@ -55,7 +57,7 @@ public:
         }
         output().say(faults == 0            ? "The project has no faults."
                      : faultsOfProject == 0 ? "'projectctl setup' configures the merge driver."
-                                            : adviceFor(faultsOfText));
+                                            : adviceFor(faultsOfDefinition));
         return faults == 0 ? exit_code::done : exit_code::finding;
     }
 
@@ -64,10 +66,22 @@ public:
 private:
     static void repair(OpenProject& project) {
         project.shield().raise();
+        if (auto* const log = project.log()) {
+            repair(*log);
+            return;
+        }
         std::string const aside = project.text().repair();
         if (!aside.empty()) {
             project.stageLater();
             report("the damaged lines are now in " + project.storeFile(aside));
+        }
+    }
+
+    static void repair(project::stores::JournalBackend& log) {
+        if (auto const aside = log.repair()) {
+            report("the damaged entries " + std::to_string(aside->first) + " to " +
+                   std::to_string(aside->last) + " of the log are set aside" +
+                   (aside->isNothingLost ? ", and nothing is lost" : "; what could be read is kept"));
         }
     }
 

@@ -42,7 +42,9 @@ public:
         }
         Differences found{leavesOutIgnored_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
                           findProblems(project, isJson_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_))};
-        checkMergeSetup(root_, found.problems);
+        if (project.log() == nullptr) { // git merges no log
+            checkMergeSetup(root_, found.problems);
+        }
         isJson_ ? writeJson(found) : writeLines(found);
         return 0;
     }

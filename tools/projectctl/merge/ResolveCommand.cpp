@@ -40,6 +40,11 @@ public:
     }
 
     int run(OpenProject& project) override {
+        if (project.log() != nullptr) {
+            throw Failure(
+                "a server stores the project: its changes are in one order, so there are no conflicts "
+                "to resolve");
+        }
         auto const merge = mergeAgain(project.root());
         auto const choices = choose(merge.conflicts());
         project.shield().raise();

@@ -21,6 +21,10 @@ public:
 
     int run() override {
         auto const root = findProjectRoot(workingFolder());
+        if (isShared(root)) {
+            throw Failure(
+                "a server stores the project: git merges no text of it, so there is nothing to set up");
+        }
         if (mergeSetupOf(root) == MergeSetup::NoRepository) {
             throw Failure("\"" + shown(root) +
                           "\" is not in a git repository, so there is nothing to set up");

@@ -11,6 +11,7 @@
 #include "project/Commands.hpp"
 #include "project/OpenProject.hpp"
 #include "project/ProjectFolder.hpp"
+#include "project/SharedRoles.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
@@ -24,6 +25,10 @@ public:
         auto* const app = tool.add_subcommand("init", "Create a project in a folder");
         takeText(*app, "FOLDER", folder_, "The root folder; by default the current folder");
         takeText(*app, "--name", name_, "The name of the project; by default the name of the folder");
+        auto* const store =
+            takeText(*app, "--store", store_,
+                     "Let the server of this service store the project, for a team that shares it");
+        takeRoles(*app, *store, reader_, writer_);
         return app;
     }
 
@@ -31,8 +36,12 @@ public:
         auto const root = folder_ ? chosenFolder(*folder_) : workingFolder();
         requireNoProject(root);
         std::u16string const name = name_ ? textOf(*name_) : nameOf(root);
-        OpenProject::create(root, name).stage();
-        if (settings().sourceControl) {
+        if (store_) {
+            OpenProject::createShared(root, name, sharedStore(*store_, name, reader_, writer_)).stage();
+        } else {
+            OpenProject::create(root, name).stage();
+        }
+        if (!store_ && settings().sourceControl) {
             auto const setup = mergeSetupOf(root);
             if (setup == MergeSetup::Missing || setup == MergeSetup::ProgramMissing) {
                 setUpMerge(root);
@@ -70,6 +79,9 @@ private:
 
     std::optional<std::string> folder_;
     std::optional<std::string> name_;
+    std::optional<std::string> store_;
+    std::optional<std::string> reader_;
+    std::optional<std::string> writer_;
 };
 
 } // namespace

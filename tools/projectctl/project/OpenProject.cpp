@@ -15,6 +15,7 @@ namespace projectctl {
 using project::metadata::MetadataPath;
 using project::session::SourceControl;
 using project::stores::Fault;
+using project::stores::HistoryLoss;
 using project::stores::TextBackend;
 using ZEPHRA::project::management::FileNotInProject;
 
@@ -35,6 +36,11 @@ OpenProject OpenProject::create(Path const& root, std::u16string const& name) {
     return OpenProject(Session::create(root, name, sessionOptions()));
 }
 
+OpenProject OpenProject::createShared(Path const& root, std::u16string const& name,
+                                      project::session::SharedStore const& shared) {
+    return OpenProject(Session::createShared(root, name, shared, sessionOptions()));
+}
+
 OpenProject::OpenProject(Session session)
     : shield_(std::make_shared<WriteShield>()), session_(std::move(session)) {
     session_.project().subscribe(shield_);
@@ -46,8 +52,8 @@ OpenProject OpenProject::ofWorkingFolder() {
     return OpenProject(findProjectRoot(workingFolder()));
 }
 
-std::string OpenProject::textFile() const {
-    return shown(TextBackend::textPath(root()));
+std::string OpenProject::definition() {
+    return log() == nullptr ? shown(TextBackend::textPath(root())) : log()->journal().name();
 }
 
 std::string OpenProject::storeFile(std::string const& name) const {
@@ -62,7 +68,7 @@ void OpenProject::requireInProject(Path const& path) {
 
 void OpenProject::loadChildren(MetadataPath const& address, project::stores::ChildSink& children) {
     if (openTransactions_ == 0) {
-        text().load(address, children);
+        backend().load(address, children);
         return;
     }
     for (auto const& child : store().getChildNodes(address)) {
@@ -74,11 +80,11 @@ void OpenProject::loadChildren(MetadataPath const& address, project::stores::Chi
     }
 }
 
-std::vector<Fault> const& OpenProject::faultsOfText() {
+std::vector<Fault> const& OpenProject::faults() {
     if (openTransactions_ == 0) {
-        faultsOfText_ = text().check();
+        faults_ = log() == nullptr ? text().check() : log()->faults();
     }
-    return faultsOfText_;
+    return faults_;
 }
 
 void OpenProject::stageReturnedLater(std::vector<Path> const& files) {
@@ -98,16 +104,26 @@ void OpenProject::stageReturned() {
     access_.stageReturned(std::exchange(returned_, {}));
 }
 
+void OpenProject::warnOfReset() {
+    auto const loss = log() == nullptr ? std::nullopt : log()->historyLoss();
+    if (loss && loss->kind == HistoryLoss::Kind::Reset) {
+        printError("warning: the server was reset to an earlier state: version " +
+                   std::to_string(loss->seen) + " was seen here, and the newest one is now " +
+                   std::to_string(loss->found) + ". 'projectctl shared status' accepts that.");
+    }
+}
+
 void OpenProject::warnOfDamage() {
     std::size_t count = 0;
     std::string first;
     if (openTransactions_ > 0) {
         return;
     }
-    for (auto const& fault : faultsOfText()) {
+    for (auto const& fault : faults()) {
         if (fault.kind == Fault::Kind::Damage || fault.kind == Fault::Kind::Conflict) {
             if (count++ == 0) {
-                first = textFile() + ':' + std::to_string(fault.line) + ": " + fault.problem;
+                first = definition() + (fault.line > 0 ? ':' + std::to_string(fault.line) : "") + ": " +
+                        fault.problem;
             }
         }
     }

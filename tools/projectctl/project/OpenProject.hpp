@@ -1,5 +1,6 @@
 #pragma once
 
+#include <chrono>
 #include <cstddef>
 #include <memory>
 #include <string>
@@ -8,6 +9,7 @@
 #include "project/WriteShield.hpp"
 #include "project/session.hpp"
 #include "project/session/ToolAccess.hpp"
+#include "project/stores/JournalBackend.hpp"
 #include "project/stores/Node.hpp"
 #include "project/stores/TextBackend.hpp"
 
@@ -29,6 +31,11 @@ public:
     /// @throws StoreError when there is already one.
     static OpenProject create(Path const& root, std::u16string const& name);
 
+    /// Creates a project on a server, with a file in the folder that leads to it.
+    /// @throws StoreError when there is a project already, or the server refuses it.
+    static OpenProject createShared(Path const& root, std::u16string const& name,
+                                    project::session::SharedStore const& shared);
+
     /// Opens the project that contains the working folder.
     /// @throws Failure when there is none.
     static OpenProject ofWorkingFolder();
@@ -49,31 +56,44 @@ public:
 
     /// The backend of the store, which does not contain the changes of a transaction. Its `load` may be
     /// called while a guard of the store is open.
+    project::stores::Backend& backend() { return access_.backend(); }
+
+    /// The text behind the store.
+    /// @throws StoreError if a server stores the project.
     project::stores::TextBackend& text() { return access_.text(); }
 
-    /// Passes on the addresses directly below one address, as `load` of the text does, with the changes of a
-    /// transaction. Call it with a guard of the store open.
+    /// The log of a project that a server stores; otherwise null.
+    project::stores::JournalBackend* log() { return access_.log(); }
+
+    /// Passes on the addresses directly below one address, as `load` of the backend does, with the changes of
+    /// a transaction. Call it with a guard of the store open.
     void loadChildren(project::metadata::MetadataPath const& address, project::stores::ChildSink& children);
 
-    /// The faults of the text. In a transaction, those that were found before it: reading the text again
-    /// would show the changes of other programs in the middle of it. Otherwise call this without an open
-    /// guard.
-    std::vector<project::stores::Fault> const& faultsOfText();
+    /// The faults of the text, or of what was read of the log. In a transaction, those that were found before
+    /// it: reading again would show the changes of other programs in the middle of it. Otherwise call this
+    /// without an open guard.
+    std::vector<project::stores::Fault> const& faults();
 
     WriteShield& shield() noexcept { return *shield_; }
 
-    /// The path of the text, for messages.
-    std::string textFile() const;
+    /// The path of the text or the name of the log, for messages.
+    std::string definition();
 
     /// The path of another file in the store's folder, for messages. @param name in UTF-8.
     std::string storeFile(std::string const& name) const;
 
-    /// Warns on standard error, in one line, if the text is damaged or contains conflicts, because a listing
-    /// may then be incomplete. Does nothing in a transaction. Call this without an open guard.
+    /// Warns on standard error, in one line, if the definition is damaged or contains conflicts, because a
+    /// listing may then be incomplete. Does nothing in a transaction. Call this without an open guard.
     void warnOfDamage();
+
+    /// Warns on standard error, in one line, if the server of a shared project was reset to an earlier state.
+    void warnOfReset();
 
     /// Reads the changes of other programs, and raises the events for them.
     void refresh() { session_.refresh(); }
+
+    /// The same for a shared project, after it has waited for a change.
+    void watch(std::chrono::milliseconds time) { session_.watch(time); }
 
     project::management::ProjectEventBroadcaster& events() noexcept { return *session_.events(); }
 
@@ -107,7 +127,7 @@ private:
     Session session_;
     project::session::ToolAccess access_{session_};
     std::vector<Path> returned_; ///< of stageReturnedLater
-    std::vector<project::stores::Fault> faultsOfText_;
+    std::vector<project::stores::Fault> faults_;
     std::size_t openTransactions_ = 0;
 };
 

@@ -6,6 +6,7 @@ int ProjectCommand::run() {
     auto project = OpenProject::ofWorkingFolder();
     auto const result = run(project);
     project.stage();
+    project.warnOfReset();
     return result;
 }
 

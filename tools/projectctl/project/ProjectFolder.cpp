@@ -13,6 +13,7 @@
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
+#include "project/stores/SharedLocation.hpp"
 #include "project/stores/StoreError.hpp"
 #include "project/stores/SystemDisk.hpp"
 #include "project/stores/TextBackend.hpp"
@@ -21,6 +22,7 @@
 namespace projectctl {
 
 using fl::filesystem::SystemName;
+using project::stores::SharedLocation;
 using project::stores::StoreError;
 using project::stores::TextBackend;
 using project::stores::TreeMetadataManager;
@@ -57,10 +59,17 @@ ProjectTrace findProjectIn(Path const& folder) {
     if (kind != S_IFDIR) {
         return ProjectTrace::None;
     }
-    if (kindOf(store / TextBackend::textName) || errno != ENOENT) {
-        return ProjectTrace::Text;
+    for (auto const* file : {TextBackend::textName, SharedLocation::fileName}) {
+        if (kindOf(store / file) || errno != ENOENT) {
+            return ProjectTrace::Text;
+        }
     }
     return isEmptyFolder(store) ? ProjectTrace::None : ProjectTrace::TextMissing;
+}
+
+bool isShared(Path const& root) {
+    auto const disk = project::stores::makeSystemDisk(root, TextBackend::folderName);
+    return project::stores::readSharedLocation(*disk).has_value();
 }
 
 ProjectTrace findFinishedProjectIn(Path const& folder) {

@@ -10,10 +10,14 @@ using fl::filesystem::Path;
 enum class ProjectTrace {
     None,        ///< no store; an interrupted `init` can leave an empty folder with the store's name
     TextMissing, ///< a store without its text
-    Text,        ///< a store with its text, in any state
+    Text,        ///< a store with its text, in any state, or with the location of a server
 };
 
 ProjectTrace findProjectIn(Path const& folder);
+
+/// True if the project with this root is stored by a server.
+/// @throws StoreError if the file that says so is unreadable.
+bool isShared(Path const& root);
 
 /// The same, after another process has finished with the store: until then, a store without its text may
 /// belong to a project that is being created.

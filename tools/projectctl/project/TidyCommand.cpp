@@ -16,7 +16,10 @@ public:
 
     int run(OpenProject& project) override {
         project.shield().raise();
-        if (project.text().tidy()) {
+        if (auto* const log = project.log()) {
+            output().say(log->tidy() ? "The log begins with a new body."
+                                     : "The newest entry is a body already.");
+        } else if (project.text().tidy()) {
             project.stageLater();
             output().say("The project's text was tidied.");
         } else {

@@ -12,8 +12,14 @@ namespace projectctl {
 
 namespace {
 
-/// The time between two checks for changes. A check costs one system call.
+/// The time between two checks of a text for changes. A check costs one system call.
 constexpr auto checkInterval = std::chrono::milliseconds(50);
+
+/// How long to wait for the server of a shared project, which announces changes.
+constexpr auto longWait = std::chrono::hours(1);
+
+/// The time until the next attempt to reach a server that was unreachable.
+constexpr auto pauseAfterError = std::chrono::seconds(1);
 
 /// Prints the changes that other programs make to the project, until it is ended.
 class WatchCommand : public ProjectCommand {
@@ -31,23 +37,30 @@ public:
         output().say("Waiting for changes. Press Ctrl-C to stop.");
         for (;;) {
             output().flush();
-            std::this_thread::sleep_for(checkInterval);
-            checkForChanges(project);
+            awaitChange(project);
         }
     }
 
     bool canRunInBatch() const override { return false; }
 
 private:
-    /// A text that cannot be read now may be readable later: another program may be writing it.
-    void checkForChanges(OpenProject& project) {
+    /// A text that cannot be read now may be readable later: another program may be writing it. A server may
+    /// be reachable later.
+    void awaitChange(OpenProject& project) {
+        bool const isText = project.log() == nullptr;
+        if (isText) {
+            std::this_thread::sleep_for(checkInterval);
+        }
         try {
-            project.refresh();
+            isText ? project.refresh() : project.watch(longWait);
             lastProblem_.clear();
         } catch (project::stores::StoreError const& error) {
             if (lastProblem_ != error.what()) {
                 lastProblem_ = error.what();
                 printError(lastProblem_);
+            }
+            if (!isText) {
+                std::this_thread::sleep_for(pauseAfterError);
             }
         }
     }

@@ -5,8 +5,10 @@
 #include "project/session.hpp"
 
 namespace project::stores {
+class Backend;
+class JournalBackend;
 class TextBackend;
-}
+} // namespace project::stores
 
 namespace project::session {
 
@@ -16,6 +18,12 @@ class PROJECT_SESSION_EXPORT ToolAccess {
 public:
     /// @param session must outlive this object. It may be moved meanwhile.
     explicit ToolAccess(Session& session) noexcept;
+
+    /// The backend of the store: a text, or the log of a shared project.
+    stores::Backend& backend() noexcept;
+
+    /// The log of a shared project; otherwise null.
+    stores::JournalBackend* log() noexcept;
 
     /// The store's text. A change made through it is not staged; see markTextForStaging.
     /// @throws stores::StoreError with the kind Refused if the project is shared.

@@ -92,6 +92,9 @@ public:
     /// @param count the largest number of entries to return.
     virtual std::vector<JournalRecord> records(std::optional<std::uint64_t> before, std::size_t count) = 0;
 
+    /// @throws StoreError with the kind Refused if the user does not own the project. One round trip.
+    virtual void requireOwner() = 0;
+
     /// Deletes all entries with a smaller version, and the pieces of bodies that belong to no entry. Requires
     /// the lock. The pieces of an append that is in progress must stay, or make that append fail.
     /// @param version the version of a body.

@@ -92,6 +92,10 @@ public:
     /// been taken, writes are refused.
     std::optional<HistoryLoss> takeHistoryLoss();
 
+    /// The loss that takeHistoryLoss would return. A cache keeps the state before a reset until the loss is
+    /// taken, so that the next process finds it, too.
+    std::optional<HistoryLoss> historyLoss() const noexcept;
+
     /// True if the last read guard showed the last state because the server was unreachable.
     bool isShowingLastState() const noexcept;
 
@@ -117,12 +121,16 @@ public:
     /// @throws StoreError with the kind Refused if the user does not own the project.
     std::size_t deleteHistory(std::uint64_t version = std::numeric_limits<std::uint64_t>::max());
 
+    /// The faults of the entries that this client has read. Checks for changes only if it has read none.
+    std::vector<Fault> faults();
+
     /// Reads the log again from its newest body, and returns its faults. A problem names its version.
     std::vector<Fault> check();
 
     /// Sets damaged entries aside: appends a body with everything that is readable. If this client has read
     /// the newest entry before an entry was damaged, that is everything.
     /// @return nothing if no entry is damaged.
+    /// @throws StoreError with the kind Refused if the user does not own the project: content may be lost.
     std::optional<SetAside> repair();
 
     /// The log, for its records and for awaiting changes.

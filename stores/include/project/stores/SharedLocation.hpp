@@ -14,6 +14,9 @@ namespace project::stores {
 struct PROJECT_STORES_EXPORT SharedLocation {
     static char16_t const* const fileName;
 
+    /// The name of the folder beside the file in which a client keeps the last state.
+    static char16_t const* const cacheName;
+
     std::string kind;    ///< of the server, for example "postgresql"
     std::string service; ///< the name of the service in the configuration of the server's client library
     std::string project; ///< the project's UUID

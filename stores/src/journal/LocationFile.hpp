@@ -1,0 +1,21 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "project/stores/SharedLocation.hpp"
+
+namespace project::stores {
+
+/// The file that leads to a shared project, and the file for source control beside it.
+struct LocationFile {
+    static constexpr char const* name = "store.json";
+    static constexpr char const* temporary = "store.json.tmp";
+
+    static constexpr char const* ignored = ".gitignore";
+    static constexpr std::string_view ignoredContent = "/cache/\n/store.json.tmp\n/*.old*\n";
+
+    static std::string contentOf(SharedLocation const& location);
+};
+
+} // namespace project::stores
