@@ -86,6 +86,12 @@ std::string PostgresServer::obstacle() {
     return "";
 }
 
+std::string PostgresServer::obstacleToSmallDisk() {
+    auto const mount = asAccount({"/usr/bin/unshare", "--user", "--map-root-user", "--mount", "/bin/true"});
+    bool const canMount = test::runProgram(mount, {}).exitCode == 0;
+    return canMount ? obstacle() : "no user namespaces: nobody but root can mount a file system";
+}
+
 std::string PostgresServer::program(std::string const& name) {
     std::string newest;
     std::error_code ignored;
@@ -98,15 +104,22 @@ std::string PostgresServer::program(std::string const& name) {
     return newest;
 }
 
-PostgresServer::PostgresServer(std::vector<std::string> const& settings) : port_(freePort()) {
+PostgresServer::PostgresServer(std::vector<std::string> const& settings, int smallDisk)
+    : port_(freePort()), smallDisk_(smallDisk) {
     give(folder());
     auto const password = folder_.addFile("password", "secret");
     runProgram({program("initdb"), "--no-sync", "--username", superuser, "--auth", "scram-sha-256",
                 "--pwfile", password, "--encoding", "UTF8", "--locale", "C.UTF-8", "--pgdata", data()});
     allowWithoutPassword("swift");
     configure(settings);
+    std::filesystem::create_directory(folder() / "small");
+    give(folder() / "small");
     start();
     query("CREATE DATABASE projects", "postgres");
+    if (smallDisk > 0) {
+        std::string const location = (folder() / "small").string();
+        query("CREATE TABLESPACE small LOCATION '" + location + "'", "postgres");
+    }
 }
 
 PostgresServer::PostgresServer(PostgresServer const& primary, std::vector<std::string> const& settings)
@@ -148,10 +161,30 @@ void PostgresServer::start() {
     std::filesystem::remove(folder() / "log");
     auto const log = folder_.addFile("log");
     give(log);
-    // The shell's exec keeps the process, and the log keeps the pipe from filling up.
-    running_ =
-        startProgram({"/bin/sh", "-c", R"(exec "$0" -D "$1" >"$2" 2>&1)", program("postgres"), data(), log});
+    running_ = startProgram(commandWith(log));
     awaitStart();
+}
+
+/// Each exec keeps the process, and the log keeps the pipe from filling up.
+std::vector<std::string> PostgresServer::commandWith(std::string const& log) const {
+    if (smallDisk_ == 0) {
+        return {"/bin/sh", "-c", R"(exec "$0" -D "$1" >"$2" 2>&1)", program("postgres"), data(), log};
+    }
+    // Mounting needs the rights of root, which the server refuses to have: it gets a user of its own below.
+    return {"/usr/bin/unshare",
+            "--user",
+            "--map-root-user",
+            "--mount",
+            "/bin/sh",
+            "-c",
+            R"(mount -t tmpfs -o size="$3"m,mode=700 none "$4" &&)"
+            R"( exec unshare --user --map-user=1000 --map-group=1000 setpriv --pdeathsig QUIT)"
+            R"( "$0" -D "$1" >"$2" 2>&1)",
+            program("postgres"),
+            data(),
+            log,
+            std::to_string(smallDisk_),
+            folder() / "small"};
 }
 
 void PostgresServer::awaitStart() {

@@ -19,9 +19,14 @@ public:
     /// The reason why no server can be started here; empty if it can.
     static std::string obstacle();
 
+    /// The reason why no server with a small disk can be started here; empty if it can.
+    static std::string obstacleToSmallDisk();
+
     /// Creates an empty server and starts it.
     /// @param settings lines for its configuration file.
-    explicit PostgresServer(std::vector<std::string> const& settings = {});
+    /// @param smallDisk the mebibytes of a file system that only the server sees, as a tablespace `small`; 0
+    ///     for none.
+    explicit PostgresServer(std::vector<std::string> const& settings = {}, int smallDisk = 0);
 
     /// Starts a standby of another server, which follows it from now on.
     PostgresServer(PostgresServer const& primary, std::vector<std::string> const& settings);
@@ -72,9 +77,11 @@ private:
     void allowWithoutPassword(std::string const& user);
     void configure(std::vector<std::string> const& settings);
     void awaitStart();
+    std::vector<std::string> commandWith(std::string const& log) const;
 
     TemporaryFolder folder_;
     int port_;
+    int smallDisk_ = 0;
     std::unique_ptr<RunningProgram> running_;
 };
 

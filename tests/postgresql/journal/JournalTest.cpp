@@ -1,3 +1,4 @@
+#include <csignal>
 #include <future>
 #include <string>
 #include <thread>
@@ -5,6 +6,7 @@
 #include <gmock/gmock.h>
 
 #include "postgresql/SharedProjectFixture.hpp"
+#include "support/ChildProcess.hpp"
 #include "support/Waiting.hpp"
 
 namespace project::postgresql {
@@ -226,6 +228,26 @@ TEST_F(PostgresJournalTest, theServerEndsALockHolderThatIsIdleForTooLong) {
     append(*anna, *body(1, "text\n"));
     // The holder that goes on takes the lock again, and its entry is refused, because the state has changed.
     EXPECT_EQ(stopped.append(body(1, "other\n")->entry), Journal::Appended::Superseded);
+}
+
+TEST_F(PostgresJournalTest, aProcessThatIsStoppedWithTheLockLosesItAndStoresNothing) {
+    auto settings = settingsFor(sharedServer().connection("ben"));
+    settings.idleLockLimit = milliseconds(200);
+    test::ChildProcess holder([&](test::ChildProcess::Parent const& parent) {
+        PostgresJournal journal(settings, project.id);
+        journal.lock(seconds(5), std::nullopt);
+        parent.say("locked");
+        parent.await();
+        bool const isStored = journal.append(body(1, "other\n")->entry) == Journal::Appended::Stored;
+        parent.say(isStored ? "stored" : "superseded");
+    });
+    ASSERT_EQ(holder.hear(), "locked");
+    ASSERT_EQ(::kill(holder.id(), SIGSTOP), 0);
+    ASSERT_EQ(append(*anna, *body(1, "text\n")), Journal::Appended::Stored);
+    ASSERT_EQ(::kill(holder.id(), SIGCONT), 0);
+    holder.goOn();
+    EXPECT_EQ(holder.hear(), "superseded");
+    EXPECT_EQ(anna->look(std::nullopt).body, "text\n");
 }
 
 TEST_F(PostgresJournalTest, anAppendRequiresTheLock) {

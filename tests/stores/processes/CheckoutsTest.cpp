@@ -7,13 +7,13 @@
 #include <random>
 #include <thread>
 
-#include "SharedMemory.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/SystemDisk.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 #include "support/ChildProcess.hpp"
 #include "support/GitFolder.hpp"
 #include "support/NightlyScale.hpp"
+#include "support/SharedMemory.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/TextStore.hpp"
 #include "support/Waiting.hpp"

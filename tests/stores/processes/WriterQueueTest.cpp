@@ -18,10 +18,10 @@
 #include <sys/syscall.h>
 #include <unistd.h>
 
-#include "SharedMemory.hpp"
 #include "project/stores/SystemDisk.hpp"
 #include "support/ChildProcess.hpp"
 #include "support/NightlyScale.hpp"
+#include "support/SharedMemory.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/TextStore.hpp"
 #include "support/Waiting.hpp"

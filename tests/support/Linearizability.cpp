@@ -1,4 +1,4 @@
-#include "Linearizability.hpp"
+#include "support/Linearizability.hpp"
 
 #include <algorithm>
 #include <utility>
