@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "ChangeStep.hpp"
+#include "FileSearch.hpp"
 #include "NewSharedProject.hpp"
 #include "SessionState.hpp"
 #include "fl/i18n/Utf8.hpp"
@@ -56,6 +57,15 @@ Session::~Session() = default;
 
 management::ProjectManager& Session::project() noexcept {
     return *state_->project;
+}
+
+std::vector<FoundFile> Session::find(Query const& query) {
+    std::vector<FoundFile> result;
+    auto const guard = state_->store->acquireReadLock();
+    visitFound(query, *state_->store, state_->root, [&](VisitedFile const& file) {
+        result.push_back({state_->root / Path(file.path), file.kind});
+    });
+    return result;
 }
 
 Transaction Session::transaction() {

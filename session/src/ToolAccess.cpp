@@ -1,5 +1,7 @@
 #include "project/session/ToolAccess.hpp"
 
+#include "FileSearch.hpp"
+#include "FileTree.hpp"
 #include "SessionState.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
@@ -27,6 +29,22 @@ stores::TextBackend& ToolAccess::text() {
                                  "\"projectctl shared\" has the commands for such a project.");
     }
     return *state_.stored.text();
+}
+
+void ToolAccess::visit(Query const& query, FileVisitor const& visitor) {
+    visitFound(query, *state_.store, state_.root, visitor);
+}
+
+FileLevel ToolAccess::level(metadata::MetadataPath const& address) {
+    return FileTree(*state_.store, state_.root).level(address);
+}
+
+metadata::MetadataPath ToolAccess::addressOf(Path const& path) const {
+    return FileTree(*state_.store, state_.root).addressOf(path);
+}
+
+void ToolAccess::loadChildren(metadata::MetadataPath const& address, stores::ChildSink& children) {
+    state_.store->loadChildren(address, children);
 }
 
 void ToolAccess::markTextForStaging() noexcept {

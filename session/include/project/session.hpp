@@ -4,9 +4,11 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "project/management.hpp"
 #include "project/session/Export.hpp"
+#include "project/session/Query.hpp"
 #include "project/session/Transaction.hpp"
 #include "project/stores/HistoryLoss.hpp"
 #include "project/stores/SharedServer.hpp"
@@ -104,6 +106,15 @@ public:
     /// The outermost manager: changes made through it are committed, then staged, then reported to
     /// observers.
     management::ProjectManager& project() noexcept;
+
+    /// Finds the files and folders that meet all conditions of a query: all of them in one state of the
+    /// project, in the order of the store, which is that of Path. A folder comes before its contents. Reads
+    /// the store once, also for several conditions, and takes about as long as listing everything.
+    ///
+    /// Takes the read lock, and holds none when it returns. In a transaction of this thread, the results
+    /// contain its changes.
+    /// @throws stores::StoreError if the project cannot be read.
+    std::vector<FoundFile> find(Query const& query);
 
     /// Begins a transaction: the following changes of this thread are one step, which is in the project when
     /// the transaction is committed. If one is open already, the new one is nested in it.

@@ -85,6 +85,37 @@ std::vector<Address> MetadataTree::children(Address const& address) const {
     return result;
 }
 
+void MetadataTree::passChildren(Address const& address, ChildSink& children) const {
+    {
+        Cursors::Use use(cursors_);
+        bool const isThere = moveTo(address, *use, Loading::Never);
+        auto const* const found = below(*use);
+        if (found == nullptr || found->isNone()) {
+            return;
+        }
+        if (auto const* const level = found->loaded()) {
+            if (isThere) {
+                pass(*level, children);
+            }
+            return;
+        }
+    }
+    std::lock_guard const guard(loading_);
+    loader_(address, children);
+}
+
+void MetadataTree::pass(Level const& level, ChildSink& children) const {
+    level.forEach([&](Level::Position at) {
+        auto const element = level.element(types_, at);
+        auto const* const below = level.below(at);
+        auto const* const loaded = below == nullptr ? nullptr : below->loaded();
+        bool const hasChildren =
+            below != nullptr && !below->isNone() && (loaded == nullptr || !loaded->empty());
+        children.add(
+            {element.getType(), element.getLocation(), level.node(at), level.isCreated(at), hasChildren});
+    });
+}
+
 Node const& MetadataTree::Search::node(Address const& address) {
     static Node const none;
     cursor_.beginBeside(address);

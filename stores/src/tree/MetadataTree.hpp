@@ -71,6 +71,10 @@ public:
     /// The addresses one level below, sorted by element.
     std::vector<Address> children(Address const& address) const;
 
+    /// Passes on the addresses one level below, sorted. A level that is not in memory comes from the loader
+    /// and is not kept. The sink must not query the tree.
+    void passChildren(Address const& address, ChildSink& children) const;
+
     /// Applies the steps of a batch in order. If it throws, nothing has changed.
     Undo apply(Batch const& batch);
 
@@ -95,6 +99,7 @@ private:
     Level* levelBelow(Cursor const& cursor, Address const& address, Loading loading) const;
     LevelBelow* below(Cursor const& cursor) const noexcept;
     void load(LevelBelow& below, Address const& address) const;
+    void pass(Level const& level, ChildSink& children) const;
     LevelPointer loadLevel(Address const& address) const;
     void reload(LevelBelow& below, Address const& address);
     void forget() noexcept;

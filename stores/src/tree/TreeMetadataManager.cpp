@@ -175,6 +175,11 @@ std::vector<Address> TreeMetadataManager::getChildNodes(Address const& path) {
     return state_->tree.children(path);
 }
 
+void TreeMetadataManager::loadChildren(Address const& path, ChildSink& children) {
+    auto const guard = state_->lock.readLock();
+    state_->tree.passChildren(path, children);
+}
+
 void TreeMetadataManager::subscribe(std::weak_ptr<metadata::FileChangeRequestListener> listener) {
     state_->listeners.add(std::move(listener));
 }

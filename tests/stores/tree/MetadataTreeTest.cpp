@@ -123,5 +123,58 @@ TEST_F(MetadataTreeTest, rollingBackRestoresTheEarlierTree) {
     EXPECT_TRUE(tree.exists(aa));
 }
 
+/// What passChildren passes on, in words.
+class PassedChildren : public ChildSink {
+public:
+    void add(LoadedChild const& child) override {
+        lines.push_back(std::u16string(child.location) + (child.node ? u" node" : u"") +
+                        (child.isCreated ? u" created" : u"") + (child.hasChildren ? u" children" : u""));
+    }
+
+    std::vector<std::u16string> lines;
+};
+
+TEST_F(MetadataTreeTest, aLevelThatIsOnlyPassedOnIsNotKept) {
+    levels[root] = {plain(u"a", true), bare(u"b")};
+    for (int time = 0; time < 2; ++time) {
+        PassedChildren passed;
+        tree.passChildren(root, passed);
+        EXPECT_THAT(passed.lines, ElementsAre(u"a node children", u"b children"));
+    }
+    EXPECT_THAT(loaded, ElementsAre(root, root));
+}
+
+TEST_F(MetadataTreeTest, aLoadedLevelIsPassedOnFromMemoryWithTheChangesOfABatch) {
+    levels[root] = {plain(u"a", true), plain(u"b", true), plain(u"c")};
+    levels[a] = {plain(u"x")};
+    levels[b] = {plain(u"x")};
+    tree.apply({{Change::Kind::Remove, b, nullptr},
+                {Change::Kind::Create, root.child({u"t", u"d"}), nullptr},
+                {Change::Kind::Set, root.child({u"t", u"c"}).child({u"t", u"new"}), plainNode()},
+                {Change::Kind::Remove, a.child({u"t", u"x"}), nullptr}});
+    loaded.clear();
+
+    PassedChildren top;
+    tree.passChildren(root, top);
+    EXPECT_THAT(top.lines, ElementsAre(u"a node", u"c node children", u"d created"));
+    PassedChildren below;
+    for (auto const& address : {a, b, b.child({u"t", u"x"}), root.child({u"t", u"d"})}) {
+        tree.passChildren(address, below);
+    }
+    EXPECT_THAT(below.lines, IsEmpty());
+    EXPECT_THAT(loaded, IsEmpty());
+}
+
+TEST_F(MetadataTreeTest, aLevelBelowALoadedOneIsPassedOnFromTheLoader) {
+    levels[root] = {plain(u"a", true)};
+    levels[a] = {plain(u"a", true)};
+    levels[aa] = {plain(u"deep")};
+    tree.children(root);
+    PassedChildren passed;
+    tree.passChildren(aa, passed);
+    EXPECT_THAT(passed.lines, ElementsAre(u"deep node"));
+    EXPECT_THAT(loaded, ElementsAre(root, aa));
+}
+
 } // namespace
 } // namespace project::stores

@@ -1,94 +1,107 @@
+#include <cstddef>
 #include <optional>
 #include <string>
+#include <vector>
 
+#include "cli/CodedFailure.hpp"
 #include "cli/PathArguments.hpp"
-#include "cli/ShownPaths.hpp"
 #include "cli/TextArguments.hpp"
 #include "files/Commands.hpp"
-#include "output/JsonRows.hpp"
+#include "output/Kind.hpp"
 #include "output/NameForms.hpp"
-#include "output/Output.hpp"
-#include "project/FileList.hpp"
+#include "project/FoundFiles.hpp"
+#include "project/LabelNames.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {
 
 namespace {
 
-/// Lists the files and folders of the project, all of them or those below one of them.
+using project::session::LabelChoice;
+using project::session::Query;
+
+/// Lists the files and folders of the project that meet all conditions of its options; by default all of
+/// them.
 class ListCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand("list", "List the files and folders of the project");
-        takeText(*app, "PATH", path_,
-                 "List this path and everything in the project below it (default: everything)");
-        auto* const tree = app->add_flag("--tree", isTree_, "Write a tree, with a slash after each folder");
-        auto* const json =
-            app->add_flag("--json", isJson_, "Write a JSON array of objects with \"path\" and \"kind\"");
-        auto* const null = app->add_flag("-0,--null", isNullEnded_, "End each path with a zero byte");
-        tree->excludes(json)->excludes(null);
-        json->excludes(null);
+        auto* const app = tool.add_subcommand(
+            "list", "List the files and folders of the project: all of them, or those that meet all of the "
+                    "given conditions");
+        takeTexts(*app, "PATH", paths_,
+                  "List these paths and everything in the project below them (default: everything)");
+        declareConditions(*app);
+        form_.declare(*app, true);
         return app;
     }
 
     int run(OpenProject& project) override {
-        auto const path = path_ ? absolutePath(*path_) : project.root();
+        Query query;
+        query.paths = absolutePaths(paths_);
         project
             .warnOfDamage(); // first: this reads the text, and the list need not check it for changes again
-        FileList const list(project);
-        project.requireInProject(path);
-        if (isJson_) {
-            writeJson(list, path);
-        } else if (isTree_) {
-            writeTree(list, path, ShownPaths(project.root()));
-        } else {
-            writePaths(list, path, ShownPaths(project.root()));
+        FileList const files(project);
+        for (auto const& path : query.paths) {
+            project.requireInProject(path);
         }
+        LabelNames names(project.manager().getLabelManager());
+        query.labels = choicesOf(labels_, names);
+        query.absentLabels = choicesOf(absentLabels_, names);
+        query.kind = kind();
+        query.glob = glob_ ? std::optional(textOf(*glob_)) : std::nullopt;
+        query.isEntryPoint = isEntryPoint_;
+        query.isUnlabelled = isUnlabelled_;
+        form_.write(project, files, query);
         return 0;
     }
 
 private:
-    void writePaths(FileList const& list, Path const& from, ShownPaths shown) const {
-        list.visit(from, [this, &shown](FileList::File const& file) {
-            if (isNullEnded_) {
-                appendBytes(output().text(), shown.of(file.path));
-                output().text() += '\0';
-            } else {
-                output().name(shown.of(file.path));
-                output().text() += '\n';
-            }
-            output().flushWhenLarge();
-        });
+    void declareConditions(CLI::App& app) {
+        takeTexts(
+            app, "--label", labels_,
+            "CATEGORY or CATEGORY=LABEL, by name or UUID: only files that have this label, or any label "
+            "of the category; may be given several times")
+            ->allow_extra_args(false);
+        takeTexts(app, "--no-label", absentLabels_,
+                  "The same: only files that do not have the label, or any label of the category")
+            ->allow_extra_args(false);
+        takeText(app, "--kind", kind_, "Only entries of this kind: file or folder");
+        takeText(app, "--glob", glob_,
+                 "Only files whose path from the root matches: * and ? do not match a slash, ** does");
+        app.add_flag("--entry-points", isEntryPoint_, "Only files with an entry point");
+        app.add_flag("--unlabelled", isUnlabelled_, "Only files without any label");
     }
 
-    static void writeTree(FileList const& list, Path const& from, ShownPaths shown) {
-        list.visit(from, [&shown](FileList::File const& file) {
-            auto name = std::u16string_view(file.path);
-            if (file.depth == 0) {
-                name = shown.of(name);
-            } else {
-                name.remove_prefix(name.rfind(u'/') + 1);
-            }
-            output().text().append(2 * file.depth, ' ');
-            output().name(name);
-            output().text() += file.kind == Kind::Folder ? "/\n" : "\n";
-            output().flushWhenLarge();
-        });
+    static std::vector<LabelChoice> choicesOf(std::vector<std::string> const& arguments, LabelNames& names) {
+        std::vector<LabelChoice> result;
+        result.reserve(arguments.size());
+        for (auto const& argument : arguments) {
+            std::size_t const equals = argument.find('=');
+            result.push_back(equals == std::string::npos
+                                 ? names.choice(argument, std::nullopt)
+                                 : names.choice(argument.substr(0, equals), argument.substr(equals + 1)));
+        }
+        return result;
     }
 
-    static void writeJson(FileList const& list, Path const& from) {
-        JsonRows rows;
-        list.visit(from, [&rows](FileList::File const& file) {
-            rows.begin();
-            rows.addFile(file.path, file.kind);
-        });
-        rows.finishOutput();
+    std::optional<Kind> kind() const {
+        if (!kind_) {
+            return std::nullopt;
+        }
+        if (*kind_ != "file" && *kind_ != "folder") {
+            throw WrongUse('"' + *kind_ + "\" is not a kind. The kinds are file and folder");
+        }
+        return *kind_ == "file" ? Kind::File : Kind::Folder;
     }
 
-    std::optional<std::string> path_;
-    bool isTree_ = false;
-    bool isJson_ = false;
-    bool isNullEnded_ = false;
+    std::vector<std::string> paths_;
+    std::vector<std::string> labels_;
+    std::vector<std::string> absentLabels_;
+    std::optional<std::string> kind_;
+    std::optional<std::string> glob_;
+    bool isEntryPoint_ = false;
+    bool isUnlabelled_ = false;
+    FoundFiles form_;
 };
 
 } // namespace

@@ -3,8 +3,8 @@
 
 #include "cli/TextArguments.hpp"
 #include "labels/LabelCommands.hpp"
-#include "labels/LabelNames.hpp"
 #include "output/NameForms.hpp"
+#include "project/LabelNames.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {

@@ -3,8 +3,8 @@
 
 #include "cli/TextArguments.hpp"
 #include "labels/CategoryCommands.hpp"
-#include "labels/LabelNames.hpp"
 #include "output/Progress.hpp"
+#include "project/LabelNames.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {

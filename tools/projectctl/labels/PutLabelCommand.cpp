@@ -3,7 +3,7 @@
 
 #include "labels/FileLabelCommand.hpp"
 #include "labels/LabelCommands.hpp"
-#include "labels/LabelNames.hpp"
+#include "project/LabelNames.hpp"
 #include "project/files/FileLabel.hpp"
 
 namespace projectctl {

@@ -4,9 +4,9 @@
 
 #include "cli/TextArguments.hpp"
 #include "labels/CategoryCommands.hpp"
-#include "labels/LabelNames.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
+#include "project/LabelNames.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {

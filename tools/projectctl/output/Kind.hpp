@@ -1,9 +1,10 @@
 #pragma once
 
+#include "project/session/FileKind.hpp"
+
 namespace projectctl {
 
-/// The kind of a file system entry. Everything that is not a folder counts as a file, also a symbolic link to
-/// a folder.
-enum class Kind { File, Folder };
+/// The kind of a file system entry.
+using Kind = project::session::FileKind;
 
 } // namespace projectctl

@@ -12,7 +12,6 @@
 
 namespace projectctl {
 
-using project::metadata::MetadataPath;
 using project::session::SourceControl;
 using project::stores::Fault;
 using project::stores::HistoryLoss;
@@ -63,20 +62,6 @@ std::string OpenProject::storeFile(std::string const& name) const {
 void OpenProject::requireInProject(Path const& path) {
     if (!files().isFileInProject(path)) {
         project::exception::raise(FileNotInProject(path.native()));
-    }
-}
-
-void OpenProject::loadChildren(MetadataPath const& address, project::stores::ChildSink& children) {
-    if (openTransactions_ == 0) {
-        backend().load(address, children);
-        return;
-    }
-    for (auto const& child : store().getChildNodes(address)) {
-        auto const node = project::stores::Node(store().getNode(child));
-        bool const hasChildren = !store().getChildNodes(child).empty();
-        bool const isCreated = !node && !hasChildren;
-        auto const element = child.leaf();
-        children.add({element.getType(), element.getLocation(), node, isCreated, hasChildren});
     }
 }
 

@@ -65,9 +65,14 @@ public:
     /// The log of a project that a server stores; otherwise null.
     project::stores::JournalBackend* log() { return access_.log(); }
 
-    /// Passes on the addresses directly below one address, as `load` of the backend does, with the changes of
-    /// a transaction. Call it with a guard of the store open.
-    void loadChildren(project::metadata::MetadataPath const& address, project::stores::ChildSink& children);
+    /// The parts of the session for commands that read the store directly.
+    project::session::ToolAccess& access() noexcept { return access_; }
+
+    /// Passes on the addresses directly below one address, with the changes of a transaction. Call it with a
+    /// guard of the store open.
+    void loadChildren(project::metadata::MetadataPath const& address, project::stores::ChildSink& children) {
+        access_.loadChildren(address, children);
+    }
 
     /// The faults of the text, or of what was read of the log. In a transaction, those that were found before
     /// it: reading again would show the changes of other programs in the middle of it. Otherwise call this

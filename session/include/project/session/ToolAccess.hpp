@@ -1,8 +1,13 @@
 #pragma once
 
+#include <cstddef>
+#include <functional>
+#include <string>
 #include <vector>
 
 #include "project/session.hpp"
+#include "project/session/FileLevel.hpp"
+#include "project/session/Query.hpp"
 
 namespace project::stores {
 class Backend;
@@ -11,6 +16,17 @@ class TextBackend;
 } // namespace project::stores
 
 namespace project::session {
+
+/// A file or folder while it is visited. What it refers to is valid during the call that receives it.
+struct VisitedFile {
+    std::u16string const& path; ///< relative to the root
+    std::size_t depth;          ///< number of folders between it and the path at which the visit began
+    FileKind kind;
+    metadata::MetadataNode const& node; ///< the value stored for it
+};
+
+/// Receives files one by one. It must not change the project.
+using FileVisitor = std::function<void(VisitedFile const&)>;
 
 /// The parts of a session that only projectctl needs: it checks, repairs and merges the text itself.
 /// Applications do not need this header.
@@ -28,6 +44,20 @@ public:
     /// The store's text. A change made through it is not staged; see markTextForStaging.
     /// @throws stores::StoreError with the kind Refused if the project is shared.
     stores::TextBackend& text();
+
+    /// Visits the files that a query finds, as Session::find returns them. The caller holds a guard of the
+    /// store.
+    void visit(Query const& query, FileVisitor const& visitor);
+
+    /// The level of an address of the file list; empty if the address does not exist. The caller holds a
+    /// guard of the store.
+    FileLevel level(metadata::MetadataPath const& address);
+
+    /// The address of a file in the file list. @param path absolute, the project's root or below it.
+    metadata::MetadataPath addressOf(Path const& path) const;
+
+    /// Passes on the addresses directly below one address, as TreeMetadataManager::loadChildren does.
+    void loadChildren(metadata::MetadataPath const& address, stores::ChildSink& children);
 
     /// Lets the next call of Session::stage stage the text, although the store did not write it: for
     /// changes made through text().

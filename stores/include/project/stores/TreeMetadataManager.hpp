@@ -36,6 +36,12 @@ public:
     void createPaths(std::vector<metadata::MetadataPath>& paths) override;
     bool pathExists(metadata::MetadataPath path) override;
 
+    /// Passes on the addresses directly below one address, with their nodes, as this thread sees them. Unlike
+    /// getChildNodes it copies nothing and keeps nothing in memory that was not there before, so it is the
+    /// fastest way to read a large part of the tree once. Takes the read lock.
+    /// @param children must not use the store.
+    void loadChildren(metadata::MetadataPath const& path, ChildSink& children);
+
     /// Takes the write guard and begins a transaction, which the writes of this thread belong to until it
     /// ends. If one is open already, the new one is nested in it.
     /// @throws std::system_error (resource_deadlock_would_occur) if this thread has read guards only.

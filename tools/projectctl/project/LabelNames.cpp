@@ -1,4 +1,4 @@
-#include "labels/LabelNames.hpp"
+#include "project/LabelNames.hpp"
 
 #include <vector>
 
@@ -53,6 +53,15 @@ Label LabelNames::label(std::string const& category, std::string const& name) {
     }
     throw Failure("the category " + inQuotes(found.getName()) + " has no label " + inQuotes(wanted) +
                   ". 'projectctl label list' shows its labels");
+}
+
+project::session::LabelChoice LabelNames::choice(std::string const& category,
+                                                 std::optional<std::string> const& name) {
+    if (!name) {
+        return {this->category(category).getUUID(), {}};
+    }
+    auto const found = label(category, *name);
+    return {found.getCategory().getUUID(), found.getUUID()};
 }
 
 Label LabelNames::labelEvenIfDeleted(std::string const& category, std::string const& name) {

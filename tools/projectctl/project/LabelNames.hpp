@@ -7,6 +7,7 @@
 #include "project/labels/CategoryIdentifier.hpp"
 #include "project/labels/Label.hpp"
 #include "project/labels/LabelIdentifier.hpp"
+#include "project/session/Query.hpp"
 
 namespace projectctl {
 
@@ -28,8 +29,13 @@ public:
     ///         have the name.
     project::management::Label label(std::string const& category, std::string const& name);
 
-    /// The same, but UUIDs are accepted even if the label or its category was deleted. Files may still have
-    /// such a label.
+    /// A label, or any label of a category if no label is given, as a condition of a query.
+    /// @throws the same errors as category() and label().
+    project::session::LabelChoice choice(std::string const& category,
+                                         std::optional<std::string> const& label);
+
+    /// The same as label(), but UUIDs are accepted even if the label or its category was deleted. Files may
+    /// still have such a label.
     project::management::Label labelEvenIfDeleted(std::string const& category, std::string const& name);
 
 private:

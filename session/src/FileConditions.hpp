@@ -1,0 +1,37 @@
+#pragma once
+
+#include <optional>
+#include <set>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "Glob.hpp"
+#include "project/session/Query.hpp"
+#include "project/session/ToolAccess.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
+
+namespace project::session {
+
+/// The conditions of a query on one file, prepared for many files. Only the conditions that are set cost
+/// time.
+class FileConditions {
+public:
+    /// Reads the entry points if the query asks for them. The caller holds a guard of the store until the
+    /// last check.
+    /// @param query must outlive this object.
+    FileConditions(Query const& query, stores::TreeMetadataManager& store);
+
+    /// Whether a file meets all of them, except that it is at or below one of the paths.
+    bool hold(VisitedFile const& file) const;
+
+private:
+    bool holdForLabels(metadata::MetadataNode const& node) const;
+
+    Query const& query_;
+    bool hasLabelConditions_;
+    std::optional<Glob> glob_;
+    std::set<std::u16string, std::less<>> entryPoints_; ///< their files, relative to the root
+};
+
+} // namespace project::session
