@@ -4,7 +4,26 @@
 #include <cstring>
 #include <utility>
 
-namespace fl::filesystem::detail {
+#include "fl/filesystem/CommonLength.hpp"
+
+namespace fl::filesystem {
+
+std::size_t commonLength(std::u16string_view left, std::u16string_view right) noexcept {
+    // Neighbours in a list of paths have long common folders, so this compares sixteen bytes at a time.
+    constexpr std::size_t block = 8;
+    std::size_t const limit = std::min(left.size(), right.size());
+    std::size_t same = 0;
+    while (same + block <= limit &&
+           std::memcmp(left.data() + same, right.data() + same, block * sizeof(char16_t)) == 0) {
+        same += block;
+    }
+    while (same < limit && left[same] == right[same]) {
+        ++same;
+    }
+    return same;
+}
+
+namespace detail {
 
 namespace {
 
@@ -24,22 +43,6 @@ std::u16string_view lastElement(std::u16string_view path) noexcept {
     }
     std::size_t const begin = path.find_last_of(separator, end);
     return begin == std::u16string_view::npos ? path.substr(0, end + 1) : path.substr(begin + 1, end - begin);
-}
-
-/// The number of common code units at the beginning. Neighbours in a sorted list of paths have long common
-/// folders, so this compares eight bytes at a time.
-std::size_t commonLength(std::u16string_view left, std::u16string_view right) noexcept {
-    constexpr std::size_t step = 4;
-    std::size_t const limit = std::min(left.size(), right.size());
-    std::size_t same = 0;
-    while (same + step <= limit &&
-           std::memcmp(left.data() + same, right.data() + same, step * sizeof(char16_t)) == 0) {
-        same += step;
-    }
-    while (same < limit && left[same] == right[same]) {
-        ++same;
-    }
-    return same;
 }
 
 /// True if an element that was read up to here ends here.
@@ -112,4 +115,6 @@ std::strong_ordering compare_elements(std::u16string_view left, std::u16string_v
     }
 }
 
-} // namespace fl::filesystem::detail
+} // namespace detail
+
+} // namespace fl::filesystem

@@ -2,10 +2,12 @@
 
 #include <algorithm>
 #include <atomic>
-#include <iterator>
-#include <span>
+#include <cstddef>
+#include <string_view>
 #include <utility>
+#include <vector>
 
+#include "fl/filesystem/CommonLength.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
@@ -27,6 +29,14 @@ namespace {
 /// The number of steps of the address of the root folder.
 constexpr std::size_t headDepth = 1;
 
+/// The path of a name in a folder.
+Path pathBelow(Path const& folder, std::u16string const& name) {
+    std::u16string text;
+    text.reserve(folder.native().size() + 1 + name.size());
+    text = folder.native();
+    return fl::filesystem::detail::concatenate_pathname(std::move(text), name);
+}
+
 } // namespace
 
 FileMetadataManager::~FileMetadataManager() = default;
@@ -41,9 +51,12 @@ public:
             return LastAddress(head_).withNames(path); // it is in use by another thread
         }
         Using const mark(isInUse_);
-        splitNames(path);
-        auto const shared = countSharedNames();
-        address_.replaceSteps(headDepth + shared, schema::files::fileType, std::span(names_).subspan(shared));
+        keepSharedNames(path);
+        auto const shared = ends_.size();
+        path_.clear(); // shares no name with the next path, should this throw
+        splitFurtherNames(path);
+        address_.replaceSteps(headDepth + shared, schema::files::fileType, further_);
+        path_ = path;
         return address_;
     }
 
@@ -62,34 +75,36 @@ private:
         std::atomic<bool>& mark_;
     };
 
-    void splitNames(std::u16string_view path) {
-        names_.clear();
-        while (!path.empty()) {
-            auto const name = path.substr(0, path.find(u'/'));
-            names_.push_back(name);
-            path.remove_prefix(std::min(name.size() + 1, path.size()));
+    /// Drops the ends of the last path's names from the first one on that the new path does not have.
+    void keepSharedNames(std::u16string_view path) {
+        auto const same = fl::filesystem::commonLength(path_, path);
+        auto const isShared = [&](std::size_t end) {
+            return end < same || (end == same && (end == path.size() || path[end] == u'/'));
+        };
+        while (!ends_.empty() && !isShared(ends_.back())) {
+            ends_.pop_back();
         }
     }
 
-    /// The number of first names that are also those of the last address.
-    std::size_t countSharedNames() {
-        address_.listSteps(steps_);
-        auto const& names = names_;
-        auto const isShared = [](PathElement const* step, std::u16string_view name) {
-            return step->getLocation() == name;
-        };
-        auto const different = std::mismatch(std::next(steps_.begin(), headDepth), steps_.end(),
-                                             names.begin(), names.end(), isShared);
-        return static_cast<std::size_t>(different.second - names.begin());
+    /// Lists the names behind the shared ones, and adds their ends.
+    void splitFurtherNames(std::u16string_view path) {
+        further_.clear();
+        for (std::size_t begin = ends_.empty() ? 0 : ends_.back() + 1; begin < path.size();) {
+            std::size_t const end = std::min(path.find(u'/', begin), path.size());
+            further_.push_back(path.substr(begin, end - begin));
+            ends_.push_back(end);
+            begin = end + 1;
+        }
     }
 
     MetadataPath const head_;
     std::atomic<bool> isInUse_ = false;
-    MetadataPath address_; ///< the last one
+    MetadataPath address_;          ///< the last one
+    std::u16string path_;           ///< the path with this address
+    std::vector<std::size_t> ends_; ///< of its names
 
-    // Of the last call, and members only because they keep their memory.
-    std::vector<std::u16string_view> names_;
-    std::vector<PathElement const*> steps_;
+    // Of the last call, and a member only because it keeps its memory.
+    std::vector<std::u16string_view> further_;
 };
 
 PathLocalizedFileMetadataManager::PathLocalizedFileMetadataManager(
@@ -173,11 +188,16 @@ std::vector<Path> PathLocalizedFileMetadataManager::getChildFiles(Path file) {
 std::vector<Path> PathLocalizedFileMetadataManager::childFiles(Path const& file) {
     auto const guard = metadataManager_->acquireReadLock();
     std::vector<Path> result;
-    auto const children = metadataManager_->getChildNodes(toMetadataPath(file));
+    auto const address = toMetadataPath(file);
+    auto const children = metadataManager_->getChildNodes(address);
+    if (children.empty()) {
+        return result;
+    }
+    Path const folder = toFilePath(address);
     result.reserve(children.size());
     for (auto const& child : children) {
         if (isFileMetadataPath(child)) {
-            result.push_back(toFilePath(child));
+            result.push_back(pathBelow(folder, child.leaf().getLocation()));
         }
     }
     return result;
@@ -192,15 +212,17 @@ MetadataPath PathLocalizedFileMetadataManager::toMetadataPath(Path const& file) 
 }
 
 Path PathLocalizedFileMetadataManager::toFilePath(MetadataPath const& path) const {
+    std::vector<PathElement const*> steps;
+    path.listSteps(steps);
     std::size_t length = root_.native().size();
-    for (std::size_t index = headDepth; index < path.depth(); ++index) {
-        length += path[index].getLocation().size() + 1;
+    for (std::size_t index = headDepth; index < steps.size(); ++index) {
+        length += steps[index]->getLocation().size() + 1;
     }
     std::u16string text;
     text.reserve(length);
     text = root_.native();
-    for (std::size_t index = headDepth; index < path.depth(); ++index) {
-        text = fl::filesystem::detail::concatenate_pathname(std::move(text), path[index].getLocation());
+    for (std::size_t index = headDepth; index < steps.size(); ++index) {
+        text = fl::filesystem::detail::concatenate_pathname(std::move(text), steps[index]->getLocation());
     }
     return text;
 }

@@ -1,6 +1,7 @@
 #include "files/PathSets.hpp"
 
 #include <algorithm>
+#include <cstddef>
 #include <iterator>
 #include <set>
 #include <utility>
@@ -11,13 +12,44 @@ namespace project::management {
 
 namespace {
 
-/// Sorts the paths and removes duplicates. Most lists are sorted already.
-void makeSet(std::vector<Path>& paths) {
+using Place = std::vector<Path>::iterator;
+
+/// Divides the paths into runs, in each of which a path precedes the next one. @return where the runs begin,
+/// and the end of the last one.
+std::vector<Place> ascendingRuns(std::vector<Path>& paths) {
     auto const isNotBefore = [](Path const& left, Path const& right) { return !(left < right); };
-    if (std::adjacent_find(paths.begin(), paths.end(), isNotBefore) != paths.end()) {
-        std::sort(paths.begin(), paths.end());
-        paths.erase(std::unique(paths.begin(), paths.end()), paths.end());
+    std::vector<Place> bounds{paths.begin()};
+    while (bounds.back() != paths.end()) {
+        auto const last = std::adjacent_find(bounds.back(), paths.end(), isNotBefore);
+        bounds.push_back(last == paths.end() ? last : std::next(last));
     }
+    return bounds;
+}
+
+/// Merges each run with the next one. @return the bounds of the merged runs.
+std::vector<Place> mergeNeighbours(std::vector<Place> const& bounds) {
+    std::vector<Place> merged{bounds.front()};
+    for (std::size_t run = 2; run < bounds.size(); run += 2) {
+        std::inplace_merge(bounds[run - 2], bounds[run - 1], bounds[run]);
+        merged.push_back(bounds[run]);
+    }
+    if (merged.back() != bounds.back()) {
+        merged.push_back(bounds.back()); // a run without a partner
+    }
+    return merged;
+}
+
+/// Sorts the paths and removes duplicates. Most lists are sorted already, or consist of a few runs: a list of
+/// numbered files begins a new run where the numbers get another digit.
+void makeSet(std::vector<Path>& paths) {
+    auto bounds = ascendingRuns(paths);
+    if (bounds.size() <= 2) {
+        return;
+    }
+    while (bounds.size() > 2) {
+        bounds = mergeNeighbours(bounds);
+    }
+    paths.erase(std::unique(paths.begin(), paths.end()), paths.end());
 }
 
 /// Paths in a list into which each is inserted directly after another one.

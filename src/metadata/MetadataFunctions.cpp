@@ -14,6 +14,7 @@
 #include <boost/uuid/uuid.hpp>
 #include <boost/uuid/uuid_io.hpp>
 
+#include "fl/filesystem/CommonLength.hpp"
 #include "fl/filesystem/SystemName.hpp"
 
 namespace project::metadata {
@@ -50,20 +51,33 @@ Text takeName(Text& names) {
     return name;
 }
 
+/// True if a separator follows another one. Loops over blocks without a branch, so that the compiler uses
+/// vector instructions.
+bool hasRepeatedSeparators(Text names) {
+    constexpr std::size_t block = 8;
+    std::size_t first = 0;
+    for (; first + block < names.size(); first += block) {
+        unsigned isRepeated = 0;
+        for (std::size_t i = first; i < first + block; ++i) {
+            isRepeated |= static_cast<unsigned>(names[i] == separator) &
+                          static_cast<unsigned>(names[i + 1] == separator);
+        }
+        if (isRepeated != 0) {
+            return true;
+        }
+    }
+    for (; first + 1 < names.size(); ++first) {
+        if (names[first] == separator && names[first + 1] == separator) {
+            return true;
+        }
+    }
+    return false;
+}
+
 /// True for one or more names with single separators between them and none at either end.
 bool isPlain(Text names) {
-    if (names.empty() || names.front() == separator || names.back() == separator) {
-        return false;
-    }
-    bool isAfterSeparator = false;
-    for (char16_t const unit : names) {
-        bool const isSeparator = unit == separator;
-        if (isSeparator && isAfterSeparator) {
-            return false;
-        }
-        isAfterSeparator = isSeparator;
-    }
-    return true;
+    return !names.empty() && names.front() != separator && names.back() != separator &&
+           !hasRepeatedSeparators(names);
 }
 
 /// The same as starts_with, which compares one code unit after the other.
@@ -72,9 +86,8 @@ bool startsWith(Text text, Text beginning) {
            std::memcmp(text.data(), beginning.data(), beginning.size() * sizeof(char16_t)) == 0;
 }
 
-/// The part of the target's text below the base. Nothing if the target is not below the base, or if repeated
-/// or trailing separators in either text need the general algorithm.
-std::optional<Text> plainTextBelow(Text base, Text target) {
+/// The target's text behind the base and a separator. Nothing if it does not begin with both.
+std::optional<Text> textBehind(Text base, Text target) {
     if (!startsWith(target, base)) {
         return std::nullopt;
     }
@@ -85,14 +98,19 @@ std::optional<Text> plainTextBelow(Text base, Text target) {
         }
         rest.remove_prefix(1);
     }
-    return isPlain(rest) ? std::optional(rest) : std::nullopt;
+    return rest;
+}
+
+/// The same, and nothing if repeated or trailing separators need the general algorithm.
+std::optional<Text> plainTextBelow(Text base, Text target) {
+    auto const rest = textBehind(base, target);
+    return rest && isPlain(*rest) ? rest : std::nullopt;
 }
 
 /// Drops the common beginning of both texts up to its last separator, which is most of the work. The next
 /// name may still be the same in both.
 void dropCommonText(Text& left, Text& right) {
-    auto const ends = std::mismatch(left.begin(), left.end(), right.begin(), right.end());
-    auto const same = left.substr(0, static_cast<std::size_t>(ends.first - left.begin()));
+    auto const same = left.substr(0, fl::filesystem::commonLength(left, right));
     std::size_t const slash = same.rfind(separator);
     std::size_t const length = slash == Text::npos ? 0 : slash + 1;
     left.remove_prefix(length);
@@ -166,6 +184,10 @@ std::optional<std::u16string_view> textBelow(Path const& base, Path const& targe
 }
 
 bool leadsUpward(Path const& base, Path const& target) noexcept {
+    if (auto below = textBehind(base.native(), target.native())) { // most targets are below the base
+        dropSeparators(*below);
+        return below->starts_with(upward);
+    }
     Parting const parting(base.native(), target.native());
     return !parting.isRootShared || !parting.base.empty() || parting.target.starts_with(upward);
 }

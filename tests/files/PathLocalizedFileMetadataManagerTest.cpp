@@ -1,6 +1,9 @@
 #include "files/PathLocalizedFileMetadataManager.hpp"
 
+#include <optional>
+
 #include <gmock/gmock.h>
+#include <rapidcheck/gtest.h>
 
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
@@ -34,6 +37,7 @@ protected:
     std::shared_ptr<test::RecordingMetadataManager> store =
         std::make_shared<test::RecordingMetadataManager>();
     PathLocalizedFileMetadataManager files{folder.root(), store, u"Root"};
+    PathLocalizedFileMetadataManager plain{u"/root", store, u"Root"};
     MetadataPath const head = address({{u"Files", u"Root"}});
 };
 
@@ -56,6 +60,24 @@ TEST_F(PathLocalizedFileMetadataManagerTest, aFilesAddressHasOneStepForEachNameI
     auto const expected = address({{u"Files", u"Root"}, {u"File", u"c1"}, {u"File", u"c2"}});
     EXPECT_EQ(files.toMetadataPath(path), expected);
     EXPECT_EQ(files.toFilePath(expected), path);
+}
+
+RC_GTEST_FIXTURE_PROP(PathLocalizedFileMetadataManagerTest, anAddressDoesNotDependOnThePreviousOne, ()) {
+    auto const name = rc::gen::element<std::u16string>(u"a", u"ab", u"b", u"..");
+    auto const names = rc::gen::container<std::vector<std::u16string>>(name);
+    auto const paths = *rc::gen::container<std::vector<std::vector<std::u16string>>>(names);
+    std::optional<MetadataPath> kept; // shares steps with the next one
+    for (auto const& path : paths) {
+        Path file(u"/root");
+        MetadataPath expected = head;
+        for (auto const& step : path) {
+            file /= step;
+            expected = expected.child({u"File", step});
+        }
+        auto const address = plain.toMetadataPath(file);
+        RC_ASSERT(address == expected);
+        kept = path.size() % 2 == 0 ? std::optional(address) : std::nullopt;
+    }
 }
 
 TEST_F(PathLocalizedFileMetadataManagerTest, anAddressHasAPathWithStepsOfAnyType) {

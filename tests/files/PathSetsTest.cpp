@@ -1,6 +1,9 @@
 #include "files/PathSets.hpp"
 
+#include <set>
+
 #include <gtest/gtest.h>
+#include <rapidcheck/gtest.h>
 
 namespace project::management {
 namespace {
@@ -29,6 +32,18 @@ TEST(PathSets, parentFoldersAreAddedUpToTheRootButWithoutIt) {
 TEST(PathSets, sharedParentFoldersAreListedOnceAndInPathOrder) {
     EXPECT_EQ(withParentFolders({u"/p/b/y", u"/p/b/x", u"/p/a.txt", u"/p/a/z"}, u"/p"),
               (Paths{u"/p/a", u"/p/a/z", u"/p/a.txt", u"/p/b", u"/p/b/x", u"/p/b/y"}));
+}
+
+RC_GTEST_PROP(PathSets, filesInAnyOrderAreListedOnceAndInPathOrder, ()) {
+    auto const numbers = *rc::gen::container<std::vector<int>>(rc::gen::inRange(0, 40));
+    Paths files;
+    for (int const number : numbers) {
+        auto const digits = std::to_string(number);
+        files.emplace_back(u"/p/" + std::u16string(digits.begin(), digits.end()));
+    }
+    std::set<Path> const expected(files.begin(), files.end());
+
+    RC_ASSERT(withParentFolders(files, u"/p") == Paths(expected.begin(), expected.end()));
 }
 
 TEST(PathSets, theRootContributesNothing) {

@@ -98,6 +98,16 @@ TEST(GetRelativePath, isTheTargetBelowTheBase) {
     }
 }
 
+TEST(TextBelow, findsARepeatedSeparatorAtEachPlaceOfALongPath) {
+    std::u16string const names = u"/some/folder/with/a/longer/name";
+    EXPECT_EQ(textBelow(u"/a", u"/a" + names), names.substr(1));
+    for (std::size_t place = 0; place <= names.size(); ++place) {
+        auto repeated = names;
+        repeated.insert(place, u"//");
+        EXPECT_EQ(textBelow(u"/a", u"/a" + repeated), std::nullopt) << place;
+    }
+}
+
 TEST(GetRelativePath, isEmptyForTheSameElements) {
     EXPECT_EQ(getRelativePath(u"/a", u"/a"), u"");
     EXPECT_EQ(getRelativePath(u"/a", u"/a/"), u"");
