@@ -21,6 +21,7 @@ ROOMS = {
         "merge": ["line", "node", "text"],
         "writing": ["line", "node", "text"],
         "journal": ["line", "node", "text"],
+        "copy": ["line", "node", "text", "writing", "journal"],
     },
     "adapters/git/src": {
         "repository": [],
@@ -44,6 +45,7 @@ ROOMS = {
         "references": ["output", "cli", "git", "project"],
         "merge": ["output", "cli", "git", "project"],
         "watch": ["output", "cli", "git", "project"],
+        "shared": ["output", "cli", "git", "project"],
         "batch": ["output", "cli", "git", "project", "changes"],
         "checks": ["output", "cli", "git", "project", "files", "labels", "entrypoints", "references", "merge"],
     },

@@ -14,6 +14,7 @@
 #include "output/Output.hpp"
 #include "project/Commands.hpp"
 #include "references/Commands.hpp"
+#include "shared/Commands.hpp"
 #include "watch/Commands.hpp"
 
 namespace {
@@ -43,6 +44,8 @@ projectctl::CommandList const& commands() {
         {"tidy", makeTidyCommand},
         {"setup", makeSetupCommand},
         {"merge", makeMergeCommand},
+        {"copy", makeCopyCommand},
+        {"shared", makeSharedCommand},
         {"resolve", makeResolveCommand},
     };
     return result;

@@ -15,6 +15,11 @@ constexpr Statement listProjects{
         " coalesce(pg_has_role(to_regrole(quote_ident(writer))::oid, 'USAGE'), false)"
         " FROM pm.project ORDER BY name, project"};
 
+constexpr Statement membersOfRole{"",
+                                  "SELECT rolname::text FROM pg_roles WHERE rolcanlogin AND NOT rolsuper"
+                                  " AND coalesce(pg_has_role(oid, to_regrole(quote_ident($1::text))::oid, "
+                                  "'USAGE'), false) ORDER BY rolname"};
+
 constexpr Statement isRole{"", "SELECT FROM pg_roles WHERE rolname = $1::name"};
 
 constexpr Statement insertProject{"", "INSERT INTO pm.project (project, name, reader, writer)"
@@ -95,6 +100,16 @@ bool SharedProjects::remove(std::string const& id) const {
                                       {deleteAllPieces, {{id}}},
                                       {deleteBarrier, {{id}}}});
     return answers.front().affected() > 0;
+}
+
+std::vector<std::string> SharedProjects::members(std::string const& role) const {
+    OneSession session(settings_);
+    auto const answers = session.run({{membersOfRole, {{role}}}});
+    std::vector<std::string> names;
+    for (int row = 0; row < answers.front().rows(); ++row) {
+        names.push_back(answers.front().text(row, 0));
+    }
+    return names;
 }
 
 std::unique_ptr<stores::Journal> SharedProjects::open(std::string const& id) const {

@@ -114,6 +114,9 @@ public:
     /// Marks the text as changed through text(), so that stage() stages it.
     void stageLater() noexcept { access_.markTextForStaging(); }
 
+    /// Stages that the folder's definition is another file now, if git tracks the old one.
+    void stageReplaced(project::stores::FileChanges const& files) { access_.stageReplaced(files); }
+
     /// The files below some folders that git tracks and that are not in the project. @param folders absolute.
     std::vector<Path> trackedOutsideProject(std::vector<Path> const& folders) {
         return access_.trackedOutsideProject(folders);

@@ -8,6 +8,7 @@
 #include "project/session.hpp"
 #include "project/session/FileLevel.hpp"
 #include "project/session/Query.hpp"
+#include "project/stores/Change.hpp"
 
 namespace project::stores {
 class Backend;
@@ -67,6 +68,11 @@ public:
     /// again: adding stages only files that git does not know. A session with EachChange does this itself.
     /// Takes the write lock.
     void stageReturned(std::vector<Path> const& files);
+
+    /// Stages that the file which leads to the definition was replaced by another one: the new files, and the
+    /// removal of the old one. Does nothing if git does not track the old one. Call it while no other thread
+    /// uses the session.
+    void stageReplaced(stores::FileChanges const& files);
 
     /// The files in some folders that git tracks and that are not in the project. If such a folder is
     /// removed from the project, these files are removed from git's index too. Takes the write lock.

@@ -40,6 +40,10 @@ public:
     /// @throws StoreError with the kind Refused if the user is not the owner.
     virtual bool remove(std::string const& id) const = 0;
 
+    /// The users that have a role, themselves or through another one, by name; without those who have every
+    /// role.
+    virtual std::vector<std::string> members(std::string const& role) const = 0;
+
     /// The log of a project. Does not connect yet.
     /// @throws StoreError with the kind Refused if the id is not a UUID.
     virtual std::unique_ptr<Journal> open(std::string const& id) const = 0;

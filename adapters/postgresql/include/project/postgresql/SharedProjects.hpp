@@ -24,6 +24,8 @@ public:
 
     bool remove(std::string const& id) const override;
 
+    std::vector<std::string> members(std::string const& role) const override;
+
     std::unique_ptr<stores::Journal> open(std::string const& id) const override;
 
 private:

@@ -1,0 +1,115 @@
+#include "project/stores/StoreCopy.hpp"
+
+#include "fl/filesystem/Path.hpp"
+#include "journal/LocationFile.hpp"
+#include "project/stores/StoreError.hpp"
+#include "text/ProjectText.hpp"
+#include "writing/StoreFiles.hpp"
+
+namespace project::stores {
+
+namespace {
+
+/// Creates a file that is complete as soon as it has its name. @return false if the name is taken.
+bool createFile(Disk& disk, std::string const& temporary, std::string const& name, std::string_view content) {
+    disk.remove(temporary);
+    disk.create(temporary, content, std::nullopt);
+    try {
+        disk.sync();
+        if (disk.renameToFree(temporary, name)) {
+            return true;
+        }
+    } catch (StoreError const&) {
+        disk.remove(temporary);
+        throw;
+    }
+    disk.remove(temporary);
+    return false;
+}
+
+Path pathOf(Disk const& disk, std::string const& name) {
+    return fl::filesystem::fromSystem(disk.folder()) / fl::filesystem::fromSystem(name);
+}
+
+/// Both kinds of store leave files that source control ignores. A file that somebody has edited stays.
+void ignoreFilesOfBothKinds(Disk& disk, FileChanges& changes) {
+    auto const now = disk.read(LocationFile::ignored, 0);
+    std::string const wanted =
+        std::string(StoreFiles::ignoredContent) + std::string(LocationFile::ignoredContent);
+    bool const isOurs =
+        !now || now->bytes == StoreFiles::ignoredContent || now->bytes == LocationFile::ignoredContent;
+    if (isOurs) {
+        disk.remove(LocationFile::temporary);
+        disk.create(LocationFile::temporary, wanted, std::nullopt);
+        disk.sync();
+        disk.rename(LocationFile::temporary, LocationFile::ignored);
+        changes.added.push_back(pathOf(disk, LocationFile::ignored));
+    }
+}
+
+/// Renames a file to its name with ".old", or ".old2" and so on.
+void setAside(Disk& disk, std::string const& name) {
+    std::string aside = name + ".old";
+    for (int number = 2; !disk.renameToFree(name, aside); ++number) {
+        aside = name + ".old" + std::to_string(number);
+    }
+}
+
+[[noreturn]] void throwTaken(Disk const& disk, char const* name) {
+    throw StoreError(StoreError::Kind::Refused, disk.folder() + '/' + name, 0, "exists already",
+                     "Move it to another place.");
+}
+
+/// Gives the folder a new file for its definition, and sets the old one aside.
+void exchange(Disk& disk, std::string const& temporary, char const* fresh, std::string_view content,
+              char const* old, FileChanges& changes) {
+    if (!createFile(disk, temporary, fresh, content)) {
+        throwTaken(disk, fresh);
+    }
+    try {
+        setAside(disk, old);
+    } catch (StoreError const&) {
+        disk.remove(fresh);
+        throw;
+    }
+    disk.syncFolder();
+    changes.added.push_back(pathOf(disk, fresh));
+    changes.removed.push_back(pathOf(disk, old));
+}
+
+} // namespace
+
+std::string canonicalText(Disk& disk) {
+    auto const content = disk.openFolder() ? disk.read(StoreFiles::text, 0) : std::nullopt;
+    auto const file = StoreFiles::pathOfText(disk);
+    auto const text = content ? ProjectText::read(content->bytes, file) : std::nullopt;
+    if (!text || text->hasFault(Fault::Kind::Damage) || text->hasFault(Fault::Kind::Conflict)) {
+        throw StoreError(StoreError::Kind::Damaged, file, 0,
+                         "is missing, incomplete, damaged or contains conflicts",
+                         "Repair it with \"projectctl check --repair\" or \"projectctl resolve\" first.");
+    }
+    return text->rewrittenWith({}).body();
+}
+
+FileChanges replaceTextByLocation(Disk& disk, SharedLocation const& location) {
+    FileChanges changes;
+    ignoreFilesOfBothKinds(disk, changes);
+    exchange(disk, LocationFile::temporary, LocationFile::name, LocationFile::contentOf(location),
+             StoreFiles::text, changes);
+    return changes;
+}
+
+FileChanges replaceLocationByText(Disk& disk, std::string_view text) {
+    FileChanges changes;
+    if (!disk.openFolder()) {
+        throw StoreError(StoreError::Kind::Refused, disk.folder(), 0, "does not exist", "");
+    }
+    ignoreFilesOfBothKinds(disk, changes);
+    if (createFile(disk, StoreFiles::newTemporary(), StoreFiles::attributes, StoreFiles::attributesContent)) {
+        changes.added.push_back(pathOf(disk, StoreFiles::attributes));
+    }
+    exchange(disk, StoreFiles::newTemporary(), StoreFiles::text, text, LocationFile::name, changes);
+    return changes;
+}
+
+} // namespace project::stores

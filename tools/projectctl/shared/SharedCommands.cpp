@@ -1,0 +1,43 @@
+#include "shared/SharedCommands.hpp"
+
+#include <array>
+#include <ctime>
+#include <utility>
+#include <vector>
+
+#include "cli/CommandGroup.hpp"
+#include "output/Failure.hpp"
+#include "shared/Commands.hpp"
+
+namespace projectctl {
+
+std::unique_ptr<Command> makeSharedCommand() {
+    std::vector<std::unique_ptr<Command>> members;
+    members.push_back(makeSharedStatusCommand());
+    members.push_back(makeSharedTidyCommand());
+    members.push_back(makeSharedLogCommand());
+    members.push_back(makeSharedRolesCommand());
+    return std::make_unique<CommandGroup>(
+        "shared", "Show and tidy the log of a project that a server stores, and show who has access to it",
+        std::move(members));
+}
+
+project::stores::JournalBackend& requireLog(OpenProject& project) {
+    if (project.log() == nullptr) {
+        throw Failure(
+            "the project is not shared: it is stored in a text. 'projectctl copy --to SERVICE' copies it to "
+            "a server");
+    }
+    return *project.log();
+}
+
+std::string shownTime(std::chrono::system_clock::time_point time) {
+    auto const seconds = std::chrono::system_clock::to_time_t(time);
+    std::tm parts{};
+    gmtime_r(&seconds, &parts);
+    std::array<char, 32> text{};
+    std::strftime(text.data(), text.size(), "%F %T UTC", &parts);
+    return text.data();
+}
+
+} // namespace projectctl

@@ -1,0 +1,75 @@
+#include <chrono>
+#include <optional>
+#include <string>
+
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
+#include "shared/SharedCommands.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::stores::Journal;
+
+/// Appends a body to the log, and deletes old history.
+class TidyLogCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand(
+            "tidy",
+            "Append a body to the log, so that new clients read no tail; with --keep, delete older entries");
+        app->add_option(
+               "--keep", days_,
+               "Delete entries that are older than this many days, as far as a body after them contains "
+               "the definition; only the owner of the project may do that")
+            ->check(CLI::Range(0, mostDays));
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        auto& log = requireLog(project);
+        project.shield().raise();
+        output().say(log.tidy() ? "The log has a new body." : "The newest entry is a body already.");
+        if (days_) {
+            auto const deleted = log.deleteHistory(firstKept(log.journal()));
+            output().text() +=
+                "deleted " + std::to_string(deleted) + (deleted == 1 ? " entry\n" : " entries\n");
+        }
+        return 0;
+    }
+
+    bool canRunInBatch() const override { return false; }
+
+private:
+    static constexpr int mostDays = 36500;
+    static constexpr std::size_t page = 1000;
+
+    /// The oldest version that is young enough; with none, the newest one.
+    std::uint64_t firstKept(Journal& journal) const {
+        auto const limit = std::chrono::system_clock::now() - std::chrono::hours(24) * *days_;
+        std::optional<std::uint64_t> oldest;
+        for (;;) {
+            auto const records = journal.records(oldest, page);
+            for (auto const& record : records) {
+                if (oldest && record.time < limit) {
+                    return *oldest;
+                }
+                oldest = record.position.version;
+            }
+            if (records.size() < page) {
+                return oldest.value_or(0);
+            }
+        }
+    }
+
+    std::optional<int> days_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeSharedTidyCommand() {
+    return std::make_unique<TidyLogCommand>();
+}
+
+} // namespace projectctl
