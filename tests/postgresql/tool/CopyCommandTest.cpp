@@ -62,15 +62,15 @@ protected:
 };
 
 TEST_F(CopyCommand, aTextThatIsCopiedToAServerAndBackHasTheSameBytes) {
-    auto const listed = tool({"list", "--long"}).output;
+    auto const listed = tool({"list", "--json"}).output;
 
     EXPECT_THAT(copyTo("owner"), SucceedsSilently());
-    EXPECT_EQ(tool({"list", "--long"}).output, listed);
+    EXPECT_EQ(tool({"list", "--json"}).output, listed);
     EXPECT_EQ(newestVersion(), "1") << "a copy is one entry";
     EXPECT_THAT(tool({"copy", "--to", "text"}), SucceedsSilently());
 
     EXPECT_EQ(readText(), before_);
-    EXPECT_EQ(tool({"list", "--long"}).output, listed);
+    EXPECT_EQ(tool({"list", "--json"}).output, listed);
     EXPECT_THAT(files(), UnorderedElementsAre("project.jsonl", "project.jsonl.old", "store.json.old",
                                               ".gitignore", ".gitattributes"));
     EXPECT_EQ(contentOf(folder_.onDisk() / ".projectdata/project.jsonl.old"), before_);

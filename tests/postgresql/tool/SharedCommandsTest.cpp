@@ -48,7 +48,6 @@ TEST_F(SharedCommands, everyCommandHasTheResultThatItHasWithAText) {
         {"name"},
         {"description", "a pump"},
         {"add", "--recursive", "src", "valve.cpp"},
-        {"list", "--long"},
         {"list", "--json"},
         {"remove", "src/main.cpp"},
         {"list"},
