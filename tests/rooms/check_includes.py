@@ -48,6 +48,7 @@ ROOMS = {
         "shared": ["output", "cli", "git", "project"],
         "batch": ["output", "cli", "git", "project", "changes"],
         "checks": ["output", "cli", "git", "project", "files", "labels", "entrypoints", "references", "merge"],
+        "completion": ["output", "cli", "git", "project", "files", "entrypoints", "references"],
     },
     "src": {
         "metadata": [],

@@ -6,6 +6,7 @@
 #include "cli/CommandLine.hpp"
 #include "cli/ExitCode.hpp"
 #include "cli/Language.hpp"
+#include "completion/Commands.hpp"
 #include "entrypoints/Commands.hpp"
 #include "files/Commands.hpp"
 #include "fl/i18n/MessageCatalog.hpp"
@@ -47,6 +48,7 @@ projectctl::CommandList const& commands() {
         {"copy", makeCopyCommand},
         {"shared", makeSharedCommand},
         {"resolve", makeResolveCommand},
+        {completeCommandName, [] { return makeCompleteCommand(commands()); }},
     };
     return result;
 }

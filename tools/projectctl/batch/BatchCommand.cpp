@@ -13,6 +13,7 @@
 #include "changes/DryRun.hpp"
 #include "cli/CodedFailure.hpp"
 #include "cli/CommandText.hpp"
+#include "cli/Completes.hpp"
 #include "cli/StandardInput.hpp"
 #include "cli/TextArguments.hpp"
 #include "output/Output.hpp"
@@ -38,7 +39,8 @@ public:
             "The commands init, root, references, batch, watch, tidy, setup, merge, resolve and check "
             "--repair cannot be part of a batch. Exits with 3 if a command has found a fault, which does not "
             "stop the batch");
-        takeText(*app, "FILE", file_, "The file with the commands; - or none is standard input");
+        completes(takeText(*app, "FILE", file_, "The file with the commands; - or none is standard input"),
+                  Completes::Files);
         dryRun_.declare(*app);
         return app;
     }

@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "cli/CodedFailure.hpp"
+#include "cli/Completes.hpp"
 #include "cli/Settings.hpp"
 #include "cli/TextArguments.hpp"
 #include "cli/WorkingFolder.hpp"
@@ -25,7 +26,8 @@ constexpr char const* inFolder = "-C";
 void declareCommonOptions(CLI::App& tool) {
     auto const ignore = [] {};
     auto const ignoreValue = [](CLI::results_t const&) { return true; };
-    tool.add_option(inFolder, ignoreValue, "Run as if started in the folder DIR")->option_text("DIR");
+    auto* const folder = tool.add_option(inFolder, ignoreValue, "Run as if started in the folder DIR");
+    completes(folder, Completes::Folders)->option_text("DIR");
     tool.add_flag_callback(fullNames, ignore,
                            "Show paths relative to the project's root, not to the current folder");
     tool.add_flag_callback(sourceControlOff, ignore,
@@ -173,6 +175,15 @@ std::unique_ptr<Command> parseCommand(std::vector<std::string> const& words, Com
     } catch (CLI::ParseError const& error) {
         throw wrongUse(error, tool);
     }
+}
+
+DeclaredTool declareTool(CommandList const& commands) {
+    DeclaredTool result{std::make_unique<CLI::App>("", "projectctl"), {}};
+    declareCommonOptions(*result.app);
+    for (auto& declared : declareNamed({}, commands, *result.app)) {
+        result.commands.push_back(std::move(declared.command));
+    }
+    return result;
 }
 
 bool isCommonOption(std::string const& argument) {

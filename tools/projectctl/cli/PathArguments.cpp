@@ -10,8 +10,10 @@
 
 namespace projectctl {
 
-void PathArguments::declare(CLI::App& app, std::string const& description) {
-    takeTexts(app, "PATH", arguments_, description + "; - reads paths from standard input, one per line");
+void PathArguments::declare(CLI::App& app, std::string const& description, Completes things) {
+    auto* const option =
+        takeTexts(app, "PATH", arguments_, description + "; - reads paths from standard input, one per line");
+    completes(option, things);
     app.add_flag("-0,--null", isNull_, "Also read paths from standard input, each followed by a zero byte");
     app.final_callback([this] {
         if (arguments_.empty() && !isNull_) {

@@ -5,6 +5,7 @@
 
 #include <CLI/CLI.hpp>
 
+#include "cli/Completes.hpp"
 #include "fl/filesystem/Path.hpp"
 
 namespace projectctl {
@@ -17,7 +18,8 @@ public:
     /// Declares the arguments, at least one, and the option -0. Parsing them claims standard input if they
     /// say that it contains paths.
     /// @param description of the paths, for the help.
-    void declare(CLI::App& app, std::string const& description);
+    /// @param things the paths that a shell offers.
+    void declare(CLI::App& app, std::string const& description, Completes things = Completes::ProjectPaths);
 
     /// The paths, absolute, in the given order. Reads standard input if the arguments say so.
     /// @throws Failure for an empty path.

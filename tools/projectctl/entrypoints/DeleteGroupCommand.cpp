@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "entrypoints/GroupCommands.hpp"
 #include "entrypoints/Groups.hpp"
@@ -18,7 +19,8 @@ public:
         auto* const app = group.add_subcommand(
             "delete", "Delete a group of entry points. Its entry points remain, without a group. For the "
                       "default group under another name, delete only that name");
-        takeText(*app, "GROUP", group_, "The group's name or UUID")->required();
+        completes(takeText(*app, "GROUP", group_, "The group's name or UUID"), Completes::EntryPointGroups)
+            ->required();
         return app;
     }
 

@@ -11,7 +11,7 @@ public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app =
             group.add_subcommand("remove", "Remove the entry points of files. The files stay in the project");
-        paths_.declare(*app, "The files");
+        paths_.declare(*app, "The files", Completes::EntryPoints);
         return app;
     }
 

@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "entrypoints/GroupCommands.hpp"
 #include "entrypoints/Groups.hpp"
@@ -15,7 +16,8 @@ class RenameGroupCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("rename", "Rename a group of entry points");
-        takeText(*app, "GROUP", group_, "The group's name or UUID")->required();
+        completes(takeText(*app, "GROUP", group_, "The group's name or UUID"), Completes::EntryPointGroups)
+            ->required();
         takeText(*app, "NAME", name_, "The new name")->required();
         return app;
     }

@@ -2,6 +2,7 @@
 #include <string>
 #include <vector>
 
+#include "cli/Completes.hpp"
 #include "cli/PathArguments.hpp"
 #include "cli/TextArguments.hpp"
 #include "entrypoints/EntryCommands.hpp"
@@ -38,13 +39,17 @@ public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand(
             "set", "Create an entry point for a file of the project, or change the one that it has");
-        takeText(*app, "FILE", file_, "A file of the project")->required();
-        takeText(*app, "--type", type_, "Basic, Startup, Shutdown or Batch_Job (default: Basic)");
+        completes(takeText(*app, "FILE", file_, "A file of the project"), Completes::ProjectPaths)
+            ->required();
+        completes(takeText(*app, "--type", type_, "Basic, Startup, Shutdown or Batch_Job (default: Basic)"),
+                  Completes::EntryPointTypes);
         takeText(*app, "--name", name_,
                  "The name for users (default: the file's name without its extension)");
         auto* const hidden = app->add_flag("--hidden", isHidden_, "Hide it from users");
         app->add_flag("--visible", isVisible_, "Show it to users (default)")->excludes(hidden);
-        takeText(*app, "--group", group_, "The name or UUID of its group (default: the default group)");
+        completes(
+            takeText(*app, "--group", group_, "The name or UUID of its group (default: the default group)"),
+            Completes::EntryPointGroups);
         takeTexts(*app, "--extension", extensions_, "KEY=VALUE to store with it; may be given several times")
             ->allow_extra_args(false);
         takeTexts(*app, "--no-extension", removed_,

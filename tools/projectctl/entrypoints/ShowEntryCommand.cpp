@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/PathArguments.hpp"
 #include "cli/ShownPaths.hpp"
 #include "cli/TextArguments.hpp"
@@ -21,7 +22,7 @@ class ShowEntryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("show", "Show all data of a file's entry point");
-        takeText(*app, "FILE", file_, "A file of the project")->required();
+        completes(takeText(*app, "FILE", file_, "A file of the project"), Completes::EntryPoints)->required();
         app->add_flag("--json", isJson_, "Write a JSON array of one object");
         return app;
     }

@@ -40,7 +40,7 @@ public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(
             "add", "Add files and folders to the project. Those that are already in the project are skipped");
-        given_.declare(*app, "The files and folders");
+        given_.declare(*app, "The files and folders", Completes::NewPaths);
         app->add_flag(
             "-r,--recursive", isRecursive_,
             "Also add the contents of folders, at any depth, except the data of source control and of "

@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "cli/CodedFailure.hpp"
+#include "cli/Completes.hpp"
 #include "cli/PathArguments.hpp"
 #include "cli/TextArguments.hpp"
 #include "files/Commands.hpp"
@@ -28,8 +29,10 @@ public:
         auto* const app = tool.add_subcommand(
             "list", "List the files and folders of the project: all of them, or those that meet all of the "
                     "given conditions");
-        takeTexts(*app, "PATH", paths_,
-                  "List these paths and everything in the project below them (default: everything)");
+        completes(
+            takeTexts(*app, "PATH", paths_,
+                      "List these paths and everything in the project below them (default: everything)"),
+            Completes::ProjectPaths);
         declareConditions(*app);
         form_.declare(*app, true);
         return app;
@@ -57,15 +60,17 @@ public:
 
 private:
     void declareConditions(CLI::App& app) {
-        takeTexts(
+        auto* const label = takeTexts(
             app, "--label", labels_,
             "CATEGORY or CATEGORY=LABEL, by name or UUID: only files that have this label, or any label "
-            "of the category; may be given several times")
-            ->allow_extra_args(false);
-        takeTexts(app, "--no-label", absentLabels_,
-                  "The same: only files that do not have the label, or any label of the category")
-            ->allow_extra_args(false);
-        takeText(app, "--kind", kind_, "Only entries of this kind: file or folder");
+            "of the category; may be given several times");
+        completes(label, Completes::LabelChoices)->allow_extra_args(false);
+        auto* const noLabel =
+            takeTexts(app, "--no-label", absentLabels_,
+                      "The same: only files that do not have the label, or any label of the category");
+        completes(noLabel, Completes::LabelChoices)->allow_extra_args(false);
+        completes(takeText(app, "--kind", kind_, "Only entries of this kind: file or folder"),
+                  Completes::Kinds);
         takeText(app, "--glob", glob_,
                  "Only files whose path from the root matches: * and ? do not match a slash, ** does");
         app.add_flag("--entry-points", isEntryPoint_, "Only files with an entry point");

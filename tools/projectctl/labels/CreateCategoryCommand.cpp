@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/CategoryCommands.hpp"
 #include "output/NameForms.hpp"
@@ -17,8 +18,9 @@ public:
         takeText(*app, "NAME", name_, "The name of the category")->required();
         app->add_flag("--read-only", isReadOnly_, "Do not allow it to be renamed or deleted");
         app->add_flag("--single-valued", isSingleValued_, "Allow at most one label of it per file");
-        takeText(*app, "--type", type_,
-                 "The type of the data that its labels have on a file (default: None)");
+        completes(takeText(*app, "--type", type_,
+                           "The type of the data that its labels have on a file (default: None)"),
+                  Completes::DataTypes);
         return app;
     }
 

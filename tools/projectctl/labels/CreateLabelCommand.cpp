@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/LabelCommands.hpp"
 #include "output/NameForms.hpp"
@@ -18,7 +19,8 @@ class CreateLabelCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("create", "Create a label in a category");
-        takeText(*app, "CATEGORY", category_, "The category's name or UUID")->required();
+        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
+            ->required();
         takeText(*app, "NAME", name_, "The name of the label")->required();
         auto* const readOnly = app->add_flag("--read-only", isReadOnly_, "Do not allow it to be deleted");
         app->add_flag("--writable", isWritable_, "Allow it to be deleted even if its category is read-only")

@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/CategoryCommands.hpp"
 #include "output/Progress.hpp"
@@ -16,7 +17,8 @@ public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand(
             "delete", "Delete a category with its labels, and remove the labels from all files");
-        takeText(*app, "CATEGORY", category_, "The category's name or UUID")->required();
+        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
+            ->required();
         return app;
     }
 

@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/LabelCommands.hpp"
 #include "output/Progress.hpp"
@@ -15,8 +16,9 @@ class DeleteLabelCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("delete", "Delete a label, and remove it from all files");
-        takeText(*app, "CATEGORY", category_, "The category's name or UUID")->required();
-        takeText(*app, "LABEL", label_, "The label's name or UUID")->required();
+        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
+            ->required();
+        completes(takeText(*app, "LABEL", label_, "The label's name or UUID"), Completes::Labels)->required();
         return app;
     }
 

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
@@ -24,8 +25,9 @@ int FileLabelCommand::run(OpenProject& project) {
 }
 
 void FileLabelCommand::declareArguments(CLI::App& app, std::string const& use) {
-    takeText(app, "CATEGORY", category_, "The category's name or UUID")->required();
-    takeText(app, "LABEL", label_, "The label's name or UUID")->required();
+    completes(takeText(app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
+        ->required();
+    completes(takeText(app, "LABEL", label_, "The label's name or UUID"), Completes::Labels)->required();
     paths_.declare(app, use);
     dryRun_.declare(app);
 }

@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/LabelCommands.hpp"
 #include "project/FoundFiles.hpp"
@@ -17,8 +18,11 @@ public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand(
             "find", "List the files and folders that have a label: short for 'projectctl list --label'");
-        takeText(*app, "CATEGORY", category_, "The category's name or UUID")->required();
-        takeText(*app, "LABEL", label_, "The label's name or UUID (default: any label of the category)");
+        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
+            ->required();
+        completes(
+            takeText(*app, "LABEL", label_, "The label's name or UUID (default: any label of the category)"),
+            Completes::Labels);
         form_.declare(*app, false);
         return app;
     }

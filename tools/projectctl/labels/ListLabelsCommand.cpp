@@ -2,6 +2,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/LabelCommands.hpp"
 #include "output/JsonRows.hpp"
@@ -22,7 +23,8 @@ public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app =
             group.add_subcommand("list", "List the labels of all categories, or of one category");
-        takeText(*app, "CATEGORY", category_, "The category's name or UUID");
+        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"),
+                  Completes::Categories);
         app->add_flag("--json", isJson_, "Write a JSON array of objects, with the UUIDs");
         return app;
     }

@@ -2,6 +2,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/CategoryCommands.hpp"
 #include "output/NameForms.hpp"
@@ -19,7 +20,8 @@ class RenameCategoryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("rename", "Rename a category");
-        takeText(*app, "CATEGORY", category_, "The category's name or UUID")->required();
+        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
+            ->required();
         takeText(*app, "NAME", name_, "The new name")->required();
         return app;
     }

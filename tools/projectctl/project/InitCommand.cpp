@@ -1,6 +1,7 @@
 #include <optional>
 #include <string>
 
+#include "cli/Completes.hpp"
 #include "cli/Settings.hpp"
 #include "cli/TextArguments.hpp"
 #include "cli/WorkingFolder.hpp"
@@ -23,7 +24,8 @@ class InitCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand("init", "Create a project in a folder");
-        takeText(*app, "FOLDER", folder_, "The root folder; by default the current folder");
+        completes(takeText(*app, "FOLDER", folder_, "The root folder; by default the current folder"),
+                  Completes::Folders);
         takeText(*app, "--name", name_, "The name of the project; by default the name of the folder");
         auto* const store =
             takeText(*app, "--store", store_,

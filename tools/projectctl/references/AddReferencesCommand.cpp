@@ -1,6 +1,7 @@
 #include <string>
 #include <vector>
 
+#include "cli/Completes.hpp"
 #include "cli/PathArguments.hpp"
 #include "cli/TextArguments.hpp"
 #include "output/Failure.hpp"
@@ -22,7 +23,9 @@ public:
 
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("add", "Add folders to " + list_.name);
-        takeTexts(*app, "FOLDER", arguments_, "The folders, inside or outside the project")->required();
+        completes(takeTexts(*app, "FOLDER", arguments_, "The folders, inside or outside the project"),
+                  Completes::Folders)
+            ->required();
         if (list_.isOfProjects) {
             app->add_flag("--absolute", isAbsolute_,
                           "Store the absolute path instead of the path relative to the root");

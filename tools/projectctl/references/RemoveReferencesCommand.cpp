@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "cli/Choice.hpp"
+#include "cli/Completes.hpp"
 #include "cli/PathArguments.hpp"
 #include "cli/ShownPaths.hpp"
 #include "cli/TextArguments.hpp"
@@ -27,8 +28,10 @@ public:
 
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("remove", "Remove folders from " + list_.name);
-        takeTexts(*app, "FOLDER", arguments_,
-                  "A folder, a path in the form in which 'list' shows it, or the UUID of one entry")
+        completes(
+            takeTexts(*app, "FOLDER", arguments_,
+                      "A folder, a path in the form in which 'list' shows it, or the UUID of one entry"),
+            list_.isOfProjects ? Completes::References : Completes::PathFolders)
             ->required();
         return app;
     }

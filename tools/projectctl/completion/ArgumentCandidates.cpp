@@ -1,0 +1,160 @@
+#include "completion/ArgumentCandidates.hpp"
+
+#include <algorithm>
+#include <cctype>
+#include <cstddef>
+
+#include "cli/CommandLine.hpp"
+#include "cli/Completes.hpp"
+#include "cli/WorkingFolder.hpp"
+#include "completion/NameCandidates.hpp"
+#include "completion/PathCandidates.hpp"
+#include "completion/TypedPlace.hpp"
+#include "output/Failure.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// The first sentence of a description, on one line.
+std::string summaryOf(std::string const& description) {
+    std::string result = description.substr(
+        0, std::min({description.find(". "), description.find("; "), description.find(": ")}));
+    std::ranges::replace_if(
+        result, [](unsigned char byte) { return std::iscntrl(byte) != 0; }, ' ');
+    return result;
+}
+
+void addMembers(Candidates& candidates, CLI::App& group) {
+    for (auto const* member : group.get_subcommands([](auto*) { return true; })) {
+        if (!member->get_group().empty()) {
+            candidates.add(member->get_name(), summaryOf(member->get_description()));
+        }
+    }
+}
+
+/// The name of an option for a person, the long one if it has any; empty for an argument.
+std::string nameOf(CLI::Option const& option) {
+    if (!option.get_lnames().empty()) {
+        return "--" + option.get_lnames().front();
+    }
+    return option.get_snames().empty() ? "" : '-' + option.get_snames().front();
+}
+
+/// Adds the options of a command, and those that every command accepts.
+void addOptions(Candidates& candidates, CLI::App& command, CLI::App& tool) {
+    auto const add = [&candidates](CLI::Option const& option) {
+        candidates.add(nameOf(option), summaryOf(option.get_description()));
+    };
+    for (auto const* option : command.get_options([](auto* each) { return !nameOf(*each).empty(); })) {
+        add(*option);
+    }
+    if (&command != &tool) {
+        for (auto const* option :
+             tool.get_options([](auto* each) { return isCommonOption(nameOf(*each)); })) {
+            add(*option);
+        }
+    }
+}
+
+/// The category whose labels are offered.
+std::string typedCategory(TypedPlace const& place) {
+    if (completedBy(*place.option) == Completes::LabelChoices) {
+        return place.values.at(place.option).back();
+    }
+    for (auto* const argument : place.command->get_options([](auto*) { return true; })) {
+        auto const found = place.values.find(argument);
+        if (completedBy(*argument) == Completes::Categories && found != place.values.end() &&
+            !found->second.empty()) {
+            return found->second.back();
+        }
+    }
+    throw Failure("a label needs its category first");
+}
+
+/// In the form CATEGORY=LABEL, the label is what is being typed.
+Completes thingsAt(TypedPlace& place) {
+    auto const things = completedBy(*place.option);
+    std::size_t const equals = place.word.find('=');
+    if (things != Completes::LabelChoices || equals == std::string::npos) {
+        return things;
+    }
+    place.values[place.option].push_back(place.word.substr(0, equals));
+    place.before += place.word.substr(0, equals + 1);
+    place.word.erase(0, equals + 1);
+    return Completes::Labels;
+}
+
+void addOfProject(Candidates& candidates, Completes things, TypedPlace const& place) {
+    auto project = OpenProject::ofWorkingFolder();
+    switch (things) {
+    case Completes::Categories:
+    case Completes::LabelChoices:
+        return addCategories(candidates, project);
+    case Completes::Labels:
+        return addLabels(candidates, project, typedCategory(place));
+    case Completes::ProjectPaths:
+        return addProjectPaths(candidates, project);
+    case Completes::NewPaths:
+        return addNewPaths(candidates, project);
+    case Completes::EntryPoints:
+        return addEntryPoints(candidates, project);
+    case Completes::EntryPointGroups:
+        return addEntryPointGroups(candidates, project);
+    case Completes::PathFolders:
+        return addReferences(candidates, project, projectPath());
+    case Completes::References:
+        return addReferences(candidates, project, projectReferences());
+    default:
+        return;
+    }
+}
+
+void addValues(Candidates& candidates, Completes things, TypedPlace const& place) {
+    switch (things) {
+    case Completes::Nothing:
+        return;
+    case Completes::Files:
+        return addDiskPaths(candidates, DiskPaths::All);
+    case Completes::Folders:
+        return addDiskPaths(candidates, DiskPaths::Folders);
+    case Completes::Kinds:
+        return addKinds(candidates);
+    case Completes::EntryPointTypes:
+        return addEntryPointTypes(candidates);
+    case Completes::DataTypes:
+        return addDataTypes(candidates);
+    default:
+        return addOfProject(candidates, things, place);
+    }
+}
+
+void enterFolders(TypedPlace const& place, CLI::App& tool) {
+    auto const folders = place.values.find(tool.get_option("-C"));
+    if (folders != place.values.end()) {
+        std::ranges::for_each(folders->second, enterFolder);
+    }
+}
+
+} // namespace
+
+std::vector<Candidate> candidatesFor(std::vector<std::string> const& arguments, CommandList const& commands) {
+    auto const declared = declareTool(commands);
+    auto& tool = *declared.app;
+    auto place = placeOfLast(arguments, tool);
+    enterFolders(place, tool);
+    auto const things = place.option != nullptr ? thingsAt(place) : Completes::Nothing;
+    Candidates candidates(place.word);
+    if (place.option != nullptr) {
+        addValues(candidates, things, place);
+    } else if (!place.optionsEnded && place.word.starts_with('-')) {
+        addOptions(candidates, *place.command, tool);
+    } else {
+        addMembers(candidates, *place.command);
+    }
+    auto result = candidates.all();
+    std::ranges::for_each(result, [&place](Candidate& each) { each.value.insert(0, place.before); });
+    return result;
+}
+
+} // namespace projectctl

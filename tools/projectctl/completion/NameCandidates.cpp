@@ -1,0 +1,107 @@
+#include "completion/NameCandidates.hpp"
+
+#include <algorithm>
+#include <vector>
+
+#include "cli/Choice.hpp"
+#include "cli/ShownPaths.hpp"
+#include "entrypoints/Groups.hpp"
+#include "output/NameForms.hpp"
+#include "project/LabelNames.hpp"
+#include "project/entrypoints/EntryPoint.hpp"
+#include "project/entrypoints/EntryPointType.hpp"
+#include "project/labels/LabelDataValidators.hpp"
+#include "project/references/FolderReference.hpp"
+
+namespace projectctl {
+
+namespace {
+
+std::string bytesOf(std::u16string_view text) {
+    std::string result;
+    appendBytes(result, text);
+    return result;
+}
+
+/// A name that is not unique does not identify its thing, and one that begins with a dash would be an option.
+bool isUsable(std::u16string const& name, std::vector<Named> const& things) {
+    return !name.empty() && !name.starts_with(u'-') && std::ranges::count(things, name, &Named::name) == 1;
+}
+
+void addNamed(Candidates& candidates, std::vector<Named> const& things, std::string const& kind) {
+    for (auto const& [name, uuid] : things) {
+        if (isUsable(name, things)) {
+            candidates.add(bytesOf(name), kind);
+        } else {
+            candidates.add(bytesOf(uuid), withoutControls(kind + ' ' + inQuotes(name), false));
+        }
+    }
+}
+
+template <typename Things>
+std::vector<Named> namesSorted(Things const& things) {
+    std::vector<Named> result;
+    for (auto const& thing : things) {
+        result.push_back({thing.getName(), thing.getUUID()});
+    }
+    std::ranges::stable_sort(result, {}, &Named::name);
+    return result;
+}
+
+} // namespace
+
+void addCategories(Candidates& candidates, OpenProject& project) {
+    addNamed(candidates, namesSorted(project.manager().getLabelManager().getAllCategories()), "category");
+}
+
+void addLabels(Candidates& candidates, OpenProject& project, std::string const& category) {
+    auto const guard = project.store().acquireReadLock();
+    auto& labels = project.manager().getLabelManager();
+    addNamed(candidates, namesSorted(labels.getLabels(LabelNames(labels).category(category))), "label");
+}
+
+void addEntryPointGroups(Candidates& candidates, OpenProject& project) {
+    Groups const groups(project.manager().getEntryPointManager());
+    std::vector<Named> names;
+    for (auto const& group : groups.all()) {
+        names.push_back({group->getName(), group->getUUID()});
+    }
+    addNamed(candidates, names, "group");
+}
+
+void addEntryPoints(Candidates& candidates, OpenProject& project) {
+    ShownPaths shown(project.root());
+    for (auto const& entry : project.manager().getEntryPointManager().getEntryPoints()) {
+        candidates.add(bytesOf(shown.ofAbsolute(entry->getFile())),
+                       withoutControls(bytesOf(toString(entry->getType())), false));
+    }
+}
+
+void addReferences(Candidates& candidates, OpenProject& project, ReferenceList const& list) {
+    ShownPaths shown(project.root());
+    for (auto const& reference : list.manager(project).getReferences()) {
+        candidates.add(bytesOf(shown.of(reference.getStoredPath())), "folder");
+    }
+}
+
+void addKinds(Candidates& candidates) {
+    candidates.add("file", "");
+    candidates.add("folder", "");
+}
+
+void addEntryPointTypes(Candidates& candidates) {
+    using project::management::EntryPointType;
+    for (auto const type : {EntryPointType::Basic, EntryPointType::Startup, EntryPointType::Shutdown,
+                            EntryPointType::BatchJob}) {
+        candidates.add(bytesOf(toString(type)), "type of entry points");
+    }
+}
+
+void addDataTypes(Candidates& candidates) {
+    project::management::LabelDataValidators().getValidator([&candidates](auto& validator) {
+        candidates.add(bytesOf(validator.getDataType()), "type of data");
+        return false; // all of them
+    });
+}
+
+} // namespace projectctl
