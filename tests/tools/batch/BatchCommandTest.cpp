@@ -107,7 +107,7 @@ TEST_F(BatchCommand, changesNothingIfALineInTheMiddleFails) {
 
 TEST_F(BatchCommand, runsNoLineIfOneIsUnknownOrHasWrongArguments) {
     expectRefused("remove a\nlsit\n", 2, "line 2: unknown command or option \"lsit\"");
-    expectRefused("remove a\nlist --long\n", 2, "line 2: The following argument was not expected: --long");
+    expectRefused("remove a\nlist --long\n", 2, "line 2: unknown option \"--long\"");
     expectRefused("remove a\n\nlabel put Status\n", 2, "line 3: ");
     expectRefused("remove a\nlist --help\n", 2, "line 2: ");
     expectRefused("remove a\nname \"X\n", 2, "line 2: a double quote is not closed");

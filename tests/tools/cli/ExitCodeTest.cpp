@@ -41,8 +41,8 @@ class ExitCodes : public ToolTest {};
 
 TEST_F(ExitCodes, areInTheHelp) {
     EXPECT_THAT(tool({"--help"}).output,
-                AllOf(HasSubstr("Exit codes: 0 done; 1 "), HasSubstr("; 3 done, and a fault was found"),
-                      HasSubstr("8 the outcome")));
+                AllOf(HasSubstr("Exit codes:\n  0  done\n  1  "),
+                      HasSubstr("\n  3  done, and a fault was found"), HasSubstr("\n  8  the outcome")));
 }
 
 TEST_F(ExitCodes, distinguishAFindingAFailureAndAWrongUse) {

@@ -31,16 +31,8 @@ public:
     explicit BatchCommand(CommandList const& commands) : commands_(commands) {}
 
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "batch",
-            "Run several commands as one step: if one fails, nothing is changed. Each line is one command, "
-            "without 'projectctl', whose words are quoted as in a shell; nothing is expanded. Empty lines "
-            "and comments, which begin with #, are skipped. A command sees the changes of those before it. "
-            "The commands init, root, references, batch, watch, tidy, setup, merge, resolve and check "
-            "--repair cannot be part of a batch. Exits with 3 if a command has found a fault, which does not "
-            "stop the batch");
-        completes(takeText(*app, "FILE", file_, "The file with the commands; - or none is standard input"),
-                  Completes::Files);
+        auto* const app = tool.add_subcommand("batch");
+        completes(takeText(*app, "FILE", file_), Completes::Files);
         dryRun_.declare(*app);
         return app;
     }

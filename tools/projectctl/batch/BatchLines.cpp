@@ -7,6 +7,7 @@
 #include "cli/CodedFailure.hpp"
 #include "cli/CommandLine.hpp"
 #include "cli/CommandText.hpp"
+#include "cli/CommonOptions.hpp"
 
 namespace projectctl {
 

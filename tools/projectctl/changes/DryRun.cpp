@@ -6,7 +6,7 @@
 namespace projectctl {
 
 void DryRun::declare(CLI::App& app) {
-    app.add_flag(option, isOn_, "Show what would change, one line per change, and change nothing");
+    app.add_flag(option, isOn_);
 }
 
 bool DryRun::end(ProjectTransaction& transaction, OpenProject& project) const {

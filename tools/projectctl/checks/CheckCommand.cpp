@@ -21,9 +21,8 @@ using project::stores::Fault;
 class CheckCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand("check", "Check the whole project for faults");
-        app->add_flag("--repair", repair_,
-                      "First set damaged lines aside in a file of their own, and rewrite the rest");
+        auto* const app = tool.add_subcommand("check");
+        app->add_flag("--repair", repair_);
         return app;
     }
 

@@ -23,13 +23,9 @@ namespace {
 class StatusCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "status",
-            "Show the files on disk that are not in the project, the files in the project that are not on "
-            "disk, and references to things that do not exist");
-        app->add_flag("--json", isJson_,
-                      "Write a JSON object with the arrays \"new\", \"gone\" and \"problems\"");
-        app->add_flag("--gitignore", leavesOutIgnored_, "Leave out files that git ignores");
+        auto* const app = tool.add_subcommand("status");
+        app->add_flag("--json", isJson_);
+        app->add_flag("--gitignore", leavesOutIgnored_);
         return app;
     }
 

@@ -12,6 +12,8 @@ class CodedFailure : public Failure {
 public:
     CodedFailure(std::string const& text, int exitCode) : Failure(text), exitCode_(exitCode) {}
 
+    CodedFailure(Message const& message, int exitCode) : Failure(message), exitCode_(exitCode) {}
+
     int exitCode() const noexcept { return exitCode_; }
 
 private:
@@ -22,6 +24,8 @@ private:
 class WrongUse : public CodedFailure {
 public:
     explicit WrongUse(std::string const& text) : CodedFailure(text, exit_code::wrongUse) {}
+
+    explicit WrongUse(Message const& message) : CodedFailure(message, exit_code::wrongUse) {}
 };
 
 } // namespace projectctl

@@ -29,9 +29,13 @@ public:
     virtual std::unique_ptr<Command> takeCalledMember() { return nullptr; }
 };
 
+/// The purpose of a command that help does not show.
+inline constexpr char const* hiddenPurpose = "";
+
 /// A command by its name on the command line.
 struct NamedCommand {
     std::string_view name;
+    char const* purpose; ///< the message with the heading under which help shows it
     std::unique_ptr<Command> (*make)();
 };
 

@@ -6,17 +6,17 @@
 
 namespace projectctl {
 
-CommandGroup::CommandGroup(std::string name, std::string description,
-                           std::vector<std::unique_ptr<Command>> members)
-    : name_(std::move(name)), description_(std::move(description)), members_(std::move(members)) {
+CommandGroup::CommandGroup(std::string name, std::vector<std::unique_ptr<Command>> members)
+    : name_(std::move(name)), members_(std::move(members)) {
 }
 
 CLI::App* CommandGroup::declare(CLI::App& tool) {
-    auto* const app = tool.add_subcommand(name_, description_);
+    auto* const app = tool.add_subcommand(name_);
     app->require_subcommand(1);
     declared_.reserve(members_.size());
     for (auto const& member : members_) {
         declared_.push_back(member->declare(*app));
+        declared_.back()->group("HelpMembers");
     }
     return app;
 }

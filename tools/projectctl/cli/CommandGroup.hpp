@@ -12,7 +12,7 @@ namespace projectctl {
 class CommandGroup : public Command {
 public:
     /// @param members the commands, in the order in which help shows them.
-    CommandGroup(std::string name, std::string description, std::vector<std::unique_ptr<Command>> members);
+    CommandGroup(std::string name, std::vector<std::unique_ptr<Command>> members);
 
     CLI::App* declare(CLI::App& tool) override;
     std::unique_ptr<Command> takeCalledMember() override;
@@ -20,7 +20,6 @@ public:
 
 private:
     std::string name_;
-    std::string description_;
     std::vector<std::unique_ptr<Command>> members_;
     std::vector<CLI::App*> declared_; ///< one per member
 };

@@ -22,15 +22,4 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
 /// @throws WrongUse also for --help.
 std::unique_ptr<Command> parseCommand(std::vector<std::string> const& words, CommandList const& commands);
 
-/// The tool with all commands, as the parser knows it.
-struct DeclaredTool {
-    std::unique_ptr<CLI::App> app;
-    std::vector<std::unique_ptr<Command>> commands; ///< the values of the options are stored in them
-};
-
-DeclaredTool declareTool(CommandList const& commands);
-
-/// Whether an argument is one of the options that every command accepts.
-bool isCommonOption(std::string const& argument);
-
 } // namespace projectctl

@@ -10,11 +10,9 @@
 
 namespace projectctl {
 
-void PathArguments::declare(CLI::App& app, std::string const& description, Completes things) {
-    auto* const option =
-        takeTexts(app, "PATH", arguments_, description + "; - reads paths from standard input, one per line");
-    completes(option, things);
-    app.add_flag("-0,--null", isNull_, "Also read paths from standard input, each followed by a zero byte");
+void PathArguments::declare(CLI::App& app, Completes things) {
+    completes(takeTexts(app, "PATH", arguments_), things);
+    app.add_flag("-0,--null", isNull_);
     app.final_callback([this] {
         if (arguments_.empty() && !isNull_) {
             throw CLI::RequiredError("PATH");

@@ -17,9 +17,8 @@ class PathArguments {
 public:
     /// Declares the arguments, at least one, and the option -0. Parsing them claims standard input if they
     /// say that it contains paths.
-    /// @param description of the paths, for the help.
     /// @param things the paths that a shell offers.
-    void declare(CLI::App& app, std::string const& description, Completes things = Completes::ProjectPaths);
+    void declare(CLI::App& app, Completes things = Completes::ProjectPaths);
 
     /// The paths, absolute, in the given order. Reads standard input if the arguments say so.
     /// @throws Failure for an empty path.

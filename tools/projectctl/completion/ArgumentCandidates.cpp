@@ -1,11 +1,12 @@
 #include "completion/ArgumentCandidates.hpp"
 
 #include <algorithm>
-#include <cctype>
 #include <cstddef>
 
-#include "cli/CommandLine.hpp"
+#include "cli/CommonOptions.hpp"
 #include "cli/Completes.hpp"
+#include "cli/DeclaredTool.hpp"
+#include "cli/VerbDescription.hpp"
 #include "cli/WorkingFolder.hpp"
 #include "completion/NameCandidates.hpp"
 #include "completion/PathCandidates.hpp"
@@ -16,19 +17,16 @@ namespace projectctl {
 
 namespace {
 
-/// The first sentence of a description, on one line.
-std::string summaryOf(std::string const& description) {
-    std::string result = description.substr(
+/// The first sentence of a description.
+std::string shortened(std::string const& description) {
+    return description.substr(
         0, std::min({description.find(". "), description.find("; "), description.find(": ")}));
-    std::ranges::replace_if(
-        result, [](unsigned char byte) { return std::iscntrl(byte) != 0; }, ' ');
-    return result;
 }
 
 void addMembers(Candidates& candidates, CLI::App& group) {
     for (auto const* member : group.get_subcommands([](auto*) { return true; })) {
         if (!member->get_group().empty()) {
-            candidates.add(member->get_name(), summaryOf(member->get_description()));
+            candidates.add(member->get_name(), shortened(summaryOf(*member)));
         }
     }
 }
@@ -43,16 +41,16 @@ std::string nameOf(CLI::Option const& option) {
 
 /// Adds the options of a command, and those that every command accepts.
 void addOptions(Candidates& candidates, CLI::App& command, CLI::App& tool) {
-    auto const add = [&candidates](CLI::Option const& option) {
-        candidates.add(nameOf(option), summaryOf(option.get_description()));
+    auto const add = [&candidates](CLI::Option const& option, CLI::App const& verb) {
+        candidates.add(nameOf(option), shortened(descriptionOf(option, verb)));
     };
     for (auto const* option : command.get_options([](auto* each) { return !nameOf(*each).empty(); })) {
-        add(*option);
+        add(*option, command);
     }
     if (&command != &tool) {
         for (auto const* option :
              tool.get_options([](auto* each) { return isCommonOption(nameOf(*each)); })) {
-            add(*option);
+            add(*option, tool);
         }
     }
 }
@@ -139,8 +137,8 @@ void enterFolders(TypedPlace const& place, CLI::App& tool) {
 } // namespace
 
 std::vector<Candidate> candidatesFor(std::vector<std::string> const& arguments, CommandList const& commands) {
-    auto const declared = declareTool(commands);
-    auto& tool = *declared.app;
+    DeclaredTool declared(commands);
+    auto& tool = declared.parser();
     auto place = placeOfLast(arguments, tool);
     enterFolders(place, tool);
     auto const things = place.option != nullptr ? thingsAt(place) : Completes::Nothing;

@@ -23,15 +23,11 @@ public:
     explicit CompleteCommand(CommandList const& commands) : commands_(commands) {}
 
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app =
-            tool.add_subcommand(completeCommandName, "Write the candidates for the last argument");
+        auto* const app = tool.add_subcommand(completeCommandName);
         app->group(""); // hidden: people do not call it
-        takeTexts(*app, "WORDS", words_, "The arguments of projectctl; the last one is being typed");
-        auto* const bash =
-            app->add_flag("--bash", isBash_,
-                          "The arguments are a line up to the cursor, and its end that the shell "
-                          "replaces; write only values, in the form that replaces this end");
-        app->add_flag("--fish", isFish_, "The argument is a line up to the cursor")->excludes(bash);
+        takeTexts(*app, "WORDS", words_);
+        auto* const bash = app->add_flag("--bash", isBash_);
+        app->add_flag("--fish", isFish_)->excludes(bash);
         return app;
     }
 

@@ -14,8 +14,8 @@ namespace {
 class CreateGroupCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("create", "Create a group of entry points");
-        takeText(*app, "NAME", name_, "The name of the group")->required();
+        auto* const app = group.add_subcommand("create");
+        takeText(*app, "NAME", name_)->required();
         return app;
     }
 

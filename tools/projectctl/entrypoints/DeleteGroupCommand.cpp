@@ -16,11 +16,8 @@ namespace {
 class DeleteGroupCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand(
-            "delete", "Delete a group of entry points. Its entry points remain, without a group. For the "
-                      "default group under another name, delete only that name");
-        completes(takeText(*app, "GROUP", group_, "The group's name or UUID"), Completes::EntryPointGroups)
-            ->required();
+        auto* const app = group.add_subcommand("delete");
+        completes(takeText(*app, "GROUP", group_), Completes::EntryPointGroups)->required();
         return app;
     }
 

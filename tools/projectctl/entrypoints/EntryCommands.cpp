@@ -14,8 +14,7 @@ std::unique_ptr<Command> makeEntryCommand() {
     members.push_back(makeListEntriesCommand());
     members.push_back(makeShowEntryCommand());
     members.push_back(makeRemoveEntryCommand());
-    return std::make_unique<CommandGroup>("entry", "Set, list, show and remove the entry points of files",
-                                          std::move(members));
+    return std::make_unique<CommandGroup>("entry", std::move(members));
 }
 
 } // namespace projectctl

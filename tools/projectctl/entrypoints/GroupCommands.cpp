@@ -14,8 +14,7 @@ std::unique_ptr<Command> makeGroupCommand() {
     members.push_back(makeListGroupsCommand());
     members.push_back(makeRenameGroupCommand());
     members.push_back(makeDeleteGroupCommand());
-    return std::make_unique<CommandGroup>("group", "Create, list, rename and delete groups of entry points",
-                                          std::move(members));
+    return std::make_unique<CommandGroup>("group", std::move(members));
 }
 
 } // namespace projectctl

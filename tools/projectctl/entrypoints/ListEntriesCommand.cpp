@@ -16,11 +16,9 @@ using project::management::EntryPoint;
 class ListEntriesCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app =
-            group.add_subcommand("list", "List the entry points of the project, sorted by file");
-        auto* const json = app->add_flag("--json", isJson_, "Write a JSON array of objects with all data");
-        app->add_flag("-0,--null", isNullEnded_, "Write only the files, each ended by a zero byte")
-            ->excludes(json);
+        auto* const app = group.add_subcommand("list");
+        auto* const json = app->add_flag("--json", isJson_);
+        app->add_flag("-0,--null", isNullEnded_)->excludes(json);
         return app;
     }
 

@@ -11,8 +11,8 @@ namespace {
 class ListGroupsCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("list", "List the groups, the default group first");
-        app->add_flag("--json", isJson_, "Write a JSON array of objects, with the UUIDs");
+        auto* const app = group.add_subcommand("list");
+        app->add_flag("--json", isJson_);
         return app;
     }
 

@@ -9,9 +9,8 @@ namespace {
 class RemoveEntryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app =
-            group.add_subcommand("remove", "Remove the entry points of files. The files stay in the project");
-        paths_.declare(*app, "The files", Completes::EntryPoints);
+        auto* const app = group.add_subcommand("remove");
+        paths_.declare(*app, Completes::EntryPoints);
         return app;
     }
 

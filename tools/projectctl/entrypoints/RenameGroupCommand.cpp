@@ -15,10 +15,9 @@ namespace {
 class RenameGroupCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("rename", "Rename a group of entry points");
-        completes(takeText(*app, "GROUP", group_, "The group's name or UUID"), Completes::EntryPointGroups)
-            ->required();
-        takeText(*app, "NAME", name_, "The new name")->required();
+        auto* const app = group.add_subcommand("rename");
+        completes(takeText(*app, "GROUP", group_), Completes::EntryPointGroups)->required();
+        takeText(*app, "NAME", name_)->required();
         return app;
     }
 

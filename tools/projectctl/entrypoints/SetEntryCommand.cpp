@@ -37,24 +37,15 @@ void requireNoBackslash(Path const& root, Path const& file) {
 class SetEntryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand(
-            "set", "Create an entry point for a file of the project, or change the one that it has");
-        completes(takeText(*app, "FILE", file_, "A file of the project"), Completes::ProjectPaths)
-            ->required();
-        completes(takeText(*app, "--type", type_, "Basic, Startup, Shutdown or Batch_Job (default: Basic)"),
-                  Completes::EntryPointTypes);
-        takeText(*app, "--name", name_,
-                 "The name for users (default: the file's name without its extension)");
-        auto* const hidden = app->add_flag("--hidden", isHidden_, "Hide it from users");
-        app->add_flag("--visible", isVisible_, "Show it to users (default)")->excludes(hidden);
-        completes(
-            takeText(*app, "--group", group_, "The name or UUID of its group (default: the default group)"),
-            Completes::EntryPointGroups);
-        takeTexts(*app, "--extension", extensions_, "KEY=VALUE to store with it; may be given several times")
-            ->allow_extra_args(false);
-        takeTexts(*app, "--no-extension", removed_,
-                  "KEY of an extension to delete; may be given several times")
-            ->allow_extra_args(false);
+        auto* const app = group.add_subcommand("set");
+        completes(takeText(*app, "FILE", file_), Completes::ProjectPaths)->required();
+        completes(takeText(*app, "--type", type_), Completes::EntryPointTypes);
+        takeText(*app, "--name", name_);
+        auto* const hidden = app->add_flag("--hidden", isHidden_);
+        app->add_flag("--visible", isVisible_)->excludes(hidden);
+        completes(takeText(*app, "--group", group_), Completes::EntryPointGroups);
+        takeTexts(*app, "--extension", extensions_)->allow_extra_args(false);
+        takeTexts(*app, "--no-extension", removed_)->allow_extra_args(false);
         return app;
     }
 

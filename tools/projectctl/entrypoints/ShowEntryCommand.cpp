@@ -21,9 +21,9 @@ using project::management::EntryPoint;
 class ShowEntryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("show", "Show all data of a file's entry point");
-        completes(takeText(*app, "FILE", file_, "A file of the project"), Completes::EntryPoints)->required();
-        app->add_flag("--json", isJson_, "Write a JSON array of one object");
+        auto* const app = group.add_subcommand("show");
+        completes(takeText(*app, "FILE", file_), Completes::EntryPoints)->required();
+        app->add_flag("--json", isJson_);
         return app;
     }
 

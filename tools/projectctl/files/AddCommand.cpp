@@ -38,18 +38,11 @@ namespace fileSchema = project::metadata::schema::files;
 class AddCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "add", "Add files and folders to the project. Those that are already in the project are skipped");
-        given_.declare(*app, "The files and folders", Completes::NewPaths);
-        app->add_flag(
-            "-r,--recursive", isRecursive_,
-            "Also add the contents of folders, at any depth, except the data of source control and of "
-            "project stores, sockets, pipes and devices. Symbolic links are added but not followed");
-        app->add_flag("--gitignore", leavesOutIgnored_, "Leave out the contents of folders that git ignores")
-            ->needs("--recursive");
-        app->add_flag("--anew", addsAnew_,
-                      "Do not skip the given paths that are already in the project: add them again, without "
-                      "their labels. The folders above them keep theirs");
+        auto* const app = tool.add_subcommand("add");
+        given_.declare(*app, Completes::NewPaths);
+        app->add_flag("-r,--recursive", isRecursive_);
+        app->add_flag("--gitignore", leavesOutIgnored_)->needs("--recursive");
+        app->add_flag("--anew", addsAnew_);
         dryRun_.declare(*app);
         return app;
     }

@@ -26,13 +26,8 @@ using project::session::Query;
 class ListCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "list", "List the files and folders of the project: all of them, or those that meet all of the "
-                    "given conditions");
-        completes(
-            takeTexts(*app, "PATH", paths_,
-                      "List these paths and everything in the project below them (default: everything)"),
-            Completes::ProjectPaths);
+        auto* const app = tool.add_subcommand("list");
+        completes(takeTexts(*app, "PATH", paths_), Completes::ProjectPaths);
         declareConditions(*app);
         form_.declare(*app, true);
         return app;
@@ -60,21 +55,14 @@ public:
 
 private:
     void declareConditions(CLI::App& app) {
-        auto* const label = takeTexts(
-            app, "--label", labels_,
-            "CATEGORY or CATEGORY=LABEL, by name or UUID: only files that have this label, or any label "
-            "of the category; may be given several times");
+        auto* const label = takeTexts(app, "--label", labels_);
         completes(label, Completes::LabelChoices)->allow_extra_args(false);
-        auto* const noLabel =
-            takeTexts(app, "--no-label", absentLabels_,
-                      "The same: only files that do not have the label, or any label of the category");
+        auto* const noLabel = takeTexts(app, "--no-label", absentLabels_);
         completes(noLabel, Completes::LabelChoices)->allow_extra_args(false);
-        completes(takeText(app, "--kind", kind_, "Only entries of this kind: file or folder"),
-                  Completes::Kinds);
-        takeText(app, "--glob", glob_,
-                 "Only files whose path from the root matches: * and ? do not match a slash, ** does");
-        app.add_flag("--entry-points", isEntryPoint_, "Only files with an entry point");
-        app.add_flag("--unlabelled", isUnlabelled_, "Only files without any label");
+        completes(takeText(app, "--kind", kind_), Completes::Kinds);
+        takeText(app, "--glob", glob_);
+        app.add_flag("--entry-points", isEntryPoint_);
+        app.add_flag("--unlabelled", isUnlabelled_);
     }
 
     static std::vector<LabelChoice> choicesOf(std::vector<std::string> const& arguments, LabelNames& names) {

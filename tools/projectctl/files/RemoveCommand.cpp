@@ -20,10 +20,8 @@ namespace {
 class RemoveCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "remove", "Remove files, and folders with everything below them, from the project, together with "
-                      "their labels, data and entry points. The files stay on disk");
-        paths_.declare(*app, "The files and folders");
+        auto* const app = tool.add_subcommand("remove");
+        paths_.declare(*app);
         dryRun_.declare(*app);
         return app;
     }

@@ -14,8 +14,7 @@ std::unique_ptr<Command> makeCategoryCommand() {
     members.push_back(makeListCategoriesCommand());
     members.push_back(makeRenameCategoryCommand());
     members.push_back(makeDeleteCategoryCommand());
-    return std::make_unique<CommandGroup>("category", "Create, list, rename and delete categories of labels",
-                                          std::move(members));
+    return std::make_unique<CommandGroup>("category", std::move(members));
 }
 
 } // namespace projectctl

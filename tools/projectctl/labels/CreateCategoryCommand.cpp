@@ -14,13 +14,11 @@ namespace {
 class CreateCategoryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("create", "Create a category of labels");
-        takeText(*app, "NAME", name_, "The name of the category")->required();
-        app->add_flag("--read-only", isReadOnly_, "Do not allow it to be renamed or deleted");
-        app->add_flag("--single-valued", isSingleValued_, "Allow at most one label of it per file");
-        completes(takeText(*app, "--type", type_,
-                           "The type of the data that its labels have on a file (default: None)"),
-                  Completes::DataTypes);
+        auto* const app = group.add_subcommand("create");
+        takeText(*app, "NAME", name_)->required();
+        app->add_flag("--read-only", isReadOnly_);
+        app->add_flag("--single-valued", isSingleValued_);
+        completes(takeText(*app, "--type", type_), Completes::DataTypes);
         return app;
     }
 

@@ -18,13 +18,11 @@ using project::management::LabelReadOnlyState;
 class CreateLabelCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("create", "Create a label in a category");
-        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
-            ->required();
-        takeText(*app, "NAME", name_, "The name of the label")->required();
-        auto* const readOnly = app->add_flag("--read-only", isReadOnly_, "Do not allow it to be deleted");
-        app->add_flag("--writable", isWritable_, "Allow it to be deleted even if its category is read-only")
-            ->excludes(readOnly);
+        auto* const app = group.add_subcommand("create");
+        completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
+        takeText(*app, "NAME", name_)->required();
+        auto* const readOnly = app->add_flag("--read-only", isReadOnly_);
+        app->add_flag("--writable", isWritable_)->excludes(readOnly);
         return app;
     }
 

@@ -15,10 +15,8 @@ namespace {
 class DeleteCategoryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand(
-            "delete", "Delete a category with its labels, and remove the labels from all files");
-        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
-            ->required();
+        auto* const app = group.add_subcommand("delete");
+        completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
         return app;
     }
 

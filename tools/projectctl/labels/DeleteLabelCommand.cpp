@@ -15,10 +15,9 @@ namespace {
 class DeleteLabelCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("delete", "Delete a label, and remove it from all files");
-        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
-            ->required();
-        completes(takeText(*app, "LABEL", label_, "The label's name or UUID"), Completes::Labels)->required();
+        auto* const app = group.add_subcommand("delete");
+        completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
+        completes(takeText(*app, "LABEL", label_), Completes::Labels)->required();
         return app;
     }
 

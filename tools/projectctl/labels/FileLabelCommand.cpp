@@ -24,11 +24,10 @@ int FileLabelCommand::run(OpenProject& project) {
     return 0;
 }
 
-void FileLabelCommand::declareArguments(CLI::App& app, std::string const& use) {
-    completes(takeText(app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
-        ->required();
-    completes(takeText(app, "LABEL", label_, "The label's name or UUID"), Completes::Labels)->required();
-    paths_.declare(app, use);
+void FileLabelCommand::declareArguments(CLI::App& app) {
+    completes(takeText(app, "CATEGORY", category_), Completes::Categories)->required();
+    completes(takeText(app, "LABEL", label_), Completes::Labels)->required();
+    paths_.declare(app);
     dryRun_.declare(app);
 }
 

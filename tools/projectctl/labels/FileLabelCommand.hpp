@@ -21,8 +21,7 @@ protected:
     /// @param paths all of them in the project. @return the confirmation of the change.
     virtual std::string change(OpenProject& project, std::vector<Path> const& paths) const = 0;
 
-    /// @param use the description of the paths for the help text.
-    void declareArguments(CLI::App& app, std::string const& use);
+    void declareArguments(CLI::App& app);
 
     std::string const& category() const { return *category_; }
 

@@ -16,13 +16,9 @@ namespace {
 class FindLabelCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand(
-            "find", "List the files and folders that have a label: short for 'projectctl list --label'");
-        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
-            ->required();
-        completes(
-            takeText(*app, "LABEL", label_, "The label's name or UUID (default: any label of the category)"),
-            Completes::Labels);
+        auto* const app = group.add_subcommand("find");
+        completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
+        completes(takeText(*app, "LABEL", label_), Completes::Labels);
         form_.declare(*app, false);
         return app;
     }

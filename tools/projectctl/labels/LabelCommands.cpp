@@ -17,10 +17,7 @@ std::unique_ptr<Command> makeLabelCommand() {
     members.push_back(makeTakeLabelCommand());
     members.push_back(makeShowLabelsCommand());
     members.push_back(makeFindLabelCommand());
-    return std::make_unique<CommandGroup>(
-        "label",
-        "Create, list and delete labels; put them on files, remove them from files, and find labelled files",
-        std::move(members));
+    return std::make_unique<CommandGroup>("label", std::move(members));
 }
 
 } // namespace projectctl

@@ -17,8 +17,8 @@ using project::management::CategoryIdentifier;
 class ListCategoriesCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("list", "List the categories of the project by name");
-        app->add_flag("--json", isJson_, "Write a JSON array of objects, with the UUIDs");
+        auto* const app = group.add_subcommand("list");
+        app->add_flag("--json", isJson_);
         return app;
     }
 

@@ -21,11 +21,9 @@ using project::management::LabelReadOnlyState;
 class ListLabelsCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app =
-            group.add_subcommand("list", "List the labels of all categories, or of one category");
-        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"),
-                  Completes::Categories);
-        app->add_flag("--json", isJson_, "Write a JSON array of objects, with the UUIDs");
+        auto* const app = group.add_subcommand("list");
+        completes(takeText(*app, "CATEGORY", category_), Completes::Categories);
+        app->add_flag("--json", isJson_);
         return app;
     }
 

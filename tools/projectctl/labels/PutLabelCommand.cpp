@@ -14,11 +14,8 @@ namespace {
 class PutLabelCommand : public FileLabelCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand(
-            "put",
-            "Put a label on files and folders of the project, in one step. In a single-valued category "
-            "it replaces the label that was there");
-        declareArguments(*app, "The files and folders");
+        auto* const app = group.add_subcommand("put");
+        declareArguments(*app);
         return app;
     }
 

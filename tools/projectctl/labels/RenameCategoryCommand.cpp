@@ -19,10 +19,9 @@ using project::management::CategoryIdentifier;
 class RenameCategoryCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("rename", "Rename a category");
-        completes(takeText(*app, "CATEGORY", category_, "The category's name or UUID"), Completes::Categories)
-            ->required();
-        takeText(*app, "NAME", name_, "The new name")->required();
+        auto* const app = group.add_subcommand("rename");
+        completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
+        takeText(*app, "NAME", name_)->required();
         return app;
     }
 

@@ -21,9 +21,9 @@ using project::management::FileLabel;
 class ShowLabelsCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("show", "Show the labels of files and folders of the project");
-        paths_.declare(*app, "The files and folders");
-        app->add_flag("--json", isJson_, "Write a JSON array of objects, one per label, with the UUIDs");
+        auto* const app = group.add_subcommand("show");
+        paths_.declare(*app);
+        app->add_flag("--json", isJson_);
         return app;
     }
 

@@ -15,10 +15,8 @@ namespace {
 class TakeLabelCommand : public FileLabelCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand(
-            "take", "Remove a label from files and folders of the project, in one step. A label that was "
-                    "deleted but is still on files can be removed by its UUIDs");
-        declareArguments(*app, "The files and folders");
+        auto* const app = group.add_subcommand("take");
+        declareArguments(*app);
         return app;
     }
 

@@ -24,14 +24,11 @@ namespace {
 class MergeCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "merge",
-            "Merge two versions of a project's text; git calls this after 'projectctl setup'. Exits with 1 "
-            "if there is a conflict, which is marked in the result, and with 129 if it fails");
-        takeText(*app, "BASE", base_, "The common ancestor; an empty file if there is none")->required();
-        takeText(*app, "OURS", ours_, "One version; replaced by the result")->required();
-        takeText(*app, "THEIRS", theirs_, "The other version")->required();
-        takeText(*app, "PATH", path_, "The name of the text in messages");
+        auto* const app = tool.add_subcommand("merge");
+        takeText(*app, "BASE", base_)->required();
+        takeText(*app, "OURS", ours_)->required();
+        takeText(*app, "THEIRS", theirs_)->required();
+        takeText(*app, "PATH", path_);
         return app;
     }
 

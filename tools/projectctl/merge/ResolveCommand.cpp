@@ -29,13 +29,9 @@ constexpr char const* textInRoot = "./.projectdata/project.jsonl";
 class ResolveCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "resolve",
-            "Resolve the conflicts that a merge has left in the project's text, and stage the result; on a "
-            "terminal, asks which side to take for each conflict");
-        auto* const ours = app->add_flag("--ours", ours_, "Resolve all conflicts in favour of this branch");
-        app->add_flag("--theirs", theirs_, "Resolve all conflicts in favour of the other branch")
-            ->excludes(ours);
+        auto* const app = tool.add_subcommand("resolve");
+        auto* const ours = app->add_flag("--ours", ours_);
+        app->add_flag("--theirs", theirs_)->excludes(ours);
         return app;
     }
 

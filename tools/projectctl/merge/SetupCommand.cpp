@@ -13,11 +13,7 @@ namespace {
 /// Configures a clone of a repository to merge the project's text with this tool.
 class SetupCommand : public Command {
 public:
-    CLI::App* declare(CLI::App& tool) override {
-        return tool.add_subcommand("setup",
-                                   "Configure the git repository to merge the project's text with this tool; "
-                                   "do this once in each clone, and after the tool was moved");
-    }
+    CLI::App* declare(CLI::App& tool) override { return tool.add_subcommand("setup"); }
 
     int run() override {
         auto const root = findProjectRoot(workingFolder());

@@ -24,11 +24,9 @@ void writeJson(FileList const& files, Query const& query) {
 } // namespace
 
 void FoundFiles::declare(CLI::App& app, bool hasTree) {
-    auto* const tree =
-        hasTree ? app.add_flag("--tree", isTree_, "Write a tree, with a slash after each folder") : nullptr;
-    auto* const json =
-        app.add_flag("--json", isJson_, "Write a JSON array of objects with \"path\" and \"kind\"");
-    auto* const null = app.add_flag("-0,--null", isNullEnded_, "End each path with a zero byte");
+    auto* const tree = hasTree ? app.add_flag("--tree", isTree_) : nullptr;
+    auto* const json = app.add_flag("--json", isJson_);
+    auto* const null = app.add_flag("-0,--null", isNullEnded_);
     json->excludes(null);
     if (hasTree) {
         tree->excludes(json)->excludes(null);

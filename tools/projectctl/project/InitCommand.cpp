@@ -23,13 +23,10 @@ namespace {
 class InitCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand("init", "Create a project in a folder");
-        completes(takeText(*app, "FOLDER", folder_, "The root folder; by default the current folder"),
-                  Completes::Folders);
-        takeText(*app, "--name", name_, "The name of the project; by default the name of the folder");
-        auto* const store =
-            takeText(*app, "--store", store_,
-                     "Let the server of this service store the project, for a team that shares it");
+        auto* const app = tool.add_subcommand("init");
+        completes(takeText(*app, "FOLDER", folder_), Completes::Folders);
+        takeText(*app, "--name", name_);
+        auto* const store = takeText(*app, "--store", store_);
         takeRoles(*app, *store, reader_, writer_);
         return app;
     }

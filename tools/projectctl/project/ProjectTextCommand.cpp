@@ -24,9 +24,8 @@ public:
         : name_(std::move(name)), get_(get), set_(set) {}
 
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(name_, "Show or set the project's " + name_);
-        takeText(*app, "TEXT", text_,
-                 "The new " + name_ + "; without it, the current " + name_ + " is shown");
+        auto* const app = tool.add_subcommand(name_);
+        takeText(*app, "TEXT", text_);
         return app;
     }
 

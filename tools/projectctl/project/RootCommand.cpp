@@ -10,11 +10,7 @@ namespace {
 /// Prints the root of the project. It does not open the project: scripts also need the root of a damaged one.
 class RootCommand : public Command {
 public:
-    CLI::App* declare(CLI::App& tool) override {
-        return tool.add_subcommand("root",
-                                   "Print the project's root: the nearest folder above the current one "
-                                   "that contains a project");
-    }
+    CLI::App* declare(CLI::App& tool) override { return tool.add_subcommand("root"); }
 
     int run() override {
         output().name(findProjectRoot(workingFolder()).native());

@@ -7,13 +7,8 @@ namespace projectctl {
 
 void takeRoles(CLI::App& app, CLI::Option& service, std::optional<std::string>& reader,
                std::optional<std::string>& writer) {
-    takeText(
-        app, "--reader", reader,
-        "The role whose members may read the shared project; created if it does not exist. By default it "
-        "has the project's name with _reader")
-        ->needs(&service);
-    takeText(app, "--writer", writer, "The role whose members may change it; by default with _writer")
-        ->needs(&service);
+    takeText(app, "--reader", reader)->needs(&service);
+    takeText(app, "--writer", writer)->needs(&service);
 }
 
 project::session::SharedStore sharedStore(std::string const& service, std::u16string const& name,

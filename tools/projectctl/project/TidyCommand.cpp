@@ -9,10 +9,7 @@ namespace {
 /// Rewrites the text in its canonical form, so that a commit contains only real changes.
 class TidyCommand : public ProjectCommand {
 public:
-    CLI::App* declare(CLI::App& tool) override {
-        return tool.add_subcommand(
-            "tidy", "Rewrite the project's text in its canonical form; do this before you commit it");
-    }
+    CLI::App* declare(CLI::App& tool) override { return tool.add_subcommand("tidy"); }
 
     int run(OpenProject& project) override {
         project.shield().raise();

@@ -22,13 +22,10 @@ public:
     explicit AddReferencesCommand(ReferenceList const& list) : list_(list) {}
 
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("add", "Add folders to " + list_.name);
-        completes(takeTexts(*app, "FOLDER", arguments_, "The folders, inside or outside the project"),
-                  Completes::Folders)
-            ->required();
+        auto* const app = group.add_subcommand("add");
+        completes(takeTexts(*app, "FOLDER", arguments_), Completes::Folders)->required();
         if (list_.isOfProjects) {
-            app->add_flag("--absolute", isAbsolute_,
-                          "Store the absolute path instead of the path relative to the root");
+            app->add_flag("--absolute", isAbsolute_);
         }
         return app;
     }

@@ -22,12 +22,9 @@ public:
     explicit ListReferencesCommand(ReferenceList const& list) : list_(list) {}
 
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("list", "List the folders of " + list_.name);
-        auto* const json =
-            app->add_flag("--json", isJson_,
-                          "Write a JSON array of objects with the stored path, the folder that "
-                          "it leads to on this machine, and the UUID");
-        app->add_flag("-0,--null", isNullEnded_, "End each path with a zero byte")->excludes(json);
+        auto* const app = group.add_subcommand("list");
+        auto* const json = app->add_flag("--json", isJson_);
+        app->add_flag("-0,--null", isNullEnded_)->excludes(json);
         return app;
     }
 

@@ -11,24 +11,22 @@ namespace projectctl {
 
 namespace {
 
-std::unique_ptr<Command> makeListCommands(std::string const& name, std::string const& description,
-                                          ReferenceList const& list) {
+std::unique_ptr<Command> makeListCommands(std::string const& name, ReferenceList const& list) {
     std::vector<std::unique_ptr<Command>> members;
     members.push_back(makeAddReferencesCommand(list));
     members.push_back(makeListReferencesCommand(list));
     members.push_back(makeRemoveReferencesCommand(list));
-    return std::make_unique<CommandGroup>(name, description, std::move(members));
+    return std::make_unique<CommandGroup>(name, std::move(members));
 }
 
 } // namespace
 
 std::unique_ptr<Command> makePathCommand() {
-    return makeListCommands("path", "Add, list and remove the folders of the project path", projectPath());
+    return makeListCommands("path", projectPath());
 }
 
 std::unique_ptr<Command> makeReferenceCommand() {
-    return makeListCommands("reference", "Add, list and remove references to other projects",
-                            projectReferences());
+    return makeListCommands("reference", projectReferences());
 }
 
 } // namespace projectctl

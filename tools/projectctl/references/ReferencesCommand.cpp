@@ -14,14 +14,10 @@ namespace {
 class ReferencesCommand : public Command {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "references",
-            "Follow the references to other projects. Exits with 3 if a project is missing or unreadable, or "
-            "if projects reference each other in a cycle");
-        app->add_flag("--graph", isGraph_, "Show all projects that are reached, with their references")
-            ->required();
-        auto* const json = app->add_flag("--json", isJson_, "Write a JSON object instead of a tree");
-        app->add_flag("--dot", isDot_, "Write text for Graphviz instead of a tree")->excludes(json);
+        auto* const app = tool.add_subcommand("references");
+        app->add_flag("--graph", isGraph_)->required();
+        auto* const json = app->add_flag("--json", isJson_);
+        app->add_flag("--dot", isDot_)->excludes(json);
         return app;
     }
 

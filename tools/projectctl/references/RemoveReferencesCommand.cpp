@@ -27,11 +27,9 @@ public:
     explicit RemoveReferencesCommand(ReferenceList const& list) : list_(list) {}
 
     CLI::App* declare(CLI::App& group) override {
-        auto* const app = group.add_subcommand("remove", "Remove folders from " + list_.name);
-        completes(
-            takeTexts(*app, "FOLDER", arguments_,
-                      "A folder, a path in the form in which 'list' shows it, or the UUID of one entry"),
-            list_.isOfProjects ? Completes::References : Completes::PathFolders)
+        auto* const app = group.add_subcommand("remove");
+        completes(takeTexts(*app, "FOLDER", arguments_),
+                  list_.isOfProjects ? Completes::References : Completes::PathFolders)
             ->required();
         return app;
     }

@@ -81,12 +81,8 @@ private:
 class CopyCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "copy",
-            "Copy the project's definition from its text to a server, or from the server to a text, and use "
-            "the copy from now on; the file that led to the old store is set aside with the ending .old");
-        auto* const to = takeText(*app, "--to", target_,
-                                  "The service of the server that is to store the project; or \"text\"");
+        auto* const app = tool.add_subcommand("copy");
+        auto* const to = takeText(*app, "--to", target_);
         to->required();
         takeRoles(*app, *to, reader_, writer_);
         return app;

@@ -17,9 +17,7 @@ std::unique_ptr<Command> makeSharedCommand() {
     members.push_back(makeSharedTidyCommand());
     members.push_back(makeSharedLogCommand());
     members.push_back(makeSharedRolesCommand());
-    return std::make_unique<CommandGroup>(
-        "shared", "Show and tidy the log of a project that a server stores, and show who has access to it",
-        std::move(members));
+    return std::make_unique<CommandGroup>("shared", std::move(members));
 }
 
 project::stores::JournalBackend& requireLog(OpenProject& project) {

@@ -20,13 +20,9 @@ using project::stores::JournalRecord;
 class ShowLogCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "log",
-            "Show the entries of the log, the newest first: version, time, author, host, and its kind");
-        app->add_option("--count", count_, "The number of entries; by default 20")
-            ->check(CLI::Range(1, most));
-        app->add_flag("--lines", showsLines_,
-                      "Show also the lines that each entry has added to the definition, as in a text");
+        auto* const app = tool.add_subcommand("log");
+        app->add_option("--count", count_)->check(CLI::Range(1, most));
+        app->add_flag("--lines", showsLines_);
         return app;
     }
 

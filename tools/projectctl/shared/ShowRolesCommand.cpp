@@ -19,11 +19,7 @@ using project::stores::TextBackend;
 /// Shows the roles of the project, and the users that have them.
 class ShowRolesCommand : public ProjectCommand {
 public:
-    CLI::App* declare(CLI::App& tool) override {
-        return tool.add_subcommand("roles",
-                                   "Show the roles whose members read and write the project, with the users "
-                                   "that have them");
-    }
+    CLI::App* declare(CLI::App& tool) override { return tool.add_subcommand("roles"); }
 
     int run(OpenProject& project) override {
         requireLog(project);

@@ -15,11 +15,7 @@ using project::stores::HistoryLoss;
 /// Shows the state of the log, and takes note of a loss of history.
 class StatusOfLogCommand : public ProjectCommand {
 public:
-    CLI::App* declare(CLI::App& tool) override {
-        return tool.add_subcommand(
-            "status", "Show the newest version, its author and the size of the log; accept a reset of "
-                      "the server to an earlier state, after which changes are possible again");
-    }
+    CLI::App* declare(CLI::App& tool) override { return tool.add_subcommand("status"); }
 
     int run(OpenProject& project) override {
         auto& log = requireLog(project);

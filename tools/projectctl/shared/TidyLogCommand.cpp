@@ -16,14 +16,8 @@ using project::stores::Journal;
 class TidyLogCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand(
-            "tidy",
-            "Append a body to the log, so that new clients read no tail; with --keep, delete older entries");
-        app->add_option(
-               "--keep", days_,
-               "Delete entries that are older than this many days, as far as a body after them contains "
-               "the definition; only the owner of the project may do that")
-            ->check(CLI::Range(0, mostDays));
+        auto* const app = tool.add_subcommand("tidy");
+        app->add_option("--keep", days_)->check(CLI::Range(0, mostDays));
         return app;
     }
 

@@ -25,9 +25,8 @@ constexpr auto pauseAfterError = std::chrono::seconds(1);
 class WatchCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
-        auto* const app = tool.add_subcommand("watch", "Print the changes that other programs make to the "
-                                                       "project, one line per event, until interrupted");
-        app->add_flag("--json", json_, "Print each event as a JSON object with \"event\" and its data");
+        auto* const app = tool.add_subcommand("watch");
+        app->add_flag("--json", json_);
         return app;
     }
 

@@ -1,0 +1,71 @@
+#include "cli/Nearest.hpp"
+#include "tools/ToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+using ::testing::Not;
+
+class UsageProblem : public ToolTest {};
+
+TEST_F(UsageProblem, namesTheVerbThatWasProbablyMeant) {
+    EXPECT_THAT(tool({"lsit"}), FailsWith(2, "unknown command or option \"lsit\". Did you mean \"list\"?"));
+    EXPECT_THAT(tool({"lable", "list"}), FailsWith(2, "\"lable\". Did you mean \"label\"?"));
+    EXPECT_THAT(tool({"label", "lst"}),
+                FailsWith(2, "\"lst\". Did you mean \"list\"? ('projectctl label --help'"));
+    EXPECT_THAT(tool({"put", "a"}), FailsWith(2, "\"put\". Did you mean \"label put\"?"));
+    EXPECT_THAT(tool({"frobnicate"}), FailsWith(2, "unknown command or option \"frobnicate\" ("));
+}
+
+TEST_F(UsageProblem, namesTheOptionThatWasProbablyMeant) {
+    EXPECT_THAT(tool({"list", "--tre"}), FailsWith(2, "unknown option \"--tre\". Did you mean \"--tree\"?"));
+    EXPECT_THAT(tool({"list", "--jsn=1"}), FailsWith(2, "Did you mean \"--json\"?"));
+    EXPECT_THAT(tool({"list", "--fullname"}), FailsWith(2, "Did you mean \"--full-name\"?"));
+    EXPECT_THAT(tool({"list", "--zzzz"}), FailsWith(2, "unknown option \"--zzzz\" ("));
+}
+
+TEST_F(UsageProblem, abbreviationsAreNotVerbs) {
+    initProject();
+    EXPECT_THAT(tool({"desc"}), FailsWith(2, "\"desc\". Did you mean \"description\"?"));
+    EXPECT_THAT(tool({"li"}), FailsWith(2, "\"li\". Did you mean \"list\"?"));
+    EXPECT_THAT(tool({"list", "--tr"}), FailsWith(2, "\"--tr\". Did you mean \"--tree\"?"));
+}
+
+TEST_F(UsageProblem, isInGermanToo) {
+    settings_.environment["LANG"] = "de";
+
+    EXPECT_THAT(tool({"lsit"}),
+                FailsWith(2, "unbekannter Befehl oder unbekannte Option „lsit“. Meinten Sie „list“?"));
+    EXPECT_THAT(tool({"list", "a", "b"}),
+                FailsWith(2, "überzähliges Argument „b“ („projectctl list --help“ zeigt"));
+    EXPECT_THAT(tool({"list", "--tree", "--json"}), FailsWith(2, "--tree schließt --json aus"));
+    EXPECT_THAT(tool({"remove"}), FailsWith(2, "PATH fehlt"));
+    EXPECT_THAT(tool({"init", "--name"}), FailsWith(2, "--name braucht einen Wert"));
+    EXPECT_THAT(tool({"add", "--gitignore", "."}), FailsWith(2, "--gitignore erfordert --recursive"));
+    EXPECT_THAT(tool({}), FailsWith(2, "ein Befehl fehlt"));
+}
+
+using projectctl::nearest;
+
+TEST(Nearest, findsTheNameWithTheFewestChanges) {
+    std::vector<std::string> const names{"Startup", "Shutdown", "Basic"};
+
+    EXPECT_EQ(nearest("Startp", names), "Startup");
+    EXPECT_EQ(nearest("tSartup", names), "Startup");
+    EXPECT_EQ(nearest("shutdown", names), "Shutdown");
+    EXPECT_EQ(nearest("Bas", names), "Basic");
+    EXPECT_EQ(nearest("Other", names), std::nullopt);
+    EXPECT_EQ(nearest("", names), std::nullopt);
+    EXPECT_EQ(nearest("x", {}), std::nullopt);
+}
+
+TEST(Nearest, countsCharactersInsteadOfBytes) {
+    EXPECT_EQ(nearest("Prufung", {"Prüfung"}), "Prüfung");
+}
+
+TEST(Nearest, doesNotCompareVeryLongTexts) {
+    EXPECT_EQ(nearest(std::string(100000, 'a'), {std::string(100000, 'b')}), std::nullopt);
+}
+
+} // namespace
+} // namespace project::test

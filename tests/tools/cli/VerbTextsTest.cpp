@@ -1,0 +1,97 @@
+#include <map>
+#include <regex>
+#include <set>
+
+#include "Verbs.hpp"
+#include "cli/DeclaredTool.hpp"
+#include "cli/VerbDescription.hpp"
+#include "support/GlobalLocale.hpp"
+#include "tools/ToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+using projectctl::VerbDescription;
+using ::testing::IsEmpty;
+using ::testing::Not;
+
+/// The texts of a source of a catalog by their keys. Each text is on one line.
+std::map<std::string, std::string> readTexts(std::string const& catalog, std::string const& language) {
+    std::ifstream file(std::filesystem::path(PROJECTCTL_TEXTS) / catalog / (language + ".txt"));
+    static std::regex const entry(R"re(^    (?:"([^"]+)"|(\w+)) \{ "(.*)" \}$)re");
+    std::map<std::string, std::string> result;
+    int lines = 0;
+    for (std::string line; std::getline(file, line);) {
+        std::smatch found;
+        if (std::regex_match(line, found, entry)) {
+            EXPECT_TRUE(result.emplace(found[1].str() + found[2].str(), found[3]).second) << line;
+        }
+        lines += line.starts_with("    ") && !line.starts_with("    //") ? 1 : 0;
+    }
+    EXPECT_EQ(lines, static_cast<int>(result.size())) << catalog << ' ' << language;
+    return result;
+}
+
+std::set<std::string> argumentsOf(std::string const& text) {
+    static std::regex const argument(R"(\{(\d+))");
+    return {std::sregex_token_iterator(text.begin(), text.end(), argument, 1), std::sregex_token_iterator()};
+}
+
+class Catalogs : public ::testing::TestWithParam<char const*> {};
+
+TEST_P(Catalogs, haveTheSameTextsWithTheSameArgumentsInBothLanguages) {
+    auto const english = readTexts(GetParam(), "root");
+    auto german = readTexts(GetParam(), "de");
+    EXPECT_GT(english.size(), 30U);
+
+    for (auto const& [key, text] : english) {
+        if (key.ends_with(": example")) { // a call is the same in both languages
+            EXPECT_FALSE(german.contains(key)) << key;
+        } else {
+            ASSERT_TRUE(german.contains(key)) << key;
+            EXPECT_EQ(argumentsOf(german[key]), argumentsOf(text)) << key;
+            EXPECT_FALSE(german[key].empty()) << key;
+            german.erase(key);
+        }
+    }
+    EXPECT_THAT(german, IsEmpty());
+}
+
+INSTANTIATE_TEST_SUITE_P(OfTheTool, Catalogs, ::testing::Values("verbs", "messages"));
+
+/// The descriptions of a verb and its members, one after the other.
+std::vector<VerbDescription> flattened(VerbDescription const& verb) {
+    std::vector<VerbDescription> result{verb};
+    for (auto const& member : verb.members) {
+        auto const below = flattened(member);
+        result.insert(result.end(), below.begin(), below.end());
+    }
+    return result;
+}
+
+TEST(VerbTexts, describeEachVerbOptionAndArgumentInBothLanguages) {
+    projectctl::DeclaredTool tool(projectctl::verbs());
+    auto const english = flattened(projectctl::describe(tool.parser()));
+    GlobalLocale const locale("de");
+    auto const german = flattened(projectctl::describe(tool.parser()));
+
+    ASSERT_EQ(english.size(), german.size());
+    for (std::size_t i = 0; i < english.size(); ++i) {
+        EXPECT_THAT(english[i].summary, Not(IsEmpty())) << english[i].name;
+        EXPECT_NE(english[i].summary, german[i].summary) << english[i].name;
+        EXPECT_FALSE(english[i].summary.ends_with('.')) << english[i].summary;
+        for (auto const list : {&VerbDescription::options, &VerbDescription::arguments}) {
+            auto const& options = english[i].*list;
+            ASSERT_EQ(options.size(), (german[i].*list).size());
+            for (std::size_t j = 0; j < options.size(); ++j) {
+                EXPECT_THAT(options[j].text, Not(IsEmpty()))
+                    << english[i].name << ' ' << options[j].names.back();
+                EXPECT_NE(options[j].text, (german[i].*list)[j].text)
+                    << english[i].name << ' ' << options[j].names.back();
+            }
+        }
+    }
+}
+
+} // namespace
+} // namespace project::test

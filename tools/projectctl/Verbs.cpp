@@ -1,0 +1,58 @@
+#include "Verbs.hpp"
+
+#include "batch/Commands.hpp"
+#include "checks/Commands.hpp"
+#include "cli/HelpCommand.hpp"
+#include "completion/Commands.hpp"
+#include "entrypoints/Commands.hpp"
+#include "files/Commands.hpp"
+#include "labels/Commands.hpp"
+#include "merge/Commands.hpp"
+#include "project/Commands.hpp"
+#include "references/Commands.hpp"
+#include "shared/Commands.hpp"
+#include "watch/Commands.hpp"
+
+namespace projectctl {
+
+CommandList const& verbs() {
+    static CommandList const result{
+        {"init", "PurposeProject", makeInitCommand},
+        {"root", "PurposeProject", makeRootCommand},
+        {"name", "PurposeProject", makeNameCommand},
+        {"description", "PurposeProject", makeDescriptionCommand},
+
+        {"add", "PurposeFiles", makeAddCommand},
+        {"remove", "PurposeFiles", makeRemoveCommand},
+        {"list", "PurposeFiles", makeListCommand},
+        {"status", "PurposeFiles", makeStatusCommand},
+
+        {"category", "PurposeLabels", makeCategoryCommand},
+        {"label", "PurposeLabels", makeLabelCommand},
+
+        {"entry", "PurposeEntryPoints", makeEntryCommand},
+        {"group", "PurposeEntryPoints", makeGroupCommand},
+
+        {"path", "PurposeReferences", makePathCommand},
+        {"reference", "PurposeReferences", makeReferenceCommand},
+        {"references", "PurposeReferences", makeReferencesCommand},
+
+        {"check", "PurposeText", makeCheckCommand},
+        {"tidy", "PurposeText", makeTidyCommand},
+        {"setup", "PurposeText", makeSetupCommand},
+        {"merge", "PurposeText", makeMergeCommand},
+        {"resolve", "PurposeText", makeResolveCommand},
+
+        {"copy", "PurposeShared", makeCopyCommand},
+        {"shared", "PurposeShared", makeSharedCommand},
+
+        {"batch", "PurposeScripts", [] { return makeBatchCommand(verbs()); }},
+        {"watch", "PurposeScripts", makeWatchCommand},
+
+        {"help", "PurposeHelp", [] { return makeHelpCommand(verbs()); }},
+        {completeCommandName, hiddenPurpose, [] { return makeCompleteCommand(verbs()); }},
+    };
+    return result;
+}
+
+} // namespace projectctl
