@@ -44,7 +44,7 @@ TEST_F(CommandLine, refusesAnUnknownOption) {
 }
 
 TEST_F(CommandLine, refusesWrongArgumentsOutsideAProjectToo) {
-    EXPECT_THAT(tool({"list", "a", "b"}), FailsWith(2, "projectctl list --help"));
+    EXPECT_THAT(tool({"name", "a", "b"}), FailsWith(2, "projectctl name --help"));
 }
 
 TEST_F(CommandLine, acceptsNamesThatLookLikeOptionsOrLists) {
