@@ -31,10 +31,7 @@ MetadataPath const& entryPointsHead() {
 }
 
 MetadataPath entryPointPath(std::u16string const& uuid) {
-    return MetadataPathBuilder()
-        .add(entryPointsHead())
-        .add(schema::entrypoints::entryPointType, uuid)
-        .build();
+    return entryPointsHead().child(metadata::PathElement(schema::entrypoints::entryPointType, uuid));
 }
 
 std::unique_ptr<EntryPointGroup>
@@ -151,7 +148,7 @@ std::u16string EntryPointManagerBase::findUUIDForFile(Path const& file) const {
     for (auto const& path : getEntryPointNodes()) {
         auto const node = metadataManager_->getNode(path);
         if (node && node->get(schema::entrypoints::fileKey) == stored) {
-            return path.getLeaf().getLocation();
+            return path.leaf().getLocation();
         }
     }
     return {};
@@ -183,7 +180,7 @@ std::unique_ptr<EntryPoint> EntryPointManagerBase::readEntryPoint(MetadataPath c
     }
     return std::make_unique<EntryPointBase>(
         std::move(file), getFromName(node->get(schema::entrypoints::typeKey)),
-        node->get(schema::entrypoints::nameKey), path.getLeaf().getLocation(),
+        node->get(schema::entrypoints::nameKey), path.leaf().getLocation(),
         node->get(schema::entrypoints::visibleKey) != schema::entrypoints::hidden,
         findGroup(groups, node->get(schema::entrypoints::groupUUIDKey)), readExtensionData(*node));
 }

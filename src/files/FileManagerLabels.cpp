@@ -195,7 +195,9 @@ std::vector<FileLabel> FileManagerBase::getLabels(Path const& path) {
     std::vector<FileLabel> result;
     auto const dataNode = getLabelDataNode(path);
     auto const& records = dataNode->getChildren();
-    for (auto const& pair : getLabelIDSets(path)) {
+    auto const pairs = getLabelIDSets(path);
+    result.reserve(pairs.size());
+    for (auto const& pair : pairs) {
         CategoryIdentifier const category = labelManager_->getCategoryByUUID(pair.getCategoryUUID());
         LabelIdentifier const label = labelManager_->getLabelByUUID(category, pair.getLabelUUID());
         auto const record = std::ranges::find_if(records, [&](auto const& candidate) {

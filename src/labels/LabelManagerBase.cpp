@@ -18,6 +18,7 @@ using metadata::MetadataNode;
 using metadata::MetadataNodeSpecification;
 using metadata::MetadataPath;
 using metadata::MetadataPathBuilder;
+using metadata::PathElement;
 using ZEPHRA::project::management::CanNotModifyReadOnlyCategory;
 using ZEPHRA::project::management::CanNotModifyReadOnlyLabel;
 using ZEPHRA::project::management::CategoryDoesNotExist;
@@ -35,18 +36,19 @@ MetadataPath const& getCategoriesPath() {
 }
 
 MetadataPath getCategoryPath(std::u16string const& uuid) {
-    return MetadataPathBuilder().add(getCategoriesPath()).add(schema::categories::categoryType, uuid).build();
+    return getCategoriesPath().child(PathElement(schema::categories::categoryType, uuid));
+}
+
+MetadataPath getLabelPath(MetadataPath const& category, std::u16string const& labelUUID) {
+    return category.child(PathElement(schema::categories::labelType, labelUUID));
 }
 
 MetadataPath getLabelPath(CategoryIdentifier const& category, std::u16string const& labelUUID) {
-    return MetadataPathBuilder()
-        .add(getCategoryPath(category.getUUID()))
-        .add(schema::categories::labelType, labelUUID)
-        .build();
+    return getLabelPath(getCategoryPath(category.getUUID()), labelUUID);
 }
 
 bool isLabelPath(MetadataPath const& path) {
-    return path.getLeaf().getType() == schema::categories::labelType;
+    return path.leaf().getType() == schema::categories::labelType;
 }
 
 std::u16string boolToFlag(bool value) {
@@ -154,8 +156,7 @@ std::vector<LabelIdentifier> LabelManagerBase::getLabels(CategoryIdentifier cons
 
 LabelIdentifier LabelManagerBase::getLabelByUUID(CategoryIdentifier const& category, std::u16string uuid) {
     auto const guard = metadataManager_->acquireReadLock();
-    requireCategoryPath(category);
-    MetadataPath const path = getLabelPath(category, uuid);
+    MetadataPath const path = getLabelPath(requireCategoryPath(category), uuid);
     if (!metadataManager_->pathExists(path)) {
         exception::raise(LabelDoesNotExistsByUUID(uuid));
     }
@@ -170,12 +171,12 @@ void LabelManagerBase::deleteLabel(CategoryIdentifier const& category, LabelIden
 }
 
 bool LabelManagerBase::isCategoryPath(MetadataPath const& path) {
-    return path.getLeaf().getType() == schema::categories::categoryType && metadataManager_->hasNode(path);
+    return path.leaf().getType() == schema::categories::categoryType && metadataManager_->hasNode(path);
 }
 
 CategoryIdentifier LabelManagerBase::readCategory(MetadataPath const& path) {
     auto const node = metadataManager_->getNode(path);
-    CategoryDefinition category(node->get(schema::categories::categoryNameKey), path.getLeaf().getLocation());
+    CategoryDefinition category(node->get(schema::categories::categoryNameKey), path.leaf().getLocation());
     category.setIsReadOnly(node->get(schema::categories::categoryReadOnlyKey) == schema::categories::flagTrue)
         .setIsSingleValued(node->get(schema::categories::categorySingleValuedKey) ==
                            schema::categories::flagTrue)
@@ -190,7 +191,7 @@ LabelIdentifier LabelManagerBase::readLabel(MetadataPath const& path) {
         // one.
         node = std::make_unique<MetadataNodeSpecification>(schema::nodeType);
     }
-    LabelDefinition label(node->get(schema::categories::labelNameKey), path.getLeaf().getLocation());
+    LabelDefinition label(node->get(schema::categories::labelNameKey), path.leaf().getLocation());
     label.setIsReadOnly(getLabelStateFromName(node->get(schema::categories::labelReadOnlyKey)));
     return label;
 }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <cstdint>
 #include <cstring>
 #include <optional>
 #include <string>
@@ -57,10 +58,12 @@ bool hasRepeatedSeparators(Text names) {
     constexpr std::size_t block = 8;
     std::size_t first = 0;
     for (; first + block < names.size(); first += block) {
-        unsigned isRepeated = 0;
-        for (std::size_t i = first; i < first + block; ++i) {
-            isRepeated |= static_cast<unsigned>(names[i] == separator) &
-                          static_cast<unsigned>(names[i + 1] == separator);
+        auto const* const unit = names.data() + first;
+        std::uint16_t isRepeated = 0; // as wide as a code unit
+        for (std::size_t i = 0; i < block; ++i) {
+            auto const differences =
+                static_cast<std::uint16_t>((unit[i] ^ separator) | (unit[i + 1] ^ separator));
+            isRepeated |= static_cast<std::uint16_t>(differences == 0);
         }
         if (isRepeated != 0) {
             return true;

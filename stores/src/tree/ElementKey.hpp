@@ -1,6 +1,7 @@
 #pragma once
 
 #include <compare>
+#include <cstring>
 #include <optional>
 #include <string_view>
 
@@ -20,7 +21,7 @@ public:
     std::u16string_view location() const noexcept { return name_.text(); }
 
     bool isEqual(TypeTable::Index type, StoredName const& name) const noexcept {
-        return name_.isEqual(name) && std::is_eq(compareTypes(type));
+        return name_.isEqual(name) && (compared_ == type ? std::is_eq(order_) : hasText(types_[type]));
     }
 
     /// The order of this element and an entry: by type, then by location, each by code units.
@@ -30,6 +31,12 @@ public:
     }
 
 private:
+    /// The same as ==, which compares one code unit after the other.
+    bool hasText(std::u16string_view type) const noexcept {
+        return type.size() == type_.size() &&
+               std::memcmp(type.data(), type_.data(), type.size() * sizeof(char16_t)) == 0;
+    }
+
     /// Most comparisons of a search are with the same type.
     std::strong_ordering compareTypes(TypeTable::Index type) const noexcept {
         if (compared_ != type) {

@@ -22,6 +22,10 @@ Level::Found Level::findNear(ElementKey const& key, Position hint) const noexcep
     if (isEqual(key, hint)) {
         return {hint, true};
     }
+    // Before the order, which costs more: queries often proceed to the next entry.
+    if (hasNext(hint) && isEqual(key, next(hint))) {
+        return {next(hint), true};
+    }
     auto const order = compare(key, hint);
     bool const isAfter = std::is_gt(order);
     bool const isOutmost = isAfter ? !hasNext(hint) : hint.chunk == 0 && hint.entry == 0;

@@ -11,11 +11,6 @@ void LevelDeleter::operator()(Level* level) const noexcept {
     std::pmr::polymorphic_allocator<Level>(level->memory()).delete_object(level);
 }
 
-Level* LevelBelow::unloadedMark() noexcept {
-    static Level mark(std::pmr::null_memory_resource());
-    return &mark;
-}
-
 LevelBelow LevelBelow::unloaded() noexcept {
     LevelBelow result;
     result.level_.store(unloadedMark(), std::memory_order_relaxed);

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <atomic>
+#include <cstddef>
 #include <memory>
 
 namespace project::stores {
@@ -42,8 +43,12 @@ public:
     void set(LevelPointer level) noexcept;
 
 private:
-    static Level* unloadedMark() noexcept;
+    /// An address that no level has. It is never dereferenced.
+    static Level* unloadedMark() noexcept { return reinterpret_cast<Level*>(&unloadedMark_); }
+
     Level* take() noexcept;
+
+    inline static std::max_align_t unloadedMark_{};
 
     std::atomic<Level*> level_ = nullptr;
 };

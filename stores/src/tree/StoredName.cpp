@@ -1,6 +1,7 @@
 #include "tree/StoredName.hpp"
 
 #include <algorithm>
+#include <array>
 #include <cstring>
 
 namespace project::stores {
@@ -38,6 +39,24 @@ void copyNarrow(std::u16string_view text, char* out) noexcept {
     for (; unit != end; ++unit, ++out) {
         *out = static_cast<char>(*unit);
     }
+}
+
+/// Compares texts of the same length from the end: names in one folder often begin alike.
+bool isEqualNarrow(std::u16string_view text, std::string_view bytes) noexcept {
+    std::size_t left = text.size();
+    for (; left >= block; left -= block) {
+        std::array<char16_t, block> units;
+        for (std::size_t i = 0; i < block; ++i) {
+            units[i] = static_cast<unsigned char>(bytes[left - block + i]);
+        }
+        if (std::memcmp(units.data(), text.data() + left - block, sizeof units) != 0) {
+            return false;
+        }
+    }
+    while (left > 0 && text[left - 1] == static_cast<unsigned char>(bytes[left - 1])) {
+        --left;
+    }
+    return left == 0;
 }
 
 char16_t unitAt(StoredName const& name, std::size_t index) noexcept {
@@ -94,13 +113,7 @@ bool NameKey::isEqual(StoredName const& stored) const noexcept {
     if (stored.isWide) {
         return std::memcmp(text_.data(), stored.bytes.data(), stored.bytes.size()) == 0;
     }
-    // From the end: names in one folder often begin alike.
-    for (std::size_t i = text_.size(); i > 0; --i) {
-        if (text_[i - 1] != static_cast<unsigned char>(stored.bytes[i - 1])) {
-            return false;
-        }
-    }
-    return true;
+    return isEqualNarrow(text_, stored.bytes);
 }
 
 std::strong_ordering NameKey::compareWith(StoredName const& stored) const noexcept {

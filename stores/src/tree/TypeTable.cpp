@@ -22,8 +22,11 @@ Position positionOf(TypeTable::Index index) noexcept {
 } // namespace
 
 TypeTable::Index TypeTable::index(std::u16string_view type) {
+    if (!indexes_.empty() && (*this)[last_] == type) {
+        return last_;
+    }
     if (auto const found = indexes_.find(type); found != indexes_.end()) {
-        return found->second;
+        return last_ = found->second;
     }
     auto const index = static_cast<Index>(indexes_.size());
     auto const [segment, size, offset] = positionOf(index);
@@ -36,7 +39,7 @@ TypeTable::Index TypeTable::index(std::u16string_view type) {
     }
     types[offset] = type;
     indexes_.emplace(types[offset], index);
-    return index;
+    return last_ = index;
 }
 
 std::u16string const& TypeTable::operator[](Index index) const noexcept {

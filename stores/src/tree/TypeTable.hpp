@@ -29,6 +29,7 @@ private:
 
     std::array<std::unique_ptr<std::u16string[]>, segmentCount> segments_;
     std::map<std::u16string_view, Index> indexes_;
+    Index last_ = 0; ///< the last one that index returned: siblings mostly have the same type
 };
 
 } // namespace project::stores

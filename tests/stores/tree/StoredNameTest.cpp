@@ -56,5 +56,16 @@ TEST(StoredName, isComparedByCodeUnitsWhateverItsForm) {
     }
 }
 
+TEST(StoredName, aDifferenceIsFoundAtEachPlace) {
+    std::u16string const name = u"a name of a length";
+    Stored const stored(name);
+    EXPECT_TRUE(NameKey(name).isEqual(stored.view()));
+    for (std::size_t place = 0; place < name.size(); ++place) {
+        auto other = name;
+        other[place] = static_cast<char16_t>(name[place] + 0x100); // the same as a byte
+        EXPECT_FALSE(NameKey(other).isEqual(stored.view())) << place;
+    }
+}
+
 } // namespace
 } // namespace project::stores
