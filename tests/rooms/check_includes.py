@@ -46,6 +46,7 @@ ROOMS = {
         "references": ["texts", "output", "cli", "git", "project"],
         "merge": ["texts", "output", "cli", "git", "project"],
         "watch": ["texts", "output", "cli", "git", "project"],
+        "manual": ["texts", "cli"],
         "shared": ["texts", "output", "cli", "git", "project"],
         "batch": ["texts", "output", "cli", "git", "project", "changes"],
         "checks": ["texts", "output", "cli", "git", "project", "files", "labels", "entrypoints", "references", "merge"],

@@ -45,6 +45,58 @@ TEST_F(UsageProblem, isInGermanToo) {
     EXPECT_THAT(tool({}), FailsWith(2, "ein Befehl fehlt"));
 }
 
+/// The names of the project's things.
+class MeantNames : public ToolTest {
+protected:
+    void SetUp() override {
+        initProject();
+        std::filesystem::create_directories(inFolder("src/io"));
+        folder_.addFile("src/io/pump.cpp");
+        ASSERT_EQ(tool({"add", "src/io/pump.cpp"}).exitCode, 0);
+        ASSERT_EQ(tool({"category", "create", "Status"}).exitCode, 0);
+        ASSERT_EQ(tool({"label", "create", "Status", "Reviewed"}).exitCode, 0);
+        ASSERT_EQ(tool({"group", "create", "Nightly"}).exitCode, 0);
+    }
+};
+
+TEST_F(MeantNames, areNamedByTheErrors) {
+    EXPECT_THAT(tool({"list", "src/io/pmp.cpp"}),
+                FailsWith(1, "pmp.cpp\" is not in the project. Did you mean \"" +
+                                 inFolder("src/io/pump.cpp") + "\"?"));
+    EXPECT_THAT(tool({"label", "show", "scr/oi/pump.cpp"}),
+                FailsWith(1, "Did you mean \"" + inFolder("src/io/pump.cpp") + "\"?"));
+    EXPECT_THAT(tool({"list", "src/other"}),
+                FailsWith(1, "is not in the project. Add it to the project first"));
+    EXPECT_THAT(tool({"label", "list", "Statsu"}),
+                FailsWith(1, "There is no category \"Statsu\" in the project. Did "
+                             "you mean \"Status\"?"));
+    EXPECT_THAT(tool({"label", "find", "Status", "reviewd"}), FailsWith(1, "Did you mean \"Reviewed\"?"));
+    EXPECT_THAT(tool({"group", "delete", "Nigthly"}), FailsWith(1, "Did you mean \"Nightly\"?"));
+}
+
+TEST_F(MeantNames, ofTypesAreListed) {
+    EXPECT_THAT(
+        tool({"entry", "set", "src/io/pump.cpp", "--type", "Startp"}),
+        FailsWith(1,
+                  "\"Startp\" is not a type of entry point. Did you mean \"Startup\"? The types are Basic, "
+                  "Startup, Shutdown and Batch_Job"));
+    EXPECT_THAT(tool({"entry", "set", "src/io/pump.cpp", "--type", "X"}),
+                FailsWith(1, "\"X\" is not a type of entry point. The types are Basic, Startup,"));
+    EXPECT_THAT(tool({"entry", "set", "src/io/pump.cpp", "--type", "StartUp"}), SucceedsSilently());
+}
+
+TEST_F(MeantNames, areNamedInGermanToo) {
+    settings_.environment["LANG"] = "de";
+    EXPECT_THAT(tool({"list", "src/io/pmp.cpp"}),
+                FailsWith(1, "Meinten Sie „" + inFolder("src/io/pump.cpp") + "“?"));
+    EXPECT_THAT(tool({"label", "list", "Statsu"}), FailsWith(1, "Meinten Sie „Status“?"));
+    EXPECT_THAT(tool({"label", "find", "Status", "x"}),
+                FailsWith(1, "die Kategorie „Status“ hat kein Etikett „x“"));
+    EXPECT_THAT(tool({"group", "delete", "x"}), FailsWith(1, "es gibt keine Einstiegspunktgruppe „x“"));
+    EXPECT_THAT(tool({"entry", "set", "src/io/pump.cpp", "--type", "Startp"}),
+                FailsWith(1, "Meinten Sie „Startup“?"));
+}
+
 using projectctl::nearest;
 
 TEST(Nearest, findsTheNameWithTheFewestChanges) {

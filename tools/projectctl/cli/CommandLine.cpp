@@ -7,6 +7,7 @@
 #include "cli/CodedFailure.hpp"
 #include "cli/CommonOptions.hpp"
 #include "cli/DeclaredTool.hpp"
+#include "cli/ExternalVerb.hpp"
 #include "cli/TextArguments.hpp"
 #include "cli/UsageProblem.hpp"
 #include "cli/WorkingFolder.hpp"
@@ -20,13 +21,26 @@ std::string verbOf(std::vector<std::string> const& arguments) {
     return arguments.empty() ? std::string() : arguments.front();
 }
 
+bool isUnknownWord(std::string const& word, CommandList const& verbs) {
+    bool const isWord = !word.empty() && !word.starts_with('-');
+    return isWord && std::ranges::find(verbs, word, &NamedCommand::name) == verbs.end();
+}
+
 /// The parser would skip a word that it does not know, and call the verb that follows.
 void requireVerb(std::string const& word, CommandList const& verbs) {
-    bool const isWord = !word.empty() && !word.starts_with('-');
-    if (isWord && std::ranges::find(verbs, word, &NamedCommand::name) == verbs.end()) {
+    if (isUnknownWord(word, verbs)) {
         DeclaredTool const tool(verbs);
         static_cast<void>(tool.find({unmarked(word)}));
     }
+}
+
+/// The arguments of a verb that is a program of its own: all that follow the verb, unchanged.
+std::vector<std::string> externalArguments(std::vector<std::string> const& given) {
+    auto word = given.begin();
+    while (word != given.end() && isCommonOption(*word)) {
+        word += hasFolder(*word) ? 2 : 1;
+    }
+    return {word + 1, given.end()};
 }
 
 int show(std::string const& text) {
@@ -44,7 +58,11 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     if (verbOf(arguments) == "--version") {
         return show(version + '\n');
     }
-    requireVerb(verbOf(arguments), commands);
+    if (isUnknownWord(verbOf(arguments), commands)) {
+        std::ranges::for_each(folders, enterFolder);
+        callExternalVerb(unmarked(verbOf(arguments)), externalArguments({argv + 1, argv + argc}));
+        requireVerb(verbOf(arguments), commands);
+    }
     DeclaredTool tool(commands, verbOf(arguments));
     std::unique_ptr<Command> called;
     try {

@@ -50,4 +50,8 @@ bool isCommonOption(std::string const& argument) {
     return std::ranges::find(commonOptions(), argument) != commonOptions().end();
 }
 
+bool hasFolder(std::string const& option) {
+    return option == inFolder;
+}
+
 } // namespace projectctl

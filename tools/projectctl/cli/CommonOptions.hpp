@@ -23,4 +23,7 @@ std::vector<std::string> const& commonOptions();
 /// Whether an argument is one of them.
 bool isCommonOption(std::string const& argument);
 
+/// Whether it is the one that a folder follows.
+bool hasFolder(std::string const& option);
+
 } // namespace projectctl

@@ -1,6 +1,9 @@
 #include "entrypoints/Groups.hpp"
 
+#include <algorithm>
+
 #include "cli/Choice.hpp"
+#include "cli/Nearest.hpp"
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 
@@ -21,8 +24,10 @@ EntryPointGroup& Groups::named(std::string const& name) const {
     std::u16string const wanted = textOf(name);
     auto const chosen = choose(names, wanted, "entry point groups");
     if (!chosen) {
-        throw Failure("there is no entry point group " + inQuotes(wanted) +
-                      ". 'projectctl group list' shows the groups");
+        std::vector<std::u16string> known(names.size());
+        std::ranges::transform(names, known.begin(), &Named::name);
+        auto const meant = nearest(wanted, known);
+        throw Failure(meant ? Message("GroupMeant", wanted, *meant) : Message("GroupUnknown", wanted));
     }
     return *groups_[*chosen];
 }

@@ -1,8 +1,10 @@
+#include <algorithm>
 #include <optional>
 #include <string>
 #include <vector>
 
 #include "cli/Completes.hpp"
+#include "cli/Nearest.hpp"
 #include "cli/PathArguments.hpp"
 #include "cli/TextArguments.hpp"
 #include "entrypoints/EntryCommands.hpp"
@@ -21,6 +23,7 @@ namespace {
 
 using project::management::EntryPointDefinition;
 using project::management::EntryPointManager;
+using project::management::EntryPointType;
 using ZEPHRA::project::management::FileNotInProject;
 
 /// The stored path has "/" in place of every backslash. An entry point of such a file could not be found
@@ -32,6 +35,20 @@ void requireNoBackslash(Path const& root, Path const& file) {
             "an entry point of " + inQuotes(fromRoot) +
             " could not be found again because of the backslash in the path. Rename the file first");
     }
+}
+
+EntryPointType typeNamed(std::u16string const& name) {
+    std::vector<std::u16string> known;
+    for (auto const type : {EntryPointType::Basic, EntryPointType::Startup, EntryPointType::Shutdown,
+                            EntryPointType::BatchJob}) {
+        known.push_back(project::management::toString(type));
+    }
+    bool const isOtherName = name == u"StartUp" || name == u"Batch Job";
+    if (std::ranges::find(known, name) == known.end() && !isOtherName) {
+        auto const meant = nearest(name, known);
+        throw Failure(meant ? Message("EntryTypeMeant", name, *meant) : Message("EntryTypeUnknown", name));
+    }
+    return project::management::getFromName(name);
 }
 
 class SetEntryCommand : public ProjectCommand {
@@ -67,7 +84,7 @@ public:
 private:
     void change(EntryPointDefinition& entry, EntryPointManager& entryPoints) const {
         if (type_) {
-            entry.setType(project::management::getFromName(textOf(*type_)));
+            entry.setType(typeNamed(textOf(*type_)));
         }
         if (name_) {
             entry.setName(textOf(*name_));

@@ -1,8 +1,11 @@
 #include "project/LabelNames.hpp"
 
+#include <algorithm>
+
 #include <vector>
 
 #include "cli/Choice.hpp"
+#include "cli/Nearest.hpp"
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "project/metadata/Messages.hpp"
@@ -29,6 +32,13 @@ std::vector<Named> namesOf(std::vector<Thing> const& things) {
     return result;
 }
 
+template <typename Thing>
+std::vector<std::u16string> textsOf(std::vector<Thing> const& things) {
+    std::vector<std::u16string> result(things.size());
+    std::ranges::transform(things, result.begin(), &Thing::getName);
+    return result;
+}
+
 } // namespace
 
 CategoryIdentifier LabelNames::category(std::string const& name) {
@@ -38,6 +48,9 @@ CategoryIdentifier LabelNames::category(std::string const& name) {
     }
     if (isUUID(wanted)) {
         return labels_.getCategoryByUUID(wanted);
+    }
+    if (auto const meant = nearest(wanted, textsOf(labels_.getAllCategories()))) {
+        throw Failure(Message("CategoryMeant", wanted, *meant));
     }
     project::exception::raise(CategoryDoesNotExist(wanted));
 }
@@ -51,8 +64,9 @@ Label LabelNames::label(std::string const& category, std::string const& name) {
     if (isUUID(wanted)) {
         return {found, labels_.getLabelByUUID(found, wanted)};
     }
-    throw Failure("the category " + inQuotes(found.getName()) + " has no label " + inQuotes(wanted) +
-                  ". 'projectctl label list' shows its labels");
+    auto const meant = nearest(wanted, textsOf(labels_.getLabels(found)));
+    throw Failure(meant ? Message("LabelMeant", found.getName(), wanted, *meant)
+                        : Message("LabelUnknown", found.getName(), wanted));
 }
 
 project::session::LabelChoice LabelNames::choice(std::string const& category,

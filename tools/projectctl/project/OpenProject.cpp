@@ -4,8 +4,10 @@
 
 #include "cli/Settings.hpp"
 #include "cli/WorkingFolder.hpp"
+#include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
+#include "project/MeantPath.hpp"
 #include "project/ProjectFolder.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/ProjectException.hpp"
@@ -60,9 +62,13 @@ std::string OpenProject::storeFile(std::string const& name) const {
 }
 
 void OpenProject::requireInProject(Path const& path) {
-    if (!files().isFileInProject(path)) {
-        project::exception::raise(FileNotInProject(path.native()));
+    if (files().isFileInProject(path)) {
+        return;
     }
+    if (auto const meant = meantPath(*this, path)) {
+        throw Failure(Message("PathMeant", path, *meant));
+    }
+    project::exception::raise(FileNotInProject(path.native()));
 }
 
 std::vector<Fault> const& OpenProject::faults() {
