@@ -34,13 +34,20 @@ void requireVerb(std::string const& word, CommandList const& verbs) {
     }
 }
 
-/// The arguments of a verb that is a program of its own: all that follow the verb, unchanged.
-std::vector<std::string> externalArguments(std::vector<std::string> const& given) {
+/// Calls the program of an unknown verb, if there is one. The options before the verb are the tool's, all
+/// that follow it are the program's.
+void callIfExternal(std::vector<std::string> const& given, CommandList const& verbs) {
     auto word = given.begin();
+    std::vector<std::string> folders;
     while (word != given.end() && isCommonOption(*word)) {
-        word += hasFolder(*word) ? 2 : 1;
+        if (hasFolder(*word++) && word != given.end()) {
+            folders.push_back(*word++);
+        }
     }
-    return {word + 1, given.end()};
+    if (word != given.end() && isUnknownWord(*word, verbs)) {
+        std::ranges::for_each(folders, enterFolder);
+        callExternalVerb(*word, {word + 1, given.end()});
+    }
 }
 
 int show(std::string const& text) {
@@ -53,16 +60,14 @@ int show(std::string const& text) {
 
 int runCommandLine(int argc, char const* const* argv, std::string const& version,
                    CommandList const& commands) {
-    auto arguments = markedArguments({argv + 1, argv + argc});
+    std::vector<std::string> const given(argv + 1, argv + argc);
+    callIfExternal(given, commands);
+    auto arguments = markedArguments(given);
     auto const folders = takeCommonOptions(arguments);
     if (verbOf(arguments) == "--version") {
         return show(version + '\n');
     }
-    if (isUnknownWord(verbOf(arguments), commands)) {
-        std::ranges::for_each(folders, enterFolder);
-        callExternalVerb(unmarked(verbOf(arguments)), externalArguments({argv + 1, argv + argc}));
-        requireVerb(verbOf(arguments), commands);
-    }
+    requireVerb(verbOf(arguments), commands);
     DeclaredTool tool(commands, verbOf(arguments));
     std::unique_ptr<Command> called;
     try {

@@ -13,11 +13,11 @@ namespace projectctl {
 
 namespace {
 
-/// Text for a line of its own, or for the arguments of a macro.
+/// Text for a line of its own, or behind the macro of a line.
 std::string escaped(std::string_view text) {
     std::string result;
     for (char const byte : text) {
-        result += byte == '\\' ? "\\e" : byte == '"' ? "\\(dq" : std::string(1, byte);
+        result += byte == '\\' ? "\\e" : std::string(1, byte);
     }
     return result.starts_with('.') || result.starts_with('\'') ? "\\&" + result : result;
 }
