@@ -145,6 +145,7 @@ bool FaultyProxy::pass(Pair& pair, int from, int to) {
     if (count <= 0) {
         return false;
     }
+    countRequest(pair, from == pair.client, buffer.front());
     if (delay_ > 0) {
         std::this_thread::sleep_for(std::chrono::milliseconds(delay_));
     }
@@ -156,6 +157,14 @@ bool FaultyProxy::pass(Pair& pair, int from, int to) {
         }
     }
     return isOpen;
+}
+
+void FaultyProxy::countRequest(Pair& pair, bool isFromClient, char first) {
+    constexpr char farewell = 'X';
+    if (isFromClient && pair.isClientsTurn && first != farewell) {
+        ++requests_;
+    }
+    pair.isClientsTurn = !isFromClient;
 }
 
 bool FaultyProxy::breakNow(Pair& pair) {
