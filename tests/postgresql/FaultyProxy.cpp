@@ -106,6 +106,7 @@ void FaultyProxy::serve() {
             }
             if (!isOpen) {
                 closeBoth(pair->client, pair->server);
+                --openConnections_;
             }
             pair = isOpen ? std::next(pair) : pairs_.erase(pair);
         }
@@ -131,6 +132,7 @@ void FaultyProxy::accept() {
         return;
     }
     pairs_.push_back({client, server});
+    ++openConnections_;
 }
 
 /// Passes on a part. @return false if the connection is to be closed.

@@ -42,6 +42,9 @@ public:
     /// The connections so far.
     int connections() const { return connections_; }
 
+    /// The connections that are open now.
+    int openConnections() const { return openConnections_; }
+
     /// The requests of clients so far: what a client sends until the server sends something is one request.
     /// The farewell of a client is not counted.
     int requests() const { return requests_; }
@@ -68,6 +71,7 @@ private:
     std::atomic<bool> refusesAfterBreak_ = false;
     std::atomic<long long> delay_ = 0;
     std::atomic<int> connections_ = 0;
+    std::atomic<int> openConnections_ = 0;
     std::atomic<int> requests_ = 0;
     std::mutex mutex_;
     bool isArmed_ = false;

@@ -1,5 +1,6 @@
 #include "postgresql/FaultyProxy.hpp"
 #include "postgresql/tool/SharedToolTest.hpp"
+#include "support/Waiting.hpp"
 
 namespace project::test {
 namespace {
@@ -28,6 +29,8 @@ protected:
         int const before = proxy_->requests();
         auto const result = elsewhere(command, input);
         EXPECT_EQ(result.exitCode, 0) << result.errors;
+        // The proxy may still be passing on the last request of a program that has ended.
+        EXPECT_TRUE(comesTrue([this] { return proxy_->openConnections() == 0; }));
         return proxy_->requests() - before;
     }
 
