@@ -99,9 +99,10 @@ bool Session::State::isStoreEmpty() const {
 }
 
 void Session::State::stage() {
-    bool const hasText = stored.text() != nullptr; // the location of a shared project never changes
-    if (hasText && stager && stager->isDue()) {
-        stored.text()->tidy(); // a staged text has no tail
+    if (stager && stager->isDue()) {
+        if (stored.text() != nullptr) {
+            stored.text()->tidy(); // a staged text has no tail
+        }
         stager->stageIfWritten();
     }
 }
@@ -135,9 +136,6 @@ void Session::State::wake() noexcept {
 }
 
 bool Session::State::refresh() {
-    if (stored.log() != nullptr) {
-        stored.log()->requestCheck();
-    }
     queueEventsOfOthers();
     bool hasDispatched = false;
     while (auto const event = nextEventOfOthers()) {

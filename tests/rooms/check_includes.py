@@ -50,6 +50,7 @@ ROOMS = {
         "shared": ["texts", "output", "cli", "git", "project"],
         "batch": ["texts", "output", "cli", "git", "project", "changes"],
         "checks": ["texts", "output", "cli", "git", "project", "files", "labels", "entrypoints", "references", "merge"],
+        "exchange": ["texts", "output", "cli", "git", "project", "changes", "files"],
         "completion": ["texts", "output", "cli", "git", "project", "files", "entrypoints", "references"],
     },
     "src": {

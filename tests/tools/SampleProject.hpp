@@ -64,6 +64,13 @@ private:
         if (command.find(" merge ") != std::string::npos) {
             result += "for name in base ours theirs; do cp .projectdata/project.jsonl $name.jsonl; done\n";
         }
+        if (command.find(" import ") != std::string::npos) {
+            result += R"(
+                echo '* ada@example.org' >CODEOWNERS
+                mkdir build && echo '[]' >build/compile_commands.json
+                projectctl export csv >labels.csv && projectctl export jsonl >labels.jsonl
+            )";
+        }
         if (command.find(" resolve") != std::string::npos) {
             result += R"(
                 git switch -qc other && projectctl name Hers && git commit -qam hers

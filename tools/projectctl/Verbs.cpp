@@ -5,6 +5,8 @@
 #include "cli/HelpCommand.hpp"
 #include "completion/Commands.hpp"
 #include "entrypoints/Commands.hpp"
+#include "exchange/Commands.hpp"
+#include "files/Additions.hpp"
 #include "files/Commands.hpp"
 #include "labels/Commands.hpp"
 #include "merge/Commands.hpp"
@@ -17,7 +19,7 @@ namespace projectctl {
 
 CommandList const& verbs() {
     static CommandList const result{
-        {"init", "PurposeProject", makeInitCommand},
+        {"init", "PurposeProject", [] { return makeInitCommand(addWholeTree); }},
         {"root", "PurposeProject", makeRootCommand},
         {"name", "PurposeProject", makeNameCommand},
         {"description", "PurposeProject", makeDescriptionCommand},
@@ -26,6 +28,8 @@ CommandList const& verbs() {
         {"remove", "PurposeFiles", makeRemoveCommand},
         {"list", "PurposeFiles", makeListCommand},
         {"status", "PurposeFiles", makeStatusCommand},
+        {"import", "PurposeFiles", makeImportCommand},
+        {"export", "PurposeFiles", makeExportCommand},
 
         {"category", "PurposeLabels", makeCategoryCommand},
         {"label", "PurposeLabels", makeLabelCommand},

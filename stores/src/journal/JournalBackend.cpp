@@ -1,7 +1,6 @@
 #include "project/stores/JournalBackend.hpp"
 
 #include <algorithm>
-#include <atomic>
 #include <utility>
 
 #include "fl/i18n/Utf8.hpp"
@@ -58,8 +57,6 @@ public:
 
     std::optional<HistoryLoss> historyLoss() const noexcept { return seen_.loss(); }
 
-    void requestCheck() noexcept { isCheckRequested_ = true; }
-
     bool isShowingLastState() const noexcept { return isShowingLastState_; }
 
     std::unique_ptr<Journal> const journal;
@@ -106,7 +103,6 @@ private:
     bool hasBegun_ = false;
     bool isLocked_ = false;
     bool isShowingLastState_ = false;
-    std::atomic<bool> isCheckRequested_ = false;
 };
 
 Changes JournalBackend::State::enter(Access access) {
@@ -144,8 +140,7 @@ void JournalBackend::State::beginFromCache() {
 
 void JournalBackend::State::checkForReading() {
     isShowingLastState_ = false;
-    bool const isRequested = isCheckRequested_.exchange(false);
-    if (!isRequested && lastCheck_ && Clock::now() - *lastCheck_ < options_.freshness) {
+    if (lastCheck_ && Clock::now() - *lastCheck_ < options_.freshness) {
         return;
     }
     try {
@@ -453,10 +448,6 @@ std::optional<HistoryLoss> JournalBackend::takeHistoryLoss() {
 
 std::optional<HistoryLoss> JournalBackend::historyLoss() const noexcept {
     return state_->historyLoss();
-}
-
-void JournalBackend::requestCheck() noexcept {
-    state_->requestCheck();
 }
 
 bool JournalBackend::isShowingLastState() const noexcept {

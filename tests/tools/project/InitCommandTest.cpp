@@ -118,5 +118,25 @@ TEST_F(InitCommand, leavesNoFilesBehindWhenNothingCanBeWritten) {
     EXPECT_TRUE(std::filesystem::is_empty(folder_.onDisk()));
 }
 
+TEST_F(InitCommand, addsTheWholeTreeExceptIgnoredFiles) {
+    folder_.addFile("src/main.cpp");
+    folder_.addFile("build/main.o");
+    folder_.addFile(".gitignore", "build\n");
+    ASSERT_EQ(runProgram({"/usr/bin/git", "init", "-q"}, settings_).exitCode, 0);
+
+    EXPECT_THAT(tool({"init", "--add"}), SucceedsSilently());
+
+    EXPECT_THAT(list(), ::testing::ElementsAre(".gitignore", "src", "src/main.cpp"));
+}
+
+TEST_F(InitCommand, addsTheWholeTreeWithoutARepository) {
+    folder_.addFile("sub/build/main.o");
+    folder_.addFile("sub/.gitignore", "build\n");
+
+    EXPECT_THAT(tool({"init", "sub", "--add"}), SucceedsSilently());
+
+    EXPECT_THAT(toolFrom("sub", {"list"}), Prints(".gitignore\nbuild\nbuild/main.o\n"));
+}
+
 } // namespace
 } // namespace project::test

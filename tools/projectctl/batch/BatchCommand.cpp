@@ -1,9 +1,5 @@
 #include <algorithm>
 #include <exception>
-#include <filesystem>
-#include <fstream>
-#include <iostream>
-#include <iterator>
 #include <optional>
 #include <string>
 #include <vector>
@@ -38,13 +34,10 @@ public:
     }
 
     int run(OpenProject& project) override {
-        auto const lines = parseBatch(read(), commands_);
-        if (project.log() == nullptr) {
-            project.warnOfDamage();
-        }
+        auto const lines = parseBatch(readFileOrInput(file_), commands_);
+        project.warnOfDamage();
         Progress progress("Running the commands");
         ProjectTransaction transaction(project);
-        project.warnOfDamageInLog(); // the transaction has read it
         int const result = runAll(lines, project, progress);
         output().flush(); // while a failure can still roll everything back
         if (end(transaction, project)) {
@@ -56,20 +49,6 @@ public:
     bool canRunInBatch() const override { return false; }
 
 private:
-    std::string read() const {
-        if (!file_ || *file_ == "-") {
-            claimStandardInput();
-            std::cin.sync_with_stdio(false);
-            return {std::istreambuf_iterator<char>(std::cin), {}};
-        }
-        std::error_code error;
-        std::ifstream file(*file_, std::ios::binary);
-        if (!file || std::filesystem::is_directory(*file_, error)) {
-            throw Failure('"' + *file_ + "\" cannot be read");
-        }
-        return {std::istreambuf_iterator<char>(file), {}};
-    }
-
     /// @return `finding` if a command has returned it, otherwise `done`.
     static int runAll(std::vector<BatchLine> const& lines, OpenProject& project, Progress& progress) {
         Output::Silence const silence(output()); // confirmations of changes that are not committed yet

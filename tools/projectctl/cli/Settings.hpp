@@ -4,8 +4,7 @@ namespace projectctl {
 
 /// The options that every command accepts.
 struct Settings {
-    bool sourceControl = true; ///< false: the tool does not use git
-    bool usesPager = true;
+    bool sourceControl = true;   ///< false: the tool does not use git
     bool showsFullNames = false; ///< show paths relative to the root instead of the current folder
 };
 

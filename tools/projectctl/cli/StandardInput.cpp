@@ -1,8 +1,14 @@
 #include "cli/StandardInput.hpp"
 
+#include <filesystem>
+#include <fstream>
+#include <iostream>
+#include <iterator>
+#include <system_error>
 #include <utility>
 
 #include "cli/CodedFailure.hpp"
+#include "output/Failure.hpp"
 
 namespace projectctl {
 
@@ -11,6 +17,20 @@ void claimStandardInput() {
     if (std::exchange(isClaimed, true)) {
         throw WrongUse("standard input contains the batch, or paths for an earlier command");
     }
+}
+
+std::string readFileOrInput(std::optional<std::string> const& file) {
+    if (!file || *file == "-") {
+        claimStandardInput();
+        std::cin.sync_with_stdio(false);
+        return {std::istreambuf_iterator<char>(std::cin), {}};
+    }
+    std::error_code error;
+    std::ifstream stream(*file, std::ios::binary);
+    if (!stream || std::filesystem::is_directory(*file, error)) {
+        throw Failure('"' + *file + "\" cannot be read");
+    }
+    return {std::istreambuf_iterator<char>(stream), {}};
 }
 
 } // namespace projectctl

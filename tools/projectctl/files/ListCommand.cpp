@@ -10,7 +10,6 @@
 #include "files/Commands.hpp"
 #include "output/Kind.hpp"
 #include "output/NameForms.hpp"
-#include "output/Progress.hpp"
 #include "project/FoundFiles.hpp"
 #include "project/LabelNames.hpp"
 #include "project/ProjectCommand.hpp"
@@ -35,7 +34,6 @@ public:
     }
 
     int run(OpenProject& project) override {
-        Progress const progress(Message("ProgressList"));
         Query query;
         query.paths = absolutePaths(paths_);
         project

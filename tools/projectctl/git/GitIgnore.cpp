@@ -66,6 +66,14 @@ std::unordered_set<std::string> trackedDespitePattern(Path const& root) {
 
 } // namespace
 
+bool isInGitRepository(Path const& folder) {
+    try {
+        return runGit(folder, {"rev-parse", "--is-inside-work-tree"}).output == "true\n";
+    } catch (std::system_error const&) {
+        return false;
+    }
+}
+
 std::vector<Path> withoutIgnoredByGit(Path const& root, std::vector<Path> paths) {
     std::string const names = namesFor(root, paths);
     // --no-index, because git would otherwise search the whole index for each name.

@@ -8,6 +8,9 @@ namespace projectctl {
 
 using fl::filesystem::Path;
 
+/// Whether git is installed and the folder is in the work tree of a repository.
+bool isInGitRepository(Path const& folder);
+
 /// Removes from a list the paths that git ignores in the project's repository: those that match a pattern, or
 /// lie in a folder that does, and are not tracked.
 ///

@@ -11,7 +11,6 @@
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
-#include "output/Progress.hpp"
 #include "project/stores/TextMerge.hpp"
 
 namespace projectctl {
@@ -34,7 +33,6 @@ public:
     }
 
     int run() override {
-        Progress const progress(Message("ProgressMerge"));
         try {
             return mergeFiles();
         } catch (std::exception const& error) {

@@ -8,7 +8,6 @@
 
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
-#include "output/Progress.hpp"
 
 namespace projectctl {
 
@@ -38,16 +37,13 @@ void Output::flushWhenLarge() {
 }
 
 void Output::say(std::string_view line) {
-    if (isTerminal_ && !isSilent_ && !isQuiet_) {
+    if (isTerminal_ && !isSilent_) {
         text_ += withoutControls(line, false) + '\n';
     }
 }
 
 void Output::flush() {
     std::string_view rest = text_;
-    if (isTerminal_ && !rest.empty()) {
-        Progress::endShown();
-    }
     while (!rest.empty()) {
         auto const written = write(descriptor_, rest.data(), rest.size());
         if (written >= 0) {

@@ -1,3 +1,4 @@
+#include <cstddef>
 #include <optional>
 #include <string>
 
@@ -9,7 +10,6 @@
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
-#include "output/Progress.hpp"
 #include "project/Commands.hpp"
 #include "project/OpenProject.hpp"
 #include "project/ProjectFolder.hpp"
@@ -23,10 +23,15 @@ namespace {
 /// Creates a project in a folder.
 class InitCommand : public Command {
 public:
+    using AddTree = std::size_t (*)(OpenProject& project);
+
+    explicit InitCommand(AddTree addTree) : addTree_(addTree) {}
+
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand("init");
         completes(takeText(*app, "FOLDER", folder_), Completes::Folders);
         takeText(*app, "--name", name_);
+        app->add_flag("--add", addsTree_);
         auto* const store = takeText(*app, "--store", store_);
         takeRoles(*app, *store, reader_, writer_);
         return app;
@@ -35,24 +40,31 @@ public:
     int run() override {
         auto const root = folder_ ? chosenFolder(*folder_) : workingFolder();
         requireNoProject(root);
-        Progress const progress(Message("ProgressInit"));
         std::u16string const name = name_ ? textOf(*name_) : nameOf(root);
-        if (store_) {
-            OpenProject::createShared(root, name, sharedStore(*store_, name, reader_, writer_)).stage();
-        } else {
-            OpenProject::create(root, name).stage();
-        }
+        std::size_t const added = create(root, name);
         if (!store_ && settings().sourceControl) {
             auto const setup = mergeSetupOf(root);
             if (setup == MergeSetup::Missing || setup == MergeSetup::ProgramMissing) {
                 setUpMerge(root);
             }
         }
-        output().say("Created a project in \"" + shown(root) + "\". 'projectctl add' adds files to it.");
+        output().say("Created a project in \"" + shown(root) + "\". " +
+                     (addsTree_ ? std::to_string(added) + " files and folders were added."
+                                : "'projectctl add' adds files to it."));
         return 0;
     }
 
 private:
+    /// @return the number of files and folders that were added.
+    std::size_t create(Path const& root, std::u16string const& name) const {
+        auto project =
+            store_ ? OpenProject::createShared(root, name, sharedStore(*store_, name, reader_, writer_))
+                   : OpenProject::create(root, name);
+        std::size_t const added = addsTree_ ? addTree_(project) : 0;
+        project.stage();
+        return added;
+    }
+
     static Path chosenFolder(std::string const& argument) {
         auto folder = fl::filesystem::canonical(fl::filesystem::fromSystem(argument), workingFolder());
         if (argument.empty() || !project::metadata::is_directory(folder)) {
@@ -78,6 +90,8 @@ private:
         return above == root ? root.native() : project::metadata::getRelativePath(above, root);
     }
 
+    AddTree addTree_;
+    bool addsTree_ = false;
     std::optional<std::string> folder_;
     std::optional<std::string> name_;
     std::optional<std::string> store_;
@@ -87,8 +101,8 @@ private:
 
 } // namespace
 
-std::unique_ptr<Command> makeInitCommand() {
-    return std::make_unique<InitCommand>();
+std::unique_ptr<Command> makeInitCommand(std::size_t (*addTree)(OpenProject& project)) {
+    return std::make_unique<InitCommand>(addTree);
 }
 
 } // namespace projectctl

@@ -1,0 +1,12 @@
+#pragma once
+
+#include <memory>
+
+#include "cli/Command.hpp"
+
+namespace projectctl {
+
+std::unique_ptr<Command> makeImportCommand();
+std::unique_ptr<Command> makeExportCommand();
+
+} // namespace projectctl

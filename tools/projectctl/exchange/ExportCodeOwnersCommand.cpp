@@ -1,0 +1,83 @@
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "exchange/CodeOwners.hpp"
+#include "exchange/ExportCommands.hpp"
+#include "exchange/OwnerCategory.hpp"
+#include "exchange/ProjectRows.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/ProjectCommand.hpp"
+
+namespace projectctl {
+
+namespace {
+
+/// Writes a rule for each file that has an owner.
+class ExportCodeOwnersCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& group) override { return group.add_subcommand("codeowners"); }
+
+    int run(OpenProject& project) override {
+        project.warnOfDamage();
+        Unmapped unmapped("export");
+        Unmapped others("export"); // labels without names are not owners
+        visitRows(project, others, [&](FileRow const& row, Kind kind) {
+            if (row.category == ownerCategory) {
+                take(row, kind, unmapped);
+            }
+        });
+        writeLine(unmapped);
+        return unmapped.report();
+    }
+
+private:
+    void take(FileRow const& row, Kind kind, Unmapped& unmapped) {
+        if (row.path != path_) {
+            writeLine(unmapped);
+            path_ = row.path;
+        }
+        auto const owner = ownerBytes(row.label);
+        if (kind == Kind::Folder) {
+            unmapped.add(0, inQuotes(row.path) + " is a folder: its owner would own everything below it");
+        } else if (!isCodeOwner(owner)) {
+            unmapped.add(0, inQuotes(row.label) + ", the owner of " + inQuotes(row.path) +
+                                ", is not a user or an address");
+        } else {
+            owners_.push_back(owner);
+        }
+    }
+
+    /// Writes the line of the last file.
+    void writeLine(Unmapped& unmapped) {
+        if (owners_.empty()) {
+            return;
+        }
+        std::ranges::sort(owners_);
+        if (auto const line = codeOwnersLine(ownerBytes(path_), owners_)) {
+            output().text() += *line;
+            output().flushWhenLarge();
+        } else {
+            unmapped.add(0, inQuotes(path_) + " has a line end, which no pattern can contain");
+        }
+        owners_.clear();
+    }
+
+    static std::string ownerBytes(std::u16string const& text) {
+        std::string result;
+        appendBytes(result, text);
+        return result;
+    }
+
+    std::u16string path_;
+    std::vector<std::string> owners_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeExportCodeOwnersCommand() {
+    return std::make_unique<ExportCodeOwnersCommand>();
+}
+
+} // namespace projectctl

@@ -1,0 +1,36 @@
+#include "exchange/ImportCommand.hpp"
+
+#include "cli/Completes.hpp"
+#include "cli/TextArguments.hpp"
+#include "exchange/ItemImport.hpp"
+#include "output/Output.hpp"
+#include "output/Progress.hpp"
+
+namespace projectctl {
+
+int ImportCommand::run(OpenProject& project) {
+    auto const data = load(project);
+    Unmapped unmapped(source(project));
+    Progress const progress("Importing");
+    ProjectTransaction transaction(project);
+    auto const items = itemsIn(data, project, unmapped);
+    ItemImport import(project, items, unmapped);
+    import.run();
+    if (dryRun_.end(transaction, project)) {
+        output().say(std::to_string(import.addedFiles()) + " files and folders added, " +
+                     std::to_string(import.putLabels()) + " labels put on files");
+    }
+    return unmapped.report();
+}
+
+CLI::App* ImportCommand::declareForm(CLI::App& group, std::string const& name) {
+    auto* const app = group.add_subcommand(name);
+    dryRun_.declare(*app);
+    return app;
+}
+
+void ImportCommand::declareFile(CLI::App& app) {
+    completes(takeText(app, "FILE", file_), Completes::Files);
+}
+
+} // namespace projectctl

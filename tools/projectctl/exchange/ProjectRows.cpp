@@ -1,0 +1,88 @@
+#include "exchange/ProjectRows.hpp"
+
+#include <map>
+#include <set>
+#include <utility>
+#include <vector>
+
+#include "exchange/LabelData.hpp"
+#include "output/NameForms.hpp"
+#include "project/FileList.hpp"
+#include "project/core/LabelManager.hpp"
+#include "project/labels/CategoryIdentifier.hpp"
+#include "project/labels/LabelIdentifier.hpp"
+#include "project/metadata/TreeSchema.hpp"
+
+namespace projectctl {
+
+namespace fileSchema = project::metadata::schema::files;
+
+using project::metadata::MetadataNode;
+
+namespace {
+
+using LabelUUIDs = std::pair<std::u16string, std::u16string>; ///< of the category and the label
+
+struct LabelNamesOfProject {
+    std::u16string category;
+    std::u16string label;
+};
+
+std::map<LabelUUIDs, LabelNamesOfProject> allLabels(OpenProject& project) {
+    auto& labels = project.manager().getLabelManager();
+    std::map<LabelUUIDs, LabelNamesOfProject> result;
+    for (auto const& category : labels.getAllCategories()) {
+        for (auto const& label : labels.getLabels(category)) {
+            result.emplace(LabelUUIDs(category.getUUID(), label.getUUID()),
+                           LabelNamesOfProject{category.getName(), label.getName()});
+        }
+    }
+    return result;
+}
+
+/// The labels in the node of a file, each once.
+std::vector<LabelUUIDs> labelsIn(MetadataNode const& node) {
+    std::vector<LabelUUIDs> result;
+    std::set<LabelUUIDs> seen;
+    for (auto const& category : node.getChildren()) {
+        for (auto const& label : category->getChildren()) {
+            LabelUUIDs uuids(category->get(fileSchema::categoryUUIDKey),
+                             label->get(fileSchema::labelUUIDKey));
+            bool const isLabel =
+                category->getType() == fileSchema::categoryType && label->getType() == fileSchema::labelType;
+            if (isLabel && seen.insert(uuids).second) {
+                result.push_back(std::move(uuids));
+            }
+        }
+    }
+    return result;
+}
+
+} // namespace
+
+void visitRows(OpenProject& project, Unmapped& unmapped, RowVisitor const& visitor) {
+    FileList const files(project);
+    LabelData const data(project);
+    auto const names = allLabels(project);
+    files.visit(project.root(), [&](FileList::File const& file) {
+        bool isVisited = false;
+        for (auto const& uuids : labelsIn(file.node)) {
+            auto const found = names.find(uuids);
+            bool const isNamed =
+                found != names.end() && (!found->second.category.empty() || !found->second.label.empty());
+            if (isNamed) {
+                auto const& [category, label] = found->second;
+                visitor({file.path, category, label, data.of(project.root() / Path(file.path), uuids.second)},
+                        file.kind);
+                isVisited = true;
+            } else {
+                unmapped.add(0, inQuotes(file.path) + " has a label that was deleted, or that has no name");
+            }
+        }
+        if (!isVisited) {
+            visitor({file.path, {}, {}, {}}, file.kind);
+        }
+    });
+}
+
+} // namespace projectctl
