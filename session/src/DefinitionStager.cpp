@@ -55,7 +55,6 @@ void DefinitionStager::stageIfWritten() {
 }
 
 void DefinitionStager::stageReturned(std::vector<Path> const& files) {
-    auto const guard = store_.acquireWriteLock();
     std::vector<Path> returned;
     for (auto const& [file, state] : adapter_.getFileStates(files)) {
         if (state.getState() == LocalStatus::RemovalStaged) {

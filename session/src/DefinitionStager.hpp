@@ -26,7 +26,7 @@ public:
 
     /// Stages those of these files whose removal is staged: files that were removed from the project and
     /// are now added again. CMActionManager adds only files that git does not know, and git knows these.
-    /// Takes the write lock.
+    /// Call it with a guard of the store held.
     void stageReturned(std::vector<Path> const& files);
 
     /// Counts as a write of the store.

@@ -99,10 +99,9 @@ bool Session::State::isStoreEmpty() const {
 }
 
 void Session::State::stage() {
-    if (stager && stager->isDue()) {
-        if (stored.text() != nullptr) {
-            stored.text()->tidy(); // a staged text has no tail
-        }
+    bool const hasText = stored.text() != nullptr; // the location of a shared project never changes
+    if (hasText && stager && stager->isDue()) {
+        stored.text()->tidy(); // a staged text has no tail
         stager->stageIfWritten();
     }
 }
@@ -136,6 +135,9 @@ void Session::State::wake() noexcept {
 }
 
 bool Session::State::refresh() {
+    if (stored.log() != nullptr) {
+        stored.log()->requestCheck();
+    }
     queueEventsOfOthers();
     bool hasDispatched = false;
     while (auto const event = nextEventOfOthers()) {

@@ -58,8 +58,14 @@ void ToolAccess::markTextForStaging() noexcept {
     }
 }
 
+cmlink::ReentrantReadWriteLock::LockGuard ToolAccess::guardForSourceControl() {
+    return state_.stored.text() != nullptr ? state_.store->acquireWriteLock()
+                                           : state_.store->acquireReadLock();
+}
+
 void ToolAccess::stageReturned(std::vector<Path> const& files) {
     if (state_.stager) {
+        auto const guard = guardForSourceControl();
         state_.stager->stageReturned(files);
     }
 }
@@ -83,7 +89,7 @@ void ToolAccess::stageReplaced(stores::FileChanges const& files) {
 std::vector<Path> ToolAccess::trackedOutsideProject(std::vector<Path> const& folders) {
     std::vector<Path> result;
     if (state_.adapter) {
-        auto const guard = state_.store->acquireWriteLock(); // only one thread at a time may use the adapter
+        auto const guard = guardForSourceControl();
         for (auto const& file : state_.adapter->trackedBelow(folders)) {
             if (!state_.project->getFileManager().isFileInProject(file)) {
                 result.push_back(file);

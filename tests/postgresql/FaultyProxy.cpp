@@ -106,6 +106,7 @@ void FaultyProxy::serve() {
             }
             if (!isOpen) {
                 closeBoth(pair->client, pair->server);
+                --openConnections_;
             }
             pair = isOpen ? std::next(pair) : pairs_.erase(pair);
         }
@@ -131,6 +132,7 @@ void FaultyProxy::accept() {
         return;
     }
     pairs_.push_back({client, server});
+    ++openConnections_;
 }
 
 /// Passes on a part. @return false if the connection is to be closed.
@@ -145,6 +147,7 @@ bool FaultyProxy::pass(Pair& pair, int from, int to) {
     if (count <= 0) {
         return false;
     }
+    countRequest(pair, from == pair.client, buffer.front());
     if (delay_ > 0) {
         std::this_thread::sleep_for(std::chrono::milliseconds(delay_));
     }
@@ -156,6 +159,14 @@ bool FaultyProxy::pass(Pair& pair, int from, int to) {
         }
     }
     return isOpen;
+}
+
+void FaultyProxy::countRequest(Pair& pair, bool isFromClient, char first) {
+    constexpr char farewell = 'X';
+    if (isFromClient && pair.isClientsTurn && first != farewell) {
+        ++requests_;
+    }
+    pair.isClientsTurn = !isFromClient;
 }
 
 bool FaultyProxy::breakNow(Pair& pair) {

@@ -42,16 +42,25 @@ public:
     /// The connections so far.
     int connections() const { return connections_; }
 
+    /// The connections that are open now.
+    int openConnections() const { return openConnections_; }
+
+    /// The requests of clients so far: what a client sends until the server sends something is one request.
+    /// The farewell of a client is not counted.
+    int requests() const { return requests_; }
+
 private:
     struct Pair {
         int client;
         int server;
         bool isStalled = false;
+        bool isClientsTurn = true; ///< the next part from the client begins a request
     };
 
     void serve();
     void accept();
     bool pass(Pair& pair, int from, int to);
+    void countRequest(Pair& pair, bool isFromClient, char first);
     bool breakNow(Pair& pair);
 
     int serverPort_;
@@ -62,6 +71,8 @@ private:
     std::atomic<bool> refusesAfterBreak_ = false;
     std::atomic<long long> delay_ = 0;
     std::atomic<int> connections_ = 0;
+    std::atomic<int> openConnections_ = 0;
+    std::atomic<int> requests_ = 0;
     std::mutex mutex_;
     bool isArmed_ = false;
     std::size_t left_ = 0;

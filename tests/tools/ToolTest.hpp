@@ -18,7 +18,10 @@ namespace project::test {
 /// Runs projectctl as a process of its own, in a fresh folder.
 class ToolTest : public ::testing::Test {
 protected:
-    ToolTest() { settings_.folder = folder_.onDisk(); }
+    ToolTest() {
+        settings_.folder = folder_.onDisk();
+        settings_.environment["PROJECTCTL_PAGER"] = "cat"; // a terminal shows the output itself
+    }
 
     /// Calls projectctl with the current settings.
     ProgramResult tool(std::vector<std::string> arguments, std::string_view input = {}) const {

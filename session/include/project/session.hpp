@@ -43,7 +43,8 @@ struct Options {
     bool honoursEnvironment = false;
 
     /// For a shared project: a read guard checks for changes only if the last check is at least this long
-    /// ago. By default every guard checks, which takes a round trip to the server.
+    /// ago. By default every guard checks, which takes a round trip to the server. Session::refresh and
+    /// Session::watch always check.
     std::chrono::milliseconds freshness = std::chrono::milliseconds(0);
 
     /// For a shared project: whether reading continues with the last state while the server is unreachable.

@@ -1,6 +1,7 @@
 #include "project/stores/JournalBackend.hpp"
 
 #include <algorithm>
+#include <atomic>
 #include <utility>
 
 #include "fl/i18n/Utf8.hpp"
@@ -57,6 +58,8 @@ public:
 
     std::optional<HistoryLoss> historyLoss() const noexcept { return seen_.loss(); }
 
+    void requestCheck() noexcept { isCheckRequested_ = true; }
+
     bool isShowingLastState() const noexcept { return isShowingLastState_; }
 
     std::unique_ptr<Journal> const journal;
@@ -103,6 +106,7 @@ private:
     bool hasBegun_ = false;
     bool isLocked_ = false;
     bool isShowingLastState_ = false;
+    std::atomic<bool> isCheckRequested_ = false;
 };
 
 Changes JournalBackend::State::enter(Access access) {
@@ -140,7 +144,8 @@ void JournalBackend::State::beginFromCache() {
 
 void JournalBackend::State::checkForReading() {
     isShowingLastState_ = false;
-    if (lastCheck_ && Clock::now() - *lastCheck_ < options_.freshness) {
+    bool const isRequested = isCheckRequested_.exchange(false);
+    if (!isRequested && lastCheck_ && Clock::now() - *lastCheck_ < options_.freshness) {
         return;
     }
     try {
@@ -448,6 +453,10 @@ std::optional<HistoryLoss> JournalBackend::takeHistoryLoss() {
 
 std::optional<HistoryLoss> JournalBackend::historyLoss() const noexcept {
     return state_->historyLoss();
+}
+
+void JournalBackend::requestCheck() noexcept {
+    state_->requestCheck();
 }
 
 bool JournalBackend::isShowingLastState() const noexcept {

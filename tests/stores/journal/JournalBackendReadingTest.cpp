@@ -140,6 +140,20 @@ TEST_F(JournalBackendReading, aGuardWithinTheFreshnessAsksNothing) {
     EXPECT_EQ(loadAll(*reader), files({u"a", u"b"})) << "a writer always checks for changes";
 }
 
+TEST_F(JournalBackendReading, aRequestedCheckIsMadeOnceAlthoughTheLastOneIsFresh) {
+    prepare({u"a"});
+    auto const reader = open({.freshness = std::chrono::hours(1)});
+    contentOf(*reader);
+    commit(*open(), {set(fileAddress(u"b"))});
+    calls();
+
+    reader->requestCheck();
+
+    EXPECT_EQ(contentOf(*reader), files({u"a", u"b"}));
+    EXPECT_EQ(contentOf(*reader), files({u"a", u"b"}));
+    EXPECT_THAT(calls(), ::testing::SizeIs(1));
+}
+
 TEST_F(JournalBackendReading, anUnreachableServerIsAnErrorThatSaysSo) {
     prepare({u"a"});
     auto const reader = open();

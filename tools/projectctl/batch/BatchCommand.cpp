@@ -35,9 +35,12 @@ public:
 
     int run(OpenProject& project) override {
         auto const lines = parseBatch(readFileOrInput(file_), commands_);
-        project.warnOfDamage();
+        if (project.log() == nullptr) {
+            project.warnOfDamage();
+        }
         Progress progress("Running the commands");
         ProjectTransaction transaction(project);
+        project.warnOfDamageInLog(); // the transaction has read it
         int const result = runAll(lines, project, progress);
         output().flush(); // while a failure can still roll everything back
         if (end(transaction, project)) {

@@ -10,6 +10,7 @@
 #include "files/Commands.hpp"
 #include "output/Kind.hpp"
 #include "output/NameForms.hpp"
+#include "output/Progress.hpp"
 #include "project/FoundFiles.hpp"
 #include "project/LabelNames.hpp"
 #include "project/ProjectCommand.hpp"
@@ -34,6 +35,7 @@ public:
     }
 
     int run(OpenProject& project) override {
+        Progress const progress(Message("ProgressList"));
         Query query;
         query.paths = absolutePaths(paths_);
         project

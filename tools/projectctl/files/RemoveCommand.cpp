@@ -28,10 +28,11 @@ public:
 
     int run(OpenProject& project) override {
         auto const paths = paths_.read();
+        ProjectTransaction transaction(
+            project); // first: the checks read the state in which the files are removed
         requireWithinRoot(project, paths);
         warnOfTrackedFiles(project, paths);
         Progress const progress("Removing " + std::to_string(paths.size()) + " files and folders");
-        ProjectTransaction transaction(project);
         auto const removed = project.files().remove(paths);
         if (dryRun_.end(transaction, project)) {
             output().say(std::to_string(removed.size()) + " removed from the project");

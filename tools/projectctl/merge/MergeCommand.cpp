@@ -11,6 +11,7 @@
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
+#include "output/Progress.hpp"
 #include "project/stores/TextMerge.hpp"
 
 namespace projectctl {
@@ -33,6 +34,7 @@ public:
     }
 
     int run() override {
+        Progress const progress(Message("ProgressMerge"));
         try {
             return mergeFiles();
         } catch (std::exception const& error) {

@@ -8,6 +8,7 @@
 
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
+#include "output/Progress.hpp"
 
 namespace projectctl {
 
@@ -37,13 +38,16 @@ void Output::flushWhenLarge() {
 }
 
 void Output::say(std::string_view line) {
-    if (isTerminal_ && !isSilent_) {
+    if (isTerminal_ && !isSilent_ && !isQuiet_) {
         text_ += withoutControls(line, false) + '\n';
     }
 }
 
 void Output::flush() {
     std::string_view rest = text_;
+    if (isTerminal_ && !rest.empty()) {
+        Progress::endShown();
+    }
     while (!rest.empty()) {
         auto const written = write(descriptor_, rest.data(), rest.size());
         if (written >= 0) {

@@ -32,6 +32,11 @@ public:
     /// Appends a line that confirms a change, on a terminal only.
     void say(std::string_view line);
 
+    /// From now on, say() appends nothing, and no progress is shown.
+    void beQuiet() noexcept { isQuiet_ = true; }
+
+    bool isQuiet() const noexcept { return isQuiet_; }
+
     /// As long as it exists, say() appends nothing.
     class Silence {
     public:
@@ -56,6 +61,7 @@ private:
     int descriptor_;
     bool isTerminal_;
     bool isSilent_ = false;
+    bool isQuiet_ = false;
     std::string text_;
 };
 

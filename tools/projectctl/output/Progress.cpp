@@ -6,6 +6,8 @@
 
 #include <unistd.h>
 
+#include "output/Output.hpp"
+
 namespace projectctl {
 
 namespace {
@@ -28,14 +30,25 @@ std::string withThousands(std::size_t number) {
 
 } // namespace
 
-Progress::Progress(std::string work) : Progress(std::move(work), STDERR_FILENO, Timing()) {
+Progress::Progress(std::string work) : descriptor_(STDERR_FILENO), work_(std::move(work)) {
+    if (!output().isQuiet()) {
+        start();
+    }
+}
+
+Progress::Progress(Message const& work) : Progress(isatty(STDERR_FILENO) == 1 ? work.text() : std::string()) {
 }
 
 Progress::Progress(std::string work, int descriptor, Timing timing)
     : descriptor_(descriptor), timing_(timing), work_(std::move(work)) {
-    if (isatty(descriptor) != 1 || std::exchange(isAnyShown(), true)) {
+    start();
+}
+
+void Progress::start() {
+    if (isatty(descriptor_) != 1 || shown() != nullptr) {
         return;
     }
+    shown() = this;
     // The thread blocks all signals: it would otherwise receive those that the main thread has blocked.
     sigset_t all;
     sigset_t before;
@@ -46,6 +59,10 @@ Progress::Progress(std::string work, int descriptor, Timing timing)
 }
 
 Progress::~Progress() {
+    end();
+}
+
+void Progress::end() {
     if (!drawing_.joinable()) {
         return;
     }
@@ -55,13 +72,19 @@ Progress::~Progress() {
     }
     changed_.notify_one();
     drawing_.join();
-    isAnyShown() = false;
+    shown() = nullptr;
+}
+
+void Progress::endShown() {
+    if (shown() != nullptr) {
+        shown()->end();
+    }
 }
 
 /// Used by the main thread alone.
-bool& Progress::isAnyShown() {
-    static bool isShown = false;
-    return isShown;
+Progress*& Progress::shown() {
+    static Progress* one = nullptr;
+    return one;
 }
 
 void Progress::begin(std::string work) {

@@ -8,6 +8,8 @@
 #include <string>
 #include <thread>
 
+#include "texts/Message.hpp"
+
 namespace projectctl {
 
 /// Shows the current work of the tool on the terminal: one line, after a second, deleted at the end.
@@ -24,6 +26,9 @@ public:
     /// @param work the first piece of work, for instance "Reading folders".
     explicit Progress(std::string work);
 
+    /// The same with a text of the catalog, which is only read if the work is shown.
+    explicit Progress(Message const& work);
+
     /// @param descriptor the terminal to draw on; nothing is drawn if it is not a terminal.
     Progress(std::string work, int descriptor, Timing timing);
     ~Progress();
@@ -36,8 +41,13 @@ public:
     /// Sets the count, which is shown if it is not 0. Cheap enough to call for each file.
     void reach(std::size_t count) noexcept { count_.store(count, std::memory_order_relaxed); }
 
+    /// Ends the one that is shown, before results are written to the terminal.
+    static void endShown();
+
 private:
-    static bool& isAnyShown();
+    static Progress*& shown();
+    void start();
+    void end();
     void drawUntilStopped();
     std::string line();
 

@@ -10,6 +10,7 @@
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
+#include "output/Progress.hpp"
 #include "project/Commands.hpp"
 #include "project/OpenProject.hpp"
 #include "project/ProjectFolder.hpp"
@@ -40,6 +41,7 @@ public:
     int run() override {
         auto const root = folder_ ? chosenFolder(*folder_) : workingFolder();
         requireNoProject(root);
+        Progress const progress(Message("ProgressInit"));
         std::u16string const name = name_ ? textOf(*name_) : nameOf(root);
         std::size_t const added = create(root, name);
         if (!store_ && settings().sourceControl) {

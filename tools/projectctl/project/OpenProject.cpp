@@ -22,10 +22,13 @@ using ZEPHRA::project::management::FileNotInProject;
 
 namespace {
 
+/// A command reads a shared project once, unless it takes long.
+constexpr auto freshness = std::chrono::seconds(10);
+
 /// A command stages the text once, at its end.
 project::session::Options sessionOptions() {
     auto const sourceControl = settings().sourceControl ? SourceControl::WhenAsked : SourceControl::Off;
-    return {sourceControl, true};
+    return {sourceControl, true, freshness};
 }
 
 } // namespace
@@ -72,8 +75,10 @@ void OpenProject::requireInProject(Path const& path) {
 }
 
 std::vector<Fault> const& OpenProject::faults() {
-    if (openTransactions_ == 0) {
-        faults_ = log() == nullptr ? text().check() : log()->faults();
+    if (log() != nullptr) {
+        faults_ = log()->faults(); // of what was read: no other client writes in a transaction
+    } else if (openTransactions_ == 0) {
+        faults_ = text().check();
     }
     return faults_;
 }
@@ -90,7 +95,7 @@ void OpenProject::stage() {
 }
 
 void OpenProject::stageReturned() {
-    auto const guard = store().acquireWriteLock();
+    auto const guard = access_.guardForSourceControl();
     std::erase_if(returned_, [this](Path const& file) { return !files().isFileInProject(file); });
     access_.stageReturned(std::exchange(returned_, {}));
 }
@@ -105,11 +110,20 @@ void OpenProject::warnOfReset() {
 }
 
 void OpenProject::warnOfDamage() {
+    if (openTransactions_ == 0) {
+        warnOfFaults();
+    }
+}
+
+void OpenProject::warnOfDamageInLog() {
+    if (log() != nullptr) {
+        warnOfFaults();
+    }
+}
+
+void OpenProject::warnOfFaults() {
     std::size_t count = 0;
     std::string first;
-    if (openTransactions_ > 0) {
-        return;
-    }
     for (auto const& fault : faults()) {
         if (fault.kind == Fault::Kind::Damage || fault.kind == Fault::Kind::Conflict) {
             if (count++ == 0) {

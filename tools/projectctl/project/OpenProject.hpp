@@ -91,6 +91,9 @@ public:
     /// listing may then be incomplete. Does nothing in a transaction. Call this without an open guard.
     void warnOfDamage();
 
+    /// The same for a shared project only, also in a transaction, which has read the log already.
+    void warnOfDamageInLog();
+
     /// Warns on standard error, in one line, if the server of a shared project was reset to an earlier state.
     void warnOfReset();
 
@@ -129,6 +132,7 @@ private:
     explicit OpenProject(Session session);
 
     void stageReturned();
+    void warnOfFaults();
 
     std::shared_ptr<WriteShield>
         shield_; ///< before the session, so that it is destroyed after the last write

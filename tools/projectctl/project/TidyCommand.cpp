@@ -1,4 +1,5 @@
 #include "output/Output.hpp"
+#include "output/Progress.hpp"
 #include "project/Commands.hpp"
 #include "project/ProjectCommand.hpp"
 
@@ -12,6 +13,7 @@ public:
     CLI::App* declare(CLI::App& tool) override { return tool.add_subcommand("tidy"); }
 
     int run(OpenProject& project) override {
+        Progress const progress(Message("ProgressTidy"));
         project.shield().raise();
         if (auto* const log = project.log()) {
             output().say(log->tidy() ? "The log begins with a new body."

@@ -64,9 +64,14 @@ public:
     /// changes made through text().
     void markTextForStaging() noexcept;
 
+    /// A guard for work with git, which only one thread at a time may do: a write guard of a text, so that no
+    /// other process changes it meanwhile. For a shared project a read guard, since the lock of a server
+    /// takes round trips and keeps other machines waiting; use the session with one thread then.
+    cmlink::ReentrantReadWriteLock::LockGuard guardForSourceControl();
+
     /// Stages those of these files whose removal is staged. For files that were removed and are now added
     /// again: adding stages only files that git does not know. A session with EachChange does this itself.
-    /// Takes the write lock.
+    /// Takes guardForSourceControl.
     void stageReturned(std::vector<Path> const& files);
 
     /// Stages that the file which leads to the definition was replaced by another one: the new files, and the
@@ -75,7 +80,7 @@ public:
     void stageReplaced(stores::FileChanges const& files);
 
     /// The files in some folders that git tracks and that are not in the project. If such a folder is
-    /// removed from the project, these files are removed from git's index too. Takes the write lock.
+    /// removed from the project, these files are removed from git's index too. Takes guardForSourceControl.
     /// @param folders absolute.
     /// @return in Path order; empty if source control is off.
     std::vector<Path> trackedOutsideProject(std::vector<Path> const& folders);

@@ -96,6 +96,10 @@ public:
     /// taken, so that the next process finds it, too.
     std::optional<HistoryLoss> historyLoss() const noexcept;
 
+    /// Lets the next guard check for changes, however fresh the last check is: somebody knows that there are
+    /// changes, or asks for them. May be called by any thread, also with a guard open.
+    void requestCheck() noexcept;
+
     /// True if the last read guard showed the last state because the server was unreachable.
     bool isShowingLastState() const noexcept;
 
