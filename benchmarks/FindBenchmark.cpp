@@ -2,9 +2,11 @@
 
 #include "GeneratedTree.hpp"
 #include "Process.hpp"
+#include "project/core/EntryPointManager.hpp"
 #include "project/core/FileManager.hpp"
 #include "project/core/LabelManager.hpp"
 #include "project/entrypoints/EntryPoint.hpp"
+#include "project/files/FileLabel.hpp"
 
 // Queries on 100,000 files in 5,000 folders, of which one in ten has a label, each by a new process, against
 // a plain list of the same project.
