@@ -106,6 +106,7 @@ std::vector<std::string> SharedProjects::members(std::string const& role) const 
     OneSession session(settings_);
     auto const answers = session.run({{membersOfRole, {{role}}}});
     std::vector<std::string> names;
+    names.reserve(static_cast<std::size_t>(answers.front().rows()));
     for (int row = 0; row < answers.front().rows(); ++row) {
         names.push_back(answers.front().text(row, 0));
     }

@@ -41,6 +41,7 @@ void addNamed(Candidates& candidates, std::vector<Named> const& things, std::str
 template <typename Things>
 std::vector<Named> namesSorted(Things const& things) {
     std::vector<Named> result;
+    result.reserve(things.size());
     for (auto const& thing : things) {
         result.push_back({thing.getName(), thing.getUUID()});
     }

@@ -87,12 +87,13 @@ private:
         if (rest_.empty()) {
             return; // the byte is not typed yet
         }
-        bool const isOctal = hasControls && rest_.front() >= '0' && rest_.front() <= '7';
-        char const byte = isOctal ? takeNumber(3, 8) : take();
+        if (hasControls && rest_.front() >= '0' && rest_.front() <= '7') {
+            word() += takeNumber(3, 8);
+            return;
+        }
+        char const byte = take();
         std::size_t const control = controlLetters.find(byte);
-        if (isOctal) {
-            word() += byte;
-        } else if (hasControls && control != std::string_view::npos) {
+        if (hasControls && control != std::string_view::npos) {
             word() += controls[control];
         } else if (hasControls && (byte == 'x' || byte == 'X')) {
             word() += takeNumber(2, 16);
