@@ -26,6 +26,11 @@ void* operator new(std::size_t size) {
     throw std::bad_alloc();
 }
 
+/// Not left to the library: a sanitizer has its own, whose memory must not be freed like this one's.
+void* operator new(std::size_t size, std::nothrow_t const& /*tag*/) noexcept {
+    return std::malloc(size == 0 ? 1 : size);
+}
+
 void operator delete(void* object) noexcept {
     noteAndFree(object);
 }
