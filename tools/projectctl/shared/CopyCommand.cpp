@@ -24,7 +24,6 @@ using project::stores::Disk;
 using project::stores::JournalBackend;
 using project::stores::SharedLocation;
 using project::stores::SharedServer;
-using project::stores::StoreError;
 using project::stores::TextBackend;
 
 /// A new project on a server with a definition as its only entry. It is deleted again unless it is kept.
