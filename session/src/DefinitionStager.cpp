@@ -1,5 +1,6 @@
 #include "DefinitionStager.hpp"
 
+#include <algorithm>
 #include <atomic>
 #include <utility>
 
@@ -63,6 +64,16 @@ void DefinitionStager::stageReturned(std::vector<Path> const& files) {
     }
     if (!returned.empty()) {
         adapter_.addToSourceControl(returned);
+    }
+}
+
+void DefinitionStager::stageReplaced(stores::FileChanges const& files) {
+    auto const states = adapter_.getFileStates(files.removed);
+    bool const wasTracked =
+        std::ranges::any_of(states, [](auto const& state) { return isTracked(state.second.getState()); });
+    if (wasTracked) {
+        adapter_.removeFromSourceControl(files.removed);
+        adapter_.addToSourceControl(files.added);
     }
 }
 

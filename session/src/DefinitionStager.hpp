@@ -5,6 +5,7 @@
 
 #include "cmlink/CMAdapter.hpp"
 #include "project/metadata/MetadataManager.hpp"
+#include "project/stores/Change.hpp"
 
 namespace project::session {
 
@@ -28,6 +29,9 @@ public:
     /// are now added again. CMActionManager adds only files that git does not know, and git knows these.
     /// Call it with a guard of the store held.
     void stageReturned(std::vector<Path> const& files);
+
+    /// Stages that the file of the definition was replaced by another one, if git tracks the old one.
+    void stageReplaced(stores::FileChanges const& files);
 
     /// Counts as a write of the store.
     void noteWritten() noexcept;

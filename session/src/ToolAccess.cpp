@@ -1,17 +1,12 @@
 #include "project/session/ToolAccess.hpp"
 
-#include <algorithm>
-
 #include "FileSearch.hpp"
 #include "FileTree.hpp"
 #include "SessionState.hpp"
-#include "cmlink/LocalStatus.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
 
 namespace project::session {
-
-using cmlink::LocalStatus;
 
 ToolAccess::ToolAccess(Session& session) noexcept : state_(*session.state_) {
 }
@@ -71,18 +66,8 @@ void ToolAccess::stageReturned(std::vector<Path> const& files) {
 }
 
 void ToolAccess::stageReplaced(stores::FileChanges const& files) {
-    if (!state_.adapter) {
-        return;
-    }
-    auto const states = state_.adapter->getFileStates(files.removed);
-    bool const isTracked = std::ranges::any_of(states, [](auto const& state) {
-        auto const status = state.second.getState();
-        return status == LocalStatus::Unmodified || status == LocalStatus::Modified ||
-               status == LocalStatus::Added || status == LocalStatus::Renamed;
-    });
-    if (isTracked) {
-        state_.adapter->removeFromSourceControl(files.removed);
-        state_.adapter->addToSourceControl(files.added);
+    if (state_.stager) {
+        state_.stager->stageReplaced(files);
     }
 }
 

@@ -1,6 +1,6 @@
 #include "project/stores/StoreCopy.hpp"
 
-#include "fl/filesystem/Path.hpp"
+#include "journal/CompleteFile.hpp"
 #include "journal/LocationFile.hpp"
 #include "project/stores/StoreError.hpp"
 #include "text/ProjectText.hpp"
@@ -9,27 +9,6 @@
 namespace project::stores {
 
 namespace {
-
-/// Creates a file that is complete as soon as it has its name. @return false if the name is taken.
-bool createFile(Disk& disk, std::string const& temporary, std::string const& name, std::string_view content) {
-    disk.remove(temporary);
-    disk.create(temporary, content, std::nullopt);
-    try {
-        disk.sync();
-        if (disk.renameToFree(temporary, name)) {
-            return true;
-        }
-    } catch (StoreError const&) {
-        disk.remove(temporary);
-        throw;
-    }
-    disk.remove(temporary);
-    return false;
-}
-
-Path pathOf(Disk const& disk, std::string const& name) {
-    return fl::filesystem::fromSystem(disk.folder()) / fl::filesystem::fromSystem(name);
-}
 
 /// Both kinds of store leave files that source control ignores. A file that somebody has edited stays.
 void ignoreFilesOfBothKinds(Disk& disk, FileChanges& changes) {
@@ -43,7 +22,7 @@ void ignoreFilesOfBothKinds(Disk& disk, FileChanges& changes) {
         disk.create(LocationFile::temporary, wanted, std::nullopt);
         disk.sync();
         disk.rename(LocationFile::temporary, LocationFile::ignored);
-        changes.added.push_back(pathOf(disk, LocationFile::ignored));
+        changes.added.push_back(pathIn(disk, LocationFile::ignored));
     }
 }
 
@@ -63,7 +42,7 @@ void setAside(Disk& disk, std::string const& name) {
 /// Gives the folder a new file for its definition, and sets the old one aside.
 void exchange(Disk& disk, std::string const& temporary, char const* fresh, std::string_view content,
               char const* old, FileChanges& changes) {
-    if (!createFile(disk, temporary, fresh, content)) {
+    if (!createComplete(disk, temporary, fresh, content)) {
         throwTaken(disk, fresh);
     }
     try {
@@ -73,8 +52,8 @@ void exchange(Disk& disk, std::string const& temporary, char const* fresh, std::
         throw;
     }
     disk.syncFolder();
-    changes.added.push_back(pathOf(disk, fresh));
-    changes.removed.push_back(pathOf(disk, old));
+    changes.added.push_back(pathIn(disk, fresh));
+    changes.removed.push_back(pathIn(disk, old));
 }
 
 } // namespace
@@ -105,8 +84,9 @@ FileChanges replaceLocationByText(Disk& disk, std::string_view text) {
         throw StoreError(StoreError::Kind::Refused, disk.folder(), 0, "does not exist", "");
     }
     ignoreFilesOfBothKinds(disk, changes);
-    if (createFile(disk, StoreFiles::newTemporary(), StoreFiles::attributes, StoreFiles::attributesContent)) {
-        changes.added.push_back(pathOf(disk, StoreFiles::attributes));
+    if (createComplete(disk, StoreFiles::newTemporary(), StoreFiles::attributes,
+                       StoreFiles::attributesContent)) {
+        changes.added.push_back(pathIn(disk, StoreFiles::attributes));
     }
     exchange(disk, StoreFiles::newTemporary(), StoreFiles::text, text, LocationFile::name, changes);
     return changes;

@@ -2,8 +2,8 @@
 
 #include <string_view>
 
-#include "fl/filesystem/SystemName.hpp"
 #include "fl/i18n/Utf8.hpp"
+#include "journal/CompleteFile.hpp"
 #include "journal/LocationFile.hpp"
 #include "line/JsonReader.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
@@ -67,18 +67,13 @@ std::string textName() {
     return fl::i18n::toUtf8(TextBackend::textName);
 }
 
-/// Creates a file that is complete as soon as it has its name. @return false if the name is taken.
+/// @return false if the name is taken.
 bool createFile(Disk& disk, char const* name, std::string_view content, FileChanges& created) {
-    disk.remove(LocationFile::temporary);
-    disk.create(LocationFile::temporary, content, std::nullopt);
-    disk.sync();
-    if (!disk.renameToFree(LocationFile::temporary, name)) {
-        disk.remove(LocationFile::temporary);
-        return false;
+    bool const isCreated = createComplete(disk, LocationFile::temporary, name, content);
+    if (isCreated) {
+        created.added.push_back(pathIn(disk, name));
     }
-    created.added.push_back(fl::filesystem::fromSystem(disk.folder()) /
-                            fl::filesystem::fromSystem(std::string(name)));
-    return true;
+    return isCreated;
 }
 
 [[noreturn]] void throwTaken(Disk const& disk) {

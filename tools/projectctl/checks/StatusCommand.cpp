@@ -45,6 +45,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     using Files = std::vector<StatusScan::File>;
 

@@ -13,6 +13,17 @@ struct Named {
     std::u16string uuid;
 };
 
+/// The names of categories, of labels, or of other things with these two getters.
+template <typename Thing>
+std::vector<Named> namesOf(std::vector<Thing> const& things) {
+    std::vector<Named> result;
+    result.reserve(things.size());
+    for (auto const& thing : things) {
+        result.push_back({thing.getName(), thing.getUUID()});
+    }
+    return result;
+}
+
 /// Finds the thing that an argument names: the one with that name, else the one with that UUID.
 /// @param kind the noun for these things, in the plural, for the error.
 /// @return its index; empty when there is none.

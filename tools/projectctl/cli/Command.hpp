@@ -27,6 +27,9 @@ public:
 
     /// Of a group, removes and returns the member that the parsed command line calls; otherwise null.
     virtual std::unique_ptr<Command> takeCalledMember() { return nullptr; }
+
+    /// Whether the command writes a listing, which a terminal shows in a pager.
+    virtual bool isListing() const { return false; }
 };
 
 /// The purpose of a command that help does not show.

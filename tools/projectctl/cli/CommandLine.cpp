@@ -1,9 +1,7 @@
 #include "cli/CommandLine.hpp"
 
 #include <algorithm>
-#include <array>
 #include <optional>
-#include <string_view>
 #include <utility>
 
 #include "cli/CodedFailure.hpp"
@@ -53,17 +51,6 @@ void callIfExternal(std::vector<std::string> const& given, CommandList const& ve
     }
 }
 
-/// Whether the called verb is one that lists things.
-bool isListing(CLI::App const& tool) {
-    static constexpr std::array<std::string_view, 6> names{"list", "status",     "show",
-                                                           "find", "references", "log"};
-    auto const* verb = &tool;
-    for (auto below = tool.get_subcommands(); !below.empty(); below = verb->get_subcommands()) {
-        verb = below.front();
-    }
-    return std::ranges::find(names, verb->get_name()) != names.end();
-}
-
 int show(std::string const& text) {
     output().text() += text;
     output().flush();
@@ -93,7 +80,7 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     }
     std::ranges::for_each(folders, enterFolder);
     std::optional<Pager> pager;
-    if (isListing(tool.parser())) {
+    if (called->isListing()) {
         pager.emplace();
     }
     auto const result = called->run();

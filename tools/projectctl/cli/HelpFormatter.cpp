@@ -5,7 +5,6 @@
 #include <utility>
 #include <vector>
 
-#include "cli/ExitCode.hpp"
 #include "cli/WrappedText.hpp"
 #include "texts/Message.hpp"
 
@@ -73,8 +72,8 @@ void appendMembers(std::string& out, std::vector<VerbDescription> const& members
 
 void appendExitCodes(std::string& out) {
     Rows rows;
-    for (int code = exit_code::done; code <= exit_code::outcomeUnknown; ++code) {
-        rows.emplace_back(std::to_string(code), Message("ExitCode" + std::to_string(code)).text());
+    for (auto const& [code, text] : describeExitCodes()) {
+        rows.emplace_back(code, text);
     }
     appendHeading(out, "HelpExitCodes");
     appendRows(out, rows);

@@ -61,6 +61,12 @@ std::optional<std::u16string> nearest(std::u16string_view wanted, std::vector<st
     return best;
 }
 
+std::optional<std::u16string> nearest(std::u16string_view wanted, std::vector<Named> const& things) {
+    std::vector<std::u16string> names(things.size());
+    std::ranges::transform(things, names.begin(), &Named::name);
+    return nearest(wanted, names);
+}
+
 std::optional<std::string> nearest(std::string const& wanted, std::vector<std::string> const& names) {
     std::vector<std::u16string> converted(names.size());
     std::ranges::transform(names, converted.begin(),

@@ -7,34 +7,11 @@
 #include "cli/CommonOptions.hpp"
 #include "cli/Nearest.hpp"
 #include "cli/TextArguments.hpp"
+#include "cli/VerbTree.hpp"
 
 namespace projectctl {
 
 namespace {
-
-/// The command that the arguments name, as far as they could be parsed, and its full name.
-struct Called {
-    CLI::App const* app;
-    std::string name;
-};
-
-Called calledOf(CLI::App const& tool) {
-    Called result{&tool, "projectctl"};
-    for (auto below = tool.get_subcommands(); !below.empty(); below = result.app->get_subcommands()) {
-        result.app = below.front();
-        result.name += ' ' + result.app->get_name();
-    }
-    return result;
-}
-
-std::string fullNameOf(CLI::App const& app) {
-    return app.get_parent() == nullptr ? app.get_name()
-                                       : fullNameOf(*app.get_parent()) + ' ' + app.get_name();
-}
-
-std::vector<CLI::App const*> membersOf(CLI::App const& group) {
-    return group.get_subcommands([](auto const*) { return true; });
-}
 
 /// A member of another group with exactly this name, with the group: "label put" for "put".
 std::optional<std::string> memberElsewhere(CLI::App const& group, std::string const& word) {
@@ -111,14 +88,14 @@ Message problemOf(CLI::ParseError const& error, CLI::App const& verb) {
 } // namespace
 
 WrongUse wrongUse(CLI::ParseError const& error, CLI::App const& tool) {
-    auto const called = calledOf(tool);
-    return WrongUse(Message("WrongUse", problemOf(error, *called.app).text(), called.name));
+    auto const& called = calledVerb(tool);
+    return WrongUse(Message("WrongUse", problemOf(error, called).text(), callOf(called)));
 }
 
 Message unknownVerb(CLI::App const& group, std::string const& word) {
     auto const meant = meantVerb(group, word);
     auto const problem = meant ? Message("UnknownVerbMeant", word, *meant) : Message("UnknownVerb", word);
-    return Message("WrongUse", problem.text(), fullNameOf(group));
+    return Message("WrongUse", problem.text(), callOf(group));
 }
 
 } // namespace projectctl

@@ -1,6 +1,7 @@
 #include "cli/VerbDescription.hpp"
 
-#include "cli/Command.hpp"
+#include "cli/ExitCode.hpp"
+#include "cli/VerbTree.hpp"
 #include "texts/Message.hpp"
 #include "texts/VerbText.hpp"
 
@@ -8,19 +9,9 @@ namespace projectctl {
 
 namespace {
 
-/// The words that call a verb, without the tool's name.
-std::string nameOf(CLI::App const& verb) {
-    auto const* const parent = verb.get_parent();
-    if (parent == nullptr) {
-        return {};
-    }
-    auto const above = nameOf(*parent);
-    return above.empty() ? verb.get_name() : above + ' ' + verb.get_name();
-}
-
 /// The name of the text with the summary of a verb.
 std::string keyOf(CLI::App const& verb) {
-    auto const name = nameOf(verb);
+    auto const name = wordsOf(verb);
     return name.empty() ? "projectctl" : name;
 }
 
@@ -86,12 +77,12 @@ std::string summaryOf(CLI::App const& verb) {
 }
 
 std::string descriptionOf(CLI::Option const& option, CLI::App const& verb) {
-    return optionText(nameOf(verb), namesOf(option).back());
+    return optionText(wordsOf(verb), namesOf(option).back());
 }
 
 VerbDescription describe(CLI::App const& declared) {
     VerbDescription result;
-    result.name = nameOf(declared);
+    result.name = wordsOf(declared);
     auto const key = keyOf(declared);
     result.summary = summaryOf(declared);
     result.purpose = declared.get_group();
@@ -101,9 +92,19 @@ VerbDescription describe(CLI::App const& declared) {
         auto& list = option->get_positional() ? result.arguments : result.options;
         list.push_back(describe(*option, result.name));
     }
-    for (auto const* member :
-         declared.get_subcommands([](auto const* app) { return app->get_group() != hiddenPurpose; })) {
-        result.members.push_back(describe(*member));
+    for (auto const* member : membersOf(declared)) {
+        if (!isHidden(*member)) {
+            result.members.push_back(describe(*member));
+        }
+    }
+    return result;
+}
+
+std::vector<ExitCodeDescription> describeExitCodes() {
+    std::vector<ExitCodeDescription> result;
+    for (int code = exit_code::done; code <= exit_code::outcomeUnknown; ++code) {
+        auto const number = std::to_string(code);
+        result.push_back({number, Message("ExitCode" + number).text()});
     }
     return result;
 }

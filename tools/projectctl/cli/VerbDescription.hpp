@@ -36,6 +36,15 @@ struct VerbDescription {
     std::string usage() const;
 };
 
+/// An exit code of the tool, as the help and the manual page describe it.
+struct ExitCodeDescription {
+    std::string code;
+    std::string text;
+};
+
+/// The exit codes in ascending order.
+std::vector<ExitCodeDescription> describeExitCodes();
+
 /// The summary of a verb.
 std::string summaryOf(CLI::App const& verb);
 

@@ -7,6 +7,7 @@
 #include "cli/Completes.hpp"
 #include "cli/DeclaredTool.hpp"
 #include "cli/VerbDescription.hpp"
+#include "cli/VerbTree.hpp"
 #include "cli/WorkingFolder.hpp"
 #include "completion/NameCandidates.hpp"
 #include "completion/PathCandidates.hpp"
@@ -24,32 +25,24 @@ std::string shortened(std::string const& description) {
 }
 
 void addMembers(Candidates& candidates, CLI::App& group) {
-    for (auto const* member : group.get_subcommands([](auto*) { return true; })) {
-        if (!member->get_group().empty()) {
+    for (auto const* member : membersOf(group)) {
+        if (!isHidden(*member)) {
             candidates.add(member->get_name(), shortened(summaryOf(*member)));
         }
     }
 }
 
-/// The name of an option for a person, the long one if it has any; empty for an argument.
-std::string nameOf(CLI::Option const& option) {
-    if (!option.get_lnames().empty()) {
-        return "--" + option.get_lnames().front();
-    }
-    return option.get_snames().empty() ? "" : '-' + option.get_snames().front();
-}
-
 /// Adds the options of a command, and those that every command accepts.
 void addOptions(Candidates& candidates, CLI::App& command, CLI::App& tool) {
     auto const add = [&candidates](CLI::Option const& option, CLI::App const& verb) {
-        candidates.add(nameOf(option), shortened(descriptionOf(option, verb)));
+        candidates.add(option.get_name(), shortened(descriptionOf(option, verb)));
     };
-    for (auto const* option : command.get_options([](auto* each) { return !nameOf(*each).empty(); })) {
+    for (auto const* option : command.get_options([](auto* each) { return !each->get_positional(); })) {
         add(*option, command);
     }
     if (&command != &tool) {
         for (auto const* option :
-             tool.get_options([](auto* each) { return isCommonOption(nameOf(*each)); })) {
+             tool.get_options([](auto* each) { return isCommonOption(each->get_name()); })) {
             add(*option, tool);
         }
     }

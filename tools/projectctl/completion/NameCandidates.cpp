@@ -5,6 +5,7 @@
 
 #include "cli/Choice.hpp"
 #include "cli/ShownPaths.hpp"
+#include "entrypoints/EntryTypes.hpp"
 #include "entrypoints/Groups.hpp"
 #include "output/NameForms.hpp"
 #include "project/LabelNames.hpp"
@@ -16,12 +17,6 @@
 namespace projectctl {
 
 namespace {
-
-std::string bytesOf(std::u16string_view text) {
-    std::string result;
-    appendBytes(result, text);
-    return result;
-}
 
 /// A name that is not unique does not identify its thing, and one that begins with a dash would be an option.
 bool isUsable(std::u16string const& name, std::vector<Named> const& things) {
@@ -40,11 +35,7 @@ void addNamed(Candidates& candidates, std::vector<Named> const& things, std::str
 
 template <typename Things>
 std::vector<Named> namesSorted(Things const& things) {
-    std::vector<Named> result;
-    result.reserve(things.size());
-    for (auto const& thing : things) {
-        result.push_back({thing.getName(), thing.getUUID()});
-    }
+    auto result = namesOf(things);
     std::ranges::stable_sort(result, {}, &Named::name);
     return result;
 }
@@ -62,12 +53,7 @@ void addLabels(Candidates& candidates, OpenProject& project, std::string const& 
 }
 
 void addEntryPointGroups(Candidates& candidates, OpenProject& project) {
-    Groups const groups(project.manager().getEntryPointManager());
-    std::vector<Named> names;
-    for (auto const& group : groups.all()) {
-        names.push_back({group->getName(), group->getUUID()});
-    }
-    addNamed(candidates, names, "group");
+    addNamed(candidates, Groups(project.manager().getEntryPointManager()).names(), "group");
 }
 
 void addEntryPoints(Candidates& candidates, OpenProject& project) {
@@ -91,10 +77,8 @@ void addKinds(Candidates& candidates) {
 }
 
 void addEntryPointTypes(Candidates& candidates) {
-    using project::management::EntryPointType;
-    for (auto const type : {EntryPointType::Basic, EntryPointType::Startup, EntryPointType::Shutdown,
-                            EntryPointType::BatchJob}) {
-        candidates.add(bytesOf(toString(type)), "type of entry points");
+    for (auto const& name : entryTypeNames()) {
+        candidates.add(bytesOf(name), "type of entry points");
     }
 }
 

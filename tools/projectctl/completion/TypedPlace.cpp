@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstddef>
 
+#include "cli/VerbTree.hpp"
 #include "output/Failure.hpp"
 
 namespace projectctl {
@@ -46,12 +47,10 @@ public:
     }
 
 private:
-    bool hasMembers() const {
-        return !place_.command->get_subcommands([](auto const*) { return true; }).empty();
-    }
+    bool hasMembers() const { return !membersOf(*place_.command).empty(); }
 
     void enter(std::string const& name) {
-        auto const members = place_.command->get_subcommands([](auto const*) { return true; });
+        auto const members = membersOf(*place_.command);
         auto const found =
             std::ranges::find_if(members, [&name](auto const* member) { return member->get_name() == name; });
         if (found == members.end()) {

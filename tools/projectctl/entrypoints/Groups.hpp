@@ -4,6 +4,7 @@
 #include <string>
 #include <vector>
 
+#include "cli/Choice.hpp"
 #include "project/core/EntryPointManager.hpp"
 #include "project/entrypoints/EntryPointGroup.hpp"
 
@@ -20,6 +21,9 @@ public:
     explicit Groups(project::management::EntryPointManager& entryPoints);
 
     List const& all() const noexcept { return groups_; }
+
+    /// Their names and UUIDs, in the same order.
+    std::vector<Named> names() const;
 
     /// The group with a name or UUID. @param name bytes of an argument.
     /// @throws Failure if there is none, or if several groups have the name.

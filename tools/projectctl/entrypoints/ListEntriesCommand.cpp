@@ -43,6 +43,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     /// For example "src/main.cpp: Startup, main (hidden)".
     void writeLine(std::u16string_view file, EntryPoint const& entry) const {

@@ -23,6 +23,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     static void writeLines(Groups const& groups) {
         for (auto const& group : groups.all()) {

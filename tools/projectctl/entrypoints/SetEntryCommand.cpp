@@ -8,6 +8,7 @@
 #include "cli/PathArguments.hpp"
 #include "cli/TextArguments.hpp"
 #include "entrypoints/EntryCommands.hpp"
+#include "entrypoints/EntryTypes.hpp"
 #include "entrypoints/Groups.hpp"
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
@@ -38,11 +39,7 @@ void requireNoBackslash(Path const& root, Path const& file) {
 }
 
 EntryPointType typeNamed(std::u16string const& name) {
-    std::vector<std::u16string> known;
-    for (auto const type : {EntryPointType::Basic, EntryPointType::Startup, EntryPointType::Shutdown,
-                            EntryPointType::BatchJob}) {
-        known.push_back(project::management::toString(type));
-    }
+    auto const known = entryTypeNames();
     bool const isOtherName = name == u"StartUp" || name == u"Batch Job";
     if (std::ranges::find(known, name) == known.end() && !isOtherName) {
         auto const meant = nearest(name, known);

@@ -41,6 +41,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     static void writeJson(Path const& root, EntryPoint const& entry) {
         EntryRows rows(root);

@@ -38,7 +38,7 @@ private:
             writeLine(unmapped);
             path_ = row.path;
         }
-        auto const owner = ownerBytes(row.label);
+        auto const owner = bytesOf(row.label);
         if (kind == Kind::Folder) {
             unmapped.add(0, inQuotes(row.path) + " is a folder: its owner would own everything below it");
         } else if (!isCodeOwner(owner)) {
@@ -55,19 +55,13 @@ private:
             return;
         }
         std::ranges::sort(owners_);
-        if (auto const line = codeOwnersLine(ownerBytes(path_), owners_)) {
+        if (auto const line = codeOwnersLine(bytesOf(path_), owners_)) {
             output().text() += *line;
             output().flushWhenLarge();
         } else {
             unmapped.add(0, inQuotes(path_) + " has a line end, which no pattern can contain");
         }
         owners_.clear();
-    }
-
-    static std::string ownerBytes(std::u16string const& text) {
-        std::string result;
-        appendBytes(result, text);
-        return result;
     }
 
     std::u16string path_;

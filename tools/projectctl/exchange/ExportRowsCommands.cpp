@@ -3,6 +3,7 @@
 #include "exchange/CsvText.hpp"
 #include "exchange/ExportCommands.hpp"
 #include "exchange/ProjectRows.hpp"
+#include "output/JsonObject.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "project/FileList.hpp"
@@ -11,12 +12,6 @@
 namespace projectctl {
 
 namespace {
-
-std::string rowBytes(std::u16string const& text) {
-    std::string result;
-    appendBytes(result, text);
-    return result;
-}
 
 /// Writes a row for each label of each file.
 class ExportRowsCommand : public ProjectCommand {
@@ -46,8 +41,8 @@ protected:
     void begin() const override { appendCsvRecord(output().text(), {"path", "category", "label", "data"}); }
 
     void write(FileRow const& row) const override {
-        appendCsvRecord(output().text(), {rowBytes(row.path), rowBytes(row.category), rowBytes(row.label),
-                                          rowBytes(row.data)});
+        appendCsvRecord(output().text(),
+                        {bytesOf(row.path), bytesOf(row.category), bytesOf(row.label), bytesOf(row.data)});
     }
 };
 
@@ -57,25 +52,18 @@ public:
 
 protected:
     void write(FileRow const& row) const override {
-        output().text() += '{';
-        writeMember("path", row.path);
+        JsonObject object;
+        object.begin();
+        object.addText("path", row.path);
         if (!row.category.empty() || !row.label.empty()) {
-            output().text() += ", ";
-            writeMember("category", row.category);
-            output().text() += ", ";
-            writeMember("label", row.label);
+            object.addText("category", row.category);
+            object.addText("label", row.label);
         }
         if (!row.data.empty()) {
-            output().text() += ", ";
-            writeMember("data", row.data);
+            object.addText("data", row.data);
         }
-        output().text() += "}\n";
-    }
-
-private:
-    static void writeMember(std::string const& name, std::u16string const& text) {
-        output().text() += '"' + name + "\": ";
-        appendJsonString(output().text(), text);
+        object.end();
+        output().text() += '\n';
     }
 };
 

@@ -23,7 +23,7 @@ public:
 
 protected:
     std::string source(OpenProject& project) const override {
-        return file() ? *file() : bytesOf(defaultFile(project.root()));
+        return file() ? *file() : bytesOf(defaultFile(project.root()).native());
     }
 
     std::string load(OpenProject& project) const override { return readFileOrInput(source(project)); }
@@ -35,8 +35,7 @@ protected:
         }
         ImportedItems result;
         FileList(project).visit(project.root(), [&](FileList::File const& file) {
-            auto const* const rule =
-                file.kind == Kind::File ? owners.ruleOf(bytesOf(Path(file.path))) : nullptr;
+            auto const* const rule = file.kind == Kind::File ? owners.ruleOf(bytesOf(file.path)) : nullptr;
             if (rule != nullptr) {
                 for (auto const& owner : rule->owners) {
                     result.push_back({rule->line, project.root() / Path(file.path),
@@ -48,12 +47,6 @@ protected:
     }
 
 private:
-    static std::string bytesOf(Path const& path) {
-        std::string result;
-        appendBytes(result, path.native());
-        return result;
-    }
-
     static Path defaultFile(Path const& root) {
         for (auto const* const name : {u".github/CODEOWNERS", u"CODEOWNERS", u"docs/CODEOWNERS"}) {
             if (auto file = root / Path(name); isOnDisk(file)) {

@@ -3,11 +3,10 @@
 #include <cstddef>
 #include <vector>
 
-#include "cli/StandardInput.hpp"
 #include "exchange/CsvText.hpp"
 #include "exchange/FileRow.hpp"
-#include "exchange/ImportCommand.hpp"
 #include "exchange/ImportCommands.hpp"
+#include "exchange/ImportTableCommand.hpp"
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 
@@ -64,19 +63,11 @@ private:
 };
 
 /// Adds the files of a table, with labels and their data.
-class ImportCsvCommand : public ImportCommand {
+class ImportCsvCommand : public ImportTableCommand {
 public:
-    CLI::App* declare(CLI::App& group) override {
-        auto* const app = declareForm(group, "csv");
-        declareFile(*app);
-        return app;
-    }
+    ImportCsvCommand() : ImportTableCommand("csv") {}
 
 protected:
-    std::string source(OpenProject& /*project*/) const override { return file().value_or("-"); }
-
-    std::string load(OpenProject& /*project*/) const override { return readFileOrInput(file()); }
-
     ImportedItems itemsIn(std::string const& data, OpenProject& project, Unmapped& unmapped) const override {
         CsvText text(data);
         auto const header = text.next();

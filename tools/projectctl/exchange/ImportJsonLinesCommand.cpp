@@ -1,10 +1,9 @@
 #include <algorithm>
 #include <string_view>
 
-#include "cli/StandardInput.hpp"
 #include "exchange/FileRow.hpp"
-#include "exchange/ImportCommand.hpp"
 #include "exchange/ImportCommands.hpp"
+#include "exchange/ImportTableCommand.hpp"
 #include "exchange/JsonLine.hpp"
 #include "output/Failure.hpp"
 
@@ -13,19 +12,11 @@ namespace projectctl {
 namespace {
 
 /// Adds files with labels and their data, one JSON object per line.
-class ImportJsonLinesCommand : public ImportCommand {
+class ImportJsonLinesCommand : public ImportTableCommand {
 public:
-    CLI::App* declare(CLI::App& group) override {
-        auto* const app = declareForm(group, "jsonl");
-        declareFile(*app);
-        return app;
-    }
+    ImportJsonLinesCommand() : ImportTableCommand("jsonl") {}
 
 protected:
-    std::string source(OpenProject& /*project*/) const override { return file().value_or("-"); }
-
-    std::string load(OpenProject& /*project*/) const override { return readFileOrInput(file()); }
-
     ImportedItems itemsIn(std::string const& data, OpenProject& project, Unmapped& unmapped) const override {
         ImportedItems result;
         std::size_t number = 1;

@@ -10,7 +10,6 @@
 #include "files/Commands.hpp"
 #include "files/DiskFolder.hpp"
 #include "files/DiskWalk.hpp"
-#include "git/GitIgnore.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
 #include "project/ProjectCommand.hpp"
@@ -79,15 +78,8 @@ private:
                 walk.enter(path);
             }
         }
-        auto result = walk.found();
-        if (leavesOutIgnored_) {
-            progress.begin("Asking git for ignored files");
-            result = withoutIgnoredByGit(project.root(), std::move(result));
-        }
         requireReadable(walk, given);
-        requireReadable(walk, result);
-        reportUnaddable(walk, project.root());
-        return result;
+        return contentsToAdd(walk, project.root(), leavesOutIgnored_, progress);
     }
 
     static bool isWithin(Path const& path, Path const& folder) {

@@ -71,6 +71,17 @@ private:
     Nodes result_;
 };
 
+/// Says on standard error which paths the project cannot contain.
+void reportUnaddable(DiskWalk const& walk, Path const& root) {
+    auto const& unaddable = walk.unaddable();
+    if (!unaddable.empty()) {
+        std::size_t const others = unaddable.size() - 1;
+        printError("left out " + inQuotes(std::u16string(ShownPaths(root).ofAbsolute(unaddable.front()))) +
+                   (others > 0 ? " and " + std::to_string(others) + " more" : "") +
+                   ": a name that begins with two dots cannot be added from the project's root");
+    }
+}
+
 } // namespace
 
 void addBelowLabelledFolders(OpenProject& project, std::vector<Path> const& added) {
@@ -90,14 +101,16 @@ void requireReadable(DiskWalk const& walk, std::vector<Path> const& paths) {
     }
 }
 
-void reportUnaddable(DiskWalk const& walk, Path const& root) {
-    auto const& unaddable = walk.unaddable();
-    if (!unaddable.empty()) {
-        std::size_t const others = unaddable.size() - 1;
-        printError("left out " + inQuotes(std::u16string(ShownPaths(root).ofAbsolute(unaddable.front()))) +
-                   (others > 0 ? " and " + std::to_string(others) + " more" : "") +
-                   ": a name that begins with two dots cannot be added from the project's root");
+std::vector<Path> contentsToAdd(DiskWalk const& walk, Path const& root, bool leavesOutIgnored,
+                                Progress& progress) {
+    auto found = walk.found();
+    if (leavesOutIgnored) {
+        progress.begin("Asking git for ignored files");
+        found = withoutIgnoredByGit(root, std::move(found));
     }
+    requireReadable(walk, found);
+    reportUnaddable(walk, root);
+    return found;
 }
 
 std::size_t addWholeTree(OpenProject& project) {
@@ -105,13 +118,8 @@ std::size_t addWholeTree(OpenProject& project) {
     Progress progress("Reading folders");
     DiskWalk walk(root, progress);
     walk.enter(root);
-    auto found = walk.found();
-    if (settings().sourceControl && isInGitRepository(root)) {
-        progress.begin("Asking git for ignored files");
-        found = withoutIgnoredByGit(root, std::move(found));
-    }
-    requireReadable(walk, found);
-    reportUnaddable(walk, root);
+    bool const leavesOutIgnored = settings().sourceControl && isInGitRepository(root);
+    auto const found = contentsToAdd(walk, root, leavesOutIgnored, progress);
     progress.begin("Adding " + std::to_string(found.size()) + " files and folders");
     ProjectTransaction transaction(project);
     project.files().add(found);

@@ -55,6 +55,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     void declareConditions(CLI::App& app) {
         auto* const label = takeTexts(app, "--label", labels_);

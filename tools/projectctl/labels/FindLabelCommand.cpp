@@ -32,6 +32,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     std::optional<std::string> category_;
     std::optional<std::string> label_;

@@ -30,6 +30,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     static void writeLines(std::vector<CategoryIdentifier> const& categories) {
         for (auto const& category : categories) {

@@ -48,6 +48,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     static void writeJson(JsonRows& rows, CategoryIdentifier const& category, LabelIdentifier const& label) {
         rows.begin();

@@ -49,6 +49,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     /// The file manager lists a label that has data twice, first with the data and then without.
     static std::vector<FileLabel> labelsOf(OpenProject& project, Path const& path) {

@@ -6,7 +6,6 @@
 #include <string_view>
 #include <vector>
 
-#include "cli/ExitCode.hpp"
 #include "texts/Message.hpp"
 
 namespace projectctl {
@@ -122,9 +121,8 @@ std::string verbsOf(VerbDescription const& tool) {
 
 std::string exitCodes() {
     std::string result = ".Bl -tag -width Ds\n";
-    for (int code = exit_code::done; code <= exit_code::outcomeUnknown; ++code) {
-        auto const number = std::to_string(code);
-        result += ".It " + number + '\n' + paragraph(Message("ExitCode" + number).text() + '.');
+    for (auto const& [code, text] : describeExitCodes()) {
+        result += ".It " + code + '\n' + paragraph(text + '.');
     }
     return result + ".El\n" + paragraph(Message("HelpOfVerbs").text());
 }

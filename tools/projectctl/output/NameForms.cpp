@@ -66,6 +66,12 @@ void appendBytes(std::string& out, std::u16string_view name) {
     out += onDisk.get() != nullptr ? std::string(onDisk.get()) : fl::i18n::toUtf8(name);
 }
 
+std::string bytesOf(std::u16string_view name) {
+    std::string result;
+    appendBytes(result, name);
+    return result;
+}
+
 std::u16string textOf(std::string const& argument) {
     return fl::filesystem::fromSystem(argument).native();
 }

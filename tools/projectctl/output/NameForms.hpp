@@ -14,6 +14,9 @@ namespace projectctl {
 /// damaged store contains, is appended as UTF-8, with U+FFFD for each character that is not valid.
 void appendBytes(std::string& out, std::u16string_view name);
 
+/// The same as a text of its own.
+std::string bytesOf(std::u16string_view name);
+
 /// The text of an argument. Bytes that are not valid UTF-8 are preserved.
 std::u16string textOf(std::string const& argument);
 

@@ -1,9 +1,5 @@
 #include "project/LabelNames.hpp"
 
-#include <algorithm>
-
-#include <vector>
-
 #include "cli/Choice.hpp"
 #include "cli/Nearest.hpp"
 #include "output/Failure.hpp"
@@ -20,27 +16,6 @@ using project::management::LabelDefinition;
 using project::management::LabelIdentifier;
 using ZEPHRA::project::management::CategoryDoesNotExist;
 
-namespace {
-
-template <typename Thing>
-std::vector<Named> namesOf(std::vector<Thing> const& things) {
-    std::vector<Named> result;
-    result.reserve(things.size());
-    for (auto const& thing : things) {
-        result.push_back({thing.getName(), thing.getUUID()});
-    }
-    return result;
-}
-
-template <typename Thing>
-std::vector<std::u16string> textsOf(std::vector<Thing> const& things) {
-    std::vector<std::u16string> result(things.size());
-    std::ranges::transform(things, result.begin(), &Thing::getName);
-    return result;
-}
-
-} // namespace
-
 CategoryIdentifier LabelNames::category(std::string const& name) {
     std::u16string const wanted = textOf(name);
     if (auto const found = find(wanted)) {
@@ -49,7 +24,7 @@ CategoryIdentifier LabelNames::category(std::string const& name) {
     if (isUUID(wanted)) {
         return labels_.getCategoryByUUID(wanted);
     }
-    if (auto const meant = nearest(wanted, textsOf(labels_.getAllCategories()))) {
+    if (auto const meant = nearest(wanted, namesOf(labels_.getAllCategories()))) {
         throw Failure(Message("CategoryMeant", wanted, *meant));
     }
     project::exception::raise(CategoryDoesNotExist(wanted));
@@ -64,7 +39,7 @@ Label LabelNames::label(std::string const& category, std::string const& name) {
     if (isUUID(wanted)) {
         return {found, labels_.getLabelByUUID(found, wanted)};
     }
-    auto const meant = nearest(wanted, textsOf(labels_.getLabels(found)));
+    auto const meant = nearest(wanted, namesOf(labels_.getLabels(found)));
     throw Failure(meant ? Message("LabelMeant", found.getName(), wanted, *meant)
                         : Message("LabelUnknown", found.getName(), wanted));
 }

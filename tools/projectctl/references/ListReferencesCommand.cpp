@@ -36,6 +36,8 @@ public:
         return 0;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     static void writeJson(std::vector<FolderReference> const& references) {
         JsonRows rows;

@@ -33,6 +33,8 @@ public:
         return graph.isSound() ? exit_code::done : exit_code::finding;
     }
 
+    bool isListing() const override { return true; }
+
 private:
     bool isGraph_ = false; ///< required: the only form so far
     bool isJson_ = false;

@@ -45,6 +45,8 @@ public:
 
     bool canRunInBatch() const override { return false; }
 
+    bool isListing() const override { return true; }
+
 private:
     using Lines = std::map<std::uint64_t, std::string>;
 

@@ -42,6 +42,8 @@ public:
 
     bool canRunInBatch() const override { return false; }
 
+    bool isListing() const override { return true; }
+
 private:
     static void show(std::string const& name, std::string const& value) {
         output().text() += name + '\t' + value + '\n';
