@@ -79,5 +79,15 @@ TEST_P(EnglishManual, showsTheTextsOfTheHelp) {
 
 INSTANTIATE_TEST_SUITE_P(OfVerbs, EnglishManual, ::testing::Values("en"));
 
+class Guide : public ToolTest {};
+
+TEST_F(Guide, hasThePageThatTheTextsOfTheHelpGive) {
+    ASSERT_EQ(runProgram({PROJECTCTL_MANUAL, "--guide", inFolder("verbs.md")}, settings_).exitCode, 0);
+
+    EXPECT_EQ(
+        runProgram({"diff", "-u", PROJECTCTL_GUIDE "/verbs.md", inFolder("verbs.md")}, settings_).output, "")
+        << "'scripts/guide' writes the page";
+}
+
 } // namespace
 } // namespace project::test

@@ -2,6 +2,7 @@
 
 #include "changes/ChangeLines.hpp"
 #include "changes/TransactionChanges.hpp"
+#include "changes/UndoHint.hpp"
 
 namespace projectctl {
 
@@ -14,6 +15,7 @@ bool DryRun::end(ProjectTransaction& transaction, OpenProject& project) const {
         auto const changes = changesOfTransaction(project);
         ChangeLines(project, changes).write();
     } else {
+        noteUndoHint(project);
         transaction.commit();
     }
     return !isOn_;

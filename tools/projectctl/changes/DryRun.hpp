@@ -16,7 +16,7 @@ public:
     void declare(CLI::App& app);
 
     /// Ends the transaction of the command: commits it, or, with the option, writes its changes as
-    /// ChangeLines does and leaves it to be rolled back.
+    /// ChangeLines does and leaves it to be rolled back. A commit notes how git undoes it.
     /// @return whether it was committed.
     bool end(ProjectTransaction& transaction, OpenProject& project) const;
 

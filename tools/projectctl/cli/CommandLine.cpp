@@ -39,14 +39,13 @@ void requireVerb(std::string const& word, CommandList const& verbs) {
 /// that follow it are the program's.
 void callIfExternal(std::vector<std::string> const& given, CommandList const& verbs) {
     auto word = given.begin();
-    std::vector<std::string> folders;
     while (word != given.end() && isCommonOption(*word)) {
-        if (hasFolder(*word++) && word != given.end()) {
-            folders.push_back(*word++);
-        }
+        bool const hasValue = isBeforeItsValue(*word++);
+        word += hasValue && word != given.end() ? 1 : 0;
     }
     if (word != given.end() && isUnknownWord(*word, verbs)) {
-        std::ranges::for_each(folders, enterFolder);
+        std::vector<std::string> options(given.begin(), word);
+        std::ranges::for_each(takeCommonOptions(options), enterFolder);
         callExternalVerb(*word, {word + 1, given.end()});
     }
 }

@@ -14,6 +14,7 @@ enum class Completes {
     NewPaths,     ///< files on disk that are not in the project, and folders
     Files,        ///< files and folders on disk
     Kinds,        ///< of entries: file or folder
+    ColorUses,    ///< auto, always or never
     Folders,      ///< folders on disk
     EntryPoints,  ///< files that are entry points
     EntryPointTypes,

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "cli/WrappedText.hpp"
+#include "output/Colors.hpp"
 #include "texts/Message.hpp"
 
 namespace projectctl {
@@ -18,7 +19,7 @@ constexpr std::size_t indent = 2;
 constexpr std::size_t widestFirst = 20; ///< a longer first column has a line of its own
 
 void appendHeading(std::string& out, std::string const& message) {
-    out += '\n' + Message(message).text() + ":\n";
+    out += '\n' + colored(Color::Heading, Message(message).text() + ':') + '\n';
 }
 
 /// Two columns, of which the second is wrapped.
@@ -85,9 +86,9 @@ std::string helpOf(VerbDescription const& verb) {
     std::string out;
     appendWrapped(out, verb.summary + '.' + (verb.details.empty() ? "" : ' ' + verb.details), 0, 0);
     out += '\n';
-    auto const usage = Message("HelpUsage").text() + ": ";
-    out += usage;
-    appendWrapped(out, verb.usage(), columnsOf(usage), columnsOf(usage));
+    auto const usage = Message("HelpUsage").text() + ':';
+    out += colored(Color::Heading, usage) + ' ';
+    appendWrapped(out, verb.usage(), columnsOf(usage) + 1, columnsOf(usage) + 1);
     appendMembers(out, verb.members);
     appendOptions(out, "HelpArguments", verb.arguments);
     appendOptions(out, "HelpOptionsHeading", verb.options);

@@ -35,7 +35,8 @@ std::string pagerCommand() {
     std::signal(SIGPIPE, SIG_DFL);
     std::signal(SIGXFSZ, SIG_DFL);
     dup2(input, STDIN_FILENO);
-    setenv("LESS", "FRX", 0);
+    setenv("LESS", "FRX", 0); // R: colours reach the terminal
+    setenv("LV", "-c", 0);
     execl("/bin/sh", "sh", "-c", command.c_str(), nullptr);
     _exit(127);
 }

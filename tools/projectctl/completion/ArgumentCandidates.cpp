@@ -111,6 +111,8 @@ void addValues(Candidates& candidates, Completes things, TypedPlace const& place
         return addDiskPaths(candidates, DiskPaths::Folders);
     case Completes::Kinds:
         return addKinds(candidates);
+    case Completes::ColorUses:
+        return addColorUses(candidates);
     case Completes::EntryPointTypes:
         return addEntryPointTypes(candidates);
     case Completes::DataTypes:

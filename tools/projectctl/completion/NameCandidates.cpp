@@ -76,6 +76,12 @@ void addKinds(Candidates& candidates) {
     candidates.add("folder", "");
 }
 
+void addColorUses(Candidates& candidates) {
+    for (auto const* const use : {"auto", "always", "never"}) {
+        candidates.add(use, "");
+    }
+}
+
 void addEntryPointTypes(Candidates& candidates) {
     for (auto const& name : entryTypeNames()) {
         candidates.add(bytesOf(name), "type of entry points");

@@ -26,6 +26,8 @@ void addReferences(Candidates& candidates, OpenProject& project, ReferenceList c
 
 void addKinds(Candidates& candidates);
 
+void addColorUses(Candidates& candidates);
+
 void addEntryPointTypes(Candidates& candidates);
 
 /// Offers the types of the data of labels.

@@ -52,7 +52,7 @@ private:
             appendBytes(output().text(), file);
             output().text() += '\0';
         } else {
-            output().name(file);
+            output().pathBesideData(file);
             output().text() += ": ";
             output().name(toString(entry.getType()));
             output().text() += ", ";

@@ -16,6 +16,8 @@ int ImportCommand::run(OpenProject& project) {
     auto const items = itemsIn(data, project, unmapped);
     ItemImport import(project, items, unmapped);
     import.run();
+    project.changedFiles().listed += import.addedFiles();
+    project.changedFiles().labelled += import.putLabels();
     if (dryRun_.end(transaction, project)) {
         output().say(std::to_string(import.addedFiles()) + " files and folders added, " +
                      std::to_string(import.putLabels()) + " labels put on files");

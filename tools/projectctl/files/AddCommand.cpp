@@ -61,6 +61,7 @@ private:
         addBelowLabelledFolders(project, added);
         project.stageReturnedLater(added);
         project.stageReturnedLater(skipped);
+        project.changedFiles().listed += added.size();
         if (dryRun_.end(transaction, project)) {
             output().say(std::to_string(added.size()) + " added to the project" +
                          (skipped.empty() ? "" : ", " + std::to_string(skipped.size()) + " already in it"));

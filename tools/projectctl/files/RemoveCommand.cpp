@@ -34,6 +34,7 @@ public:
         warnOfTrackedFiles(project, paths);
         Progress const progress("Removing " + std::to_string(paths.size()) + " files and folders");
         auto const removed = project.files().remove(paths);
+        project.changedFiles().listed += removed.size();
         if (dryRun_.end(transaction, project)) {
             output().say(std::to_string(removed.size()) + " removed from the project");
         }

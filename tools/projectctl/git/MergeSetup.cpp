@@ -10,6 +10,7 @@
 
 #include "git/GitCommand.hpp"
 #include "output/Failure.hpp"
+#include "output/NameForms.hpp"
 
 namespace projectctl {
 
@@ -45,8 +46,7 @@ constexpr std::string_view quoteInQuotes = R"('\'')";
 
 /// The program in single quotes for the shell, and with its percent signs doubled for git.
 std::string commandFor(std::string const& program) {
-    std::string const quoted = '\'' + replaced(replaced(program, "'", quoteInQuotes), "%", "%%") + '\'';
-    return std::string(commandStart) + quoted + std::string(commandEnd);
+    return std::string(commandStart) + replaced(quotedForShell(program), "%", "%%") + std::string(commandEnd);
 }
 
 /// The program that a command of commandFor calls; empty for any other command.

@@ -4,9 +4,11 @@
 #include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/CategoryCommands.hpp"
+#include "labels/LabelRemoval.hpp"
 #include "output/Progress.hpp"
 #include "project/LabelNames.hpp"
 #include "project/ProjectCommand.hpp"
+#include "project/ProjectTransaction.hpp"
 
 namespace projectctl {
 
@@ -21,10 +23,13 @@ public:
     }
 
     int run(OpenProject& project) override {
-        auto const guard = project.store().acquireWriteLock();
+        ProjectTransaction transaction(project);
         auto& labels = project.manager().getLabelManager();
         Progress const progress("Removing the labels of the category from all files");
-        labels.deleteCategory(LabelNames(labels).category(*category_));
+        auto const category = LabelNames(labels).category(*category_);
+        noteRemoval(project, LabelNames(labels).choice(*category_, std::nullopt));
+        labels.deleteCategory(category);
+        transaction.commit();
         return 0;
     }
 

@@ -4,9 +4,11 @@
 #include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "labels/LabelCommands.hpp"
+#include "labels/LabelRemoval.hpp"
 #include "output/Progress.hpp"
 #include "project/LabelNames.hpp"
 #include "project/ProjectCommand.hpp"
+#include "project/ProjectTransaction.hpp"
 
 namespace projectctl {
 
@@ -22,11 +24,13 @@ public:
     }
 
     int run(OpenProject& project) override {
-        auto const guard = project.store().acquireWriteLock();
+        ProjectTransaction transaction(project);
         auto& labels = project.manager().getLabelManager();
         Progress const progress("Removing the label from all files");
         auto const label = LabelNames(labels).label(*category_, *label_);
+        noteRemoval(project, LabelNames(labels).choice(*category_, label_));
         labels.deleteLabel(label.getCategory(), label.getLabelIdentifier());
+        transaction.commit();
         return 0;
     }
 

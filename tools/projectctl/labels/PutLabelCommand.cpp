@@ -25,6 +25,7 @@ private:
         auto lacking = paths;
         std::erase_if(lacking, [&](Path const& path) { return countOn(project, path, label) > 0; });
         auto const replaced = project.files().addLabels(lacking, {label});
+        project.changedFiles().labelled += lacking.size();
         return "put on " + std::to_string(lacking.size()) +
                (replaced.empty() ? "" : ", replacing " + std::to_string(replaced.size()) + " others");
     }

@@ -85,7 +85,7 @@ private:
     /// @param path empty if the line should not show it.
     static void writeLine(std::u16string_view path, FileLabel const& label) {
         if (!path.empty()) {
-            output().name(path);
+            output().pathBesideData(path);
             output().text() += ": ";
         }
         output().name(label.getCategory().getName());

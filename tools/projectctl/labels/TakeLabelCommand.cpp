@@ -32,6 +32,7 @@ private:
                 most = std::max(most, count);
             }
         }
+        project.changedFiles().labelled += labelled.size();
         if (!labelled.empty()) {
             project.files().removeLabels(labelled, std::vector(most, label)); // each element removes one
         }

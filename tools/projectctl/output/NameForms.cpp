@@ -109,6 +109,14 @@ std::string shown(fl::filesystem::Path const& path) {
     return fl::i18n::toUtf8(path.native());
 }
 
+std::string quotedForShell(std::string_view bytes) {
+    std::string result = "'";
+    for (char const byte : bytes) {
+        result += byte == '\'' ? "'\\''" : std::string(1, byte);
+    }
+    return result + '\'';
+}
+
 std::string withoutControls(std::string_view text, bool lineBreaks) {
     std::string result;
     for (std::size_t index = 0; index < text.size();) {

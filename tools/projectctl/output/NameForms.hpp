@@ -35,6 +35,9 @@ std::string inQuotes(std::u16string_view text);
 /// A path for a message, in UTF-8.
 std::string shown(fl::filesystem::Path const& path);
 
+/// Bytes as one word for a shell, in single quotes.
+std::string quotedForShell(std::string_view bytes);
+
 /// Text in a form that is safe for a terminal: control characters other than tabs are replaced by C escapes.
 /// @param lineBreaks whether line feeds are kept.
 std::string withoutControls(std::string_view text, bool lineBreaks);

@@ -6,6 +6,7 @@
 
 #include <unistd.h>
 
+#include "output/Colors.hpp"
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "output/Progress.hpp"
@@ -29,6 +30,12 @@ void Output::name(std::u16string_view name) {
     } else {
         appendBytes(text_, name);
     }
+}
+
+void Output::pathBesideData(std::u16string_view path) {
+    text_ += beginOf(Color::FilePath);
+    name(path);
+    text_ += endOfColor();
 }
 
 void Output::flushWhenLarge() {
@@ -64,6 +71,10 @@ void Output::flush() {
 Output& output() {
     static Output standardOutput(STDOUT_FILENO);
     return standardOutput;
+}
+
+void printHint(std::string const& text) noexcept {
+    printError("hint: " + text);
 }
 
 void printError(std::string_view text) noexcept {

@@ -26,6 +26,9 @@ public:
     /// Appends a name or path: as appendQuoted does on a terminal, otherwise its bytes.
     void name(std::u16string_view name);
 
+    /// The same for a path that other data follows on its line: in its colour.
+    void pathBesideData(std::u16string_view path);
+
     /// Writes the buffer when it is large enough to be worth a system call.
     void flushWhenLarge();
 
@@ -67,6 +70,9 @@ private:
 
 /// Standard output.
 Output& output();
+
+/// Writes "projectctl: hint: " and the text to standard error, as printError does.
+void printHint(std::string const& text) noexcept;
 
 /// Writes "projectctl: " and the text to standard error, as one line: line feeds are escaped.
 void printError(std::string_view text) noexcept;

@@ -100,6 +100,12 @@ void OpenProject::stageReturned() {
     access_.stageReturned(std::exchange(returned_, {}));
 }
 
+void OpenProject::showHint() const {
+    if (hint_) {
+        printHint(hint_->text());
+    }
+}
+
 void OpenProject::warnOfReset() {
     auto const loss = log() == nullptr ? std::nullopt : log()->historyLoss();
     if (loss && loss->kind == HistoryLoss::Kind::Reset) {

@@ -3,6 +3,7 @@
 #include <chrono>
 #include <cstddef>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -12,6 +13,7 @@
 #include "project/stores/JournalBackend.hpp"
 #include "project/stores/Node.hpp"
 #include "project/stores/TextBackend.hpp"
+#include "texts/Message.hpp"
 
 namespace projectctl {
 
@@ -125,6 +127,23 @@ public:
         return access_.trackedOutsideProject(folders);
     }
 
+    /// Files that the command has changed.
+    struct ChangedFiles {
+        std::size_t listed = 0;   ///< added to the file list or removed from it
+        std::size_t labelled = 0; ///< with other labels
+
+        std::size_t total() const noexcept { return listed + labelled; }
+    };
+
+    ChangedFiles& changedFiles() noexcept { return changed_; }
+
+    bool isInNestedTransaction() const noexcept { return openTransactions_ > 1; }
+
+    /// Shows this on standard error at the end of the command.
+    void setHint(Message const& hint) { hint_ = hint; }
+
+    void showHint() const;
+
 private:
     friend class ProjectTransaction;
     using Session = project::session::Session;
@@ -141,6 +160,8 @@ private:
     std::vector<Path> returned_; ///< of stageReturnedLater
     std::vector<project::stores::Fault> faults_;
     std::size_t openTransactions_ = 0;
+    ChangedFiles changed_;
+    std::optional<Message> hint_;
 };
 
 } // namespace projectctl

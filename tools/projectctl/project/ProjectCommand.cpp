@@ -7,6 +7,7 @@ int ProjectCommand::run() {
     auto const result = run(project);
     project.stage();
     project.warnOfReset();
+    project.showHint();
     return result;
 }
 
