@@ -23,7 +23,7 @@ using Broadcaster = DispatchableProjectEventBroadcaster;
 /// Sorts differences by the event that reports them.
 class Sorting {
 public:
-    explicit Sorting(Path const& root) : root_(root) {}
+    Sorting(Path const& root, FileEvents fileEvents) : root_(root), fileEvents_(fileEvents) {}
 
     void take(Difference const& difference);
 
@@ -40,6 +40,7 @@ private:
     void takeFile(Difference const& difference);
 
     Path const& root_;
+    FileEvents fileEvents_;
     bool name_ = false;
     std::vector<Difference> categories_;
     std::set<Path> files_;
@@ -91,10 +92,12 @@ void Sorting::takeFile(Difference const& difference) {
         index + 1 == address.depth() && address[index].getType() == schema::files::markerType;
     bool const isItself = index == address.depth() || isMarker;
     bool const isAddedOrRemoved = isItself && (difference.before == nullptr) != (difference.after == nullptr);
-    if (isAddedOrRemoved) {
+    auto const hasLabels = [](stores::Node const& node) { return node && !node->getChildren().empty(); };
+    bool const isListed = fileEvents_ == FileEvents::All;
+    if (isAddedOrRemoved && isListed) {
         files_.insert(files_.end(), path); // the differences are sorted, except for unusual names
     }
-    if (!isAddedOrRemoved || (difference.after && !difference.after->getChildren().empty())) {
+    if (!isAddedOrRemoved || hasLabels(difference.after) || (!isListed && hasLabels(difference.before))) {
         labelled_.insert(path);
     }
 }
@@ -124,8 +127,8 @@ std::vector<Event> Sorting::events(std::vector<Event> ofCategories) const {
 } // namespace
 
 std::vector<Event> eventsOf(Changes const& changes, std::shared_ptr<metadata::MetadataManager> const& store,
-                            Path const& root) {
-    Sorting sorting(root);
+                            Path const& root, FileEvents fileEvents) {
+    Sorting sorting(root, fileEvents);
     for (auto const& difference : changes.differences) {
         sorting.take(difference);
     }

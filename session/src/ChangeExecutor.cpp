@@ -5,15 +5,19 @@
 
 namespace project::session {
 
-ChangeExecutor::ChangeExecutor(stores::TreeMetadataManager& store, git::GitAdapter* adapter,
-                               DefinitionStager* stager, TransactionFiles& files, EventQueue& raised,
-                               std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers)
+ChangeExecutor::ChangeExecutor(
+    stores::TreeMetadataManager& store, git::GitAdapter* adapter, DefinitionStager* stager,
+    TransactionFiles& files, EventQueue& raised,
+    std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers, PersonalSteps* personal,
+    std::shared_ptr<management::DispatchableProjectEventBroadcaster> personalObservers)
     : store_(store),
       adapter_(adapter),
       stager_(stager),
       files_(files),
       raised_(raised),
-      observers_(std::move(observers)) {
+      observers_(std::move(observers)),
+      personal_(personal),
+      personalObservers_(std::move(personalObservers)) {
 }
 
 void ChangeExecutor::run(std::function<void()> const& operation, ChangedFiles const& files) {
@@ -56,12 +60,6 @@ void ChangeExecutor::publish(git::GitAdapter::Batch& batch) {
             stager_->noteWritten(); // the text is not staged after all
         }
         throw;
-    }
-}
-
-void ChangeExecutor::dispatch(std::vector<Event> const& events) {
-    for (auto const& event : events) {
-        event(*observers_);
     }
 }
 

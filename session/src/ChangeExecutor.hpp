@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "EventQueue.hpp"
+#include "PersonalSteps.hpp"
 #include "TransactionFiles.hpp"
 #include "project/git/GitAdapter.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
@@ -25,9 +26,13 @@ public:
     /// @param stager null if the text is not staged after each change.
     /// @param raised the queue of the events that the managers raise.
     /// @param observers the broadcaster to dispatch these events on.
-    ChangeExecutor(stores::TreeMetadataManager& store, git::GitAdapter* adapter, DefinitionStager* stager,
-                   TransactionFiles& files, EventQueue& raised,
-                   std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers);
+    /// @param personal the personal part of the steps, with the broadcaster for its events; may be null.
+    ChangeExecutor(
+        stores::TreeMetadataManager& store, git::GitAdapter* adapter, DefinitionStager* stager,
+        TransactionFiles& files, EventQueue& raised,
+        std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers,
+        PersonalSteps* personal = nullptr,
+        std::shared_ptr<management::DispatchableProjectEventBroadcaster> personalObservers = nullptr);
 
     /// Runs one operation as a step.
     /// @param files the files that the operation adds to the project or removes from it.
@@ -44,6 +49,18 @@ public:
         }
     }
 
+    /// Whether a step is open. The caller holds a guard of the store: the step is one of its own thread then.
+    bool isInStep() const noexcept { return openSteps_ > 0; }
+
+    /// Lets the open steps take part in the personal text, before a personal change in them.
+    void joinPersonal() { personal_->join(openSteps_); }
+
+    /// The broadcaster for the events of the personal text.
+    std::shared_ptr<management::DispatchableProjectEventBroadcaster> const&
+    personalObservers() const noexcept {
+        return personalObservers_;
+    }
+
 private:
     friend class ChangeStep;
 
@@ -51,7 +68,6 @@ private:
     void stage(git::GitAdapter::Batch* batch);
     void stageText(std::vector<Path> const& added);
     void publish(git::GitAdapter::Batch& batch);
-    void dispatch(std::vector<Event> const& events);
 
     stores::TreeMetadataManager& store_;
     git::GitAdapter* adapter_;
@@ -59,6 +75,8 @@ private:
     TransactionFiles& files_;
     EventQueue& raised_;
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers_;
+    PersonalSteps* personal_;
+    std::shared_ptr<management::DispatchableProjectEventBroadcaster> personalObservers_;
     std::size_t openSteps_ = 0;
 };
 

@@ -51,6 +51,8 @@ void ChangeStep::commit() {
 
 void ChangeStep::commitOutermost() {
     std::vector<Event> events;
+    std::vector<Event> personalEvents;
+    std::exception_ptr personalError;
     std::exception_ptr stagingError;
     {
         auto const guard = executor_.store_.acquireWriteLock(); // until the text is staged
@@ -60,12 +62,21 @@ void ChangeStep::commitOutermost() {
         }
         commitWrites();
         events = executor_.raised_.take();
+        if (executor_.personal_ != nullptr) {
+            personalError = errorOf([&] { executor_.personal_->commit(depth_); });
+            personalEvents = executor_.personal_->raised().take();
+        }
         stagingError = errorOf([&] { executor_.stage(batch ? &*batch : nullptr); });
     }
     // The step is committed, so observers are called even if it could not be staged.
-    auto const slotError = errorOf([&] { executor_.dispatch(events); });
-    if (auto const& error = stagingError ? stagingError : slotError) {
-        std::rethrow_exception(error);
+    auto const slotError = errorOf([&] {
+        dispatch(events, *executor_.observers_);
+        dispatch(personalEvents, *executor_.personalObservers_);
+    });
+    for (auto const& error : {personalError, stagingError, slotError}) {
+        if (error) {
+            std::rethrow_exception(error);
+        }
     }
 }
 
@@ -75,6 +86,9 @@ void ChangeStep::commitWrites() {
             executor_.files_.passToSourceControl();
         }
         writes_.commit();
+        if (!isOutermost() && executor_.personal_ != nullptr) {
+            executor_.personal_->commit(depth_);
+        }
     } catch (...) {
         if (!writes_.isOpen()) {
             end();
@@ -91,6 +105,9 @@ void ChangeStep::end() noexcept {
 
 void ChangeStep::drop() noexcept {
     executor_.raised_.dropBehind(earlierEvents_);
+    if (executor_.personal_ != nullptr) {
+        executor_.personal_->rollBack(depth_);
+    }
     executor_.files_.dropSince(earlierFiles_);
     if (isOutermost()) {
         if (kind_ == Kind::Transaction) {

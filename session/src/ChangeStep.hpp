@@ -13,6 +13,8 @@ namespace project::session {
 ///    collects. A step that ends without a commit is rolled back, and its events are dropped.
 /// 3. The outermost step commits: the store writes one batch and notifies source control, which prepares its
 ///    change of git's index. A failure rolls the step back, with the prepared change.
+///    Then the personal text is committed, if the step has changed it. A failure of that is thrown at the
+///    end.
 /// 4. It adds the text to the prepared change, if the session stages each change, and writes git's index.
 /// 5. It releases the guard and dispatches the events.
 ///
@@ -34,8 +36,8 @@ public:
     /// Ends the step. A nested step leaves everything else to the outer one.
     /// @throws std::logic_error as stores::Transaction::commit; nothing changes.
     /// @throws an exception of the store or of source control: the step is rolled back. Otherwise the error
-    ///         of staging, else the exception of a slot: the step is committed, and the events were
-    ///         dispatched.
+    ///         of the personal text, whose changes are rolled back, else the error of staging, else the
+    ///         exception of a slot: the step is committed, and the events were dispatched.
     void commit();
 
 private:

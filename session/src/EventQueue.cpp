@@ -22,6 +22,12 @@ auto appendTo(std::vector<Event>& events, void (Broadcaster::*dispatch)(Argument
 
 } // namespace
 
+void dispatch(std::vector<Event> const& events, Broadcaster& observers) {
+    for (auto const& event : events) {
+        event(observers);
+    }
+}
+
 // No manager raises metadataChange.
 EventQueue::EventQueue() : input_(std::make_shared<Broadcaster>()) {
     input_->onFileListUpdate(appendTo(events_, &Broadcaster::dispatchOnFileListUpdate));

@@ -11,6 +11,9 @@ namespace project::session {
 /// An event that is still to be dispatched.
 using Event = std::function<void(management::DispatchableProjectEventBroadcaster&)>;
 
+/// Dispatches events in their order. An exception of a slot ends it.
+void dispatch(std::vector<Event> const& events, management::DispatchableProjectEventBroadcaster& observers);
+
 /// Collects the events that the managers raise, so that they can be dispatched when no lock is held.
 ///
 /// It has no lock of its own: events are raised and taken under the store's write guard.

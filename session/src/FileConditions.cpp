@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "FileTree.hpp"
 #include "project/metadata/TreeSchema.hpp"
 
 namespace project::session {
@@ -40,7 +41,7 @@ bool isChosen(MetadataNode const& category, MetadataNode const& label, LabelChoi
                                  (choice->labelUUID.empty() || choice->labelUUID == uuid));
 }
 
-bool hasLabel(MetadataNode const& file, LabelChoice const* choice) {
+bool isLabelled(MetadataNode const& file, LabelChoice const* choice) {
     return std::ranges::any_of(file.getChildren(), [choice](auto const& category) {
         return category->getType() == fileSchema::categoryType &&
                std::ranges::any_of(category->getChildren(), [choice, &category](auto const& label) {
@@ -51,7 +52,8 @@ bool hasLabel(MetadataNode const& file, LabelChoice const* choice) {
 
 } // namespace
 
-FileConditions::FileConditions(Query const& query, stores::TreeMetadataManager& store)
+FileConditions::FileConditions(Query const& query, stores::TreeMetadataManager& store,
+                               stores::TreeMetadataManager& personal, fl::filesystem::Path const& root)
     : query_(query),
       hasLabelConditions_(!query.labels.empty() || !query.absentLabels.empty() || query.isUnlabelled) {
     if (query.glob) {
@@ -64,18 +66,34 @@ FileConditions::FileConditions(Query const& query, stores::TreeMetadataManager& 
                            files);
         entryPoints_ = files.take();
     }
+    if (hasLabelConditions_ && query.layers != Layers::Project) {
+        auto const guard = personal.acquireReadLock();
+        FileTree(personal, root).visit(root, [this](VisitedFile const& file) {
+            if (!file.node.getChildren().empty()) {
+                personal_.emplace(file.path, file.node);
+            }
+        });
+    }
 }
 
 bool FileConditions::hold(VisitedFile const& file) const {
     return (!query_.kind || *query_.kind == file.kind) &&
            (!query_.isEntryPoint || entryPoints_.contains(file.path)) &&
-           (!hasLabelConditions_ || holdForLabels(file.node)) && (!glob_ || glob_->isMatch(file.path));
+           (!hasLabelConditions_ || holdForLabels(file)) && (!glob_ || glob_->isMatch(file.path));
 }
 
-bool FileConditions::holdForLabels(MetadataNode const& node) const {
-    auto const has = [&node](LabelChoice const& choice) { return hasLabel(node, &choice); };
+bool FileConditions::holdForLabels(VisitedFile const& file) const {
+    auto const has = [this, &file](LabelChoice const& choice) { return hasLabel(file, &choice); };
     return std::ranges::all_of(query_.labels, has) && std::ranges::none_of(query_.absentLabels, has) &&
-           (!query_.isUnlabelled || !hasLabel(node, nullptr));
+           (!query_.isUnlabelled || !hasLabel(file, nullptr));
+}
+
+bool FileConditions::hasLabel(VisitedFile const& file, LabelChoice const* choice) const {
+    if (query_.layers != Layers::Personal && isLabelled(file.node, choice)) {
+        return true;
+    }
+    auto const personal = personal_.find(file.path);
+    return personal != personal_.end() && isLabelled(personal->second, choice);
 }
 
 } // namespace project::session

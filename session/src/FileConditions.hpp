@@ -1,5 +1,7 @@
 #pragma once
 
+#include <functional>
+#include <map>
 #include <optional>
 #include <set>
 #include <string>
@@ -7,6 +9,8 @@
 #include <vector>
 
 #include "Glob.hpp"
+#include "fl/filesystem/Path.hpp"
+#include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/session/Query.hpp"
 #include "project/session/ToolAccess.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
@@ -17,21 +21,26 @@ namespace project::session {
 /// time.
 class FileConditions {
 public:
-    /// Reads the entry points if the query asks for them. The caller holds a guard of the store until the
-    /// last check.
+    /// Reads the entry points and the personal labels if the query asks for them. The caller holds a guard of
+    /// the store until the last check.
     /// @param query must outlive this object.
-    FileConditions(Query const& query, stores::TreeMetadataManager& store);
+    /// @param root of the project.
+    FileConditions(Query const& query, stores::TreeMetadataManager& store,
+                   stores::TreeMetadataManager& personal, fl::filesystem::Path const& root);
 
     /// Whether a file meets all of them, except that it is at or below one of the paths.
     bool hold(VisitedFile const& file) const;
 
 private:
-    bool holdForLabels(metadata::MetadataNode const& node) const;
+    bool holdForLabels(VisitedFile const& file) const;
+    bool hasLabel(VisitedFile const& file, LabelChoice const* choice) const;
 
     Query const& query_;
     bool hasLabelConditions_;
     std::optional<Glob> glob_;
     std::set<std::u16string, std::less<>> entryPoints_; ///< their files, relative to the root
+    std::map<std::u16string, metadata::MetadataNodeSpecification, std::less<>>
+        personal_; ///< the nodes with personal labels, by path relative to the root
 };
 
 } // namespace project::session

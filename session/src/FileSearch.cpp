@@ -29,10 +29,10 @@ std::vector<Path> startsOf(Query const& query, Path const& root) {
 
 } // namespace
 
-void visitFound(Query const& query, stores::TreeMetadataManager& store, Path const& root,
-                FileVisitor const& visitor) {
+void visitFound(Query const& query, stores::TreeMetadataManager& store, stores::TreeMetadataManager& personal,
+                Path const& root, FileVisitor const& visitor) {
     FileTree const files(store, root);
-    FileConditions const conditions(query, store);
+    FileConditions const conditions(query, store, personal, root);
     for (auto const& start : startsOf(query, root)) {
         files.visit(start, [&](VisitedFile const& file) {
             if (conditions.hold(file)) {

@@ -59,12 +59,17 @@ management::ProjectManager& Session::project() noexcept {
     return *state_->project;
 }
 
+Personal& Session::personal() noexcept {
+    return state_->personal;
+}
+
 std::vector<FoundFile> Session::find(Query const& query) {
     std::vector<FoundFile> result;
     auto const guard = state_->store->acquireReadLock();
-    visitFound(query, *state_->store, state_->root, [&](VisitedFile const& file) {
-        result.push_back({state_->root / Path(file.path), file.kind});
-    });
+    visitFound(query, *state_->store, *state_->personalStore.tree(), state_->root,
+               [&](VisitedFile const& file) {
+                   result.push_back({state_->root / Path(file.path), file.kind});
+               });
     return result;
 }
 

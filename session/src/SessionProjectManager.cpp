@@ -1,8 +1,10 @@
 #include "SessionProjectManager.hpp"
 
+#include <exception>
 #include <utility>
 
 #include "project/files/FileLabel.hpp"
+#include "project/stores/StoreError.hpp"
 
 namespace project::session {
 
@@ -20,7 +22,26 @@ void SessionFileManager::add(std::vector<Path> const& files) {
 }
 
 std::vector<Path> SessionFileManager::remove(std::vector<Path> const& files) {
-    return executor_.execute([&] { return FileManagerDecorator::remove(files); }, {.removed = files});
+    return executor_.execute(
+        [&] {
+            auto removed = FileManagerDecorator::remove(files);
+            removeFromPersonal(files);
+            return removed;
+        },
+        {.removed = files});
+}
+
+/// A personal text that cannot be read or locked must not prevent a change of the project. Labels that stay
+/// are hidden.
+void SessionFileManager::removeFromPersonal(std::vector<Path> const& files) {
+    try {
+        if (!personal_.containedIn(files).empty()) {
+            executor_.joinPersonal();
+            personal_.remove(files);
+        }
+    } catch (stores::StoreError const&) {
+        personal_.steps().keepError(std::current_exception());
+    }
 }
 
 std::vector<FileLabel> SessionFileManager::addLabels(std::vector<Path> const& files,
@@ -86,10 +107,10 @@ void SessionFolderReferenceManager::removeReferences(std::vector<FolderReference
 }
 
 SessionProjectManager::SessionProjectManager(std::unique_ptr<management::ProjectManager> inner,
-                                             ChangeExecutor& executor)
+                                             ChangeExecutor& executor, PersonalStore& personal)
     : ProjectManagerDecorator(std::move(inner)),
       executor_(executor),
-      files_(ProjectManagerDecorator::getFileManager(), executor),
+      files_(ProjectManagerDecorator::getFileManager(), executor, personal),
       labels_(ProjectManagerDecorator::getLabelManager(), executor),
       entryPoints_(ProjectManagerDecorator::getEntryPointManager(), executor),
       projectPath_(ProjectManagerDecorator::getProjectPathManager(), executor),

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "ChangeExecutor.hpp"
+#include "PersonalStore.hpp"
 #include "project/decorators/EntryPointManagerDecorator.hpp"
 #include "project/decorators/FileManagerDecorator.hpp"
 #include "project/decorators/FolderReferenceManagerDecorator.hpp"
@@ -23,8 +24,9 @@ namespace project::session {
 
 class SessionFileManager : public management::FileManagerDecorator {
 public:
-    SessionFileManager(management::FileManager& inner, ChangeExecutor& executor)
-        : FileManagerDecorator(inner), executor_(executor) {}
+    /// @param personal loses the labels of the files that are removed.
+    SessionFileManager(management::FileManager& inner, ChangeExecutor& executor, PersonalStore& personal)
+        : FileManagerDecorator(inner), executor_(executor), personal_(personal) {}
 
     void add(std::vector<management::Path> const& files) override;
     std::vector<management::Path> remove(std::vector<management::Path> const& files) override;
@@ -36,7 +38,10 @@ public:
                         management::CategoryIdentifier const& category) override;
 
 private:
+    void removeFromPersonal(std::vector<management::Path> const& files);
+
     ChangeExecutor& executor_;
+    PersonalStore& personal_;
 };
 
 class SessionLabelManager : public management::LabelManagerDecorator {
@@ -89,8 +94,9 @@ private:
 class SessionProjectManager : public management::ProjectManagerDecorator {
 public:
     /// @param inner the project with all other layers; not null.
-    /// @param executor borrowed; must outlive this object.
-    SessionProjectManager(std::unique_ptr<management::ProjectManager> inner, ChangeExecutor& executor);
+    /// @param executor, personal borrowed; must outlive this object.
+    SessionProjectManager(std::unique_ptr<management::ProjectManager> inner, ChangeExecutor& executor,
+                          PersonalStore& personal);
 
     management::EntryPointManager& getEntryPointManager() override { return entryPoints_; }
 

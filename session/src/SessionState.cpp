@@ -43,10 +43,14 @@ Session::State::State(Path const& folder, Options options)
       managers(makeManagers()),
       files(managers.sourceControl,
             [this](Path const& file) { return project->getFileManager().isFileInProject(file); }),
+      personalStore(root),
       executor(*store, adapter.get(),
                options.sourceControl == SourceControl::EachChange ? stager.get() : nullptr, files, raised,
-               events),
-      project(std::make_unique<SessionProjectManager>(std::move(managers.outermost), executor)) {
+               events, &personalStore.steps(), std::make_shared<DispatchableProjectEventBroadcaster>()),
+      project(
+          std::make_unique<SessionProjectManager>(std::move(managers.outermost), executor, personalStore)),
+      personal(*project, store, personalStore, executor),
+      ofOthers_(store, root, FileEvents::All) {
 }
 
 std::unique_ptr<DefinitionStager> Session::State::makeStager() {
@@ -138,35 +142,8 @@ bool Session::State::refresh() {
     if (stored.log() != nullptr) {
         stored.log()->requestCheck();
     }
-    queueEventsOfOthers();
-    bool hasDispatched = false;
-    while (auto const event = nextEventOfOthers()) {
-        hasDispatched = true;
-        (*event)(*events);
-    }
-    return hasDispatched;
-}
-
-void Session::State::queueEventsOfOthers() {
-    auto const guard = store->acquireReadLock(); // the project stays as the changes have left it
-    auto const changes = store->takeOthersChanges();
-    if (!changes.everything && changes.differences.empty()) {
-        return;
-    }
-    auto found = eventsOf(changes, store, root);
-    std::lock_guard const lock(eventsOfOthersMutex_);
-    std::move(found.begin(), found.end(), std::back_inserter(eventsOfOthers_));
-}
-
-/// Removes the event before it is dispatched: an event whose slot throws is not dispatched twice.
-std::optional<Event> Session::State::nextEventOfOthers() {
-    std::lock_guard const lock(eventsOfOthersMutex_);
-    if (eventsOfOthers_.empty()) {
-        return std::nullopt;
-    }
-    auto event = std::move(eventsOfOthers_.front());
-    eventsOfOthers_.pop_front();
-    return event;
+    bool const hasChanged = ofOthers_.dispatch(*events);
+    return personal.refresh() || hasChanged;
 }
 
 } // namespace project::session

@@ -3,15 +3,16 @@
 #include <atomic>
 #include <chrono>
 #include <condition_variable>
-#include <deque>
 #include <memory>
 #include <mutex>
-#include <optional>
 #include <vector>
 
 #include "ChangeExecutor.hpp"
 #include "DefinitionStager.hpp"
 #include "EventQueue.hpp"
+#include "OthersEvents.hpp"
+#include "PersonalLayer.hpp"
+#include "PersonalStore.hpp"
 #include "SessionStore.hpp"
 #include "TransactionFiles.hpp"
 #include "project/cm/CMAwareProjectManager.hpp"
@@ -61,21 +62,20 @@ public:
     EventQueue raised; ///< by the managers
     Managers managers;
     TransactionFiles files;
+    PersonalStore personalStore;
     ChangeExecutor executor;
     std::unique_ptr<management::ProjectManager> project;
+    PersonalLayer personal;
 
 private:
     std::unique_ptr<DefinitionStager> makeStager();
     Managers makeManagers();
     bool isStoreEmpty() const;
-    void queueEventsOfOthers();
-    std::optional<Event> nextEventOfOthers();
 
     std::mutex wakingMutex_;
     std::condition_variable waking_;
     std::atomic<bool> isWoken_ = false;
-    std::mutex eventsOfOthersMutex_;
-    std::deque<Event> eventsOfOthers_; ///< to be dispatched by refresh
+    OthersEvents ofOthers_; ///< to be dispatched by refresh
 };
 
 } // namespace project::session

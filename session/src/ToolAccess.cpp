@@ -31,8 +31,16 @@ stores::TextBackend& ToolAccess::text() {
     return *state_.stored.text();
 }
 
+stores::TreeMetadataManager& ToolAccess::personalStore() noexcept {
+    return *state_.personalStore.tree();
+}
+
+stores::TextBackend& ToolAccess::personalText() noexcept {
+    return state_.personalStore.text();
+}
+
 void ToolAccess::visit(Query const& query, FileVisitor const& visitor) {
-    visitFound(query, *state_.store, state_.root, visitor);
+    visitFound(query, *state_.store, *state_.personalStore.tree(), state_.root, visitor);
 }
 
 FileLevel ToolAccess::level(metadata::MetadataPath const& address) {

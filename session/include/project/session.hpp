@@ -8,6 +8,7 @@
 
 #include "project/management.hpp"
 #include "project/session/Export.hpp"
+#include "project/session/Personal.hpp"
 #include "project/session/Query.hpp"
 #include "project/session/Transaction.hpp"
 #include "project/stores/HistoryLoss.hpp"
@@ -108,9 +109,15 @@ public:
     /// observers.
     management::ProjectManager& project() noexcept;
 
+    /// The personal layer: categories and labels that source control never gets.
+    Personal& personal() noexcept;
+
     /// Finds the files and folders that meet all conditions of a query: all of them in one state of the
     /// project, in the order of the store, which is that of Path. A folder comes before its contents. Reads
     /// the store once, also for several conditions, and takes about as long as listing everything.
+    ///
+    /// Conditions on labels concern the labels of the project and personal ones, unless the query says
+    /// otherwise.
     ///
     /// Takes the read lock, and holds none when it returns. In a transaction of this thread, the results
     /// contain its changes.

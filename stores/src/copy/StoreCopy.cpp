@@ -1,5 +1,9 @@
 #include "project/stores/StoreCopy.hpp"
 
+#include <algorithm>
+#include <array>
+#include <string_view>
+
 #include "journal/CompleteFile.hpp"
 #include "journal/LocationFile.hpp"
 #include "project/stores/StoreError.hpp"
@@ -14,9 +18,11 @@ namespace {
 void ignoreFilesOfBothKinds(Disk& disk, FileChanges& changes) {
     auto const now = disk.read(LocationFile::ignored, 0);
     std::string const wanted =
-        std::string(StoreFiles::ignoredContent) + std::string(LocationFile::ignoredContent);
-    bool const isOurs =
-        !now || now->bytes == StoreFiles::ignoredContent || now->bytes == LocationFile::ignoredContent;
+        std::string(StoreFiles::ignoredOfText) + std::string(LocationFile::ignoredContent);
+    // A store from before there were personal texts does not name their folder.
+    std::array const ours{StoreFiles::ignoredContent, StoreFiles::ignoredOfText, LocationFile::ignoredContent,
+                          LocationFile::ignoredOfLocation};
+    bool const isOurs = !now || std::ranges::find(ours, now->bytes) != ours.end();
     if (isOurs) {
         disk.remove(LocationFile::temporary);
         disk.create(LocationFile::temporary, wanted, std::nullopt);

@@ -13,7 +13,10 @@ struct LocationFile {
     static constexpr char const* temporary = "store.json.tmp";
 
     static constexpr char const* ignored = ".gitignore";
-    static constexpr std::string_view ignoredContent = "/cache/\n/store.json.tmp\n/*.old*\n";
+    static constexpr std::string_view ignoredOfLocation = "/cache/\n/store.json.tmp\n/*.old*\n";
+
+    /// With the folder of a person's own text.
+    static constexpr std::string_view ignoredContent = "/cache/\n/store.json.tmp\n/*.old*\n/local/\n";
 
     static std::string contentOf(SharedLocation const& location);
 };

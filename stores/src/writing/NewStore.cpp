@@ -15,8 +15,11 @@ void NewStore::createFolder() {
 
 FileChanges NewStore::createFiles() {
     FileChanges changes;
-    createFile(StoreFiles::attributes, StoreFiles::attributesContent, changes);
-    createFile(StoreFiles::ignored, StoreFiles::ignoredContent, changes);
+    if (!isPersonal_) {
+        createFile(StoreFiles::attributes, StoreFiles::attributesContent, changes);
+    }
+    createFile(StoreFiles::ignored, isPersonal_ ? StoreFiles::ignoredInPersonal : StoreFiles::ignoredContent,
+               changes);
     auto text = ProjectText::empty();
     createFile(StoreFiles::text, text.body(), changes);
     if (created_.empty() || created_.back().name != StoreFiles::text) {

@@ -14,7 +14,9 @@ namespace project::stores {
 /// attempt creates and reports them again.
 class NewStore {
 public:
-    NewStore(Disk& disk, SeenText& seen) : disk_(disk), seen_(seen) {}
+    /// @param isPersonal the store is one that source control ignores as a whole.
+    NewStore(Disk& disk, SeenText& seen, bool isPersonal)
+        : disk_(disk), seen_(seen), isPersonal_(isPersonal) {}
 
     /// Creates the folder, without locking it.
     void createFolder();
@@ -47,6 +49,7 @@ private:
 
     Disk& disk_;
     SeenText& seen_;
+    bool const isPersonal_;
     bool isFolderCreated_ = false;
     std::vector<CreatedFile> created_;
 };

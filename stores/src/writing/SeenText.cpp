@@ -57,7 +57,7 @@ bool SeenText::checkOnce(Changes& changes, bool acceptsNoText) {
     if (seen_) {
         auto const now = disk_.identifyByPath(StoreFiles::text);
         if (!now) {
-            return acceptMissing();
+            return acceptMissing(changes);
         }
         if (*now == seen_->identity && seen_->isReliable) {
             return true;
@@ -90,13 +90,13 @@ bool SeenText::applyAppended(Changes& changes) {
 
 bool SeenText::readAll(Changes& changes, bool acceptsNoText) {
     if (!staysInFolder_ && !disk_.openFolder()) {
-        return acceptMissing();
+        return acceptMissing(changes);
     }
     auto const before = disk_.now();
     auto content = disk_.read(StoreFiles::text, 0);
     if (!content) {
         bool const isAwaited = !seen_ && !acceptsNoText && disk_.identify(StoreFiles::attributes);
-        return !isAwaited && acceptMissing();
+        return !isAwaited && acceptMissing(changes);
     }
     bool const isReliable = isOlderThanATick(content->identity, before);
     if (seen_ && seen_->text.hasSameBytes(content->bytes)) {
@@ -115,9 +115,12 @@ bool SeenText::readAll(Changes& changes, bool acceptsNoText) {
 
 /// Without an earlier text there is no store yet. An earlier text without nodes was deleted by the writer
 /// that rolled back its first batch. Any other missing text is being written by another program.
-bool SeenText::acceptMissing() {
+bool SeenText::acceptMissing(Changes& changes) {
     if (seen_ && !isWithoutNodes(seen_->text)) {
-        return false;
+        if (!mayVanish_) {
+            return false;
+        }
+        addChanges(changes, {false, seen_->text.differencesTo(ProjectText::empty())});
     }
     seen_.reset();
     return true;

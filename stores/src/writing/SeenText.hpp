@@ -18,7 +18,8 @@ namespace project::stores {
 /// is still writing it; an incomplete text is read again, and is never taken for an empty project.
 class SeenText {
 public:
-    explicit SeenText(Disk& disk) : disk_(disk) {}
+    /// @param mayVanish a text that is missing was deleted, and nothing will write it again.
+    SeenText(Disk& disk, bool mayVanish) : disk_(disk), mayVanish_(mayVanish) {}
 
     /// Finds and applies the changes since the last check. If it throws, the earlier text stays.
     /// @param patience how long to wait for an incomplete text.
@@ -61,9 +62,10 @@ private:
     bool checkOnce(Changes& changes, bool acceptsNoText);
     bool applyAppended(Changes& changes);
     bool readAll(Changes& changes, bool acceptsNoText);
-    bool acceptMissing();
+    bool acceptMissing(Changes& changes);
 
     Disk& disk_;
+    bool const mayVanish_;
     std::optional<Seen> seen_;
     bool staysInFolder_ = false;
 };

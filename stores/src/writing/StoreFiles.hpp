@@ -21,7 +21,17 @@ struct StoreFiles {
 
     /// For source control: temporary files and files that were set aside are not part of the project.
     static constexpr char const* ignored = ".gitignore";
-    static constexpr std::string_view ignoredContent = "/project.jsonl.*.tmp\n/damaged-*\n/displaced-*\n";
+    static constexpr std::string_view ignoredOfText = "/project.jsonl.*.tmp\n/damaged-*\n/displaced-*\n";
+
+    /// The folder of a person's own text, in the folder of any store.
+    static constexpr std::string_view ignoredPersonal = "/local/\n";
+
+    /// The files of a new store: ignoredOfText and ignoredPersonal.
+    static constexpr std::string_view ignoredContent =
+        "/project.jsonl.*.tmp\n/damaged-*\n/displaced-*\n/local/\n";
+
+    /// In the folder of a person's own text: everything, this file included.
+    static constexpr std::string_view ignoredInPersonal = "*\n";
 
     /// A new name for a file that is being written: "project.jsonl.<process>-<random>.tmp".
     static std::string newTemporary();

@@ -45,9 +45,9 @@ public:
     State(std::unique_ptr<Disk> disk, Options options)
         : disk_(std::move(disk)),
           options_(options),
-          seen_(*disk_),
+          seen_(*disk_, options.isPersonal),
           writer_(*disk_, seen_),
-          newStore_(*disk_, seen_) {}
+          newStore_(*disk_, seen_, options.isPersonal) {}
 
     Changes enter(Access access);
     void leave() noexcept;

@@ -42,7 +42,7 @@ TEST_F(TextBackendWriting, theFirstBatchCreatesTheStoreBeforeWriteReturns) {
                                       "renameToFree temporary project.jsonl", "syncFolder"));
     EXPECT_EQ(textOf({}), text());
     EXPECT_EQ("project.jsonl -text merge=project-definition\n", volume->content(".gitattributes"));
-    EXPECT_EQ("/project.jsonl.*.tmp\n/damaged-*\n/displaced-*\n", volume->content(".gitignore"));
+    EXPECT_EQ("/project.jsonl.*.tmp\n/damaged-*\n/displaced-*\n/local/\n", volume->content(".gitignore"));
     EXPECT_THAT(stored(), IsEmpty());
 }
 

@@ -15,6 +15,9 @@ struct LabelChoice {
     std::u16string labelUUID; ///< empty for any label of the category
 };
 
+/// The labels that conditions concern: those of the project, personal ones, or both.
+enum class Layers { Both, Project, Personal };
+
 /// A question about the file list: which files and folders meet all of these conditions? A query without
 /// conditions asks for all of them. Every member has a value, so that a query can name only its conditions:
 /// `session.find({.glob = u"**/*.cpp", .isUnlabelled = true})`.
@@ -48,6 +51,9 @@ struct Query {
 
     /// The file has no label of any category.
     bool isUnlabelled = false;
+
+    /// The labels that the conditions above concern.
+    Layers layers = Layers::Both;
 };
 
 /// A file or folder that a query has found.

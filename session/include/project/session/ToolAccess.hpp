@@ -14,6 +14,7 @@ namespace project::stores {
 class Backend;
 class JournalBackend;
 class TextBackend;
+class TreeMetadataManager;
 } // namespace project::stores
 
 namespace project::session {
@@ -45,6 +46,12 @@ public:
     /// The store's text. A change made through it is not staged; see markTextForStaging.
     /// @throws stores::StoreError with the kind Refused if the project is shared.
     stores::TextBackend& text();
+
+    /// The store of the personal layer. Take its guards after one of the session's store.
+    stores::TreeMetadataManager& personalStore() noexcept;
+
+    /// The text behind that store, which may not exist yet.
+    stores::TextBackend& personalText() noexcept;
 
     /// Visits the files that a query finds, as Session::find returns them. The caller holds a guard of the
     /// store.

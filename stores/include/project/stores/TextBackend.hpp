@@ -27,6 +27,10 @@ public:
 
         /// Batches are appended as long as the tail is at most the length of the body divided by this.
         std::size_t bodyToTail = 16;
+
+        /// The text belongs to one person: source control ignores everything in its folder, and the text may
+        /// be deleted at any time, which leaves a store without nodes. See PersonalText.
+        bool isPersonal = false;
     };
 
     /// The name of the store's folder in the project's root, ".projectdata".
