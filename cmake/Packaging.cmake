@@ -17,6 +17,8 @@ if(TARGET project_postgresql) # with an export of its own, so that it can be lef
   install(FILES adapters/postgresql/sql/setup.sql DESTINATION "${CMAKE_INSTALL_DATADIR}/project-management")
 endif()
 
+install(DIRECTORY docs/json DESTINATION "${CMAKE_INSTALL_DATADIR}/project-management")
+
 configure_package_config_file(packaging/project_managementConfig.cmake.in
   "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfig.cmake" INSTALL_DESTINATION "${package_folder}")
 write_basic_package_version_file("${CMAKE_CURRENT_BINARY_DIR}/project_managementConfigVersion.cmake"

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -25,14 +26,36 @@ protected:
 
     /// Calls projectctl with the current settings.
     ProgramResult tool(std::vector<std::string> arguments, std::string_view input = {}) const {
-        return runProgram(commandFor(std::move(arguments)), settings_, input);
+        return validated(arguments, runProgram(commandFor(arguments), settings_, input));
     }
 
     /// Calls projectctl from a folder below the fresh one.
     ProgramResult toolFrom(std::filesystem::path const& relative, std::vector<std::string> arguments) const {
         auto settings = settings_;
         settings.folder /= relative;
-        return runProgram(commandFor(std::move(arguments)), settings);
+        return validated(arguments, runProgram(commandFor(arguments), settings));
+    }
+
+    /// Everything that the tests receive as JSON must follow the schemas of docs/json.
+    void TearDown() override { expectValid(documents_); }
+
+    /// Compares JSON documents, one after the other, with their schemas.
+    static void expectValid(std::string const& documents) {
+        if (!documents.empty()) {
+            auto const result = runProgram({VALIDATE_JSON, JSON_SCHEMAS}, {}, documents);
+            EXPECT_EQ(result.exitCode, 0) << result.output << result.errors;
+        }
+    }
+
+    /// The JSON document of a format, version 1, with one array.
+    /// @param rows one object each.
+    static std::string document(std::string const& format, std::string const& key,
+                                std::vector<std::string> const& rows) {
+        std::string result = "{\"format\": \"projectctl-" + format + "\", \"version\": 1, \"" + key + "\": [";
+        for (auto const& row : rows) {
+            result += (&row == &rows.front() ? "\n" : ",\n") + row;
+        }
+        return result + (rows.empty() ? "]}\n" : "\n]}\n");
     }
 
     static std::vector<std::string> commandFor(std::vector<std::string> arguments) {
@@ -90,6 +113,17 @@ protected:
 
     TemporaryFolder folder_;
     ProgramSettings settings_;
+
+private:
+    ProgramResult validated(std::vector<std::string> const& arguments, ProgramResult result) const {
+        bool const isCompletion = !arguments.empty() && arguments.front() == "__complete";
+        if (!isCompletion && std::ranges::count(arguments, "--json") > 0) {
+            documents_ += result.output + result.errors;
+        }
+        return result;
+    }
+
+    mutable std::string documents_; ///< in JSON, of all calls
 };
 
 /// A run that succeeded without any output.
@@ -104,6 +138,18 @@ MATCHER_P2(FailsWith, exitCode, text, "") {
     *result_listener << "exit code " << arg.exitCode << ", errors: " << arg.errors
                      << ", output: " << arg.output;
     return arg.exitCode == exitCode && arg.output.empty() && arg.errors.starts_with("projectctl: ") &&
+           arg.errors.find('\n') == arg.errors.size() - 1 && arg.errors.find(text) != std::string::npos;
+}
+
+/// A run with --json that failed with this exit code and one JSON document on standard error, whose text
+/// contains this text.
+MATCHER_P2(FailsInJsonWith, exitCode, text, "") {
+    *result_listener << "exit code " << arg.exitCode << ", errors: " << arg.errors
+                     << ", output: " << arg.output;
+    return arg.exitCode == exitCode && arg.output.empty() &&
+           arg.errors.starts_with(
+               "{\"format\": \"projectctl-message\", \"version\": 1, \"severity\": \"error\"") &&
+           arg.errors.find("\"exitCode\": " + std::to_string(exitCode) + ",") != std::string::npos &&
            arg.errors.find('\n') == arg.errors.size() - 1 && arg.errors.find(text) != std::string::npos;
 }
 

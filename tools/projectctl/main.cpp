@@ -29,7 +29,8 @@ int main(int argc, char** argv) {
     } catch (projectctl::OutputClosed const&) {
         return endOfClosedOutput();
     } catch (std::exception const& error) {
-        projectctl::printError(error.what());
-        return projectctl::exitCodeFor(error);
+        int const code = projectctl::exitCodeFor(error);
+        projectctl::printFailure(error.what(), projectctl::nameOf(code), code);
+        return code;
     }
 }

@@ -4,6 +4,7 @@
 #include <map>
 #include <utility>
 
+#include "line/LineParser.hpp"
 #include "text/TextContent.hpp"
 #include "text/TextDifference.hpp"
 #include "text/TextLines.hpp"
@@ -184,6 +185,39 @@ std::string const& ProjectText::body() const noexcept {
 
 bool ProjectText::isTidy() const noexcept {
     return state_->reading().isCanonical && state_->reading().tail.empty();
+}
+
+std::vector<std::size_t> ProjectText::linesOf(std::vector<Address> const& addresses) const {
+    std::map<Address, std::size_t> own;
+    std::map<Address, std::size_t> below;
+    for (auto const& address : addresses) {
+        own.emplace(address, 0);
+        below.emplace(address, 0);
+    }
+    auto const text = bytes();
+    LineWalk walk(text, 0, 1);
+    while (walk.next()) {
+        auto const parsed = parseLine(walk.line().text);
+        if (!parsed.change || parsed.change->kind == Change::Kind::Remove) {
+            continue;
+        }
+        auto address = parsed.change->address;
+        if (auto const found = own.find(address); found != own.end()) {
+            found->second = walk.line().number;
+        }
+        for (; address.depth() > 1; address = address.parent()) {
+            auto const found = below.find(address.parent());
+            if (found != below.end() && found->second == 0) {
+                found->second = walk.line().number;
+            }
+        }
+    }
+    std::vector<std::size_t> result;
+    result.reserve(addresses.size());
+    for (auto const& address : addresses) {
+        result.push_back(own[address] > 0 ? own[address] : below[address]);
+    }
+    return result;
 }
 
 std::vector<Fault> const& ProjectText::faults() const noexcept {

@@ -73,6 +73,10 @@ public:
     /// True if the body is canonical and nothing follows it: rewriting the text would give the same bytes.
     bool isTidy() const noexcept;
 
+    /// The numbers of the lines that describe some addresses, counted from 1: of each the last one, or the
+    /// first one below it if it has no line of its own, or 0. Reads all lines.
+    std::vector<std::size_t> linesOf(std::vector<Address> const& addresses) const;
+
     /// By line.
     std::vector<Fault> const& faults() const noexcept;
     bool hasFault(Fault::Kind kind) const noexcept;

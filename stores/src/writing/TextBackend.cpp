@@ -58,6 +58,7 @@ public:
     bool tidy();
     std::string repair();
     void resolve(std::string resolved);
+    std::vector<std::size_t> linesOf(std::vector<Address> const& addresses) const;
     std::vector<Fault> check();
     void tidyOnClose() noexcept;
 
@@ -327,6 +328,10 @@ void TextBackend::State::resolve(std::string resolved) {
     writer_.rewrite(next->rewrittenWith({}));
 }
 
+std::vector<std::size_t> TextBackend::State::linesOf(std::vector<Address> const& addresses) const {
+    return seen_.exists() ? seen_.text().linesOf(addresses) : std::vector<std::size_t>(addresses.size());
+}
+
 std::vector<Fault> TextBackend::State::check() {
     seen_.distrust();
     checkForChanges(options_.patience);
@@ -407,6 +412,10 @@ void TextBackend::resolve(std::string resolved) {
 
 std::string TextBackend::repair() {
     return state_->repair();
+}
+
+std::vector<std::size_t> TextBackend::linesOf(std::vector<Address> const& addresses) const {
+    return state_->linesOf(addresses);
 }
 
 std::vector<Fault> TextBackend::check() {

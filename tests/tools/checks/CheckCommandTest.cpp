@@ -233,8 +233,8 @@ TEST_F(CheckCommand, findsLabelsThatAFileHasTooOften) {
 
     EXPECT_EQ(result.exitCode, 3);
     EXPECT_THAT(linesOf(result.output),
-                ElementsAre(AllOf(reports("note: "), HasSubstr("\"c1\" has the label")),
-                            AllOf(reports("\"c3\""), HasSubstr("has 2 labels"))));
+                ElementsAre(AllOf(reports("\"c3\""), HasSubstr("has 2 labels")), // the worst first
+                            AllOf(reports("note: "), HasSubstr("\"c1\" has the label"))));
 }
 
 TEST_F(CheckCommand, acceptsDataOfFilesThatNoReaderUses) {
@@ -296,6 +296,84 @@ TEST_F(CheckCommand, doesNotRepairConflicts) {
     insertLineBefore("\"b\"", "<<<<<<< ours");
 
     EXPECT_THAT(tool({"check", "--repair"}), FailsWith(6, text().string() + ":3: "));
+}
+
+/// A project with a fault and a note: a label that does not exist, and a reference that cannot be followed.
+class CheckForms : public ToolTest {
+protected:
+    void SetUp() override {
+        initProject();
+        folder_.file(u"a");
+        folder_.folder(u"gone");
+        ASSERT_EQ(tool({"batch"}, "add a\ncategory create Status\nlabel create Status Open\n"
+                                  "label put Status Open a\nreference add gone\n")
+                      .exitCode,
+                  0);
+        folder_.remove(u"gone");
+        auto content = readText();
+        auto const label = content.find("\"Label\",\"keys\":{\"UUID\":\"") + 24;
+        ASSERT_NE(content.find("\"file\":\"a\""), std::string::npos);
+        writeText(content.replace(label, 36, "lost"));
+    }
+
+    /// The number of the line that contains a text.
+    std::string lineOf(std::string const& text) const {
+        auto const content = readText();
+        auto const end = content.begin() + static_cast<std::ptrdiff_t>(content.find(text));
+        return std::to_string(std::count(content.begin(), end, '\n') + 1);
+    }
+};
+
+TEST_F(CheckForms, gccShowsTheLineTheWeightAndTheCodeTheWorstFirst) {
+    auto const result = tool({"check", "--format", "gcc"});
+
+    EXPECT_EQ(result.exitCode, 3);
+    auto const lines = linesOf(result.output);
+    ASSERT_EQ(lines.size(), 2U) << result.output;
+    EXPECT_EQ(lines[0],
+              ".projectdata/project.jsonl:" + lineOf("\"file\":\"a\"") +
+                  ": error: the file \"a\" has the label \"lost\" of the category \"Status\", which "
+                  "does not exist [label-missing]");
+    EXPECT_THAT(lines[1],
+                ::testing::StartsWith(".projectdata/project.jsonl:" + lineOf("\"Ref\"") + ": note: "));
+    EXPECT_THAT(lines[1], ::testing::EndsWith("[reference-folder-missing]"));
+}
+
+TEST_F(CheckForms, gitHubGetsOneCommandForEachFinding) {
+    auto const result = tool({"check", "--format", "github"});
+
+    EXPECT_EQ(result.exitCode, 3);
+    auto const lines = linesOf(result.output);
+    ASSERT_EQ(lines.size(), 2U) << result.output;
+    EXPECT_EQ(lines[0], "::error file=.projectdata/project.jsonl,line=" + lineOf("\"file\":\"a\"") +
+                            ",title=label-missing::the file \"a\" has the label \"lost\" of the category "
+                            "\"Status\", which does not exist");
+    EXPECT_THAT(lines[1], ::testing::StartsWith("::notice file=.projectdata/project.jsonl,line="));
+}
+
+TEST_F(CheckForms, gitHubGetsSpecialCharactersEscaped) {
+    folder_.addFile("100%\nsure");
+    ASSERT_EQ(tool({"batch"}, "add '100%\nsure'\nentry set '100%\nsure'\n").exitCode, 0);
+    std::filesystem::remove(inFolder("100%\nsure"));
+
+    EXPECT_THAT(tool({"check", "--format", "github"}).output, ::testing::HasSubstr("\"100%25%0Asure\""));
+}
+
+TEST_F(CheckForms, jsonHasCodePathLineAndSentenceRelativeToTheRoot) {
+    std::filesystem::create_directory(inFolder("below"));
+    auto const result = toolFrom("below", {"check", "--json"});
+
+    EXPECT_EQ(result.exitCode, 3);
+    EXPECT_THAT(
+        result.output,
+        ::testing::HasSubstr("{\"code\": \"label-missing\", \"fault\": true, \"path\": \"a\", \"line\": " +
+                             lineOf("\"file\":\"a\"") + ", \"text\": \"the file \\\"a\\\" has"));
+    EXPECT_THAT(tool({"status", "--json"}).output, ::testing::HasSubstr("{\"code\": \"label-missing\""));
+}
+
+TEST_F(CheckForms, refuseAnUnknownFormat) {
+    EXPECT_THAT(tool({"check", "--format", "xml"}), FailsWith(2, "The formats are text, gcc and github"));
+    EXPECT_THAT(tool({"check", "--format", "gcc", "--json"}), FailsInJsonWith(2, "excludes"));
 }
 
 } // namespace

@@ -15,7 +15,8 @@ protected:
 
 TEST_F(StatusCommand, showsNothingWhenProjectAndDiskAgree) {
     EXPECT_THAT(tool({"status"}), SucceedsSilently());
-    EXPECT_THAT(tool({"status", "--json"}), Prints("{\"new\": [],\n\"gone\": [],\n\"problems\": []}\n"));
+    EXPECT_THAT(tool({"status", "--json"}), Prints("{\"format\": \"projectctl-status\", \"version\": 1, "
+                                                   "\"new\": [], \"gone\": [], \"findings\": []}\n"));
 }
 
 TEST_F(StatusCommand, saysSoOnATerminal) {
@@ -106,20 +107,35 @@ TEST_F(StatusCommand, recognisesAPipeThatIsInTheProject) {
     EXPECT_THAT(tool({"status"}), Prints("gone .git/config\ngone pipe\n"));
 }
 
+TEST_F(StatusCommand, saysInItsExitCodeWhetherAnythingDiffersIfAsked) {
+    EXPECT_THAT(tool({"status", "--exit-code"}), SucceedsSilently());
+
+    folder_.file(u"new");
+
+    EXPECT_EQ(tool({"status"}).exitCode, 0);
+    EXPECT_EQ(tool({"status", "--exit-code"}).exitCode, 3);
+    EXPECT_EQ(tool({"status", "--exit-code", "--json"}).exitCode, 3);
+    ASSERT_THAT(tool({"add", "new"}), SucceedsSilently());
+    EXPECT_EQ(tool({"status", "--exit-code"}).exitCode, 0);
+    folder_.remove(u"new");
+    EXPECT_EQ(tool({"status", "--exit-code"}).exitCode, 3);
+}
+
 TEST_F(StatusCommand, writesJson) {
     folder_.file(u"docs/a");
     folder_.addFile("b\xFF");
     folder_.remove(u"src/io");
 
-    EXPECT_THAT(tool({"status", "--json"}), Prints("{\"new\": [\n"
-                                                   "{\"path\": \"b\\udcff\", \"kind\": \"file\"},\n"
-                                                   "{\"path\": \"docs\", \"kind\": \"folder\"}\n"
-                                                   "],\n"
-                                                   "\"gone\": [\n"
-                                                   "{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
-                                                   "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}\n"
-                                                   "],\n"
-                                                   "\"problems\": []}\n"));
+    EXPECT_THAT(tool({"status", "--json"}),
+                Prints("{\"format\": \"projectctl-status\", \"version\": 1, \"new\": [\n"
+                       "{\"path\": \"b\\udcff\", \"kind\": \"file\"},\n"
+                       "{\"path\": \"docs\", \"kind\": \"folder\"}\n"
+                       "], "
+                       "\"gone\": [\n"
+                       "{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
+                       "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}\n"
+                       "], "
+                       "\"findings\": []}\n"));
 }
 
 TEST_F(StatusCommand, continuesAfterAFolderThatCannotBeRead) {

@@ -58,8 +58,9 @@ TEST_F(ShownPaths, areRelativeToTheRootWithFullName) {
 
 TEST_F(ShownPaths, areRelativeToTheRootInJson) {
     EXPECT_THAT(tool({"list", "--json", "."}),
-                Prints("[\n{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
-                       "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}\n]\n"));
+                Prints(document("list", "files",
+                                {"{\"path\": \"src/io\", \"kind\": \"folder\"}",
+                                 "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}"})));
 }
 
 TEST_F(ShownPaths, beginEachTreeOfAList) {
@@ -150,6 +151,8 @@ TEST_F(ShownPaths, areThoseOfEvents) {
     RunningProgram watchingJson(commandFor({"watch", "--json"}), settings_);
     ASSERT_TRUE(watching.waitUntilItSleeps());
     ASSERT_TRUE(watchingJson.waitUntilItSleeps());
+    ASSERT_EQ(watching.readLine(), "ready\t1");
+    ASSERT_THAT(watchingJson.readLine(), HasSubstr("\"ready\""));
 
     ASSERT_THAT(tool({"remove", "../main.cpp", "."}), SucceedsSilently());
 

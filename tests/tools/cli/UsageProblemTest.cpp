@@ -38,7 +38,7 @@ TEST_F(UsageProblem, isInGermanToo) {
                 FailsWith(2, "unbekannter Befehl oder unbekannte Option „lsit“. Meinten Sie „list“?"));
     EXPECT_THAT(tool({"name", "a", "b"}),
                 FailsWith(2, "überzähliges Argument „b“ („projectctl name --help“ zeigt"));
-    EXPECT_THAT(tool({"list", "--tree", "--json"}), FailsWith(2, "--tree schließt --json aus"));
+    EXPECT_THAT(tool({"list", "--tree", "--json"}), FailsInJsonWith(2, "--tree schließt --json aus"));
     EXPECT_THAT(tool({"remove"}), FailsWith(2, "PATH fehlt"));
     EXPECT_THAT(tool({"init", "--name"}), FailsWith(2, "--name braucht einen Wert"));
     EXPECT_THAT(tool({"add", "--gitignore", "."}), FailsWith(2, "--gitignore erfordert --recursive"));

@@ -25,7 +25,7 @@ protected:
 
 TEST_F(EntryCommand, listsNothingInANewProject) {
     EXPECT_THAT(tool({"entry", "list"}), SucceedsSilently());
-    EXPECT_THAT(tool({"entry", "list", "--json"}), Prints("[]\n"));
+    EXPECT_THAT(tool({"entry", "list", "--json"}), Prints(document("entry-list", "entryPoints", {})));
 }
 
 TEST_F(EntryCommand, usesDefaultsForOptionsThatAreNotGiven) {
@@ -74,10 +74,11 @@ TEST_F(EntryCommand, listsAllStoredDataAsJson) {
          {std::vector<std::string>{"entry", "list", "--json"}, {"entry", "show", "main.cpp", "--json"}}) {
         EXPECT_THAT(
             tool(command).output,
-            MatchesRegex("\\[\n\\{\"path\": \"main.cpp\", \"uuid\": \"[-0-9a-f]*\", \"type\": \"Basic\", "
-                         "\"name\": \"main\", \"visible\": true, \"group\": \"Default\", "
-                         "\"groupUuid\": \"default\", "
-                         "\"extensions\": \\{\"k\\\\\"\": \"v\", \"l\": \"\"\\}\\}\n\\]\n"));
+            MatchesRegex("\\{\"format\": \"projectctl-entry-list\", \"version\": 1, \"entryPoints\": "
+                         "\\[\n\\{\"path\": \"main.cpp\", \"uuid\": \"[-0-9a-f]*\", \"type\": \"Basic\", "
+                         "\"name\": \"main\", \"visible\": true, \"group\": "
+                         "\\{\"uuid\": \"default\", \"name\": \"Default\"\\}, "
+                         "\"extensions\": \\{\"k\\\\\"\": \"v\", \"l\": \"\"\\}\\}\n\\]\\}\n"));
     }
 }
 

@@ -181,10 +181,10 @@ protected:
     /// The UUID of a label.
     std::string uuidOf(std::string const& name) const {
         auto const labels = tool({"label", "list", "--json"}).output;
-        auto const key = "\"label\": \"" + name + "\", \"labelUuid\": \"";
-        auto const found = labels.find(key);
-        EXPECT_NE(found, std::string::npos) << labels;
-        return labels.substr(found + key.size(), 36);
+        auto const end = labels.find("\", \"name\": \"" + name + "\"}, \"readOnly\"");
+        EXPECT_NE(end, std::string::npos) << labels;
+        constexpr std::size_t length = 36;
+        return labels.substr(end - length, length);
     }
 
     std::vector<std::string> const all_{"readme", "src", "src/io", "src/io/pump.cpp"};

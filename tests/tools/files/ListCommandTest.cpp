@@ -44,21 +44,22 @@ TEST_F(ListCommand, showsATree) {
 }
 
 TEST_F(ListCommand, writesJsonWithKinds) {
-    EXPECT_THAT(tool({"list", "--json"}), Prints("[\n"
-                                                 "{\"path\": \"src\", \"kind\": \"folder\"},\n"
-                                                 "{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
-                                                 "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"},\n"
-                                                 "{\"path\": \"src/main.cpp\", \"kind\": \"file\"},\n"
-                                                 "{\"path\": \"src.txt\", \"kind\": \"file\"}\n"
-                                                 "]\n"));
+    EXPECT_THAT(tool({"list", "--json"}),
+                Prints(document("list", "files",
+                                {"{\"path\": \"src\", \"kind\": \"folder\"}",
+                                 "{\"path\": \"src/io\", \"kind\": \"folder\"}",
+                                 "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}",
+                                 "{\"path\": \"src/main.cpp\", \"kind\": \"file\"}",
+                                 "{\"path\": \"src.txt\", \"kind\": \"file\"}"})));
 }
 
 TEST_F(ListCommand, listsADeletedFolderStillAsAFolder) {
     folder_.remove(u"src");
 
     EXPECT_THAT(tool({"list", "--json", "src/io"}),
-                Prints("[\n{\"path\": \"src/io\", \"kind\": \"folder\"},\n"
-                       "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}\n]\n"));
+                Prints(document("list", "files",
+                                {"{\"path\": \"src/io\", \"kind\": \"folder\"}",
+                                 "{\"path\": \"src/io/pump.cpp\", \"kind\": \"file\"}"})));
 }
 
 TEST_F(ListCommand, endsPathsWithZeroBytes) {
@@ -66,8 +67,8 @@ TEST_F(ListCommand, endsPathsWithZeroBytes) {
 }
 
 TEST_F(ListCommand, refusesTwoFormsAtOnce) {
-    EXPECT_THAT(tool({"list", "--tree", "--json"}), FailsWith(2, "--tree excludes --json"));
-    EXPECT_THAT(tool({"list", "--json", "-0"}), FailsWith(2, "excludes"));
+    EXPECT_THAT(tool({"list", "--tree", "--json"}), FailsInJsonWith(2, "--tree excludes --json"));
+    EXPECT_THAT(tool({"list", "--json", "-0"}), FailsInJsonWith(2, "excludes"));
     EXPECT_THAT(tool({"list", "--tree", "-0"}), FailsWith(2, "excludes"));
 }
 
@@ -77,14 +78,13 @@ TEST_F(ListCommand, listsTheSameFilesAsTheFileManager) {
     EXPECT_THAT(list(), ElementsAre("src", "src/io", "src/io/pump.cpp", "src/main.cpp", "src.txt"));
 }
 
-TEST(ListCommandOfAnEmptyProject, writesNothing) {
-    TemporaryFolder const folder;
-    ProgramSettings settings;
-    settings.folder = folder.onDisk();
-    ASSERT_EQ(runProgram({PROJECTCTL, "init"}, settings).exitCode, 0);
+class ListCommandOfAnEmptyProject : public ToolTest {};
 
-    EXPECT_THAT(runProgram({PROJECTCTL, "list"}, settings), SucceedsSilently());
-    EXPECT_THAT(runProgram({PROJECTCTL, "list", "--json"}, settings), Prints("[]\n"));
+TEST_F(ListCommandOfAnEmptyProject, writesNothing) {
+    initProject();
+
+    EXPECT_THAT(tool({"list"}), SucceedsSilently());
+    EXPECT_THAT(tool({"list", "--json"}), Prints(document("list", "files", {})));
 }
 
 } // namespace

@@ -11,7 +11,7 @@ using CategoryCommand = LabelToolTest;
 
 TEST_F(CategoryCommand, listsNothingInANewProject) {
     EXPECT_THAT(tool({"category", "list"}), SucceedsSilently());
-    EXPECT_THAT(tool({"category", "list", "--json"}), Prints("[]\n"));
+    EXPECT_THAT(tool({"category", "list", "--json"}), Prints(document("category-list", "categories", {})));
 }
 
 TEST_F(CategoryCommand, listsCategoriesByNameWithTheirAttributes) {
@@ -27,8 +27,9 @@ TEST_F(CategoryCommand, listsEveryAttributeAsJson) {
     ASSERT_THAT(tool({"category", "create", "Owner", "--read-only", "--type", "Text"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"category", "list", "--json"}),
-                Prints("[\n{\"name\": \"Owner\", \"uuid\": \"" + categoryUUID("Owner") +
-                       "\", \"readOnly\": true, \"singleValued\": false, \"type\": \"Text\"}\n]\n"));
+                Prints(document("category-list", "categories",
+                                {"{\"name\": \"Owner\", \"uuid\": \"" + categoryUUID("Owner") +
+                                 "\", \"readOnly\": true, \"singleValued\": false, \"type\": \"Text\"}"})));
 }
 
 TEST_F(CategoryCommand, refusesASecondCategoryOfTheSameName) {

@@ -28,7 +28,7 @@ protected:
 
 TEST_F(FileLabelCommand, showsNothingForAFileWithoutLabels) {
     EXPECT_THAT(tool({"label", "show", "a"}), SucceedsSilently());
-    EXPECT_THAT(tool({"label", "show", "a", "--json"}), Prints("[]\n"));
+    EXPECT_THAT(tool({"label", "show", "a", "--json"}), Prints(document("label-show", "labels", {})));
 }
 
 TEST_F(FileLabelCommand, putsALabelOnManyFilesInOneStep) {
@@ -165,8 +165,8 @@ TEST_F(FileLabelCommand, showsALabelThatHasDataOnceWithItsData) {
 
     EXPECT_THAT(tool({"label", "show", "a"}), Prints("Owner: Ann = since May\nOwner: Bob\n"));
     EXPECT_THAT(tool({"label", "show", "a", "--json"}).output,
-                HasSubstr("\"label\": \"Ann\", \"labelUuid\": \"" + labelUUID("Ann") +
-                          "\", \"data\": \"since May\"},\n"));
+                HasSubstr("\"label\": {\"uuid\": \"" + labelUUID("Ann") +
+                          "\", \"name\": \"Ann\"}, \"data\": \"since May\"},\n"));
 }
 
 TEST_F(FileLabelCommand, findsTheFilesWithALabelOrAnyLabelOfACategory) {
@@ -179,17 +179,18 @@ TEST_F(FileLabelCommand, findsTheFilesWithALabelOrAnyLabelOfACategory) {
     EXPECT_THAT(tool({"label", "find", "Owner", "Ann"}), Prints("b\nsrc\n"));
     EXPECT_THAT(tool({"label", "find", "Owner"}), Prints("b\nsrc\nsrc/pump.cpp\n"));
     EXPECT_THAT(tool({"label", "find", "Owner", "-0"}), Prints(withZeros({"b", "src", "src/pump.cpp"})));
-    EXPECT_THAT(
-        tool({"label", "find", "Owner", "Ann", "--json"}),
-        Prints("[\n{\"path\": \"b\", \"kind\": \"file\"},\n{\"path\": \"src\", \"kind\": \"folder\"}\n]\n"));
-    EXPECT_THAT(tool({"label", "find", "Status", "Open", "--json"}), Prints("[]\n"));
+    EXPECT_THAT(tool({"label", "find", "Owner", "Ann", "--json"}),
+                Prints(document(
+                    "list", "files",
+                    {"{\"path\": \"b\", \"kind\": \"file\"}", "{\"path\": \"src\", \"kind\": \"folder\"}"})));
+    EXPECT_THAT(tool({"label", "find", "Status", "Open", "--json"}), Prints(document("list", "files", {})));
 }
 
 TEST_F(FileLabelCommand, reportsALabelToFindThatDoesNotExist) {
     EXPECT_THAT(tool({"label", "find", "Area"}), FailsWith(1, "There is no category \"Area\""));
     EXPECT_THAT(tool({"label", "find", "Owner", "Eve"}),
                 FailsWith(1, "the category \"Owner\" has no label \"Eve\""));
-    EXPECT_THAT(tool({"label", "find", "Owner", "--json", "-0"}), FailsWith(2, "excludes"));
+    EXPECT_THAT(tool({"label", "find", "Owner", "--json", "-0"}), FailsInJsonWith(2, "excludes"));
 }
 
 TEST_F(FileLabelCommand, losesTheLabelsOfAFileThatIsAddedAnew) {
@@ -210,7 +211,9 @@ TEST_F(FileLabelCommand, isReportedByStatusAndCheckWhenTheLabelDoesNotExist) {
     EXPECT_THAT(tool({"status"}), Prints("bad  " + text + "\n"));
     EXPECT_THAT(
         tool({"status", "--json"}).output,
-        HasSubstr("\"problems\": [\n{\"fault\": true, \"text\": \"the file \\\"a\\\" has the label "));
+        AllOf(HasSubstr("\"findings\": [\n{\"code\": \"label-missing\", \"fault\": true, \"path\": \"a\", "
+                        "\"line\": "),
+              HasSubstr("\"text\": \"the file \\\"a\\\" has the label ")));
     EXPECT_EQ(tool({"check"}).exitCode, 3);
     EXPECT_THAT(tool({"check"}).output, HasSubstr(": " + text + "\n"));
 }

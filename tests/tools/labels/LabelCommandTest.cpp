@@ -33,11 +33,27 @@ TEST_F(LabelCommand, listsEveryAttributeAsJson) {
     ASSERT_THAT(tool({"label", "create", "Status", "Open"}), SucceedsSilently());
 
     EXPECT_THAT(tool({"label", "list", "--json"}),
-                Prints("[\n{\"category\": \"Status\", \"categoryUuid\": \"" + categoryUUID("Status") +
-                       "\", \"label\": \"Open\", \"labelUuid\": \"" + labelUUID("Open") +
-                       "\", \"readOnly\": \"INHERITED\"}\n]\n"));
+                Prints(document("label-list", "labels",
+                                {"{\"category\": {\"uuid\": \"" + categoryUUID("Status") +
+                                 "\", \"name\": \"Status\"}, \"label\": {\"uuid\": \"" + labelUUID("Open") +
+                                 "\", \"name\": \"Open\"}, \"readOnly\": false, "
+                                 "\"inheritsReadOnly\": true}"})));
     ASSERT_THAT(tool({"label", "delete", "Status", "Open"}), SucceedsSilently());
-    EXPECT_THAT(tool({"label", "list", "--json"}), Prints("[]\n"));
+    EXPECT_THAT(tool({"label", "list", "--json"}), Prints(document("label-list", "labels", {})));
+}
+
+TEST_F(LabelCommand, showsInJsonWhetherALabelCanBeChanged) {
+    ASSERT_THAT(tool({"category", "create", "Fixed", "--read-only"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "create", "Fixed", "Same"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "create", "Fixed", "Writable", "--writable"}), SucceedsSilently());
+    ASSERT_THAT(tool({"label", "create", "Status", "Kept", "--read-only"}), SucceedsSilently());
+
+    auto const output = tool({"label", "list", "--json"}).output;
+
+    EXPECT_THAT(output, HasSubstr("\"name\": \"Same\"}, \"readOnly\": true, \"inheritsReadOnly\": true}"));
+    EXPECT_THAT(output,
+                HasSubstr("\"name\": \"Writable\"}, \"readOnly\": false, \"inheritsReadOnly\": false}"));
+    EXPECT_THAT(output, HasSubstr("\"name\": \"Kept\"}, \"readOnly\": true, \"inheritsReadOnly\": false}"));
 }
 
 TEST_F(LabelCommand, createsLabelsInAReadOnlyCategory) {

@@ -30,7 +30,8 @@ protected:
     }
 
     std::string labelUUID(std::string const& name) const {
-        return found("\"label\": \"" + name + "\", \"labelUuid\": \"([^\"]*)\"", {"label", "list", "--json"});
+        return found("\"label\": \\{\"uuid\": \"([^\"]*)\", \"name\": \"" + name + "\"",
+                     {"label", "list", "--json"});
     }
 
     /// Replaces every occurrence in the project's text. There must be at least one.

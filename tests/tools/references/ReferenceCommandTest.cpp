@@ -33,7 +33,7 @@ protected:
 TEST_F(ReferenceCommand, listsNothingInANewProject) {
     EXPECT_THAT(tool({"path", "list"}), SucceedsSilently());
     EXPECT_THAT(tool({"reference", "list"}), SucceedsSilently());
-    EXPECT_THAT(tool({"reference", "list", "--json"}), Prints("[]\n"));
+    EXPECT_THAT(tool({"reference", "list", "--json"}), Prints(document("reference-list", "references", {})));
 }
 
 TEST_F(ReferenceCommand, storesFoldersRelativeToTheRoot) {
@@ -49,7 +49,7 @@ TEST_F(ReferenceCommand, storesTheAbsolutePathOnRequest) {
 
     EXPECT_THAT(tool({"reference", "list"}), Prints("../pump\n" + inFolder("valve") + "\n"));
     EXPECT_THAT(tool({"reference", "list", "--json"}).output,
-                HasSubstr("{\"path\": \"../pump\", \"type\": \"Relative\", \"location\": \"" +
+                HasSubstr("{\"path\": \"../pump\", \"type\": \"Relative\", \"folder\": \"" +
                           inFolder("pump") + "\", \"uuid\": \""));
     EXPECT_THAT(tool({"path", "add", "lib", "--absolute"}), FailsWith(2, "--absolute"));
 }
@@ -195,10 +195,10 @@ TEST_F(ReferenceCommand, resolvesAgainstTheNewRootWhenTheProjectHasMoved) {
     EXPECT_THAT(tool({"list"}), Prints(list));
     EXPECT_THAT(tool({"entry", "list"}), Prints("src/x: Basic, x\n"));
     EXPECT_THAT(tool({"path", "list", "--json"}).output,
-                HasSubstr("\"location\": \"" + inFolder("elsewhere/engine2/lib") + '"'));
+                HasSubstr("\"folder\": \"" + inFolder("elsewhere/engine2/lib") + '"'));
     auto const references = tool({"reference", "list", "--json"}).output;
-    EXPECT_THAT(references, HasSubstr("\"location\": \"" + inFolder("elsewhere/pump") + '"'));
-    EXPECT_THAT(references, HasSubstr("\"location\": \"" + inFolder("valve") + '"'));
+    EXPECT_THAT(references, HasSubstr("\"folder\": \"" + inFolder("elsewhere/pump") + '"'));
+    EXPECT_THAT(references, HasSubstr("\"folder\": \"" + inFolder("valve") + '"'));
 }
 
 } // namespace

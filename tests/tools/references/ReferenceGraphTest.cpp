@@ -119,13 +119,15 @@ TEST_F(ReferenceGraph, showsAProjectThatCannotBeRead) {
 TEST_F(ReferenceGraph, writesJson) {
     makeReference("engine", "pump");
 
-    EXPECT_THAT(toolFrom("engine", {"references", "--graph", "--json"}),
-                Prints("{\"projects\": [\n{\"folder\": " + quoted("engine") +
-                       ", \"state\": \"project\", \"name\": \"engine\"},\n{\"folder\": " + quoted("pump") +
-                       ", \"state\": \"project\", \"name\": \"pump\"}\n],\n\"references\": [\n{\"from\": " +
-                       quoted("engine") + ", \"to\": " + quoted("pump") +
-                       ", \"path\": \"../pump\", \"type\": \"Relative\", \"closesCycle\": false}\n],\n"
-                       "\"cycles\": []}\n"));
+    EXPECT_THAT(
+        toolFrom("engine", {"references", "--graph", "--json"}),
+        Prints("{\"format\": \"projectctl-reference-graph\", \"version\": 1, \"projects\": [\n{\"folder\": " +
+               quoted("engine") +
+               ", \"state\": \"project\", \"name\": \"engine\"},\n{\"folder\": " + quoted("pump") +
+               ", \"state\": \"project\", \"name\": \"pump\"}\n], \"references\": [\n{\"from\": " +
+               quoted("engine") + ", \"to\": " + quoted("pump") +
+               ", \"path\": \"../pump\", \"type\": \"Relative\", \"closesCycle\": false}\n], "
+               "\"cycles\": []}\n"));
 }
 
 TEST_F(ReferenceGraph, writesTextForGraphviz) {
@@ -173,7 +175,7 @@ TEST_F(ReferenceGraph, followsALongChain) {
 
 TEST_F(ReferenceGraph, requiresExactlyOneForm) {
     EXPECT_THAT(tool({"references"}), FailsWith(2, "--graph is required"));
-    EXPECT_THAT(tool({"references", "--graph", "--json", "--dot"}), FailsWith(2, "excludes"));
+    EXPECT_THAT(tool({"references", "--graph", "--json", "--dot"}), FailsInJsonWith(2, "excludes"));
 }
 
 } // namespace

@@ -21,14 +21,17 @@ protected:
     /// A `watch` that is running.
     std::unique_ptr<RunningProgram> watch(std::vector<std::string> options = {}) const {
         options.insert(options.begin(), "watch");
-        auto watching = std::make_unique<RunningProgram>(commandFor(std::move(options)), settings_);
-        EXPECT_TRUE(watching->waitUntilItSleeps());
+        auto watching = std::make_unique<RunningProgram>(commandFor(options), settings_);
+        bool const isJson = std::ranges::count(options, "--json") > 0;
+        EXPECT_EQ(watching->readLine(),
+                  isJson ? R"({"event": "ready", "format": "projectctl-watch", "version": 1})" : "ready\t1");
         return watching;
     }
 
     /// The line that a `watch` prints for another command.
-    std::string printed(RunningProgram& watching, std::vector<std::string> command) const {
-        auto const result = tool(std::move(command));
+    std::string printed(RunningProgram& watching, std::vector<std::string> command,
+                        std::string_view input = {}) const {
+        auto const result = tool(std::move(command), input);
         EXPECT_EQ(result.exitCode, 0) << result.errors;
         return watching.readLine();
     }
@@ -73,6 +76,35 @@ TEST_F(WatchCommand, printsEachEventAsAJsonObject) {
                                       R"("name": "Status"\}, "label": \{"uuid": "[-0-9a-f]+", )"
                                       R"("name": "Done"\}\})"));
     EXPECT_EQ(printed(*watching, {"name", "Engine"}), R"({"event": "nameChanged"})");
+}
+
+TEST_F(WatchCommand, writesEventsThatFollowTheirSchema) {
+    auto const watching = watch({"--json"});
+    std::string documents;
+    for (auto const& command : std::vector<std::vector<std::string>>{{"add", "valve.cpp"},
+                                                                     {"category", "create", "Owner"},
+                                                                     {"label", "create", "Status", "Done"},
+                                                                     {"name", "Engine"}}) {
+        documents += printed(*watching, command) + '\n';
+    }
+    expectValid(documents + R"({"event": "ready", "format": "projectctl-watch", "version": 1})");
+}
+
+TEST_F(WatchCommand, runsACommandForEachGroupOfEventsAndContinuesIfItFails) {
+    auto const watching = watch({"--exec", "sed 's/^/got /'; exit 3"});
+
+    EXPECT_EQ(printed(*watching, {"batch"}, "add valve.cpp\nname Engine\n"), "got nameChanged");
+    EXPECT_EQ(watching->readLine(), "got fileListUpdate\tvalve.cpp");
+    EXPECT_EQ(watching->readErrorLine(),
+              "projectctl: warning: the command of --exec has failed with the exit code 3");
+    EXPECT_EQ(printed(*watching, {"name", "Motor"}), "got nameChanged");
+}
+
+TEST_F(WatchCommand, passesAnyNumberOfEventsToACommandThatDoesNotReadThem) {
+    auto const watching = watch({"--exec", "echo done"});
+
+    EXPECT_EQ(printed(*watching, {"name", "Motor"}), "done");
+    EXPECT_EQ(printed(*watching, {"name", "Engine"}), "done");
 }
 
 TEST_F(WatchCommand, keepsANameWithALineFeedInOneLine) {

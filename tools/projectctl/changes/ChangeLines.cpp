@@ -53,11 +53,6 @@ std::string quotedName(std::u16string_view text) {
     return result;
 }
 
-void writeChange(std::string_view words, std::string const& text) {
-    output().text().append(words).append(1, ' ').append(text).append(1, '\n');
-    output().flushWhenLarge();
-}
-
 MetadataPath categoryAddress(std::u16string const& uuid) {
     return MetadataPath::root()
         .child(PathElement(treeSchema::categories::categoriesType, treeSchema::rootLocation))
@@ -71,14 +66,37 @@ std::u16string const& earliest(Difference const& change, char16_t const* key) {
 
 } // namespace
 
-ChangeLines::ChangeLines(OpenProject& project, std::vector<Difference> const& changes)
-    : project_(project), changes_(changes), shown_(project.root()) {
+ChangeLines::ChangeLines(OpenProject& project, std::vector<Difference> const& changes, bool isJson)
+    : project_(project), changes_(changes), shown_(project.root()), isJson_(isJson) {
 }
 
 void ChangeLines::write() {
     for (auto const& change : changes_) {
         write(change);
     }
+    if (isJson_) {
+        rows_.finish();
+    }
+}
+
+/// A line consists of the words, the texts with "=" between them, and the path.
+void ChangeLines::write(std::string_view words, std::vector<Member> const& members) {
+    if (isJson_) {
+        rows_.begin();
+        rows_.addText("change", std::u16string(words.begin(), words.end()));
+        for (auto const& member : members) {
+            rows_.addText(member.key, member.text);
+        }
+        return;
+    }
+    std::string line(words);
+    for (auto const& member : members) {
+        bool const isPath = member.key == "path";
+        line += isPath || &member == &members.front() ? ' ' : '=';
+        line += isPath ? quotedName(shown_.of(member.text)) : quotedName(member.text);
+    }
+    output().text().append(line).append(1, '\n');
+    output().flushWhenLarge();
 }
 
 void ChangeLines::write(Difference const& change) {
@@ -100,9 +118,9 @@ void ChangeLines::write(Difference const& change) {
     } else if (head == treeSchema::references::referencesType && depth == 2) {
         writeReference("reference", change);
     } else if (address == ProjectManagerBase::getRootNodePath() && change.after) {
-        writeChange("name", quotedName(change.after->get(treeSchema::information::nameKey)));
+        write("name", {{"name", change.after->get(treeSchema::information::nameKey)}});
     } else if (address == ProjectManagerBase::getDescriptionNodePath() && change.after) {
-        writeChange("description", quotedName(change.after->get(treeSchema::information::descriptionKey)));
+        write("description", {{"description", change.after->get(treeSchema::information::descriptionKey)}});
     } else {
         writeOther(change);
     }
@@ -116,23 +134,22 @@ void ChangeLines::writeFile(Difference const& change) {
     }
     auto const path = pathOf(change.address);
     if (!change.after) {
-        writeChange("remove", quotedName(shown_.of(path)));
+        write("remove", {{"path", path}});
         return;
     }
     if (!change.before) {
-        writeChange("add", quotedName(shown_.of(path)));
+        write("add", {{"path", path}});
     }
     writeLabelsOfFile(change, path);
 }
 
-void ChangeLines::writeLabelsOfFile(Difference const& change, std::u16string_view path) {
+void ChangeLines::writeLabelsOfFile(Difference const& change, std::u16string const& path) {
     auto const before = labelsOf(change.before);
     auto const after = labelsOf(change.after);
     auto const writeLabel = [&](std::string_view word, LabelOnFile const& label) {
         auto const category = categoryAddress(label.first);
         auto const own = category.child(PathElement(treeSchema::categories::labelType, label.second));
-        writeChange(word, quotedName(nameAt(category)) + '=' + quotedName(nameAt(own)) + ' ' +
-                              quotedName(shown_.of(path)));
+        write(word, {{"category", nameAt(category)}, {"label", nameAt(own)}, {"path", path}});
     };
     for (auto const& label : without(before, after)) {
         writeLabel("take", label);
@@ -141,7 +158,7 @@ void ChangeLines::writeLabelsOfFile(Difference const& change, std::u16string_vie
         writeLabel("put", label);
     }
     if (change.before && before == after) {
-        writeChange("change", quotedName(shown_.of(path)));
+        write("change", {{"path", path}});
     }
 }
 
@@ -151,38 +168,52 @@ void ChangeLines::writeDataOfFile(Difference const& change) {
     if (isOfRemovedFile(change.address) || (isInList && find(change.address.parent()) != nullptr)) {
         return;
     }
-    isInList ? writeChange("change", quotedName(shown_.of(pathOf(change.address)))) : writeOther(change);
+    isInList ? write("change", {{"path", pathOf(change.address)}}) : writeOther(change);
 }
 
 void ChangeLines::writeNamed(std::string_view kind, Difference const& change, std::u16string const& owner) {
     constexpr auto const* key = treeSchema::categories::categoryNameKey;
     static_assert(std::u16string_view(key) == treeSchema::categories::labelNameKey);
     static_assert(std::u16string_view(key) == treeSchema::entrypoints::groupNameKey);
-    auto text = (owner.empty() ? std::string() : quotedName(owner) + '=') + quotedName(earliest(change, key));
+    std::vector<Member> members;
+    if (!owner.empty()) {
+        members.push_back({"category", owner});
+    }
+    members.push_back({"name", earliest(change, key)});
     auto const* word = !change.before ? " create" : !change.after ? " delete" : " rename";
     if (change.before && change.after) {
-        text += '=' + quotedName(change.after->get(key));
+        members.push_back({"newName", change.after->get(key)});
     }
-    writeChange(std::string(kind) + word, text);
+    write(std::string(kind) + word, members);
 }
 
 void ChangeLines::writeReference(std::string_view kind, Difference const& change) {
-    writeChange(std::string(kind) + (change.after ? " add" : " remove"),
-                quotedName(earliest(change, treeSchema::references::storedPathKey)));
+    write(std::string(kind) + (change.after ? " add" : " remove"),
+          {{"folder", earliest(change, treeSchema::references::storedPathKey)}});
 }
 
 void ChangeLines::writeEntry(Difference const& change) {
-    writeChange(change.after ? "entry set" : "entry remove",
-                quotedName(shown_.of(earliest(change, treeSchema::entrypoints::fileKey))));
+    write(change.after ? "entry set" : "entry remove",
+          {{"path", earliest(change, treeSchema::entrypoints::fileKey)}});
 }
 
 void ChangeLines::writeOther(Difference const& change) {
-    std::string steps;
+    std::vector<std::u16string> steps;
     for (auto const& step : change.address.getPath()) {
-        steps +=
-            (steps.empty() ? "" : " ") + quotedName(step.getType()) + ' ' + quotedName(step.getLocation());
+        steps.push_back(step.getType());
+        steps.push_back(step.getLocation());
     }
-    writeChange("other", steps);
+    if (isJson_) {
+        rows_.begin();
+        rows_.addText("change", u"other");
+        rows_.addList("address", steps);
+        return;
+    }
+    output().text() += "other";
+    for (auto const& step : steps) {
+        output().text() += ' ' + quotedName(step);
+    }
+    output().text() += '\n';
 }
 
 bool ChangeLines::isOfRemovedFile(Address const& address) const {

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "cli/ShownPaths.hpp"
+#include "output/JsonRows.hpp"
 #include "project/OpenProject.hpp"
 #include "project/stores/Change.hpp"
 
@@ -21,12 +22,15 @@ namespace projectctl {
 ///     path add PATH               path remove PATH             the same with reference
 ///     name TEXT                   description TEXT             other STEP... (any other address)
 ///
+/// In JSON, each change is an object with "change", the first words of its line, and a member for each of its
+/// texts.
+///
 /// Texts are quoted as appendQuoted does, so that a line is always one change. The labels and data of a
 /// removed file have no lines of their own.
 class ChangeLines {
 public:
     /// @param project in the transaction. @param changes sorted by address; borrowed.
-    ChangeLines(OpenProject& project, std::vector<project::stores::Difference> const& changes);
+    ChangeLines(OpenProject& project, std::vector<project::stores::Difference> const& changes, bool isJson);
 
     void write();
 
@@ -34,9 +38,16 @@ private:
     using Address = project::metadata::MetadataPath;
     using Difference = project::stores::Difference;
 
+    /// A text of a change.
+    struct Member {
+        std::string_view key; ///< in JSON
+        std::u16string text;  ///< of "path", relative to the root
+    };
+
     void write(Difference const& change);
+    void write(std::string_view words, std::vector<Member> const& members);
     void writeFile(Difference const& change);
-    void writeLabelsOfFile(Difference const& change, std::u16string_view path);
+    void writeLabelsOfFile(Difference const& change, std::u16string const& path);
     void writeDataOfFile(Difference const& change);
     void writeNamed(std::string_view kind, Difference const& change, std::u16string const& owner);
     void writeReference(std::string_view kind, Difference const& change);
@@ -55,6 +66,8 @@ private:
     OpenProject& project_;
     std::vector<Difference> const& changes_;
     ShownPaths shown_;
+    bool isJson_;
+    JsonRows rows_{json::dryRun, "changes"};
 };
 
 } // namespace projectctl

@@ -8,12 +8,13 @@ namespace projectctl {
 
 void DryRun::declare(CLI::App& app) {
     app.add_flag(option, isOn_);
+    app.add_flag("--json", isJson_);
 }
 
 bool DryRun::end(ProjectTransaction& transaction, OpenProject& project) const {
     if (isOn_) {
         auto const changes = changesOfTransaction(project);
-        ChangeLines(project, changes).write();
+        ChangeLines(project, changes, isJson_).write();
     } else {
         noteUndoHint(project);
         transaction.commit();

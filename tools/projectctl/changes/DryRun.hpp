@@ -22,6 +22,7 @@ public:
 
 private:
     bool isOn_ = false;
+    bool isJson_ = false;
 };
 
 } // namespace projectctl

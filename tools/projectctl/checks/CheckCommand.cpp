@@ -1,11 +1,18 @@
 #include <algorithm>
+#include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "checks/Commands.hpp"
+#include "checks/FindingForms.hpp"
 #include "checks/MergeSetupCheck.hpp"
 #include "checks/TreeCheck.hpp"
+#include "cli/CodedFailure.hpp"
 #include "cli/ExitCode.hpp"
+#include "cli/ShownPaths.hpp"
+#include "cli/TextArguments.hpp"
+#include "output/JsonDocument.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
@@ -17,70 +24,136 @@ namespace {
 
 using project::stores::Fault;
 
+std::string_view codeOf(Fault::Kind kind) {
+    switch (kind) {
+    case Fault::Kind::Damage:
+        return code::textDamaged;
+    case Fault::Kind::Conflict:
+        return code::textConflict;
+    case Fault::Kind::Irregular:
+        return code::textIrregular;
+    case Fault::Kind::TornTail:
+        return code::textTornTail;
+    case Fault::Kind::Displaced:
+        break;
+    }
+    return code::textDisplaced;
+}
+
 /// Reports all faults of the project's text, of its definition and of the merge set-up.
 class CheckCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand("check");
         app->add_flag("--repair", repair_);
+        auto* const form = takeText(*app, "--format", format_);
+        app->add_flag("--json", isJson_)->excludes(form);
         return app;
     }
 
     int run(OpenProject& project) override {
+        auto const form = chosenForm();
         if (repair_) {
             repair(project);
         }
         Progress progress("Checking the project");
-        std::size_t faults = 0;
-        std::string const file = project.definition();
-        auto const faultsOfDefinition = project.log() == nullptr ? project.faults() : project.log()->check();
-        for (auto const& fault : faultsOfDefinition) {
-            ++faults;
-            std::string const line = fault.line > 0 ? ':' + std::to_string(fault.line) : std::string();
-            report(file + line + ": " + fault.problem);
+        auto const faults = project.log() == nullptr ? project.faults() : project.log()->check();
+        auto found = allFindings(faults, project);
+        if (isJson_) {
+            writeJson(found);
+        } else if (form == FindingForm::Text) {
+            writeText(found, project.definition());
+        } else {
+            write(found, form, shownDefinition(project));
         }
-        for (auto const& finding : TreeCheck(project).run()) {
-            bool const isFault = finding.weight == Finding::Weight::Fault;
-            faults += isFault ? 1 : 0;
-            report(file + (isFault ? ": " : ": note: ") + finding.text);
-        }
-        Findings ofSetup;
-        if (project.log() == nullptr) { // git merges no log
-            checkMergeSetup(project.root(), ofSetup);
-        }
-        std::size_t const faultsOfProject = faults;
-        for (auto const& finding : ofSetup) {
-            bool const isFault = finding.weight == Finding::Weight::Fault;
-            faults += isFault ? 1 : 0;
-            report((isFault ? "" : "note: ") + finding.text);
-        }
-        output().say(faults == 0            ? "The project has no faults."
-                     : faultsOfProject == 0 ? "'projectctl setup' configures the merge driver."
-                                            : adviceFor(faultsOfDefinition));
-        return faults == 0 ? exit_code::done : exit_code::finding;
+        auto const count = countFaults(found);
+        bool const isOfSetup = std::ranges::all_of(
+            found, [](Finding const& finding) { return !finding.isFault() || isAboutSetup(finding); });
+        output().say(count == 0  ? "The project has no faults."
+                     : isOfSetup ? "'projectctl setup' configures the merge driver."
+                                 : adviceFor(faults));
+        return count == 0 ? exit_code::done : exit_code::finding;
     }
 
     bool canRunInBatch() const override { return !repair_; }
 
 private:
-    static void repair(OpenProject& project) {
-        project.shield().raise();
-        if (auto* const log = project.log()) {
-            repair(*log);
-            return;
+    FindingForm chosenForm() const {
+        if (!format_ || *format_ == "text") {
+            return FindingForm::Text;
         }
-        std::string const aside = project.text().repair();
-        if (!aside.empty()) {
-            project.stageLater();
-            report("the damaged lines are now in " + project.storeFile(aside));
+        if (*format_ != "gcc" && *format_ != "github") {
+            throw WrongUse('"' + *format_ + "\" is not a format. The formats are text, gcc and github");
+        }
+        return *format_ == "gcc" ? FindingForm::Gcc : FindingForm::GitHub;
+    }
+
+    /// The worst first.
+    Findings allFindings(std::vector<Fault> const& faults, OpenProject& project) const {
+        Findings result;
+        for (auto const& fault : faults) {
+            result.push_back(Finding::fault(codeOf(fault.kind), fault.problem));
+            result.back().line = fault.line;
+        }
+        auto const root = project.root();
+        append(result, TreeCheck(project, isJson_ ? ShownPaths::fromRoot(root) : ShownPaths(root)).run());
+        placeInText(result, project);
+        if (project.log() == nullptr) { // git merges no log
+            checkMergeSetup(root, result);
+        }
+        sortByWeight(result);
+        return result;
+    }
+
+    static bool isAboutSetup(Finding const& finding) { return finding.code.starts_with("merge-"); }
+
+    /// Faults of the text itself are shown with their lines.
+    static void writeText(Findings const& findings, std::string const& file) {
+        for (auto const& finding : findings) {
+            bool const hasLine = finding.line > 0 && !finding.address;
+            std::string const place = file + (hasLine ? ':' + std::to_string(finding.line) : std::string());
+            report((isAboutSetup(finding) ? std::string() : place + ": ") +
+                   (finding.isFault() ? "" : "note: ") + finding.text);
         }
     }
 
-    static void repair(project::stores::JournalBackend& log) {
+    static std::string shownDefinition(OpenProject& project) {
+        if (project.log() != nullptr) {
+            return project.definition();
+        }
+        std::string result;
+        auto const text = project::stores::TextBackend::textPath(project.root());
+        appendBytes(result, ShownPaths(project.root()).ofAbsolute(text));
+        return result;
+    }
+
+    void writeJson(Findings const& findings) const {
+        JsonDocument document(json::check);
+        addFindings(document, findings);
+        if (!aside_.empty()) {
+            document.addText("repaired", textOf(aside_));
+        }
+        document.finish();
+    }
+
+    void repair(OpenProject& project) {
+        project.shield().raise();
+        if (auto* const log = project.log()) {
+            repair(*log);
+        } else if (std::string const aside = project.text().repair(); !aside.empty()) {
+            project.stageLater();
+            aside_ = "the damaged lines are now in " + project.storeFile(aside);
+        }
+        if (!aside_.empty() && !isJson_) {
+            report(aside_);
+        }
+    }
+
+    void repair(project::stores::JournalBackend& log) {
         if (auto const aside = log.repair()) {
-            report("the damaged entries " + std::to_string(aside->first) + " to " +
-                   std::to_string(aside->last) + " of the log are set aside" +
-                   (aside->isNothingLost ? ", and nothing is lost" : "; what could be read is kept"));
+            aside_ = "the damaged entries " + std::to_string(aside->first) + " to " +
+                     std::to_string(aside->last) + " of the log are set aside" +
+                     (aside->isNothingLost ? ", and nothing is lost" : "; what could be read is kept");
         }
     }
 
@@ -104,6 +177,9 @@ private:
     static void report(std::string const& text) { output().text() += withoutControls(text, false) + '\n'; }
 
     bool repair_ = false;
+    bool isJson_ = false;
+    std::optional<std::string> format_;
+    std::string aside_; ///< what --repair has done
 };
 
 } // namespace

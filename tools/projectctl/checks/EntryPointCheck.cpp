@@ -23,39 +23,50 @@ Findings EntryPointCheck::run() {
         PathElement(treeSchema::entrypoints::entryPointsType, treeSchema::rootLocation));
     for (auto const& address : project_.store().getChildNodes(head)) {
         if (auto const node = project_.store().getNode(address)) {
-            check(address.leaf().getLocation(), *node);
+            check(address, *node);
         }
     }
-    for (auto const& [file, count] : files_) {
-        if (count > 1) {
-            findings_.push_back(
-                Finding::fault("the file " + inQuotes(shown_.of(file)) + " has " + std::to_string(count) +
-                               " entry points, but only the first one can be found by its path"));
+    for (auto const& [file, addresses] : files_) {
+        if (addresses.size() > 1) {
+            add(Finding::fault(code::entryRepeated,
+                               "the file " + inQuotes(shown_.of(file)) + " has " +
+                                   std::to_string(addresses.size()) +
+                                   " entry points, but only the first one can be found by its path"),
+                addresses[1], file);
         }
     }
     return std::move(findings_);
 }
 
-void EntryPointCheck::check(std::u16string const& uuid, Node const& node) {
+void EntryPointCheck::check(MetadataPath const& address, Node const& node) {
     auto const& file = node.get(treeSchema::entrypoints::fileKey);
-    std::string const entry =
-        "the entry point " + inQuotes(uuid) + " of the file " + inQuotes(shown_.of(file));
-    ++files_[file];
-    checkFile(entry, file);
+    std::string const entry = "the entry point " + inQuotes(address.leaf().getLocation()) + " of the file " +
+                              inQuotes(shown_.of(file));
+    files_[file].push_back(address);
+    checkFile(entry, file, address);
     auto const& group = node.get(treeSchema::entrypoints::groupUUIDKey);
     if (!group.empty() && !groups_.contains(group)) {
-        findings_.push_back(
-            Finding::fault(entry + " is in the group " + inQuotes(group) + ", which does not exist"));
+        add(Finding::fault(code::groupMissing,
+                           entry + " is in the group " + inQuotes(group) + ", which does not exist"),
+            address, file);
     }
 }
 
-void EntryPointCheck::checkFile(std::string const& entry, std::u16string const& file) {
+void EntryPointCheck::checkFile(std::string const& entry, std::u16string const& file,
+                                MetadataPath const& address) {
     auto const path = project_.root() / Path(file);
     if (!project_.files().isFileInProject(path)) {
-        findings_.push_back(Finding::note(entry + " is not shown, because the file is not in the project"));
+        add(Finding::note(code::entryFileNotListed,
+                          entry + " is not shown, because the file is not in the project"),
+            address, file);
     } else if (!project::metadata::exists(path)) {
-        findings_.push_back(Finding::note(entry + " cannot be used, because the file is not on disk"));
+        add(Finding::note(code::entryFileGone, entry + " cannot be used, because the file is not on disk"),
+            address, file);
     }
+}
+
+void EntryPointCheck::add(Finding finding, MetadataPath const& address, std::u16string const& file) {
+    findings_.push_back(std::move(finding).at(address).about(file));
 }
 
 } // namespace projectctl

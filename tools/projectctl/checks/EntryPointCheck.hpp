@@ -3,6 +3,7 @@
 #include <map>
 #include <set>
 #include <string>
+#include <vector>
 
 #include "checks/Finding.hpp"
 #include "cli/ShownPaths.hpp"
@@ -25,13 +26,16 @@ public:
 private:
     using Node = project::metadata::MetadataNode;
 
-    void check(std::u16string const& uuid, Node const& node);
-    void checkFile(std::string const& entry, std::u16string const& file);
+    using Address = project::metadata::MetadataPath;
+
+    void check(Address const& address, Node const& node);
+    void checkFile(std::string const& entry, std::u16string const& file, Address const& address);
+    void add(Finding finding, Address const& address, std::u16string const& file);
 
     OpenProject& project_;
     ShownPaths& shown_;
-    std::set<std::u16string> groups_;             ///< UUIDs
-    std::map<std::u16string, std::size_t> files_; ///< how many entry points each file has
+    std::set<std::u16string> groups_;                      ///< UUIDs
+    std::map<std::u16string, std::vector<Address>> files_; ///< the entry points of each file
     Findings findings_;
 };
 

@@ -1,9 +1,15 @@
 #pragma once
 
+#include <cstddef>
 #include <iterator>
+#include <optional>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
+
+#include "checks/FindingCode.hpp"
+#include "project/metadata/MetadataPath.hpp"
 
 namespace projectctl {
 
@@ -15,11 +21,31 @@ struct Finding {
     };
 
     Weight weight;
-    std::string text; ///< one clause in UTF-8, which names its subject
+    std::string_view code;    ///< of FindingCode.hpp
+    std::string text;         ///< one clause in UTF-8, which names its subject
+    std::u16string path = {}; ///< of the file that it is about, relative to the root; empty if there is none
+    std::optional<project::metadata::MetadataPath> address = {}; ///< of its node; empty if there is none
+    std::size_t line = 0; ///< of the text, counted from 1; 0 if it has none, or until placeInText was called
 
-    static Finding fault(std::string text) { return {Weight::Fault, std::move(text)}; }
+    static Finding fault(std::string_view code, std::string text) {
+        return {Weight::Fault, code, std::move(text)};
+    }
 
-    static Finding note(std::string text) { return {Weight::Note, std::move(text)}; }
+    static Finding note(std::string_view code, std::string text) {
+        return {Weight::Note, code, std::move(text)};
+    }
+
+    bool isFault() const noexcept { return weight == Weight::Fault; }
+
+    Finding at(project::metadata::MetadataPath where) && {
+        address = std::move(where);
+        return std::move(*this);
+    }
+
+    Finding about(std::u16string_view file) && {
+        path = file;
+        return std::move(*this);
+    }
 };
 
 using Findings = std::vector<Finding>;

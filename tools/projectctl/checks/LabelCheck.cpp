@@ -1,6 +1,7 @@
 #include "checks/LabelCheck.hpp"
 
 #include <cstddef>
+#include <utility>
 
 #include "output/NameForms.hpp"
 #include "project/metadata/TreeSchema.hpp"
@@ -15,14 +16,15 @@ using project::metadata::PathElement;
 namespace {
 
 Finding missing(std::string const& file, std::u16string const& uuid, std::string const& category) {
-    return Finding::fault(file + " has the label " + inQuotes(uuid) + " of the category " + category +
-                          ", which does not exist");
+    return Finding::fault(code::labelMissing, file + " has the label " + inQuotes(uuid) +
+                                                  " of the category " + category + ", which does not exist");
 }
 
 Finding repeated(std::string const& file, std::u16string const& label, std::string const& category,
                  std::size_t count) {
-    return Finding::note(file + " has the label " + inQuotes(label) + " of the category " + category + ' ' +
-                         std::to_string(count) + " times");
+    return Finding::note(code::labelRepeated, file + " has the label " + inQuotes(label) +
+                                                  " of the category " + category + ' ' +
+                                                  std::to_string(count) + " times");
 }
 
 } // namespace
@@ -49,14 +51,18 @@ LabelCheck::LabelCheck(project::metadata::MetadataManager& store) {
     }
 }
 
-void LabelCheck::check(std::u16string_view path, Node const& node, ShownPaths& shown,
+void LabelCheck::check(CheckedFile const& subject, Node const& node, ShownPaths& shown,
                        Findings& findings) const {
     if (node.getChildren().empty()) {
         return;
     }
-    std::string const file = "the file " + inQuotes(shown.of(path));
+    std::string const file = "the file " + inQuotes(shown.of(subject.path));
+    Findings found;
     for (auto const& [category, labels] : labelsOn(node)) {
-        checkCategory(file, category, labels, findings);
+        checkCategory(file, category, labels, found);
+    }
+    for (auto& finding : found) {
+        findings.push_back(std::move(finding).at(subject.address()).about(subject.path));
     }
 }
 
@@ -81,8 +87,9 @@ void LabelCheck::checkCategory(std::string const& file, std::u16string const& uu
                                Findings& findings) const {
     auto const category = categories_.find(uuid);
     if (category == categories_.end()) {
-        findings.push_back(Finding::fault(file + " has a label of the category " + inQuotes(uuid) +
-                                          ", which does not exist"));
+        findings.push_back(Finding::fault(code::categoryMissing, file + " has a label of the category " +
+                                                                     inQuotes(uuid) +
+                                                                     ", which does not exist"));
         return;
     }
     std::string const name = inQuotes(category->second.name);
@@ -97,8 +104,9 @@ void LabelCheck::checkCategory(std::string const& file, std::u16string const& uu
         }
     }
     if (category->second.isSingleValued && total > 1) {
-        findings.push_back(Finding::fault(file + " has " + std::to_string(total) +
-                                          " labels of the category " + name + ", which allows one"));
+        findings.push_back(Finding::fault(code::labelsContradict, file + " has " + std::to_string(total) +
+                                                                      " labels of the category " + name +
+                                                                      ", which allows one"));
     }
 }
 

@@ -4,6 +4,7 @@
 #include <set>
 #include <string>
 
+#include "checks/CheckedFile.hpp"
 #include "checks/Finding.hpp"
 #include "cli/ShownPaths.hpp"
 #include "project/metadata/MetadataManager.hpp"
@@ -18,8 +19,8 @@ public:
     explicit LabelCheck(project::metadata::MetadataManager& store);
 
     /// Adds the faults of the labels on one file to the findings. Cheap for a file without labels.
-    /// @param path relative to the root. @param node of the file.
-    void check(std::u16string_view path, project::metadata::MetadataNode const& node, ShownPaths& shown,
+    /// @param node of the file.
+    void check(CheckedFile const& subject, project::metadata::MetadataNode const& node, ShownPaths& shown,
                Findings& findings) const;
 
 private:

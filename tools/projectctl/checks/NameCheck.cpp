@@ -4,14 +4,18 @@
 
 namespace projectctl {
 
-void checkName(std::u16string_view path, ShownPaths& shown, Findings& findings) {
+void checkName(CheckedFile const& subject, ShownPaths& shown, Findings& findings) {
+    auto const path = subject.path;
     std::size_t const backslash = path.rfind(u'\\');
     std::size_t const separator = path.rfind(u'/');
     if (backslash != std::u16string_view::npos &&
         (separator == std::u16string_view::npos || separator < backslash)) {
-        findings.push_back(Finding::note(inQuotes(shown.of(path)) +
-                                         " has a backslash in its name: entry points of it or of files "
-                                         "below it, and references to it, cannot be found again"));
+        findings.push_back(Finding::note(code::nameBackslash,
+                                         inQuotes(shown.of(path)) +
+                                             " has a backslash in its name: entry points of it or of files "
+                                             "below it, and references to it, cannot be found again")
+                               .at(subject.address())
+                               .about(path));
     }
 }
 

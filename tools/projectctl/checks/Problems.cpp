@@ -13,8 +13,10 @@ Findings findProblems(OpenProject& project, ShownPaths shown) {
     FileList const list(project);
     LabelCheck const labels(project.store());
     list.visit(project.root(), [&](FileList::File const& file) {
-        checkName(file.path, shown, result);
-        labels.check(file.path, file.node, shown, result);
+        CheckedFile const subject{file.path,
+                                  [&] { return list.addressOf(project.root() / Path(file.path)); }};
+        checkName(subject, shown, result);
+        labels.check(subject, file.node, shown, result);
     });
     append(result, EntryPointCheck(project, shown).run());
     append(result, ReferenceCheck(project, shown).run());

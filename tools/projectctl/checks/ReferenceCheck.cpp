@@ -16,6 +16,14 @@ namespace treeSchema = project::metadata::schema;
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
 
+namespace {
+
+MetadataPath headOf(ReferenceList const& list) {
+    return MetadataPath::root().child(PathElement(std::u16string(list.head), treeSchema::rootLocation));
+}
+
+} // namespace
+
 Findings ReferenceCheck::run() {
     for (auto const* list : {&projectPath(), &projectReferences()}) {
         auto const references = list->manager(project_).getReferences();
@@ -30,16 +38,17 @@ void ReferenceCheck::checkForms(ReferenceList const& list, References const& ref
     for (auto const& reference : references) {
         read.insert(reference.getUUID());
     }
-    auto const head =
-        MetadataPath::root().child(PathElement(std::u16string(list.head), treeSchema::rootLocation));
-    for (auto const& address : project_.store().getChildNodes(head)) {
+    for (auto const& address : project_.store().getChildNodes(headOf(list))) {
         auto const& uuid = address.leaf().getLocation();
         auto const node = project_.store().getNode(address);
         bool const isReference = node && address.leaf().getType() == treeSchema::references::referenceType;
         if (isReference && !read.contains(uuid)) {
-            findings_.push_back(Finding::note("the reference " + inQuotes(uuid) + " in " + list.name +
-                                              " is not shown, because this list does not support its type " +
-                                              inQuotes(node->get(treeSchema::references::typeKey))));
+            findings_.push_back(
+                Finding::note(code::referenceTypeUnsupported,
+                              "the reference " + inQuotes(uuid) + " in " + list.name +
+                                  " is not shown, because this list does not support its type " +
+                                  inQuotes(node->get(treeSchema::references::typeKey)))
+                    .at(address));
         }
     }
 }
@@ -47,14 +56,20 @@ void ReferenceCheck::checkForms(ReferenceList const& list, References const& ref
 void ReferenceCheck::checkTargets(ReferenceList const& list, References const& references) {
     for (auto const& reference : references) {
         auto const& folder = reference.getLocation();
+        auto const address =
+            headOf(list).child(PathElement(treeSchema::references::referenceType, reference.getUUID()));
         std::string const subject =
             "the reference " + inQuotes(shown_.of(reference.getStoredPath())) + " in " + list.name;
         if (!project::metadata::is_directory(folder)) {
-            findings_.push_back(Finding::note(subject + " cannot be followed: the folder " +
-                                              inQuotes(folder.native()) + " does not exist"));
+            findings_.push_back(
+                Finding::note(code::referenceFolderMissing, subject + " cannot be followed: the folder " +
+                                                                inQuotes(folder.native()) + " does not exist")
+                    .at(address));
         } else if (list.isOfProjects && findProjectIn(folder) == ProjectTrace::None) {
-            findings_.push_back(Finding::note(subject + " cannot be followed: the folder " +
-                                              inQuotes(folder.native()) + " does not contain a project"));
+            findings_.push_back(Finding::note(code::referenceProjectMissing,
+                                              subject + " cannot be followed: the folder " +
+                                                  inQuotes(folder.native()) + " does not contain a project")
+                                    .at(address));
         }
     }
 }

@@ -3,9 +3,11 @@
 #include <vector>
 
 #include "checks/Commands.hpp"
+#include "checks/FindingForms.hpp"
 #include "checks/MergeSetupCheck.hpp"
 #include "checks/Problems.hpp"
 #include "checks/StatusScan.hpp"
+#include "cli/ExitCode.hpp"
 #include "cli/ShownPaths.hpp"
 #include "git/GitIgnore.hpp"
 #include "output/JsonRows.hpp"
@@ -26,6 +28,7 @@ public:
         auto* const app = tool.add_subcommand("status");
         app->add_flag("--json", isJson_);
         app->add_flag("--gitignore", leavesOutIgnored_);
+        app->add_flag("--exit-code", hasExitCode_);
         return app;
     }
 
@@ -34,15 +37,18 @@ public:
         project.warnOfDamage();
         auto const scan = compare(project);
         for (auto const& line : scan.unreadable()) {
-            printError("warning: " + line);
+            printWarning(line);
         }
         Differences found{leavesOutIgnored_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
                           findProblems(project, isJson_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_))};
         if (project.log() == nullptr) { // git merges no log
             checkMergeSetup(root_, found.problems);
         }
+        placeInText(found.problems, project);
+        sortByWeight(found.problems);
         isJson_ ? writeJson(found) : writeLines(found);
-        return 0;
+        bool const isClean = found.added.empty() && found.gone.empty() && countFaults(found.problems) == 0;
+        return hasExitCode_ && !isClean ? exit_code::finding : exit_code::done;
     }
 
     bool isListing() const override { return true; }
@@ -104,19 +110,13 @@ private:
     }
 
     void writeJson(Differences const& found) const {
-        output().text() += "{\"new\": ";
+        JsonDocument document(json::status);
+        document.addKey("new");
         writeJson(found.added);
-        output().text() += ",\n\"gone\": ";
+        document.addKey("gone");
         writeJson(found.gone);
-        output().text() += ",\n\"problems\": ";
-        JsonRows rows;
-        for (auto const& problem : found.problems) {
-            rows.begin();
-            rows.addFlag("fault", problem.weight == Finding::Weight::Fault);
-            rows.addText("text", textOf(problem.text));
-        }
-        rows.finish();
-        output().text() += "}\n";
+        addFindings(document, found.problems);
+        document.finish();
     }
 
     void writeJson(Files const& files) const {
@@ -131,6 +131,7 @@ private:
     Path root_;
     bool isJson_ = false;
     bool leavesOutIgnored_ = false;
+    bool hasExitCode_ = false;
 };
 
 } // namespace

@@ -54,12 +54,12 @@ bool isOneOf(std::u16string const& text, std::initializer_list<std::u16string_vi
 
 } // namespace
 
-TreeCheck::TreeCheck(OpenProject& project)
+TreeCheck::TreeCheck(OpenProject& project, ShownPaths shown)
     : project_(project),
       store_(project.store()),
       guard_(store_.acquireReadLock()),
       labels_(store_),
-      shown_(project.root()) {
+      shown_(std::move(shown)) {
 }
 
 Findings TreeCheck::run() {
@@ -87,7 +87,8 @@ void TreeCheck::checkHead(Address const& head) {
         checkReferences(head);
     } else if (head != ProjectManagerBase::getRootNodePath() &&
                head != ProjectManagerBase::getDescriptionNodePath().parent()) {
-        note("this version does not use the data at " + described(head));
+        add(Finding::note(code::dataUnused, "this version does not use the data at " + described(head)),
+            head);
     }
 }
 
@@ -110,7 +111,10 @@ void TreeCheck::checkFiles(Address const& scope) {
 
 void TreeCheck::checkFile(Address const& file) {
     if (!isPossibleName(file.leaf().getLocation())) {
-        fault("no file can have the name " + inQuotes(file.leaf().getLocation()) + ", at " + described(file));
+        add(Finding::fault(code::nameImpossible, "no file can have the name " +
+                                                     inQuotes(file.leaf().getLocation()) + ", at " +
+                                                     described(file)),
+            file);
     }
     auto const node = store_.getNode(file);
     if (!node) {
@@ -118,12 +122,16 @@ void TreeCheck::checkFile(Address const& file) {
     }
     auto const above = file.parent();
     if (above.depth() > 1 && !store_.hasNode(above)) {
-        fault("the file " + inQuotes(shown_.of(pathOf(file))) +
-              " is in the project but its folder is not, so listings do not show it");
+        add(Finding::fault(code::folderNotListed,
+                           "the file " + inQuotes(shown_.of(pathOf(file))) +
+                               " is in the project but its folder is not, so listings do not show it"),
+            file);
     }
     if (file[0].getLocation() == treeSchema::rootLocation) {
-        checkName(pathOf(file), shown_, findings_);
-        labels_.check(pathOf(file), *node, shown_, findings_);
+        auto const path = pathOf(file);
+        CheckedFile const subject{path, [&file] { return file; }};
+        checkName(subject, shown_, findings_);
+        labels_.check(subject, *node, shown_, findings_);
     }
 }
 
@@ -141,8 +149,10 @@ void TreeCheck::checkLabels(Address const& category) {
         }
         std::u16string const state = store_.getNode(label)->get(treeSchema::categories::labelReadOnlyKey);
         if (!isOneOf(state, {u"", u"READ_ONLY", u"WRITABLE", u"INHERITED"})) {
-            fault("the label " + inQuotes(label.leaf().getLocation()) + " has the unknown read-only state " +
-                  inQuotes(state));
+            add(Finding::fault(code::labelStateUnknown, "the label " + inQuotes(label.leaf().getLocation()) +
+                                                            " has the unknown read-only state " +
+                                                            inQuotes(state)),
+                label);
         }
     }
 }
@@ -156,7 +166,9 @@ void TreeCheck::checkEntryPoints(Address const& head) {
         std::string const uuid = inQuotes(entryPoint.leaf().getLocation());
         auto const& type = node->get(treeSchema::entrypoints::typeKey);
         if (!isOneOf(type, {u"Basic", u"Startup", u"StartUp", u"Shutdown", u"Batch_Job", u"Batch Job"})) {
-            fault("the entry point " + uuid + " has the unknown type " + inQuotes(type));
+            add(Finding::fault(code::entryTypeUnknown,
+                               "the entry point " + uuid + " has the unknown type " + inQuotes(type)),
+                entryPoint);
         }
     }
 }
@@ -177,16 +189,15 @@ bool TreeCheck::requireNode(Address const& address, std::string const& kind) {
     if (store_.hasNode(address)) {
         return true;
     }
-    fault(kind + ' ' + inQuotes(address.leaf().getLocation()) + " has an address without a node");
+    add(Finding::fault(code::nodeMissing, kind + ' ' + inQuotes(address.leaf().getLocation()) +
+                                              " has an address without a node"),
+        address);
     return false;
 }
 
-void TreeCheck::fault(std::string text) {
-    findings_.push_back(Finding::fault(std::move(text)));
-}
-
-void TreeCheck::note(std::string text) {
-    findings_.push_back(Finding::note(std::move(text)));
+void TreeCheck::add(Finding finding, Address const& address) {
+    bool const isFile = address[0].getType() == treeSchema::files::filesType;
+    findings_.push_back(std::move(finding).at(address).about(isFile ? pathOf(address) : std::u16string()));
 }
 
 } // namespace projectctl

@@ -14,7 +14,8 @@ namespace projectctl {
 class TreeCheck {
 public:
     /// Takes the store's read guard and holds it, so that all findings are about one state of the project.
-    explicit TreeCheck(OpenProject& project);
+    /// @param shown for the paths in findings.
+    TreeCheck(OpenProject& project, ShownPaths shown);
 
     /// Makes all checks. Call it once.
     Findings run();
@@ -31,8 +32,7 @@ private:
     void checkGroups(Address const& head);
     void checkReferences(Address const& head);
     bool requireNode(Address const& address, std::string const& kind);
-    void fault(std::string text);
-    void note(std::string text);
+    void add(Finding finding, Address const& address);
 
     OpenProject& project_;
     project::metadata::MetadataManager& store_; ///< the project's

@@ -7,11 +7,14 @@
 #include "cli/CodedFailure.hpp"
 #include "cli/CommonOptions.hpp"
 #include "cli/DeclaredTool.hpp"
+#include "cli/ExitCode.hpp"
 #include "cli/ExternalVerb.hpp"
 #include "cli/Pager.hpp"
 #include "cli/TextArguments.hpp"
 #include "cli/UsageProblem.hpp"
 #include "cli/WorkingFolder.hpp"
+#include "output/JsonDocument.hpp"
+#include "output/NameForms.hpp"
 #include "output/Output.hpp"
 
 namespace projectctl {
@@ -56,6 +59,34 @@ int show(std::string const& text) {
     return exit_code::done;
 }
 
+int showVersion(std::string const& version) {
+    if (!output().isJson()) {
+        return show(version + '\n');
+    }
+    JsonDocument document(json::version);
+    document.addText("projectctl", std::u16string(version.begin(), version.end()));
+    document.finish();
+    return show({});
+}
+
+/// The words after a hidden verb are those of another command line.
+bool asksForJson(std::vector<std::string> const& arguments, CommandList const& verbs) {
+    auto const verb = std::ranges::find(verbs, verbOf(arguments), &NamedCommand::name);
+    bool const isHidden = verb != verbs.end() && std::string_view(verb->purpose).empty();
+    return !isHidden && std::ranges::count(arguments, DeclaredTool::jsonOption) > 0;
+}
+
+/// With --json, every command that is done writes a document.
+void confirmInJson(int result) {
+    if (output().isJson() && !output().hasContent() && result == exit_code::done) {
+        JsonDocument document(json::done);
+        if (!output().confirmation().empty()) {
+            document.addText("text", textOf(output().confirmation()));
+        }
+        document.finish();
+    }
+}
+
 } // namespace
 
 int runCommandLine(int argc, char const* const* argv, std::string const& version,
@@ -63,9 +94,12 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
     std::vector<std::string> const given(argv + 1, argv + argc);
     callIfExternal(given, commands);
     auto arguments = markedArguments(given);
+    if (asksForJson(arguments, commands)) {
+        output().beginJson(); // before any error, also of the parser
+    }
     auto const folders = takeCommonOptions(arguments);
     if (verbOf(arguments) == "--version") {
-        return show(version + '\n');
+        return showVersion(version);
     }
     requireVerb(verbOf(arguments), commands);
     DeclaredTool tool(commands, verbOf(arguments));
@@ -83,6 +117,7 @@ int runCommandLine(int argc, char const* const* argv, std::string const& version
         pager.emplace();
     }
     auto const result = called->run();
+    confirmInJson(result);
     output().flush();
     return result;
 }

@@ -1,6 +1,7 @@
 #include "cli/DeclaredTool.hpp"
 
 #include <algorithm>
+#include <string_view>
 #include <utility>
 
 #include "cli/CommonOptions.hpp"
@@ -16,6 +17,16 @@ std::unique_ptr<CLI::App> makeParser() {
     parser->formatter(std::make_shared<HelpFormatter>());
     parser->require_subcommand(1);
     return parser;
+}
+
+/// Every command whose results have a form in JSON accepts --json. Those that only change the project declare
+/// no form of their own.
+void declareJson(CLI::App& app) {
+    auto const members = app.get_subcommands([](auto const*) { return true; });
+    std::ranges::for_each(members, [](CLI::App* member) { declareJson(*member); });
+    if (members.empty() && app.get_option_no_throw(DeclaredTool::jsonOption) == nullptr) {
+        app.add_flag_callback(DeclaredTool::jsonOption, [] {});
+    }
 }
 
 } // namespace
@@ -38,6 +49,11 @@ void DeclaredTool::declare(NamedCommand const& verb) {
     auto command = verb.make();
     auto* const app = command->declare(*parser_);
     app->group(verb.purpose);
+    bool const writesTextOnly =
+        verb.name == "shared" || verb.name == "export" || std::string_view(verb.purpose).empty();
+    if (!writesTextOnly) {
+        declareJson(*app);
+    }
     declared_.push_back({std::move(command), app});
 }
 

@@ -13,6 +13,9 @@ namespace projectctl {
 /// The parser with the verbs of the tool declared to it.
 class DeclaredTool {
 public:
+    /// The option of every command that writes its result, or an error, as JSON.
+    static constexpr char const* jsonOption = "--json";
+
     /// Declares all verbs.
     explicit DeclaredTool(CommandList const& verbs);
 

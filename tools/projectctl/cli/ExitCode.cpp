@@ -1,5 +1,8 @@
 #include "cli/ExitCode.hpp"
 
+#include <array>
+#include <cstddef>
+
 #include "cli/CodedFailure.hpp"
 #include "project/git/GitError.hpp"
 #include "project/stores/StoreError.hpp"
@@ -8,6 +11,13 @@ namespace projectctl {
 
 using project::git::GitError;
 using project::stores::StoreError;
+
+std::string_view nameOf(int exitCode) {
+    static constexpr std::array<std::string_view, 9> names{"done",     "failed",      "wrong-use",
+                                                           "finding",  "busy",        "damaged",
+                                                           "conflict", "disk-failed", "outcome-unknown"};
+    return names.at(static_cast<std::size_t>(exitCode));
+}
 
 int exitCodeFor(std::exception const& error) {
     if (auto const* const coded = dynamic_cast<CodedFailure const*>(&error)) {

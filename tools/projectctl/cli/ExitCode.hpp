@@ -1,6 +1,7 @@
 #pragma once
 
 #include <exception>
+#include <string_view>
 
 namespace projectctl {
 
@@ -19,6 +20,9 @@ inline constexpr int diskFailed = 7;     ///< the disk is full or fails, or a pe
 inline constexpr int outcomeUnknown = 8; ///< the change may be in the project or not
 
 } // namespace exit_code
+
+/// The word for an exit code, as in JSON: "busy".
+std::string_view nameOf(int exitCode);
 
 /// The exit code of a command that failed with an error.
 int exitCodeFor(std::exception const& error);

@@ -12,8 +12,7 @@ void EntryRows::add(project::management::EntryPoint const& entry) {
     rows_.addText("name", entry.getName());
     rows_.addFlag("visible", entry.isVisible());
     if (auto const group = entry.getGroup()) {
-        rows_.addText("group", group->getName());
-        rows_.addText("groupUuid", group->getUUID());
+        rows_.addNamed("group", group->getName(), group->getUUID());
     }
     JsonRows::Texts extensions;
     for (auto const& key : entry.getExtensionKeys()) {

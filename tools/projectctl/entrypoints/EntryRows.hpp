@@ -15,11 +15,11 @@ public:
     void add(project::management::EntryPoint const& entry);
 
     /// Ends the output. Call it once, after the last entry point.
-    void finish() { rows_.finishOutput(); }
+    void finish() { rows_.finish(); }
 
 private:
     Path const& root_;
-    JsonRows rows_;
+    JsonRows rows_{json::entryList, "entryPoints"};
 };
 
 } // namespace projectctl

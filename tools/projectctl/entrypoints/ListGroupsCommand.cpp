@@ -34,13 +34,13 @@ private:
     }
 
     static void writeJson(Groups const& groups) {
-        JsonRows rows;
+        JsonRows rows(json::groupList, "groups");
         for (auto const& group : groups.all()) {
             rows.begin();
             rows.addText("name", group->getName());
             rows.addText("uuid", group->getUUID());
         }
-        rows.finishOutput();
+        rows.finish();
     }
 
     bool isJson_ = false;

@@ -61,8 +61,8 @@ private:
     static void warnOfTrackedFiles(OpenProject& project, std::vector<Path> const& paths) {
         ShownPaths shown(project.root());
         for (auto const& path : project.trackedOutsideProject(paths)) {
-            printError("warning: " + inQuotes(shown.ofAbsolute(path)) +
-                       " is below a removed folder but not in the project; git will no longer track it");
+            printWarning(inQuotes(shown.ofAbsolute(path)) +
+                         " is below a removed folder but not in the project; git will no longer track it");
         }
     }
 

@@ -163,6 +163,16 @@ int waitFor(pid_t child) {
 
 } // namespace
 
+int runVisibly(std::vector<std::string> const& command, std::string_view input) {
+    auto toChild = makePipe();
+    auto const child = SpawnSettings(toChild.readEnd.get(), STDOUT_FILENO, STDERR_FILENO).spawn(command);
+    toChild.readEnd.close();
+    while (toChild.writeEnd.get() >= 0) {
+        feed(toChild.writeEnd, input);
+    }
+    return waitFor(child);
+}
+
 ProcessResult runWithInput(std::vector<std::string> const& command, std::string_view input) {
     auto toChild = makePipe();
     auto output = makePipe();

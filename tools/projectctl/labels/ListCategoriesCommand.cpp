@@ -42,7 +42,7 @@ private:
     }
 
     static void writeJson(std::vector<CategoryIdentifier> const& categories) {
-        JsonRows rows;
+        JsonRows rows(json::categoryList, "categories");
         for (auto const& category : categories) {
             rows.begin();
             rows.addText("name", category.getName());
@@ -51,7 +51,7 @@ private:
             rows.addFlag("singleValued", category.isSingleValued());
             rows.addText("type", category.getDataType());
         }
-        rows.finishOutput();
+        rows.finish();
     }
 
     /// The differences from a category that was created without options: " (read-only, type Number)".

@@ -34,7 +34,7 @@ public:
         auto categories =
             category_ ? std::vector{LabelNames(labels).category(*category_)} : labels.getAllCategories();
         std::ranges::stable_sort(categories, {}, &CategoryIdentifier::getName);
-        JsonRows rows;
+        JsonRows rows(json::labelList, "labels");
         for (auto const& category : categories) {
             auto ofCategory = labels.getLabels(category);
             std::ranges::stable_sort(ofCategory, {}, &LabelIdentifier::getName);
@@ -43,7 +43,7 @@ public:
             }
         }
         if (isJson_) {
-            rows.finishOutput();
+            rows.finish();
         }
         return 0;
     }
@@ -53,11 +53,12 @@ public:
 private:
     static void writeJson(JsonRows& rows, CategoryIdentifier const& category, LabelIdentifier const& label) {
         rows.begin();
-        rows.addText("category", category.getName());
-        rows.addText("categoryUuid", category.getUUID());
-        rows.addText("label", label.getName());
-        rows.addText("labelUuid", label.getUUID());
-        rows.addText("readOnly", labelTypeToString(label.isReadOnly()));
+        bool const inherits = label.isReadOnly() == LabelReadOnlyState::INHERITED;
+        rows.addNamed("category", category.getName(), category.getUUID());
+        rows.addNamed("label", label.getName(), label.getUUID());
+        rows.addFlag("readOnly",
+                     inherits ? category.isReadOnly() : label.isReadOnly() == LabelReadOnlyState::READ_ONLY);
+        rows.addFlag("inheritsReadOnly", inherits);
     }
 
     void writeLine(CategoryIdentifier const& category, LabelIdentifier const& label) const {

@@ -39,8 +39,8 @@ private:
         std::u16string const name = textOf(*name_);
         auto const count = std::ranges::count(categories, name, &CategoryIdentifier::getName);
         if (count > 1) {
-            printError("warning: " + std::to_string(count) + " categories now have the name " +
-                       inQuotes(name) + "; only their UUIDs distinguish them");
+            printWarning(std::to_string(count) + " categories now have the name " + inQuotes(name) +
+                         "; only their UUIDs distinguish them");
         }
     }
 

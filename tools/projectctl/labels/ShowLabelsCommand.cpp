@@ -32,7 +32,7 @@ public:
         project.warnOfDamage();
         auto const guard = project.store().acquireReadLock();
         ShownPaths shown(project.root());
-        JsonRows rows;
+        JsonRows rows(json::labelShow, "labels");
         for (auto const& path : paths) {
             std::u16string const fromRoot = project::metadata::getRelativePath(project.root(), path);
             for (auto const& label : labelsOf(project, path)) {
@@ -44,7 +44,7 @@ public:
             }
         }
         if (isJson_) {
-            rows.finishOutput();
+            rows.finish();
         }
         return 0;
     }
@@ -75,10 +75,8 @@ private:
     static void writeJson(JsonRows& rows, std::u16string const& path, FileLabel const& label) {
         rows.begin();
         rows.addText("path", path);
-        rows.addText("category", label.getCategory().getName());
-        rows.addText("categoryUuid", label.getCategory().getUUID());
-        rows.addText("label", label.getLabelIdentifier().getName());
-        rows.addText("labelUuid", label.getUUID());
+        rows.addNamed("category", label.getCategory().getName(), label.getCategory().getUUID());
+        rows.addNamed("label", label.getLabelIdentifier().getName(), label.getUUID());
         rows.addText("data", label.getData());
     }
 

@@ -1,3 +1,4 @@
+#include <cstddef>
 #include <iostream>
 #include <optional>
 #include <string>
@@ -10,6 +11,7 @@
 #include "merge/Commands.hpp"
 #include "merge/ConflictWords.hpp"
 #include "output/Failure.hpp"
+#include "output/JsonRows.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "project/ProjectCommand.hpp"
@@ -32,6 +34,7 @@ public:
         auto* const app = tool.add_subcommand("resolve");
         auto* const ours = app->add_flag("--ours", ours_);
         app->add_flag("--theirs", theirs_)->excludes(ours);
+        app->add_flag("--json", isJson_);
         return app;
     }
 
@@ -46,6 +49,9 @@ public:
         project.shield().raise();
         project.text().resolve(merge.text(choices));
         stage(project.root());
+        if (isJson_) {
+            writeJson(merge.conflicts(), choices);
+        }
         output().say("The conflicts are resolved.");
         return 0;
     }
@@ -53,6 +59,17 @@ public:
     bool canRunInBatch() const override { return false; }
 
 private:
+    static void writeJson(std::vector<MergeConflict> const& conflicts,
+                          std::vector<MergeSide> const& choices) {
+        JsonRows rows(json::resolve, "conflicts");
+        for (std::size_t index = 0; index < conflicts.size(); ++index) {
+            rows.begin();
+            rows.addText("side", choices[index] == MergeSide::Ours ? u"ours" : u"theirs");
+            rows.addText("text", textOf(inWords(conflicts[index])));
+        }
+        rows.finish();
+    }
+
     static TextMerge mergeAgain(Path const& root) {
         constexpr int base = 1;
         constexpr int ours = 2;
@@ -91,7 +108,7 @@ private:
         if (ours_ || theirs_) {
             return {conflicts.size(), ours_ ? MergeSide::Ours : MergeSide::Theirs};
         }
-        bool const canAsk = output().isTerminal() && isatty(STDIN_FILENO) == 1;
+        bool const canAsk = !isJson_ && output().isTerminal() && isatty(STDIN_FILENO) == 1;
         std::vector<MergeSide> result;
         result.reserve(conflicts.size());
         for (auto const& conflict : conflicts) {
@@ -129,6 +146,7 @@ private:
 
     bool ours_ = false;
     bool theirs_ = false;
+    bool isJson_ = false;
 };
 
 } // namespace

@@ -44,6 +44,11 @@ void JsonObject::addFlag(std::string_view key, bool value) {
     output().text() += value ? "true" : "false";
 }
 
+void JsonObject::addNumber(std::string_view key, std::size_t value) {
+    addKey(key);
+    output().text() += std::to_string(value);
+}
+
 void JsonObject::addFile(std::u16string_view path, Kind kind) {
     addText("path", path);
     addText("kind", kind == Kind::Folder ? u"folder" : u"file");

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -23,6 +24,15 @@ public:
     void addTexts(std::string_view key, Texts const& texts);
 
     void addFlag(std::string_view key, bool value);
+    void addNumber(std::string_view key, std::size_t value);
+
+    /// Adds a thing that has a name and a UUID, such as a category, as a nested object.
+    void addNamed(std::string_view key, std::u16string const& name, std::u16string const& uuid) {
+        addTexts(key, {{u"uuid", uuid}, {u"name", name}});
+    }
+
+    /// Adds a key, whose value the caller writes next.
+    void addKey(std::string_view key);
 
     /// Adds the members "path" and "kind" of a file.
     void addFile(std::u16string_view path, Kind kind);
@@ -30,8 +40,6 @@ public:
     void end();
 
 private:
-    void addKey(std::string_view key);
-
     bool isFirstMember_ = true;
 };
 

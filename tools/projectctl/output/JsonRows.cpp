@@ -4,9 +4,18 @@
 
 namespace projectctl {
 
+void JsonRows::open() {
+    if (format_ != nullptr) {
+        document_.emplace(*format_);
+        document_->addKey(key_);
+    }
+    output().text() += '[';
+}
+
 void JsonRows::begin() {
     if (isEmpty_) {
-        output().text() += "[\n";
+        open();
+        output().text() += '\n';
     } else {
         end();
         output().text() += ",\n";
@@ -18,16 +27,15 @@ void JsonRows::begin() {
 
 void JsonRows::finish() {
     if (isEmpty_) {
-        output().text() += "[]";
+        open();
+        output().text() += ']';
     } else {
         end();
         output().text() += "\n]";
     }
-}
-
-void JsonRows::finishOutput() {
-    finish();
-    output().text() += '\n';
+    if (document_) {
+        document_->finish();
+    }
 }
 
 } // namespace projectctl

@@ -32,13 +32,24 @@ public:
     /// Writes the buffer when it is large enough to be worth a system call.
     void flushWhenLarge();
 
-    /// Appends a line that confirms a change, on a terminal only.
+    /// Appends a line that confirms a change, on a terminal only. With --json it is kept for confirmation().
     void say(std::string_view line);
 
     /// From now on, say() appends nothing, and no progress is shown.
     void beQuiet() noexcept { isQuiet_ = true; }
 
     bool isQuiet() const noexcept { return isQuiet_; }
+
+    /// The command writes JSON: nothing else is appended, and messages on standard error are JSON too.
+    void beginJson() noexcept { isJson_ = true; }
+
+    bool isJson() const noexcept { return isJson_; }
+
+    /// The most recent line of say() with --json, so that a command that writes nothing else can show it.
+    std::string const& confirmation() const noexcept { return confirmation_; }
+
+    /// Whether anything was appended since the start.
+    bool hasContent() const noexcept { return hasWritten_ || !text_.empty(); }
 
     /// As long as it exists, say() appends nothing.
     class Silence {
@@ -65,16 +76,27 @@ private:
     bool isTerminal_;
     bool isSilent_ = false;
     bool isQuiet_ = false;
+    bool isJson_ = false;
+    bool hasWritten_ = false;
     std::string text_;
+    std::string confirmation_;
 };
 
 /// Standard output.
 Output& output();
 
-/// Writes "projectctl: hint: " and the text to standard error, as printError does.
-void printHint(std::string const& text) noexcept;
-
-/// Writes "projectctl: " and the text to standard error, as one line: line feeds are escaped.
+/// Writes "projectctl: " and the text to standard error, as one line: line feeds are escaped. With --json,
+/// writes a JSON document of one line.
 void printError(std::string_view text) noexcept;
+
+/// The same with "warning: " in front of the text.
+void printWarning(std::string_view text) noexcept;
+
+/// The same with "hint: " in front of the text.
+void printHint(std::string_view text) noexcept;
+
+/// The same for the error that ends the command.
+/// @param code the word for its exit code.
+void printFailure(std::string_view text, std::string_view code, int exitCode) noexcept;
 
 } // namespace projectctl

@@ -13,12 +13,12 @@ using project::session::Query;
 namespace {
 
 void writeJson(FileList const& files, Query const& query) {
-    JsonRows rows;
+    JsonRows rows(json::list, "files");
     files.visit(query, [&rows](FileList::File const& file) {
         rows.begin();
         rows.addFile(file.path, file.kind);
     });
-    rows.finishOutput();
+    rows.finish();
 }
 
 } // namespace

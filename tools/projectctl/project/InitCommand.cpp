@@ -8,6 +8,7 @@
 #include "cli/WorkingFolder.hpp"
 #include "git/MergeSetup.hpp"
 #include "output/Failure.hpp"
+#include "output/JsonDocument.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
@@ -35,6 +36,7 @@ public:
         app->add_flag("--add", addsTree_);
         auto* const store = takeText(*app, "--store", store_);
         takeRoles(*app, *store, reader_, writer_);
+        app->add_flag("--json", isJson_);
         return app;
     }
 
@@ -49,6 +51,12 @@ public:
             if (setup == MergeSetup::Missing || setup == MergeSetup::ProgramMissing) {
                 setUpMerge(root);
             }
+        }
+        if (isJson_) {
+            JsonDocument document(json::init);
+            document.addText("root", root.native());
+            document.addText("name", name);
+            document.finish();
         }
         output().say("Created a project in \"" + shown(root) + "\". " +
                      (addsTree_ ? std::to_string(added) + " files and folders were added."
@@ -99,6 +107,7 @@ private:
     std::optional<std::string> store_;
     std::optional<std::string> reader_;
     std::optional<std::string> writer_;
+    bool isJson_ = false;
 };
 
 } // namespace

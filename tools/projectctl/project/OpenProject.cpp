@@ -109,9 +109,9 @@ void OpenProject::showHint() const {
 void OpenProject::warnOfReset() {
     auto const loss = log() == nullptr ? std::nullopt : log()->historyLoss();
     if (loss && loss->kind == HistoryLoss::Kind::Reset) {
-        printError("warning: the server was reset to an earlier state: version " +
-                   std::to_string(loss->seen) + " was seen here, and the newest one is now " +
-                   std::to_string(loss->found) + ". 'projectctl shared status' accepts that.");
+        printWarning("the server was reset to an earlier state: version " + std::to_string(loss->seen) +
+                     " was seen here, and the newest one is now " + std::to_string(loss->found) +
+                     ". 'projectctl shared status' accepts that.");
     }
 }
 
@@ -139,8 +139,8 @@ void OpenProject::warnOfFaults() {
         }
     }
     if (count > 0) {
-        printError("warning: " + first + (count > 1 ? ", and " + std::to_string(count - 1) + " more" : "") +
-                   ". 'projectctl check' shows all faults.");
+        printWarning(first + (count > 1 ? ", and " + std::to_string(count - 1) + " more" : "") +
+                     ". 'projectctl check' shows all faults.");
     }
 }
 

@@ -2,6 +2,7 @@
 #include <string>
 
 #include "cli/TextArguments.hpp"
+#include "output/JsonDocument.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "project/Commands.hpp"
@@ -26,6 +27,7 @@ public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand(name_);
         takeText(*app, "TEXT", text_);
+        app->add_flag("--json", isJson_);
         return app;
     }
 
@@ -39,7 +41,13 @@ public:
     }
 
 private:
-    static void show(std::u16string const& text) {
+    void show(std::u16string const& text) const {
+        if (isJson_) {
+            JsonDocument document(name_ == "name" ? json::name : json::description);
+            document.addText(name_, text);
+            document.finish();
+            return;
+        }
         std::string bytes;
         appendBytes(bytes, text);
         output().text() += output().isTerminal() ? withoutControls(bytes, true) : bytes;
@@ -50,6 +58,7 @@ private:
     Getter get_;
     Setter set_;
     std::optional<std::string> text_;
+    bool isJson_ = false;
 };
 
 } // namespace

@@ -1,4 +1,5 @@
 #include "cli/WorkingFolder.hpp"
+#include "output/JsonDocument.hpp"
 #include "output/Output.hpp"
 #include "project/Commands.hpp"
 #include "project/ProjectFolder.hpp"
@@ -10,13 +11,27 @@ namespace {
 /// Prints the root of the project. It does not open the project: scripts also need the root of a damaged one.
 class RootCommand : public Command {
 public:
-    CLI::App* declare(CLI::App& tool) override { return tool.add_subcommand("root"); }
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand("root");
+        app->add_flag("--json", isJson_);
+        return app;
+    }
 
     int run() override {
-        output().name(findProjectRoot(workingFolder()).native());
-        output().text() += '\n';
+        auto const root = findProjectRoot(workingFolder());
+        if (isJson_) {
+            JsonDocument document(json::root);
+            document.addText("root", root.native());
+            document.finish();
+        } else {
+            output().name(root.native());
+            output().text() += '\n';
+        }
         return 0;
     }
+
+private:
+    bool isJson_ = false;
 };
 
 } // namespace

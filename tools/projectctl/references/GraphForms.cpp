@@ -131,11 +131,13 @@ void writeTree(ReferenceGraph const& graph) {
 
 void writeJson(ReferenceGraph const& graph) {
     auto& out = output().text();
-    out += "{\"projects\": ";
+    JsonDocument document(json::referenceGraph);
+    document.addKey("projects");
     writeJsonNodes(graph.nodes());
-    out += ",\n\"references\": ";
+    document.addKey("references");
     writeJsonReferences(graph.nodes());
-    out += ",\n\"cycles\": [";
+    document.addKey("cycles");
+    out += '[';
     for (std::size_t index = 0; index < graph.cycles().size(); ++index) {
         out += index == 0 ? "\n[" : ",\n[";
         for (std::size_t const node : graph.cycles()[index]) {
@@ -144,7 +146,8 @@ void writeJson(ReferenceGraph const& graph) {
         }
         out += ']';
     }
-    out += graph.cycles().empty() ? "]}\n" : "\n]}\n";
+    out += graph.cycles().empty() ? "]" : "\n]";
+    document.finish();
 }
 
 void writeDot(ReferenceGraph const& graph) {

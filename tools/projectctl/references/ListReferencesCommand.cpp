@@ -40,15 +40,15 @@ public:
 
 private:
     static void writeJson(std::vector<FolderReference> const& references) {
-        JsonRows rows;
+        JsonRows rows(json::referenceList, "references");
         for (auto const& reference : references) {
             rows.begin();
             rows.addText("path", reference.getStoredPath());
             rows.addText("type", reference.getType());
-            rows.addText("location", reference.getLocation().native());
+            rows.addText("folder", reference.getLocation().native());
             rows.addText("uuid", reference.getUUID());
         }
-        rows.finishOutput();
+        rows.finish();
     }
 
     void writePaths(std::vector<FolderReference> const& references, Path const& root) const {

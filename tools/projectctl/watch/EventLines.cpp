@@ -1,5 +1,6 @@
 #include "watch/EventLines.hpp"
 
+#include "output/JsonFormat.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 
@@ -38,8 +39,8 @@ void endJson(JsonObject& object) {
 }
 
 template <typename Identifier>
-JsonObject::Texts named(Identifier const& identifier) {
-    return {{u"uuid", identifier.getUUID()}, {u"name", identifier.getName()}};
+void addNamed(JsonObject& object, std::string_view key, Identifier const& identifier) {
+    object.addNamed(key, identifier.getName(), identifier.getUUID());
 }
 
 } // namespace
@@ -62,6 +63,18 @@ EventLines::EventLines(OpenProject& project, bool asJson)
     events.onPathChanged([this] { write("pathChanged"); });
     events.onReferencesChanged([this] { write("referencesChanged"); });
     events.onMetadataChange([this] { write("metadataChange"); });
+}
+
+void EventLines::writeReady() const {
+    auto const version = static_cast<std::size_t>(json::watch.version);
+    if (asJson_) {
+        auto object = beginJson("ready");
+        object.addText("format", std::u16string(json::watch.name.begin(), json::watch.name.end()));
+        object.addNumber("version", version);
+        endJson(object);
+    } else {
+        output().text() += "ready\t" + std::to_string(version) + '\n';
+    }
 }
 
 void EventLines::write(std::string_view event) {
@@ -91,7 +104,7 @@ void EventLines::writeFiles(std::string_view event, std::vector<Path> const& fil
 void EventLines::writeCategory(std::string_view event, CategoryIdentifier const& category) {
     if (asJson_) {
         auto object = beginJson(event);
-        object.addTexts("category", named(category));
+        addNamed(object, "category", category);
         endJson(object);
     } else {
         writeLine({event, {category.getName()}});
@@ -102,8 +115,8 @@ void EventLines::writeLabel(Label const& label) {
     constexpr std::string_view event = "labelModified";
     if (asJson_) {
         auto object = beginJson(event);
-        object.addTexts("category", named(label.getCategory()));
-        object.addTexts("label", named(label.getLabelIdentifier()));
+        addNamed(object, "category", label.getCategory());
+        addNamed(object, "label", label.getLabelIdentifier());
         endJson(object);
     } else {
         writeLine({event, {label.getCategory().getName(), label.getLabelIdentifier().getName()}});

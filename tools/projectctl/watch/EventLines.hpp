@@ -19,6 +19,9 @@ public:
     EventLines(EventLines const&) = delete;
     EventLines& operator=(EventLines const&) = delete;
 
+    /// Writes the first line: from now on, every change is reported. It gives the version of the format.
+    void writeReady() const;
+
 private:
     using CategoryIdentifier = project::management::CategoryIdentifier;
     using Label = project::management::Label;

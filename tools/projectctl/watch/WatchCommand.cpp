@@ -1,7 +1,11 @@
 #include <chrono>
+#include <optional>
 #include <string>
 #include <thread>
+#include <utility>
 
+#include "cli/TextArguments.hpp"
+#include "git/PipedProcess.hpp"
 #include "output/Output.hpp"
 #include "project/ProjectCommand.hpp"
 #include "project/stores/StoreError.hpp"
@@ -27,22 +31,40 @@ public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand("watch");
         app->add_flag("--json", json_);
+        takeText(*app, "--exec", command_);
         return app;
     }
 
     [[noreturn]] int run(OpenProject& project) override {
         project.refresh(); // the current state is not a change
         EventLines const lines(project, json_);
+        lines.writeReady();
         output().say("Waiting for changes. Press Ctrl-C to stop.");
+        output().flush();
         for (;;) {
-            output().flush();
             awaitChange(project);
+            passOn();
         }
     }
 
     bool canRunInBatch() const override { return false; }
 
 private:
+    /// Prints the events of one check for changes, or passes them to the command.
+    void passOn() const {
+        if (!command_ || output().text().empty()) {
+            output().flush();
+            return;
+        }
+        auto const events = std::exchange(output().text(), {});
+        int const exitCode = runVisibly({"/bin/sh", "-c", *command_}, events);
+        if (exitCode != 0) {
+            printWarning("the command of --exec has failed" +
+                         (exitCode < 0 ? std::string(" with a signal")
+                                       : " with the exit code " + std::to_string(exitCode)));
+        }
+    }
+
     /// A text that cannot be read now may be readable later: another program may be writing it. A server may
     /// be reachable later.
     void awaitChange(OpenProject& project) {
@@ -65,6 +87,7 @@ private:
     }
 
     bool json_ = false;
+    std::optional<std::string> command_;
     std::string lastProblem_;
 };
 

@@ -76,6 +76,11 @@ public:
     ///         text on disk contains none.
     void resolve(std::string resolved);
 
+    /// The numbers of the lines of the text that describe some addresses, counted from 1: of each the last
+    /// one, or the first one below it if it has no line of its own, or 0 if there is none. The text is the
+    /// one that was read last.
+    std::vector<std::size_t> linesOf(std::vector<Address> const& addresses) const;
+
     /// All faults of the text as it is on disk now, by line. To be called with no guard open. Takes no lock.
     std::vector<Fault> check();
 
