@@ -20,12 +20,14 @@ endif()
 install(DIRECTORY docs/json DESTINATION "${CMAKE_INSTALL_DATADIR}/project-management")
 
 configure_package_config_file(packaging/project_managementConfig.cmake.in
-  "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfig.cmake" INSTALL_DESTINATION "${package_folder}")
+  "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfig.cmake" INSTALL_DESTINATION "${package_folder}"
+  PATH_VARS CMAKE_INSTALL_BINDIR)
 write_basic_package_version_file("${CMAKE_CURRENT_BINARY_DIR}/project_managementConfigVersion.cmake"
   COMPATIBILITY SameMinorVersion)
 install(FILES
   "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfig.cmake"
   "${CMAKE_CURRENT_BINARY_DIR}/project_managementConfigVersion.cmake"
+  packaging/ProjectManagementFiles.cmake
   DESTINATION "${package_folder}")
 
 # Relative to the file itself, because the prefix can change at installation.
