@@ -121,10 +121,8 @@ private:
         if (project.log() != nullptr) {
             return project.definition();
         }
-        std::string result;
         auto const text = project::stores::TextBackend::textPath(project.root());
-        appendBytes(result, ShownPaths(project.root()).ofAbsolute(text));
-        return result;
+        return bytesOf(ShownPaths(project.root()).ofAbsolute(text));
     }
 
     void writeJson(Findings const& findings) const {
