@@ -3,7 +3,8 @@
 # Sets a variable to the files of the project that contains the current source folder, as absolute paths: all of them, or
 # those that have every one of the labels and are at or below one of the paths, which are relative to the current source
 # folder. Folders are left out. A change of the project's definition makes the build configure again, and nothing else
-# does. Names with spaces and semicolons work; names with line ends do not.
+# does; changes of a project that a server stores are not noticed. Names with spaces and semicolons work; names with line
+# ends do not.
 #
 # The cache variable PROJECT_MANAGEMENT_PROJECTCTL is the tool, projectctl.
 function(project_management_files variable)
@@ -44,5 +45,8 @@ function(project_management_files variable)
     string(REPLACE "\n" ";" found "${found}")
   endif()
   set(${variable} "${found}" PARENT_SCOPE)
-  set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${root}/.projectdata/project.jsonl")
+  set(text "${root}/.projectdata/project.jsonl")
+  if(EXISTS "${text}") # otherwise a server stores the definition
+    set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${text}")
+  endif()
 endfunction()
