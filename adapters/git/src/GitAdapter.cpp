@@ -55,6 +55,28 @@ void GitAdapter::removeFromSourceControl(std::vector<Path> const& files) {
     }
 }
 
+void GitAdapter::moveInSourceControl(std::vector<FileMove> const& moves) {
+    if (!moves.empty()) {
+        stage([&moves](Staging& staging) { staging.move(moves); });
+    }
+}
+
+bool GitAdapter::isTracked(Path const& file) {
+    auto* const found = repository();
+    auto const path = found == nullptr ? std::nullopt : found->workTree().relativeInProject(file);
+    return path && (trackedAt(found->index(), *path) || isAnythingTrackedBelow(found->index(), *path));
+}
+
+std::string GitAdapter::indexState() {
+    auto* const found = repository();
+    if (found == nullptr) {
+        return {};
+    }
+    auto const stamp = FileStamp::of(found->indexFile());
+    return std::to_string(stamp.number) + ' ' + std::to_string(stamp.size) + ' ' +
+           std::to_string(stamp.seconds) + ' ' + std::to_string(stamp.nanoseconds);
+}
+
 std::map<fl::filesystem::Path, cmlink::FileState> GitAdapter::getFileStates(std::vector<Path> const& files) {
     std::map<Path, cmlink::FileState> result;
     if (files.empty()) {

@@ -19,6 +19,14 @@ void append(std::string& bytes, git_index_time const& time) {
     append(bytes, time.nanoseconds);
 }
 
+void appendFlags(std::string& bytes, std::uint16_t flags) {
+    bytes += static_cast<char>(flags >> 8U);
+    bytes += static_cast<char>(flags & 0xFFU);
+}
+
+/// Those that an entry keeps when it gets another name.
+constexpr std::uint16_t keptExtendedFlags = GIT_INDEX_ENTRY_INTENT_TO_ADD | GIT_INDEX_ENTRY_SKIP_WORKTREE;
+
 /// A number of variable length, as in version 4 of the format.
 void appendVarying(std::string& bytes, std::size_t number) {
     std::string reversed(1, static_cast<char>(number & 0x7FU));
@@ -94,9 +102,13 @@ void IndexPatch::add(git_index_entry const& entry, TreePath const& path) {
         append(result_, number);
     }
     result_.append(reinterpret_cast<char const*>(entry.id.id), GIT_OID_RAWSZ);
+    auto const extended = std::uint16_t(entry.flags_extended & keptExtendedFlags);
     auto const length = std::min(path.size(), std::size_t{nameLengthMask});
-    result_ += static_cast<char>(length >> 8U);
-    result_ += static_cast<char>(length & 0xFFU);
+    appendFlags(result_, static_cast<std::uint16_t>(length | (entry.flags & GIT_INDEX_ENTRY_VALID) |
+                                                    (extended != 0 ? isExtended : 0U)));
+    if (extended != 0) { // the entry is one of this index, whose version has them
+        appendFlags(result_, extended);
+    }
     addName(path);
     finishEntry(begin);
     ++count_;

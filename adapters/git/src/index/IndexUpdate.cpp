@@ -44,6 +44,9 @@ void IndexUpdate::apply(IndexChanges const& changes) {
     for (auto const& [path, entry] : changes.staged) {
         staged_.insert(path);
     }
+    for (auto const& path : changes.moved) {
+        staged_.erase(path);
+    }
     new_ = std::move(prepared);
     repository_.showIndex(new_);
 }

@@ -19,6 +19,17 @@ void requireNothingForeign(std::string const& file, Conversion const& conversion
     }
 }
 
+void requireMovable(git_index_entry const& entry, std::string const& file) {
+    if (isSubmodule(entry)) {
+        throw GitError(GitError::Kind::Refused, file, "a submodule cannot be moved here",
+                       "Move it with `git mv`, which also changes its settings.");
+    }
+    if (((entry.flags & GIT_INDEX_ENTRY_STAGEMASK) >> GIT_INDEX_ENTRY_STAGESHIFT) != 0) {
+        throw GitError(GitError::Kind::Refused, file, "the file is in a conflict of git and cannot be moved",
+                       "Resolve the conflict, enter `git add` for the file, and try again.");
+    }
+}
+
 } // namespace
 
 void Staging::add(std::vector<fl::filesystem::Path> const& files) {
@@ -48,6 +59,49 @@ void Staging::remove(std::vector<fl::filesystem::Path> const& files) {
         }
     }
     update.apply(changes);
+}
+
+void Staging::move(std::vector<FileMove> const& moves) {
+    auto& update = openUpdate_();
+    auto const& index = repository_.index();
+    IndexChanges changes;
+    for (auto const& move : moves) {
+        auto const from = repository_.workTree().relativeInProject(move.from);
+        auto const to = repository_.workTree().relativeInProject(move.to);
+        if (!from || !to) {
+            continue;
+        }
+        auto position = index.firstFrom(*from);
+        for (; position < index.size() && index.pathAt(position) == *from; ++position) {
+            moveEntry(position, *to, changes);
+        }
+        for (position = firstBelow(index, *from);
+             position < index.size() && isBelow(index.pathAt(position), *from); ++position) {
+            moveEntry(position, *to + (index.pathAt(position) + from->size()), changes);
+        }
+    }
+    update.apply(changes);
+}
+
+/// Gives an entry another name. A later comparison with the disk need not read the file, as far as it is as
+/// it was: moving a file changes one of its times only.
+void Staging::moveEntry(std::size_t position, TreePath const& path, IndexChanges& changes) const {
+    auto entry = repository_.index().at(position);
+    TreePath const old = entry.path;
+    requireMovable(entry, repository_.workTree().onDisk(old));
+    auto const onDisk = diskEntryAt(repository_.workTree().onDisk(path));
+    if (onDisk && isFileOrLink(*onDisk)) {
+        git_index_entry now{};
+        record(*onDisk, now);
+        bool const isSame = now.ino == entry.ino && now.mtime.seconds == entry.mtime.seconds &&
+                            now.mtime.nanoseconds == entry.mtime.nanoseconds &&
+                            now.file_size == entry.file_size;
+        entry.ctime = isSame ? now.ctime : entry.ctime;
+    }
+    removeReplaced(path, changes);
+    changes.removed.insert(old);
+    changes.staged.insert_or_assign(path, entry);
+    changes.moved.insert(path);
 }
 
 /// The files of the list that can be staged. Throws if there is one that only git can stage.

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <functional>
 #include <map>
 #include <utility>
@@ -9,6 +10,7 @@
 #include "index/BlobWriter.hpp"
 #include "index/IndexChanges.hpp"
 #include "index/IndexUpdate.hpp"
+#include "project/git/FileMove.hpp"
 #include "repository/Repository.hpp"
 
 namespace project::git {
@@ -24,6 +26,7 @@ public:
 
     void add(std::vector<fl::filesystem::Path> const& files);
     void remove(std::vector<fl::filesystem::Path> const& files);
+    void move(std::vector<FileMove> const& moves);
 
 private:
     using Names = std::map<TreePath, bool>; // and whether the content is converted
@@ -32,6 +35,7 @@ private:
     void stage(TreePath const& path, bool isConverted, BlobWriter& blobs, IndexChanges& changes) const;
     void removeReplaced(TreePath const& path, IndexChanges& changes) const;
     void removeBelow(TreePath const& folder, IndexChanges& changes) const;
+    void moveEntry(std::size_t position, TreePath const& path, IndexChanges& changes) const;
 
     Repository& repository_;
     OpenUpdate openUpdate_;

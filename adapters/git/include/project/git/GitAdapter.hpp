@@ -3,10 +3,12 @@
 #include <map>
 #include <memory>
 #include <set>
+#include <string>
 #include <vector>
 
 #include "cmlink/CMAdapter.hpp"
 #include "project/git/Export.hpp"
+#include "project/git/FileMove.hpp"
 #include "project/git/GitEnvironment.hpp"
 
 namespace project::git {
@@ -55,6 +57,20 @@ public:
     /// exist there.
     /// @throws GitError if the index is locked (the error's file is the lock file) or cannot be written.
     void removeFromSourceControl(std::vector<Path> const& files) override;
+
+    /// Gives the entries of files, and of all files below folders, the names that these files have after a
+    /// move on disk, as `git mv` does: staged content stays staged, and a change that is not staged stays
+    /// one. Files that are not tracked stay untracked. Skips paths outside the project's folder.
+    /// @param moves that happened at once: no file that was moved lies in a folder that was moved.
+    /// @throws GitError if the index is locked (the error's file is the lock file) or cannot be written, if a
+    ///         file has a conflict, or if it is a submodule. The index is unchanged then.
+    void moveInSourceControl(std::vector<FileMove> const& moves);
+
+    /// Whether git's index contains a path, or anything below it. False outside the project's folder.
+    bool isTracked(Path const& path);
+
+    /// A text that changes when any program writes git's index; empty without a repository.
+    std::string indexState();
 
     /// The state of every path, as `git status --no-renames` reports it.
     ///

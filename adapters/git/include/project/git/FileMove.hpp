@@ -1,0 +1,13 @@
+#pragma once
+
+#include "fl/filesystem/Path.hpp"
+
+namespace project::git {
+
+/// A file, or a folder with everything below it, that was moved on disk. Both paths are absolute.
+struct FileMove {
+    fl::filesystem::Path from;
+    fl::filesystem::Path to;
+};
+
+} // namespace project::git
