@@ -9,7 +9,7 @@ ChangeExecutor::ChangeExecutor(
     stores::TreeMetadataManager& store, git::GitAdapter* adapter, DefinitionStager* stager,
     TransactionFiles& files, EventQueue& raised,
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers, PersonalSteps* personal,
-    std::shared_ptr<management::DispatchableProjectEventBroadcaster> personalObservers)
+    std::shared_ptr<management::DispatchableProjectEventBroadcaster> personalObservers, OpenMoves* moves)
     : store_(store),
       adapter_(adapter),
       stager_(stager),
@@ -17,7 +17,9 @@ ChangeExecutor::ChangeExecutor(
       raised_(raised),
       observers_(std::move(observers)),
       personal_(personal),
-      personalObservers_(std::move(personalObservers)) {
+      personalObservers_(std::move(personalObservers)),
+
+      moves_(moves) {
 }
 
 void ChangeExecutor::run(std::function<void()> const& operation, ChangedFiles const& files) {
@@ -32,6 +34,7 @@ void ChangeExecutor::run(std::function<void()> const& operation, ChangedFiles co
 void ChangeExecutor::stage(git::GitAdapter::Batch* batch) {
     auto const added = files_.takeAdded();
     if (batch == nullptr) {
+        finishMoves();
         return;
     }
     try {
@@ -41,6 +44,34 @@ void ChangeExecutor::stage(git::GitAdapter::Batch* batch) {
         throw;
     }
     publish(*batch);
+    if (stager_ != nullptr) { // otherwise Session::stage ends the moves
+        finishMoves();
+    }
+}
+
+void ChangeExecutor::finishMoves() noexcept {
+    if (moves_ != nullptr) {
+        moves_->finish();
+    }
+}
+
+void ChangeExecutor::stageMoves() {
+    if (moves_ != nullptr) {
+        moves_->stage();
+    }
+}
+
+void ChangeExecutor::commitMoves() noexcept {
+    if (moves_ != nullptr) {
+        moves_->commit();
+    }
+}
+
+/// Completes or rolls back the moves of a process that has died.
+void ChangeExecutor::recoverMoves() {
+    if (moves_ != nullptr && moves_->recover() && stager_ != nullptr) {
+        stager_->noteWritten();
+    }
 }
 
 void ChangeExecutor::stageText(std::vector<Path> const& added) {

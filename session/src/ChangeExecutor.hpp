@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "EventQueue.hpp"
+#include "OpenMoves.hpp"
 #include "PersonalSteps.hpp"
 #include "TransactionFiles.hpp"
 #include "project/git/GitAdapter.hpp"
@@ -27,12 +28,14 @@ public:
     /// @param raised the queue of the events that the managers raise.
     /// @param observers the broadcaster to dispatch these events on.
     /// @param personal the personal part of the steps, with the broadcaster for its events; may be null.
+    /// @param moves the moves on disk of the steps; null if there are none.
     ChangeExecutor(
         stores::TreeMetadataManager& store, git::GitAdapter* adapter, DefinitionStager* stager,
         TransactionFiles& files, EventQueue& raised,
         std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers,
         PersonalSteps* personal = nullptr,
-        std::shared_ptr<management::DispatchableProjectEventBroadcaster> personalObservers = nullptr);
+        std::shared_ptr<management::DispatchableProjectEventBroadcaster> personalObservers = nullptr,
+        OpenMoves* moves = nullptr);
 
     /// Runs one operation as a step.
     /// @param files the files that the operation adds to the project or removes from it.
@@ -68,6 +71,10 @@ private:
     void stage(git::GitAdapter::Batch* batch);
     void stageText(std::vector<Path> const& added);
     void publish(git::GitAdapter::Batch& batch);
+    void recoverMoves();
+    void stageMoves();
+    void commitMoves() noexcept;
+    void finishMoves() noexcept;
 
     stores::TreeMetadataManager& store_;
     git::GitAdapter* adapter_;
@@ -77,6 +84,7 @@ private:
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> observers_;
     PersonalSteps* personal_;
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> personalObservers_;
+    OpenMoves* moves_;
     std::size_t openSteps_ = 0;
 };
 

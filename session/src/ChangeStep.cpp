@@ -4,6 +4,8 @@
 #include <optional>
 #include <vector>
 
+#include "project/stores/StoreError.hpp"
+
 namespace project::session {
 
 namespace {
@@ -27,7 +29,11 @@ ChangeStep::ChangeStep(ChangeExecutor& executor, Kind kind)
       writes_(executor.store_.transaction()),
       depth_(executor.openSteps_ + 1),
       earlierEvents_(executor.raised_.size()),
-      earlierFiles_(executor.files_.mark()) {
+      earlierFiles_(executor.files_.mark()),
+      earlierMoves_(executor.moves_ != nullptr ? executor.moves_->size() : 0) {
+    if (isOutermost()) {
+        executor_.recoverMoves();
+    }
     if (isOutermost() && kind_ == Kind::Transaction) {
         executor_.files_.beginTransaction();
     }
@@ -60,7 +66,9 @@ void ChangeStep::commitOutermost() {
         if (executor_.adapter_ != nullptr) {
             batch.emplace(*executor_.adapter_);
         }
+        executor_.stageMoves();
         commitWrites();
+        executor_.commitMoves();
         events = executor_.raised_.take();
         if (executor_.personal_ != nullptr) {
             personalError = errorOf([&] { executor_.personal_->commit(depth_); });
@@ -89,14 +97,25 @@ void ChangeStep::commitWrites() {
         if (!isOutermost() && executor_.personal_ != nullptr) {
             executor_.personal_->commit(depth_);
         }
-    } catch (...) {
-        if (!writes_.isOpen()) {
-            end();
-            drop();
+    } catch (stores::StoreError const& error) {
+        if (executor_.moves_ != nullptr && error.kind() == stores::StoreError::Kind::OutcomeUnknown) {
+            executor_.moves_->leave();
         }
+        abandon();
+        throw;
+    } catch (...) {
+        abandon();
         throw;
     }
     end();
+}
+
+/// Drops everything, unless the transaction is still open.
+void ChangeStep::abandon() noexcept {
+    if (!writes_.isOpen()) {
+        end();
+        drop();
+    }
 }
 
 void ChangeStep::end() noexcept {
@@ -109,6 +128,9 @@ void ChangeStep::drop() noexcept {
         executor_.personal_->rollBack(depth_);
     }
     executor_.files_.dropSince(earlierFiles_);
+    if (executor_.moves_ != nullptr) {
+        executor_.moves_->undoBehind(earlierMoves_);
+    }
     if (isOutermost()) {
         if (kind_ == Kind::Transaction) {
             executor_.files_.restoreEarlier();

@@ -45,6 +45,7 @@ private:
     void commitOutermost();
     void end() noexcept;
     void drop() noexcept;
+    void abandon() noexcept;
 
     bool isOutermost() const noexcept { return depth_ == 1; }
 
@@ -54,6 +55,7 @@ private:
     std::size_t depth_;
     std::size_t earlierEvents_;
     TransactionFiles::Mark earlierFiles_;
+    std::size_t earlierMoves_;
 };
 
 } // namespace project::session

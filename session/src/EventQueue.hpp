@@ -2,6 +2,7 @@
 
 #include <functional>
 #include <memory>
+#include <utility>
 #include <vector>
 
 #include "project/decorators/DispatchableProjectEventBroadcaster.hpp"
@@ -30,6 +31,9 @@ public:
 
     /// The number of events that are waiting.
     std::size_t size() const noexcept { return events_.size(); }
+
+    /// Adds an event that no manager raises.
+    void push(Event event) { events_.push_back(std::move(event)); }
 
     /// Removes all events but the first ones: what they report was rolled back.
     /// @param count the number of events to keep, at most size().

@@ -73,6 +73,22 @@ std::vector<FoundFile> Session::find(Query const& query) {
     return result;
 }
 
+std::vector<Move> Session::move(std::vector<Path> const& sources, Path const& destination) {
+    return state_->move(sources, destination);
+}
+
+void Session::adopt(std::vector<Move> const& moves) {
+    state_->adopt(moves);
+}
+
+std::optional<RecoveredMoves> Session::takeRecoveredMoves() {
+    return state_->moves.takeRecovered();
+}
+
+bool Session::hasUnfinishedMove() const {
+    return state_->moves.hasUnfinished();
+}
+
 Transaction Session::transaction() {
     return Transaction(std::make_unique<ChangeStep>(state_->executor, ChangeStep::Kind::Transaction));
 }

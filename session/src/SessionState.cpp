@@ -5,6 +5,11 @@
 #include <utility>
 
 #include "ChangeEvents.hpp"
+#include "ChangeStep.hpp"
+#include "DefinitionMove.hpp"
+#include "DiskEntries.hpp"
+#include "FileTree.hpp"
+#include "MovePlan.hpp"
 #include "SessionProjectManager.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
@@ -35,6 +40,7 @@ std::unique_ptr<GitAdapter> makeAdapter(Path const& root, Options options) {
 
 Session::State::State(Path const& folder, Options options)
     : root(fl::filesystem::canonical(folder, Path())),
+      storeFolder(root / stores::TextBackend::folderName),
       adapter(makeAdapter(root, options)),
       stored(root, options),
       store(stored.tree()),
@@ -44,13 +50,21 @@ Session::State::State(Path const& folder, Options options)
       files(managers.sourceControl,
             [this](Path const& file) { return project->getFileManager().isFileInProject(file); }),
       personalStore(root),
+      moves(root, storeFolder, adapter.get(),
+            {[this](Path const& file) { return project->getFileManager().isFileInProject(file); },
+             [this] { return definitionState(); }}),
       executor(*store, adapter.get(),
                options.sourceControl == SourceControl::EachChange ? stager.get() : nullptr, files, raised,
-               events, &personalStore.steps(), std::make_shared<DispatchableProjectEventBroadcaster>()),
+               events, &personalStore.steps(), std::make_shared<DispatchableProjectEventBroadcaster>(),
+               &moves),
       project(
           std::make_unique<SessionProjectManager>(std::move(managers.outermost), executor, personalStore)),
       personal(*project, store, personalStore, executor),
       ofOthers_(store, root, FileEvents::All) {
+}
+
+Session::State::~State() {
+    moves.finish();
 }
 
 std::unique_ptr<DefinitionStager> Session::State::makeStager() {
@@ -107,6 +121,75 @@ void Session::State::stage() {
     if (hasText && stager && stager->isDue()) {
         stored.text()->tidy(); // a staged text has no tail
         stager->stageIfWritten();
+    }
+    moves.finish();
+}
+
+std::vector<Move> Session::State::move(std::vector<Path> const& sources, Path const& destination) {
+    ChangeStep step(executor, ChangeStep::Kind::Operation);
+    MovePlan::IsInProject const isListed = [this](Path const& file) {
+        return project->getFileManager().isFileInProject(file);
+    };
+    auto const planned = MovePlan(root, storeFolder, isListed).onDisk(sources, destination);
+    if (planned.empty()) {
+        return planned;
+    }
+    DefinitionMove definition(*store, root);
+    definition.run(planned, DefinitionMove::EmptiedFolders::Stay);
+    // personal labels follow
+    files.move(planned);
+    moves.make(planned);
+    raiseEventsOf(definition.takeChanges());
+    step.commit();
+    return planned;
+}
+
+void Session::State::adopt(std::vector<Move> const& made) {
+    ChangeStep step(executor, ChangeStep::Kind::Transaction);
+    MovePlan::IsInProject const isListed = [this](Path const& file) {
+        return project->getFileManager().isFileInProject(file);
+    };
+    auto const planned = MovePlan(root, storeFolder, isListed).made(made);
+    if (planned.empty()) {
+        return;
+    }
+    DefinitionMove definition(*store, root);
+    definition.run(planned, DefinitionMove::EmptiedFolders::Leave);
+    // personal labels follow
+    files.add(listedFilesOf(planned));
+    raiseEventsOf(definition.takeChanges());
+    step.commit();
+}
+
+/// The files for source control, and everything in the project below folders.
+ChangedFiles Session::State::listedFilesOf(std::vector<Move> const& made) const {
+    ChangedFiles result;
+    for (auto const& move : made) {
+        result.removed.push_back(move.from);
+        FileTree(*store, root).visit(move.to, [&](VisitedFile const& file) {
+            result.added.push_back(root / Path(file.path));
+        });
+    }
+    return result;
+}
+
+/// The newest entry of a log, or the file of a text: every commit rewrites it or appends to it.
+std::string Session::State::definitionState() const {
+    if (stored.log() != nullptr) {
+        auto const newest = stored.log()->journal().records(std::nullopt, 1);
+        return newest.empty() ? std::string() : newest.front().position.sum;
+    }
+    auto const text = diskEntry(stored.file());
+    if (!text) {
+        return {};
+    }
+    return std::to_string(text->st_ino) + ' ' + std::to_string(text->st_size) + ' ' +
+           std::to_string(text->st_mtim.tv_sec) + ' ' + std::to_string(text->st_mtim.tv_nsec);
+}
+
+void Session::State::raiseEventsOf(stores::Changes const& changes) {
+    for (auto& event : eventsOf(changes, store, root)) {
+        raised.push(std::move(event));
     }
 }
 

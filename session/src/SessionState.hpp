@@ -10,6 +10,7 @@
 #include "ChangeExecutor.hpp"
 #include "DefinitionStager.hpp"
 #include "EventQueue.hpp"
+#include "OpenMoves.hpp"
 #include "OthersEvents.hpp"
 #include "PersonalLayer.hpp"
 #include "PersonalStore.hpp"
@@ -26,6 +27,7 @@ namespace project::session {
 class Session::State {
 public:
     State(Path const& folder, Options options);
+    ~State();
 
     /// The managers between the store and the session's own.
     struct Managers {
@@ -45,6 +47,9 @@ public:
     /// Stages files of the store that the session has created.
     void stageNew(std::vector<Path> const& files);
 
+    std::vector<Move> move(std::vector<Path> const& sources, Path const& destination);
+    void adopt(std::vector<Move> const& moves);
+
     bool refresh();
 
     /// Waits until others may have changed a shared project, or the time has run out, or wake was called.
@@ -54,6 +59,7 @@ public:
     void wake() noexcept;
 
     Path const root;
+    Path const storeFolder;
     std::unique_ptr<git::GitAdapter> adapter; ///< null if source control is off
     SessionStore stored;
     std::shared_ptr<stores::TreeMetadataManager> const store; ///< of stored
@@ -63,6 +69,7 @@ public:
     Managers managers;
     TransactionFiles files;
     PersonalStore personalStore;
+    OpenMoves moves;
     ChangeExecutor executor;
     std::unique_ptr<management::ProjectManager> project;
     PersonalLayer personal;
@@ -71,6 +78,9 @@ private:
     std::unique_ptr<DefinitionStager> makeStager();
     Managers makeManagers();
     bool isStoreEmpty() const;
+    std::string definitionState() const;
+    void raiseEventsOf(stores::Changes const& changes);
+    ChangedFiles listedFilesOf(std::vector<Move> const& moves) const;
 
     std::mutex wakingMutex_;
     std::condition_variable waking_;

@@ -19,6 +19,24 @@ void TransactionFiles::add(ChangedFiles const& files) {
     files_.removed.insert(files_.removed.end(), files.removed.begin(), files.removed.end());
 }
 
+void TransactionFiles::move(std::vector<Move> const& moves) {
+    ChangedFiles changed;
+    for (auto const& move : moves) {
+        for (auto const& file : files_.added) {
+            if (file == move.from || metadata::isParent(file, move.from)) {
+                changed.added.push_back(move.to / Path(metadata::getRelativePath(move.from, file)));
+                changed.removed.push_back(file);
+            }
+        }
+        for (auto const& file : files_.removed) {
+            if (file == move.to || metadata::isParent(file, move.to)) {
+                changed.added.push_back(file);
+            }
+        }
+    }
+    add(changed);
+}
+
 void TransactionFiles::dropSince(Mark mark) noexcept {
     auto const drop = [](std::vector<Path>& files, std::size_t count) {
         files.erase(files.begin() + static_cast<std::ptrdiff_t>(count), files.end());

@@ -4,6 +4,7 @@
 #include <vector>
 
 #include "project/cm/CMAwareProjectManager.hpp"
+#include "project/session/Move.hpp"
 
 namespace project::session {
 
@@ -37,6 +38,10 @@ public:
 
     /// Adds the files of an operation that has returned.
     void add(ChangedFiles const& files);
+
+    /// Follows moves on disk: a file that the step has added is to be added under its new path, and a path
+    /// that was left is not removed any more if another file has it now.
+    void move(std::vector<Move> const& moves);
 
     /// Drops the files since a mark: the operations were rolled back.
     void dropSince(Mark mark) noexcept;

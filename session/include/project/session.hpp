@@ -8,6 +8,7 @@
 
 #include "project/management.hpp"
 #include "project/session/Export.hpp"
+#include "project/session/Move.hpp"
 #include "project/session/Personal.hpp"
 #include "project/session/Query.hpp"
 #include "project/session/Transaction.hpp"
@@ -123,6 +124,46 @@ public:
     /// contain its changes.
     /// @throws stores::StoreError if the project cannot be read.
     std::vector<FoundFile> find(Query const& query);
+
+    /// Moves files and folders of the project: on disk, in the definition, and in git's index, as one change.
+    /// A folder moves with everything below it, also with files that are not in the project. In the
+    /// definition, labels, data in every scope, entry points, the project path and references follow; the
+    /// folders above the new path are added. In git's index, staged content stays staged, a change that is
+    /// not staged stays one, and a file that is not tracked stays untracked.
+    ///
+    /// In a transaction, the files move at once, and move back if it is rolled back. If the process dies, the
+    /// next change of any process completes the move or rolls it back; see takeRecoveredMoves.
+    ///
+    /// Raises the events of the changes, as refresh does for those of others: onFileListUpdate with the old
+    /// and the new paths, and where they apply onFileLabelsChanged with the new paths, onEntryPointsChanged,
+    /// onPathChanged, onReferencesChanged, and onMetadataChange for data in other scopes. Takes the write
+    /// lock.
+    /// @param sources in the project, absolute.
+    /// @param destination the new path; or an existing folder, which the sources move into. A source that is
+    ///        there already does not move.
+    /// @return the moves that were made, sorted by their old paths.
+    /// @throws FileNotInProject if a source is not in the project.
+    /// @throws MoveError, stores::StoreError or git::GitError; nothing has moved then.
+    std::vector<Move> move(std::vector<Path> const& sources, Path const& destination);
+
+    /// Lets the definition follow moves that were made without it: as move does, but without a change of the
+    /// files on disk, which need not exist. The moves happen at the same time, so files can exchange their
+    /// paths. Where a folder and a file below it both move, the file's own move decides. A folder of the file
+    /// list leaves it if it has nothing below it any more and nothing else is stored for it; therefore
+    /// adopting the reverse moves restores the definition. The new files are staged, and the old ones are
+    /// removed from git's index, as those that are added and removed.
+    /// @throws FileNotInProject if an old path is not in the project.
+    /// @throws MoveError, for instance if a new path is in the project already and no move leaves it; or
+    ///         stores::StoreError or git::GitError. Nothing has changed then.
+    void adopt(std::vector<Move> const& moves);
+
+    /// The end of a move that another process, or an earlier session, did not finish: the last change has
+    /// completed it or rolled it back. Each is returned once.
+    std::optional<RecoveredMoves> takeRecoveredMoves();
+
+    /// Whether there is an unfinished move, which the next change completes or rolls back. False while a move
+    /// of this session is waiting for stage.
+    bool hasUnfinishedMove() const;
 
     /// Begins a transaction: the following changes of this thread are one step, which is in the project when
     /// the transaction is committed. If one is open already, the new one is nested in it.

@@ -1,0 +1,72 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "computils/exception/StackTraceRecordingException.hpp"
+#include "fl/filesystem/Path.hpp"
+#include "project/session/Export.hpp"
+
+namespace project::session {
+
+/// A file or folder with its old and its new path, both absolute. A folder moves with everything below it.
+struct Move {
+    fl::filesystem::Path from;
+    fl::filesystem::Path to;
+
+    friend bool operator==(Move const&, Move const&) = default;
+};
+
+/// The end of a move that a process did not finish, because it was killed or the power failed.
+struct RecoveredMoves {
+    enum class Outcome {
+        Completed,  ///< the definition contained the new paths: git's index has them now as well
+        RolledBack, ///< it did not: the files have their old paths again
+    };
+
+    Outcome outcome;
+    std::vector<Move> moves;
+
+    /// Those whose files stay where they are, because another program has put something in their place.
+    std::vector<Move> left;
+
+    friend bool operator==(RecoveredMoves const&, RecoveredMoves const&) = default;
+};
+
+/// A move that is not possible. Nothing has changed.
+class PROJECT_SESSION_EXPORT MoveError : public computils::exception::StackTraceRecordingException {
+public:
+    enum class Reason {
+        IsRoot,            ///< the project's own folder
+        IsMissing,         ///< the file is not on disk
+        IsNested,          ///< another file of the same move is a folder above it
+        Exists,            ///< there is something at the new path on disk
+        IsInProject,       ///< the new path is in the project already, or is that of two files
+        LeavesProject,     ///< the new path is outside the project's folder
+        EntersStore,       ///< the new path is in the store's own folder
+        EntersItself,      ///< the new path is below the folder that would move
+        HasNoFolder,       ///< there is no folder for the new path
+        IsBeyondLink,      ///< a symbolic link is above the new path, so that it may be outside the project
+        IsOtherFileSystem, ///< the new path is on another file system
+        DiskFailed,        ///< a system call failed
+    };
+
+    /// @param problem of the system, for DiskFailed.
+    MoveError(Reason reason, Move move, std::string problem = {});
+
+    char const* what() const noexcept override { return text_.c_str(); }
+
+    Reason reason() const noexcept { return reason_; }
+
+    Move const& move() const noexcept { return move_; }
+
+    std::string const& problem() const noexcept { return problem_; }
+
+private:
+    Reason reason_;
+    Move move_;
+    std::string problem_;
+    std::string text_;
+};
+
+} // namespace project::session
