@@ -12,6 +12,7 @@
 #include "merge/Commands.hpp"
 #include "project/Commands.hpp"
 #include "references/Commands.hpp"
+#include "renames/Commands.hpp"
 #include "shared/Commands.hpp"
 #include "watch/Commands.hpp"
 
@@ -26,6 +27,8 @@ CommandList const& verbs() {
 
         {"add", "PurposeFiles", makeAddCommand},
         {"remove", "PurposeFiles", makeRemoveCommand},
+        {"move", "PurposeFiles", makeMoveCommand},
+        {"adopt", "PurposeFiles", makeAdoptCommand},
         {"list", "PurposeFiles", makeListCommand},
         {"status", "PurposeFiles", makeStatusCommand},
         {"import", "PurposeFiles", makeImportCommand},

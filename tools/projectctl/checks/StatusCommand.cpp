@@ -1,3 +1,4 @@
+#include <set>
 #include <string>
 #include <utility>
 #include <vector>
@@ -6,6 +7,7 @@
 #include "checks/FindingForms.hpp"
 #include "checks/MergeSetupCheck.hpp"
 #include "checks/Problems.hpp"
+#include "checks/RenameForms.hpp"
 #include "checks/StatusScan.hpp"
 #include "cli/ExitCode.hpp"
 #include "cli/ShownPaths.hpp"
@@ -16,6 +18,8 @@
 #include "output/Progress.hpp"
 #include "project/ProjectCommand.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
+#include "renames/FindRenames.hpp"
+#include "renames/SimilarityOption.hpp"
 
 namespace projectctl {
 
@@ -29,12 +33,15 @@ public:
         app->add_flag("--json", isJson_);
         app->add_flag("--gitignore", leavesOutIgnored_);
         app->add_flag("--exit-code", hasExitCode_);
+        auto* const renames = app->add_flag("--renames", showsRenames_);
+        declareSimilarity(*app, similarity_)->needs(renames);
         return app;
     }
 
     int run(OpenProject& project) override {
         root_ = project.root();
         project.warnOfDamage();
+        project.warnOfUnfinishedMove();
         auto const scan = compare(project);
         for (auto const& line : scan.unreadable()) {
             printWarning(line);
@@ -46,8 +53,13 @@ public:
         }
         placeInText(found.problems, project);
         sortByWeight(found.problems);
+        if (showsRenames_) {
+            found.renames = renamesIn(project);
+            leaveOutPaired(found);
+        }
         isJson_ ? writeJson(found) : writeLines(found);
-        bool const isClean = found.added.empty() && found.gone.empty() && countFaults(found.problems) == 0;
+        bool const isClean = found.added.empty() && found.gone.empty() && countFaults(found.problems) == 0 &&
+                             found.renames.pairs.empty() && found.renames.ambiguous.empty();
         return hasExitCode_ && !isClean ? exit_code::finding : exit_code::done;
     }
 
@@ -60,7 +72,30 @@ private:
         Files added;
         Files gone;
         Findings problems;
+        Renames renames{};
     };
+
+    Renames renamesIn(OpenProject& project) const {
+        Progress const progress(Message("ProgressRenames"));
+        return findRenames(project, similarity_);
+    }
+
+    /// Files that are paired are neither new nor gone.
+    void leaveOutPaired(Differences& found) const {
+        std::set<std::u16string> earlier;
+        std::set<std::u16string> later;
+        for (auto const& rename : found.renames.pairs) {
+            earlier.insert(rename.from);
+            later.insert(rename.to);
+        }
+        auto const leaveOut = [this](Files& files, std::set<std::u16string> const& paired) {
+            std::erase_if(files, [&](StatusScan::File const& file) {
+                return paired.contains(project::metadata::getRelativePath(root_, file.path));
+            });
+        };
+        leaveOut(found.gone, earlier);
+        leaveOut(found.added, later);
+    }
 
     static StatusScan compare(OpenProject& project) {
         Progress progress("Comparing the project with the disk");
@@ -87,11 +122,13 @@ private:
     void writeLines(Differences const& found) const {
         writeLines("new  ", found.added, true);
         writeLines("gone ", found.gone, false);
+        writeRenameLines(found.renames, ShownPaths(root_));
         for (auto const& problem : found.problems) {
             bool const isFault = problem.weight == Finding::Weight::Fault;
             output().text() += (isFault ? "bad  " : "note ") + withoutControls(problem.text, false) + '\n';
         }
-        if (found.added.empty() && found.gone.empty() && found.problems.empty()) {
+        if (found.added.empty() && found.gone.empty() && found.problems.empty() &&
+            found.renames.pairs.empty() && found.renames.ambiguous.empty()) {
             output().say("The project and the disk contain the same files.");
         }
     }
@@ -115,6 +152,10 @@ private:
         writeJson(found.added);
         document.addKey("gone");
         writeJson(found.gone);
+        if (showsRenames_) {
+            document.addKey("renames");
+            writeRenameRows(found.renames);
+        }
         addFindings(document, found.problems);
         document.finish();
     }
@@ -132,6 +173,8 @@ private:
     bool isJson_ = false;
     bool leavesOutIgnored_ = false;
     bool hasExitCode_ = false;
+    bool showsRenames_ = false;
+    int similarity_ = usualSimilarity;
 };
 
 } // namespace

@@ -8,6 +8,7 @@ namespace projectctl {
 
 std::unique_ptr<Command> makeAddCommand();
 std::unique_ptr<Command> makeRemoveCommand();
+std::unique_ptr<Command> makeMoveCommand();
 std::unique_ptr<Command> makeListCommand();
 
 } // namespace projectctl

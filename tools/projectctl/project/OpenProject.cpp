@@ -106,6 +106,28 @@ void OpenProject::showHint() const {
     }
 }
 
+void OpenProject::reportRecoveredMoves() {
+    using project::session::RecoveredMoves;
+    auto const recovered = session_.takeRecoveredMoves();
+    if (!recovered) {
+        return;
+    }
+    bool const isCompleted = recovered->outcome == RecoveredMoves::Outcome::Completed;
+    auto const& first = recovered->moves.front();
+    printError(Message(isCompleted ? "MoveCompleted" : "MoveRolledBack", recovered->moves.size(), first.from,
+                       first.to)
+                   .text());
+    for (auto const& move : recovered->left) {
+        printError(Message("MoveLeft", move.from, move.to).text());
+    }
+}
+
+void OpenProject::warnOfUnfinishedMove() {
+    if (session_.hasUnfinishedMove()) {
+        printError(Message("MoveUnfinished").text());
+    }
+}
+
 void OpenProject::warnOfReset() {
     auto const loss = log() == nullptr ? std::nullopt : log()->historyLoss();
     if (loss && loss->kind == HistoryLoss::Kind::Reset) {

@@ -107,6 +107,20 @@ public:
 
     project::management::ProjectEventBroadcaster& events() noexcept { return *session_.events(); }
 
+    /// Moves files as project::session::Session::move does.
+    std::vector<project::session::Move> move(std::vector<Path> const& sources, Path const& destination) {
+        return session_.move(sources, destination);
+    }
+
+    /// Adopts moves as project::session::Session::adopt does.
+    void adopt(std::vector<project::session::Move> const& moves) { session_.adopt(moves); }
+
+    /// Says on standard error that a change has completed a move of a process that died, or rolled it back.
+    void reportRecoveredMoves();
+
+    /// Warns on standard error, in one line, if the next change has to do that.
+    void warnOfUnfinishedMove();
+
     /// Lets stage() stage those of these files whose removal is staged: they were added, and git may know
     /// them as removed ones. A transaction that is rolled back takes the request back.
     void stageReturnedLater(std::vector<Path> const& files);

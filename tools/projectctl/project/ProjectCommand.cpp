@@ -4,8 +4,15 @@ namespace projectctl {
 
 int ProjectCommand::run() {
     auto project = OpenProject::ofWorkingFolder();
-    auto const result = run(project);
-    project.stage();
+    int result = 0;
+    try {
+        result = run(project);
+        project.stage();
+    } catch (...) {
+        project.reportRecoveredMoves();
+        throw;
+    }
+    project.reportRecoveredMoves();
     project.warnOfReset();
     project.showHint();
     return result;

@@ -1,0 +1,101 @@
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "changes/DryRun.hpp"
+#include "cli/CodedFailure.hpp"
+#include "cli/PathArguments.hpp"
+#include "cli/TextArguments.hpp"
+#include "files/MoveFailure.hpp"
+#include "output/Output.hpp"
+#include "output/Progress.hpp"
+#include "project/ProjectCommand.hpp"
+#include "renames/Commands.hpp"
+#include "renames/FindRenames.hpp"
+#include "renames/SimilarityOption.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::session::Move;
+
+/// Lets the project follow files that other programs have renamed, in one step.
+class AdoptCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand("adopt");
+        completes(takeTexts(*app, "PATH", pairs_), Completes::Files);
+        declareSimilarity(*app, similarity_)->excludes(app->get_option("PATH"));
+        app->add_flag("--guesses", adoptsGuesses_)->excludes(app->get_option("PATH"));
+        dryRun_.declare(*app);
+        app->final_callback([this] {
+            if (pairs_.size() % 2 != 0) {
+                throw WrongUse(Message("PairIncomplete", pairs_.back()));
+            }
+        });
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        ProjectTransaction transaction(project);
+        auto const moves = pairs_.empty() ? found(project) : given(project);
+        try {
+            project.adopt(moves);
+        } catch (project::session::MoveError const& error) {
+            throw failureOf(error);
+        }
+        std::vector<Path> files;
+        std::ranges::transform(moves, std::back_inserter(files), &Move::to);
+        project.stageReturnedLater(files);
+        if (dryRun_.end(transaction, project)) {
+            output().say(Message("Adopted", moves.size()).text());
+        }
+        return 0;
+    }
+
+private:
+    std::vector<Move> given(OpenProject& project) const {
+        auto const paths = absolutePaths(pairs_);
+        std::vector<Move> result;
+        for (std::size_t index = 0; index < paths.size(); index += 2) {
+            project.requireInProject(paths[index]);
+            result.push_back({paths[index], paths[index + 1]});
+        }
+        return result;
+    }
+
+    std::vector<Move> found(OpenProject& project) const {
+        Progress const progress(Message("ProgressRenames"));
+        auto const renames = findRenames(project, similarity_);
+        std::vector<Move> result;
+        std::size_t guesses = 0;
+        for (auto const& rename : renames.pairs) {
+            if (rename.evidence == Rename::Evidence::Name && !adoptsGuesses_) {
+                ++guesses;
+            } else {
+                result.push_back({project.root() / Path(rename.from), project.root() / Path(rename.to)});
+            }
+        }
+        if (guesses > 0) {
+            printError(Message("GuessesLeft", guesses).text());
+        }
+        if (!renames.ambiguous.empty()) {
+            printError(Message("AmbiguousLeft", renames.ambiguous.size()).text());
+        }
+        return result;
+    }
+
+    std::vector<std::string> pairs_;
+    int similarity_ = usualSimilarity;
+    bool adoptsGuesses_ = false;
+    DryRun dryRun_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeAdoptCommand() {
+    return std::make_unique<AdoptCommand>();
+}
+
+} // namespace projectctl

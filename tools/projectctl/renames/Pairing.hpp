@@ -1,0 +1,60 @@
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "renames/Renames.hpp"
+
+namespace projectctl {
+
+/// A path, relative to the project's root, and the identity of the content there. Contents with the same
+/// identity are equal.
+struct FileContentId {
+    std::u16string path;
+    std::string id;
+    bool isEmpty = false; ///< the content says nothing: only files of the same name are paired
+};
+
+/// The pairs of files, and the files that were not paired.
+struct PairedFiles {
+    Renames renames;
+    std::vector<FileContentId> gone;
+    std::vector<FileContentId> added;
+};
+
+/// Pairs files with equal contents. Where several files have the same content, those are paired that have
+/// more of the end of their paths in common with each other than with any other file, at least their name.
+/// The others are ambiguous.
+PairedFiles pairByContent(std::vector<FileContentId> gone, std::vector<FileContentId> added);
+
+/// Pairs files by their names alone, if no other file has the name.
+Renames pairByName(std::vector<std::u16string> const& gone, std::vector<std::u16string> const& added);
+
+/// Adds pairs for folders: for one that is gone, if every pair of a file below it leads to the same place
+/// below one other folder, which is not in the project.
+/// @param goneFolders relative to the root, sorted.
+/// @param isListed whether a path is in the project.
+template <typename IsListed>
+void pairFolders(Renames& renames, std::vector<std::u16string> const& goneFolders, IsListed const& isListed);
+
+/// Sorts by the earlier path, a folder before its contents.
+void sortByPath(std::vector<Rename>& pairs);
+
+/// The folder that a folder has become; empty if the pairs do not agree.
+/// @param pairs of files, sorted by the earlier path.
+std::u16string newFolderOf(std::u16string const& folder, std::vector<Rename> const& pairs);
+
+template <typename IsListed>
+void pairFolders(Renames& renames, std::vector<std::u16string> const& goneFolders, IsListed const& isListed) {
+    std::vector<Rename> folders;
+    for (auto const& folder : goneFolders) {
+        auto const to = newFolderOf(folder, renames.pairs);
+        if (!to.empty() && to != folder && !isListed(to)) {
+            folders.push_back({folder, to, Kind::Folder, Rename::Evidence::Folder, 0});
+        }
+    }
+    renames.pairs.insert(renames.pairs.end(), folders.begin(), folders.end());
+    sortByPath(renames.pairs);
+}
+
+} // namespace projectctl
