@@ -147,7 +147,7 @@ private:
     }
 
     void writeJson(Differences const& found) const {
-        JsonDocument document(json::status);
+        JsonDocument document(showsRenames_ ? json::statusRenames : json::status);
         document.addKey("new");
         writeJson(found.added);
         document.addKey("gone");

@@ -34,6 +34,7 @@ inline constexpr JsonFormat referenceList{"projectctl-reference-list", 1}; ///< 
 inline constexpr JsonFormat resolve{"projectctl-resolve", 1};
 inline constexpr JsonFormat root{"projectctl-root", 1};
 inline constexpr JsonFormat status{"projectctl-status", 1};
+inline constexpr JsonFormat statusRenames{"projectctl-status-renames", 1};
 inline constexpr JsonFormat version{"projectctl-version", 1};
 inline constexpr JsonFormat watch{"projectctl-watch", 1}; ///< of the first line; the others are its events
 

@@ -45,6 +45,7 @@ public:
         } catch (project::session::MoveError const& error) {
             throw failureOf(error);
         }
+        project.changedFiles().listed += moves.size();
         std::vector<Path> files;
         std::ranges::transform(moves, std::back_inserter(files), &Move::to);
         project.stageReturnedLater(files);
