@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
-# A repository whose commits pre-commit checks with the hooks of this one: a commit with a file that the project does
-# not list fails, and a clean one passes. Nothing is loaded from the network.
+# A repository whose commits pre-commit checks with the hooks of this one, as the guide says: a commit with a file that
+# the project does not list fails, and a clean one passes. Nothing is loaded from the network.
 #   pre_commit.sh ROOT PROJECTCTL
 set -euo pipefail
 root=$1 projectctl=$2
@@ -22,14 +22,9 @@ revision=$(git rev-parse HEAD)
 cd "$work/project"
 git init -q
 projectctl init
-cat > .pre-commit-config.yaml <<END
-repos:
-  - repo: $work/hooks
-    rev: $revision
-    hooks:
-      - id: projectctl-status
-      - id: projectctl-check
-END
+sed -n '/^```yaml$/,/^```$/{/^repos:/,/^```$/p}' "$root/docs/guide/continuous-integration.md" | sed '$d' |
+    sed "s|REPOSITORY|$work/hooks|; s|REVISION|$revision|" > .pre-commit-config.yaml
+grep -q "rev: $revision" .pre-commit-config.yaml
 echo listed > listed
 projectctl add listed .pre-commit-config.yaml
 git add .
