@@ -1,6 +1,8 @@
 #include "completion/NameCandidates.hpp"
 
 #include <algorithm>
+#include <iterator>
+#include <utility>
 #include <vector>
 
 #include "cli/Choice.hpp"
@@ -8,6 +10,7 @@
 #include "entrypoints/EntryTypes.hpp"
 #include "entrypoints/Groups.hpp"
 #include "output/NameForms.hpp"
+#include "project/LabelLayer.hpp"
 #include "project/LabelNames.hpp"
 #include "project/entrypoints/EntryPoint.hpp"
 #include "project/entrypoints/EntryPointType.hpp"
@@ -33,23 +36,25 @@ void addNamed(Candidates& candidates, std::vector<Named> const& things, std::str
     }
 }
 
-template <typename Things>
-std::vector<Named> namesSorted(Things const& things) {
-    auto result = namesOf(things);
-    std::ranges::stable_sort(result, {}, &Named::name);
-    return result;
+std::vector<Named> sorted(std::vector<Named> things) {
+    std::ranges::stable_sort(things, {}, &Named::name);
+    return things;
 }
 
 } // namespace
 
 void addCategories(Candidates& candidates, OpenProject& project) {
-    addNamed(candidates, namesSorted(project.manager().getLabelManager().getAllCategories()), "category");
+    auto categories = namesOf(project.manager().getLabelManager().getAllCategories());
+    std::ranges::move(namesOf(project.personal().getLabelManager().getAllCategories()),
+                      std::back_inserter(categories));
+    addNamed(candidates, sorted(std::move(categories)), "category");
 }
 
 void addLabels(Candidates& candidates, OpenProject& project, std::string const& category) {
     auto const guard = project.store().acquireReadLock();
-    auto& labels = project.manager().getLabelManager();
-    addNamed(candidates, namesSorted(labels.getLabels(LabelNames(labels).category(category))), "label");
+    LabelLayer const personal(project, true);
+    auto& labels = LabelLayer(project, personal.hasCategory(category)).labels();
+    addNamed(candidates, sorted(namesOf(labels.getLabels(LabelNames(labels).category(category)))), "label");
 }
 
 void addEntryPointGroups(Candidates& candidates, OpenProject& project) {

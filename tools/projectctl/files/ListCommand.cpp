@@ -12,7 +12,7 @@
 #include "output/NameForms.hpp"
 #include "output/Progress.hpp"
 #include "project/FoundFiles.hpp"
-#include "project/LabelNames.hpp"
+#include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {
@@ -44,9 +44,9 @@ public:
         for (auto const& path : query.paths) {
             project.requireInProject(path);
         }
-        LabelNames names(project.manager().getLabelManager());
-        query.labels = choicesOf(labels_, names);
-        query.absentLabels = choicesOf(absentLabels_, names);
+        query.labels = choicesOf(project, labels_);
+        query.absentLabels = choicesOf(project, absentLabels_);
+        query.layers = layers_.layers();
         query.kind = kind();
         query.glob = glob_ ? std::optional(textOf(*glob_)) : std::nullopt;
         query.isEntryPoint = isEntryPoint_;
@@ -67,16 +67,18 @@ private:
         takeText(app, "--glob", glob_);
         app.add_flag("--entry-points", isEntryPoint_);
         app.add_flag("--unlabelled", isUnlabelled_);
+        layers_.declare(app);
     }
 
-    static std::vector<LabelChoice> choicesOf(std::vector<std::string> const& arguments, LabelNames& names) {
+    std::vector<LabelChoice> choicesOf(OpenProject& project,
+                                       std::vector<std::string> const& arguments) const {
         std::vector<LabelChoice> result;
         result.reserve(arguments.size());
         for (auto const& argument : arguments) {
             std::size_t const equals = argument.find('=');
-            result.push_back(equals == std::string::npos
-                                 ? names.choice(argument, std::nullopt)
-                                 : names.choice(argument.substr(0, equals), argument.substr(equals + 1)));
+            result.push_back(equals == std::string::npos ? layers_.choice(project, argument, std::nullopt)
+                                                         : layers_.choice(project, argument.substr(0, equals),
+                                                                          argument.substr(equals + 1)));
         }
         return result;
     }
@@ -98,6 +100,7 @@ private:
     std::optional<std::string> glob_;
     bool isEntryPoint_ = false;
     bool isUnlabelled_ = false;
+    LayerOptions layers_;
     FoundFiles form_;
 };
 

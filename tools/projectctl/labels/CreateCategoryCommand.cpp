@@ -5,6 +5,8 @@
 #include "cli/TextArguments.hpp"
 #include "labels/CategoryCommands.hpp"
 #include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {
@@ -19,6 +21,7 @@ public:
         app->add_flag("--read-only", isReadOnly_);
         app->add_flag("--single-valued", isSingleValued_);
         completes(takeText(*app, "--type", type_), Completes::DataTypes);
+        layers_.declarePersonal(*app);
         return app;
     }
 
@@ -28,11 +31,16 @@ public:
         if (type_) {
             category.setDataType(textOf(*type_));
         }
-        project.manager().getLabelManager().createCategory(category);
+        auto const layer = layers_.forNew(project);
+        layer.labels().createCategory(category);
+        if (LabelLayer(project, !layer.isPersonal()).hasCategory(*name_)) {
+            printHint(Message("CategoryNowInBothLayers", *name_).text());
+        }
         return 0;
     }
 
 private:
+    LayerOptions layers_;
     std::optional<std::string> name_;
     std::optional<std::string> type_;
     bool isReadOnly_ = false;

@@ -6,6 +6,7 @@
 #include "labels/LabelCommands.hpp"
 #include "output/NameForms.hpp"
 #include "project/LabelNames.hpp"
+#include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {
@@ -23,12 +24,14 @@ public:
         takeText(*app, "NAME", name_)->required();
         auto* const readOnly = app->add_flag("--read-only", isReadOnly_);
         app->add_flag("--writable", isWritable_)->excludes(readOnly);
+        layers_.declare(*app);
         return app;
     }
 
     int run(OpenProject& project) override {
-        auto const guard = project.store().acquireWriteLock();
-        auto& labels = project.manager().getLabelManager();
+        auto const layer = layers_.forChange(project, *category_);
+        LabelLayer::Guard const guard(layer);
+        auto& labels = layer.labels();
         LabelDefinition label(textOf(*name_));
         if (isReadOnly_ || isWritable_) {
             label.setIsReadOnly(isReadOnly_ ? LabelReadOnlyState::READ_ONLY : LabelReadOnlyState::WRITABLE);
@@ -40,6 +43,7 @@ public:
 private:
     std::optional<std::string> category_;
     std::optional<std::string> name_;
+    LayerOptions layers_;
     bool isReadOnly_ = false;
     bool isWritable_ = false;
 };

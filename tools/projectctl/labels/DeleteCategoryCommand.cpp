@@ -7,8 +7,8 @@
 #include "labels/LabelRemoval.hpp"
 #include "output/Progress.hpp"
 #include "project/LabelNames.hpp"
+#include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
-#include "project/ProjectTransaction.hpp"
 
 namespace projectctl {
 
@@ -19,22 +19,24 @@ public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("delete");
         completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
+        layers_.declare(*app);
         return app;
     }
 
     int run(OpenProject& project) override {
-        ProjectTransaction transaction(project);
-        auto& labels = project.manager().getLabelManager();
         Progress const progress("Removing the labels of the category from all files");
-        auto const category = LabelNames(labels).category(*category_);
-        noteRemoval(project, LabelNames(labels).choice(*category_, std::nullopt));
-        labels.deleteCategory(category);
-        transaction.commit();
+        auto const layer = layers_.forChange(project, *category_);
+        changeLabels(project, layer, [&] {
+            LabelNames names(layer.labels());
+            noteRemoval(project, layer, names.choice(*category_, std::nullopt));
+            layer.labels().deleteCategory(names.category(*category_));
+        });
         return 0;
     }
 
 private:
     std::optional<std::string> category_;
+    LayerOptions layers_;
 };
 
 } // namespace

@@ -7,8 +7,8 @@
 #include "labels/LabelRemoval.hpp"
 #include "output/Progress.hpp"
 #include "project/LabelNames.hpp"
+#include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
-#include "project/ProjectTransaction.hpp"
 
 namespace projectctl {
 
@@ -20,23 +20,26 @@ public:
         auto* const app = group.add_subcommand("delete");
         completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
         completes(takeText(*app, "LABEL", label_), Completes::Labels)->required();
+        layers_.declare(*app);
         return app;
     }
 
     int run(OpenProject& project) override {
-        ProjectTransaction transaction(project);
-        auto& labels = project.manager().getLabelManager();
         Progress const progress("Removing the label from all files");
-        auto const label = LabelNames(labels).label(*category_, *label_);
-        noteRemoval(project, LabelNames(labels).choice(*category_, label_));
-        labels.deleteLabel(label.getCategory(), label.getLabelIdentifier());
-        transaction.commit();
+        auto const layer = layers_.forChange(project, *category_);
+        changeLabels(project, layer, [&] {
+            LabelNames names(layer.labels());
+            auto const label = names.label(*category_, *label_);
+            noteRemoval(project, layer, names.choice(*category_, label_));
+            layer.labels().deleteLabel(label.getCategory(), label.getLabelIdentifier());
+        });
         return 0;
     }
 
 private:
     std::optional<std::string> category_;
     std::optional<std::string> label_;
+    LayerOptions layers_;
 };
 
 } // namespace

@@ -7,6 +7,7 @@
 
 #include "changes/DryRun.hpp"
 #include "cli/PathArguments.hpp"
+#include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
 #include "project/labels/Label.hpp"
 
@@ -19,7 +20,8 @@ public:
 
 protected:
     /// @param paths all of them in the project. @return the confirmation of the change.
-    virtual std::string change(OpenProject& project, std::vector<Path> const& paths) const = 0;
+    virtual std::string change(OpenProject& project, LabelLayer const& layer,
+                               std::vector<Path> const& paths) const = 0;
 
     void declareArguments(CLI::App& app);
 
@@ -28,13 +30,17 @@ protected:
     std::string const& label() const { return *label_; }
 
     /// How many times a file has a label. More than once is possible in a text that was merged or edited.
-    static std::size_t countOn(OpenProject& project, Path const& path,
+    static std::size_t countOn(LabelLayer const& layer, Path const& path,
                                project::management::Label const& label);
 
 private:
+    std::string changeAll(OpenProject& project, LabelLayer const& layer,
+                          std::vector<Path> const& paths) const;
+
     std::optional<std::string> category_;
     std::optional<std::string> label_;
     PathArguments paths_;
+    LayerOptions layers_;
     DryRun dryRun_;
 };
 

@@ -5,7 +5,7 @@
 #include "cli/TextArguments.hpp"
 #include "labels/LabelCommands.hpp"
 #include "project/FoundFiles.hpp"
-#include "project/LabelNames.hpp"
+#include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {
@@ -19,6 +19,7 @@ public:
         auto* const app = group.add_subcommand("find");
         completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
         completes(takeText(*app, "LABEL", label_), Completes::Labels);
+        layers_.declare(*app);
         form_.declare(*app, false);
         return app;
     }
@@ -27,7 +28,8 @@ public:
         project.warnOfDamage();
         FileList const files(project);
         project::session::Query query;
-        query.labels.push_back(LabelNames(project.manager().getLabelManager()).choice(*category_, label_));
+        query.labels.push_back(layers_.choice(project, *category_, label_));
+        query.layers = layers_.layers();
         form_.write(project, files, query);
         return 0;
     }
@@ -37,6 +39,7 @@ public:
 private:
     std::optional<std::string> category_;
     std::optional<std::string> label_;
+    LayerOptions layers_;
     FoundFiles form_;
 };
 

@@ -20,12 +20,15 @@ public:
     }
 
 private:
-    std::string change(OpenProject& project, std::vector<Path> const& paths) const override {
-        auto const label = LabelNames(project.manager().getLabelManager()).label(category(), this->label());
+    std::string change(OpenProject& project, LabelLayer const& layer,
+                       std::vector<Path> const& paths) const override {
+        auto const label = LabelNames(layer.labels()).label(category(), this->label());
         auto lacking = paths;
-        std::erase_if(lacking, [&](Path const& path) { return countOn(project, path, label) > 0; });
-        auto const replaced = project.files().addLabels(lacking, {label});
-        project.changedFiles().labelled += lacking.size();
+        std::erase_if(lacking, [&](Path const& path) { return countOn(layer, path, label) > 0; });
+        auto const replaced = layer.files().addLabels(lacking, {label});
+        if (!layer.isPersonal()) { // git has no personal labels to restore
+            project.changedFiles().labelled += lacking.size();
+        }
         return "put on " + std::to_string(lacking.size()) +
                (replaced.empty() ? "" : ", replacing " + std::to_string(replaced.size()) + " others");
     }

@@ -8,6 +8,7 @@
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "project/LabelNames.hpp"
+#include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
 
 namespace projectctl {
@@ -22,12 +23,14 @@ public:
         auto* const app = group.add_subcommand("rename");
         completes(takeText(*app, "CATEGORY", category_), Completes::Categories)->required();
         takeText(*app, "NAME", name_)->required();
+        layers_.declare(*app);
         return app;
     }
 
     int run(OpenProject& project) override {
-        auto const guard = project.store().acquireWriteLock();
-        auto& labels = project.manager().getLabelManager();
+        auto const layer = layers_.forChange(project, *category_);
+        LabelLayer::Guard const guard(layer);
+        auto& labels = layer.labels();
         labels.renameCategory(LabelNames(labels).category(*category_), textOf(*name_));
         warnOfSharedName(labels.getAllCategories());
         return 0;
@@ -46,6 +49,7 @@ private:
 
     std::optional<std::string> category_;
     std::optional<std::string> name_;
+    LayerOptions layers_;
 };
 
 } // namespace

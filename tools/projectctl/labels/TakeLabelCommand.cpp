@@ -21,20 +21,22 @@ public:
     }
 
 private:
-    std::string change(OpenProject& project, std::vector<Path> const& paths) const override {
-        auto const label =
-            LabelNames(project.manager().getLabelManager()).labelEvenIfDeleted(category(), this->label());
+    std::string change(OpenProject& project, LabelLayer const& layer,
+                       std::vector<Path> const& paths) const override {
+        auto const label = LabelNames(layer.labels()).labelEvenIfDeleted(category(), this->label());
         std::vector<Path> labelled;
         std::size_t most = 0;
         for (auto const& path : paths) {
-            if (std::size_t const count = countOn(project, path, label); count > 0) {
+            if (std::size_t const count = countOn(layer, path, label); count > 0) {
                 labelled.push_back(path);
                 most = std::max(most, count);
             }
         }
-        project.changedFiles().labelled += labelled.size();
+        if (!layer.isPersonal()) { // git has no personal labels to restore
+            project.changedFiles().labelled += labelled.size();
+        }
         if (!labelled.empty()) {
-            project.files().removeLabels(labelled, std::vector(most, label)); // each element removes one
+            layer.files().removeLabels(labelled, std::vector(most, label)); // each element removes one
         }
         return "removed from " + std::to_string(labelled.size());
     }

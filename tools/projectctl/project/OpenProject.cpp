@@ -11,6 +11,7 @@
 #include "project/ProjectFolder.hpp"
 #include "project/metadata/Messages.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
 
 namespace projectctl {
 
@@ -48,6 +49,7 @@ OpenProject OpenProject::createShared(Path const& root, std::u16string const& na
 OpenProject::OpenProject(Session session)
     : shield_(std::make_shared<WriteShield>()), session_(std::move(session)) {
     session_.project().subscribe(shield_);
+    access_.personalStore().subscribe(shield_);
 }
 
 OpenProject::~OpenProject() = default;

@@ -51,6 +51,9 @@ public:
 
     project::management::FileManager& files() { return manager().getFileManager(); }
 
+    /// The personal categories and labels.
+    project::session::Personal& personal() noexcept { return session_.personal(); }
+
     /// @throws FileNotInProject
     void requireInProject(Path const& path);
 

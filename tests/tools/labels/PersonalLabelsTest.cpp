@@ -1,0 +1,179 @@
+#include <filesystem>
+
+#include "support/GitFolder.hpp"
+#include "tools/labels/LabelToolTest.hpp"
+
+namespace project::test {
+namespace {
+
+using ::testing::AllOf;
+using ::testing::HasSubstr;
+using ::testing::IsEmpty;
+using ::testing::Not;
+
+class PersonalLabels : public LabelToolTest {
+protected:
+    /// Creates a personal category with a label, and puts the label on a file.
+    void createPersonal(std::string const& category, std::string const& label,
+                        std::string const& file) const {
+        ASSERT_EQ(tool({"category", "create", category, "--personal"}).exitCode, 0);
+        ASSERT_THAT(tool({"label", "create", category, label, "--personal"}), SucceedsSilently());
+        ASSERT_THAT(tool({"label", "put", category, label, file, "--personal"}), SucceedsSilently());
+    }
+
+    std::filesystem::path personalText() const {
+        return folder_.onDisk() / ".projectdata" / "local" / "project.jsonl";
+    }
+};
+
+TEST_F(PersonalLabels, areStoredOutsideTheTextOfTheProject) {
+    auto const before = readText();
+    createPersonal("Mine", "Later", "a");
+
+    EXPECT_EQ(before, readText());
+    EXPECT_TRUE(std::filesystem::exists(personalText()));
+    EXPECT_THAT(tool({"label", "show", "a"}), Prints("Mine: Later (personal)\n"));
+}
+
+TEST_F(PersonalLabels, areListedWithThoseOfTheProject) {
+    createLabelled("Status", "Done", "a");
+    createPersonal("Mine", "Later", "a");
+
+    EXPECT_THAT(tool({"category", "list"}), Prints("Mine (personal)\nStatus\n"));
+    EXPECT_THAT(tool({"category", "list", "--personal"}), Prints("Mine (personal)\n"));
+    EXPECT_THAT(tool({"category", "list", "--no-personal"}), Prints("Status\n"));
+    EXPECT_THAT(tool({"label", "list"}), Prints("Mine: Later (personal)\nStatus: Done\n"));
+    EXPECT_THAT(tool({"label", "list", "Mine"}), Prints("Later (personal)\n"));
+    EXPECT_THAT(tool({"label", "list", "--no-personal"}), Prints("Status: Done\n"));
+    EXPECT_THAT(tool({"label", "show", "a", "b"}), Prints("a: Status: Done\na: Mine: Later (personal)\n"));
+    EXPECT_THAT(tool({"label", "show", "a", "--personal"}), Prints("Mine: Later (personal)\n"));
+    EXPECT_THAT(tool({"label", "show", "a", "--no-personal"}), Prints("Status: Done\n"));
+}
+
+TEST_F(PersonalLabels, areMarkedInJson) {
+    createLabelled("Status", "Done", "a");
+    createPersonal("Mine", "Later", "a");
+    auto const marked = AllOf(HasSubstr("\"personal\": false"), HasSubstr("\"personal\": true"));
+
+    EXPECT_THAT(tool({"category", "list", "--json"}).output, marked);
+    EXPECT_THAT(tool({"label", "list", "--json"}).output, marked);
+    EXPECT_THAT(tool({"label", "show", "a", "--json"}).output, marked);
+    EXPECT_THAT(tool({"label", "show", "a", "--json", "--no-personal"}).output,
+                Not(HasSubstr("\"personal\": true")));
+}
+
+TEST_F(PersonalLabels, areFoundTogetherWithThoseOfTheProject) {
+    createLabelled("Status", "Done", "a");
+    createPersonal("Mine", "Later", "a");
+    ASSERT_THAT(tool({"label", "put", "Mine", "Later", "b", "--personal"}), SucceedsSilently());
+
+    EXPECT_THAT(tool({"list", "--label", "Mine=Later"}), Prints("a\nb\n"));
+    EXPECT_THAT(tool({"list", "--label", "Mine", "--label", "Status=Done"}), Prints("a\n"));
+    EXPECT_THAT(tool({"list", "--label", "Status", "--no-label", "Mine"}), SucceedsSilently());
+    EXPECT_THAT(tool({"list", "--unlabelled"}), Prints("c\n"));
+    EXPECT_THAT(tool({"list", "--unlabelled", "--no-personal"}), Prints("b\nc\n"));
+    EXPECT_THAT(tool({"label", "find", "Mine", "Later"}), Prints("a\nb\n"));
+    EXPECT_THAT(tool({"label", "find", "Status"}), Prints("a\n"));
+    EXPECT_THAT(tool({"label", "find", "Mine", "--no-personal"}), FailsWith(1, "Mine"));
+}
+
+TEST_F(PersonalLabels, areNeverConfusedWithThoseOfTheProject) {
+    createLabelled("Status", "Done", "a");
+    ASSERT_THAT(tool({"category", "create", "Status", "--personal"}).errors, HasSubstr("--no-personal"));
+    ASSERT_THAT(tool({"label", "create", "Status", "Done", "--personal"}), SucceedsSilently());
+
+    for (auto const& command : std::vector<std::vector<std::string>>{
+             {"label", "put", "Status", "Done", "b"},
+             {"label", "take", "Status", "Done", "a"},
+             {"label", "find", "Status", "Done"},
+             {"list", "--label", "Status=Done"},
+             {"label", "list", "Status"},
+             {"label", "create", "Status", "Open"},
+             {"label", "delete", "Status", "Done"},
+             {"category", "rename", "Status", "State"},
+             {"category", "delete", "Status"},
+         }) {
+        EXPECT_THAT(tool(command), FailsWith(1, "--no-personal")) << command[0] << ' ' << command[1];
+    }
+
+    EXPECT_THAT(tool({"label", "put", "Status", "Done", "b", "--personal"}), SucceedsSilently());
+    EXPECT_THAT(tool({"label", "put", "Status", "Done", "c", "--no-personal"}), SucceedsSilently());
+    EXPECT_THAT(tool({"list", "--label", "Status=Done", "--personal"}), Prints("b\n"));
+    EXPECT_THAT(tool({"list", "--label", "Status=Done", "--no-personal"}), Prints("a\nc\n"));
+    EXPECT_THAT(tool({"category", "delete", "Status", "--personal"}), SucceedsSilently());
+    EXPECT_THAT(tool({"list", "--label", "Status=Done"}), Prints("a\nc\n"));
+}
+
+TEST_F(PersonalLabels, areChangedOnlyOnRequest) {
+    createPersonal("Mine", "Later", "a");
+
+    EXPECT_THAT(tool({"label", "put", "Mine", "Later", "b"}), FailsWith(1, "add --personal"));
+    EXPECT_THAT(tool({"category", "delete", "Mine"}), FailsWith(1, "add --personal"));
+    EXPECT_THAT(tool({"label", "take", "Mine", "Later", "a", "--no-personal"}), FailsWith(1, "Mine"));
+    EXPECT_THAT(tool({"label", "put", "Mine", "Later", "a", "--personal", "--no-personal"}),
+                FailsWith(2, "--no-personal"));
+
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("a\n"));
+}
+
+TEST_F(PersonalLabels, areRenamedAndDeleted) {
+    createPersonal("Mine", "Later", "a");
+
+    EXPECT_THAT(tool({"category", "rename", "Mine", "Own", "--personal"}), SucceedsSilently());
+    EXPECT_THAT(tool({"label", "show", "a"}), Prints("Own: Later (personal)\n"));
+    EXPECT_THAT(tool({"label", "take", "Own", "Later", "a", "--personal"}), SucceedsSilently());
+    EXPECT_THAT(tool({"label", "show", "a"}), SucceedsSilently());
+    EXPECT_THAT(tool({"label", "delete", "Own", "Later", "--personal"}), SucceedsSilently());
+    EXPECT_THAT(tool({"label", "list"}), SucceedsSilently());
+}
+
+TEST_F(PersonalLabels, goWithTheFileThatIsRemovedFromTheProject) {
+    createPersonal("Mine", "Later", "a");
+
+    ASSERT_EQ(tool({"remove", "a"}).exitCode, 0);
+    ASSERT_EQ(tool({"add", "a"}).exitCode, 0);
+
+    EXPECT_THAT(tool({"label", "show", "a"}), SucceedsSilently());
+}
+
+TEST_F(PersonalLabels, arePartOfABatch) {
+    createPersonal("Mine", "Later", "a");
+    auto const lines = "label put Mine Later b --personal\nlabel put Mine Later unknown --personal\n";
+
+    EXPECT_NE(tool({"batch"}, lines).exitCode, 0);
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("a\n"));
+    EXPECT_EQ(tool({"batch"}, "label put Mine Later b --personal\nadd a\n").exitCode, 0);
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("a\nb\n"));
+}
+
+TEST_F(PersonalLabels, areNotStagedByAnyCommand) {
+    GitFolder const git(folder_.onDisk());
+    git.commitAll();
+    createPersonal("Mine", "Later", "a");
+    ASSERT_EQ(tool({"remove", "b"}).exitCode, 0);
+    git.commitAll();
+
+    EXPECT_THAT(git.run({"status", "--porcelain"}), IsEmpty());
+    EXPECT_THAT(git.run({"ls-files"}), Not(HasSubstr("local")));
+    EXPECT_EQ(".projectdata/local/\n",
+              git.run({"ls-files", "--others", "--ignored", "--exclude-standard", "--directory"}));
+}
+
+TEST_F(PersonalLabels, canBePutInAProjectThatIsReadOnly) {
+    using std::filesystem::perms;
+    createPersonal("Mine", "Later", "a");
+    std::filesystem::permissions(folder_.onDisk(), perms(0755));
+    std::filesystem::permissions(personalText().parent_path(), perms(0777));
+    std::filesystem::permissions(personalText(), perms(0666));
+    std::filesystem::permissions(text(), perms(0444));
+    std::filesystem::permissions(text().parent_path(), perms(0555));
+    dropPrivileges();
+
+    EXPECT_THAT(tool({"label", "put", "Mine", "Later", "b", "--personal"}), SucceedsSilently());
+    EXPECT_NE(tool({"remove", "c"}).exitCode, 0);
+
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("a\nb\n"));
+}
+
+} // namespace
+} // namespace project::test
