@@ -31,6 +31,9 @@ public:
     /// @throws stores::StoreError if the personal text cannot be opened, or another process holds its lock.
     void join(std::size_t depth);
 
+    /// Whether an open step takes part.
+    bool hasJoined() const noexcept { return !parts_.empty(); }
+
     /// Ends the part of the step at a depth, if it has one. That of the outermost step is committed.
     /// @throws stores::StoreError: the personal changes are rolled back.
     void commit(std::size_t depth);

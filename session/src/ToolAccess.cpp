@@ -18,6 +18,10 @@ stores::Backend& ToolAccess::backend() noexcept {
     return *state_.stored.text();
 }
 
+stores::TreeMetadataManager& ToolAccess::store() noexcept {
+    return *state_.store;
+}
+
 stores::JournalBackend* ToolAccess::log() noexcept {
     return state_.stored.log();
 }
@@ -33,6 +37,10 @@ stores::TextBackend& ToolAccess::text() {
 
 stores::TreeMetadataManager& ToolAccess::personalStore() noexcept {
     return *state_.personalStore.tree();
+}
+
+bool ToolAccess::hasPersonalChanges() const noexcept {
+    return state_.personalStore.steps().hasJoined();
 }
 
 stores::TextBackend& ToolAccess::personalText() noexcept {

@@ -47,11 +47,12 @@ protected:
         }
     }
 
-    /// The JSON document of a format, version 1, with one array.
+    /// The JSON document of a format with one array.
     /// @param rows one object each.
     static std::string document(std::string const& format, std::string const& key,
-                                std::vector<std::string> const& rows) {
-        std::string result = "{\"format\": \"projectctl-" + format + "\", \"version\": 1, \"" + key + "\": [";
+                                std::vector<std::string> const& rows, int version = 1) {
+        std::string result = "{\"format\": \"projectctl-" + format +
+                             "\", \"version\": " + std::to_string(version) + ", \"" + key + "\": [";
         for (auto const& row : rows) {
             result += (&row == &rows.front() ? "\n" : ",\n") + row;
         }

@@ -108,9 +108,17 @@ bool SeenText::readAll(Changes& changes, bool acceptsNoText) {
     if (!text) {
         return false;
     }
-    addChanges(changes, seen_ ? Changes{false, seen_->text.differencesTo(*text)} : Changes{true, {}});
+    addChanges(changes, differencesTo(*text));
     seen_ = Seen{std::move(*text), content->identity, isReliable};
     return true;
+}
+
+/// From the earlier text, or from none if there was none.
+Changes SeenText::differencesTo(ProjectText const& text) const {
+    if (seen_) {
+        return {false, seen_->text.differencesTo(text)};
+    }
+    return wasMissing_ ? Changes{false, ProjectText::empty().differencesTo(text)} : Changes{true, {}};
 }
 
 /// Without an earlier text there is no store yet. An earlier text without nodes was deleted by the writer
@@ -122,6 +130,7 @@ bool SeenText::acceptMissing(Changes& changes) {
         }
         addChanges(changes, {false, seen_->text.differencesTo(ProjectText::empty())});
     }
+    wasMissing_ = mayVanish_;
     seen_.reset();
     return true;
 }

@@ -62,12 +62,14 @@ private:
     bool checkOnce(Changes& changes, bool acceptsNoText);
     bool applyAppended(Changes& changes);
     bool readAll(Changes& changes, bool acceptsNoText);
+    Changes differencesTo(ProjectText const& text) const;
     bool acceptMissing(Changes& changes);
 
     Disk& disk_;
     bool const mayVanish_;
     std::optional<Seen> seen_;
     bool staysInFolder_ = false;
+    bool wasMissing_ = false; ///< a text that may vanish was, so that its content counts as added later
 };
 
 } // namespace project::stores

@@ -132,7 +132,7 @@ TEST_F(SharedCommands, watchPrintsTheChangesOfOthers) {
     initShared();
     leadElsewhereTo("anna");
     RunningProgram watching(commandFor({"watch"}), settings_);
-    ASSERT_EQ(watching.readLine(), "ready\t1");
+    ASSERT_EQ(watching.readLine(), "ready\t2");
 
     elsewhere({"category", "create", "Status"});
     EXPECT_EQ(watching.readLine(), "categoryAdded\tStatus");

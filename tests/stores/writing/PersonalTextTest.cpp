@@ -58,6 +58,18 @@ TEST_F(PersonalTextStore, isEmptyAtOnceWhenItsTextIsDeleted) {
     EXPECT_THAT(loadAll(*backend), IsEmpty());
 }
 
+TEST_F(PersonalTextStore, reportsItsCreationByAnotherProgramAsSingleChanges) {
+    auto const backend = open(personal());
+    EXPECT_THAT(contentOf(*backend), IsEmpty());
+    prepare({u"a"});
+
+    Entered const entered(*backend);
+
+    EXPECT_FALSE(entered.changes().everything);
+    ASSERT_EQ(1U, entered.changes().differences.size());
+    EXPECT_EQ(fileAddress(u"a"), entered.changes().differences[0].address);
+}
+
 TEST_F(PersonalTextStore, isCreatedAgainAfterItsFolderWasDeleted) {
     auto const backend = open(personal());
     commit(*backend, addFiles({u"a"}));

@@ -151,7 +151,7 @@ TEST_F(ShownPaths, areThoseOfEvents) {
     RunningProgram watchingJson(commandFor({"watch", "--json"}), settings_);
     ASSERT_TRUE(watching.waitUntilItSleeps());
     ASSERT_TRUE(watchingJson.waitUntilItSleeps());
-    ASSERT_EQ(watching.readLine(), "ready\t1");
+    ASSERT_EQ(watching.readLine(), "ready\t2");
     ASSERT_THAT(watchingJson.readLine(), HasSubstr("\"ready\""));
 
     ASSERT_THAT(tool({"remove", "../main.cpp", "."}), SucceedsSilently());

@@ -24,7 +24,7 @@ def documents(text: str):
 
 def schema_for(document, folder: pathlib.Path) -> pathlib.Path:
     if "event" in document:
-        return folder / "projectctl-watch-1.schema.json"
+        return folder / "projectctl-watch-2.schema.json"
     return folder / f"{document['format']}-{document['version']}.schema.json"
 
 

@@ -11,7 +11,7 @@ using CategoryCommand = LabelToolTest;
 
 TEST_F(CategoryCommand, listsNothingInANewProject) {
     EXPECT_THAT(tool({"category", "list"}), SucceedsSilently());
-    EXPECT_THAT(tool({"category", "list", "--json"}), Prints(document("category-list", "categories", {})));
+    EXPECT_THAT(tool({"category", "list", "--json"}), Prints(document("category-list", "categories", {}, 2)));
 }
 
 TEST_F(CategoryCommand, listsCategoriesByNameWithTheirAttributes) {
@@ -29,7 +29,9 @@ TEST_F(CategoryCommand, listsEveryAttributeAsJson) {
     EXPECT_THAT(tool({"category", "list", "--json"}),
                 Prints(document("category-list", "categories",
                                 {"{\"name\": \"Owner\", \"uuid\": \"" + categoryUUID("Owner") +
-                                 "\", \"readOnly\": true, \"singleValued\": false, \"type\": \"Text\"}"})));
+                                 "\", \"readOnly\": true, \"singleValued\": false, \"type\": \"Text\", "
+                                 "\"personal\": false}"},
+                                2)));
 }
 
 TEST_F(CategoryCommand, refusesASecondCategoryOfTheSameName) {

@@ -28,7 +28,7 @@ protected:
 
 TEST_F(FileLabelCommand, showsNothingForAFileWithoutLabels) {
     EXPECT_THAT(tool({"label", "show", "a"}), SucceedsSilently());
-    EXPECT_THAT(tool({"label", "show", "a", "--json"}), Prints(document("label-show", "labels", {})));
+    EXPECT_THAT(tool({"label", "show", "a", "--json"}), Prints(document("label-show", "labels", {}, 2)));
 }
 
 TEST_F(FileLabelCommand, putsALabelOnManyFilesInOneStep) {
@@ -166,7 +166,7 @@ TEST_F(FileLabelCommand, showsALabelThatHasDataOnceWithItsData) {
     EXPECT_THAT(tool({"label", "show", "a"}), Prints("Owner: Ann = since May\nOwner: Bob\n"));
     EXPECT_THAT(tool({"label", "show", "a", "--json"}).output,
                 HasSubstr("\"label\": {\"uuid\": \"" + labelUUID("Ann") +
-                          "\", \"name\": \"Ann\"}, \"data\": \"since May\"},\n"));
+                          "\", \"name\": \"Ann\"}, \"data\": \"since May\", \"personal\": false},\n"));
 }
 
 TEST_F(FileLabelCommand, findsTheFilesWithALabelOrAnyLabelOfACategory) {

@@ -37,9 +37,10 @@ TEST_F(LabelCommand, listsEveryAttributeAsJson) {
                                 {"{\"category\": {\"uuid\": \"" + categoryUUID("Status") +
                                  "\", \"name\": \"Status\"}, \"label\": {\"uuid\": \"" + labelUUID("Open") +
                                  "\", \"name\": \"Open\"}, \"readOnly\": false, "
-                                 "\"inheritsReadOnly\": true}"})));
+                                 "\"inheritsReadOnly\": true, \"personal\": false}"},
+                                2)));
     ASSERT_THAT(tool({"label", "delete", "Status", "Open"}), SucceedsSilently());
-    EXPECT_THAT(tool({"label", "list", "--json"}), Prints(document("label-list", "labels", {})));
+    EXPECT_THAT(tool({"label", "list", "--json"}), Prints(document("label-list", "labels", {}, 2)));
 }
 
 TEST_F(LabelCommand, showsInJsonWhetherALabelCanBeChanged) {
@@ -50,10 +51,16 @@ TEST_F(LabelCommand, showsInJsonWhetherALabelCanBeChanged) {
 
     auto const output = tool({"label", "list", "--json"}).output;
 
-    EXPECT_THAT(output, HasSubstr("\"name\": \"Same\"}, \"readOnly\": true, \"inheritsReadOnly\": true}"));
-    EXPECT_THAT(output,
-                HasSubstr("\"name\": \"Writable\"}, \"readOnly\": false, \"inheritsReadOnly\": false}"));
-    EXPECT_THAT(output, HasSubstr("\"name\": \"Kept\"}, \"readOnly\": true, \"inheritsReadOnly\": false}"));
+    EXPECT_THAT(
+        output,
+        HasSubstr(
+            "\"name\": \"Same\"}, \"readOnly\": true, \"inheritsReadOnly\": true, \"personal\": false}"));
+    EXPECT_THAT(output, HasSubstr("\"name\": \"Writable\"}, \"readOnly\": false, \"inheritsReadOnly\": "
+                                  "false, \"personal\": false}"));
+    EXPECT_THAT(
+        output,
+        HasSubstr(
+            "\"name\": \"Kept\"}, \"readOnly\": true, \"inheritsReadOnly\": false, \"personal\": false}"));
 }
 
 TEST_F(LabelCommand, createsLabelsInAReadOnlyCategory) {

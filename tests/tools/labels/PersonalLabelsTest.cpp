@@ -127,6 +127,31 @@ TEST_F(PersonalLabels, areRenamedAndDeleted) {
     EXPECT_THAT(tool({"label", "list"}), SucceedsSilently());
 }
 
+TEST_F(PersonalLabels, areMarkedInADryRun) {
+    createPersonal("Mine", "Later", "a");
+    auto const before = tool({"label", "show", "a", "b"}).output;
+    std::string const batch =
+        "label put Mine Later b --personal\nlabel create Mine Now --personal\nremove a\n";
+
+    EXPECT_THAT(tool({"label", "put", "Mine", "Later", "b", "--personal", "--dry-run"}),
+                Prints("personal put Mine=Later b\n"));
+    EXPECT_THAT(tool({"batch", "--dry-run"}, batch),
+                Prints("remove a\npersonal label create Mine=Now\npersonal take Mine=Later a\n"
+                       "personal put Mine=Later b\n"));
+    EXPECT_THAT(
+        tool({"batch", "--dry-run", "--json"}, batch).output,
+        HasSubstr(
+            R"({"change": "put", "category": "Mine", "label": "Later", "path": "b", "personal": true})"));
+    EXPECT_EQ(before, tool({"label", "show", "a", "b"}).output);
+}
+
+TEST_F(PersonalLabels, areCreatedByNoDryRun) {
+    EXPECT_THAT(tool({"batch", "--dry-run"}, "category create Mine --personal\n"),
+                Prints("personal category create Mine\n"));
+
+    EXPECT_FALSE(std::filesystem::exists(personalText().parent_path()));
+}
+
 TEST_F(PersonalLabels, goWithTheFileThatIsRemovedFromTheProject) {
     createPersonal("Mine", "Later", "a");
 

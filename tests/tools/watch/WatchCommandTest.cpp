@@ -24,7 +24,7 @@ protected:
         auto watching = std::make_unique<RunningProgram>(commandFor(options), settings_);
         bool const isJson = std::ranges::count(options, "--json") > 0;
         EXPECT_EQ(watching->readLine(),
-                  isJson ? R"({"event": "ready", "format": "projectctl-watch", "version": 1})" : "ready\t1");
+                  isJson ? R"({"event": "ready", "format": "projectctl-watch", "version": 2})" : "ready\t2");
         return watching;
     }
 
@@ -78,16 +78,31 @@ TEST_F(WatchCommand, printsEachEventAsAJsonObject) {
     EXPECT_EQ(printed(*watching, {"name", "Engine"}), R"({"event": "nameChanged"})");
 }
 
+TEST_F(WatchCommand, marksEventsOfThePersonalLayer) {
+    auto const watching = watch();
+
+    EXPECT_EQ(printed(*watching, {"category", "create", "Mine", "--personal"}),
+              "personal categoryAdded\tMine");
+    EXPECT_EQ(printed(*watching, {"label", "create", "Mine", "Later", "--personal"}),
+              "personal labelModified\tMine\tLater");
+    EXPECT_EQ(printed(*watching, {"label", "put", "Mine", "Later", "src/pump.cpp", "--personal"}),
+              "personal fileLabelsChanged\tsrc/pump.cpp");
+    EXPECT_EQ(printed(*watching, {"name", "Engine"}), "nameChanged");
+}
+
 TEST_F(WatchCommand, writesEventsThatFollowTheirSchema) {
     auto const watching = watch({"--json"});
     std::string documents;
-    for (auto const& command : std::vector<std::vector<std::string>>{{"add", "valve.cpp"},
-                                                                     {"category", "create", "Owner"},
-                                                                     {"label", "create", "Status", "Done"},
-                                                                     {"name", "Engine"}}) {
+    for (auto const& command :
+         std::vector<std::vector<std::string>>{{"add", "valve.cpp"},
+                                               {"category", "create", "Owner"},
+                                               {"label", "create", "Status", "Done"},
+                                               {"category", "create", "Mine", "--personal"},
+                                               {"name", "Engine"}}) {
         documents += printed(*watching, command) + '\n';
     }
-    expectValid(documents + R"({"event": "ready", "format": "projectctl-watch", "version": 1})");
+    EXPECT_THAT(documents, testing::HasSubstr("\"name\": \"Mine\"}, \"personal\": true}"));
+    expectValid(documents + R"({"event": "ready", "format": "projectctl-watch", "version": 2})");
 }
 
 TEST_F(WatchCommand, runsACommandForEachGroupOfEventsAndContinuesIfItFails) {

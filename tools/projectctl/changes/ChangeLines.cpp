@@ -7,6 +7,7 @@
 #include "output/Output.hpp"
 #include "project/core/ProjectManagerBase.hpp"
 #include "project/metadata/TreeSchema.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
 
 namespace projectctl {
 
@@ -66,16 +67,27 @@ std::u16string const& earliest(Difference const& change, char16_t const* key) {
 
 } // namespace
 
-ChangeLines::ChangeLines(OpenProject& project, std::vector<Difference> const& changes, bool isJson)
-    : project_(project), changes_(changes), shown_(project.root()), isJson_(isJson) {
+void ChangeLines::write(std::vector<Difference> const& changes) {
+    changes_ = changes;
+    isPersonal_ = false;
+    writeAll();
 }
 
-void ChangeLines::write() {
-    for (auto const& change : changes_) {
-        write(change);
-    }
+void ChangeLines::writePersonal(std::vector<Difference> const& changes) {
+    changes_ = changes;
+    isPersonal_ = true;
+    writeAll();
+}
+
+void ChangeLines::finish() {
     if (isJson_) {
         rows_.finish();
+    }
+}
+
+void ChangeLines::writeAll() {
+    for (auto const& change : changes_) {
+        write(change);
     }
 }
 
@@ -87,9 +99,10 @@ void ChangeLines::write(std::string_view words, std::vector<Member> const& membe
         for (auto const& member : members) {
             rows_.addText(member.key, member.text);
         }
+        markPersonal();
         return;
     }
-    std::string line(words);
+    std::string line = (isPersonal_ ? "personal " : "") + std::string(words);
     for (auto const& member : members) {
         bool const isPath = member.key == "path";
         line += isPath || &member == &members.front() ? ' ' : '=';
@@ -97,6 +110,12 @@ void ChangeLines::write(std::string_view words, std::vector<Member> const& membe
     }
     output().text().append(line).append(1, '\n');
     output().flushWhenLarge();
+}
+
+void ChangeLines::markPersonal() {
+    if (isPersonal_) {
+        rows_.addFlag("personal", true);
+    }
 }
 
 void ChangeLines::write(Difference const& change) {
@@ -133,6 +152,10 @@ void ChangeLines::writeFile(Difference const& change) {
         return;
     }
     auto const path = pathOf(change.address);
+    if (isPersonal_) {
+        writeLabelsOfFile(change, path);
+        return;
+    }
     if (!change.after) {
         write("remove", {{"path", path}});
         return;
@@ -157,7 +180,7 @@ void ChangeLines::writeLabelsOfFile(Difference const& change, std::u16string con
     for (auto const& label : without(after, before)) {
         writeLabel("put", label);
     }
-    if (change.before && before == after) {
+    if (change.before && before == after && !isPersonal_) {
         write("change", {{"path", path}});
     }
 }
@@ -165,6 +188,9 @@ void ChangeLines::writeLabelsOfFile(Difference const& change, std::u16string con
 /// Data that belongs to a file whose own node has changed needs no line.
 void ChangeLines::writeDataOfFile(Difference const& change) {
     bool const isInList = change.address[0].getLocation() == treeSchema::files::fileListScope;
+    if (change.address.leaf().getType() == treeSchema::files::markerType && isPersonal_) {
+        return;
+    }
     if (isOfRemovedFile(change.address) || (isInList && find(change.address.parent()) != nullptr)) {
         return;
     }
@@ -207,9 +233,10 @@ void ChangeLines::writeOther(Difference const& change) {
         rows_.begin();
         rows_.addText("change", u"other");
         rows_.addList("address", steps);
+        markPersonal();
         return;
     }
-    output().text() += "other";
+    output().text() += isPersonal_ ? "personal other" : "other";
     for (auto const& step : steps) {
         output().text() += ' ' + quotedName(step);
     }
@@ -236,7 +263,8 @@ Difference const* ChangeLines::find(Address const& address) const {
 }
 
 std::u16string ChangeLines::nameAt(Address const& address) const {
-    std::shared_ptr<project::metadata::MetadataNode const> node = project_.store().getNode(address);
+    std::shared_ptr<project::metadata::MetadataNode const> node =
+        isPersonal_ ? project_.access().personalStore().getNode(address) : project_.store().getNode(address);
     if (auto const* const change = find(address); !node && change != nullptr) {
         node = change->before;
     }

@@ -25,14 +25,25 @@ namespace projectctl {
 /// In JSON, each change is an object with "change", the first words of its line, and a member for each of its
 /// texts.
 ///
+/// A change of the personal layer begins with the word personal, or has a member "personal" in JSON. It has
+/// no lines for the files themselves, which are those of the project.
+///
 /// Texts are quoted as appendQuoted does, so that a line is always one change. The labels and data of a
 /// removed file have no lines of their own.
 class ChangeLines {
 public:
-    /// @param project in the transaction. @param changes sorted by address; borrowed.
-    ChangeLines(OpenProject& project, std::vector<project::stores::Difference> const& changes, bool isJson);
+    /// @param project in the transaction.
+    ChangeLines(OpenProject& project, bool isJson)
+        : shown_(project.root()), project_(project), isJson_(isJson) {}
 
-    void write();
+    /// Writes changes of the project. @param changes sorted by address.
+    void write(std::vector<project::stores::Difference> const& changes);
+
+    /// Writes changes of the personal layer.
+    void writePersonal(std::vector<project::stores::Difference> const& changes);
+
+    /// Ends the document. Call it once, at the end.
+    void finish();
 
 private:
     using Address = project::metadata::MetadataPath;
@@ -44,6 +55,8 @@ private:
         std::u16string text;  ///< of "path", relative to the root
     };
 
+    void writeAll();
+    void markPersonal();
     void write(Difference const& change);
     void write(std::string_view words, std::vector<Member> const& members);
     void writeFile(Difference const& change);
@@ -63,10 +76,11 @@ private:
     /// The name of a category or a label, also of a deleted one; its UUID if it has none.
     std::u16string nameAt(Address const& address) const;
 
-    OpenProject& project_;
-    std::vector<Difference> const& changes_;
     ShownPaths shown_;
+    OpenProject& project_;
     bool isJson_;
+    std::vector<Difference> changes_; ///< of the layer that is being written
+    bool isPersonal_ = false;         ///< the layer
     JsonRows rows_{json::dryRun, "changes"};
 };
 

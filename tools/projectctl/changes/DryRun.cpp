@@ -13,8 +13,10 @@ void DryRun::declare(CLI::App& app) {
 
 bool DryRun::end(ProjectTransaction& transaction, OpenProject& project) const {
     if (isOn_) {
-        auto const changes = changesOfTransaction(project);
-        ChangeLines(project, changes, isJson_).write();
+        ChangeLines lines(project, isJson_);
+        lines.write(changesOfTransaction(project));
+        lines.writePersonal(personalChangesOfTransaction(project));
+        lines.finish();
     } else {
         noteUndoHint(project);
         transaction.commit();

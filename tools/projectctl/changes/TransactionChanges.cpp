@@ -4,13 +4,16 @@
 #include <utility>
 
 #include "project/stores/Node.hpp"
+#include "project/stores/TreeMetadataManager.hpp"
 
 namespace projectctl {
 
 using project::stores::Address;
+using project::stores::Backend;
 using project::stores::Child;
 using project::stores::Children;
 using project::stores::Difference;
+using project::stores::TreeMetadataManager;
 
 namespace {
 
@@ -60,21 +63,31 @@ private:
     std::vector<Address>& below_;
 };
 
-} // namespace
-
-std::vector<Difference> changesOfTransaction(OpenProject& project) {
+std::vector<Difference> differences(Backend& before, TreeMetadataManager& now) {
     std::vector<Difference> result;
     std::vector<Address> waiting{Address::root()};
     while (!waiting.empty()) {
         auto const address = std::move(waiting.back());
         waiting.pop_back();
         project::stores::ChildCollector after;
-        project.loadChildren(address, after);
-        LevelComparison(address, result, waiting).run(project.backend().load(address), after.take());
+        now.loadChildren(address, after);
+        LevelComparison(address, result, waiting).run(before.load(address), after.take());
     }
     std::ranges::sort(result,
                       [](auto const& left, auto const& right) { return left.address < right.address; });
     return result;
+}
+
+} // namespace
+
+std::vector<Difference> changesOfTransaction(OpenProject& project) {
+    return differences(project.backend(), project.access().store());
+}
+
+std::vector<Difference> personalChangesOfTransaction(OpenProject& project) {
+    auto& access = project.access();
+    return access.hasPersonalChanges() ? differences(access.personalText(), access.personalStore())
+                                       : std::vector<Difference>();
 }
 
 } // namespace projectctl

@@ -11,4 +11,7 @@ namespace projectctl {
 /// text, which does not contain the transaction, and the store. Visits the whole definition.
 std::vector<project::stores::Difference> changesOfTransaction(OpenProject& project);
 
+/// The same for the personal layer. Does not read it if the transaction has not changed it.
+std::vector<project::stores::Difference> personalChangesOfTransaction(OpenProject& project);
+
 } // namespace projectctl

@@ -16,16 +16,16 @@ struct JsonFormat {
 
 namespace json {
 
-inline constexpr JsonFormat categoryList{"projectctl-category-list", 1};
+inline constexpr JsonFormat categoryList{"projectctl-category-list", 2};
 inline constexpr JsonFormat check{"projectctl-check", 1};
 inline constexpr JsonFormat description{"projectctl-description", 1};
 inline constexpr JsonFormat done{"projectctl-done", 1}; ///< of verbs that only change the project
-inline constexpr JsonFormat dryRun{"projectctl-dry-run", 1};
+inline constexpr JsonFormat dryRun{"projectctl-dry-run", 2};
 inline constexpr JsonFormat entryList{"projectctl-entry-list", 1}; ///< also of `entry show`
 inline constexpr JsonFormat groupList{"projectctl-group-list", 1};
 inline constexpr JsonFormat init{"projectctl-init", 1};
-inline constexpr JsonFormat labelList{"projectctl-label-list", 1};
-inline constexpr JsonFormat labelShow{"projectctl-label-show", 1};
+inline constexpr JsonFormat labelList{"projectctl-label-list", 2};
+inline constexpr JsonFormat labelShow{"projectctl-label-show", 2};
 inline constexpr JsonFormat list{"projectctl-list", 1};       ///< also of `label find`
 inline constexpr JsonFormat message{"projectctl-message", 1}; ///< on standard error
 inline constexpr JsonFormat name{"projectctl-name", 1};
@@ -36,7 +36,7 @@ inline constexpr JsonFormat root{"projectctl-root", 1};
 inline constexpr JsonFormat status{"projectctl-status", 1};
 inline constexpr JsonFormat statusRenames{"projectctl-status-renames", 1};
 inline constexpr JsonFormat version{"projectctl-version", 1};
-inline constexpr JsonFormat watch{"projectctl-watch", 1}; ///< of the first line; the others are its events
+inline constexpr JsonFormat watch{"projectctl-watch", 2}; ///< of the first line; the others are its events
 
 } // namespace json
 

@@ -1,6 +1,12 @@
 #include "watch/EventLines.hpp"
 
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "cli/ShownPaths.hpp"
 #include "output/JsonFormat.hpp"
+#include "output/JsonObject.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 
@@ -8,22 +14,9 @@ namespace projectctl {
 
 namespace {
 
-/// The fields of a line.
-struct Line {
-    std::string_view event;
-    std::vector<std::u16string> data;
-};
-
-void writeLine(Line const& line) {
-    auto& out = output().text();
-    out += line.event;
-    for (std::u16string const& text : line.data) {
-        std::string bytes;
-        appendBytes(bytes, text);
-        out += '\t';
-        appendQuoted(out, bytes);
-    }
-    out += '\n';
+template <typename Identifier>
+void addNamed(JsonObject& object, std::string_view key, Identifier const& identifier) {
+    object.addNamed(key, identifier.getName(), identifier.getUUID());
 }
 
 JsonObject beginJson(std::string_view event) {
@@ -38,17 +31,38 @@ void endJson(JsonObject& object) {
     output().text() += '\n';
 }
 
-template <typename Identifier>
-void addNamed(JsonObject& object, std::string_view key, Identifier const& identifier) {
-    object.addNamed(key, identifier.getName(), identifier.getUUID());
-}
-
 } // namespace
 
-EventLines::EventLines(OpenProject& project, bool asJson)
-    : shown_(asJson ? ShownPaths::fromRoot(project.root()) : ShownPaths(project.root())), asJson_(asJson) {
+/// Writes the events of one layer.
+class EventLines::OfLayer {
+public:
+    OfLayer(OpenProject& project, project::management::ProjectEventBroadcaster& events, bool isPersonal,
+            bool asJson);
+    OfLayer(OfLayer const&) = delete;
+    OfLayer& operator=(OfLayer const&) = delete;
+
+private:
+    using CategoryIdentifier = project::management::CategoryIdentifier;
+    using Label = project::management::Label;
+
+    void write(std::string_view event);
+    void writeFiles(std::string_view event, std::vector<Path> const& files);
+    void writeCategory(std::string_view event, CategoryIdentifier const& category);
+    void writeLabel(Label const& label);
+    void writeLine(std::string_view event, std::vector<std::u16string> const& data) const;
+    void finish(JsonObject& object) const;
+
+    ShownPaths shown_;
+    bool isPersonal_;
+    bool asJson_;
+};
+
+EventLines::OfLayer::OfLayer(OpenProject& project, project::management::ProjectEventBroadcaster& events,
+                             bool isPersonal, bool asJson)
+    : shown_(asJson ? ShownPaths::fromRoot(project.root()) : ShownPaths(project.root())),
+      isPersonal_(isPersonal),
+      asJson_(asJson) {
     using Files = std::vector<Path>;
-    auto& events = project.events();
     events.onFileListUpdate([this](Files const& files) { writeFiles("fileListUpdate", files); });
     events.onFileLabelsChanged([this](Files const& files) { writeFiles("fileLabelsChanged", files); });
     events.onCategoryAdded(
@@ -65,6 +79,80 @@ EventLines::EventLines(OpenProject& project, bool asJson)
     events.onMetadataChange([this] { write("metadataChange"); });
 }
 
+void EventLines::OfLayer::writeLine(std::string_view event, std::vector<std::u16string> const& data) const {
+    auto& out = output().text();
+    out += isPersonal_ ? "personal " : "";
+    out += event;
+    for (std::u16string const& text : data) {
+        std::string bytes;
+        appendBytes(bytes, text);
+        out += '\t';
+        appendQuoted(out, bytes);
+    }
+    out += '\n';
+}
+
+void EventLines::OfLayer::finish(JsonObject& object) const {
+    if (isPersonal_) {
+        object.addFlag("personal", true);
+    }
+    endJson(object);
+}
+
+void EventLines::OfLayer::write(std::string_view event) {
+    if (asJson_) {
+        auto object = beginJson(event);
+        finish(object);
+    } else {
+        writeLine(event, {});
+    }
+}
+
+void EventLines::OfLayer::writeFiles(std::string_view event, std::vector<Path> const& files) {
+    std::vector<std::u16string> names;
+    names.reserve(files.size());
+    for (auto const& file : files) {
+        names.emplace_back(shown_.ofAbsolute(file));
+    }
+    if (asJson_) {
+        auto object = beginJson(event);
+        object.addList("files", names);
+        finish(object);
+    } else {
+        writeLine(event, names);
+    }
+}
+
+void EventLines::OfLayer::writeCategory(std::string_view event, CategoryIdentifier const& category) {
+    if (asJson_) {
+        auto object = beginJson(event);
+        addNamed(object, "category", category);
+        finish(object);
+    } else {
+        writeLine(event, {category.getName()});
+    }
+}
+
+void EventLines::OfLayer::writeLabel(Label const& label) {
+    constexpr std::string_view event = "labelModified";
+    if (asJson_) {
+        auto object = beginJson(event);
+        addNamed(object, "category", label.getCategory());
+        addNamed(object, "label", label.getLabelIdentifier());
+        finish(object);
+    } else {
+        writeLine(event, {label.getCategory().getName(), label.getLabelIdentifier().getName()});
+    }
+}
+
+EventLines::EventLines(OpenProject& project, bool asJson)
+    : project_(std::make_unique<OfLayer>(project, project.events(), false, asJson)),
+      personal_(std::make_unique<OfLayer>(project, *project.personal().events(), true, asJson)),
+      asJson_(asJson) {
+}
+
+EventLines::~EventLines() = default;
+
 void EventLines::writeReady() const {
     auto const version = static_cast<std::size_t>(json::watch.version);
     if (asJson_) {
@@ -74,52 +162,6 @@ void EventLines::writeReady() const {
         endJson(object);
     } else {
         output().text() += "ready\t" + std::to_string(version) + '\n';
-    }
-}
-
-void EventLines::write(std::string_view event) {
-    if (asJson_) {
-        auto object = beginJson(event);
-        endJson(object);
-    } else {
-        writeLine({event, {}});
-    }
-}
-
-void EventLines::writeFiles(std::string_view event, std::vector<Path> const& files) {
-    std::vector<std::u16string> names;
-    names.reserve(files.size());
-    for (auto const& file : files) {
-        names.emplace_back(shown_.ofAbsolute(file));
-    }
-    if (asJson_) {
-        auto object = beginJson(event);
-        object.addList("files", names);
-        endJson(object);
-    } else {
-        writeLine({event, std::move(names)});
-    }
-}
-
-void EventLines::writeCategory(std::string_view event, CategoryIdentifier const& category) {
-    if (asJson_) {
-        auto object = beginJson(event);
-        addNamed(object, "category", category);
-        endJson(object);
-    } else {
-        writeLine({event, {category.getName()}});
-    }
-}
-
-void EventLines::writeLabel(Label const& label) {
-    constexpr std::string_view event = "labelModified";
-    if (asJson_) {
-        auto object = beginJson(event);
-        addNamed(object, "category", label.getCategory());
-        addNamed(object, "label", label.getLabelIdentifier());
-        endJson(object);
-    } else {
-        writeLine({event, {label.getCategory().getName(), label.getLabelIdentifier().getName()}});
     }
 }
 

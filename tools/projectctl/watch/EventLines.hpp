@@ -1,21 +1,20 @@
 #pragma once
 
-#include <string_view>
-#include <vector>
+#include <memory>
 
-#include "cli/ShownPaths.hpp"
-#include "output/JsonObject.hpp"
 #include "project/OpenProject.hpp"
 
 namespace projectctl {
 
 /// Writes each event of a project to standard output, from construction on: a line with the event's name and
-/// data, separated by tabs, or a JSON object.
+/// data, separated by tabs, or a JSON object. An event of the personal layer has the word personal in front
+/// of its name, or a member "personal".
 ///
 /// Names are quoted as appendQuoted does, so that a line is always one event. Must outlive the last event.
 class EventLines {
 public:
     EventLines(OpenProject& project, bool asJson);
+    ~EventLines();
     EventLines(EventLines const&) = delete;
     EventLines& operator=(EventLines const&) = delete;
 
@@ -23,15 +22,10 @@ public:
     void writeReady() const;
 
 private:
-    using CategoryIdentifier = project::management::CategoryIdentifier;
-    using Label = project::management::Label;
+    class OfLayer;
 
-    void write(std::string_view event);
-    void writeFiles(std::string_view event, std::vector<Path> const& files);
-    void writeCategory(std::string_view event, CategoryIdentifier const& category);
-    void writeLabel(Label const& label);
-
-    ShownPaths shown_;
+    std::unique_ptr<OfLayer> project_;
+    std::unique_ptr<OfLayer> personal_;
     bool asJson_;
 };
 

@@ -40,6 +40,9 @@ public:
     /// The backend of the store: a text, or the log of a shared project.
     stores::Backend& backend() noexcept;
 
+    /// The session's store.
+    stores::TreeMetadataManager& store() noexcept;
+
     /// The log of a shared project; otherwise null.
     stores::JournalBackend* log() noexcept;
 
@@ -49,6 +52,9 @@ public:
 
     /// The store of the personal layer. Take its guards after one of the session's store.
     stores::TreeMetadataManager& personalStore() noexcept;
+
+    /// Whether the open transaction concerns the personal layer.
+    bool hasPersonalChanges() const noexcept;
 
     /// The text behind that store, which may not exist yet.
     stores::TextBackend& personalText() noexcept;
