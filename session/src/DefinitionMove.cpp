@@ -71,12 +71,53 @@ void DefinitionMove::takeBelow(Address address) {
 void DefinitionMove::removeEmptied(std::vector<Move> const& moves, std::vector<Address> const& scopes) {
     for (auto const& move : moves) {
         auto folder = getParentFolder(move.from);
-        while (isParent(folder, root_) &&
-               isPlainAndEmpty(addressIn(scopes.front(), relative(folder)), scopes)) {
-            remove(addressIn(scopes.front(), relative(folder)));
+        while (isParent(folder, root_) && leave(relative(folder), scopes)) {
             folder = getParentFolder(folder);
         }
     }
+}
+
+/// Lets a folder leave the project if it is empty and plain. @return false if it stays.
+bool DefinitionMove::leave(std::u16string const& folder, std::vector<Address> const& scopes) {
+    if (moves_.entries().contains(folder)) {
+        return false; // it is moved itself
+    }
+    auto const moved = moves_.moved(folder);
+    auto const address = addressIn(scopes.front(), moved ? *moved : folder);
+    if (!moved && isPlainAndEmpty(address, scopes)) {
+        remove(address);
+        return true;
+    }
+    if (moved && isPlainAndEmptyInMoved(*moved, scopes)) {
+        nodes_.erase(address.child(PathElement(schema::files::markerType, schema::files::markerLocation)));
+        nodes_.erase(address);
+        return true;
+    }
+    return false;
+}
+
+/// The same for a folder that moves with one above it.
+bool DefinitionMove::isPlainAndEmptyInMoved(std::u16string const& path,
+                                            std::vector<Address> const& scopes) const {
+    for (auto const& scope : scopes) {
+        bool const isList = scope == scopes.front();
+        auto const address = addressIn(scope, path);
+        auto const below = nodes_.lower_bound(address);
+        bool const isPlain = below != nodes_.end() && below->first == address &&
+                             metadata::isEqual(*below->second, *stores::plainNode());
+        if (isList && !isPlain) {
+            return false;
+        }
+        for (auto node = below; node != nodes_.end() && node->first.isWithin(address); ++node) {
+            bool const isOwn =
+                node->first == address || (node->first.parent() == address &&
+                                           node->first.leaf().getType() == schema::files::markerType);
+            if (!isList || !isOwn) {
+                return false;
+            }
+        }
+    }
+    return true;
 }
 
 /// @param folder in the file list, which is the first scope.

@@ -45,6 +45,8 @@ private:
     void takeFrom(std::vector<Address> const& scopes);
     void takeBelow(Address address);
     void removeEmptied(std::vector<Move> const& moves, std::vector<Address> const& scopes);
+    bool leave(std::u16string const& folder, std::vector<Address> const& scopes);
+    bool isPlainAndEmptyInMoved(std::u16string const& path, std::vector<Address> const& scopes) const;
     bool isPlainAndEmpty(Address const& folder, std::vector<Address> const& scopes) const;
     void requireFree(std::vector<Move> const& moves) const;
     void addFoldersAbove(std::vector<Move> const& moves);

@@ -132,6 +132,18 @@ TEST_F(Adoption, ofAFileThatBecameAFolderIsPossibleInBothDirections) {
     EXPECT_EQ(text(), before);
 }
 
+TEST_F(Adoption, ofAFolderThatGotAFileFromElsewhereIsPossibleInBothDirections) {
+    add({u"src/a", u"src/io/b", u"top"});
+    label(u"src");
+    auto const before = text();
+
+    session.adopt({{at(u"src"), at(u"lib")}, {at(u"top"), at(u"lib/new/top")}, {at(u"src/io/b"), at(u"b")}});
+    EXPECT_THAT(listed(), ElementsAre(u"b", u"lib", u"lib/a", u"lib/new", u"lib/new/top"));
+    session.adopt({{at(u"lib"), at(u"src")}, {at(u"lib/new/top"), at(u"top")}, {at(u"b"), at(u"src/io/b")}});
+
+    EXPECT_EQ(text(), before);
+}
+
 TEST_F(Adoption, isRefusedWithoutAnEffectWhereSomethingIsInTheWay) {
     add({u"a", u"b"});
     auto const before = text();

@@ -108,6 +108,7 @@ TEST_F(GoldenJson, findingsAndErrorsHaveTheDocumentsOfTheirVersions) {
     folder_.addFile("engine/new");
 
     golden({"status"});
+    golden({"status", "--renames"});
     auto const check = tool({"check", "--json"});
     EXPECT_EQ(check.exitCode, 3);
     expectGolden(check.output);

@@ -147,11 +147,11 @@ std::vector<GitRename> GitContentQuery::similar(GitContents const& before, GitCo
     if (before.empty() || onDisk.empty()) {
         return result;
     }
-    auto const earlier = temporary("earlier");
+    auto const earlier = newIndex("earlier");
     askOn(earlier, {"update-index", "--add", "-z", "--index-info"}, indexInfo(before, prefix_));
     auto tree = askOn(earlier, {"write-tree", "--missing-ok"});
     tree.pop_back(); // the line feed
-    auto const later = temporary("later");
+    auto const later = newIndex("later");
     std::vector<std::string> names;
     for (auto const& [name, content] : onDisk) {
         names.push_back(name);
@@ -162,6 +162,12 @@ std::vector<GitRename> GitContentQuery::similar(GitContents const& before, GitCo
     for (auto const& change : readRawChanges(answer)) {
         result.push_back({change.from, change.to, change.similarity});
     }
+    return result;
+}
+
+std::string GitContentQuery::newIndex(char const* name) const {
+    auto result = temporary(name);
+    std::filesystem::remove(result); // that of an earlier question
     return result;
 }
 

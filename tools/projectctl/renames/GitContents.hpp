@@ -75,6 +75,8 @@ private:
     std::string askOn(std::string const& index, Arguments const& arguments,
                       std::string_view input = {}) const;
 
+    std::string newIndex(char const* name) const;
+
     std::string temporary(char const* name) const { return folder_ + '/' + name; }
 
     Path const& root_;

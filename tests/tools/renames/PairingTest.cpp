@@ -1,0 +1,100 @@
+#include "renames/Pairing.hpp"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+namespace projectctl {
+namespace {
+
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+using Evidence = Rename::Evidence;
+
+Rename same(std::u16string const& from, std::u16string const& to) {
+    return {from, to, Kind::File, Evidence::Content, 100};
+}
+
+TEST(PairingByContent, pairsFilesWithEqualContents) {
+    auto const found = pairByContent({{u"a", "1"}, {u"b", "2"}}, {{u"c", "2"}, {u"d", "1"}});
+
+    EXPECT_THAT(found.renames.pairs, ElementsAre(same(u"a", u"d"), same(u"b", u"c")));
+    EXPECT_THAT(found.gone, IsEmpty());
+    EXPECT_THAT(found.added, IsEmpty());
+}
+
+TEST(PairingByContent, leavesTheOthersOver) {
+    auto const found = pairByContent({{u"a", "1"}}, {{u"c", "2"}});
+
+    EXPECT_THAT(found.renames.pairs, IsEmpty());
+    EXPECT_THAT(found.renames.ambiguous, IsEmpty());
+    EXPECT_EQ(found.gone.size(), 1U);
+    EXPECT_EQ(found.added.size(), 1U);
+}
+
+TEST(PairingByContent, ofSeveralEqualFilesChoosesThoseWithTheSameEndOfThePath) {
+    auto const found = pairByContent({{u"src/x/init", "1"}, {u"src/y/init", "1"}},
+                                     {{u"lib/y/init", "1"}, {u"lib/x/init", "1"}});
+
+    EXPECT_THAT(found.renames.pairs,
+                ElementsAre(same(u"src/x/init", u"lib/x/init"), same(u"src/y/init", u"lib/y/init")));
+}
+
+TEST(PairingByContent, listsEqualFilesThatNothingDistinguishes) {
+    auto const found = pairByContent({{u"a", "1"}}, {{u"c", "1"}, {u"b", "1"}});
+
+    EXPECT_THAT(found.renames.pairs, IsEmpty());
+    EXPECT_THAT(found.renames.ambiguous, ElementsAre(AmbiguousRename{{u"a"}, {u"b", u"c"}}));
+}
+
+TEST(PairingByContent, listsFilesThatAreEquallyNear) {
+    auto const found = pairByContent({{u"a/f", "1"}}, {{u"c/f", "1"}, {u"b/f", "1"}});
+
+    EXPECT_THAT(found.renames.ambiguous, ElementsAre(AmbiguousRename{{u"a/f"}, {u"b/f", u"c/f"}}));
+}
+
+TEST(PairingByContent, pairsEmptyFilesOfOneNameOnly) {
+    auto const found =
+        pairByContent({{u"a/f", "0", true}, {u"g", "0", true}}, {{u"b/f", "0", true}, {u"h", "0", true}});
+
+    EXPECT_THAT(found.renames.pairs, ElementsAre(same(u"a/f", u"b/f")));
+    EXPECT_THAT(found.renames.ambiguous, IsEmpty());
+}
+
+TEST(PairingByName, guessesWhereANameIsUnique) {
+    auto const found = pairByName({u"a/f", u"a/g", u"b/g"}, {u"c/g", u"c/f", u"c/h"});
+
+    EXPECT_THAT(found.pairs, ElementsAre(Rename{u"a/f", u"c/f", Kind::File, Evidence::Name, 0}));
+    EXPECT_THAT(found.ambiguous, ElementsAre(AmbiguousRename{{u"a/g", u"b/g"}, {u"c/g"}}));
+}
+
+class PairingOfFolders : public ::testing::Test {
+protected:
+    std::vector<std::u16string> foldersAfter(std::vector<Rename> pairs, std::u16string const& listed = {}) {
+        Renames renames{std::move(pairs), {}};
+        pairFolders(renames, {u"src", u"src/io"}, [&](std::u16string const& path) { return path == listed; });
+        std::vector<std::u16string> result;
+        for (auto const& pair : renames.pairs) {
+            if (pair.kind == Kind::Folder) {
+                result.push_back(pair.from + u" " + pair.to);
+            }
+        }
+        return result;
+    }
+};
+
+TEST_F(PairingOfFolders, followsTheFilesIfTheyAgree) {
+    EXPECT_THAT(foldersAfter({same(u"src/a", u"lib/a"), same(u"src/io/b", u"lib/io/b")}),
+                ElementsAre(u"src lib", u"src/io lib/io"));
+    EXPECT_THAT(foldersAfter({same(u"src/a", u"lib/a"), same(u"src/io/b", u"other/b")}),
+                ElementsAre(u"src/io other"));
+    EXPECT_THAT(foldersAfter({same(u"src/a", u"lib/b")}), IsEmpty());
+    EXPECT_THAT(foldersAfter({same(u"src/a", u"a")}), IsEmpty());
+    EXPECT_THAT(foldersAfter({same(u"src.txt", u"lib.txt")}), IsEmpty());
+}
+
+TEST_F(PairingOfFolders, leavesAFolderThatWouldTakeThePlaceOfAnother) {
+    EXPECT_THAT(foldersAfter({same(u"src/a", u"lib/a")}, u"lib"), IsEmpty());
+}
+
+} // namespace
+} // namespace projectctl
