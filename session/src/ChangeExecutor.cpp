@@ -1,7 +1,10 @@
 #include "ChangeExecutor.hpp"
 
+#include <exception>
+
 #include "ChangeStep.hpp"
 #include "DefinitionStager.hpp"
+#include "project/stores/StoreError.hpp"
 
 namespace project::session {
 
@@ -27,6 +30,18 @@ void ChangeExecutor::run(std::function<void()> const& operation, ChangedFiles co
     operation();
     files_.add(files);
     step.commit();
+}
+
+void ChangeExecutor::changePersonal(std::function<bool()> const& isConcerned,
+                                    std::function<void()> const& change) {
+    try {
+        if (isConcerned()) {
+            joinPersonal();
+            change();
+        }
+    } catch (stores::StoreError const&) {
+        personal_->keepError(std::current_exception());
+    }
 }
 
 /// Stages the files and the text of a step that is committed. If the text cannot be staged, the files are

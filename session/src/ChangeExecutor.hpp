@@ -58,6 +58,11 @@ public:
     /// Lets the open steps take part in the personal text, before a personal change in them.
     void joinPersonal() { personal_->join(openSteps_); }
 
+    /// Lets the personal text follow a change of the project, in the open steps. A personal text that cannot
+    /// be read or locked must not prevent the change: its error is thrown when the change is committed.
+    /// @param isConcerned whether there is something to change.
+    void changePersonal(std::function<bool()> const& isConcerned, std::function<void()> const& change);
+
     /// The broadcaster for the events of the personal text.
     std::shared_ptr<management::DispatchableProjectEventBroadcaster> const&
     personalObservers() const noexcept {

@@ -195,6 +195,7 @@ void OpenMoves::complete(RecordedMoves const& moves) {
         }
         batch.publish();
     }
+    definition_.complete(inOneList(moves.groups));
 }
 
 } // namespace project::session

@@ -22,6 +22,9 @@ public:
 
         /// A text that changes with every commit.
         std::function<std::string()> state;
+
+        /// Completes committed moves outside the definition.
+        std::function<void(std::vector<Move> const&)> complete;
     };
 
     /// @param root of the project. @param storeFolder the store's folder. @param adapter null if source

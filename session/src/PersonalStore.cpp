@@ -1,6 +1,7 @@
 #include "PersonalStore.hpp"
 
 #include <algorithm>
+#include <iterator>
 #include <map>
 #include <utility>
 
@@ -122,6 +123,62 @@ void PersonalStore::remove(std::vector<Path> const& files) {
         folders.push_back(folderOf(file));
     }
     removeUnlabelled(folders);
+}
+
+bool PersonalStore::concerns(stores::PathMoves const& moves) {
+    return std::ranges::any_of(moves.entries(),
+                               [this](auto const& entry) { return contains(root_ / Path(entry.first)); });
+}
+
+void PersonalStore::move(stores::PathMoves const& moves) {
+    std::map<MetadataPath, std::shared_ptr<MetadataNode>> before;
+    for (auto const& head : tree_->getChildNodes(MetadataPath::root())) {
+        if (head.leaf().getType() == schema::files::filesType) {
+            loadBelow(head, before);
+        }
+    }
+    std::map<MetadataPath, std::shared_ptr<MetadataNode>> after;
+    std::vector<MetadataPath> removed;
+    std::vector<Path> foldersBefore;
+    std::vector<Path> foldersAfter;
+    for (auto const& [from, node] : before) {
+        if (auto const to = moves.moved(from)) {
+            after.insert_or_assign(*to, node);
+            removed.insert(removed.end(), {from, *to});
+            foldersBefore.push_back(folderOf(pathOf(from)));
+            foldersAfter.push_back(folderOf(pathOf(*to)));
+        }
+    }
+    tree_->removeNodes(removed);
+    tree_->setNodes(after);
+    add(foldersAfter);
+    removeUnlabelled(foldersBefore);
+}
+
+/// Collects the nodes below an address.
+void PersonalStore::loadBelow(MetadataPath const& head,
+                              std::map<MetadataPath, std::shared_ptr<MetadataNode>>& nodes) {
+    std::vector<MetadataPath> waiting{head};
+    while (!waiting.empty()) {
+        auto const address = std::move(waiting.back());
+        waiting.pop_back();
+        if (auto node = tree_->getNode(address)) {
+            nodes.emplace(address, std::move(node));
+        }
+        auto below = tree_->getChildNodes(address);
+        std::ranges::move(below, std::back_inserter(waiting));
+    }
+}
+
+/// The file of an address, or of one that belongs to it.
+Path PersonalStore::pathOf(MetadataPath const& address) const {
+    Path result = root_;
+    for (std::size_t step = 1; step < address.depth(); ++step) {
+        if (address[step].getType() == schema::files::fileType) {
+            result = result / Path(address[step].getLocation());
+        }
+    }
+    return result;
 }
 
 void PersonalStore::removeUnlabelled(std::vector<Path> const& files) {

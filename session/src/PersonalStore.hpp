@@ -1,5 +1,6 @@
 #pragma once
 
+#include <map>
 #include <memory>
 #include <vector>
 
@@ -8,6 +9,7 @@
 #include "project/core/ProjectManagerBase.hpp"
 #include "project/decorators/EventBroadcastingProjectManager.hpp"
 #include "project/metadata/FileChangeRequestListener.hpp"
+#include "project/stores/PathMoves.hpp"
 #include "project/stores/TextBackend.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 
@@ -53,6 +55,13 @@ public:
     /// Files that the text does not contain are skipped.
     void remove(std::vector<Path> const& files);
 
+    /// Whether the text contains a file or folder that moves.
+    bool concerns(stores::PathMoves const& moves);
+
+    /// Moves files with everything below them to their new paths, in place of files that have left the
+    /// project.
+    void move(stores::PathMoves const& moves);
+
     /// Deletes those of these files, and of the folders above them, that have no labels and no data, and
     /// nothing below them.
     void removeUnlabelled(std::vector<Path> const& files);
@@ -61,6 +70,9 @@ private:
     class FolderIgnorer;
 
     std::unique_ptr<stores::Backend> makeBackend();
+    void loadBelow(metadata::MetadataPath const& head,
+                   std::map<metadata::MetadataPath, std::shared_ptr<metadata::MetadataNode>>& nodes);
+    Path pathOf(metadata::MetadataPath const& address) const;
     bool isNeeded(metadata::MetadataPath const& address);
 
     Path const root_;

@@ -1,10 +1,8 @@
 #include "SessionProjectManager.hpp"
 
-#include <exception>
 #include <utility>
 
 #include "project/files/FileLabel.hpp"
-#include "project/stores/StoreError.hpp"
 
 namespace project::session {
 
@@ -25,23 +23,11 @@ std::vector<Path> SessionFileManager::remove(std::vector<Path> const& files) {
     return executor_.execute(
         [&] {
             auto removed = FileManagerDecorator::remove(files);
-            removeFromPersonal(files);
+            executor_.changePersonal([&] { return !personal_.containedIn(files).empty(); },
+                                     [&] { personal_.remove(files); });
             return removed;
         },
         {.removed = files});
-}
-
-/// A personal text that cannot be read or locked must not prevent a change of the project. Labels that stay
-/// are hidden.
-void SessionFileManager::removeFromPersonal(std::vector<Path> const& files) {
-    try {
-        if (!personal_.containedIn(files).empty()) {
-            executor_.joinPersonal();
-            personal_.remove(files);
-        }
-    } catch (stores::StoreError const&) {
-        personal_.steps().keepError(std::current_exception());
-    }
 }
 
 std::vector<FileLabel> SessionFileManager::addLabels(std::vector<Path> const& files,

@@ -38,8 +38,6 @@ public:
                         management::CategoryIdentifier const& category) override;
 
 private:
-    void removeFromPersonal(std::vector<management::Path> const& files);
-
     ChangeExecutor& executor_;
     PersonalStore& personal_;
 };

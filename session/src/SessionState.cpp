@@ -1,6 +1,8 @@
 #include "SessionState.hpp"
 
+#include <exception>
 #include <filesystem>
+#include <set>
 #include <system_error>
 #include <utility>
 
@@ -12,6 +14,7 @@
 #include "MovePlan.hpp"
 #include "SessionProjectManager.hpp"
 #include "fl/i18n/Utf8.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
 #include "project/stores/StoreError.hpp"
 
 namespace project::session {
@@ -52,7 +55,8 @@ Session::State::State(Path const& folder, Options options)
       personalStore(root),
       moves(root, storeFolder, adapter.get(),
             {[this](Path const& file) { return project->getFileManager().isFileInProject(file); },
-             [this] { return definitionState(); }}),
+             [this] { return definitionState(); },
+             [this](std::vector<Move> const& made) { completePersonal(made); }}),
       executor(*store, adapter.get(),
                options.sourceControl == SourceControl::EachChange ? stager.get() : nullptr, files, raised,
                events, &personalStore.steps(), std::make_shared<DispatchableProjectEventBroadcaster>(),
@@ -136,7 +140,7 @@ std::vector<Move> Session::State::move(std::vector<Path> const& sources, Path co
     }
     DefinitionMove definition(*store, root);
     definition.run(planned, DefinitionMove::EmptiedFolders::Stay);
-    // personal labels follow
+    movePersonal(definition.moves());
     files.move(planned);
     moves.make(planned);
     raiseEventsOf(definition.takeChanges());
@@ -155,10 +159,42 @@ void Session::State::adopt(std::vector<Move> const& made) {
     }
     DefinitionMove definition(*store, root);
     definition.run(planned, DefinitionMove::EmptiedFolders::Leave);
-    // personal labels follow
+    movePersonal(definition.moves());
     files.add(listedFilesOf(planned));
     raiseEventsOf(definition.takeChanges());
     step.commit();
+}
+
+/// Personal labels follow the files of the project.
+void Session::State::movePersonal(stores::PathMoves const& moved) {
+    executor.changePersonal([&] { return personalStore.concerns(moved); },
+                            [&] { personalStore.move(moved); });
+}
+
+/// The same for moves of a process that died after it had committed them. It may have moved the labels, too:
+/// they are at the new paths then, and nothing changes. If a path was used twice, that cannot be known, and
+/// the labels stay where they are.
+void Session::State::completePersonal(std::vector<Move> const& made) {
+    stores::PathMoves moved;
+    std::set<Path> paths;
+    for (auto const& move : made) {
+        moved.add(metadata::getRelativePath(root, move.from), metadata::getRelativePath(root, move.to), true);
+        paths.insert({move.from, move.to});
+    }
+    if (paths.size() != 2 * made.size()) {
+        return;
+    }
+    auto& steps = personalStore.steps();
+    try {
+        if (personalStore.concerns(moved)) {
+            constexpr std::size_t outermost = 1;
+            steps.join(outermost);
+            personalStore.move(moved);
+            steps.commit(outermost);
+        }
+    } catch (StoreError const&) {
+        steps.keepError(std::current_exception());
+    }
 }
 
 /// The files for source control, and everything in the project below folders.

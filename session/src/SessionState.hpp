@@ -80,6 +80,8 @@ private:
     bool isStoreEmpty() const;
     std::string definitionState() const;
     void raiseEventsOf(stores::Changes const& changes);
+    void movePersonal(stores::PathMoves const& moved);
+    void completePersonal(std::vector<Move> const& made);
     ChangedFiles listedFilesOf(std::vector<Move> const& moves) const;
 
     std::mutex wakingMutex_;

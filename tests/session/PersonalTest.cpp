@@ -572,6 +572,65 @@ TEST_F(PersonalLayer, isWritableInAProjectThatIsNot) {
     EXPECT_EQ(2U, foundByOthers().size());
 }
 
+TEST_F(PersonalLayer, followsAFileThatMoves) {
+    put({engine_});
+    auto const moved = folder_.path(u"motor.cpp");
+
+    session_.move({engine_}, moved);
+
+    EXPECT_TRUE(isLabelled(moved));
+    EXPECT_THAT(personalText(), Not(HasSubstr("src")));
+    EXPECT_THAT(session_.personal().hiddenFiles(), IsEmpty());
+}
+
+TEST_F(PersonalLayer, followsAFolderThatMovesWithEverythingBelowIt) {
+    put({engine_, pump_, folder_.path(u"src/io"), valve_});
+
+    session_.move({folder_.path(u"src")}, folder_.path(u"lib"));
+
+    EXPECT_TRUE(isLabelled(folder_.path(u"lib/engine.cpp")));
+    EXPECT_TRUE(isLabelled(folder_.path(u"lib/io/pump.cpp")));
+    EXPECT_TRUE(isLabelled(folder_.path(u"lib/io")));
+    EXPECT_FALSE(isLabelled(folder_.path(u"lib")));
+    EXPECT_TRUE(isLabelled(valve_));
+    EXPECT_THAT(personalText(), Not(HasSubstr("src")));
+    EXPECT_EQ(4U, session_.find({.labels = {{u"mine", {}}}}).size());
+}
+
+TEST_F(PersonalLayer, followsAFileThatMovesToTheFolderOfAnUnlabelledOne) {
+    put({valve_});
+
+    session_.move({valve_}, folder_.path(u"src/io"));
+
+    EXPECT_THAT(session_.find({.labels = {{u"mine", {}}}}),
+                ElementsAre(FoundFile{folder_.path(u"src/io/valve.cpp"), FileKind::File}));
+}
+
+TEST_F(PersonalLayer, followsAnAdoptedMoveAndTheReverseRestoresItsText) {
+    put({engine_, valve_});
+    auto const before = personalText();
+    std::filesystem::rename(folder_.onDisk() / "valve.cpp", folder_.onDisk() / "vent.cpp");
+    auto const vent = folder_.path(u"vent.cpp");
+
+    session_.adopt({{valve_, vent}});
+    EXPECT_TRUE(isLabelled(vent));
+
+    std::filesystem::rename(folder_.onDisk() / "vent.cpp", folder_.onDisk() / "valve.cpp");
+    session_.adopt({{vent, valve_}});
+    EXPECT_EQ(before, personalText());
+}
+
+TEST_F(PersonalLayer, staysIfAMoveIsRolledBack) {
+    put({engine_});
+    auto const before = personalText();
+    {
+        auto const transaction = session_.transaction();
+        session_.move({engine_}, folder_.path(u"motor.cpp"));
+    }
+    EXPECT_TRUE(isLabelled(engine_));
+    EXPECT_EQ(before, personalText());
+}
+
 /// Kills the process when the personal text is committed.
 class Killer : public metadata::FileChangeRequestListener {
 public:
@@ -587,6 +646,27 @@ public:
 
     bool acceptsFileChangeRequests() override { return true; }
 };
+
+TEST_F(PersonalLayer, followsAMoveThatIsInterruptedBetweenTheTextsWithTheNextChange) {
+    put({engine_, valve_});
+    auto const killer = std::make_shared<Killer>();
+    auto const moved = folder_.path(u"motor.cpp");
+    test::ChildProcess child([&](test::ChildProcess::Parent const&) {
+        auto session = Session::open(folder_.root());
+        ToolAccess(session).personalStore().subscribe(killer);
+        session.move({engine_}, moved);
+    });
+    EXPECT_FALSE(child.join());
+    ASSERT_TRUE(projectFiles().isFileInProject(moved));
+    ASSERT_FALSE(isLabelled(moved));
+    std::filesystem::remove(folder_.onDisk() / ".git" / "index.lock"); // of the dead process
+
+    session_.project().setName(u"Pump");
+
+    EXPECT_TRUE(isLabelled(moved));
+    EXPECT_TRUE(isLabelled(valve_));
+    EXPECT_THAT(session_.personal().hiddenFiles(), IsEmpty());
+}
 
 TEST_F(PersonalLayer, hidesTheLabelsOfAFileIfItsRemovalIsInterruptedBetweenTheTexts) {
     put({engine_, valve_});
