@@ -9,49 +9,51 @@ namespace {
 
 constexpr std::size_t none = std::u16string_view::npos;
 
+bool isPair(char16_t first, char16_t second) noexcept {
+    return first >= 0xD800 && first < 0xDC00 && second >= 0xDC00 && second < 0xE000;
+}
+
 /// Removes and returns the first character. A surrogate without its partner, which stands for a byte that is
 /// not valid UTF-8, is a character of its own.
 char32_t takeCharacter(std::u16string_view& text) noexcept {
-    char32_t const first = text.front();
+    char16_t const first = text.front();
     text.remove_prefix(1);
-    bool const isPair =
-        first >= 0xD800 && first < 0xDC00 && !text.empty() && text.front() >= 0xDC00 && text.front() < 0xE000;
-    if (!isPair) {
+    if (text.empty() || !isPair(first, text.front())) {
         return first;
     }
     char32_t const second = text.front();
     text.remove_prefix(1);
-    return 0x10000 + ((first - 0xD800) << 10U) + (second - 0xDC00);
-}
-
-/// Removes and returns the first element and the separator behind it.
-std::u16string_view takeElement(std::u16string_view& path) noexcept {
-    auto const end = std::min(path.find(u'/'), path.size());
-    auto const result = path.substr(0, end);
-    path.remove_prefix(std::min(end + 1, path.size()));
-    return result;
+    return 0x10000 + ((char32_t(first) - 0xD800) << 10U) + (second - 0xDC00);
 }
 
 } // namespace
 
-Glob::Glob(std::u16string_view pattern) {
+Glob::Glob(std::u16string_view pattern) : elements_(1) {
     for (std::size_t from = 0; from <= pattern.size();) {
         // A separator that is quoted, or between brackets, separates elements as well: no name contains one.
         auto const end = std::min(pattern.find(u'/', from), pattern.size());
-        elements_.push_back(elementOf(pattern.substr(from, end - from)));
+        auto const element = pattern.substr(from, end - from);
+        if (element == u"**") {
+            elements_.emplace_back();
+        } else {
+            elements_.back().push_back(elementOf(element));
+        }
         from = end + 1;
+    }
+    if (elements_.size() > 1 && elements_.back().empty()) {
+        elements_.back().push_back(
+            elementOf(u"*")); // at the end, ** matches below a folder and not the folder
     }
 }
 
 Glob::Element Glob::elementOf(std::u16string_view pattern) {
-    Element result;
-    result.isAnyElements = pattern == u"**";
-    while (!result.isAnyElements && !pattern.empty()) {
-        auto sign = takeSign(pattern);
-        bool const isRepeated =
-            sign.kind == Kind::AnyText && !result.signs.empty() && result.signs.back().kind == Kind::AnyText;
-        if (!isRepeated) {
-            result.signs.push_back(std::move(sign));
+    Element result{{{}}};
+    while (!pattern.empty()) {
+        if (pattern.front() == u'*') {
+            pattern.remove_prefix(1);
+            result.signs.emplace_back();
+        } else {
+            result.signs.back().push_back(takeSign(pattern));
         }
     }
     return result;
@@ -60,9 +62,7 @@ Glob::Element Glob::elementOf(std::u16string_view pattern) {
 Glob::Sign Glob::takeSign(std::u16string_view& pattern) {
     auto const character = takeCharacter(pattern);
     Sign result{Kind::Literal, character, {}};
-    if (character == U'*') {
-        result.kind = Kind::AnyText;
-    } else if (character == U'?') {
+    if (character == U'?') {
         result.kind = Kind::AnyCharacter;
     } else if (character == U'\\' && !pattern.empty()) {
         result.literal = takeCharacter(pattern);
@@ -97,7 +97,8 @@ bool Glob::takeCharacters(std::u16string_view& pattern, Sign& sign) {
     return true;
 }
 
-bool Glob::Sign::isMatch(char32_t character) const noexcept {
+bool Glob::Sign::take(std::u16string_view& text) const noexcept {
+    auto const character = takeCharacter(text);
     if (kind == Kind::Literal) {
         return character == literal;
     }
@@ -107,58 +108,90 @@ bool Glob::Sign::isMatch(char32_t character) const noexcept {
     return kind == Kind::AnyCharacter || isListed == (kind == Kind::Characters);
 }
 
-/// After a mismatch, only the most recent `*` needs to match more: an earlier one can be left as it is.
-bool Glob::Element::isMatch(std::u16string_view name) const noexcept {
-    std::size_t next = 0;
-    std::size_t star = none;
-    std::u16string_view afterStar;
-    while (!name.empty() || next < signs.size()) {
-        if (next < signs.size() && signs[next].kind == Kind::AnyText) {
-            star = next++;
-            afterStar = name;
-            continue;
+void Glob::Sign::approach(std::u16string_view& text) const noexcept {
+    bool const isOneUnit = literal < 0xD800 || (literal >= 0xE000 && literal < 0x10000);
+    if (kind == Kind::Literal && isOneUnit) {
+        text.remove_prefix(std::min(text.find(static_cast<char16_t>(literal)), text.size()));
+    }
+}
+
+void Glob::Sign::skip(std::u16string_view& text) noexcept {
+    takeCharacter(text);
+}
+
+void Glob::Sign::skipLast(std::u16string_view& text) noexcept {
+    bool const endsWithPair = text.size() > 1 && isPair(text[text.size() - 2], text.back());
+    text.remove_suffix(endsWithPair ? 2 : 1);
+}
+
+bool Glob::Element::take(std::u16string_view& path) const noexcept {
+    auto const name = path.substr(0, path.find(u'/'));
+    path.remove_prefix(std::min(name.size() + 1, path.size()));
+    return Glob::isMatch(signs, name);
+}
+
+void Glob::Element::skip(std::u16string_view& path) noexcept {
+    path.remove_prefix(std::min(path.find(u'/'), path.size() - 1) + 1);
+}
+
+void Glob::Element::skipLast(std::u16string_view& path) noexcept {
+    path.remove_suffix(path.back() == u'/' ? 1 : 0); // of the element that was removed before
+    auto const slash = path.rfind(u'/');
+    path = path.substr(0, slash == none ? 0 : slash + 1);
+}
+
+/// Whether parts match the first pieces of a text, which are removed.
+template <typename Part>
+bool Glob::isTaken(std::vector<Part> const& parts, std::u16string_view& text) noexcept {
+    return std::ranges::all_of(parts, [&text](Part const& part) { return !text.empty() && part.take(text); });
+}
+
+/// Searches the first place at which parts match. Removes everything up to the end of them.
+template <typename Part>
+bool Glob::isFound(std::vector<Part> const& parts, std::u16string_view& text) noexcept {
+    while (!parts.empty()) {
+        parts.front().approach(text);
+        auto rest = text;
+        if (isTaken(parts, rest)) {
+            text = rest;
+            break;
         }
-        if (next < signs.size() && !name.empty() && signs[next].isMatch(takeCharacter(name))) {
-            ++next;
-            continue;
-        }
-        if (star == none || afterStar.empty()) {
+        if (text.empty()) {
             return false;
         }
-        takeCharacter(afterStar);
-        name = afterStar;
-        next = star + 1;
+        Part::skip(text);
     }
     return true;
 }
 
-/// The same over elements: `**` is to them as `*` is to characters.
-bool Glob::isMatch(std::u16string_view path) const noexcept {
-    std::size_t next = 0;
-    std::size_t star = none;
-    std::u16string_view afterStar;
-    while (!path.empty() || next < elements_.size()) {
-        if (next < elements_.size() && elements_[next].isAnyElements) {
-            star = next++;
-            afterStar = path;
-            // At the end of a pattern it matches what is below a folder, and not the folder itself.
-            if (next == elements_.size()) {
-                return !path.empty();
-            }
-            continue;
-        }
-        if (next < elements_.size() && !path.empty() && elements_[next].isMatch(takeElement(path))) {
-            ++next;
-            continue;
-        }
-        if (star == none || afterStar.empty()) {
+/// Compares a text with runs of parts, with any pieces between the runs: the first run is at its begin, the
+/// last one at its end, and each of the others at the first place at which it matches.
+template <typename Part>
+bool Glob::isMatch(std::vector<std::vector<Part>> const& runs, std::u16string_view text) noexcept {
+    if (!isTaken(runs.front(), text)) {
+        return false;
+    }
+    if (runs.size() == 1) {
+        return text.empty();
+    }
+    for (std::size_t run = 1; run + 1 < runs.size(); ++run) {
+        if (!isFound(runs[run], text)) {
             return false;
         }
-        takeElement(afterStar);
-        path = afterStar;
-        next = star + 1;
     }
-    return true;
+    auto before = text;
+    for (std::size_t count = 0; count < runs.back().size(); ++count) {
+        if (before.empty()) {
+            return false;
+        }
+        Part::skipLast(before);
+    }
+    text.remove_prefix(before.size());
+    return isTaken(runs.back(), text);
+}
+
+bool Glob::isMatch(std::u16string_view path) const noexcept {
+    return isMatch(elements_, path);
 }
 
 } // namespace project::session

@@ -17,35 +17,59 @@ public:
     bool isMatch(std::u16string_view path) const noexcept;
 
 private:
-    enum class Kind { Literal, AnyCharacter, Characters, OtherCharacters, AnyText };
+    enum class Kind { Literal, AnyCharacter, Characters, OtherCharacters };
 
     struct Range {
         char32_t first;
         char32_t last;
     };
 
-    /// A part of an element of the pattern that matches one character, or any text.
+    /// A part of an element of the pattern that matches one character.
     struct Sign {
         Kind kind;
         char32_t literal = 0;
         std::vector<Range> ranges;
 
-        bool isMatch(char32_t character) const noexcept;
+        /// Removes and compares the first character of a text that is not empty.
+        bool take(std::u16string_view& text) const noexcept;
+
+        /// Removes characters that it does not match, if they are quickly found.
+        void approach(std::u16string_view& text) const noexcept;
+
+        /// Removes the first character.
+        static void skip(std::u16string_view& text) noexcept;
+
+        /// Removes the last one.
+        static void skipLast(std::u16string_view& text) noexcept;
     };
 
-    /// An element of the pattern. One without signs and with this flag is `**`.
+    /// An element of the pattern: the signs between its stars.
     struct Element {
-        std::vector<Sign> signs;
-        bool isAnyElements = false;
+        std::vector<std::vector<Sign>> signs;
 
-        bool isMatch(std::u16string_view name) const noexcept;
+        /// The same as of Sign, for the elements of a path. The separator in front of the last one is left.
+        bool take(std::u16string_view& path) const noexcept;
+
+        void approach(std::u16string_view& /*path*/) const noexcept {}
+
+        static void skip(std::u16string_view& path) noexcept;
+        static void skipLast(std::u16string_view& path) noexcept;
     };
+
+    template <typename Part>
+    static bool isTaken(std::vector<Part> const& parts, std::u16string_view& text) noexcept;
+
+    template <typename Part>
+    static bool isFound(std::vector<Part> const& parts, std::u16string_view& text) noexcept;
+
+    template <typename Part>
+    static bool isMatch(std::vector<std::vector<Part>> const& runs, std::u16string_view text) noexcept;
 
     static Element elementOf(std::u16string_view pattern);
     static Sign takeSign(std::u16string_view& pattern);
     static bool takeCharacters(std::u16string_view& pattern, Sign& sign);
 
-    std::vector<Element> elements_;
+    std::vector<std::vector<Element>> elements_; ///< the elements between the `**`
 };
 
 } // namespace project::session

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include "exchange/CompileCommands.hpp"
+#include "output/NameForms.hpp"
 
 namespace project::test {
 namespace {
@@ -12,7 +13,7 @@ using projectctl::CodeOwners;
 using projectctl::CodeOwnersPattern;
 
 bool matches(std::string_view pattern, std::string_view path) {
-    return CodeOwnersPattern(pattern).matches(projectctl::namesIn(path));
+    return CodeOwnersPattern(pattern).matches(projectctl::textOf(std::string(path)));
 }
 
 TEST(CodeOwnersPattern, withoutASlashMatchesInEveryFolder) {
@@ -38,6 +39,8 @@ TEST(CodeOwnersPattern, thatEndsWithAStarDoesNotMatchBelowFolders) {
     EXPECT_FALSE(matches("docs/*", "docs/a/b.md"));
     EXPECT_TRUE(matches("docs/**", "docs/a/b.md"));
     EXPECT_FALSE(matches("/*", "a/b"));
+    EXPECT_TRUE(matches("docs/*/", "docs/a/b.md")); // of folders, with everything below them
+    EXPECT_FALSE(matches("docs/*/", "docs/a.md"));
 }
 
 TEST(CodeOwnersPattern, mayHaveTwoStarsForFolders) {
@@ -53,7 +56,9 @@ TEST(CodeOwnersPattern, quotesWithBackslashesAndHasNoBrackets) {
     EXPECT_FALSE(matches("/a\\*b", "axb"));
     EXPECT_TRUE(matches("/[a]", "[a]"));
     EXPECT_FALSE(matches("/[a]", "a"));
+    EXPECT_TRUE(matches("/\\[a]", "[a]"));
     EXPECT_TRUE(matches("/?", "\xC3\xA9"));
+    EXPECT_TRUE(matches("/?", "\xFF"));
     EXPECT_TRUE(matches("/a*b*c*d*e", "aaabbbbbccccdddde"));
     EXPECT_FALSE(matches("/a*a*a*a*a*a*a*a*a*b", std::string(200, 'a')));
 }
@@ -61,10 +66,10 @@ TEST(CodeOwnersPattern, quotesWithBackslashesAndHasNoBrackets) {
 TEST(CodeOwners, decideByTheLastPatternThatMatches) {
     CodeOwners const owners("* @all\r\n/src/ @src\n/src/none\n");
 
-    EXPECT_THAT(owners.ruleOf("a")->owners, ::testing::ElementsAre("@all"));
-    EXPECT_THAT(owners.ruleOf("src/a")->owners, ::testing::ElementsAre("@src"));
-    EXPECT_THAT(owners.ruleOf("src/none")->owners, ::testing::IsEmpty());
-    EXPECT_EQ(CodeOwners("/x @y").ruleOf("a"), nullptr);
+    EXPECT_THAT(owners.ruleOf(u"a")->owners, ::testing::ElementsAre("@all"));
+    EXPECT_THAT(owners.ruleOf(u"src/a")->owners, ::testing::ElementsAre("@src"));
+    EXPECT_THAT(owners.ruleOf(u"src/none")->owners, ::testing::IsEmpty());
+    EXPECT_EQ(CodeOwners("/x @y").ruleOf(u"a"), nullptr);
 }
 
 TEST(CompileCommands, nameTheFolderOfATarget) {

@@ -57,10 +57,9 @@ void CodeOwners::readLine(std::size_t number, std::string_view line) {
     rules_.push_back(std::move(rule));
 }
 
-CodeOwners::Rule const* CodeOwners::ruleOf(std::string_view path) const {
-    auto const names = namesIn(path);
+CodeOwners::Rule const* CodeOwners::ruleOf(std::u16string_view path) const {
     auto const found = std::find_if(rules_.rbegin(), rules_.rend(),
-                                    [&names](Rule const& rule) { return rule.pattern.matches(names); });
+                                    [path](Rule const& rule) { return rule.pattern.matches(path); });
     return found != rules_.rend() ? &*found : nullptr;
 }
 

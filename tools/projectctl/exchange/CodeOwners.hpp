@@ -28,8 +28,8 @@ public:
 
     explicit CodeOwners(std::string_view text);
 
-    /// The rule for a file. @param path relative to the root, in bytes. @return null if no pattern matches.
-    Rule const* ruleOf(std::string_view path) const;
+    /// The rule for a file. @param path relative to the root. @return null if no pattern matches.
+    Rule const* ruleOf(std::u16string_view path) const;
 
     std::vector<BadLine> const& badLines() const noexcept { return badLines_; }
 

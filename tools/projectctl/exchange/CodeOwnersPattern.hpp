@@ -1,14 +1,11 @@
 #pragma once
 
-#include <cstddef>
-#include <string>
 #include <string_view>
 #include <vector>
 
-namespace projectctl {
+#include "Glob.hpp"
 
-/// The names in a path, from the root.
-std::vector<std::string_view> namesIn(std::string_view path);
+namespace projectctl {
 
 /// A pattern of a CODEOWNERS file: one of .gitignore, with these differences: there is no negation, brackets
 /// mean themselves, and a pattern that ends with /* does not match below the folders that it matches.
@@ -17,15 +14,12 @@ public:
     /// @param text with backslashes before bytes that mean themselves.
     explicit CodeOwnersPattern(std::string_view text);
 
-    /// Whether it matches a file. @param path its names, from the root.
-    bool matches(std::vector<std::string_view> const& path) const { return matchesFrom(0, path, 0); }
+    /// Whether it matches a file. @param path relative to the root.
+    bool matches(std::u16string_view path) const;
 
 private:
-    bool matchesFrom(std::size_t name, std::vector<std::string_view> const& path, std::size_t at) const;
-
-    std::vector<std::string> names_; ///< "**" is any number of folders
-    bool isOfFolders_;               ///< matches folders only, and so everything below them
-    bool matchesBelow_;              ///< a folder that matches includes everything below it
+    std::vector<project::session::Glob>
+        globs_; ///< of the files themselves, and of those in folders that it matches
 };
 
 } // namespace projectctl

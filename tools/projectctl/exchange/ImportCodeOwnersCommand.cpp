@@ -35,7 +35,7 @@ protected:
         }
         ImportedItems result;
         FileList(project).visit(project.root(), [&](FileList::File const& file) {
-            auto const* const rule = file.kind == Kind::File ? owners.ruleOf(bytesOf(file.path)) : nullptr;
+            auto const* const rule = file.kind == Kind::File ? owners.ruleOf(file.path) : nullptr;
             if (rule != nullptr) {
                 for (auto const& owner : rule->owners) {
                     result.push_back({rule->line, project.root() / Path(file.path),
