@@ -30,7 +30,7 @@ int main(int argc, char** argv) {
         return endOfClosedOutput();
     } catch (std::exception const& error) {
         int const code = projectctl::exitCodeFor(error);
-        projectctl::printFailure(error.what(), projectctl::nameOf(code), code);
+        projectctl::printFailure(error, projectctl::nameOf(code), code);
         return code;
     }
 }

@@ -102,5 +102,32 @@ TEST_F(Colors, markTheHeadingsOfHelp) {
                 AllOf(HasSubstr("\033[1mUsage:\033[m projectctl list"), HasSubstr("\033[1mOptions:\033[m")));
 }
 
+TEST_F(Colors, markFindingsBySeverity) {
+    std::filesystem::remove(inFolder("a.txt"));
+    folder_.addFile("new.txt");
+    insertLineBefore(R"({"at":["Info","ProjectData"])", "\"lost/file\"");
+    folder_.addFile("back\\slash");
+    ASSERT_THAT(tool({"add", "back\\slash"}), SucceedsSilently());
+    onTerminal();
+
+    EXPECT_THAT(tool({"status"}).output,
+                AllOf(HasSubstr("\033[32mnew \033[m new.txt"), HasSubstr("\033[31mgone\033[m a.txt"),
+                      HasSubstr("\033[36mnote\033[m \"back")));
+    EXPECT_THAT(tool({"check"}).output,
+                AllOf(HasSubstr("\033[1;31m" + text().string() + ": \033[mthe file \"lost/file\""),
+                      HasSubstr("\033[36m" + text().string() + ": note: \033[m\"back")));
+    EXPECT_THAT(tool({"check", "--format", "gcc"}).output, Not(IsColored()));
+}
+
+TEST_F(Colors, markTheBeginningOfErrorsAndWarnings) {
+    onTerminal();
+    EXPECT_THAT(tool({"list", "missing"}).output, HasSubstr("\033[1;31mprojectctl:\033[m \""));
+    ASSERT_EQ(tool({"category", "create", "Other"}).exitCode, 0);
+    EXPECT_THAT(tool({"category", "rename", "Other", "Status"}).output,
+                HasSubstr("\033[33mprojectctl: warning:\033[m 2 categories"));
+    settings_.onTerminal = false;
+    EXPECT_THAT(tool({"list", "missing"}).errors, Not(IsColored()));
+}
+
 } // namespace
 } // namespace project::test

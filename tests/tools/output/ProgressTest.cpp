@@ -72,9 +72,9 @@ TEST(Progress, showsTheNextTask) {
     Progress progress("Reading folders", terminal.descriptor(), atOnce);
     progress.reach(3);
 
-    progress.begin("Adding 3 files");
+    progress.begin(projectctl::Message("ProgressAdd", 3));
 
-    EXPECT_THAT(terminal.read(longEnough, "Adding 3 files ..."), EndsWith("Adding 3 files ..."));
+    EXPECT_THAT(terminal.read(longEnough, "Adding 3 files and folders ..."), EndsWith("Adding 3 files and folders ..."));
 }
 
 TEST(Progress, writesNothingForShortWork) {

@@ -38,13 +38,13 @@ public:
         if (project.log() == nullptr) {
             project.warnOfDamage();
         }
-        Progress progress("Running the commands");
+        Progress progress(Message("ProgressBatch"));
         ProjectTransaction transaction(project);
         project.warnOfDamageInLog(); // the transaction has read it
         int const result = runAll(lines, project, progress);
         output().flush(); // while a failure can still roll everything back
         if (end(transaction, project)) {
-            output().say(std::to_string(lines.size()) + " commands done");
+            output().say(Message("BatchDone", lines.size()));
         }
         return result;
     }
@@ -61,7 +61,7 @@ private:
             try {
                 result = std::max(result, line.command->run(project));
             } catch (std::exception const& error) {
-                fail(ofLine(line.number) + error.what(), error);
+                fail(atLine(line.number, error.what()).text(), error);
             }
             progress.reach(++count);
         }
@@ -81,7 +81,7 @@ private:
 
     /// Says what the error itself does not: that all lines are rolled back.
     [[noreturn]] static void fail(std::string const& text, std::exception const& error) {
-        throw CodedFailure(text + " (nothing was changed)", exitCodeFor(error));
+        throw CodedFailure(Message("BatchFailed", text), exitCodeFor(error));
     }
 
     CommandList const& commands_;

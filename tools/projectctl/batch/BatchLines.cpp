@@ -20,7 +20,7 @@ void requireOptionsOfOneCommand(std::vector<std::string> const& words) {
             return;
         }
         if (isCommonOption(word) || word == DryRun::option) {
-            throw WrongUse(word + " applies to the whole batch: give it to 'projectctl batch'");
+            throw WrongUse(Message("OptionOfBatch", word));
         }
     }
 }
@@ -30,7 +30,7 @@ std::unique_ptr<ProjectCommand> parsed(std::vector<std::string> const& words, Co
     auto command = parseCommand(words, commands);
     auto* const ofProject = dynamic_cast<ProjectCommand*>(command.get());
     if (ofProject == nullptr || !ofProject->canRunInBatch()) {
-        throw WrongUse('\'' + words.front() + "' cannot be part of a batch in this form");
+        throw WrongUse(Message("NotInBatch", words.front()));
     }
     std::unique_ptr<ProjectCommand> result(ofProject);
     static_cast<void>(command.release());
@@ -46,7 +46,7 @@ std::vector<BatchLine> parseBatch(std::string text, CommandList const& commands)
         try {
             result.push_back({line->number, parsed(line->words, commands)});
         } catch (WrongUse const& error) {
-            throw WrongUse(ofLine(line->number) + error.what());
+            throw WrongUse(atLine(line->number, error.what()));
         }
     }
     return result;

@@ -12,6 +12,7 @@
 #include "cli/ExitCode.hpp"
 #include "cli/ShownPaths.hpp"
 #include "cli/TextArguments.hpp"
+#include "output/Colors.hpp"
 #include "output/JsonDocument.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
@@ -56,7 +57,7 @@ public:
         if (repair_) {
             repair(project);
         }
-        Progress progress("Checking the project");
+        Progress progress(Message("ProgressCheck"));
         auto const faults = project.log() == nullptr ? project.faults() : project.log()->check();
         auto found = allFindings(faults, project);
         if (isJson_) {
@@ -69,9 +70,7 @@ public:
         auto const count = countFaults(found);
         bool const isOfSetup = std::ranges::all_of(
             found, [](Finding const& finding) { return !finding.isFault() || isAboutSetup(finding); });
-        output().say(count == 0  ? "The project has no faults."
-                     : isOfSetup ? "'projectctl setup' configures the merge driver."
-                                 : adviceFor(faults));
+        output().say(Message(count == 0 ? "NoFaults" : isOfSetup ? "AdviceSetup" : adviceFor(faults)));
         return count == 0 ? exit_code::done : exit_code::finding;
     }
 
@@ -83,7 +82,7 @@ private:
             return FindingForm::Text;
         }
         if (*format_ != "gcc" && *format_ != "github") {
-            throw WrongUse('"' + *format_ + "\" is not a format. The formats are text, gcc and github");
+            throw WrongUse(Message("FormatUnknown", *format_));
         }
         return *format_ == "gcc" ? FindingForm::Gcc : FindingForm::GitHub;
     }
@@ -92,7 +91,7 @@ private:
     Findings allFindings(std::vector<Fault> const& faults, OpenProject& project) const {
         Findings result;
         for (auto const& fault : faults) {
-            result.push_back(Finding::fault(codeOf(fault.kind), fault.problem));
+            result.push_back({Finding::Weight::Fault, codeOf(fault.kind), fault.problem});
             result.back().line = fault.line;
         }
         auto const root = project.root();
@@ -111,9 +110,11 @@ private:
     static void writeText(Findings const& findings, std::string const& file) {
         for (auto const& finding : findings) {
             bool const hasLine = finding.line > 0 && !finding.address;
-            std::string const place = file + (hasLine ? ':' + std::to_string(finding.line) : std::string());
-            report((isAboutSetup(finding) ? std::string() : place + ": ") +
-                   (finding.isFault() ? "" : "note: ") + finding.text);
+            auto const place = file + (hasLine ? ':' + std::to_string(finding.line) : std::string()) + ": ";
+            auto const mark = finding.isFault() ? std::string() : Message("NoteMark").text() + ": ";
+            auto const begin = withoutControls((isAboutSetup(finding) ? std::string() : place) + mark, false);
+            output().text() += colored(finding.isFault() ? Color::Fault : Color::Note, begin) +
+                               withoutControls(finding.text, false) + '\n';
         }
     }
 
@@ -140,7 +141,7 @@ private:
             repair(*log);
         } else if (std::string const aside = project.text().repair(); !aside.empty()) {
             project.stageLater();
-            aside_ = "the damaged lines are now in " + project.storeFile(aside);
+            aside_ = Message("LinesAside", project.storeFile(aside)).text();
         }
         if (!aside_.empty() && !isJson_) {
             report(aside_);
@@ -149,9 +150,9 @@ private:
 
     void repair(project::stores::JournalBackend& log) {
         if (auto const aside = log.repair()) {
-            aside_ = "the damaged entries " + std::to_string(aside->first) + " to " +
-                     std::to_string(aside->last) + " of the log are set aside" +
-                     (aside->isNothingLost ? ", and nothing is lost" : "; what could be read is kept");
+            aside_ = Message(aside->isNothingLost ? "EntriesAsideNothingLost" : "EntriesAside",
+                             std::to_string(aside->first), std::to_string(aside->last))
+                         .text();
         }
     }
 
@@ -160,15 +161,15 @@ private:
             return std::ranges::find(faults, kind, &Fault::kind) != faults.end();
         };
         if (has(Fault::Kind::Conflict)) {
-            return "'projectctl resolve' resolves the conflicts.";
+            return "AdviceResolve";
         }
         if (has(Fault::Kind::Damage)) {
-            return "'projectctl check --repair' sets damaged lines aside.";
+            return "AdviceRepair";
         }
         if (has(Fault::Kind::Irregular) || has(Fault::Kind::TornTail)) {
-            return "'projectctl tidy' corrects irregular lines and torn tails.";
+            return "AdviceTidy";
         }
-        return "Correct these lines in an editor.";
+        return "AdviceEdit";
     }
 
     /// Writes one line. Control characters are replaced by C escapes.

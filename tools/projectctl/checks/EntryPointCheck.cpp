@@ -29,9 +29,7 @@ Findings EntryPointCheck::run() {
     for (auto const& [file, addresses] : files_) {
         if (addresses.size() > 1) {
             add(Finding::fault(code::entryRepeated,
-                               "the file " + inQuotes(shown_.of(file)) + " has " +
-                                   std::to_string(addresses.size()) +
-                                   " entry points, but only the first one can be found by its path"),
+                               Message("EntryRepeated", shown_.of(file), addresses.size())),
                 addresses[1], file);
         }
     }
@@ -40,15 +38,12 @@ Findings EntryPointCheck::run() {
 
 void EntryPointCheck::check(MetadataPath const& address, Node const& node) {
     auto const& file = node.get(treeSchema::entrypoints::fileKey);
-    std::string const entry = "the entry point " + inQuotes(address.leaf().getLocation()) + " of the file " +
-                              inQuotes(shown_.of(file));
+    auto const entry = Message("FindingEntry", address.leaf().getLocation(), shown_.of(file)).text();
     files_[file].push_back(address);
     checkFile(entry, file, address);
     auto const& group = node.get(treeSchema::entrypoints::groupUUIDKey);
     if (!group.empty() && !groups_.contains(group)) {
-        add(Finding::fault(code::groupMissing,
-                           entry + " is in the group " + inQuotes(group) + ", which does not exist"),
-            address, file);
+        add(Finding::fault(code::groupMissing, Message("GroupMissing", entry, group)), address, file);
     }
 }
 
@@ -56,12 +51,9 @@ void EntryPointCheck::checkFile(std::string const& entry, std::u16string const& 
                                 MetadataPath const& address) {
     auto const path = project_.root() / Path(file);
     if (!project_.files().isFileInProject(path)) {
-        add(Finding::note(code::entryFileNotListed,
-                          entry + " is not shown, because the file is not in the project"),
-            address, file);
+        add(Finding::note(code::entryFileNotListed, Message("EntryFileNotListed", entry)), address, file);
     } else if (!project::metadata::exists(path)) {
-        add(Finding::note(code::entryFileGone, entry + " cannot be used, because the file is not on disk"),
-            address, file);
+        add(Finding::note(code::entryFileGone, Message("EntryFileGone", entry)), address, file);
     }
 }
 

@@ -10,6 +10,7 @@
 
 #include "checks/FindingCode.hpp"
 #include "project/metadata/MetadataPath.hpp"
+#include "texts/Message.hpp"
 
 namespace projectctl {
 
@@ -27,12 +28,12 @@ struct Finding {
     std::optional<project::metadata::MetadataPath> address = {}; ///< of its node; empty if there is none
     std::size_t line = 0; ///< of the text, counted from 1; 0 if it has none, or until placeInText was called
 
-    static Finding fault(std::string_view code, std::string text) {
-        return {Weight::Fault, code, std::move(text)};
+    static Finding fault(std::string_view code, Message const& message) {
+        return {Weight::Fault, code, message.text()};
     }
 
-    static Finding note(std::string_view code, std::string text) {
-        return {Weight::Note, code, std::move(text)};
+    static Finding note(std::string_view code, Message const& message) {
+        return {Weight::Note, code, message.text()};
     }
 
     bool isFault() const noexcept { return weight == Weight::Fault; }

@@ -13,22 +13,6 @@ namespace treeSchema = project::metadata::schema;
 using project::metadata::MetadataPath;
 using project::metadata::PathElement;
 
-namespace {
-
-Finding missing(std::string const& file, std::u16string const& uuid, std::string const& category) {
-    return Finding::fault(code::labelMissing, file + " has the label " + inQuotes(uuid) +
-                                                  " of the category " + category + ", which does not exist");
-}
-
-Finding repeated(std::string const& file, std::u16string const& label, std::string const& category,
-                 std::size_t count) {
-    return Finding::note(code::labelRepeated, file + " has the label " + inQuotes(label) +
-                                                  " of the category " + category + ' ' +
-                                                  std::to_string(count) + " times");
-}
-
-} // namespace
-
 LabelCheck::LabelCheck(project::metadata::MetadataManager& store) {
     auto const head = MetadataPath::root().child(
         PathElement(treeSchema::categories::categoriesType, treeSchema::rootLocation));
@@ -56,7 +40,7 @@ void LabelCheck::check(CheckedFile const& subject, Node const& node, ShownPaths&
     if (node.getChildren().empty()) {
         return;
     }
-    std::string const file = "the file " + inQuotes(shown.of(subject.path));
+    std::u16string const file(shown.of(subject.path));
     Findings found;
     for (auto const& [category, labels] : labelsOn(node)) {
         checkCategory(file, category, labels, found);
@@ -83,30 +67,29 @@ std::map<std::u16string, LabelCheck::Counts> LabelCheck::labelsOn(Node const& no
     return result;
 }
 
-void LabelCheck::checkCategory(std::string const& file, std::u16string const& uuid, Counts const& labels,
+void LabelCheck::checkCategory(std::u16string const& file, std::u16string const& uuid, Counts const& labels,
                                Findings& findings) const {
     auto const category = categories_.find(uuid);
     if (category == categories_.end()) {
-        findings.push_back(Finding::fault(code::categoryMissing, file + " has a label of the category " +
-                                                                     inQuotes(uuid) +
-                                                                     ", which does not exist"));
+        findings.push_back(Finding::fault(code::categoryMissing, Message("CategoryMissing", file, uuid)));
         return;
     }
-    std::string const name = inQuotes(category->second.name);
+    auto const& name = category->second.name;
     std::size_t total = 0;
     for (auto const& [label, count] : labels) {
         auto const known = category->second.labels.find(label);
         total += count;
         if (known == category->second.labels.end()) {
-            findings.push_back(missing(file, label, name));
+            findings.push_back(
+                Finding::fault(code::labelMissing, Message("LabelMissing", file, label, name)));
         } else if (count > 1 && !category->second.isSingleValued) {
-            findings.push_back(repeated(file, known->second, name, count));
+            findings.push_back(Finding::note(code::labelRepeated,
+                                             Message("LabelRepeated", file, known->second, name, count)));
         }
     }
     if (category->second.isSingleValued && total > 1) {
-        findings.push_back(Finding::fault(code::labelsContradict, file + " has " + std::to_string(total) +
-                                                                      " labels of the category " + name +
-                                                                      ", which allows one"));
+        findings.push_back(
+            Finding::fault(code::labelsContradict, Message("LabelsContradict", file, total, name)));
     }
 }
 

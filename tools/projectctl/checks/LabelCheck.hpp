@@ -38,7 +38,7 @@ private:
     using Counts = std::map<std::u16string, std::size_t>;
 
     static std::map<std::u16string, Counts> labelsOn(Node const& node);
-    void checkCategory(std::string const& file, std::u16string const& uuid, Counts const& labels,
+    void checkCategory(std::u16string const& file, std::u16string const& uuid, Counts const& labels,
                        Findings& findings) const;
 
     std::map<std::u16string, Category> categories_; ///< by UUID

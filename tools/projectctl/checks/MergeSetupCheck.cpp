@@ -11,24 +11,16 @@ void checkMergeSetup(fl::filesystem::Path const& root, Findings& findings) {
     }
     switch (mergeSetupOf(root)) {
     case MergeSetup::NotAssigned:
-        findings.push_back(Finding::note(
-            code::mergeNotAssigned, "git merges the project's text line by line: the attribute 'merge' of "
-                                    ".projectdata/project.jsonl is not 'project-definition'"));
+        findings.push_back(Finding::note(code::mergeNotAssigned, Message("MergeNotAssigned")));
         break;
     case MergeSetup::Missing:
-        findings.push_back(Finding::note(code::mergeNotSetUp,
-                                         "git merges the project's text line by line: 'projectctl setup' "
-                                         "configures the merge driver"));
+        findings.push_back(Finding::note(code::mergeNotSetUp, Message("MergeNotSetUp")));
         break;
     case MergeSetup::OtherCommand:
-        findings.push_back(Finding::note(
-            code::mergeOtherCommand, "git merges the project's text with another command than the one that "
-                                     "'projectctl setup' configures"));
+        findings.push_back(Finding::note(code::mergeOtherCommand, Message("MergeOtherCommand")));
         break;
     case MergeSetup::ProgramMissing:
-        findings.push_back(Finding::fault(
-            code::mergeProgramMissing, "git merges the project's text line by line: the merge driver calls a "
-                                       "program that cannot be run; 'projectctl setup' configures it again"));
+        findings.push_back(Finding::fault(code::mergeProgramMissing, Message("MergeProgramMissing")));
         break;
     case MergeSetup::NoRepository:
     case MergeSetup::Works:

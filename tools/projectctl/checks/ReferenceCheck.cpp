@@ -22,6 +22,10 @@ MetadataPath headOf(ReferenceList const& list) {
     return MetadataPath::root().child(PathElement(std::u16string(list.head), treeSchema::rootLocation));
 }
 
+std::string subjectOf(ReferenceList const& list, std::u16string_view name) {
+    return Message(list.isOfProjects ? "ReferenceInProjects" : "ReferenceInPath", name).text();
+}
+
 } // namespace
 
 Findings ReferenceCheck::run() {
@@ -43,12 +47,10 @@ void ReferenceCheck::checkForms(ReferenceList const& list, References const& ref
         auto const node = project_.store().getNode(address);
         bool const isReference = node && address.leaf().getType() == treeSchema::references::referenceType;
         if (isReference && !read.contains(uuid)) {
-            findings_.push_back(
-                Finding::note(code::referenceTypeUnsupported,
-                              "the reference " + inQuotes(uuid) + " in " + list.name +
-                                  " is not shown, because this list does not support its type " +
-                                  inQuotes(node->get(treeSchema::references::typeKey)))
-                    .at(address));
+            findings_.push_back(Finding::note(code::referenceTypeUnsupported,
+                                              Message("ReferenceTypeUnsupported", subjectOf(list, uuid),
+                                                      node->get(treeSchema::references::typeKey)))
+                                    .at(address));
         }
     }
 }
@@ -58,17 +60,14 @@ void ReferenceCheck::checkTargets(ReferenceList const& list, References const& r
         auto const& folder = reference.getLocation();
         auto const address =
             headOf(list).child(PathElement(treeSchema::references::referenceType, reference.getUUID()));
-        std::string const subject =
-            "the reference " + inQuotes(shown_.of(reference.getStoredPath())) + " in " + list.name;
+        auto const subject = subjectOf(list, shown_.of(reference.getStoredPath()));
         if (!project::metadata::is_directory(folder)) {
-            findings_.push_back(
-                Finding::note(code::referenceFolderMissing, subject + " cannot be followed: the folder " +
-                                                                inQuotes(folder.native()) + " does not exist")
-                    .at(address));
+            findings_.push_back(Finding::note(code::referenceFolderMissing,
+                                              Message("ReferenceFolderMissing", subject, folder))
+                                    .at(address));
         } else if (list.isOfProjects && findProjectIn(folder) == ProjectTrace::None) {
             findings_.push_back(Finding::note(code::referenceProjectMissing,
-                                              subject + " cannot be followed: the folder " +
-                                                  inQuotes(folder.native()) + " does not contain a project")
+                                              Message("ReferenceProjectMissing", subject, folder))
                                     .at(address));
         }
     }

@@ -12,6 +12,7 @@
 #include "cli/ExitCode.hpp"
 #include "cli/ShownPaths.hpp"
 #include "git/GitIgnore.hpp"
+#include "output/Colors.hpp"
 #include "output/JsonRows.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
@@ -44,7 +45,7 @@ public:
         project.warnOfUnfinishedMove();
         auto const scan = compare(project);
         for (auto const& line : scan.unreadable()) {
-            printWarning(line);
+            printWarning(Message("AsReported", line));
         }
         Differences found{leavesOutIgnored_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
                           findProblems(project, isJson_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_))};
@@ -98,7 +99,7 @@ private:
     }
 
     static StatusScan compare(OpenProject& project) {
-        Progress progress("Comparing the project with the disk");
+        Progress progress(Message("ProgressStatus"));
         StatusScan scan(project);
         scan.run(progress);
         return scan;
@@ -120,26 +121,28 @@ private:
     }
 
     void writeLines(Differences const& found) const {
-        writeLines("new  ", found.added, true);
-        writeLines("gone ", found.gone, false);
+        writeLines(colored(Color::New, Message("StatusNew").text()), found.added, true);
+        writeLines(colored(Color::Gone, Message("StatusGone").text()), found.gone, false);
         writeRenameLines(found.renames, ShownPaths(root_));
+        auto const bad = colored(Color::Fault, Message("StatusBad").text());
+        auto const note = colored(Color::Note, Message("StatusNote").text());
         for (auto const& problem : found.problems) {
-            bool const isFault = problem.weight == Finding::Weight::Fault;
-            output().text() += (isFault ? "bad  " : "note ") + withoutControls(problem.text, false) + '\n';
+            output().text() +=
+                (problem.isFault() ? bad : note) + ' ' + withoutControls(problem.text, false) + '\n';
         }
         if (found.added.empty() && found.gone.empty() && found.problems.empty() &&
             found.renames.pairs.empty() && found.renames.ambiguous.empty()) {
-            output().say("The project and the disk contain the same files.");
+            output().say(Message("SameFiles"));
         }
     }
 
     /// @param hasSlashes whether folders end with a slash, because they are shown without their contents.
-    void writeLines(char const* word, Files const& files, bool hasSlashes) const {
+    void writeLines(std::string const& word, Files const& files, bool hasSlashes) const {
         ShownPaths shown(root_);
         for (auto const& file : files) {
             std::u16string path(shown.ofAbsolute(file.path));
             path += hasSlashes && file.kind == Kind::Folder ? u"/" : u"";
-            output().text() += word;
+            output().text() += word + ' ';
             output().name(path);
             output().text() += '\n';
             output().flushWhenLarge();

@@ -87,8 +87,7 @@ void TreeCheck::checkHead(Address const& head) {
         checkReferences(head);
     } else if (head != ProjectManagerBase::getRootNodePath() &&
                head != ProjectManagerBase::getDescriptionNodePath().parent()) {
-        add(Finding::note(code::dataUnused, "this version does not use the data at " + described(head)),
-            head);
+        add(Finding::note(code::dataUnused, Message("DataUnused", described(head))), head);
     }
 }
 
@@ -111,9 +110,8 @@ void TreeCheck::checkFiles(Address const& scope) {
 
 void TreeCheck::checkFile(Address const& file) {
     if (!isPossibleName(file.leaf().getLocation())) {
-        add(Finding::fault(code::nameImpossible, "no file can have the name " +
-                                                     inQuotes(file.leaf().getLocation()) + ", at " +
-                                                     described(file)),
+        add(Finding::fault(code::nameImpossible,
+                           Message("NameImpossible", file.leaf().getLocation(), described(file))),
             file);
     }
     auto const node = store_.getNode(file);
@@ -122,10 +120,7 @@ void TreeCheck::checkFile(Address const& file) {
     }
     auto const above = file.parent();
     if (above.depth() > 1 && !store_.hasNode(above)) {
-        add(Finding::fault(code::folderNotListed,
-                           "the file " + inQuotes(shown_.of(pathOf(file))) +
-                               " is in the project but its folder is not, so listings do not show it"),
-            file);
+        add(Finding::fault(code::folderNotListed, Message("FolderNotListed", shown_.of(pathOf(file)))), file);
     }
     if (file[0].getLocation() == treeSchema::rootLocation) {
         auto const path = pathOf(file);
@@ -137,21 +132,20 @@ void TreeCheck::checkFile(Address const& file) {
 
 void TreeCheck::checkCategories(Address const& head) {
     for (auto const& category : store_.getChildNodes(head)) {
-        requireNode(category, "the category");
+        requireNode(category, "NodelessCategory");
         checkLabels(category);
     }
 }
 
 void TreeCheck::checkLabels(Address const& category) {
     for (auto const& label : store_.getChildNodes(category)) {
-        if (!requireNode(label, "the label")) {
+        if (!requireNode(label, "NodelessLabel")) {
             continue;
         }
         std::u16string const state = store_.getNode(label)->get(treeSchema::categories::labelReadOnlyKey);
         if (!isOneOf(state, {u"", u"READ_ONLY", u"WRITABLE", u"INHERITED"})) {
-            add(Finding::fault(code::labelStateUnknown, "the label " + inQuotes(label.leaf().getLocation()) +
-                                                            " has the unknown read-only state " +
-                                                            inQuotes(state)),
+            add(Finding::fault(code::labelStateUnknown,
+                               Message("LabelStateUnknown", label.leaf().getLocation(), state)),
                 label);
         }
     }
@@ -159,15 +153,14 @@ void TreeCheck::checkLabels(Address const& category) {
 
 void TreeCheck::checkEntryPoints(Address const& head) {
     for (auto const& entryPoint : store_.getChildNodes(head)) {
-        if (!requireNode(entryPoint, "the entry point")) {
+        if (!requireNode(entryPoint, "NodelessEntry")) {
             continue;
         }
         auto const node = store_.getNode(entryPoint);
-        std::string const uuid = inQuotes(entryPoint.leaf().getLocation());
         auto const& type = node->get(treeSchema::entrypoints::typeKey);
         if (!isOneOf(type, {u"Basic", u"Startup", u"StartUp", u"Shutdown", u"Batch_Job", u"Batch Job"})) {
             add(Finding::fault(code::entryTypeUnknown,
-                               "the entry point " + uuid + " has the unknown type " + inQuotes(type)),
+                               Message("EntryOfUnknownType", entryPoint.leaf().getLocation(), type)),
                 entryPoint);
         }
     }
@@ -175,23 +168,21 @@ void TreeCheck::checkEntryPoints(Address const& head) {
 
 void TreeCheck::checkGroups(Address const& head) {
     for (auto const& group : store_.getChildNodes(head)) {
-        requireNode(group, "the entry point group");
+        requireNode(group, "NodelessGroup");
     }
 }
 
 void TreeCheck::checkReferences(Address const& head) {
     for (auto const& reference : store_.getChildNodes(head)) {
-        requireNode(reference, "the reference");
+        requireNode(reference, "NodelessReference");
     }
 }
 
-bool TreeCheck::requireNode(Address const& address, std::string const& kind) {
+bool TreeCheck::requireNode(Address const& address, char const* message) {
     if (store_.hasNode(address)) {
         return true;
     }
-    add(Finding::fault(code::nodeMissing, kind + ' ' + inQuotes(address.leaf().getLocation()) +
-                                              " has an address without a node"),
-        address);
+    add(Finding::fault(code::nodeMissing, Message(message, address.leaf().getLocation())), address);
     return false;
 }
 

@@ -31,7 +31,8 @@ private:
     void checkEntryPoints(Address const& head);
     void checkGroups(Address const& head);
     void checkReferences(Address const& head);
-    bool requireNode(Address const& address, std::string const& kind);
+    /// @param message for an address without a node.
+    bool requireNode(Address const& address, char const* message);
     void add(Finding finding, Address const& address);
 
     OpenProject& project_;

@@ -11,7 +11,7 @@ ArgumentPaths::ArgumentPaths(Path from) : from_(std::move(from)) {
 
 Path ArgumentPaths::absolute(std::string const& argument) {
     if (argument.empty()) {
-        throw Failure("an empty path does not name a file");
+        throw Failure(Message("EmptyPath"));
     }
     std::size_t const slash = argument.rfind('/');
     auto const last = slash == std::string::npos ? argument : argument.substr(slash + 1);

@@ -9,15 +9,14 @@
 namespace projectctl {
 
 std::optional<std::size_t> choose(std::vector<Named> const& things, std::u16string const& wanted,
-                                  std::string const& kind) {
+                                  char const* several) {
     auto const hasName = [&wanted](Named const& thing) { return thing.name == wanted; };
     if (std::ranges::count_if(things, hasName) > 1) {
         std::string uuids;
         for (auto const& thing : things) {
             uuids += hasName(thing) ? (uuids.empty() ? "" : ", ") + fl::i18n::toUtf8(thing.uuid) : "";
         }
-        throw Failure("several " + kind + " have the name " + inQuotes(wanted) +
-                      ". Give a UUID instead: " + uuids);
+        throw Failure(Message(several, wanted, uuids));
     }
     auto found = std::ranges::find_if(things, hasName);
     if (found == things.end()) {

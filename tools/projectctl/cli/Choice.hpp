@@ -25,11 +25,11 @@ std::vector<Named> namesOf(std::vector<Thing> const& things) {
 }
 
 /// Finds the thing that an argument names: the one with that name, else the one with that UUID.
-/// @param kind the noun for these things, in the plural, for the error.
+/// @param several the message for several things with the name.
 /// @return its index; empty when there is none.
 /// @throws Failure when several things have the name. The text lists their UUIDs.
 std::optional<std::size_t> choose(std::vector<Named> const& things, std::u16string const& wanted,
-                                  std::string const& kind);
+                                  char const* several);
 
 /// Whether a text has the form of a UUID: 36 characters, hexadecimal digits and dashes.
 bool isUUID(std::u16string const& text);

@@ -1,7 +1,5 @@
 #pragma once
 
-#include <string>
-
 #include "cli/ExitCode.hpp"
 #include "output/Failure.hpp"
 
@@ -10,8 +8,6 @@ namespace projectctl {
 /// An error with an exit code of its own.
 class CodedFailure : public Failure {
 public:
-    CodedFailure(std::string const& text, int exitCode) : Failure(text), exitCode_(exitCode) {}
-
     CodedFailure(Message const& message, int exitCode) : Failure(message), exitCode_(exitCode) {}
 
     int exitCode() const noexcept { return exitCode_; }
@@ -23,8 +19,6 @@ private:
 /// Arguments or commands that cannot be parsed, or that cannot be combined.
 class WrongUse : public CodedFailure {
 public:
-    explicit WrongUse(std::string const& text) : CodedFailure(text, exit_code::wrongUse) {}
-
     explicit WrongUse(Message const& message) : CodedFailure(message, exit_code::wrongUse) {}
 };
 

@@ -44,7 +44,7 @@ bool CommandText::isAtWord() const noexcept {
 char CommandText::take() {
     auto const byte = text_[at_++];
     if (byte == '\0') {
-        fail(line_, "a zero byte cannot be part of a command");
+        fail(line_, "ZeroByte");
     }
     line_ += byte == '\n' ? 1 : 0;
     return byte;
@@ -88,7 +88,7 @@ std::string CommandText::takeWord() {
 
 void CommandText::takeEscaped(std::string& word) {
     if (isAtEnd()) {
-        fail(line_, "nothing follows the backslash");
+        fail(line_, "NothingBehindBackslash");
     }
     char const byte = take();
     if (byte != '\n') {
@@ -105,7 +105,7 @@ void CommandText::takeSingleQuoted(std::string& word) {
         }
         word += byte;
     }
-    fail(begin, "a single quote is not closed");
+    fail(begin, "SingleQuoteOpen");
 }
 
 void CommandText::takeDoubleQuoted(std::string& word) {
@@ -122,15 +122,15 @@ void CommandText::takeDoubleQuoted(std::string& word) {
             word += byte;
         }
     }
-    fail(begin, "a double quote is not closed");
+    fail(begin, "DoubleQuoteOpen");
 }
 
-void CommandText::fail(std::size_t line, std::string const& problem) {
-    throw WrongUse(ofLine(line) + problem);
+void CommandText::fail(std::size_t line, char const* problem) {
+    throw WrongUse(atLine(line, Message(problem).text()));
 }
 
-std::string ofLine(std::size_t number) {
-    return "line " + std::to_string(number) + ": ";
+Message atLine(std::size_t number, std::string const& problem) {
+    return Message("AtLine", std::to_string(number), problem);
 }
 
 } // namespace projectctl

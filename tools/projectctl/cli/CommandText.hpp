@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+#include "texts/Message.hpp"
+
 namespace projectctl {
 
 /// A text with one command per line, whose words are quoted as in a shell:
@@ -46,14 +48,14 @@ private:
     void takeEscaped(std::string& word);
     void takeSingleQuoted(std::string& word);
     void takeDoubleQuoted(std::string& word);
-    [[noreturn]] static void fail(std::size_t line, std::string const& problem);
+    [[noreturn]] static void fail(std::size_t line, char const* problem);
 
     std::string text_;
     std::size_t at_ = 0;
     std::size_t line_ = 1;
 };
 
-/// The beginning of an error about a line.
-std::string ofLine(std::size_t number);
+/// An error about a line.
+Message atLine(std::size_t number, std::string const& problem);
 
 } // namespace projectctl

@@ -15,7 +15,7 @@ namespace projectctl {
 void claimStandardInput() {
     static bool isClaimed = false;
     if (std::exchange(isClaimed, true)) {
-        throw WrongUse("standard input contains the batch, or paths for an earlier command");
+        throw WrongUse(Message("InputClaimed"));
     }
 }
 
@@ -28,7 +28,7 @@ std::string readFileOrInput(std::optional<std::string> const& file) {
     std::error_code error;
     std::ifstream stream(*file, std::ios::binary);
     if (!stream || std::filesystem::is_directory(*file, error)) {
-        throw Failure('"' + *file + "\" cannot be read");
+        throw Failure(Message("FileUnreadable", *file));
     }
     return {std::istreambuf_iterator<char>(stream), {}};
 }

@@ -11,7 +11,7 @@ fl::filesystem::Path workingFolder() {
     std::error_code error;
     auto const folder = std::filesystem::current_path(error);
     if (error) {
-        throw Failure("the working folder cannot be found: " + error.message());
+        throw Failure(Message("WorkingFolderMissing", error.message()));
     }
     return fl::filesystem::fromSystem(folder);
 }
@@ -23,7 +23,7 @@ void enterFolder(std::string const& folder) {
     std::error_code error;
     std::filesystem::current_path(folder, error);
     if (error) {
-        throw Failure("cannot change to the folder \"" + folder + "\": " + error.message());
+        throw Failure(Message("FolderNotEntered", folder, error.message()));
     }
 }
 

@@ -60,7 +60,7 @@ std::string typedCategory(TypedPlace const& place) {
             return found->second.back();
         }
     }
-    throw Failure("a label needs its category first");
+    throw Failure(Message("CompletionNeedsCategory"));
 }
 
 /// In the form CATEGORY=LABEL, the label is what is being typed.

@@ -26,7 +26,8 @@ bool isUsable(std::u16string const& name, std::vector<Named> const& things) {
     return !name.empty() && !name.starts_with(u'-') && std::ranges::count(things, name, &Named::name) == 1;
 }
 
-void addNamed(Candidates& candidates, std::vector<Named> const& things, std::string const& kind) {
+void addNamed(Candidates& candidates, std::vector<Named> const& things, char const* message) {
+    auto const kind = Message(message).text();
     for (auto const& [name, uuid] : things) {
         if (isUsable(name, things)) {
             candidates.add(bytesOf(name), kind);
@@ -47,18 +48,19 @@ void addCategories(Candidates& candidates, OpenProject& project) {
     auto categories = namesOf(project.manager().getLabelManager().getAllCategories());
     std::ranges::move(namesOf(project.personal().getLabelManager().getAllCategories()),
                       std::back_inserter(categories));
-    addNamed(candidates, sorted(std::move(categories)), "category");
+    addNamed(candidates, sorted(std::move(categories)), "CompletesCategory");
 }
 
 void addLabels(Candidates& candidates, OpenProject& project, std::string const& category) {
     auto const guard = project.store().acquireReadLock();
     LabelLayer const personal(project, true);
     auto& labels = LabelLayer(project, personal.hasCategory(category)).labels();
-    addNamed(candidates, sorted(namesOf(labels.getLabels(LabelNames(labels).category(category)))), "label");
+    addNamed(candidates, sorted(namesOf(labels.getLabels(LabelNames(labels).category(category)))),
+             "CompletesLabel");
 }
 
 void addEntryPointGroups(Candidates& candidates, OpenProject& project) {
-    addNamed(candidates, Groups(project.manager().getEntryPointManager()).names(), "group");
+    addNamed(candidates, Groups(project.manager().getEntryPointManager()).names(), "CompletesGroup");
 }
 
 void addEntryPoints(Candidates& candidates, OpenProject& project) {
@@ -72,7 +74,7 @@ void addEntryPoints(Candidates& candidates, OpenProject& project) {
 void addReferences(Candidates& candidates, OpenProject& project, ReferenceList const& list) {
     ShownPaths shown(project.root());
     for (auto const& reference : list.manager(project).getReferences()) {
-        candidates.add(bytesOf(shown.of(reference.getStoredPath())), "folder");
+        candidates.add(bytesOf(shown.of(reference.getStoredPath())), Message("CompletesFolder").text());
     }
 }
 
@@ -89,13 +91,13 @@ void addColorUses(Candidates& candidates) {
 
 void addEntryPointTypes(Candidates& candidates) {
     for (auto const& name : entryTypeNames()) {
-        candidates.add(bytesOf(name), "type of entry points");
+        candidates.add(bytesOf(name), Message("CompletesEntryType").text());
     }
 }
 
 void addDataTypes(Candidates& candidates) {
     project::management::LabelDataValidators().getValidator([&candidates](auto& validator) {
-        candidates.add(bytesOf(validator.getDataType()), "type of data");
+        candidates.add(bytesOf(validator.getDataType()), Message("CompletesDataType").text());
         return false; // all of them
     });
 }

@@ -30,7 +30,8 @@ void addPath(Candidates& candidates, std::u16string_view name, Kind kind) {
     path += path.empty() && name.starts_with(u'-') ? "./" : ""; // so that it is not an option
     appendBytes(path, name);
     bool const isFolder = kind == Kind::Folder;
-    candidates.add(path + (isFolder ? "/" : ""), isFolder ? "folder" : "file");
+    candidates.add(path + (isFolder ? "/" : ""),
+                   Message(isFolder ? "CompletesFolder" : "CompletesFile").text());
 }
 
 /// The entries of the project in the typed folder.

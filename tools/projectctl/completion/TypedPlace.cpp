@@ -54,7 +54,7 @@ private:
         auto const found =
             std::ranges::find_if(members, [&name](auto const* member) { return member->get_name() == name; });
         if (found == members.end()) {
-            throw Failure("unknown command \"" + name + '"');
+            throw Failure(Message("UnknownVerb", name));
         }
         place_.command = *found;
     }
@@ -71,7 +71,7 @@ private:
         auto* option = place_.command->get_option_no_throw(name);
         option = option != nullptr ? option : tool_.get_option_no_throw(name);
         if (option == nullptr) {
-            throw Failure("unknown option \"" + name + '"');
+            throw Failure(Message("UnknownOption", name));
         }
         return option;
     }

@@ -27,8 +27,7 @@ public:
         Groups const groups(entryPoints);
         auto const& group = groups.named(*group_);
         if (groups.isDefault(group)) {
-            throw Failure("the group " + inQuotes(group.getName()) +
-                          " is the default group; every project has it, and it cannot be deleted");
+            throw Failure(Message("DefaultGroup", group.getName()));
         }
         entryPoints.deleteEntryPointGroup(group);
         return 0;

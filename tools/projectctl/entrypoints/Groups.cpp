@@ -24,7 +24,7 @@ std::vector<Named> Groups::names() const {
 EntryPointGroup& Groups::named(std::string const& name) const {
     auto const known = names();
     std::u16string const wanted = textOf(name);
-    auto const chosen = choose(known, wanted, "entry point groups");
+    auto const chosen = choose(known, wanted, "SeveralGroups");
     if (!chosen) {
         auto const meant = nearest(wanted, known);
         throw Failure(meant ? Message("GroupMeant", wanted, *meant) : Message("GroupUnknown", wanted));

@@ -32,9 +32,7 @@ using ZEPHRA::project::management::FileNotInProject;
 void requireNoBackslash(Path const& root, Path const& file) {
     std::u16string const fromRoot = project::metadata::getRelativePath(root, file);
     if (fromRoot.find(u'\\') != std::u16string::npos) {
-        throw Failure(
-            "an entry point of " + inQuotes(fromRoot) +
-            " could not be found again because of the backslash in the path. Rename the file first");
+        throw Failure(Message("EntryWithBackslash", fromRoot));
     }
 }
 
@@ -102,7 +100,7 @@ private:
         for (auto const& pair : extensions_) {
             std::size_t const equals = pair.find('=');
             if (equals == std::string::npos) {
-                throw Failure('"' + pair + "\" is not an extension. Give it as KEY=VALUE");
+                throw Failure(Message("NotAnExtension", pair));
             }
             entry.setExtensionData(textOf(pair.substr(0, equals)), textOf(pair.substr(equals + 1)));
         }

@@ -34,8 +34,7 @@ public:
         project.requireInProject(file);
         auto const entry = project.manager().getEntryPointManager().getEntryPoint(file);
         if (entry->getUUID().empty()) {
-            throw Failure(inQuotes(std::u16string(ShownPaths(project.root()).ofAbsolute(file))) +
-                          " is not an entry point. 'projectctl entry set' creates one");
+            throw Failure(Message("NotAnEntryPoint", ShownPaths(project.root()).ofAbsolute(file)));
         }
         isJson_ ? writeJson(project.root(), *entry) : writeLines(*entry);
         return 0;

@@ -45,13 +45,13 @@ void CodeOwners::readLine(std::size_t number, std::string_view line) {
     Rule rule{number, CodeOwnersPattern(pattern), {}};
     for (auto word = takeWordOf(line); !word.empty() && word.front() != '#'; word = takeWordOf(line)) {
         if (!isCodeOwner(word)) {
-            badLines_.push_back({number, '"' + std::string(word) + "\" is not an owner"});
+            badLines_.push_back({number, Message("NotAnOwner", word)});
             return;
         }
         rule.owners.emplace_back(word);
     }
     if (pattern.front() == '!') {
-        badLines_.push_back({number, "a pattern cannot begin with an exclamation mark"});
+        badLines_.push_back({number, Message("PatternNegated")});
         return;
     }
     rules_.push_back(std::move(rule));

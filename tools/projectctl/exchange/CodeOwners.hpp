@@ -23,7 +23,7 @@ public:
     /// A line that is not a rule.
     struct BadLine {
         std::size_t line;
-        std::string problem;
+        Message problem;
     };
 
     explicit CodeOwners(std::string_view text);

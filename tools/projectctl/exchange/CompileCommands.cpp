@@ -143,7 +143,7 @@ private:
     std::string key_;
     std::vector<std::string> arguments_;
     std::vector<CompiledFile> entries_;
-    std::string problem_ = "it is not an array of objects";
+    std::string problem_ = Message("NotAnArray").text();
 };
 
 } // namespace
@@ -154,7 +154,7 @@ std::vector<CompiledFile> readCompileCommands(std::string_view text) {
     CountingIterator const begin(text.data(), line);
     CountingIterator const end(text.data() + text.size(), line);
     if (!nlohmann::json::sax_parse(begin, end, &reader) || !reader.isArray()) {
-        throw Failure("not a compilation database: " + reader.problem() + "; nothing was imported");
+        throw Failure(Message("NotCompilationDatabase", reader.problem()));
     }
     return reader.take();
 }

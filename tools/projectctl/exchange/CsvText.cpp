@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "cli/CommandText.hpp"
 #include "output/Failure.hpp"
 
 namespace projectctl {
@@ -10,8 +11,8 @@ namespace {
 
 constexpr std::string_view byteOrderMark = "\xEF\xBB\xBF";
 
-[[noreturn]] void failAt(std::size_t line, std::string const& problem) {
-    throw Failure("line " + std::to_string(line) + ": " + problem + "; nothing was imported");
+[[noreturn]] void failAt(std::size_t line, char const* problem) {
+    throw Failure(Message("NothingImported", atLine(line, Message(problem).text()).text()));
 }
 
 } // namespace
@@ -40,14 +41,14 @@ std::string CsvText::takeField() {
     if (rest_.starts_with('"')) {
         auto result = takeQuoted();
         if (!rest_.starts_with(',') && !isAtLineEnd()) {
-            failAt(line_, "text follows a field in quotes");
+            failAt(line_, "TextBehindQuotes");
         }
         return result;
     }
     std::string result;
     while (!rest_.starts_with(',') && !isAtLineEnd()) {
         if (rest_.front() == '"') {
-            failAt(line_, "a quote is in a field without quotes");
+            failAt(line_, "QuoteInField");
         }
         result += rest_.front();
         rest_.remove_prefix(1);
@@ -68,7 +69,7 @@ std::string CsvText::takeQuoted() {
         line_ += byte == '\n' ? 1 : 0;
         result += byte;
     }
-    failAt(begin, "a quote is not closed");
+    failAt(begin, "QuoteOpen");
 }
 
 bool CsvText::isAtLineEnd() const {

@@ -40,10 +40,9 @@ private:
         }
         auto const owner = bytesOf(row.label);
         if (kind == Kind::Folder) {
-            unmapped.add(0, inQuotes(row.path) + " is a folder: its owner would own everything below it");
+            unmapped.add(0, Message("FolderWithOwner", row.path));
         } else if (!isCodeOwner(owner)) {
-            unmapped.add(0, inQuotes(row.label) + ", the owner of " + inQuotes(row.path) +
-                                ", is not a user or an address");
+            unmapped.add(0, Message("OwnerUnknown", row.label, row.path));
         } else {
             owners_.push_back(owner);
         }
@@ -59,7 +58,7 @@ private:
             output().text() += *line;
             output().flushWhenLarge();
         } else {
-            unmapped.add(0, inQuotes(path_) + " has a line end, which no pattern can contain");
+            unmapped.add(0, Message("LineEndInPattern", path_));
         }
         owners_.clear();
     }

@@ -8,11 +8,11 @@ namespace projectctl {
 ImportedItem itemOf(FileRow const& row, std::size_t line, Path const& root) {
     auto const path = pathFromRoot(root, row.path);
     if (!path) {
-        throw Failure(inQuotes(row.path) + " is not a path below the root");
+        throw Failure(Message("NotAPath", row.path));
     }
     bool const hasLabel = !row.category.empty() || !row.label.empty();
     if (!hasLabel && !row.data.empty()) {
-        throw Failure("data needs a category and a label");
+        throw Failure(Message("DataWithoutLabel"));
     }
     ImportedItem result{line, *path};
     if (hasLabel) {

@@ -53,7 +53,7 @@ private:
                 return file;
             }
         }
-        throw Failure("there is no file CODEOWNERS in .github, the root or docs");
+        throw Failure(Message("CodeOwnersMissing"));
     }
 };
 

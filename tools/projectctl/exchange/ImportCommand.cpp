@@ -11,7 +11,7 @@ namespace projectctl {
 int ImportCommand::run(OpenProject& project) {
     auto const data = load(project);
     Unmapped unmapped(source(project));
-    Progress const progress("Importing");
+    Progress const progress(Message("ProgressImport"));
     ProjectTransaction transaction(project);
     auto const items = itemsIn(data, project, unmapped);
     ItemImport import(project, items, unmapped);
@@ -19,8 +19,7 @@ int ImportCommand::run(OpenProject& project) {
     project.changedFiles().listed += import.addedFiles();
     project.changedFiles().labelled += import.putLabels();
     if (dryRun_.end(transaction, project)) {
-        output().say(std::to_string(import.addedFiles()) + " files and folders added, " +
-                     std::to_string(import.putLabels()) + " labels put on files");
+        output().say(Message("Imported", import.addedFiles(), import.putLabels()));
     }
     return unmapped.report();
 }

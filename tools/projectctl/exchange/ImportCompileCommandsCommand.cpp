@@ -37,7 +37,7 @@ protected:
         std::map<std::string, ArgumentPaths> folders; // the entries share a few
         for (auto const& entry : readCompileCommands(data)) {
             if (entry.file.empty() || !entry.directory.starts_with('/')) {
-                unmapped.add(entry.line, "the entry has no file, or no absolute directory");
+                unmapped.add(entry.line, Message("EntryIncomplete"));
                 continue;
             }
             auto const folder = fl::filesystem::fromSystem(entry.directory);

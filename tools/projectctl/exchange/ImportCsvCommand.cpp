@@ -3,6 +3,7 @@
 #include <cstddef>
 #include <vector>
 
+#include "cli/CommandText.hpp"
 #include "exchange/CsvText.hpp"
 #include "exchange/FileRow.hpp"
 #include "exchange/ImportCommands.hpp"
@@ -21,22 +22,19 @@ public:
         for (std::size_t place = 0; place < count_; ++place) {
             auto const known = std::ranges::find(members, header.fields[place], &Member::name);
             if (known == members.end()) {
-                throw Failure("line " + std::to_string(header.line) + ": " +
-                              inQuotes(textOf(header.fields[place])) +
-                              " is not a column. The columns are path, category, label and data");
+                throw Failure(
+                    atLine(header.line, Message("ColumnUnknown", textOf(header.fields[place])).text()));
             }
             places_.push_back(known->field);
         }
         if (std::ranges::find(places_, &FileRow::path) == places_.end()) {
-            throw Failure("line " + std::to_string(header.line) +
-                          ": the first line must name the column path");
+            throw Failure(atLine(header.line, Message("ColumnPathMissing").text()));
         }
     }
 
     FileRow rowOf(CsvText::Record const& record) const {
         if (record.fields.size() != count_) {
-            throw Failure(std::to_string(record.fields.size()) + " fields instead of " +
-                          std::to_string(count_));
+            throw Failure(Message("FieldCount", record.fields.size(), count_));
         }
         FileRow result;
         for (std::size_t place = 0; place < count_; ++place) {
@@ -72,7 +70,7 @@ protected:
         CsvText text(data);
         auto const header = text.next();
         if (!header) {
-            throw Failure("the first line must name the column path");
+            throw Failure(Message("ColumnPathMissing"));
         }
         Columns const columns(*header);
         ImportedItems result;
@@ -80,7 +78,7 @@ protected:
             try {
                 result.push_back(itemOf(columns.rowOf(*record), record->line, project.root()));
             } catch (Failure const& problem) {
-                unmapped.add(record->line, problem.what());
+                unmapped.add(record->line, problem);
             }
         }
         return result;

@@ -24,12 +24,11 @@ protected:
         try {
             auto result = runGit(project.root(), {"ls-files", "-z", "--cached"});
             if (result.exitCode != 0) {
-                throw Failure("git cannot list its files: " +
-                              result.errors.substr(0, result.errors.find('\n')));
+                throw Failure(Message("GitListFails", result.errors.substr(0, result.errors.find('\n'))));
             }
             return std::move(result.output);
         } catch (std::system_error const& error) {
-            throw Failure("git cannot be run: " + std::string(error.what()));
+            throw Failure(Message("GitNotRun", error.what()));
         }
     }
 
@@ -49,7 +48,7 @@ protected:
             if (path && !project::metadata::isParent(*path, project.store().getMetadataRoot())) {
                 result.push_back({0, *path});
             } else if (!path) {
-                unmapped.add(0, inQuotes(textOf(name)) + " is not a path below the root");
+                unmapped.add(0, Message("NotAPath", textOf(name)));
             }
         }
         return result;

@@ -25,7 +25,7 @@ protected:
             try {
                 appendItem(result, rest.substr(0, end), number, project.root());
             } catch (Failure const& problem) {
-                unmapped.add(number, problem.what());
+                unmapped.add(number, problem);
             }
             rest.remove_prefix(std::min(end + 1, rest.size()));
         }

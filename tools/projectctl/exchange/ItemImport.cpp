@@ -34,10 +34,10 @@ bool isValidData(CategoryIdentifier const& category, std::u16string const& data)
 
 /// The only thing of a list that has a name; the end if there is none.
 template <typename Things>
-auto onlyNamed(Things const& things, std::u16string const& name, std::string const& kind) {
+auto onlyNamed(Things const& things, std::u16string const& name, char const* several) {
     auto const hasName = [&name](auto const& thing) { return thing.getName() == name; };
     if (std::ranges::count_if(things, hasName) > 1) {
-        throw Failure("several " + kind + " have the name " + inQuotes(name));
+        throw Failure(Message(several, name));
     }
     return std::ranges::find_if(things, hasName);
 }
@@ -61,12 +61,12 @@ void ItemImport::addFiles() {
         auto const [found, isNew] = problems_.try_emplace(item.path);
         if (isNew && !project_.files().isFileInProject(item.path)) {
             found->second = problemOf(item.path);
-            if (found->second.empty()) {
+            if (!found->second) {
                 added.push_back(item.path);
             }
         }
-        if (!found->second.empty()) {
-            unmapped_.add(item.line, found->second);
+        if (found->second) {
+            unmapped_.add(item.line, *found->second);
         }
     }
     addBelowLabelledFolders(project_, added);
@@ -75,19 +75,19 @@ void ItemImport::addFiles() {
 }
 
 /// The reason why a path cannot be added; empty if it can.
-std::string ItemImport::problemOf(Path const& path) const {
+std::optional<Message> ItemImport::problemOf(Path const& path) const {
     auto const& root = project_.root();
     if (!project::metadata::isParent(path, root)) {
-        return '"' + shown(path) + "\" is outside of the project's folder";
+        return Message("PathOutside", shown(path));
     }
     std::u16string const relative = project::metadata::getRelativePath(root, path);
     if (relative.starts_with(u"..")) {
-        return inQuotes(relative) + " begins with two dots";
+        return Message("PathWithDots", relative);
     }
     if (isWithin(path, project_.store().getMetadataRoot())) {
-        return inQuotes(relative) + " belongs to the project's store";
+        return Message("PathOfStore", relative);
     }
-    return isOnDisk(path) ? "" : inQuotes(relative) + " does not exist";
+    return isOnDisk(path) ? std::nullopt : std::optional(Message("PathMissing", relative));
 }
 
 void ItemImport::readLabels() {
@@ -97,11 +97,11 @@ void ItemImport::readLabels() {
         }
     }
     for (auto const& item : items_) {
-        if (item.label && problems_.at(item.path).empty()) {
+        if (item.label && !problems_.at(item.path)) {
             try {
                 readLabel(item, *item.label);
             } catch (Failure const& problem) {
-                unmapped_.add(item.line, problem.what());
+                unmapped_.add(item.line, problem);
             }
         }
     }
@@ -109,12 +109,11 @@ void ItemImport::readLabels() {
 
 void ItemImport::readLabel(ImportedItem const& item, ImportedLabel const& wanted) {
     if (item.path == project_.root()) {
-        throw Failure("the root of a project has no labels");
+        throw Failure(Message("LabelOfRoot"));
     }
     auto const& category = categoryNamed(wanted.category);
     if (!wanted.data.empty() && !isValidData(category, wanted.data)) {
-        throw Failure(inQuotes(wanted.data) + " is not data of the type " + inQuotes(category.getDataType()) +
-                      ", which the category " + inQuotes(category.getName()) + " has");
+        throw Failure(Message("DataInvalid", wanted.data, category.getDataType(), category.getName()));
     }
     auto const& label = labelNamed(category, wanted.label);
     if (takes(item, label, wanted.data)) {
@@ -131,7 +130,7 @@ ItemImport::Category const& ItemImport::categoryNamed(std::u16string const& name
     if (found == categories_.end()) {
         auto& labels = project_.manager().getLabelManager();
         auto const present = labels.getAllCategories();
-        auto const stored = onlyNamed(present, name, "categories");
+        auto const stored = onlyNamed(present, name, "ImportSeveralCategories");
         if (stored != present.end()) {
             return categories_.emplace(name, *stored).first->second;
         }
@@ -151,7 +150,7 @@ ItemImport::Label const& ItemImport::labelNamed(Category const& category, std::u
     if (found == labels_.end()) {
         auto& labels = project_.manager().getLabelManager();
         auto const present = labels.getLabels(category);
-        auto const stored = onlyNamed(present, name, "labels of the category");
+        auto const stored = onlyNamed(present, name, "ImportSeveralLabels");
         if (stored != present.end()) {
             return labels_.emplace(key, Label(category, *stored)).first->second;
         }
@@ -169,14 +168,13 @@ bool ItemImport::takes(ImportedItem const& item, Label const& label, std::u16str
     if (category.isSingleValued()) {
         auto const [found, isNew] = single_.try_emplace({item.path, category.getUUID()}, label.getUUID());
         if (found->second != label.getUUID()) {
-            throw Failure("the category " + inQuotes(category.getName()) +
-                          " allows one label per file, and an earlier item has another one");
+            throw Failure(Message("LabelContradicts", category.getName()));
         }
     }
     if (!data.empty()) {
         Key const key(category.getUUID(), label.getUUID());
         if (data_.try_emplace({item.path, key}, data).first->second != data) {
-            throw Failure("an earlier item has other data for this label of the file");
+            throw Failure(Message("DataContradicts"));
         }
     }
     auto const present = project_.files().getLabelIDSets(item.path);

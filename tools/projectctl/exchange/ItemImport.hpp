@@ -44,7 +44,7 @@ private:
     };
 
     void addFiles();
-    std::string problemOf(Path const& path) const;
+    std::optional<Message> problemOf(Path const& path) const;
     void readLabels();
     void readLabel(ImportedItem const& item, ImportedLabel const& wanted);
     Category const& categoryNamed(std::u16string const& name);
@@ -56,10 +56,10 @@ private:
     OpenProject& project_;
     ImportedItems const& items_;
     Unmapped& unmapped_;
-    std::map<Path, std::string> problems_;          ///< of the paths of all items; empty for none
-    std::set<std::u16string> withData_;             ///< names of the categories whose labels have data
-    std::map<std::u16string, Category> categories_; ///< by name
-    std::map<Key, Label> labels_;                   ///< by the category's UUID and the name
+    std::map<Path, std::optional<Message>> problems_; ///< of the paths of all items; empty for none
+    std::set<std::u16string> withData_;               ///< names of the categories whose labels have data
+    std::map<std::u16string, Category> categories_;   ///< by name
+    std::map<Key, Label> labels_;                     ///< by the category's UUID and the name
     std::map<std::pair<Path, std::u16string>, std::u16string>
         single_;                                          ///< label of a file, by single-valued category
     std::map<std::pair<Path, Key>, std::u16string> data_; ///< by file and UUIDs of the label

@@ -20,12 +20,12 @@ JsonTexts readJsonLine(std::string_view line) {
         if (isValid) {
             auto const text = project::stores::decodeJsonContent(name);
             if (!result.emplace(text, project::stores::decodeJsonContent(value)).second) {
-                throw Failure("the object has two members " + inQuotes(text));
+                throw Failure(Message("MemberTwice", text));
             }
         }
     }
     if (!isValid || !reader.expect('}') || !reader.end()) {
-        throw Failure("not an object whose members are texts: " + std::string(reader.problem()));
+        throw Failure(Message("NotAnObject", reader.problem()));
     }
     return result;
 }

@@ -76,7 +76,7 @@ void visitRows(OpenProject& project, Unmapped& unmapped, RowVisitor const& visit
                         file.kind);
                 isVisited = true;
             } else {
-                unmapped.add(0, inQuotes(file.path) + " has a label that was deleted, or that has no name");
+                unmapped.add(0, Message("LabelDeleted", file.path));
             }
         }
         if (!isVisited) {

@@ -7,14 +7,19 @@
 
 namespace projectctl {
 
-void Unmapped::add(std::size_t line, std::string reason) {
-    items_.push_back({line, std::move(reason)});
+void Unmapped::add(std::size_t line, Message const& reason) {
+    items_.push_back({line, reason.text()});
+}
+
+void Unmapped::add(std::size_t line, Failure const& reason) {
+    items_.push_back({line, reason.what()});
 }
 
 int Unmapped::report() {
     std::ranges::stable_sort(items_, {}, &Item::line);
     for (auto const& [line, reason] : items_) {
-        printError(source_ + ':' + (line > 0 ? std::to_string(line) + ": " : " ") + reason);
+        printError(line > 0 ? Message("UnmappedAt", source_, std::to_string(line), reason)
+                            : Message("Unmapped", source_, reason));
     }
     return isEmpty() ? exit_code::done : exit_code::finding;
 }

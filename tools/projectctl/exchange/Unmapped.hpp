@@ -5,6 +5,8 @@
 #include <utility>
 #include <vector>
 
+#include "output/Failure.hpp"
+
 namespace projectctl {
 
 /// The items of an import or export that have no counterpart on the other side.
@@ -14,7 +16,8 @@ public:
     explicit Unmapped(std::string source) : source_(std::move(source)) {}
 
     /// @param line of the source, from 1; 0 if it has none.
-    void add(std::size_t line, std::string reason);
+    void add(std::size_t line, Message const& reason);
+    void add(std::size_t line, Failure const& reason);
 
     bool isEmpty() const noexcept { return items_.empty(); }
 

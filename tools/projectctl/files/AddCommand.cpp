@@ -37,7 +37,7 @@ public:
 
     int run(OpenProject& project) override {
         auto const given = given_.read();
-        Progress progress("Reading folders");
+        Progress progress(Message("ProgressReadFolders"));
         auto const contents = isRecursive_ ? contentsOf(given, project, progress) : std::vector<Path>();
         add(project, given, contents, progress);
         return 0;
@@ -57,14 +57,14 @@ private:
         }
         std::ranges::copy_if(contents, std::back_inserter(added),
                              [&](Path const& path) { return !project.files().isFileInProject(path); });
-        progress.begin("Adding " + std::to_string(added.size()) + " files and folders");
+        progress.begin(Message("ProgressAdd", added.size()));
         addBelowLabelledFolders(project, added);
         project.stageReturnedLater(added);
         project.stageReturnedLater(skipped);
         project.changedFiles().listed += added.size();
         if (dryRun_.end(transaction, project)) {
-            output().say(std::to_string(added.size()) + " added to the project" +
-                         (skipped.empty() ? "" : ", " + std::to_string(skipped.size()) + " already in it"));
+            output().say(skipped.empty() ? Message("FilesAdded", added.size())
+                                         : Message("FilesAddedOrSkipped", added.size(), skipped.size()));
         }
     }
 

@@ -75,10 +75,9 @@ private:
 void reportUnaddable(DiskWalk const& walk, Path const& root) {
     auto const& unaddable = walk.unaddable();
     if (!unaddable.empty()) {
+        std::u16string const first(ShownPaths(root).ofAbsolute(unaddable.front()));
         std::size_t const others = unaddable.size() - 1;
-        printError("left out " + inQuotes(std::u16string(ShownPaths(root).ofAbsolute(unaddable.front()))) +
-                   (others > 0 ? " and " + std::to_string(others) + " more" : "") +
-                   ": a name that begins with two dots cannot be added from the project's root");
+        printError(others > 0 ? Message("LeftOutMore", first, others) : Message("LeftOut", first));
     }
 }
 
@@ -96,7 +95,7 @@ void addBelowLabelledFolders(OpenProject& project, std::vector<Path> const& adde
 void requireReadable(DiskWalk const& walk, std::vector<Path> const& paths) {
     for (auto const& [folder, problem] : walk.unreadable()) {
         if (std::ranges::count(paths, folder) > 0) {
-            throw Failure(problem + "; nothing was added");
+            throw Failure(Message("NothingAdded", problem));
         }
     }
 }
@@ -105,7 +104,7 @@ std::vector<Path> contentsToAdd(DiskWalk const& walk, Path const& root, bool lea
                                 Progress& progress) {
     auto found = walk.found();
     if (leavesOutIgnored) {
-        progress.begin("Asking git for ignored files");
+        progress.begin(Message("ProgressIgnored"));
         found = withoutIgnoredByGit(root, std::move(found));
     }
     requireReadable(walk, found);
@@ -115,12 +114,12 @@ std::vector<Path> contentsToAdd(DiskWalk const& walk, Path const& root, bool lea
 
 std::size_t addWholeTree(OpenProject& project) {
     auto const& root = project.root();
-    Progress progress("Reading folders");
+    Progress progress(Message("ProgressReadFolders"));
     DiskWalk walk(root, progress);
     walk.enter(root);
     bool const leavesOutIgnored = settings().sourceControl && isInGitRepository(root);
     auto const found = contentsToAdd(walk, root, leavesOutIgnored, progress);
-    progress.begin("Adding " + std::to_string(found.size()) + " files and folders");
+    progress.begin(Message("ProgressAdd", found.size()));
     ProjectTransaction transaction(project);
     project.files().add(found);
     project.stageReturnedLater(found);

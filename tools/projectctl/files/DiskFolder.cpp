@@ -68,7 +68,7 @@ std::u16string toText(std::string_view name) {
 
 [[noreturn]] void fail(Path const& folder, int error) {
     throw std::system_error(error, std::generic_category(),
-                            "the folder \"" + shown(folder) + "\" cannot be read");
+                            Message("FolderUnreadable", shown(folder)).text());
 }
 
 } // namespace

@@ -88,7 +88,7 @@ private:
             return std::nullopt;
         }
         if (*kind_ != "file" && *kind_ != "folder") {
-            throw WrongUse('"' + *kind_ + "\" is not a kind. The kinds are file and folder");
+            throw WrongUse(Message("KindUnknown", *kind_));
         }
         return *kind_ == "file" ? Kind::File : Kind::Folder;
     }

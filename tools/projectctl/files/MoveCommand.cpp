@@ -46,7 +46,7 @@ public:
         }
         try {
             auto const moves = project.move(sources, destination);
-            output().say(Message("Moved", moves.size()).text());
+            output().say(Message("Moved", moves.size()));
         } catch (project::session::MoveError const& error) {
             throw failureOf(error);
         }

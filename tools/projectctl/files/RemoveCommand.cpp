@@ -32,11 +32,11 @@ public:
             project); // first: the checks read the state in which the files are removed
         requireWithinRoot(project, paths);
         warnOfTrackedFiles(project, paths);
-        Progress const progress("Removing " + std::to_string(paths.size()) + " files and folders");
+        Progress const progress(Message("ProgressRemove", paths.size()));
         auto const removed = project.files().remove(paths);
         project.changedFiles().listed += removed.size();
         if (dryRun_.end(transaction, project)) {
-            output().say(std::to_string(removed.size()) + " removed from the project");
+            output().say(Message("FilesRemoved", removed.size()));
         }
         return 0;
     }
@@ -51,9 +51,7 @@ private:
         auto const guard = project.store().acquireReadLock();
         for (auto const& path : paths) {
             if (isOutside(path) && project.files().isFileInProject(path)) {
-                throw Failure('"' + shown(path) +
-                              "\" is outside the project's folder; nothing was removed. Delete its line from "
-                              "the project's text with an editor.");
+                throw Failure(Message("FileOutside", shown(path)));
             }
         }
     }
@@ -61,8 +59,7 @@ private:
     static void warnOfTrackedFiles(OpenProject& project, std::vector<Path> const& paths) {
         ShownPaths shown(project.root());
         for (auto const& path : project.trackedOutsideProject(paths)) {
-            printWarning(inQuotes(shown.ofAbsolute(path)) +
-                         " is below a removed folder but not in the project; git will no longer track it");
+            printWarning(Message("TrackedBelowRemoved", shown.ofAbsolute(path)));
         }
     }
 

@@ -42,14 +42,14 @@ std::string askGit(Path const& root, std::vector<std::string> const& arguments, 
         auto result = runGit(root, arguments, input);
         if (result.exitCode < 0 || result.exitCode > accepted) {
             std::string const line = result.errors.substr(0, result.errors.find('\n'));
-            throw Failure("git cannot list ignored files: " + (line.empty() ? "unknown error" : line));
+            throw Failure(Message("GitIgnoredFails", line.empty() ? Message("UnknownError").text() : line));
         }
         return std::move(result.output);
     } catch (std::system_error const& error) {
         if (error.code() == std::errc::no_such_file_or_directory) {
-            throw Failure("--gitignore needs git, which is not installed");
+            throw Failure(Message("GitMissing"));
         }
-        throw Failure("git cannot list ignored files: " + std::string(error.what()));
+        throw Failure(Message("GitIgnoredFails", error.what()));
     }
 }
 

@@ -75,7 +75,7 @@ std::string thisProgram() {
     std::error_code error;
     std::string program = std::filesystem::read_symlink("/proc/self/exe", error).string();
     if (error || !canBeRun(program)) {
-        throw Failure("git cannot be set up: the path of this program is unknown");
+        throw Failure(Message("ProgramUnknown"));
     }
     return program;
 }
@@ -83,7 +83,7 @@ std::string thisProgram() {
 void configure(Path const& folder, char const* key, std::string const& value) {
     auto const result = runGit(folder, {"config", "--replace-all", key, value});
     if (result.exitCode != 0) {
-        throw Failure("git cannot be set up: " + result.errors.substr(0, result.errors.find('\n')));
+        throw Failure(Message("GitNotSetUp", result.errors.substr(0, result.errors.find('\n'))));
     }
 }
 

@@ -12,12 +12,14 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "texts/Message.hpp"
+
 namespace projectctl {
 
 namespace {
 
-[[noreturn]] void fail(int error, std::string const& what) {
-    throw std::system_error(error, std::generic_category(), what);
+[[noreturn]] void fail(int error, Message const& what) {
+    throw std::system_error(error, std::generic_category(), what.text());
 }
 
 /// One end of a pipe, closed by the destructor.
@@ -54,7 +56,7 @@ struct Pipe {
 Pipe makePipe() {
     std::array<int, 2> ends{};
     if (pipe2(ends.data(), O_CLOEXEC) != 0) {
-        fail(errno, "a pipe cannot be created");
+        fail(errno, Message("PipeNotCreated"));
     }
     return {Descriptor(ends[0]), Descriptor(ends[1])};
 }
@@ -96,7 +98,7 @@ public:
         int const error =
             posix_spawnp(&child, arguments.front(), &actions_, &attributes_, arguments.data(), environ);
         if (error != 0) {
-            fail(error, "\"" + command.front() + "\" cannot be started");
+            fail(error, Message("ProgramNotStarted", command.front()));
         }
         return child;
     }
@@ -137,7 +139,7 @@ void exchange(Descriptor& toChild, std::string_view input, Descriptor& output, D
                                        {output.get(), POLLIN, 0},
                                        {errors.get(), POLLIN, 0}}};
         if (poll(waiting.data(), waiting.size(), -1) < 0 && errno != EINTR) {
-            fail(errno, "cannot wait for a program's output");
+            fail(errno, Message("OutputNotAwaited"));
         }
         if (waiting[0].revents != 0) {
             feed(toChild, input);
@@ -155,7 +157,7 @@ int waitFor(pid_t child) {
     int status = 0;
     while (waitpid(child, &status, 0) < 0) {
         if (errno != EINTR) {
-            fail(errno, "cannot wait for a program's end");
+            fail(errno, Message("EndNotAwaited"));
         }
     }
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
@@ -178,7 +180,7 @@ ProcessResult runWithInput(std::vector<std::string> const& command, std::string_
     auto output = makePipe();
     auto errors = makePipe();
     if (fcntl(toChild.writeEnd.get(), F_SETFL, O_NONBLOCK) != 0) {
-        fail(errno, "a pipe cannot be set up");
+        fail(errno, Message("PipeNotSetUp"));
     }
     auto const child =
         SpawnSettings(toChild.readEnd.get(), output.writeEnd.get(), errors.writeEnd.get()).spawn(command);

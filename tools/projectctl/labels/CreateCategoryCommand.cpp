@@ -34,7 +34,7 @@ public:
         auto const layer = layers_.forNew(project);
         layer.labels().createCategory(category);
         if (LabelLayer(project, !layer.isPersonal()).hasCategory(*name_)) {
-            printHint(Message("CategoryNowInBothLayers", *name_).text());
+            printHint(Message("CategoryNowInBothLayers", *name_));
         }
         return 0;
     }

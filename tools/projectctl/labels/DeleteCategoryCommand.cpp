@@ -24,7 +24,7 @@ public:
     }
 
     int run(OpenProject& project) override {
-        Progress const progress("Removing the labels of the category from all files");
+        Progress const progress(Message("ProgressDeleteCategory"));
         auto const layer = layers_.forChange(project, *category_);
         changeLabels(project, layer, [&] {
             LabelNames names(layer.labels());

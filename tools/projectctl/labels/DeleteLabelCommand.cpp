@@ -25,7 +25,7 @@ public:
     }
 
     int run(OpenProject& project) override {
-        Progress const progress("Removing the label from all files");
+        Progress const progress(Message("ProgressDeleteLabel"));
         auto const layer = layers_.forChange(project, *category_);
         changeLabels(project, layer, [&] {
             LabelNames names(layer.labels());

@@ -12,7 +12,7 @@ namespace projectctl {
 
 int FileLabelCommand::run(OpenProject& project) {
     auto const paths = paths_.read();
-    Progress const progress("Labelling " + std::to_string(paths.size()) + " files and folders");
+    Progress const progress(Message("ProgressLabels", paths.size()));
     auto const layer = layers_.forChange(project, *category_);
     if (layer.isPersonal() && !dryRun_.isOn()) { // without the lock of the project
         LabelLayer::Guard const guard(layer);
@@ -27,8 +27,8 @@ int FileLabelCommand::run(OpenProject& project) {
     return 0;
 }
 
-std::string FileLabelCommand::changeAll(OpenProject& project, LabelLayer const& layer,
-                                        std::vector<Path> const& paths) const {
+Message FileLabelCommand::changeAll(OpenProject& project, LabelLayer const& layer,
+                                    std::vector<Path> const& paths) const {
     for (auto const& path : paths) {
         project.requireInProject(path);
     }

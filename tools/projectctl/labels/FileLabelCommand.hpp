@@ -20,8 +20,8 @@ public:
 
 protected:
     /// @param paths all of them in the project. @return the confirmation of the change.
-    virtual std::string change(OpenProject& project, LabelLayer const& layer,
-                               std::vector<Path> const& paths) const = 0;
+    virtual Message change(OpenProject& project, LabelLayer const& layer,
+                           std::vector<Path> const& paths) const = 0;
 
     void declareArguments(CLI::App& app);
 
@@ -34,8 +34,7 @@ protected:
                                project::management::Label const& label);
 
 private:
-    std::string changeAll(OpenProject& project, LabelLayer const& layer,
-                          std::vector<Path> const& paths) const;
+    Message changeAll(OpenProject& project, LabelLayer const& layer, std::vector<Path> const& paths) const;
 
     std::optional<std::string> category_;
     std::optional<std::string> label_;

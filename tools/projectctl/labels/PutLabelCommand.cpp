@@ -20,8 +20,8 @@ public:
     }
 
 private:
-    std::string change(OpenProject& project, LabelLayer const& layer,
-                       std::vector<Path> const& paths) const override {
+    Message change(OpenProject& project, LabelLayer const& layer,
+                   std::vector<Path> const& paths) const override {
         auto const label = LabelNames(layer.labels()).label(category(), this->label());
         auto lacking = paths;
         std::erase_if(lacking, [&](Path const& path) { return countOn(layer, path, label) > 0; });
@@ -29,8 +29,8 @@ private:
         if (!layer.isPersonal()) { // git has no personal labels to restore
             project.changedFiles().labelled += lacking.size();
         }
-        return "put on " + std::to_string(lacking.size()) +
-               (replaced.empty() ? "" : ", replacing " + std::to_string(replaced.size()) + " others");
+        return replaced.empty() ? Message("LabelPut", lacking.size())
+                                : Message("LabelPutReplacing", lacking.size(), replaced.size());
     }
 };
 

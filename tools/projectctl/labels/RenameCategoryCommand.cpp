@@ -42,8 +42,7 @@ private:
         std::u16string const name = textOf(*name_);
         auto const count = std::ranges::count(categories, name, &CategoryIdentifier::getName);
         if (count > 1) {
-            printWarning(std::to_string(count) + " categories now have the name " + inQuotes(name) +
-                         "; only their UUIDs distinguish them");
+            printWarning(Message("CategoriesWithOneName", count, name));
         }
     }
 

@@ -21,8 +21,8 @@ public:
     }
 
 private:
-    std::string change(OpenProject& project, LabelLayer const& layer,
-                       std::vector<Path> const& paths) const override {
+    Message change(OpenProject& project, LabelLayer const& layer,
+                   std::vector<Path> const& paths) const override {
         auto const label = LabelNames(layer.labels()).labelEvenIfDeleted(category(), this->label());
         std::vector<Path> labelled;
         std::size_t most = 0;
@@ -38,7 +38,7 @@ private:
         if (!labelled.empty()) {
             layer.files().removeLabels(labelled, std::vector(most, label)); // each element removes one
         }
-        return "removed from " + std::to_string(labelled.size());
+        return Message("LabelTaken", labelled.size());
     }
 };
 

@@ -5,6 +5,7 @@
 
 #include "output/NameForms.hpp"
 #include "project/metadata/TreeSchema.hpp"
+#include "texts/Message.hpp"
 
 namespace projectctl {
 
@@ -34,93 +35,90 @@ std::u16string pathOf(MetadataPath const& address) {
     return result;
 }
 
-/// The noun for an entry of the definition. @param head the type of the first step. @param type of the last
-/// one.
-std::optional<std::string> nounFor(std::u16string_view head, std::u16string_view type) {
+/// The message that names an entry of the definition. @param head the type of the first step. @param type of
+/// the last one.
+std::optional<std::string> messageFor(std::u16string_view head, std::u16string_view type) {
     if (type == treeSchema::categories::categoryType) {
-        return "the category";
+        return "ConflictCategory";
     }
     if (type == treeSchema::categories::labelType) {
-        return "the label";
+        return "ConflictLabel";
     }
     if (head == treeSchema::entrypoints::entryPointsType) {
-        return "the entry point";
+        return "ConflictEntry";
     }
     if (head == treeSchema::entrypoints::groupsType) {
-        return "the entry point group";
+        return "ConflictGroup";
     }
     if (head == treeSchema::references::projectPathType) {
-        return "the reference in the project path";
+        return "ConflictPath";
     }
     if (head == treeSchema::references::referencesType) {
-        return "the reference in the referenced projects";
+        return "ConflictReference";
     }
     return std::nullopt;
 }
 
-std::string described(MetadataPath const& address) {
+Message described(MetadataPath const& address) {
     auto const& elements = address.getPath();
     auto const& leaf = address.leaf();
     std::u16string const head = elements.front().getType();
     if (head == treeSchema::files::filesType) {
-        std::string const file = "the file " + inQuotes(pathOf(address));
-        return leaf.getType() == treeSchema::files::fileType ? file : "the data of " + file;
+        bool const isFile = leaf.getType() == treeSchema::files::fileType;
+        return Message(isFile ? "ConflictFile" : "ConflictFileData", pathOf(address));
     }
     if (elements.size() > 1) {
-        if (auto const noun = nounFor(head, leaf.getType())) {
-            return *noun + ' ' + inQuotes(leaf.getLocation());
+        if (auto const message = messageFor(head, leaf.getType())) {
+            return Message(*message, leaf.getLocation());
         }
     }
-    std::string result = "the data at";
+    std::string steps;
     for (auto const& element : elements) {
-        result += ' ' + inQuotes(element.getType() + u' ' + element.getLocation());
+        steps += (steps.empty() ? "" : " ") + inQuotes(element.getType() + u' ' + element.getLocation());
     }
-    return result;
+    return Message("ConflictData", steps);
 }
 
-/// "the label "uuid" of the category "uuid" on" for a nested node; empty for the node itself.
-std::string describedNested(MergeConflict const& conflict) {
-    std::string result;
-    for (auto step = conflict.nested.rbegin(); step != conflict.nested.rend(); ++step) {
-        bool const isLabel = step->type == treeSchema::categories::labelType ||
-                             step->type == treeSchema::categories::categoryType;
-        std::string const noun = nounFor({}, step->type).value_or("the " + inQuotes(step->type));
-        result += noun + ' ' + inQuotes(step->value) +
-                  (isLabel && step + 1 != conflict.nested.rend() ? " of " : " on ");
+/// "the label "uuid" of the category "uuid" on the file ..." for a nested node; otherwise the node itself.
+std::string subjectOf(MergeConflict const& conflict) {
+    auto result = described(conflict.address).text();
+    for (auto const& step : conflict.nested) {
+        auto const message = messageFor({}, step.type);
+        auto const name =
+            message ? Message(*message, step.value) : Message("ConflictOther", step.type, step.value);
+        bool const isWithin = message && &step != &conflict.nested.front();
+        result = Message(isWithin ? "ConflictOf" : "ConflictOn", name.text(), result).text();
     }
     return result;
 }
 
 std::string changeBy(std::optional<std::u16string> const& value, MergeSide side) {
-    return value ? "set to " + inQuotes(*value) + " by " + wordFor(side)
-                 : std::string("removed by ") + wordFor(side);
-}
-
-std::string removedAndChanged(MergeConflict const& conflict) {
-    auto const removing = conflict.removedBy.value_or(MergeSide::Ours);
-    return std::string(" is removed by ") + wordFor(removing) + " and changed by " +
-           wordFor(otherThan(removing));
+    return (value ? Message("ConflictSet", *value, wordFor(side)) : Message("ConflictRemoved", wordFor(side)))
+        .text();
 }
 
 } // namespace
 
 std::string inWords(MergeConflict const& conflict) {
-    std::string const subject = describedNested(conflict) + described(conflict.address);
-    std::string const both = changeBy(conflict.values.ours, MergeSide::Ours) + " and " +
-                             changeBy(conflict.values.theirs, MergeSide::Theirs);
-    switch (conflict.kind) {
-    case MergeConflict::Kind::Key:
-        return "the " + inQuotes(conflict.key) + " of " + subject + " is " + both;
-    case MergeConflict::Kind::Type:
-        return "the type of " + subject + " is " + both;
-    case MergeConflict::Kind::Nested:
-        return subject + removedAndChanged(conflict);
-    case MergeConflict::Kind::Subtree:
-        break;
+    auto const subject = subjectOf(conflict);
+    auto const ours = changeBy(conflict.values.ours, MergeSide::Ours);
+    auto const theirs = changeBy(conflict.values.theirs, MergeSide::Theirs);
+    if (conflict.kind == MergeConflict::Kind::Key) {
+        return Message("ConflictOfKey", conflict.key, subject, ours, theirs).text();
     }
-    bool const isOther = !conflict.changed.empty() && conflict.changed.front() != conflict.address;
-    return subject + removedAndChanged(conflict) +
-           (isOther ? ", in " + described(conflict.changed.front()) : "");
+    if (conflict.kind == MergeConflict::Kind::Type) {
+        return Message("ConflictOfType", subject, ours, theirs).text();
+    }
+    auto const removing = conflict.removedBy.value_or(MergeSide::Ours);
+    auto const* const remover = wordFor(removing);
+    auto const* const changer = wordFor(otherThan(removing));
+    bool const isOther = conflict.kind == MergeConflict::Kind::Subtree && !conflict.changed.empty() &&
+                         conflict.changed.front() != conflict.address;
+    if (isOther) {
+        auto const place = described(conflict.changed.front()).text();
+        return Message("ConflictOfRemovalIn", subject, remover, changer, place).text();
+    }
+    return Message("ConflictOfRemoval", subject, remover, changer).text();
 }
 
 } // namespace projectctl

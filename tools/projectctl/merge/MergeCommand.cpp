@@ -38,7 +38,7 @@ public:
         try {
             return mergeFiles();
         } catch (std::exception const& error) {
-            printError(error.what());
+            printError(error);
             return failed;
         }
     }
@@ -51,7 +51,7 @@ private:
             project::stores::mergeTexts(contentOf(*base_), contentOf(*ours_), contentOf(*theirs_));
         replace(*ours_, merge.textWithMarkers());
         for (auto const& conflict : merge.conflicts()) {
-            printError("conflict in " + path_.value_or(*ours_) + ": " + inWords(conflict));
+            printError(Message("ConflictIn", path_.value_or(*ours_), inWords(conflict)));
         }
         return merge.conflicts().empty() ? 0 : 1;
     }
@@ -60,7 +60,7 @@ private:
         std::ifstream file(name, std::ios::binary);
         std::string result{std::istreambuf_iterator<char>(file), {}};
         if (!file) {
-            throw Failure('"' + name + "\" cannot be read");
+            throw Failure(Message("FileUnreadable", name));
         }
         return result;
     }
@@ -78,7 +78,7 @@ private:
         }
         if (!isWritten || error) {
             std::filesystem::remove(next, error);
-            throw Failure('"' + name + "\" cannot be written");
+            throw Failure(Message("FileUnwritable", name));
         }
     }
 

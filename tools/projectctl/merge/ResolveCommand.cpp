@@ -40,9 +40,7 @@ public:
 
     int run(OpenProject& project) override {
         if (project.log() != nullptr) {
-            throw Failure(
-                "a server stores the project: its changes are in one order, so there are no conflicts "
-                "to resolve");
+            throw Failure(Message("ResolveOfShared"));
         }
         auto const merge = mergeAgain(project.root());
         auto const choices = choose(merge.conflicts());
@@ -52,7 +50,7 @@ public:
         if (isJson_) {
             writeJson(merge.conflicts(), choices);
         }
-        output().say("The conflicts are resolved.");
+        output().say(Message("Resolved"));
         return 0;
     }
 
@@ -77,7 +75,7 @@ private:
         auto const our = version(root, ours);
         auto const their = version(root, theirs);
         if (!our || !their) {
-            throw Failure("git has no conflict of the project's text to resolve");
+            throw Failure(Message("NothingToResolve"));
         }
         return project::stores::mergeTexts(version(root, base).value_or(std::string()), *our, *their);
     }
@@ -91,8 +89,7 @@ private:
     static void stage(Path const& root) {
         auto const result = git(root, {"add", "--", textInRoot});
         if (result.exitCode != 0) {
-            throw Failure("the conflict is resolved, but the text cannot be staged: " +
-                          result.errors.substr(0, result.errors.find('\n')));
+            throw Failure(Message("ResolvedNotStaged", result.errors.substr(0, result.errors.find('\n'))));
         }
     }
 
@@ -100,7 +97,7 @@ private:
         try {
             return runGit(root, arguments);
         } catch (std::system_error const& error) {
-            throw Failure("the versions of the text cannot be read from git: " + std::string(error.what()));
+            throw Failure(Message("VersionsUnreadable", error.what()));
         }
     }
 
@@ -115,25 +112,23 @@ private:
             if (canAsk) {
                 result.push_back(ask(conflict, result.size() + 1, conflicts.size()));
             } else {
-                printError("conflict: " + inWords(conflict));
+                printError(Message("Conflict", inWords(conflict)));
             }
         }
         if (result.size() < conflicts.size()) {
-            throw Failure(
-                std::to_string(conflicts.size()) + (conflicts.size() == 1 ? " conflict" : " conflicts") +
-                " to resolve. Use --ours or --theirs, or call this on a terminal to choose for each");
+            throw Failure(Message("ConflictsLeft", conflicts.size()));
         }
         return result;
     }
 
     static MergeSide ask(MergeConflict const& conflict, std::size_t number, std::size_t total) {
-        output().text() += std::to_string(number) + " of " + std::to_string(total) + ": " +
-                           withoutControls(inWords(conflict), false) + ".\n";
+        auto const question = Message("ConflictOfTotal", number, total, inWords(conflict)).text();
+        output().text() += withoutControls(question, false) + '\n';
         for (std::string answer;;) {
-            output().text() += "Take ours or theirs (o or t; q quits and changes nothing)? ";
+            output().text() += Message("WhichSide").text() + ' ';
             output().flush();
             if (!std::getline(std::cin, answer) || answer == "q") {
-                throw Failure("nothing was changed");
+                throw Failure(Message("NothingChanged"));
             }
             if (answer == "o" || answer == "ours") {
                 return MergeSide::Ours;

@@ -18,15 +18,13 @@ public:
     int run() override {
         auto const root = findProjectRoot(workingFolder());
         if (isShared(root)) {
-            throw Failure(
-                "a server stores the project: git merges no text of it, so there is nothing to set up");
+            throw Failure(Message("SetupOfShared"));
         }
         if (mergeSetupOf(root) == MergeSetup::NoRepository) {
-            throw Failure("\"" + shown(root) +
-                          "\" is not in a git repository, so there is nothing to set up");
+            throw Failure(Message("NotInRepository", shown(root)));
         }
         setUpMerge(root);
-        output().say("git now merges the project's text with this tool.");
+        output().say(Message("MergeSetUp"));
         return 0;
     }
 };

@@ -9,8 +9,6 @@ namespace projectctl {
 /// An error that the tool itself detects. The text is one clause or sentence in UTF-8 for the user.
 class Failure : public std::runtime_error {
 public:
-    using std::runtime_error::runtime_error;
-
     explicit Failure(Message const& message) : std::runtime_error(message.text()) {}
 };
 

@@ -21,7 +21,7 @@ constexpr std::size_t bufferSize = std::size_t(64) * 1024;
 /// A message on standard error.
 struct Notice {
     std::string_view severity; ///< "error", "warning" or "hint"
-    std::string_view text;
+    std::string text;
     std::string_view code = {}; ///< empty unless the message ends the command
     int exitCode = 0;
 };
@@ -35,21 +35,33 @@ std::string jsonOf(Notice const& message) {
                   "\", \"exitCode\": " + std::to_string(message.exitCode);
     }
     result += ", \"text\": ";
-    appendJsonString(result, textOf(std::string(message.text)));
+    appendJsonString(result, textOf(message.text));
     return result + "}\n";
 }
 
-std::string lineOf(Notice const& message) {
-    auto const mark = message.severity == "error" ? std::string() : std::string(message.severity) + ": ";
-    return "projectctl: " + withoutControls(mark + std::string(message.text), false) + '\n';
+std::string beginOf(Notice const& message) {
+    if (message.severity == "error") {
+        return coloredError(Color::Fault, "projectctl:");
+    }
+    auto const* const mark = message.severity == "warning" ? "WarningMark" : "HintMark";
+    return coloredError(Color::Warning, "projectctl: " + Message(mark).text() + ':');
 }
 
-void print(Notice const& message) noexcept {
+std::string lineOf(Notice const& message) {
+    return beginOf(message) + ' ' + withoutControls(message.text, false) + '\n';
+}
+
+void print(Notice const& message) {
+    std::string const line = output().isJson() ? jsonOf(message) : lineOf(message);
+    [[maybe_unused]] auto const written = write(STDERR_FILENO, line.data(), line.size());
+}
+
+/// @param makeNotice creates the message. Without memory for it, the exit code is the only report.
+template <typename MakeNotice>
+void printUnlessMemoryIsMissing(MakeNotice makeNotice) noexcept {
     try {
-        std::string const line = output().isJson() ? jsonOf(message) : lineOf(message);
-        [[maybe_unused]] auto const written = write(STDERR_FILENO, line.data(), line.size());
+        print(makeNotice());
     } catch (...) {
-        // Without memory for the line, the exit code is the only report.
         return;
     }
 }
@@ -81,11 +93,11 @@ void Output::flushWhenLarge() {
     }
 }
 
-void Output::say(std::string_view line) {
+void Output::say(Message const& line) {
     if (isJson_ && !isSilent_) {
-        confirmation_ = line;
+        confirmation_ = line.text();
     } else if (isTerminal_ && !isSilent_ && !isQuiet_) {
-        text_ += withoutControls(line, false) + '\n';
+        text_ += withoutControls(line.text(), false) + '\n';
     }
 }
 
@@ -102,7 +114,7 @@ void Output::flush() {
         } else if (errno == EPIPE) {
             throw OutputClosed();
         } else if (errno != EINTR) {
-            throw Failure("the output cannot be written: " + std::generic_category().message(errno));
+            throw Failure(Message("OutputUnwritable", std::generic_category().message(errno)));
         }
     }
     text_.clear();
@@ -113,20 +125,24 @@ Output& output() {
     return standardOutput;
 }
 
-void printError(std::string_view text) noexcept {
-    print({"error", text});
+void printError(Message const& message) noexcept {
+    printUnlessMemoryIsMissing([&message] { return Notice{"error", message.text()}; });
 }
 
-void printWarning(std::string_view text) noexcept {
-    print({"warning", text});
+void printError(std::exception const& error) noexcept {
+    printUnlessMemoryIsMissing([&error] { return Notice{"error", error.what()}; });
 }
 
-void printHint(std::string_view text) noexcept {
-    print({"hint", text});
+void printFailure(std::exception const& error, std::string_view code, int exitCode) noexcept {
+    printUnlessMemoryIsMissing([&] { return Notice{"error", error.what(), code, exitCode}; });
 }
 
-void printFailure(std::string_view text, std::string_view code, int exitCode) noexcept {
-    print({"error", text, code, exitCode});
+void printWarning(Message const& message) noexcept {
+    printUnlessMemoryIsMissing([&message] { return Notice{"warning", message.text()}; });
+}
+
+void printHint(Message const& message) noexcept {
+    printUnlessMemoryIsMissing([&message] { return Notice{"hint", message.text()}; });
 }
 
 } // namespace projectctl

@@ -1,7 +1,10 @@
 #pragma once
 
+#include <exception>
 #include <string>
 #include <string_view>
+
+#include "texts/Message.hpp"
 
 namespace projectctl {
 
@@ -33,7 +36,7 @@ public:
     void flushWhenLarge();
 
     /// Appends a line that confirms a change, on a terminal only. With --json it is kept for confirmation().
-    void say(std::string_view line);
+    void say(Message const& line);
 
     /// From now on, say() appends nothing, and no progress is shown.
     void beQuiet() noexcept { isQuiet_ = true; }
@@ -87,16 +90,19 @@ Output& output();
 
 /// Writes "projectctl: " and the text to standard error, as one line: line feeds are escaped. With --json,
 /// writes a JSON document of one line.
-void printError(std::string_view text) noexcept;
+void printError(Message const& message) noexcept;
 
-/// The same with "warning: " in front of the text.
-void printWarning(std::string_view text) noexcept;
-
-/// The same with "hint: " in front of the text.
-void printHint(std::string_view text) noexcept;
+/// The same for the text of an error that does not end the command.
+void printError(std::exception const& error) noexcept;
 
 /// The same for the error that ends the command.
 /// @param code the word for its exit code.
-void printFailure(std::string_view text, std::string_view code, int exitCode) noexcept;
+void printFailure(std::exception const& error, std::string_view code, int exitCode) noexcept;
+
+/// The same with "warning: " in front of the text.
+void printWarning(Message const& message) noexcept;
+
+/// The same with "hint: " in front of the text.
+void printHint(Message const& message) noexcept;
 
 } // namespace projectctl

@@ -19,24 +19,13 @@ void draw(int descriptor, std::string_view text) {
     [[maybe_unused]] auto const written = write(descriptor, text.data(), text.size());
 }
 
-std::string withThousands(std::size_t number) {
-    std::string text = std::to_string(number);
-    for (std::size_t place = text.size(); place > 3;) {
-        place -= 3;
-        text.insert(place, 1, ',');
-    }
-    return text;
-}
-
 } // namespace
 
-Progress::Progress(std::string work) : descriptor_(STDERR_FILENO), work_(std::move(work)) {
+Progress::Progress(Message const& work)
+    : descriptor_(STDERR_FILENO), work_(isatty(descriptor_) == 1 ? work.text() : std::string()) {
     if (!output().isQuiet()) {
         start();
     }
-}
-
-Progress::Progress(Message const& work) : Progress(isatty(STDERR_FILENO) == 1 ? work.text() : std::string()) {
 }
 
 Progress::Progress(std::string work, int descriptor, Timing timing)
@@ -87,10 +76,12 @@ Progress*& Progress::shown() {
     return one;
 }
 
-void Progress::begin(std::string work) {
-    std::lock_guard const guard(mutex_);
-    work_ = std::move(work);
-    reach(0);
+void Progress::begin(Message const& work) {
+    if (drawing_.joinable()) {
+        std::lock_guard const guard(mutex_);
+        work_ = work.text();
+        reach(0);
+    }
 }
 
 void Progress::drawUntilStopped() {
@@ -106,11 +97,8 @@ void Progress::drawUntilStopped() {
 
 std::string Progress::line() {
     auto const count = count_.load(std::memory_order_relaxed);
-    auto result = std::string(clearLine) + work_;
-    if (count > 0) {
-        result += ": " + withThousands(count);
-    }
-    return result + " ...";
+    auto const text = count > 0 ? Message("ProgressCount", work_, count) : Message("ProgressWork", work_);
+    return std::string(clearLine) + text.text();
 }
 
 } // namespace projectctl

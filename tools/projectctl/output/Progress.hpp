@@ -23,10 +23,7 @@ public:
         std::chrono::milliseconds interval = std::chrono::milliseconds(200);
     };
 
-    /// @param work the first piece of work, for instance "Reading folders".
-    explicit Progress(std::string work);
-
-    /// The same with a text of the catalog, which is only read if the work is shown.
+    /// @param work the first piece of work. Its text is only read if it is shown.
     explicit Progress(Message const& work);
 
     /// @param descriptor the terminal to draw on; nothing is drawn if it is not a terminal.
@@ -36,7 +33,7 @@ public:
     Progress& operator=(Progress const&) = delete;
 
     /// Continues with another piece of work, with a count of 0.
-    void begin(std::string work);
+    void begin(Message const& work);
 
     /// Sets the count, which is shown if it is not 0. Cheap enough to call for each file.
     void reach(std::size_t count) noexcept { count_.store(count, std::memory_order_relaxed); }

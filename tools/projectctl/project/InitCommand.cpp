@@ -58,9 +58,8 @@ public:
             document.addText("name", name);
             document.finish();
         }
-        output().say("Created a project in \"" + shown(root) + "\". " +
-                     (addsTree_ ? std::to_string(added) + " files and folders were added."
-                                : "'projectctl add' adds files to it."));
+        output().say(addsTree_ ? Message("CreatedWithFiles", shown(root), added)
+                               : Message("Created", shown(root)));
         return 0;
     }
 
@@ -78,8 +77,7 @@ private:
     static Path chosenFolder(std::string const& argument) {
         auto folder = fl::filesystem::canonical(fl::filesystem::fromSystem(argument), workingFolder());
         if (argument.empty() || !project::metadata::is_directory(folder)) {
-            throw Failure("there is no folder \"" + shown(fl::filesystem::fromSystem(argument)) +
-                          "\". Create it first.");
+            throw Failure(Message("NoSuchFolder", shown(fl::filesystem::fromSystem(argument))));
         }
         return folder;
     }
@@ -91,7 +89,7 @@ private:
         }
         if (trace != ProjectTrace::None) {
             findProjectRoot(root); // throws if the text is missing
-            throw Failure("there is already a project in \"" + shown(root) + '"');
+            throw Failure(Message("ProjectExists", shown(root)));
         }
     }
 

@@ -66,14 +66,14 @@ Label LabelNames::labelEvenIfDeleted(std::string const& category, std::string co
 
 std::optional<CategoryIdentifier> LabelNames::find(std::u16string const& category) {
     auto const categories = labels_.getAllCategories();
-    auto const chosen = choose(namesOf(categories), category, "categories");
+    auto const chosen = choose(namesOf(categories), category, "SeveralCategories");
     return chosen ? std::optional(categories[*chosen]) : std::nullopt;
 }
 
 std::optional<LabelIdentifier> LabelNames::find(CategoryIdentifier const& category,
                                                 std::u16string const& label) {
     auto const labels = labels_.getLabels(category);
-    auto const chosen = choose(namesOf(labels), label, "labels of the category");
+    auto const chosen = choose(namesOf(labels), label, "SeveralLabels");
     return chosen ? std::optional(labels[*chosen]) : std::nullopt;
 }
 

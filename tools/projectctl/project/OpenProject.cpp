@@ -104,7 +104,7 @@ void OpenProject::stageReturned() {
 
 void OpenProject::showHint() const {
     if (hint_) {
-        printHint(hint_->text());
+        printHint(*hint_);
     }
 }
 
@@ -120,22 +120,20 @@ void OpenProject::reportRecoveredMoves() {
                        first.to)
                    .text());
     for (auto const& move : recovered->left) {
-        printError(Message("MoveLeft", move.from, move.to).text());
+        printError(Message("MoveLeft", move.from, move.to));
     }
 }
 
 void OpenProject::warnOfUnfinishedMove() {
     if (session_.hasUnfinishedMove()) {
-        printError(Message("MoveUnfinished").text());
+        printError(Message("MoveUnfinished"));
     }
 }
 
 void OpenProject::warnOfReset() {
     auto const loss = log() == nullptr ? std::nullopt : log()->historyLoss();
     if (loss && loss->kind == HistoryLoss::Kind::Reset) {
-        printWarning("the server was reset to an earlier state: version " + std::to_string(loss->seen) +
-                     " was seen here, and the newest one is now " + std::to_string(loss->found) +
-                     ". 'projectctl shared status' accepts that.");
+        printWarning(Message("ServerReset", std::to_string(loss->seen), std::to_string(loss->found)));
     }
 }
 
@@ -163,8 +161,7 @@ void OpenProject::warnOfFaults() {
         }
     }
     if (count > 0) {
-        printWarning(first + (count > 1 ? ", and " + std::to_string(count - 1) + " more" : "") +
-                     ". 'projectctl check' shows all faults.");
+        printWarning(count > 1 ? Message("TextFaults", first, count - 1) : Message("TextFault", first));
     }
 }
 

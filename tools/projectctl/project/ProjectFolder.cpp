@@ -88,14 +88,11 @@ Path findProjectRoot(Path const& folder) {
         }
         if (trace == ProjectTrace::TextMissing) {
             throw StoreError(StoreError::Kind::Damaged, shown(TextBackend::textPath(here)), 0,
-                             "the project's text is missing",
-                             "Restore it, for instance from source control, or delete its folder to start "
-                             "again.");
+                             Message("TextMissing").text(), Message("TextMissingAdvice").text());
         }
         auto above = project::metadata::getParentFolder(here);
         if (above == here) {
-            throw Failure("no project in \"" + shown(folder) +
-                          "\" or a folder above it. 'projectctl init' creates one.");
+            throw Failure(Message("ProjectMissing", shown(folder)));
         }
         here = std::move(above);
     }

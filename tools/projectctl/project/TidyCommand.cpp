@@ -16,13 +16,12 @@ public:
         Progress const progress(Message("ProgressTidy"));
         project.shield().raise();
         if (auto* const log = project.log()) {
-            output().say(log->tidy() ? "The log begins with a new body."
-                                     : "The newest entry is a body already.");
+            output().say(Message(log->tidy() ? "LogTidied" : "LogIsTidy"));
         } else if (project.text().tidy()) {
             project.stageLater();
-            output().say("The project's text was tidied.");
+            output().say(Message("TextTidied"));
         } else {
-            output().say("The project's text is already tidy.");
+            output().say(Message("TextIsTidy"));
         }
         return 0;
     }

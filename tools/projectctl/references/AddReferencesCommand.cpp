@@ -34,7 +34,7 @@ public:
         std::vector<FolderReference> references;
         for (auto const& folder : absolutePaths(arguments_)) {
             if (!project::metadata::is_directory(folder)) {
-                throw Failure('"' + shown(folder) + "\" is not a folder");
+                throw Failure(Message("NotAFolder", shown(folder)));
             }
             references.push_back(isAbsolute_ ? project::management::absoluteFolderReference(folder)
                                              : relativeReference(folder, project.root()));
@@ -48,10 +48,8 @@ private:
     FolderReference relativeReference(Path const& folder, Path const& root) const {
         auto result = project::management::relativeFolderReference(folder, root);
         if (project::metadata::getRelativePath(root, result.getLocation()) != result.getStoredPath()) {
-            throw Failure('"' + shown(folder) +
-                          "\" could not be found again because of the backslash in its path. " +
-                          (list_.isOfProjects ? "Rename the folder, or add it with --absolute"
-                                              : "Rename the folder first"));
+            throw Failure(
+                Message(list_.isOfProjects ? "ProjectWithBackslash" : "FolderWithBackslash", shown(folder)));
         }
         return result;
     }

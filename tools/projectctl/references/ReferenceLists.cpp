@@ -15,7 +15,7 @@ ReferenceList const& projectPath() {
         [](OpenProject& project) -> project::management::FolderReferenceManager& {
             return project.manager().getProjectPathManager().getFolderReferenceManager();
         },
-        referenceSchema::projectPathType, "the project path", false};
+        referenceSchema::projectPathType, false};
     return list;
 }
 
@@ -24,7 +24,7 @@ ReferenceList const& projectReferences() {
         [](OpenProject& project) -> project::management::FolderReferenceManager& {
             return project.manager().getProjectReferenceManager().getFolderReferenceManager();
         },
-        referenceSchema::referencesType, "the referenced projects", true};
+        referenceSchema::referencesType, true};
     return list;
 }
 

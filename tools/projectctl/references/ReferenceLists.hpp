@@ -1,6 +1,5 @@
 #pragma once
 
-#include <string>
 #include <string_view>
 
 #include "project/OpenProject.hpp"
@@ -12,7 +11,6 @@ namespace projectctl {
 struct ReferenceList {
     project::management::FolderReferenceManager& (*manager)(OpenProject& project);
     std::u16string_view head; ///< type of the first step of its addresses
-    std::string name;         ///< for messages: "the project path"
     bool isOfProjects; ///< true: folders of projects, relative or absolute; false: folders, relative only
 };
 

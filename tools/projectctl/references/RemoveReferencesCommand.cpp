@@ -66,7 +66,7 @@ private:
             });
         }
         if (result.empty()) {
-            throw Failure(inQuotes(text) + " is not among the folders of " + list_.name);
+            throw Failure(Message(list_.isOfProjects ? "NotReferenced" : "NotInProjectPath", text));
         }
         return result;
     }

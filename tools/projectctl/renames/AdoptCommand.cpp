@@ -50,7 +50,7 @@ public:
         std::ranges::transform(moves, std::back_inserter(files), &Move::to);
         project.stageReturnedLater(files);
         if (dryRun_.end(transaction, project)) {
-            output().say(Message("Adopted", moves.size()).text());
+            output().say(Message("Adopted", moves.size()));
         }
         return 0;
     }
@@ -79,10 +79,10 @@ private:
             }
         }
         if (guesses > 0) {
-            printError(Message("GuessesLeft", guesses).text());
+            printError(Message("GuessesLeft", guesses));
         }
         if (!renames.ambiguous.empty()) {
-            printError(Message("AmbiguousLeft", renames.ambiguous.size()).text());
+            printError(Message("AmbiguousLeft", renames.ambiguous.size()));
         }
         return result;
     }

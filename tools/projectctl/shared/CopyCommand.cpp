@@ -59,7 +59,7 @@ private:
     void fill(std::string const& text) const {
         JournalBackend(server_->open(location_.project)).replace(text);
         if (JournalBackend(server_->open(location_.project)).text() != text) {
-            throw Failure("the server does not return the definition as it was stored");
+            throw Failure(Message("ServerReturnsOther"));
         }
     }
 
@@ -90,11 +90,10 @@ public:
     int run(OpenProject& project) override {
         bool const isToText = *target_ == "text";
         if (isToText == (project.log() == nullptr)) {
-            throw Failure(isToText ? "the project is stored in a text already"
-                                   : "a server stores the project already. Copy it to a text first");
+            throw Failure(Message(isToText ? "StoredInText" : "StoredOnServer"));
         }
         if (isToText && (reader_ || writer_)) {
-            throw Failure("a text has no roles");
+            throw Failure(Message("TextHasNoRoles"));
         }
         project.shield().raise();
         isToText ? copyToText(project) : copyToServer(project);
@@ -118,15 +117,14 @@ private:
         auto const files = project::stores::replaceTextByLocation(*disk, copy.location());
         copy.keep();
         project.stageReplaced(files);
-        output().say(
-            "The server stores the project. The text was set aside as .projectdata/project.jsonl.old.");
+        output().say(Message("CopiedToServer"));
     }
 
     static void copyToText(OpenProject& project) {
         auto const text = project.log()->text();
         auto const files = project::stores::replaceLocationByText(*diskOf(project), text);
         project.stageReplaced(files);
-        output().say("The project is stored in a text. The project on the server was not changed.");
+        output().say(Message("CopiedToText"));
     }
 
     std::optional<std::string> target_;

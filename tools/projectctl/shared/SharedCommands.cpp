@@ -22,9 +22,7 @@ std::unique_ptr<Command> makeSharedCommand() {
 
 project::stores::JournalBackend& requireLog(OpenProject& project) {
     if (project.log() == nullptr) {
-        throw Failure(
-            "the project is not shared: it is stored in a text. 'projectctl copy --to SERVICE' copies it to "
-            "a server");
+        throw Failure(Message("NotShared"));
     }
     return *project.log();
 }

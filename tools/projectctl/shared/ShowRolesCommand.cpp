@@ -30,7 +30,7 @@ public:
         auto const found =
             std::ranges::find(projects, location->project, &project::stores::SharedProject::id);
         if (found == projects.end()) {
-            throw Failure("the project is not on the server, or the user has no role of it");
+            throw Failure(Message("ProjectNotOnServer"));
         }
         show("reader", found->reader, *server);
         show("writer", found->writer, *server);

@@ -31,7 +31,7 @@ public:
         show("body", std::to_string(status.bodySize) + " bytes");
         show("tail", std::to_string(status.tailSize) + " bytes");
         for (auto const& fault : log.faults()) {
-            printError(log.journal().name() + ": " + fault.problem);
+            printError(Message("FaultIn", log.journal().name(), fault.problem));
         }
         auto const loss = log.takeHistoryLoss();
         if (loss) {
@@ -50,14 +50,10 @@ private:
     }
 
     static void show(HistoryLoss const& loss) {
-        std::string const versions = "version " + std::to_string(loss.seen) +
-                                     " was seen here, and the newest one is now " +
-                                     std::to_string(loss.found);
         if (loss.kind == HistoryLoss::Kind::Reset) {
-            printError("the server was reset to an earlier state: " + versions +
-                       ". This is accepted from now on; later changes are lost unless a backup has them");
+            printError(Message("ServerResetAccepted", std::to_string(loss.seen), std::to_string(loss.found)));
         } else {
-            show("history", "older entries were deleted by the owner");
+            show("history", Message("HistoryDeleted").text());
         }
     }
 };

@@ -24,11 +24,10 @@ public:
     int run(OpenProject& project) override {
         auto& log = requireLog(project);
         project.shield().raise();
-        output().say(log.tidy() ? "The log has a new body." : "The newest entry is a body already.");
+        output().say(Message(log.tidy() ? "LogTidied" : "LogIsTidy"));
         if (days_) {
             auto const deleted = log.deleteHistory(firstKept(log.journal()));
-            output().text() +=
-                "deleted " + std::to_string(deleted) + (deleted == 1 ? " entry\n" : " entries\n");
+            output().text() += Message("LogEntriesDeleted", deleted).text() + '\n';
         }
         return 0;
     }

@@ -39,7 +39,7 @@ public:
         project.refresh(); // the current state is not a change
         EventLines const lines(project, json_);
         lines.writeReady();
-        output().say("Waiting for changes. Press Ctrl-C to stop.");
+        output().say(Message("Watching"));
         output().flush();
         for (;;) {
             awaitChange(project);
@@ -59,9 +59,8 @@ private:
         auto const events = std::exchange(output().text(), {});
         int const exitCode = runVisibly({"/bin/sh", "-c", *command_}, events);
         if (exitCode != 0) {
-            printWarning("the command of --exec has failed" +
-                         (exitCode < 0 ? std::string(" with a signal")
-                                       : " with the exit code " + std::to_string(exitCode)));
+            printWarning(exitCode < 0 ? Message("ExecKilled")
+                                      : Message("ExecFailed", std::to_string(exitCode)));
         }
     }
 
@@ -78,7 +77,7 @@ private:
         } catch (project::stores::StoreError const& error) {
             if (lastProblem_ != error.what()) {
                 lastProblem_ = error.what();
-                printError(lastProblem_);
+                printError(error);
             }
             if (!isText) {
                 std::this_thread::sleep_for(pauseAfterError);

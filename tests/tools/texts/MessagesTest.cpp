@@ -1,0 +1,107 @@
+#include <map>
+#include <regex>
+#include <set>
+
+#include "support/GlobalLocale.hpp"
+#include "texts/Message.hpp"
+#include "tools/texts/CatalogSource.hpp"
+
+namespace project::test {
+namespace {
+
+using projectctl::Message;
+using ::testing::HasSubstr;
+using ::testing::IsEmpty;
+
+/// The message with an argument in each place, which the text must show.
+std::string formatted(std::string const& key, std::size_t count) {
+    switch (count) {
+    case 0:
+        return Message(key).text();
+    case 1:
+        return Message(key, 71).text();
+    case 2:
+        return Message(key, 71, 72).text();
+    case 3:
+        return Message(key, 71, 72, 73).text();
+    case 4:
+        return Message(key, 71, 72, 73, 74).text();
+    default:
+        ADD_FAILURE() << key << " has too many arguments for this test";
+        return {};
+    }
+}
+
+class Messages : public ::testing::TestWithParam<char const*> {};
+
+TEST_P(Messages, showTheirArguments) {
+    GlobalLocale const locale(GetParam());
+    for (auto const& [key, pattern] : readTexts("messages", "root")) {
+        auto const count = argumentsOf(pattern).size();
+        auto const text = formatted(key, count);
+        EXPECT_FALSE(text.empty() || text == key) << key;
+        EXPECT_EQ(text.find_first_of("{}"), std::string::npos) << key << ": " << text;
+        for (std::size_t argument = 0; argument < count; ++argument) {
+            EXPECT_THAT(text, HasSubstr(std::to_string(71 + argument))) << key;
+        }
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(InBothLanguages, Messages, ::testing::Values("en", "de"));
+
+/// The sources of the tool, by their paths.
+std::map<std::string, std::string> sources() {
+    std::map<std::string, std::string> result;
+    for (auto const& entry : std::filesystem::recursive_directory_iterator(PROJECTCTL_SOURCES)) {
+        if (entry.path().extension() == ".cpp" || entry.path().extension() == ".hpp") {
+            std::ifstream file(entry.path(), std::ios::binary);
+            result[entry.path().lexically_relative(PROJECTCTL_SOURCES).string()] = {
+                std::istreambuf_iterator<char>(file), {}};
+        }
+    }
+    return result;
+}
+
+std::set<std::string> matchesIn(std::string const& text, std::regex const& expression) {
+    return {std::sregex_token_iterator(text.begin(), text.end(), expression, 1),
+            std::sregex_token_iterator()};
+}
+
+TEST(MessageKeys, ofTheSourcesAreInTheCatalogAndNoOthers) {
+    static std::regex const used(R"re(Message\(\s*"(\w+)"\s*[,)])re");
+    static std::regex const word(R"re("([A-Z]\w+)")re");
+    auto const texts = readTexts("messages", "root");
+    std::set<std::string> words;
+    for (auto const& [path, source] : sources()) {
+        for (auto const& key : matchesIn(source, used)) {
+            EXPECT_TRUE(texts.contains(key)) << path << ": " << key;
+        }
+        words.merge(matchesIn(source, word));
+    }
+    for (auto const& [key, text] : texts) {
+        bool const isComposed = key.starts_with("ExitCode") || key.starts_with("Unknown") ||
+                                key.starts_with("UnexpectedArgument"); // from a word and a number or "Meant"
+        EXPECT_TRUE(isComposed || words.contains(key)) << key << " is not used";
+    }
+}
+
+/// Texts of at least three words are for people. Those of programs are listed here.
+TEST(Sentences, areInTheCatalogsOnly) {
+    static std::regex const comment(R"(//[^\n]*)");
+    static std::regex const sentence(
+        R"re("((?:[^"\\\n]|\\.)*[A-Za-z]{2,} [a-z]{2,} [a-z]{2,}(?:[^"\\\n]|\\.)*)")re");
+    std::set<std::string> const ofPrograms{
+        "git/MergeSetup.cpp",    // the configuration of git
+        "manual/ManualPage.cpp", // mdoc
+        "manual/GuidePage.cpp",  // a page in English
+        "manual.cpp",            // a program of the build
+    };
+    for (auto const& [path, source] : sources()) {
+        if (!ofPrograms.contains(path)) {
+            EXPECT_THAT(matchesIn(std::regex_replace(source, comment, ""), sentence), IsEmpty()) << path;
+        }
+    }
+}
+
+} // namespace
+} // namespace project::test
