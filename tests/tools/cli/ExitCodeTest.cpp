@@ -33,7 +33,7 @@ TEST(ExitCode, isThatOfBusyForALockedIndex) {
 }
 
 TEST(ExitCode, isOneForAnyOtherError) {
-    EXPECT_EQ(exitCodeFor(projectctl::Failure("no")), 1);
+    EXPECT_EQ(exitCodeFor(projectctl::Failure(projectctl::Message("EmptyPath"))), 1);
     EXPECT_EQ(exitCodeFor(std::bad_alloc()), 1);
 }
 

@@ -54,6 +54,7 @@ TEST_F(Pager, getsTheOptionsOfLessUnlessTheyAreSet) {
 }
 
 TEST_F(Pager, doesNotChangeTheExitCodeOrTheError) {
+    settings_.environment["NO_COLOR"] = "1";
     auto const result = tool({"list", "missing"});
     EXPECT_EQ(result.exitCode, 1);
     EXPECT_THAT(result.output, HasSubstr("projectctl: "));

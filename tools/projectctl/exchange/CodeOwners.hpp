@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "exchange/CodeOwnersPattern.hpp"
+#include "texts/Message.hpp"
 
 namespace projectctl {
 

@@ -12,6 +12,7 @@
 #include "exchange/Unmapped.hpp"
 #include "project/OpenProject.hpp"
 #include "project/labels/Label.hpp"
+#include "texts/Message.hpp"
 
 namespace projectctl {
 

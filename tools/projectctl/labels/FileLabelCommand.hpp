@@ -10,6 +10,7 @@
 #include "project/LayerOptions.hpp"
 #include "project/ProjectCommand.hpp"
 #include "project/labels/Label.hpp"
+#include "texts/Message.hpp"
 
 namespace projectctl {
 
