@@ -215,6 +215,23 @@ TEST_F(ImportCommand, putsTheOwnersOfTheLastPatternOnFiles) {
     EXPECT_THAT(tool({"label", "show", "docs"}), SucceedsSilently());
 }
 
+TEST_F(ImportCommand, ofTheSameFilesTargetsAndOwnersChangesNothing) {
+    git({"init", "-q"});
+    folder_.addFile("src/new.cpp");
+    git({"add", "a", "src"});
+    folder_.addFile("CODEOWNERS", "* @all\n/src/ @src ann@x.org\n");
+    folder_.addFile("compile_commands.json",
+                    "[{\"directory\": \"" + folder_.onDisk().string() +
+                        "\", \"file\": \"src/new.cpp\", \"output\": \"obj/new.o\"}]");
+
+    for (auto const* const form : {"git", "compile-commands", "codeowners"}) {
+        auto const before = readText();
+        EXPECT_THAT(tool({"import", form}), SucceedsSilently()) << form;
+        EXPECT_NE(readText(), before) << form;
+        expectNoFurtherChange({"import", form}, {});
+    }
+}
+
 TEST_F(ImportCommand, keepsTheLabelsOfFoldersAboveAddedFiles) {
     folder_.addFile("dir/one");
     folder_.addFile("dir/two");

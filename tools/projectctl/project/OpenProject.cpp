@@ -117,16 +117,15 @@ void OpenProject::reportRecoveredMoves() {
     bool const isCompleted = recovered->outcome == RecoveredMoves::Outcome::Completed;
     auto const& first = recovered->moves.front();
     printError(Message(isCompleted ? "MoveCompleted" : "MoveRolledBack", recovered->moves.size(), first.from,
-                       first.to)
-                   .text());
+                       first.to));
     for (auto const& move : recovered->left) {
-        printError(Message("MoveLeft", move.from, move.to));
+        printWarning(Message("MoveLeft", move.from, move.to));
     }
 }
 
 void OpenProject::warnOfUnfinishedMove() {
     if (session_.hasUnfinishedMove()) {
-        printError(Message("MoveUnfinished"));
+        printWarning(Message("MoveUnfinished"));
     }
 }
 
