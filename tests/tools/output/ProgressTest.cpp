@@ -74,7 +74,8 @@ TEST(Progress, showsTheNextTask) {
 
     progress.begin(projectctl::Message("ProgressAdd", 3));
 
-    EXPECT_THAT(terminal.read(longEnough, "Adding 3 files and folders ..."), EndsWith("Adding 3 files and folders ..."));
+    EXPECT_THAT(terminal.read(longEnough, "Adding 3 files and folders ..."),
+                EndsWith("Adding 3 files and folders ..."));
 }
 
 TEST(Progress, writesNothingForShortWork) {
