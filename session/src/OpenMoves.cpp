@@ -28,17 +28,6 @@ bool moveIfDue(Move const& move) {
     return true;
 }
 
-/// @return the moves that cannot be undone, because something else is in the place of the file.
-std::vector<Move> undo(std::vector<Move> const& moves) {
-    std::vector<Move> left;
-    for (auto move = moves.rbegin(); move != moves.rend(); ++move) {
-        if (!moveIfDue(reversed(*move))) {
-            left.push_back(*move);
-        }
-    }
-    return left;
-}
-
 std::vector<Move> inOneList(MoveGroups const& groups) {
     std::vector<Move> result;
     for (auto const& group : groups) {
@@ -75,6 +64,7 @@ void OpenMoves::make(std::vector<Move> const& moves) {
             made_.back().push_back(move);
         }
         syncNames(moves);
+        definition_.followInOthers(moves, false);
     } catch (...) {
         undoBehind(before);
         throw;
@@ -96,7 +86,7 @@ void OpenMoves::undoBehind(std::size_t count) noexcept {
     try {
         bool isUndone = true;
         while (made_.size() > count) {
-            isUndone = undo(made_.back()).empty() && isUndone;
+            isUndone = undo({made_.back()}, false).empty() && isUndone;
             made_.pop_back();
         }
         if (!isUndone) {
@@ -144,7 +134,7 @@ bool OpenMoves::recover() {
     if (isDone) {
         complete(recorded);
     } else {
-        left = undo(moves);
+        left = undo(recorded.groups, true);
     }
     record_.remove();
     if (!moves.empty()) {
@@ -185,6 +175,19 @@ bool OpenMoves::isStaged(RecordedMoves const& moves) const {
         }
     }
     return std::ranges::none_of(left, [this](Path const& path) { return adapter_->isTracked(path); });
+}
+
+/// @return the moves that cannot be undone, because something else is in the place of the file.
+std::vector<Move> OpenMoves::undo(MoveGroups const& groups, bool isRecovery) const {
+    std::vector<Move> left;
+    for (auto group = groups.rbegin(); group != groups.rend(); ++group) {
+        std::vector<Move> undone;
+        for (auto move = group->rbegin(); move != group->rend(); ++move) {
+            moveIfDue(reversed(*move)) ? undone.push_back(reversed(*move)) : left.push_back(*move);
+        }
+        definition_.followInOthers(undone, isRecovery);
+    }
+    return left;
 }
 
 void OpenMoves::complete(RecordedMoves const& moves) {

@@ -23,6 +23,9 @@ public:
         /// A text that changes with every commit.
         std::function<std::string()> state;
 
+        /// Lets other projects follow files that have moved on disk; perhaps once more, after a crash.
+        std::function<void(std::vector<Move> const&, bool isRepeated)> followInOthers;
+
         /// Completes committed moves outside the definition.
         std::function<void(std::vector<Move> const&)> complete;
     };
@@ -70,6 +73,7 @@ private:
     bool isCommitted(RecordedMoves const& moves) const;
     bool isStaged(RecordedMoves const& moves) const;
     void complete(RecordedMoves const& moves);
+    std::vector<Move> undo(MoveGroups const& groups, bool isRecovery) const;
     void write(MoveGroups const& groups);
     std::string indexState() const;
 

@@ -12,6 +12,7 @@
 #include "DiskEntries.hpp"
 #include "FileTree.hpp"
 #include "MovePlan.hpp"
+#include "OtherProjects.hpp"
 #include "SessionProjectManager.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
@@ -56,6 +57,9 @@ Session::State::State(Path const& folder, Options options)
       moves(root, storeFolder, adapter.get(),
             {[this](Path const& file) { return project->getFileManager().isFileInProject(file); },
              [this] { return definitionState(); },
+             [this, options](std::vector<Move> const& made, bool isRepeated) {
+                 followInOthers(made, options, isRepeated);
+             },
              [this](std::vector<Move> const& made) { completePersonal(made); }}),
       executor(*store, adapter.get(),
                options.sourceControl == SourceControl::EachChange ? stager.get() : nullptr, files, raised,
@@ -207,6 +211,16 @@ ChangedFiles Session::State::listedFilesOf(std::vector<Move> const& made) const 
         });
     }
     return result;
+}
+
+void Session::State::followInOthers(std::vector<Move> const& made, Options const& options,
+                                    bool isRepeated) const {
+    std::vector<Path> referenced;
+    for (auto const& reference :
+         project->getProjectReferenceManager().getFolderReferenceManager().getReferences()) {
+        referenced.push_back(reference.getLocation());
+    }
+    OtherProjects(root, options).follow(made, referenced, isRepeated);
 }
 
 /// The newest entry of a log, or the file of a text: every commit rewrites it or appends to it.

@@ -79,6 +79,7 @@ private:
     Managers makeManagers();
     bool isStoreEmpty() const;
     std::string definitionState() const;
+    void followInOthers(std::vector<Move> const& made, Options const& options, bool isRepeated) const;
     void raiseEventsOf(stores::Changes const& changes);
     void movePersonal(stores::PathMoves const& moved);
     void completePersonal(std::vector<Move> const& made);

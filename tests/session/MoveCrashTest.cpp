@@ -76,6 +76,19 @@ protected:
         return result;
     }
 
+    static std::string differences(State const& left, State const& right) {
+        std::string result;
+        for (auto const* state : {&left, &right}) {
+            for (auto const& file : state->disk) {
+                auto const& other = state == &left ? right.disk : left.disk;
+                auto const found = other.find(file.first);
+                bool const isSame = found != other.end() && found->second == file.second;
+                result += isSame ? "" : "\n" + file.first + ": " + file.second;
+            }
+        }
+        return result + (left.index == right.index ? "" : "\n" + left.index + "\n" + right.index);
+    }
+
     /// Writes the project's name as it is, which recovers a move. Deletes git's lock, as the error demands.
     static std::optional<RecoveredMoves> recover(files::path const& project, SourceControl mode) {
         auto session = Session::open(root(project), {mode});
@@ -113,9 +126,7 @@ protected:
             auto const recovered = recover(copy(), mode);
             auto const after = stateOf(copy());
             auto const at = std::to_string(call) + " " + name.value_or("none");
-            EXPECT_TRUE(after == old || after == fresh)
-                << at << "\n"
-                << ::testing::PrintToString(after.disk) << after.index;
+            EXPECT_TRUE(after == old || after == fresh) << at << differences(old, after);
             EXPECT_FALSE(files::exists(copy() / ".projectdata" / "local" / "moves")) << at;
             auto const moved = [](State const& state) {
                 auto shown = state.disk;
@@ -156,6 +167,20 @@ TEST_F(InterruptedMoves, ofAFolderLeaveTheOldStateOrTheNewOne) {
 TEST_F(InterruptedMoves, ofSeveralFilesLeaveTheOldStateOrTheNewOne) {
     expectOldOrNew([](Session& session, Path const& root) {
         session.move({root / Path(u"a"), root / Path(u"src/b")}, root / Path(u"src/deep"));
+    });
+}
+
+TEST_F(InterruptedMoves, ofAnotherProjectLeaveItsReferencesAsTheyWereOrAsTheyShouldBe) {
+    for (auto const* name : {"src/inner", "other", "place"}) {
+        files::create_directory(original() / name);
+        Session::create(root(original() / name), u"Another", {SourceControl::Off});
+    }
+    auto inner = Session::open(root(original() / "src/inner"), {SourceControl::Off});
+    inner.project().getProjectReferenceManager().getFolderReferenceManager().addReferences(
+        {management::relativeFolderReference(root(original() / "other"), inner.root())});
+
+    expectOldOrNew([](Session& session, Path const& root) {
+        session.move({root / Path(u"src")}, root / Path(u"place/src"));
     });
 }
 

@@ -252,6 +252,79 @@ TEST_F(Moves, entryPointsTheProjectPathAndReferencesFollow) {
                 AllOf(HasSubstr("\"lib/include\""), HasSubstr("\"lib/pump\""), Not(HasSubstr("src"))));
 }
 
+/// The stored paths of a project's references, and then those of its project path.
+std::vector<std::u16string> storedReferencesOf(Path const& root) {
+    auto session = Session::open(root, {SourceControl::Off});
+    std::vector<std::u16string> result;
+    for (auto const& reference :
+         session.project().getProjectReferenceManager().getFolderReferenceManager().getReferences()) {
+        result.push_back(reference.getStoredPath());
+    }
+    for (auto const& reference :
+         session.project().getProjectPathManager().getFolderReferenceManager().getReferences()) {
+        result.push_back(reference.getStoredPath());
+    }
+    return result;
+}
+
+void addReference(Path const& root, Path const& target) {
+    auto session = Session::open(root, {SourceControl::Off});
+    session.project().getProjectReferenceManager().getFolderReferenceManager().addReferences(
+        {management::relativeFolderReference(target, root)});
+}
+
+TEST_F(Moves, theReferencesOfAProjectInAMovedFolderFollow) {
+    add({u"libs/pump/main.c"});
+    folder.folder(u"deep");
+    folder.folder(u"tools");
+    auto const pump = folder.path(u"libs/pump");
+    Session::create(pump, u"Pump", {SourceControl::Off});
+    Session::create(folder.path(u"tools"), u"Tools", {SourceControl::Off});
+    addReference(pump, folder.path(u"tools"));
+    ASSERT_THAT(storedReferencesOf(pump), ElementsAre(u"../../tools"));
+    {
+        auto const transaction = session.transaction();
+        move({u"libs/pump"}, u"deep/pump2");
+        move({u"deep"}, u"d");
+        EXPECT_THAT(storedReferencesOf(folder.path(u"d/pump2")), ElementsAre(u"../../tools"));
+        move({u"d/pump2"}, u"pump");
+        EXPECT_THAT(storedReferencesOf(folder.path(u"pump")), ElementsAre(u"../tools"));
+    }
+
+    EXPECT_THAT(storedReferencesOf(pump), ElementsAre(u"../../tools"));
+}
+
+TEST_F(Moves, aReferenceToTheProjectAroundItFollowsAlsoWhereItWouldLeadToAnotherFolder) {
+    add({u"libs/pump/main.c", u"deep/libs/x"});
+    auto const pump = folder.path(u"libs/pump");
+    Session::create(pump, u"Pump", {SourceControl::Off});
+    addReference(pump, folder.root());
+    ASSERT_THAT(storedReferencesOf(pump), ElementsAre(u"../.."));
+
+    move({u"libs/pump"}, u"deep/libs/pump");
+
+    EXPECT_THAT(storedReferencesOf(folder.path(u"deep/libs/pump")), ElementsAre(u"../../.."));
+}
+
+TEST_F(Moves, theReferencesOfReferencedProjectsToAMovedFolderFollow) {
+    add({u"libs/pump/main.c"});
+    test::TemporaryFolder const elsewhere;
+    Session::create(elsewhere.root(), u"Elsewhere", {SourceControl::Off});
+    Session::create(folder.path(u"libs/pump"), u"Pump", {SourceControl::Off});
+    addReference(elsewhere.root(), folder.path(u"libs/pump"));
+    addReference(folder.root(), elsewhere.root());
+
+    move({u"libs/pump"}, u"pump");
+
+    EXPECT_THAT(
+        storedReferencesOf(elsewhere.root()),
+        ElementsAre(
+            management::relativeFolderReference(folder.path(u"pump"), elsewhere.root()).getStoredPath()));
+    auto const now = storedReferencesOf(elsewhere.root());
+    move({u"pump"}, u"libs/pump");
+    EXPECT_NE(storedReferencesOf(elsewhere.root()), now);
+}
+
 TEST_F(Moves, observersGetTheEventsOfTheChangesAfterTheyAreCommitted) {
     add({u"src/a", u"src/b"});
     label(u"src/a");
