@@ -47,6 +47,7 @@ using stores::Change;
 using stores::JournalBackend;
 
 constexpr char const* owner = "owner";
+constexpr char const* writer = "anna"; // the policies for rows apply to her, and not to the owner
 
 /// A server that is prepared for shared projects, with a table of rows for the peers.
 class Server {
@@ -56,7 +57,7 @@ public:
         return server;
     }
 
-    std::string connection() const { return server_.connection(owner); }
+    std::string connection() const { return server_.connection(writer); }
 
     test::PostgresServer const& process() const { return server_; }
 
@@ -66,29 +67,32 @@ public:
     /// Creates a project without entries. @return its UUID.
     std::string createProject() const {
         auto const id = stores::newSharedProjectId();
-        postgresql::SharedProjects(settings()).create({id, "benchmark", 0, "r_" + id, "w_" + id, true});
+        auto const role = "w_" + id;
+        postgresql::SharedProjects(settingsOf(owner)).create({id, "benchmark", 0, "r_" + id, role, true});
+        server_.query("GRANT \"" + role + "\" TO " + writer);
         return id;
     }
 
     /// A client that is connected and has read nothing.
     std::unique_ptr<JournalBackend> connect(std::string const& project) const {
-        auto journal = std::make_unique<PostgresJournal>(settings(), project);
-        journal->requireOwner();
+        auto journal = std::make_unique<PostgresJournal>(settingsOf(writer), project);
+        journal->records(std::nullopt, 0);
         return std::make_unique<JournalBackend>(std::move(journal));
     }
 
 private:
     Server() : server_(isDurable ? std::vector<std::string>() : std::vector<std::string>{"fsync = off"}) {
         server_.query("CREATE ROLE owner LOGIN CREATEROLE PASSWORD 'secret'");
-        server_.query("GRANT CREATE ON DATABASE projects TO owner");
+        server_.query("CREATE ROLE anna LOGIN PASSWORD 'secret'");
+        server_.query("GRANT CREATE ON DATABASE projects TO owner, anna");
         server_.runProgram({test::PostgresServer::program("psql"), "--no-psqlrc", "--quiet", "--set",
                             "ON_ERROR_STOP=1", "--single-transaction", "--file", PROJECT_SETUP_SQL,
-                            connection()});
+                            server_.connection(owner)});
     }
 
-    ServiceSettings settings() const {
+    ServiceSettings settingsOf(char const* user) const {
         ServiceSettings result;
-        result.service = connection();
+        result.service = server_.connection(user);
         return result;
     }
 

@@ -1,6 +1,8 @@
 #include "project/postgresql/PostgresJournal.hpp"
 
 #include <atomic>
+#include <cstdint>
+#include <limits>
 #include <utility>
 
 #include "journal/ChangeListener.hpp"
@@ -34,7 +36,7 @@ constexpr Statement allPieces{"", "SELECT id::text, number, bytes FROM pm.piece"
 constexpr Statement newestRecords{
     "", "SELECT version, id::text, sum, kind::text, author::text, host,"
         " (extract(epoch FROM at) * 1000000)::bigint FROM pm.entry"
-        " WHERE project = $1::uuid AND ($2::text = '' OR version < $2::text::bigint)"
+        " WHERE project = $1::uuid AND version < $2::bigint"
         " ORDER BY version DESC LIMIT $3::bigint"};
 
 // The role that ran setup.sql owns the tables, and every project in them.
@@ -144,7 +146,7 @@ public:
     void wake() noexcept { listener_.wake(); }
 
     std::vector<JournalRecord> records(std::optional<std::uint64_t> before, std::size_t count) {
-        auto const end = before ? std::to_string(*before) : std::string();
+        auto const end = std::to_string(before.value_or(std::numeric_limits<std::int64_t>::max()));
         auto const limit = std::to_string(count);
         auto const deadline = session_.deadline();
         auto const answers = run(deadline, [&] {

@@ -12,11 +12,14 @@ using std::chrono::milliseconds;
 using stores::StoreError;
 
 /// Settings of the session, as far as the server knows them: it ends a statement whose client is gone, and
-/// notices a dead client.
+/// notices a dead client. Each statement of a journal reads a few rows by their key, whatever the values are,
+/// so the server plans it once. Without these settings, it plans a check for changes each time, which takes
+/// longer than the check, or reads a whole table that was small when it was planned.
 constexpr Statement configure{
     "", "SELECT set_config(s.name, s.value, false) FROM (VALUES"
         " ('client_connection_check_interval', '5s'), ('tcp_keepalives_idle', '10'),"
         " ('tcp_keepalives_interval', '5'), ('tcp_keepalives_count', '3'), ('tcp_user_timeout', '10s'),"
+        " ('plan_cache_mode', 'force_generic_plan'), ('enable_seqscan', 'off'), ('jit', 'off'),"
         " ('search_path', '')) AS s(name, value)"
         " WHERE current_setting(s.name, true) IS NOT NULL"};
 
