@@ -6,6 +6,7 @@
 
 #include "journal/CompleteFile.hpp"
 #include "journal/LocationFile.hpp"
+#include "journal/UnfinishedCopy.hpp"
 #include "project/stores/StoreError.hpp"
 #include "text/ProjectText.hpp"
 #include "writing/StoreFiles.hpp"
@@ -32,32 +33,45 @@ void ignoreFilesOfBothKinds(Disk& disk, FileChanges& changes) {
     }
 }
 
-/// Renames a file to its name with ".old", or ".old2" and so on.
-void setAside(Disk& disk, std::string const& name) {
-    std::string aside = name + ".old";
-    for (int number = 2; !disk.renameToFree(name, aside); ++number) {
-        aside = name + ".old" + std::to_string(number);
-    }
-}
-
 [[noreturn]] void throwTaken(Disk const& disk, char const* name) {
     throw StoreError(StoreError::Kind::Refused, disk.folder() + '/' + name, 0, "exists already",
                      "Move it to another place.");
 }
 
+/// Deletes the new file again, unless the old one was set aside already.
+/// @return false if the folder may contain the new one, also after a power failure.
+bool takeBack(Disk& disk, char const* fresh, char const* old) noexcept {
+    try {
+        if (!disk.identify(old)) {
+            return false;
+        }
+        disk.remove(fresh);
+        disk.syncFolder();
+        removeCopyMark(disk);
+        return true;
+    } catch (...) {
+        return false;
+    }
+}
+
 /// Gives the folder a new file for its definition, and sets the old one aside.
 void exchange(Disk& disk, std::string const& temporary, char const* fresh, std::string_view content,
               char const* old, FileChanges& changes) {
+    markCopy(disk, old);
     if (!createComplete(disk, temporary, fresh, content)) {
         throwTaken(disk, fresh);
     }
     try {
-        setAside(disk, old);
-    } catch (StoreError const&) {
-        disk.remove(fresh);
-        throw;
+        disk.syncFolder(); // otherwise a power failure could leave neither of the files
+        finishCopy(disk, old);
+    } catch (StoreError const& error) {
+        if (takeBack(disk, fresh, old)) {
+            throw;
+        }
+        throw StoreError(StoreError::Kind::OutcomeUnknown, error.file(), 0,
+                         "the folder may lead to the copy or not: " + error.problem(),
+                         "The next command will show it.");
     }
-    disk.syncFolder();
     changes.added.push_back(pathIn(disk, fresh));
     changes.removed.push_back(pathIn(disk, old));
 }
@@ -89,6 +103,7 @@ FileChanges replaceLocationByText(Disk& disk, std::string_view text) {
     if (!disk.openFolder()) {
         throw StoreError(StoreError::Kind::Refused, disk.folder(), 0, "does not exist", "");
     }
+    FolderGuard const guard(disk);
     ignoreFilesOfBothKinds(disk, changes);
     if (createComplete(disk, StoreFiles::newTemporary(), StoreFiles::attributes,
                        StoreFiles::attributesContent)) {

@@ -5,6 +5,7 @@
 #include "fl/i18n/Utf8.hpp"
 #include "journal/CompleteFile.hpp"
 #include "journal/LocationFile.hpp"
+#include "journal/UnfinishedCopy.hpp"
 #include "line/JsonReader.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/stores/StoreError.hpp"
@@ -67,6 +68,10 @@ std::string textName() {
     return fl::i18n::toUtf8(TextBackend::textName);
 }
 
+bool containsBoth(Disk& disk) {
+    return disk.identify(LocationFile::name) && disk.identify(textName());
+}
+
 /// @return false if the name is taken.
 bool createFile(Disk& disk, char const* name, std::string_view content, FileChanges& created) {
     bool const isCreated = createComplete(disk, LocationFile::temporary, name, content);
@@ -101,12 +106,12 @@ std::optional<SharedLocation> readSharedLocation(Disk& disk) {
     if (!disk.openFolder()) {
         return std::nullopt;
     }
+    if (containsBoth(disk) && !finishCopyOfOther(disk) && containsBoth(disk)) {
+        throwDamaged(disk, "says that the project is stored on a server, and there is a text beside it");
+    }
     auto const content = disk.read(LocationFile::name, 0);
     if (!content) {
         return std::nullopt;
-    }
-    if (disk.identify(textName())) {
-        throwDamaged(disk, "says that the project is stored on a server, and there is a text beside it");
     }
     return parse(disk, content->bytes);
 }

@@ -21,9 +21,11 @@ namespace {
 
 using project::session::SharedStore;
 using project::stores::Disk;
+using project::stores::FileChanges;
 using project::stores::JournalBackend;
 using project::stores::SharedLocation;
 using project::stores::SharedServer;
+using project::stores::StoreError;
 using project::stores::TextBackend;
 
 /// A new project on a server with a definition as its only entry. It is deleted again unless it is kept.
@@ -107,6 +109,20 @@ private:
         return project::stores::makeSystemDisk(project.root(), TextBackend::folderName);
     }
 
+    /// The project stays on the server if the folder may lead to it.
+    static FileChanges leadTo(CopyOnServer& copy, Disk& disk) {
+        try {
+            auto files = project::stores::replaceTextByLocation(disk, copy.location());
+            copy.keep();
+            return files;
+        } catch (StoreError const& error) {
+            if (error.kind() == StoreError::Kind::OutcomeUnknown) {
+                copy.keep();
+            }
+            throw;
+        }
+    }
+
     /// The guard keeps other processes from changing the text, which would be lost.
     void copyToServer(OpenProject& project) const {
         auto const name = project.manager().getName();
@@ -114,8 +130,7 @@ private:
         auto const disk = diskOf(project);
         auto const text = project::stores::canonicalText(*disk);
         CopyOnServer copy(sharedStore(*target_, name, reader_, writer_), name, text);
-        auto const files = project::stores::replaceTextByLocation(*disk, copy.location());
-        copy.keep();
+        auto const files = leadTo(copy, *disk);
         project.stageReplaced(files);
         output().say(Message("CopiedToServer"));
     }

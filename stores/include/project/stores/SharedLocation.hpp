@@ -27,11 +27,12 @@ struct PROJECT_STORES_EXPORT SharedLocation {
 /// A new random UUID for a project.
 PROJECT_STORES_EXPORT std::string newSharedProjectId();
 
-/// Reads the location of the project in a folder.
+/// Reads the location of the project in a folder. If a copy to another store was interrupted between its last
+/// steps, finishes it first; see StoreCopy.hpp.
 /// @param disk the store's folder.
 /// @return nothing if the project is not a shared one.
 /// @throws StoreError with the kind Damaged if the file is unreadable or of another format, or if there is a
-///         text beside it, so that it is not clear which of them is the definition.
+///         text beside it that no copy has left, so that it is not clear which of them is the definition.
 PROJECT_STORES_EXPORT std::optional<SharedLocation> readSharedLocation(Disk& disk);
 
 /// Creates the file, and the folder with the files for source control.

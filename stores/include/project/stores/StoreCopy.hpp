@@ -11,11 +11,12 @@
 namespace project::stores {
 
 // The steps with which a project moves from a text to a server, and from a server to a text. The file that
-// leads to the old store is set aside beside the new one, under its own name with ".old". At each moment the
-// folder leads to a store, or it contains both files, which is reported when the project is opened: nothing
-// is lost in a crash.
+// leads to the old store is set aside beside the new one, under its own name with ".old". After a crash or a
+// power failure at any moment, the folder leads to the old store or to the new one, or it contains both
+// files: readSharedLocation then finishes the copy.
 //
-// All functions throw StoreError. If one throws, the folder is as before, as far as the disk permits.
+// All functions throw StoreError. With the kind OutcomeUnknown, the folder may lead to the new store. With
+// any other kind, it leads to the old one.
 
 /// The definition in the text of a folder, in canonical form. Hold a write guard of the text's store, so that
 /// no other process writes it.
