@@ -33,11 +33,10 @@ constexpr Statement piecesOfEntry{
 constexpr Statement allPieces{"", "SELECT id::text, number, bytes FROM pm.piece"
                                   " WHERE project = $1::uuid AND id = $2::uuid ORDER BY number"};
 
-constexpr Statement newestRecords{
-    "", "SELECT version, id::text, sum, kind::text, author::text, host,"
-        " (extract(epoch FROM at) * 1000000)::bigint FROM pm.entry"
-        " WHERE project = $1::uuid AND version < $2::bigint"
-        " ORDER BY version DESC LIMIT $3::bigint"};
+constexpr Statement newestRecords{"", "SELECT version, id::text, sum, kind::text, author::text, host,"
+                                      " (extract(epoch FROM at) * 1000000)::bigint FROM pm.entry"
+                                      " WHERE project = $1::uuid AND version < $2::bigint"
+                                      " ORDER BY version DESC LIMIT $3::bigint"};
 
 // The role that ran setup.sql owns the tables, and every project in them.
 constexpr Statement isOwner{"", "SELECT coalesce(pg_has_role(c.relowner, 'USAGE'), false) FROM pg_class c"
