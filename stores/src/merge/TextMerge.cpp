@@ -6,7 +6,9 @@
 #include <utility>
 
 #include "merge/DisputedBase.hpp"
+#include "merge/FollowedRenames.hpp"
 #include "merge/MergedBody.hpp"
+#include "moves/MovedBody.hpp"
 #include "project/stores/StoreError.hpp"
 #include "text/ConflictReader.hpp"
 #include "text/TextLines.hpp"
@@ -152,8 +154,16 @@ std::string TextMerge::textWithMarkers() const {
 }
 
 TextMerge mergeTexts(std::string_view base, std::string_view ours, std::string_view theirs) {
+    return mergeTexts(base, ours, theirs, {}, {});
+}
+
+TextMerge mergeTexts(std::string_view base, std::string_view ours, std::string_view theirs,
+                     SideRenames const& ourRenames, SideRenames const& theirRenames) {
     ThreeWay<TextBody> bodies{{}, readSide(ours, "ours"), readSide(theirs, "theirs")};
     bodies.base = readBase(base, bodies.ours, bodies.theirs);
+    auto const moves = followedRenames(bodies, ourRenames, theirRenames);
+    bodies = {movedBody(std::move(bodies.base), moves.base), movedBody(std::move(bodies.ours), moves.ours),
+              movedBody(std::move(bodies.theirs), moves.theirs)};
     return TextMerge(std::make_unique<TextMerge::State const>(mergeBodies(bodies)));
 }
 

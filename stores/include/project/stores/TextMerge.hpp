@@ -1,5 +1,6 @@
 #pragma once
 
+#include <map>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -9,6 +10,18 @@
 #include "project/stores/MergeConflict.hpp"
 
 namespace project::stores {
+
+/// The files that one side of a merge renamed, as source control knows them. Paths are relative to the
+/// project's root.
+struct SideRenames {
+    using Paths = std::map<std::u16string, std::u16string>;
+
+    Paths renamed; ///< the path in the common version, and the side's path
+
+    /// The side's path of a file that the merge of the files puts elsewhere, and the path there. The other
+    /// side renamed the folder of such a file.
+    Paths relocated;
+};
 
 /// Two versions of a project's text, merged with their common version: by address, by key, and by the
 /// identity of nested nodes. docs/store/merging.md describes the rules. A change that one side made is taken,
@@ -39,7 +52,8 @@ private:
     explicit TextMerge(std::unique_ptr<State const> state) noexcept;
 
     friend PROJECT_STORES_EXPORT TextMerge mergeTexts(std::string_view base, std::string_view ours,
-                                                      std::string_view theirs);
+                                                      std::string_view theirs, SideRenames const& ourRenames,
+                                                      SideRenames const& theirRenames);
 
     std::unique_ptr<State const> state_;
 };
@@ -60,5 +74,12 @@ private:
 ///         conflict markers of another merge. Its file is "base", "ours" or "theirs".
 PROJECT_STORES_EXPORT TextMerge mergeTexts(std::string_view base, std::string_view ours,
                                            std::string_view theirs);
+
+/// The same, following renames: a change that one side made to a file applies to the file that the other side
+/// has renamed, at its new path. A rename is followed only where the text of its side agrees with it. Without
+/// renames, the result is that of the other function.
+PROJECT_STORES_EXPORT TextMerge mergeTexts(std::string_view base, std::string_view ours,
+                                           std::string_view theirs, SideRenames const& ourRenames,
+                                           SideRenames const& theirRenames);
 
 } // namespace project::stores
