@@ -8,6 +8,7 @@
 #include "exchange/Commands.hpp"
 #include "files/Additions.hpp"
 #include "files/Commands.hpp"
+#include "history/Commands.hpp"
 #include "labels/Commands.hpp"
 #include "merge/Commands.hpp"
 #include "project/Commands.hpp"
@@ -46,9 +47,12 @@ CommandList const& verbs() {
 
         {"check", "PurposeText", makeCheckCommand},
         {"tidy", "PurposeText", makeTidyCommand},
+        {"log", "PurposeText", makeLogCommand},
+        {"diff", "PurposeText", makeDiffCommand},
         {"setup", "PurposeText", makeSetupCommand},
         {"merge", "PurposeText", makeMergeCommand},
         {"resolve", "PurposeText", makeResolveCommand},
+        {"textconv", "PurposeText", makeTextconvCommand},
 
         {"copy", "PurposeShared", makeCopyCommand},
         {"shared", "PurposeShared", makeSharedCommand},

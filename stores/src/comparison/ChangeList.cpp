@@ -22,7 +22,8 @@ std::u16string valueOf(Node const& node, char16_t const* key) {
     return node ? node->get(key) : std::u16string();
 }
 
-/// The keys of a node, and the values that are nested in it by name, such as the extension data of an entry point.
+/// The keys of a node, and the values that are nested in it by name, such as the extension data of an entry
+/// point.
 Values settingsOf(Node const& node) {
     Values result;
     if (node) {

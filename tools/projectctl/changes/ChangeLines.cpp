@@ -46,14 +46,6 @@ std::vector<LabelOnFile> without(std::vector<LabelOnFile> const& labels,
     return result;
 }
 
-std::string quotedName(std::u16string_view text) {
-    std::string bytes;
-    appendBytes(bytes, text);
-    std::string result;
-    appendQuoted(result, bytes);
-    return result;
-}
-
 MetadataPath categoryAddress(std::u16string const& uuid) {
     return MetadataPath::root()
         .child(PathElement(treeSchema::categories::categoriesType, treeSchema::rootLocation))

@@ -6,10 +6,8 @@
 #include <string_view>
 #include <system_error>
 
-#include <unistd.h>
-
 #include "git/GitCommand.hpp"
-#include "output/Failure.hpp"
+#include "git/ThisProgram.hpp"
 #include "output/NameForms.hpp"
 
 namespace projectctl {
@@ -66,27 +64,6 @@ std::optional<std::string> programIn(std::string_view command) {
                : std::nullopt;
 }
 
-bool canBeRun(std::string const& program) {
-    std::error_code error;
-    return std::filesystem::is_regular_file(program, error) && access(program.c_str(), X_OK) == 0;
-}
-
-std::string thisProgram() {
-    std::error_code error;
-    std::string program = std::filesystem::read_symlink("/proc/self/exe", error).string();
-    if (error || !canBeRun(program)) {
-        throw Failure(Message("ProgramUnknown"));
-    }
-    return program;
-}
-
-void configure(Path const& folder, char const* key, std::string const& value) {
-    auto const result = runGit(folder, {"config", "--replace-all", key, value});
-    if (result.exitCode != 0) {
-        throw Failure(Message("GitNotSetUp", result.errors.substr(0, result.errors.find('\n'))));
-    }
-}
-
 /// Whether git's attributes assign the driver to the text.
 bool isAssigned(Path const& folder) {
     std::string const answer = runGit(folder, {"check-attr", "-z", "merge", "--", textInProject}).output;
@@ -128,8 +105,8 @@ MergeSetup mergeSetupOf(Path const& folder) {
 
 void setUpMerge(Path const& folder) {
     std::string const command = commandFor(thisProgram());
-    configure(folder, nameKey, "projects, by address and key instead of by line");
-    configure(folder, driverKey, command);
+    configureGit(folder, nameKey, "projects, by address and key instead of by line");
+    configureGit(folder, driverKey, command);
 }
 
 } // namespace projectctl

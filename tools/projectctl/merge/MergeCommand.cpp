@@ -3,11 +3,17 @@
 #include <fstream>
 #include <iterator>
 #include <optional>
+#include <sstream>
+#include <stdexcept>
 #include <string>
+#include <system_error>
 
 #include "cli/TextArguments.hpp"
+#include "cli/WorkingFolder.hpp"
+#include "git/GitCommand.hpp"
 #include "merge/Commands.hpp"
 #include "merge/ConflictWords.hpp"
+#include "merge/RenamesOfMerge.hpp"
 #include "output/Failure.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
@@ -17,6 +23,8 @@
 namespace projectctl {
 
 namespace {
+
+using project::stores::ThreeWay;
 
 /// Merges two versions of a project's text, as git's merge driver.
 ///
@@ -47,13 +55,41 @@ private:
     static constexpr int failed = 129;
 
     int mergeFiles() const {
+        ThreeWay<std::string> const texts{contentOf(*base_), contentOf(*ours_), contentOf(*theirs_)};
+        auto const renames = path_ ? renamesKnownToGit() : RenamesOfMerge();
         auto const merge =
-            project::stores::mergeTexts(contentOf(*base_), contentOf(*ours_), contentOf(*theirs_));
+            project::stores::mergeTexts(texts.base, texts.ours, texts.theirs, renames.ours, renames.theirs);
         replace(*ours_, merge.textWithMarkers());
+        reportSuggested(renames, texts);
         for (auto const& conflict : merge.conflicts()) {
             printError(Message("ConflictIn", path_.value_or(*ours_), inWords(conflict)));
         }
         return merge.conflicts().empty() ? 0 : 1;
+    }
+
+    RenamesOfMerge renamesKnownToGit() const try {
+        auto const ids = runGit(workingFolder(), {"hash-object", "--no-filters", "--stdin-paths"},
+                                *base_ + '\n' + *ours_ + '\n' + *theirs_ + '\n');
+        std::istringstream lines(ids.output);
+        ThreeWay<std::string> versions;
+        lines >> versions.base >> versions.ours >> versions.theirs;
+        return renamesOfMerge(workingFolder(), *path_, versions);
+
+    } catch (std::runtime_error const&) {
+
+        return {}; // git cannot be called
+    }
+
+    /// Names the files of the project whose place git only suggests.
+    static void reportSuggested(RenamesOfMerge const& renames, ThreeWay<std::string> const& texts) {
+        for (auto const& [from, to] : renames.suggested) {
+            std::string path;
+            appendJsonString(path, from);
+            auto const has = [&](std::string const& text) { return text.find(path) != std::string::npos; };
+            if (has(texts.ours) || has(texts.theirs)) {
+                printError(Message("MergePlaceSuggested", from, to));
+            }
+        }
     }
 
     static std::string contentOf(std::string const& name) {

@@ -8,8 +8,10 @@
 #include <unistd.h>
 
 #include "git/GitCommand.hpp"
+#include "git/TextInRepository.hpp"
 #include "merge/Commands.hpp"
 #include "merge/ConflictWords.hpp"
+#include "merge/RenamesOfMerge.hpp"
 #include "output/Failure.hpp"
 #include "output/JsonRows.hpp"
 #include "output/NameForms.hpp"
@@ -25,7 +27,7 @@ using project::stores::MergeConflict;
 using project::stores::MergeSide;
 using project::stores::TextMerge;
 
-constexpr char const* textInRoot = "./.projectdata/project.jsonl";
+constexpr char const* textInRoot = "./.projectdata/project.jsonl"; // for git, from the root
 
 /// Resolves the conflicts of a merge, from the versions in git's index.
 class ResolveCommand : public ProjectCommand {
@@ -77,13 +79,28 @@ private:
         if (!our || !their) {
             throw Failure(Message("NothingToResolve"));
         }
-        return project::stores::mergeTexts(version(root, base).value_or(std::string()), *our, *their);
+        auto const prefix = firstLine(git(root, {"rev-parse", "--show-prefix"}));
+        auto const renames =
+            renamesOfMerge(root, prefix + textBelowRoot,
+                           {versionId(root, base), versionId(root, ours), versionId(root, theirs)});
+        return project::stores::mergeTexts(version(root, base).value_or(std::string()), *our, *their,
+                                           renames.ours, renames.theirs);
     }
 
     /// The text in one stage of git's index; empty if there is none.
     static std::optional<std::string> version(Path const& root, int stage) {
-        auto result = git(root, {"cat-file", "blob", ":" + std::to_string(stage) + ':' + textInRoot});
+        auto result = git(root, {"cat-file", "blob", inStage(stage)});
         return result.exitCode == 0 ? std::optional(std::move(result.output)) : std::nullopt;
+    }
+
+    static std::string versionId(Path const& root, int stage) {
+        return firstLine(git(root, {"rev-parse", "-q", "--verify", inStage(stage)}));
+    }
+
+    static std::string inStage(int stage) { return ":" + std::to_string(stage) + ':' + textInRoot; }
+
+    static std::string firstLine(ProcessResult const& result) {
+        return result.output.substr(0, result.output.find('\n'));
     }
 
     static void stage(Path const& root) {

@@ -1,4 +1,5 @@
 #include "cli/WorkingFolder.hpp"
+#include "git/DiffSetup.hpp"
 #include "git/MergeSetup.hpp"
 #include "merge/Commands.hpp"
 #include "output/Failure.hpp"
@@ -13,7 +14,12 @@ namespace {
 /// Configures a clone of a repository to merge the project's text with this tool.
 class SetupCommand : public Command {
 public:
-    CLI::App* declare(CLI::App& tool) override { return tool.add_subcommand("setup"); }
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand("setup");
+        auto* const diff = app->add_flag("--diff", showsWords_);
+        app->add_flag("--no-diff", showsLines_)->excludes(diff);
+        return app;
+    }
 
     int run() override {
         auto const root = findProjectRoot(workingFolder());
@@ -25,8 +31,18 @@ public:
         }
         setUpMerge(root);
         output().say(Message("MergeSetUp"));
+        if (showsWords_) {
+            setUpDiff(root);
+        }
+        if (showsLines_) {
+            removeDiffSetup(root);
+        }
         return 0;
     }
+
+private:
+    bool showsWords_ = false;
+    bool showsLines_ = false;
 };
 
 } // namespace

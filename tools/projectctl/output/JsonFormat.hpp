@@ -19,6 +19,7 @@ namespace json {
 inline constexpr JsonFormat categoryList{"projectctl-category-list", 2};
 inline constexpr JsonFormat check{"projectctl-check", 1};
 inline constexpr JsonFormat description{"projectctl-description", 1};
+inline constexpr JsonFormat diff{"projectctl-diff", 1};
 inline constexpr JsonFormat done{"projectctl-done", 1}; ///< of verbs that only change the project
 inline constexpr JsonFormat dryRun{"projectctl-dry-run", 2};
 inline constexpr JsonFormat entryList{"projectctl-entry-list", 1}; ///< also of `entry show`
@@ -26,7 +27,8 @@ inline constexpr JsonFormat groupList{"projectctl-group-list", 1};
 inline constexpr JsonFormat init{"projectctl-init", 1};
 inline constexpr JsonFormat labelList{"projectctl-label-list", 2};
 inline constexpr JsonFormat labelShow{"projectctl-label-show", 2};
-inline constexpr JsonFormat list{"projectctl-list", 1};       ///< also of `label find`
+inline constexpr JsonFormat list{"projectctl-list", 1}; ///< also of `label find`
+inline constexpr JsonFormat log{"projectctl-log", 1};
 inline constexpr JsonFormat message{"projectctl-message", 1}; ///< on standard error
 inline constexpr JsonFormat name{"projectctl-name", 1};
 inline constexpr JsonFormat referenceGraph{"projectctl-reference-graph", 1};

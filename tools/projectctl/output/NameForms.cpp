@@ -97,6 +97,14 @@ void appendQuoted(std::string& out, std::string_view bytes) {
     out += '"';
 }
 
+std::string quotedName(std::u16string_view name) {
+    std::string bytes;
+    appendBytes(bytes, name);
+    std::string result;
+    appendQuoted(result, bytes);
+    return result;
+}
+
 void appendJsonString(std::string& out, std::u16string_view text) {
     fl::i18n::appendJsonString(out, text, fl::i18n::JsonEscapes::Controls);
 }

@@ -25,6 +25,9 @@ std::u16string textOf(std::string const& argument);
 /// name can be mistaken for another one or control the terminal. Otherwise they are appended unchanged.
 void appendQuoted(std::string& out, std::string_view bytes);
 
+/// The same of a name or path.
+std::string quotedName(std::u16string_view name);
+
 /// Appends text as a JSON string in UTF-8. Text that is not valid UTF-16 is preserved: a lone surrogate is
 /// escaped, so that the byte 0x80 of a name on disk becomes \udc80.
 void appendJsonString(std::string& out, std::u16string_view text);

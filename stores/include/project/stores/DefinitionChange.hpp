@@ -48,8 +48,8 @@ struct DefinitionChange {
     /// For Renamed: the earlier name or path.
     std::u16string earlier = {};
 
-    /// For FileLabel and Label: the name of the category. For FileData: the steps of the address behind the file,
-    /// and before it the scope, if it is not the file list.
+    /// For FileLabel and Label: the name of the category. For FileData: the steps of the address behind the
+    /// file, and before it the scope, if it is not the file list.
     std::u16string category = {};
 
     /// For FileLabel: the name of the label.
