@@ -1,4 +1,6 @@
 #include <filesystem>
+#include <fstream>
+#include <iterator>
 
 #include "support/GitFolder.hpp"
 #include "tools/labels/LabelToolTest.hpp"
@@ -182,6 +184,52 @@ TEST_F(PersonalLabels, areNotStagedByAnyCommand) {
     EXPECT_THAT(git.run({"ls-files"}), Not(HasSubstr("local")));
     EXPECT_EQ(".projectdata/local/\n",
               git.run({"ls-files", "--others", "--ignored", "--exclude-standard", "--directory"}));
+}
+
+TEST_F(PersonalLabels, ofFilesOutsideTheProjectAreHiddenUntilTheyAreTidied) {
+    createPersonal("Mine", "Later", "a");
+    ASSERT_THAT(tool({"label", "put", "Mine", "Later", "b", "--personal"}), SucceedsSilently());
+    auto const whole = readText();
+    replaceInText("\"a\"\n", "");
+
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("b\n"));
+    ASSERT_EQ(tool({"tidy"}).exitCode, 0);
+    writeText(whole);
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("a\nb\n"));
+
+    replaceInText("\"a\"\n", "");
+    EXPECT_THAT(tool({"tidy", "--personal"}), SucceedsSilently());
+    writeText(whole);
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("b\n"));
+}
+
+TEST_F(PersonalLabels, inADamagedTextAreReportedAndRepaired) {
+    createPersonal("Mine", "Later", "a");
+    std::string content;
+    {
+        std::ifstream file(personalText(), std::ios::binary);
+        content.assign(std::istreambuf_iterator<char>(file), {});
+    }
+    content.insert(content.find('\n') + 1, "damaged\n");
+    std::ofstream(personalText(), std::ios::binary) << content;
+
+    auto const checked = tool({"check"});
+    EXPECT_EQ(3, checked.exitCode);
+    EXPECT_THAT(checked.output, AllOf(HasSubstr("the personal text"), HasSubstr("line 2")));
+    EXPECT_NE(0, tool({"label", "put", "Mine", "Later", "b", "--personal"}).exitCode);
+    EXPECT_THAT(tool({"category", "create", "Status"}), SucceedsSilently());
+
+    EXPECT_THAT(tool({"check", "--repair"}).output, HasSubstr(".projectdata/local/damaged-"));
+    EXPECT_THAT(tool({"label", "put", "Mine", "Later", "b", "--personal"}), SucceedsSilently());
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("a\nb\n"));
+}
+
+TEST_F(PersonalLabels, followTheFilesThatMove) {
+    createPersonal("Mine", "Later", "a");
+
+    ASSERT_EQ(tool({"move", "a", "d"}).exitCode, 0);
+
+    EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("d\n"));
 }
 
 TEST_F(PersonalLabels, canBePutInAProjectThatIsReadOnly) {

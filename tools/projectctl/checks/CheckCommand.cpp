@@ -18,6 +18,7 @@
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
 #include "project/ProjectCommand.hpp"
+#include "project/stores/PersonalText.hpp"
 
 namespace projectctl {
 
@@ -97,10 +98,26 @@ private:
         auto const root = project.root();
         append(result, TreeCheck(project, isJson_ ? ShownPaths::fromRoot(root) : ShownPaths(root)).run());
         placeInText(result, project);
+        if (!project.isInTransaction()) { // otherwise it has been read already
+            append(result, personalFindings(project));
+        }
         if (project.log() == nullptr) { // git merges no log
             checkMergeSetup(root, result);
         }
         sortByWeight(result);
+        return result;
+    }
+
+    /// The faults of the personal text. Their lines are not those of the project's text.
+    static Findings personalFindings(OpenProject& project) {
+        auto const file = shown(project::stores::PersonalText::path(project.root()));
+        Findings result;
+        for (auto const& fault : project.access().personalText().check()) {
+            Message const message = fault.line > 0
+                                        ? Message("PersonalFaultAt", file, fault.line, fault.problem)
+                                        : Message("PersonalFault", file, fault.problem);
+            result.push_back(Finding::fault(codeOf(fault.kind), message.text()));
+        }
         return result;
     }
 
@@ -142,6 +159,10 @@ private:
         } else if (std::string const aside = project.text().repair(); !aside.empty()) {
             project.stageLater();
             aside_ = Message("LinesAside", project.storeFile(aside)).text();
+        }
+        if (auto const aside = project.access().personalText().repair(); !aside.empty()) {
+            auto const file = project::stores::PersonalText::folder(project.root()) / textOf(aside);
+            aside_ += (aside_.empty() ? "" : ", and ") + Message("PersonalRepaired", file).text();
         }
         if (!aside_.empty() && !isJson_) {
             report(aside_);

@@ -84,6 +84,8 @@ public:
     /// without an open guard.
     std::vector<project::stores::Fault> const& faults();
 
+    bool isInTransaction() const noexcept { return openTransactions_ > 0; }
+
     WriteShield& shield() noexcept { return *shield_; }
 
     /// The path of the text or the name of the log, for messages.
