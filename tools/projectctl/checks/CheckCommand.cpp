@@ -116,7 +116,7 @@ private:
             Message const message = fault.line > 0
                                         ? Message("PersonalFaultAt", file, fault.line, fault.problem)
                                         : Message("PersonalFault", file, fault.problem);
-            result.push_back(Finding::fault(codeOf(fault.kind), message.text()));
+            result.push_back(Finding::fault(codeOf(fault.kind), message));
         }
         return result;
     }
@@ -162,7 +162,7 @@ private:
         }
         if (auto const aside = project.access().personalText().repair(); !aside.empty()) {
             auto const file = project::stores::PersonalText::folder(project.root()) / textOf(aside);
-            aside_ += (aside_.empty() ? "" : ", and ") + Message("PersonalRepaired", file).text();
+            aside_ += (aside_.empty() ? "" : "; ") + Message("PersonalRepaired", file).text();
         }
         if (!aside_.empty() && !isJson_) {
             report(aside_);
