@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <set>
 
+#include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
 #include "stores/merge/MergeSamples.hpp"
