@@ -28,9 +28,9 @@ void dispatch(std::vector<Event> const& events, Broadcaster& observers) {
     }
 }
 
-// No manager raises metadataChange.
 EventQueue::EventQueue() : input_(std::make_shared<Broadcaster>()) {
     input_->onFileListUpdate(appendTo(events_, &Broadcaster::dispatchOnFileListUpdate));
+    input_->onMetadataChange(appendTo(events_, &Broadcaster::dispatchMetadataChange));
     input_->onLabelModified(appendTo(events_, &Broadcaster::dispatchLabelModified));
     input_->onCategoryDeleted(appendTo(events_, &Broadcaster::dispatchCategoryDeleted));
     input_->onCategoryAdded(appendTo(events_, &Broadcaster::dispatchCategoryAdded));

@@ -8,28 +8,10 @@
 namespace project::session {
 
 namespace fileSchema = metadata::schema::files;
-namespace entrySchema = metadata::schema::entrypoints;
 
 using metadata::MetadataNode;
-using metadata::MetadataPath;
-using metadata::PathElement;
 
 namespace {
-
-/// Collects the files of entry points.
-class EntryPointFiles : public stores::ChildSink {
-public:
-    void add(stores::LoadedChild const& child) override {
-        if (child.type == entrySchema::entryPointType && child.node) {
-            files_.insert(child.node->get(entrySchema::fileKey));
-        }
-    }
-
-    std::set<std::u16string, std::less<>> take() { return std::move(files_); }
-
-private:
-    std::set<std::u16string, std::less<>> files_;
-};
 
 /// @param choice null for any label.
 bool isChosen(MetadataNode const& category, MetadataNode const& label, LabelChoice const* choice) {
@@ -60,11 +42,7 @@ FileConditions::FileConditions(Query const& query, stores::TreeMetadataManager& 
         glob_.emplace(*query.glob);
     }
     if (query.isEntryPoint) {
-        EntryPointFiles files;
-        store.loadChildren(MetadataPath::root().child(
-                               PathElement(entrySchema::entryPointsType, metadata::schema::rootLocation)),
-                           files);
-        entryPoints_ = files.take();
+        entryPoints_ = entryPointNames(store);
     }
     if (hasLabelConditions_ && query.layers != Layers::Project) {
         auto const guard = personal.acquireReadLock();

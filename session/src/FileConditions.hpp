@@ -3,11 +3,8 @@
 #include <functional>
 #include <map>
 #include <optional>
-#include <set>
-#include <string>
-#include <string_view>
-#include <vector>
 
+#include "FileAttachments.hpp"
 #include "Glob.hpp"
 #include "fl/filesystem/Path.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
@@ -38,7 +35,7 @@ private:
     Query const& query_;
     bool hasLabelConditions_;
     std::optional<Glob> glob_;
-    std::set<std::u16string, std::less<>> entryPoints_; ///< their files, relative to the root
+    EntryPointNames entryPoints_; ///< only if the query asks for them
     std::map<std::u16string, metadata::MetadataNodeSpecification, std::less<>>
         personal_; ///< the nodes with personal labels, by path relative to the root
 };

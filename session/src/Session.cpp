@@ -7,6 +7,7 @@
 #include "FileSearch.hpp"
 #include "NewSharedProject.hpp"
 #include "SessionState.hpp"
+#include "SyncRules.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
 
@@ -87,6 +88,35 @@ std::optional<RecoveredMoves> Session::takeRecoveredMoves() {
 
 bool Session::hasUnfinishedMove() const {
     return state_->moves.hasUnfinished();
+}
+
+std::vector<SyncRule> Session::syncRules() {
+    auto const guard = state_->store->acquireReadLock();
+    return readSyncRules(*state_->store, state_->root);
+}
+
+void Session::setSyncRule(SyncRule const& rule) {
+    state_->sync.set(rule);
+}
+
+bool Session::removeSyncRule(Path const& folder) {
+    return state_->sync.remove(folder);
+}
+
+SyncPlan Session::planSync() {
+    return state_->sync.plan();
+}
+
+SyncPlan Session::sync(SyncOptions const& options) {
+    auto seen = planSync();
+    if (seen.isEmpty()) {
+        return seen;
+    }
+    auto step = transaction();
+    auto plan = planSync(); // the project may have changed before the transaction began
+    state_->sync.apply(plan, options);
+    step.commit();
+    return plan;
 }
 
 Transaction Session::transaction() {

@@ -32,12 +32,15 @@ using stores::StoreError;
 
 namespace {
 
-std::unique_ptr<GitAdapter> makeAdapter(Path const& root, Options options) {
+GitEnvironment environmentOf(Options const& options) {
+    return options.honoursEnvironment ? GitEnvironment::Honoured : GitEnvironment::Ignored;
+}
+
+std::unique_ptr<GitAdapter> makeAdapter(Path const& root, Options const& options) {
     if (options.sourceControl == SourceControl::Off) {
         return nullptr;
     }
-    return std::make_unique<GitAdapter>(root, options.honoursEnvironment ? GitEnvironment::Honoured
-                                                                         : GitEnvironment::Ignored);
+    return std::make_unique<GitAdapter>(root, environmentOf(options));
 }
 
 } // namespace
@@ -68,6 +71,7 @@ Session::State::State(Path const& folder, Options options)
       project(
           std::make_unique<SessionProjectManager>(std::move(managers.outermost), executor, personalStore)),
       personal(*project, store, personalStore, executor),
+      sync(root, environmentOf(options), *store, *project, executor, raised),
       ofOthers_(store, root, FileEvents::All) {
 }
 

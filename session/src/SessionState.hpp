@@ -10,6 +10,7 @@
 #include "ChangeExecutor.hpp"
 #include "DefinitionStager.hpp"
 #include "EventQueue.hpp"
+#include "FolderSync.hpp"
 #include "OpenMoves.hpp"
 #include "OthersEvents.hpp"
 #include "PersonalLayer.hpp"
@@ -73,6 +74,7 @@ public:
     ChangeExecutor executor;
     std::unique_ptr<management::ProjectManager> project;
     PersonalLayer personal;
+    FolderSync sync;
 
 private:
     std::unique_ptr<DefinitionStager> makeStager();

@@ -1,5 +1,7 @@
 #include "project/session/ToolAccess.hpp"
 
+#include "DiskComparison.hpp"
+#include "FileAddition.hpp"
 #include "FileSearch.hpp"
 #include "FileTree.hpp"
 #include "SessionState.hpp"
@@ -57,6 +59,17 @@ FileLevel ToolAccess::level(metadata::MetadataPath const& address) {
 
 metadata::MetadataPath ToolAccess::addressOf(Path const& path) const {
     return FileTree(*state_.store, state_.root).addressOf(path);
+}
+
+DiskDifferences ToolAccess::compareWithDisk(Path const& folder, DiskProgress const& progress) {
+    FileTree const files(*state_.store, state_.root);
+    DiskComparison comparison(files, state_.root);
+    comparison.run(folder, progress);
+    return comparison.take();
+}
+
+void ToolAccess::addBelowLabelledFolders(std::vector<Path> const& added) {
+    session::addBelowLabelledFolders(added, state_.project->getFileManager());
 }
 
 void ToolAccess::loadChildren(metadata::MetadataPath const& address, stores::ChildSink& children) {

@@ -37,6 +37,8 @@ std::vector<Case> everyError() {
         {FileNotInProjectRoot(first, second), "FileNotInProjectRoot", two},
         {FileDoesNotExistError(first), "FileDoesNotExistError", one},
         {RootFolderNotRemoveable(first), "RootFolderNotRemoveable", one},
+        {SyncFolderUnsuitable(first), "SyncFolderUnsuitable", one},
+        {SyncFolderMissing(first), "SyncFolderMissing", one},
         {EntryPointGroupUUIDDefined(first), "EntryPointGroupUUIDDefined", one},
         {EntryPointGroupNameDefined(first), "EntryPointGroupNameDefined", one},
         {EntryPointTypeUndefined(first), "EntryPointTypeUndefined", one},
@@ -93,7 +95,7 @@ TEST(Messages, noTwoErrorsHaveTheSameText) {
         for (auto const& error : everyError()) {
             texts.insert(MessageCatalog::get_message(error.message, locale));
         }
-        EXPECT_EQ(texts.size(), 18u) << locale;
+        EXPECT_EQ(texts.size(), 20u) << locale;
     }
 }
 

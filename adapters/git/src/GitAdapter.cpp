@@ -1,5 +1,7 @@
 #include "project/git/GitAdapter.hpp"
 
+#include <algorithm>
+#include <iterator>
 #include <utility>
 
 #include "index/IndexUpdate.hpp"
@@ -94,6 +96,28 @@ std::map<fl::filesystem::Path, cmlink::FileState> GitAdapter::getFileStates(std:
         result.try_emplace(file, query.stateOf(file));
     }
     return result;
+}
+
+/// The files that meet a condition on a query of states; none if there is no repository.
+template <typename Condition>
+std::set<fl::filesystem::Path> GitAdapter::select(std::vector<Path> const& files,
+                                                  Condition const& condition) {
+    std::set<Path> result;
+    auto* const found = files.empty() ? nullptr : repository();
+    if (found != nullptr) {
+        StateQuery query(*found);
+        std::ranges::copy_if(files, std::inserter(result, result.end()),
+                             [&](Path const& file) { return condition(query, file); });
+    }
+    return result;
+}
+
+std::set<fl::filesystem::Path> GitAdapter::ignored(std::vector<Path> const& files) {
+    return select(files, [](StateQuery& query, Path const& file) { return query.isIgnored(file); });
+}
+
+std::set<fl::filesystem::Path> GitAdapter::leftOut(std::vector<Path> const& files) {
+    return select(files, [](StateQuery& query, Path const& file) { return query.isLeftOut(file); });
 }
 
 std::set<fl::filesystem::Path> GitAdapter::trackedBelow(std::vector<Path> const& folders) {

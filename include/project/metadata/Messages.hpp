@@ -63,6 +63,26 @@ public:
     }
 };
 
+/// A folder cannot have a rule that keeps it up to date: it is not a folder on disk within the project, or
+/// belongs to the store or to source control.
+class PROJECT_METADATA_EXPORT SyncFolderUnsuitable : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit SyncFolderUnsuitable(Text const& path) : BaseMsgID(projectCatalog(), "SyncFolderUnsuitable", 1) {
+        setArgument(0, std::u16string(path));
+    }
+};
+
+/// The folder of a rule is missing or empty, so that its rule would remove everything that the project lists
+/// below it.
+class PROJECT_METADATA_EXPORT SyncFolderMissing : public ::resource_core::BaseMsgID {
+public:
+    template <MessageText Text>
+    explicit SyncFolderMissing(Text const& path) : BaseMsgID(projectCatalog(), "SyncFolderMissing", 1) {
+        setArgument(0, std::u16string(path));
+    }
+};
+
 /// The project's root cannot be removed from its own project.
 class PROJECT_METADATA_EXPORT RootFolderNotRemoveable : public ::resource_core::BaseMsgID {
 public:

@@ -69,6 +69,24 @@ inline constexpr char16_t const* recordValueKey = u"Value";
 
 } // namespace project::metadata::schema::files
 
+/// The rules of folders that keep themselves up to date: each a node of its folder, in a scope of its own.
+namespace project::metadata::schema::sync {
+
+/// The scope of the rules.
+inline constexpr char16_t const* rulesScope = u"SyncRules";
+
+/// A key of a rule. Any text but gitIgnoreOff, and none, says that git's ignore rules apply.
+inline constexpr char16_t const* gitIgnoreKey = u"GitIgnore";
+inline constexpr char16_t const* gitIgnoreOff = u"0";
+
+/// Nested nodes of a rule: one pattern each. Their identity is their content, so that the patterns of two
+/// people merge like two sets.
+inline constexpr char16_t const* includeType = u"Include";
+inline constexpr char16_t const* excludeType = u"Exclude";
+inline constexpr char16_t const* patternKey = u"Pattern";
+
+} // namespace project::metadata::schema::sync
+
 /// Categories and their labels. The location of the first step is rootLocation.
 namespace project::metadata::schema::categories {
 

@@ -11,6 +11,7 @@
 #include "project/session/Move.hpp"
 #include "project/session/Personal.hpp"
 #include "project/session/Query.hpp"
+#include "project/session/Sync.hpp"
 #include "project/session/Transaction.hpp"
 #include "project/stores/HistoryLoss.hpp"
 #include "project/stores/SharedServer.hpp"
@@ -164,6 +165,33 @@ public:
     /// Whether there is an unfinished move, which the next change completes or rolls back. False while a move
     /// of this session is waiting for stage.
     bool hasUnfinishedMove() const;
+
+    /// The rules of the folders that keep themselves up to date, in the order of the store. Takes the read
+    /// lock.
+    std::vector<SyncRule> syncRules();
+
+    /// Stores a rule, in place of the one that the folder may have. Changes no file of the project.
+    /// @throws exception SyncFolderUnsuitable if the folder does not exist, is outside the root or behind a
+    ///         symbolic link, or belongs to the store or to source control.
+    void setSyncRule(SyncRule const& rule);
+
+    /// Removes the rule of a folder. The rules of the folders below it stay.
+    /// @return false if the folder has none.
+    bool removeSyncRule(Path const& folder);
+
+    /// What sync would change. Takes the read lock while it reads the folders on disk.
+    SyncPlan planSync();
+
+    /// Brings the folders that have rules up to date: adds the files that are new on disk, and removes those
+    /// that are gone, in one transaction. Files that no rule is above stay as they are. Without a rule,
+    /// nothing changes.
+    ///
+    /// Takes the read lock while it reads the folders, and the write lock only if there is something to do.
+    /// @return what was changed.
+    /// @throws exception SyncFolderMissing if the folder of a rule is missing or empty, unless the options
+    ///         allow it. Nothing changes.
+    /// @throws git::GitError if git's ignore rules cannot be read.
+    SyncPlan sync(SyncOptions const& options = {});
 
     /// Begins a transaction: the following changes of this thread are one step, which is in the project when
     /// the transaction is committed. If one is open already, the new one is nested in it.

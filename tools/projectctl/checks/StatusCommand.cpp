@@ -14,6 +14,7 @@
 #include "git/GitIgnore.hpp"
 #include "output/Colors.hpp"
 #include "output/JsonRows.hpp"
+#include "output/Kind.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"

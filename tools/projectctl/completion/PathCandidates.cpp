@@ -7,6 +7,7 @@
 
 #include "cli/PathArguments.hpp"
 #include "files/DiskFolder.hpp"
+#include "output/Kind.hpp"
 #include "output/NameForms.hpp"
 #include "project/FileList.hpp"
 #include "project/metadata/MetadataFunctions.hpp"

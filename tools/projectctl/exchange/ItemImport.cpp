@@ -69,7 +69,7 @@ void ItemImport::addFiles() {
             unmapped_.add(item.line, *found->second);
         }
     }
-    addBelowLabelledFolders(project_, added);
+    project_.access().addBelowLabelledFolders(added);
     project_.stageReturnedLater(added);
     addedFiles_ = added.size();
 }

@@ -58,7 +58,7 @@ private:
         std::ranges::copy_if(contents, std::back_inserter(added),
                              [&](Path const& path) { return !project.files().isFileInProject(path); });
         progress.begin(Message("ProgressAdd", added.size()));
-        addBelowLabelledFolders(project, added);
+        project.access().addBelowLabelledFolders(added);
         project.stageReturnedLater(added);
         project.stageReturnedLater(skipped);
         project.changedFiles().listed += added.size();

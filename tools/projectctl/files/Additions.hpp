@@ -9,11 +9,6 @@
 
 namespace projectctl {
 
-/// Adds files and folders, and keeps the labels of the folders above them. The file manager would drop those.
-/// Call it in a transaction.
-/// @param added those of them that are in the project already are added again, without their labels.
-void addBelowLabelledFolders(OpenProject& project, std::vector<Path> const& added);
-
 /// Requires that the folders among the paths could be read. A folder that is not added need not be readable.
 /// @throws Failure with the problem of the first one that could not.
 void requireReadable(DiskWalk const& walk, std::vector<Path> const& paths);

@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "files/DiskFolder.hpp"
+#include "output/Kind.hpp"
 
 namespace projectctl {
 

@@ -24,6 +24,29 @@ LocalStatus StateQuery::stateOf(fl::filesystem::Path const& path) {
     return entry ? trackedState(*entry) : untrackedState(*place);
 }
 
+bool StateQuery::isIgnored(fl::filesystem::Path const& path) {
+    auto const place = repository_.workTree().relative(path);
+    if (!place) {
+        return true;
+    }
+    auto const above = folders_.kindOf(parentOf(*place));
+    if (above == FolderKind::OtherRepository || above == FolderKind::BeyondLink) {
+        return true;
+    }
+    auto const onDisk = reachableEntry(*place);
+    if (onDisk && S_ISDIR(onDisk->st_mode)) {
+        return folders_.kindOf(*place) == FolderKind::OtherRepository ||
+               (folders_.isFolderIgnored(*place) && !isAnythingTrackedBelow(repository_.index(), *place));
+    }
+    return !trackedAt(repository_.index(), *place) && folders_.isFileIgnored(*place);
+}
+
+bool StateQuery::isLeftOut(fl::filesystem::Path const& path) {
+    auto const place = repository_.workTree().relative(path);
+    auto const entry = place ? trackedAt(repository_.index(), *place) : std::nullopt;
+    return entry && !reachableEntry(*place) && isDiskIgnored(*entry, false);
+}
+
 LocalStatus StateQuery::trackedState(git_index_entry const& entry) {
     if (libgit().git_index_entry_is_conflict(&entry) != 0) {
         return LocalStatus::Conflicted;

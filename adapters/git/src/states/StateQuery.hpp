@@ -15,6 +15,12 @@ public:
 
     cmlink::LocalStatus stateOf(fl::filesystem::Path const& path);
 
+    /// Whether `git add` of the folders above would leave a path out: ignored, or not in this repository.
+    bool isIgnored(fl::filesystem::Path const& path);
+
+    /// Whether a path is tracked and missing on disk on purpose.
+    bool isLeftOut(fl::filesystem::Path const& path);
+
 private:
     cmlink::LocalStatus trackedState(git_index_entry const& entry);
     cmlink::LocalStatus presentState(git_index_entry const& entry, struct stat const& onDisk);

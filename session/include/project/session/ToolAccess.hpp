@@ -30,6 +30,20 @@ struct VisitedFile {
 /// Receives files one by one. It must not change the project.
 using FileVisitor = std::function<void(VisitedFile const&)>;
 
+/// Receives the number of entries that a comparison with the disk has reached.
+using DiskProgress = std::function<void(std::size_t)>;
+
+/// The differences between the file list and the disk.
+struct DiskDifferences {
+    /// On disk but not in the project. A folder without any files in the project is listed without its
+    /// contents.
+    std::vector<FoundFile> added;
+
+    std::vector<FoundFile> gone; ///< in the project but not on disk; a folder before its contents
+
+    std::vector<std::string> unreadable; ///< one line for each folder that could not be read
+};
+
 /// The parts of a session that only projectctl needs: it checks, repairs and merges the text itself.
 /// Applications do not need this header.
 class PROJECT_SESSION_EXPORT ToolAccess {
@@ -69,6 +83,16 @@ public:
 
     /// The address of a file in the file list. @param path absolute, the project's root or below it.
     metadata::MetadataPath addressOf(Path const& path) const;
+
+    /// Compares the file list with the disk. The caller holds a guard of the store.
+    /// @param folder absolute, the root or below it, and not beyond a symbolic link.
+    /// @param progress may be empty.
+    DiskDifferences compareWithDisk(Path const& folder, DiskProgress const& progress);
+
+    /// Adds files and folders, and keeps the labels of the folders above them. The file manager would drop
+    /// those. Call it in a transaction.
+    /// @param added those of them that are in the project already are added again, without their labels.
+    void addBelowLabelledFolders(std::vector<Path> const& added);
 
     /// Passes on the addresses directly below one address, as TreeMetadataManager::loadChildren does.
     void loadChildren(metadata::MetadataPath const& address, stores::ChildSink& children);

@@ -93,6 +93,19 @@ public:
     /// @param files absolute paths; "." and ".." are resolved as text.
     std::map<Path, cmlink::FileState> getFileStates(std::vector<Path> const& files) override;
 
+    /// Those of some files and folders that `git add` of the folders above them would leave out: ignored and
+    /// not tracked, beyond a symbolic link, in another repository inside this one, or outside the work tree.
+    /// A folder is not ignored if a file below it is tracked. Empty if there is no repository.
+    ///
+    /// Reads no file and not the last commit, unlike getFileStates.
+    /// @param files absolute paths, on disk.
+    std::set<Path> ignored(std::vector<Path> const& files);
+
+    /// Those of some files that git tracks and that are missing on disk on purpose: a sparse checkout left
+    /// them out, or git was told that they are unchanged.
+    /// @param files absolute paths.
+    std::set<Path> leftOut(std::vector<Path> const& files);
+
     /// The tracked files below folders: those that removeFromSourceControl would remove from the index.
     /// @param folders absolute paths.
     /// @return paths that begin with the path of their folder, sorted.
@@ -101,6 +114,8 @@ public:
 private:
     template <typename Change>
     void stage(Change const& change);
+    template <typename Condition>
+    std::set<Path> select(std::vector<Path> const& files, Condition const& condition);
     Repository* repository();
 
     std::unique_ptr<RepositoryFinder> finder_;

@@ -1,4 +1,4 @@
-#include "files/DiskFolder.hpp"
+#include "project/session/DiskFolder.hpp"
 
 #include <algorithm>
 #include <array>
@@ -13,9 +13,10 @@
 #include <sys/stat.h>
 
 #include "fl/filesystem/SystemName.hpp"
-#include "output/NameForms.hpp"
+#include "fl/i18n/Utf8.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
 
-namespace projectctl {
+namespace project::session {
 
 using fl::filesystem::SystemName;
 
@@ -31,6 +32,11 @@ using FolderHandle = std::unique_ptr<DIR, CloseFolder>;
 constexpr std::array<std::string_view, 8> foreignFolders{".git",   ".hg", ".svn", ".bzr",
                                                          "_darcs", "CVS", ".jj",  ".projectdata"};
 
+/// Whether a name is one element of a path and does not lead elsewhere.
+bool isElement(std::u16string_view name) {
+    return !name.empty() && name != u"." && name != u".." && name.find(u'/') == std::u16string_view::npos;
+}
+
 /// The kind of an entry as the file system returned it with the name, or else as fstatat returns it.
 unsigned char typeOf(DIR* folder, dirent const& entry) {
     struct stat status {};
@@ -45,15 +51,15 @@ unsigned char typeOf(DIR* folder, dirent const& entry) {
 }
 
 /// @return empty for an entry that a project does not contain.
-std::optional<Kind> kindOf(std::string_view name, unsigned char type) {
+std::optional<FileKind> kindOf(std::string_view name, unsigned char type) {
     bool const isForeign = std::ranges::find(foreignFolders, name) != foreignFolders.end();
     switch (type) {
     case DT_DIR:
-        return name == "." || name == ".." || isForeign ? std::nullopt : std::optional(Kind::Folder);
+        return name == "." || name == ".." || isForeign ? std::nullopt : std::optional(FileKind::Folder);
     case DT_REG: // in a linked working tree or a submodule, .git is a file
-        return name == ".git" ? std::nullopt : std::optional(Kind::File);
+        return name == ".git" ? std::nullopt : std::optional(FileKind::File);
     case DT_LNK:
-        return Kind::File;
+        return FileKind::File;
     default:
         return std::nullopt;
     }
@@ -68,7 +74,7 @@ std::u16string toText(std::string_view name) {
 
 [[noreturn]] void fail(Path const& folder, int error) {
     throw std::system_error(error, std::generic_category(),
-                            Message("FolderUnreadable", shown(folder)).text());
+                            "the folder \"" + fl::i18n::toUtf8(folder.native()) + "\" cannot be read");
 }
 
 } // namespace
@@ -105,9 +111,12 @@ bool isOnDisk(Path const& path) {
 }
 
 bool isOnDisk(Path const& folder, std::u16string const& name) {
-    bool const leadsElsewhere =
-        name.empty() || name == u"." || name == u".." || name.find(u'/') != std::u16string::npos;
-    return !leadsElsewhere && isOnDisk(folder / Path(name));
+    return isElement(name) && isOnDisk(folder / Path(name));
+}
+
+bool canBeInProject(std::u16string_view name) {
+    auto const isName = [name](std::string_view foreign) { return std::ranges::equal(foreign, name); };
+    return isElement(name) && std::ranges::none_of(foreignFolders, isName);
 }
 
 bool isFolderItself(Path const& path) {
@@ -118,4 +127,19 @@ bool isFolderItself(Path const& path) {
     return name.get() != nullptr && lstat(name.get(), &status) == 0 && S_ISDIR(status.st_mode);
 }
 
-} // namespace projectctl
+bool isFolderWithin(Path const& root, Path const& folder) {
+    if (folder == root) {
+        return isFolderItself(root);
+    }
+    auto const path = metadata::getRelativePath(root, folder);
+    for (std::size_t begin = 0, end = 0; end < path.size(); begin = end + 1) {
+        end = std::min(path.find(u'/', begin), path.size());
+        if (!canBeInProject(std::u16string_view(path).substr(begin, end - begin)) ||
+            !isFolderItself(root / Path(path.substr(0, end)))) {
+            return false;
+        }
+    }
+    return !metadata::leadsUpward(root, folder);
+}
+
+} // namespace project::session
