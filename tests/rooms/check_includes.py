@@ -51,6 +51,7 @@ ROOMS = {
         "watch": ["texts", "output", "cli", "git", "project"],
         "manual": ["texts", "cli"],
         "shared": ["texts", "output", "cli", "git", "project"],
+        "sync": ["texts", "output", "cli", "git", "project", "changes"],
         "batch": ["texts", "output", "cli", "git", "project", "changes"],
         "renames": ["texts", "output", "cli", "git", "project", "changes", "files"],
         "checks": ["texts", "output", "cli", "git", "project", "files", "labels", "entrypoints", "references", "merge", "renames"],

@@ -15,6 +15,7 @@
 #include "references/Commands.hpp"
 #include "renames/Commands.hpp"
 #include "shared/Commands.hpp"
+#include "sync/Commands.hpp"
 #include "watch/Commands.hpp"
 
 namespace projectctl {
@@ -32,6 +33,7 @@ CommandList const& verbs() {
         {"adopt", "PurposeFiles", makeAdoptCommand},
         {"list", "PurposeFiles", makeListCommand},
         {"status", "PurposeFiles", makeStatusCommand},
+        {"sync", "PurposeFiles", makeSyncCommand},
         {"import", "PurposeFiles", makeImportCommand},
         {"export", "PurposeFiles", makeExportCommand},
 

@@ -57,6 +57,8 @@ public:
     /// @throws FileNotInProject
     void requireInProject(Path const& path);
 
+    project::session::Session& session() noexcept { return session_; }
+
     project::metadata::MetadataManager& store() noexcept { return session_.store(); }
 
     /// The backend of the store, which does not contain the changes of a transaction. Its `load` may be

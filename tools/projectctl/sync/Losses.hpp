@@ -1,0 +1,29 @@
+#pragma once
+
+#include <string>
+
+#include "cli/ShownPaths.hpp"
+#include "project/OpenProject.hpp"
+
+namespace projectctl {
+
+/// The labels and entry points that a synchronisation removes with their files.
+class Losses {
+public:
+    /// @param plan borrowed.
+    Losses(OpenProject& project, project::session::SyncPlan const& plan)
+        : project_(project), plan_(plan), shown_(project.root()) {}
+
+    /// Writes a warning for each file that loses something.
+    void warn();
+
+private:
+    std::string described(project::session::RemovedFile const& file) const;
+    std::string nameOf(project::session::LabelChoice const& label) const;
+
+    OpenProject& project_;
+    project::session::SyncPlan const& plan_;
+    ShownPaths shown_;
+};
+
+} // namespace projectctl

@@ -1,0 +1,143 @@
+#include <optional>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "changes/DryRun.hpp"
+#include "cli/CodedFailure.hpp"
+#include "cli/Completes.hpp"
+#include "cli/PathArguments.hpp"
+#include "cli/ShownPaths.hpp"
+#include "cli/TextArguments.hpp"
+#include "output/NameForms.hpp"
+#include "output/Output.hpp"
+#include "output/Progress.hpp"
+#include "project/ProjectCommand.hpp"
+#include "sync/Commands.hpp"
+#include "sync/Losses.hpp"
+#include "sync/RuleForms.hpp"
+
+namespace projectctl {
+
+namespace {
+
+using project::session::SyncPlan;
+using project::session::SyncRule;
+
+/// Brings the folders that have rules up to date, and sets, removes and lists these rules.
+class SyncCommand : public ProjectCommand {
+public:
+    CLI::App* declare(CLI::App& tool) override {
+        auto* const app = tool.add_subcommand("sync");
+        auto* const rule = completes(takeText(*app, "--rule", folder_), Completes::Folders);
+        for (auto* const patterns :
+             {takeTexts(*app, "--include", included_), takeTexts(*app, "--exclude", excluded_)}) {
+            patterns->allow_extra_args(false)->needs(rule);
+        }
+        app->add_flag("--no-gitignore", ignoresNothing_)->needs(rule);
+        auto* const removed = completes(takeText(*app, "--remove-rule", removed_), Completes::Folders);
+        auto* const force = app->add_flag("--force", isForced_);
+        auto* const rules = app->add_flag("--rules", listsRules_);
+        rule->excludes(removed)->excludes(rules)->excludes(force);
+        removed->excludes(rules)->excludes(force);
+        rules->excludes(force);
+        dryRun_.declare(*app);
+        return app;
+    }
+
+    int run(OpenProject& project) override {
+        if (listsRules_) {
+            writeRules(project);
+        } else if (folder_) {
+            setRule(project);
+        } else if (removed_) {
+            removeRule(project);
+        } else {
+            synchronise(project);
+        }
+        return exit_code::done;
+    }
+
+private:
+    void setRule(OpenProject& project) const {
+        SyncRule const rule{absolutePath(*folder_), patternsOf(included_), patternsOf(excluded_),
+                            !ignoresNothing_};
+        ProjectTransaction transaction(project);
+        project.session().setSyncRule(rule);
+        if (dryRun_.end(transaction, project)) {
+            auto const plan = project.session().planSync();
+            output().say(Message("SyncRuleSet", plan.added.size(), plan.removed.size()).text());
+        }
+    }
+
+    void removeRule(OpenProject& project) const {
+        ProjectTransaction transaction(project);
+        auto const folder = absolutePath(*removed_);
+        if (!project.session().removeSyncRule(folder)) {
+            throw Failure(Message("SyncRuleUnknown", ShownPaths(project.root()).ofAbsolute(folder)));
+        }
+        dryRun_.end(transaction, project);
+    }
+
+    void synchronise(OpenProject& project) const {
+        Progress const progress(Message("ProgressSync"));
+        auto const seen = project.session().planSync();
+        warnOfUnreadable(seen);
+        if (seen.isEmpty()) {
+            output().say(Message("SyncNothing").text());
+            return;
+        }
+        requireFolders(project, seen);
+        ProjectTransaction transaction(project);
+        auto const plan = project.session().sync({isForced_});
+        for (auto const& file : plan.added) {
+            project.stageReturnedLater({file.path});
+        }
+        project.changedFiles().listed += plan.added.size() + plan.removed.size();
+        Losses(project, plan).warn();
+        if (dryRun_.end(transaction, project)) {
+            output().say(Message("SyncDone", plan.added.size(), plan.removed.size()).text());
+        }
+    }
+
+    void requireFolders(OpenProject& project, SyncPlan const& plan) const {
+        if (!plan.missing.empty() && !isForced_) {
+            auto shown = ShownPaths(project.root());
+            throw Failure(Message("SyncFolderMissing", shown.ofAbsolute(plan.missing.front())));
+        }
+    }
+
+    static void warnOfUnreadable(SyncPlan const& plan) {
+        for (auto const& line : plan.unreadable) {
+            printError("warning: " + line);
+        }
+    }
+
+    static std::set<std::u16string> patternsOf(std::vector<std::string> const& arguments) {
+        std::set<std::u16string> result;
+        for (auto const& argument : arguments) {
+            if (argument.empty()) {
+                throw WrongUse(Message("SyncPatternEmpty"));
+            }
+            result.insert(textOf(argument));
+        }
+        return result;
+    }
+
+    std::optional<std::string> folder_;
+    std::optional<std::string> removed_;
+    std::vector<std::string> included_;
+    std::vector<std::string> excluded_;
+    bool ignoresNothing_ = false;
+    bool listsRules_ = false;
+    bool isForced_ = false;
+    DryRun dryRun_;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeSyncCommand() {
+    return std::make_unique<SyncCommand>();
+}
+
+} // namespace projectctl
