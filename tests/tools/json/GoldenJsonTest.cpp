@@ -118,5 +118,21 @@ TEST_F(GoldenJson, findingsAndErrorsHaveTheDocumentsOfTheirVersions) {
     expectGolden(tool({"remove", "nothing", "--json"}).errors);
 }
 
+TEST_F(GoldenJson, synchronisationsHaveTheDocumentsOfTheirVersions) {
+    ASSERT_THAT(tool({"init"}), SucceedsSilently());
+    ASSERT_EQ(tool({"batch"},
+                   "add -r src\ncategory create Status\nlabel create Status Open\n"
+                   "label put Status Open src/gone\nentry set src/gone\n"
+                   "sync --rule src --include '**/*.c' --include '*.h' --exclude out --no-gitignore\n"
+                   "sync --rule .\n")
+                  .exitCode,
+              0);
+    folder_.remove(u"engine/src/gone");
+    folder_.addFile("engine/src/io/new.c");
+
+    golden({"sync", "--rules"});
+    golden({"sync"});
+}
+
 } // namespace
 } // namespace project::test

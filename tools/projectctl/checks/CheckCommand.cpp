@@ -7,6 +7,7 @@
 #include "checks/Commands.hpp"
 #include "checks/FindingForms.hpp"
 #include "checks/MergeSetupCheck.hpp"
+#include "checks/SyncCheck.hpp"
 #include "checks/TreeCheck.hpp"
 #include "cli/CodedFailure.hpp"
 #include "cli/ExitCode.hpp"
@@ -69,9 +70,10 @@ public:
             write(found, form, shownDefinition(project));
         }
         auto const count = countFaults(found);
-        bool const isOfSetup = std::ranges::all_of(
-            found, [](Finding const& finding) { return !finding.isFault() || isAboutSetup(finding); });
-        output().say(Message(count == 0 ? "NoFaults" : isOfSetup ? "AdviceSetup" : adviceFor(faults)));
+        output().say(Message(count == 0                       ? "NoFaults"
+                             : areAll(found, &isAboutSetup)   ? "AdviceSetup"
+                             : areAll(found, &isAboutFolders) ? "AdviceSync"
+                                                              : adviceFor(faults)));
         return count == 0 ? exit_code::done : exit_code::finding;
     }
 
@@ -97,6 +99,7 @@ private:
         }
         auto const root = project.root();
         append(result, TreeCheck(project, isJson_ ? ShownPaths::fromRoot(root) : ShownPaths(root)).run());
+        append(result, findOutOfDate(project, isJson_ ? ShownPaths::fromRoot(root) : ShownPaths(root)));
         placeInText(result, project);
         if (!project.isInTransaction()) { // otherwise it has been read already
             append(result, personalFindings(project));
@@ -123,13 +126,22 @@ private:
 
     static bool isAboutSetup(Finding const& finding) { return finding.code.starts_with("merge-"); }
 
+    static bool isAboutFolders(Finding const& finding) { return finding.code.starts_with("sync-"); }
+
+    /// Whether all faults are about a subject.
+    static bool areAll(Findings const& findings, bool (*isAbout)(Finding const&)) {
+        return std::ranges::all_of(
+            findings, [isAbout](Finding const& finding) { return !finding.isFault() || isAbout(finding); });
+    }
+
     /// Faults of the text itself are shown with their lines.
     static void writeText(Findings const& findings, std::string const& file) {
         for (auto const& finding : findings) {
             bool const hasLine = finding.line > 0 && !finding.address;
             auto const place = file + (hasLine ? ':' + std::to_string(finding.line) : std::string()) + ": ";
             auto const mark = finding.isFault() ? std::string() : Message("NoteMark").text() + ": ";
-            auto const begin = withoutControls((isAboutSetup(finding) ? std::string() : place) + mark, false);
+            bool const isInText = !isAboutSetup(finding) && !isAboutFolders(finding);
+            auto const begin = withoutControls((isInText ? place : std::string()) + mark, false);
             output().text() += colored(finding.isFault() ? Color::Fault : Color::Note, begin) +
                                withoutControls(finding.text, false) + '\n';
         }

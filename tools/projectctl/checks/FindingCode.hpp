@@ -36,6 +36,11 @@ inline constexpr std::string_view referenceTypeUnsupported = "reference-type-uns
 inline constexpr std::string_view referenceFolderMissing = "reference-folder-missing";
 inline constexpr std::string_view referenceProjectMissing = "reference-project-missing";
 
+// Folders that keep themselves up to date.
+inline constexpr std::string_view syncNew = "sync-new";
+inline constexpr std::string_view syncGone = "sync-gone";
+inline constexpr std::string_view syncFolderMissing = "sync-folder-missing";
+
 // Anything else in the definition.
 inline constexpr std::string_view nodeMissing = "node-missing";
 inline constexpr std::string_view dataUnused = "data-unused";

@@ -9,6 +9,7 @@
 #include "checks/Problems.hpp"
 #include "checks/RenameForms.hpp"
 #include "checks/StatusScan.hpp"
+#include "checks/SyncCheck.hpp"
 #include "cli/ExitCode.hpp"
 #include "cli/ShownPaths.hpp"
 #include "git/GitIgnore.hpp"
@@ -48,8 +49,10 @@ public:
         for (auto const& line : scan.unreadable()) {
             printWarning(Message("AsReported", line));
         }
+        auto const shown = isJson_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_);
         Differences found{leavesOutIgnored_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),
-                          findProblems(project, isJson_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_))};
+                          findProblems(project, shown)};
+        append(found.problems, findOutOfDate(project, shown));
         if (project.log() == nullptr) { // git merges no log
             checkMergeSetup(root_, found.problems);
         }

@@ -37,6 +37,8 @@ inline constexpr JsonFormat resolve{"projectctl-resolve", 1};
 inline constexpr JsonFormat root{"projectctl-root", 1};
 inline constexpr JsonFormat status{"projectctl-status", 1};
 inline constexpr JsonFormat statusRenames{"projectctl-status-renames", 1};
+inline constexpr JsonFormat sync{"projectctl-sync", 1};
+inline constexpr JsonFormat syncRules{"projectctl-sync-rules", 1}; ///< of `sync --rules`
 inline constexpr JsonFormat version{"projectctl-version", 1};
 inline constexpr JsonFormat watch{"projectctl-watch", 2}; ///< of the first line; the others are its events
 

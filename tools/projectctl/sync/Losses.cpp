@@ -17,7 +17,7 @@ void Losses::warn() {
     for (auto const& removed : plan_.removed) {
         if (removed.isAnythingLost()) {
             Message const loss("SyncLoss", shown_.ofAbsolute(removed.file.path), described(removed));
-            printError("warning: " + loss.text());
+            printWarning(loss.text());
         }
     }
 }
@@ -25,8 +25,8 @@ void Losses::warn() {
 std::string Losses::described(RemovedFile const& file) const {
     std::string result;
     auto const add = [&result](std::string const& text) { result += (result.empty() ? "" : ", ") + text; };
-    for (auto const& label : file.labels) {
-        add(Message("SyncLostLabel", nameOf(label)).text());
+    for (auto const& label : labelsOf(file)) {
+        add(Message("SyncLostLabel", label).text());
     }
     for (auto const& entryPoint : file.entryPoints) {
         add(Message("SyncLostEntry", entryPoint).text());
@@ -34,18 +34,26 @@ std::string Losses::described(RemovedFile const& file) const {
     return result;
 }
 
-/// CATEGORY=LABEL; a UUID in place of a name that is not there any more.
-std::string Losses::nameOf(LabelChoice const& label) const {
+std::vector<std::u16string> Losses::labelsOf(RemovedFile const& file) const {
+    std::vector<std::u16string> result;
+    for (auto const& label : file.labels) {
+        result.push_back(nameOf(label));
+    }
+    return result;
+}
+
+/// A UUID in place of a name that is not there any more.
+std::u16string Losses::nameOf(LabelChoice const& label) const {
     auto const nameAt = [this](MetadataPath const& address, std::u16string const& uuid) {
         auto const node = project_.store().getNode(address);
         auto const name = node ? node->get(categorySchema::labelNameKey) : std::u16string();
-        return bytesOf(name.empty() ? uuid : name);
+        return name.empty() ? uuid : name;
     };
     auto const category =
         MetadataPath::root()
             .child(PathElement(categorySchema::categoriesType, project::metadata::schema::rootLocation))
             .child(PathElement(categorySchema::categoryType, label.categoryUUID));
-    return nameAt(category, label.categoryUUID) + '=' +
+    return nameAt(category, label.categoryUUID) + u'=' +
            nameAt(category.child(PathElement(categorySchema::labelType, label.labelUUID)), label.labelUUID);
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "cli/ShownPaths.hpp"
 #include "project/OpenProject.hpp"
@@ -17,9 +18,12 @@ public:
     /// Writes a warning for each file that loses something.
     void warn();
 
+    /// The labels that a file loses, in the form CATEGORY=LABEL.
+    std::vector<std::u16string> labelsOf(project::session::RemovedFile const& file) const;
+
 private:
     std::string described(project::session::RemovedFile const& file) const;
-    std::string nameOf(project::session::LabelChoice const& label) const;
+    std::u16string nameOf(project::session::LabelChoice const& label) const;
 
     OpenProject& project_;
     project::session::SyncPlan const& plan_;

@@ -4,8 +4,10 @@
 #include <string>
 
 #include "cli/ShownPaths.hpp"
+#include "output/JsonRows.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
 
 namespace projectctl {
 
@@ -27,6 +29,18 @@ void writeRules(OpenProject& project) {
         writeOptions(" --exclude ", rule.excluded);
         output().text() += rule.usesGitIgnore ? "\n" : " --no-gitignore\n";
     }
+}
+
+void writeRulesAsJson(OpenProject& project) {
+    JsonRows rows(json::syncRules, "rules");
+    for (auto const& rule : project.session().syncRules()) {
+        rows.begin();
+        rows.addText("folder", project::metadata::getRelativePath(project.root(), rule.folder));
+        rows.addList("include", {rule.included.begin(), rule.included.end()});
+        rows.addList("exclude", {rule.excluded.begin(), rule.excluded.end()});
+        rows.addFlag("gitignore", rule.usesGitIgnore);
+    }
+    rows.finish();
 }
 
 } // namespace projectctl

@@ -8,4 +8,7 @@ namespace projectctl {
 /// --rule` that set it, as words of a shell.
 void writeRules(OpenProject& project);
 
+/// Writes them as a JSON document.
+void writeRulesAsJson(OpenProject& project);
+
 } // namespace projectctl

@@ -15,6 +15,7 @@
 #include "project/ProjectCommand.hpp"
 #include "sync/Commands.hpp"
 #include "sync/Losses.hpp"
+#include "sync/PlanJson.hpp"
 #include "sync/RuleForms.hpp"
 
 namespace projectctl {
@@ -47,7 +48,7 @@ public:
 
     int run(OpenProject& project) override {
         if (listsRules_) {
-            writeRules(project);
+            dryRun_.isJson() ? writeRulesAsJson(project) : writeRules(project);
         } else if (folder_) {
             setRule(project);
         } else if (removed_) {
@@ -84,6 +85,7 @@ private:
         auto const seen = project.session().planSync();
         warnOfUnreadable(seen);
         if (seen.isEmpty()) {
+            report(seen, project);
             output().say(Message("SyncNothing").text());
             return;
         }
@@ -94,9 +96,20 @@ private:
             project.stageReturnedLater({file.path});
         }
         project.changedFiles().listed += plan.added.size() + plan.removed.size();
-        Losses(project, plan).warn();
+        report(plan, project);
+        if (dryRun_.isOn() && dryRun_.isJson()) {
+            return; // the document contains the changes
+        }
         if (dryRun_.end(transaction, project)) {
             output().say(Message("SyncDone", plan.added.size(), plan.removed.size()).text());
+        }
+    }
+
+    void report(SyncPlan const& plan, OpenProject& project) const {
+        if (dryRun_.isJson()) {
+            writeAsJson(plan, !dryRun_.isOn(), project);
+        } else {
+            Losses(project, plan).warn();
         }
     }
 
@@ -109,7 +122,7 @@ private:
 
     static void warnOfUnreadable(SyncPlan const& plan) {
         for (auto const& line : plan.unreadable) {
-            printError("warning: " + line);
+            printWarning(line);
         }
     }
 
