@@ -92,20 +92,20 @@ TEST_F(SyncCommand, aDryRunShowsEverythingAndChangesNothing) {
     auto const result = tool({"sync", "--dry-run"});
 
     EXPECT_EQ(result.exitCode, 0);
-    EXPECT_EQ(result.output, "add src/io\nadd src/io/new.c\nremove src/old.c\nentry remove src/old.c\n");
+    EXPECT_EQ(result.output, "entry remove src/old.c\nadd src/io\nadd src/io/new.c\nremove src/old.c\n");
     EXPECT_EQ(result.errors, "projectctl: warning: \"src/old.c\" is gone from disk and loses the label "
                              "Status=Open, the entry point Main\n");
     EXPECT_EQ(readText(), before);
 
     auto const json = tool({"sync", "--dry-run", "--json"});
 
-    EXPECT_EQ(json.output,
-              "{\"format\": \"projectctl-sync\", \"version\": 1, \"applied\": false, \"added\": [\n"
-              "{\"path\": \"src/io/new.c\", \"kind\": \"file\"}\n"
-              "], \"removed\": [\n"
-              "{\"path\": \"src/old.c\", \"kind\": \"file\", \"labels\": [\"Status=Open\"], "
-              "\"entryPoints\": [\"Main\"]}\n"
-              "]}\n");
+    EXPECT_EQ(json.output, "{\"format\": \"projectctl-sync\", \"version\": 1, \"applied\": false, "
+                           "\"renamed\": [], \"added\": [\n"
+                           "{\"path\": \"src/io/new.c\", \"kind\": \"file\"}\n"
+                           "], \"removed\": [\n"
+                           "{\"path\": \"src/old.c\", \"kind\": \"file\", \"labels\": [\"Status=Open\"], "
+                           "\"entryPoints\": [\"Main\"]}\n"
+                           "]}\n");
     EXPECT_EQ(readText(), before);
 }
 
@@ -271,6 +271,29 @@ TEST_F(SyncCommandInRepository, aCommitHookRefusesAFileThatIsNotListed) {
 
     ASSERT_THAT(tool({"sync"}), SucceedsSilently());
     EXPECT_EQ(git_.tryTo({"commit", "-q", "-m", "listed"}).exitCode, 0);
+}
+
+TEST_F(SyncCommandInRepository, renamedFilesKeepTheirLabels) {
+    folder_.file(u"src/a.c", "the first\n");
+    folder_.file(u"src/b.c", "the second\n");
+    ASSERT_EQ(tool({"batch"}, "add -r src\nsync --rule src\nlabel put Status Open src/a.c\n").exitCode, 0);
+    commit("src");
+    std::filesystem::create_directories(inFolder("src/io"));
+    std::filesystem::rename(inFolder("src/a.c"), inFolder("src/io/new.c"));
+    folder_.file(u"src/c.c", "the third\n");
+    folder_.remove(u"src/b.c");
+    auto const before = readText();
+
+    auto const dryRun = tool({"sync", "--dry-run", "--json"});
+
+    EXPECT_THAT(dryRun.output,
+                HasSubstr("\"renamed\": [\n{\"from\": \"src/a.c\", \"to\": \"src/io/new.c\"}\n]"));
+    EXPECT_EQ(readText(), before);
+
+    EXPECT_THAT(tool({"sync"}), SucceedsSilently());
+
+    EXPECT_THAT(tool({"list", "--label", "Status=Open"}), Prints("src/io/new.c\n"));
+    EXPECT_EQ(list(), (Lines{"a", "b", "c", "src", "src/c.c", "src/io", "src/io/new.c"}));
 }
 
 TEST_F(SyncCommandInRepository, rulesOfTwoPeopleMerge) {

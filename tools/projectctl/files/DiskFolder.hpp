@@ -1,5 +1,6 @@
 #pragma once
 
+#include "output/Kind.hpp"
 #include "project/session/DiskFolder.hpp"
 
 namespace projectctl {

@@ -19,9 +19,18 @@ void addFile(JsonRows& rows, FoundFile const& file, OpenProject& project) {
 
 } // namespace
 
-void writeAsJson(SyncPlan const& plan, bool isApplied, OpenProject& project) {
+void writeAsJson(std::vector<project::session::Move> const& renamed, SyncPlan const& plan, bool isApplied,
+                 OpenProject& project) {
     JsonDocument document(json::sync);
     document.addFlag("applied", isApplied);
+    document.addKey("renamed");
+    JsonRows moves;
+    for (auto const& move : renamed) {
+        moves.begin();
+        moves.addText("from", project::metadata::getRelativePath(project.root(), move.from));
+        moves.addText("to", project::metadata::getRelativePath(project.root(), move.to));
+    }
+    moves.finish();
     document.addKey("added");
     JsonRows added;
     for (auto const& file : plan.added) {

@@ -1,11 +1,14 @@
 #pragma once
 
+#include <vector>
+
 #include "project/OpenProject.hpp"
 
 namespace projectctl {
 
 /// Writes the changes of a synchronisation to standard output, as a JSON document.
-/// @param isApplied whether they were made.
-void writeAsJson(project::session::SyncPlan const& plan, bool isApplied, OpenProject& project);
+/// @param renamed the files that the project has followed. @param isApplied whether the changes were made.
+void writeAsJson(std::vector<project::session::Move> const& renamed, project::session::SyncPlan const& plan,
+                 bool isApplied, OpenProject& project);
 
 } // namespace projectctl

@@ -14,6 +14,7 @@
 #include "output/Progress.hpp"
 #include "project/ProjectCommand.hpp"
 #include "sync/Commands.hpp"
+#include "sync/Followed.hpp"
 #include "sync/Losses.hpp"
 #include "sync/PlanJson.hpp"
 #include "sync/RuleForms.hpp"
@@ -24,6 +25,8 @@ namespace {
 
 using project::session::SyncPlan;
 using project::session::SyncRule;
+
+using Moves = std::vector<project::session::Move>;
 
 /// Brings the folders that have rules up to date, and sets, removes and lists these rules.
 class SyncCommand : public ProjectCommand {
@@ -85,29 +88,40 @@ private:
         auto const seen = project.session().planSync();
         warnOfUnreadable(seen);
         if (seen.isEmpty()) {
-            report(seen, project);
+            report({}, seen, project);
             output().say(Message("SyncNothing").text());
             return;
         }
-        requireFolders(project, seen);
         ProjectTransaction transaction(project);
+        auto const renamed = followRenames(project, seen);
+        requireFolders(project, project.session().planSync());
         auto const plan = project.session().sync({isForced_});
-        for (auto const& file : plan.added) {
-            project.stageReturnedLater({file.path});
-        }
-        project.changedFiles().listed += plan.added.size() + plan.removed.size();
-        report(plan, project);
+        note(renamed, plan, project);
+        report(renamed, plan, project);
         if (dryRun_.isOn() && dryRun_.isJson()) {
             return; // the document contains the changes
         }
         if (dryRun_.end(transaction, project)) {
-            output().say(Message("SyncDone", plan.added.size(), plan.removed.size()).text());
+            output().say(Message("SyncDone", plan.added.size(), plan.removed.size(), renamed.size()).text());
         }
     }
 
-    void report(SyncPlan const& plan, OpenProject& project) const {
+    /// Notes what is staged at the end of the command, and how many files have changed.
+    static void note(Moves const& renamed, SyncPlan const& plan, OpenProject& project) {
+        std::vector<Path> files;
+        for (auto const& move : renamed) {
+            files.push_back(move.to);
+        }
+        for (auto const& file : plan.added) {
+            files.push_back(file.path);
+        }
+        project.stageReturnedLater(files);
+        project.changedFiles().listed += files.size() + plan.removed.size();
+    }
+
+    void report(Moves const& renamed, SyncPlan const& plan, OpenProject& project) const {
         if (dryRun_.isJson()) {
-            writeAsJson(plan, !dryRun_.isOn(), project);
+            writeAsJson(renamed, plan, !dryRun_.isOn(), project);
         } else {
             Losses(project, plan).warn();
         }
