@@ -31,7 +31,7 @@ void DiskComparison::compare(Path const& folder, Address const& address, FileLev
     try {
         onDisk = readDiskFolder(folder);
     } catch (std::system_error const& error) {
-        found_.unreadable.emplace_back(error.what());
+        found_.unreadable.push_back({folder, error.code()});
     }
     std::size_t nextFile = 0;
     std::size_t nextEntry = 0;

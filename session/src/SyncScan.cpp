@@ -152,7 +152,7 @@ void SyncScan::readNew(Path const& folder, std::vector<FoundFile>& found) {
             found.push_back({folder / Path(entry.name), entry.kind});
         }
     } catch (std::system_error const& error) {
-        plan_.unreadable.emplace_back(error.what());
+        plan_.unreadable.push_back({folder, error.code()});
     }
 }
 

@@ -12,6 +12,7 @@
 #include "checks/SyncCheck.hpp"
 #include "cli/ExitCode.hpp"
 #include "cli/ShownPaths.hpp"
+#include "files/DiskFolder.hpp"
 #include "git/GitIgnore.hpp"
 #include "output/Colors.hpp"
 #include "output/JsonRows.hpp"
@@ -46,8 +47,8 @@ public:
         project.warnOfDamage();
         project.warnOfUnfinishedMove();
         auto const scan = compare(project);
-        for (auto const& line : scan.unreadable()) {
-            printWarning(Message("AsReported", line));
+        for (auto const& folder : scan.unreadable()) {
+            printWarning(Message("AsReported", problemOf(folder)));
         }
         auto const shown = isJson_ ? ShownPaths::fromRoot(root_) : ShownPaths(root_);
         Differences found{leavesOutIgnored_ ? withoutIgnored(scan.added()) : scan.added(), scan.gone(),

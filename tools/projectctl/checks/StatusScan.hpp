@@ -1,6 +1,5 @@
 #pragma once
 
-#include <string>
 #include <vector>
 
 #include "output/Progress.hpp"
@@ -25,8 +24,10 @@ public:
     /// The files and folders that are in the project but not on disk.
     std::vector<File> const& gone() const noexcept { return found_.gone; }
 
-    /// One line for each folder that could not be read.
-    std::vector<std::string> const& unreadable() const noexcept { return found_.unreadable; }
+    /// The folders that could not be read.
+    std::vector<project::session::UnreadableFolder> const& unreadable() const noexcept {
+        return found_.unreadable;
+    }
 
 private:
     OpenProject& project_;

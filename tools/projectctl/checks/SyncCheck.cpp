@@ -10,7 +10,7 @@ namespace projectctl {
 Findings findOutOfDate(OpenProject& project, ShownPaths shown) {
     Findings result;
     auto const add = [&](std::string_view code, char const* text, Path const& path) {
-        result.push_back(Finding::fault(code, Message(text, shown.ofAbsolute(path)).text())
+        result.push_back(Finding::fault(code, Message(text, shown.ofAbsolute(path)))
                              .about(project::metadata::getRelativePath(project.root(), path)));
     };
     auto const plan = project.session().planSync();

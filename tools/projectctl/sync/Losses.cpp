@@ -16,8 +16,7 @@ using project::session::RemovedFile;
 void Losses::warn() {
     for (auto const& removed : plan_.removed) {
         if (removed.isAnythingLost()) {
-            Message const loss("SyncLoss", shown_.ofAbsolute(removed.file.path), described(removed));
-            printWarning(loss.text());
+            printWarning(Message("SyncLoss", shown_.ofAbsolute(removed.file.path), described(removed)));
         }
     }
 }

@@ -9,6 +9,7 @@
 #include "cli/PathArguments.hpp"
 #include "cli/ShownPaths.hpp"
 #include "cli/TextArguments.hpp"
+#include "files/DiskFolder.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
@@ -70,7 +71,7 @@ private:
         project.session().setSyncRule(rule);
         if (dryRun_.end(transaction, project)) {
             auto const plan = project.session().planSync();
-            output().say(Message("SyncRuleSet", plan.added.size(), plan.removed.size()).text());
+            output().say(Message("SyncRuleSet", plan.added.size(), plan.removed.size()));
         }
     }
 
@@ -89,7 +90,7 @@ private:
         warnOfUnreadable(seen);
         if (seen.isEmpty()) {
             report({}, seen, project);
-            output().say(Message("SyncNothing").text());
+            output().say(Message("SyncNothing"));
             return;
         }
         ProjectTransaction transaction(project);
@@ -102,7 +103,7 @@ private:
             return; // the document contains the changes
         }
         if (dryRun_.end(transaction, project)) {
-            output().say(Message("SyncDone", plan.added.size(), plan.removed.size(), renamed.size()).text());
+            output().say(Message("SyncDone", plan.added.size(), plan.removed.size(), renamed.size()));
         }
     }
 
@@ -135,8 +136,8 @@ private:
     }
 
     static void warnOfUnreadable(SyncPlan const& plan) {
-        for (auto const& line : plan.unreadable) {
-            printWarning(line);
+        for (auto const& folder : plan.unreadable) {
+            printWarning(Message("AsReported", problemOf(folder)));
         }
     }
 

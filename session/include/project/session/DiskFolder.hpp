@@ -2,6 +2,7 @@
 
 #include <string>
 #include <string_view>
+#include <system_error>
 #include <vector>
 
 #include "fl/filesystem/Path.hpp"
@@ -16,6 +17,12 @@ using fl::filesystem::Path;
 struct DiskEntry {
     std::u16string name;
     FileKind kind;
+};
+
+/// A folder that cannot be read.
+struct UnreadableFolder {
+    Path folder;
+    std::error_code problem;
 };
 
 /// The entries of a folder on disk, sorted by name in code units.

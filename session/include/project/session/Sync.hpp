@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "fl/filesystem/Path.hpp"
+#include "project/session/DiskFolder.hpp"
 #include "project/session/Query.hpp"
 
 namespace project::session {
@@ -61,8 +62,8 @@ struct SyncPlan {
     /// the rule would remove.
     std::vector<fl::filesystem::Path> missing;
 
-    /// One line for each folder that could not be read. What is in it stays as it is.
-    std::vector<std::string> unreadable;
+    /// Folders that could not be read. What is in them stays as it is.
+    std::vector<UnreadableFolder> unreadable;
 
     bool isEmpty() const noexcept { return added.empty() && removed.empty(); }
 };

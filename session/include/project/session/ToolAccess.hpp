@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "project/session.hpp"
+#include "project/session/DiskFolder.hpp"
 #include "project/session/FileLevel.hpp"
 #include "project/session/Query.hpp"
 #include "project/stores/Change.hpp"
@@ -41,7 +42,7 @@ struct DiskDifferences {
 
     std::vector<FoundFile> gone; ///< in the project but not on disk; a folder before its contents
 
-    std::vector<std::string> unreadable; ///< one line for each folder that could not be read
+    std::vector<UnreadableFolder> unreadable;
 };
 
 /// The parts of a session that only projectctl needs: it checks, repairs and merges the text itself.
