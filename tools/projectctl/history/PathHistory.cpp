@@ -4,10 +4,11 @@ namespace projectctl {
 
 using project::stores::DefinitionChange;
 
+using Subject = DefinitionChange::Subject;
+
 namespace {
 
-bool concernsPaths(DefinitionChange::Subject subject) {
-    using Subject = DefinitionChange::Subject;
+bool concernsPaths(Subject subject) {
     return subject == Subject::File || subject == Subject::FileLabel || subject == Subject::FileData ||
            subject == Subject::EntryPoint || subject == Subject::ProjectPath || subject == Subject::Reference;
 }
