@@ -119,11 +119,11 @@ void TreeCheck::checkFile(Address const& file) {
         return; // the files below it are reported
     }
     auto const above = file.parent();
-    bool const isListed = file[0].getLocation() == treeSchema::files::fileListScope;
-    if (isListed && above.depth() > 1 && !store_.hasNode(above)) {
+    bool const isRule = file[0].getLocation() == treeSchema::sync::rulesScope; // folders above need none
+    if (!isRule && above.depth() > 1 && !store_.hasNode(above)) {
         add(Finding::fault(code::folderNotListed, Message("FolderNotListed", shown_.of(pathOf(file)))), file);
     }
-    if (isListed) {
+    if (file[0].getLocation() == treeSchema::rootLocation) {
         auto const path = pathOf(file);
         CheckedFile const subject{path, [&file] { return file; }};
         checkName(subject, shown_, findings_);
