@@ -1,4 +1,5 @@
 #include "postgresql/tool/SharedToolTest.hpp"
+#include "tools/json/GoldenDocument.hpp"
 
 namespace project::test {
 namespace {
@@ -61,6 +62,39 @@ TEST_F(SharedGroup, rolesShowsWhoHasAccess) {
     EXPECT_THAT(tool({"shared", "roles"}),
                 Prints("reader\t" + reader_ + "\tanna\trita\nwriter\t" + writer_ + "\tanna\n"));
     EXPECT_EQ(elsewhere({"shared", "roles"}).exitCode, 0);
+}
+
+TEST_F(SharedGroup, writesTheJsonDocumentsOfItsVersions) {
+    auto const host =
+        sharedServer().query("SELECT host FROM pm.entry WHERE project = '" + id() + "' LIMIT 1");
+    GoldenDocument const golden(
+        {{reader_, "readers"}, {writer_, "writers"}, {"\"" + host + "\"", "\"host\""}});
+    auto const expectGolden = [&](std::vector<std::string> command) {
+        command.emplace_back("--json");
+        auto const result = tool(command);
+        EXPECT_EQ(result.errors, "") << ::testing::PrintToString(command);
+        golden.expect(result.output);
+    };
+    elsewhere({"name", "Pump"});
+
+    expectGolden({"shared", "status"});
+    expectGolden({"shared", "roles"});
+    expectGolden({"shared", "log"});
+    EXPECT_THAT(tool({"shared", "log", "--lines", "--count", "1", "--json"}).output,
+                AllOf(HasSubstr(R"("kind": "batch", "lines": [")"), HasSubstr("Pump")));
+    query("UPDATE pm.entry SET at = at - interval '10 days'");
+    expectGolden({"shared", "tidy", "--keep", "5"});
+}
+
+TEST_F(SharedGroup, statusInJsonSaysThatTheServerWasReset) {
+    tool({"name", "Pump"});
+    deleteNewestEntry();
+
+    auto const status = tool({"shared", "status", "--json"});
+
+    EXPECT_EQ(status.exitCode, 3);
+    EXPECT_THAT(status.output, HasSubstr(R"("history": "reset", "seenVersion": 2)"));
+    EXPECT_THAT(status.errors, HasSubstr("This is accepted from now on"));
 }
 
 TEST_F(SharedGroup, tidyDeletesOldHistoryForTheOwnerOnly) {

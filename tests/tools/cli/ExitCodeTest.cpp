@@ -6,6 +6,7 @@
 #include "output/Failure.hpp"
 #include "project/git/GitError.hpp"
 #include "project/stores/StoreError.hpp"
+#include "support/GitFolder.hpp"
 #include "tools/ToolTest.hpp"
 
 namespace project::test {
@@ -43,6 +44,35 @@ TEST_F(ExitCodes, areInTheHelp) {
     EXPECT_THAT(tool({"--help"}).output,
                 AllOf(HasSubstr("Exit codes:\n  0  done\n  1  "),
                       HasSubstr("\n  3  done, and a fault was found"), HasSubstr("\n  8  the outcome")));
+}
+
+TEST(ExitCode, hasAWordOfItsOwn) {
+    std::set<std::string_view> words;
+    for (int code = projectctl::exit_code::done; code <= projectctl::exit_code::outcomeUnknown; ++code) {
+        words.insert(projectctl::nameOf(code));
+    }
+    EXPECT_EQ(words.size(), 9U);
+}
+
+TEST_F(ExitCodes, areInTheErrorsInJson) {
+    auto const expectError = [this](int code, std::string const& word, std::vector<std::string> command) {
+        command.emplace_back("--json");
+        EXPECT_THAT(tool(command), FailsInJsonWith(code, "\"code\": \"" + word + '"'));
+    };
+    GitFolder const git(folder_.onDisk());
+    folder_.addFile("a");
+    expectError(1, "failed", {"list"}); // no project
+    expectError(2, "wrong-use", {"list", "--unknown"});
+    initProject();
+    folder_.addFile(".git/index.lock");
+    expectError(4, "busy", {"add", "a"});
+    std::filesystem::remove(inFolder(".git/index.lock"));
+    auto const good = readText();
+    insertLineBefore(R"({"at":["Info")", "hello");
+    expectError(5, "damaged", {"add", "a"});
+    writeText(good);
+    insertLineBefore(R"({"at":["Info")", "<<<<<<< ours\n\"b\"\n=======\n\"c\"\n>>>>>>> theirs");
+    expectError(6, "conflict", {"add", "a"});
 }
 
 TEST_F(ExitCodes, distinguishAFindingAFailureAndAWrongUse) {

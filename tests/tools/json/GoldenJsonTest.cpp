@@ -1,16 +1,11 @@
-#include <cstdlib>
-#include <map>
-#include <regex>
-
+#include "support/GitFolder.hpp"
 #include "tools/ToolTest.hpp"
+#include "tools/json/GoldenDocument.hpp"
 
 namespace project::test {
 namespace {
 
-/// A project in which every verb has something to write. Its documents are compared with files that never
-/// change: a document of another form needs a new version.
-///
-/// With PROJECT_WRITE_GOLDEN in the environment, missing files are written.
+/// A project in which every verb has something to write.
 class GoldenJson : public ToolTest {
 protected:
     void SetUp() override {
@@ -22,38 +17,9 @@ protected:
         folder_.folder(u"pump");
     }
 
-    /// UUIDs, the folder and the version of the tool differ in each run, and sentences are for people.
-    std::string normalised(std::string text) const {
-        std::map<std::string, std::string> names;
-        std::regex const uuid("[0-9a-f]{8}(-[0-9a-f]{4}){3}-[0-9a-f]{12}");
-        for (std::smatch match; std::regex_search(text, match, uuid);) {
-            auto const& name = names.emplace(match[0], "UUID-" + std::to_string(names.size())).first->second;
-            text = match.prefix().str() + name + match.suffix().str();
-        }
-        for (auto const& [from, to] : {std::pair(folder_.onDisk().string(), std::string("/FOLDER")),
-                                       {std::string(PROJECTCTL_VERSION), std::string("0.0.0")}}) {
-            for (auto at = text.find(from); at != std::string::npos; at = text.find(from, at)) {
-                text.replace(at, from.size(), to);
-            }
-        }
-        return std::regex_replace(text, std::regex(R"re("text": "(\\.|[^"\\])*")re"), "\"text\": \"...\"");
-    }
-
-    /// Compares a document with the file of its format and version.
     void expectGolden(std::string const& document) const {
-        std::smatch head;
-        ASSERT_TRUE(std::regex_search(document, head,
-                                      std::regex(R"re(^\{"format": "([a-z-]+)", "version": (\d+))re")))
-            << document;
-        auto const name = head[1].str() + '-' + head[2].str() + ".json";
-        auto const file = std::filesystem::path(GOLDEN_JSON) / name;
-        auto const text = normalised(document);
-        if (!std::filesystem::exists(file) && std::getenv("PROJECT_WRITE_GOLDEN") != nullptr) {
-            std::ofstream(file, std::ios::binary) << text;
-        }
-        std::ifstream stored(file, std::ios::binary);
-        EXPECT_EQ(text, std::string(std::istreambuf_iterator<char>(stored), {}))
-            << name << " is another document. If that is intended, give the format a new version.";
+        GoldenDocument({{folder_.onDisk().string(), "/FOLDER"}, {PROJECTCTL_VERSION, "0.0.0"}})
+            .expect(document);
     }
 
     void golden(std::vector<std::string> command, std::string_view input = {}) const {
@@ -85,6 +51,8 @@ TEST_F(GoldenJson, everyVerbWritesTheDocumentOfItsVersion) {
     golden({"entry", "list"});
     golden({"group", "list"});
     golden({"reference", "list"});
+    golden({"export", "jsonl"});
+    golden({"help", "root"});
     golden({"batch", "--dry-run"},
            "name Motor\nlabel create Owner Bob\nlabel put Owner Bob src/io\nremove src/gone\n"
            "entry remove src/main.cpp\npath add src\ngroup delete Nightly\ncategory rename Owner Keeper\n");
@@ -132,6 +100,59 @@ TEST_F(GoldenJson, synchronisationsHaveTheDocumentsOfTheirVersions) {
 
     golden({"sync", "--rules"});
     golden({"sync"});
+}
+
+TEST_F(GoldenJson, ofImportAndExportListEverythingThatHasNoCounterpart) {
+    ASSERT_EQ(tool({"init"}).exitCode, 0);
+    auto const import =
+        tool({"import", "csv", "--json"},
+             "path,category,label\nsrc/main.cpp,Owner,@ann\nsrc/main.cpp,Owner,@ben\n../no,,\n");
+    EXPECT_EQ(import.exitCode, 3);
+    EXPECT_EQ(import.errors, "");
+    expectGolden(import.output);
+    golden({"export", "codeowners"});
+}
+
+TEST_F(GoldenJson, ofResolveShowsTheConflicts) {
+    GitFolder const git(settings_.folder);
+    ASSERT_EQ(tool({"init"}).exitCode, 0);
+    git.commitAll();
+    git.run({"switch", "-qc", "theirs"});
+    ASSERT_EQ(tool({"name", "Theirs"}).exitCode, 0);
+    git.commitAll();
+    git.run({"switch", "-q", "-"});
+    ASSERT_EQ(tool({"name", "Ours"}).exitCode, 0);
+    git.commitAll();
+    git.tryTo({"merge", "-q", "theirs"});
+
+    golden({"resolve", "--ours"});
+}
+
+TEST_F(GoldenJson, ofWatchShowsEachEvent) {
+    ASSERT_EQ(tool({"init"}).exitCode, 0);
+    ASSERT_EQ(tool({"add", "src/main.cpp"}).exitCode, 0);
+    ASSERT_EQ(tool({"category", "create", "Owner"}).exitCode, 0);
+    RunningProgram watching(commandFor({"watch", "--json"}), settings_);
+    std::string events = watching.readLine() + '\n';
+    auto const afterCommand = [&](std::vector<std::string> const& command) {
+        EXPECT_EQ(tool(command).exitCode, 0) << ::testing::PrintToString(command);
+        events += watching.readLine() + '\n';
+    };
+
+    afterCommand({"add", "src/io/pump.cpp"});
+    afterCommand({"category", "create", "Status"});
+    afterCommand({"label", "create", "Status", "Open"});
+    afterCommand({"label", "put", "Status", "Open", "src/main.cpp"});
+    afterCommand({"category", "rename", "Status", "State"});
+    afterCommand({"entry", "set", "src/main.cpp"});
+    afterCommand({"name", "Motor"});
+    afterCommand({"path", "add", "src"});
+    afterCommand({"reference", "add", "../pump"});
+    afterCommand({"description", "Turns"});
+    afterCommand({"category", "delete", "Owner"});
+
+    expectValid(events);
+    expectGolden(events);
 }
 
 } // namespace

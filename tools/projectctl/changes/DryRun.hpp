@@ -24,6 +24,9 @@ public:
     /// @return whether it was committed.
     bool end(ProjectTransaction& transaction, OpenProject& project) const;
 
+    /// Whether the command writes JSON.
+    bool isJson() const noexcept { return isJson_; }
+
 private:
     bool isOn_ = false;
     bool isJson_ = false;

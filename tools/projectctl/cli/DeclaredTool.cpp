@@ -7,6 +7,7 @@
 #include "cli/CommonOptions.hpp"
 #include "cli/HelpFormatter.hpp"
 #include "cli/UsageProblem.hpp"
+#include "cli/VerbTree.hpp"
 
 namespace projectctl {
 
@@ -22,7 +23,7 @@ std::unique_ptr<CLI::App> makeParser() {
 /// Every command whose results have a form in JSON accepts --json. Those that only change the project declare
 /// no form of their own.
 void declareJson(CLI::App& app) {
-    auto const members = app.get_subcommands([](auto const*) { return true; });
+    auto const members = membersOf(app);
     std::ranges::for_each(members, [](CLI::App* member) { declareJson(*member); });
     if (members.empty() && app.get_option_no_throw(DeclaredTool::jsonOption) == nullptr) {
         app.add_flag_callback(DeclaredTool::jsonOption, [] {});
@@ -49,9 +50,7 @@ void DeclaredTool::declare(NamedCommand const& verb) {
     auto command = verb.make();
     auto* const app = command->declare(*parser_);
     app->group(verb.purpose);
-    bool const writesTextOnly =
-        verb.name == "shared" || verb.name == "export" || std::string_view(verb.purpose).empty();
-    if (!writesTextOnly) {
+    if (!isHidden(*app)) {
         declareJson(*app);
     }
     declared_.push_back({std::move(command), app});

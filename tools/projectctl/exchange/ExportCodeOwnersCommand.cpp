@@ -6,6 +6,7 @@
 #include "exchange/ExportCommands.hpp"
 #include "exchange/OwnerCategory.hpp"
 #include "exchange/ProjectRows.hpp"
+#include "output/JsonRows.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "project/ProjectCommand.hpp"
@@ -17,7 +18,11 @@ namespace {
 /// Writes a rule for each file that has an owner.
 class ExportCodeOwnersCommand : public ProjectCommand {
 public:
-    CLI::App* declare(CLI::App& group) override { return group.add_subcommand("codeowners"); }
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand("codeowners");
+        app->add_flag("--json", isJson_);
+        return app;
+    }
 
     int run(OpenProject& project) override {
         project.warnOfDamage();
@@ -29,6 +34,9 @@ public:
             }
         });
         writeLine(unmapped);
+        if (isJson_) {
+            rows_.finish();
+        }
         return unmapped.report();
     }
 
@@ -55,14 +63,28 @@ private:
         }
         std::ranges::sort(owners_);
         if (auto const line = codeOwnersLine(bytesOf(path_), owners_)) {
-            output().text() += *line;
-            output().flushWhenLarge();
+            isJson_ ? writeRule() : write(*line);
         } else {
             unmapped.add(0, Message("LineEndInPattern", path_));
         }
         owners_.clear();
     }
 
+    static void write(std::string const& line) {
+        output().text() += line;
+        output().flushWhenLarge();
+    }
+
+    void writeRule() {
+        std::vector<std::u16string> owners(owners_.size());
+        std::ranges::transform(owners_, owners.begin(), textOf);
+        rows_.begin();
+        rows_.addText("path", path_);
+        rows_.addList("owners", owners);
+    }
+
+    JsonRows rows_{json::exportCodeOwners, "rules"};
+    bool isJson_ = false;
     std::u16string path_;
     std::vector<std::string> owners_;
 };

@@ -3,7 +3,7 @@
 #include "exchange/CsvText.hpp"
 #include "exchange/ExportCommands.hpp"
 #include "exchange/ProjectRows.hpp"
-#include "output/JsonObject.hpp"
+#include "output/JsonRows.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "project/FileList.hpp"
@@ -16,14 +16,18 @@ namespace {
 /// Writes a row for each label of each file.
 class ExportRowsCommand : public ProjectCommand {
 public:
+    explicit ExportRowsCommand(char const* form) : form_(form) {}
+
+    CLI::App* declare(CLI::App& group) override {
+        auto* const app = group.add_subcommand(form_);
+        app->add_flag("--json", isJson_);
+        return app;
+    }
+
     int run(OpenProject& project) override {
         project.warnOfDamage();
         Unmapped unmapped("export");
-        begin();
-        visitRows(project, unmapped, [this](FileRow const& row, Kind /*kind*/) {
-            write(row);
-            output().flushWhenLarge();
-        });
+        isJson_ ? writeDocument(project, unmapped) : writeRows(project, unmapped);
         return unmapped.report();
     }
 
@@ -31,11 +35,43 @@ protected:
     virtual void begin() const {}
 
     virtual void write(FileRow const& row) const = 0;
+
+    static void addMembers(JsonObject& object, FileRow const& row) {
+        object.addText("path", row.path);
+        if (!row.category.empty() || !row.label.empty()) {
+            object.addText("category", row.category);
+            object.addText("label", row.label);
+        }
+        if (!row.data.empty()) {
+            object.addText("data", row.data);
+        }
+    }
+
+private:
+    void writeRows(OpenProject& project, Unmapped& unmapped) const {
+        begin();
+        visitRows(project, unmapped, [this](FileRow const& row, Kind /*kind*/) {
+            write(row);
+            output().flushWhenLarge();
+        });
+    }
+
+    static void writeDocument(OpenProject& project, Unmapped& unmapped) {
+        JsonRows rows(json::exportRows, "rows");
+        visitRows(project, unmapped, [&rows](FileRow const& row, Kind /*kind*/) {
+            rows.begin();
+            addMembers(rows, row);
+        });
+        rows.finish();
+    }
+
+    char const* form_;
+    bool isJson_ = false;
 };
 
 class ExportCsvCommand : public ExportRowsCommand {
 public:
-    CLI::App* declare(CLI::App& group) override { return group.add_subcommand("csv"); }
+    ExportCsvCommand() : ExportRowsCommand("csv") {}
 
 protected:
     void begin() const override { appendCsvRecord(output().text(), {"path", "category", "label", "data"}); }
@@ -48,20 +84,13 @@ protected:
 
 class ExportJsonLinesCommand : public ExportRowsCommand {
 public:
-    CLI::App* declare(CLI::App& group) override { return group.add_subcommand("jsonl"); }
+    ExportJsonLinesCommand() : ExportRowsCommand("jsonl") {}
 
 protected:
     void write(FileRow const& row) const override {
         JsonObject object;
         object.begin();
-        object.addText("path", row.path);
-        if (!row.category.empty() || !row.label.empty()) {
-            object.addText("category", row.category);
-            object.addText("label", row.label);
-        }
-        if (!row.data.empty()) {
-            object.addText("data", row.data);
-        }
+        addMembers(object, row);
         object.end();
         output().text() += '\n';
     }
@@ -72,24 +101,39 @@ class ExportFilesCommand : public ProjectCommand {
 public:
     CLI::App* declare(CLI::App& group) override {
         auto* const app = group.add_subcommand("files");
-        app->add_flag("-0,--null", isNullEnded_);
+        auto* const null = app->add_flag("-0,--null", isNullEnded_);
+        app->add_flag("--json", isJson_)->excludes(null);
         return app;
     }
 
     int run(OpenProject& project) override {
         project.warnOfDamage();
-        FileList(project).visit(project.root(), [this](FileList::File const& file) {
+        JsonRows rows(json::list, "files");
+        FileList(project).visit(project.root(), [this, &rows](FileList::File const& file) {
             if (file.kind == Kind::File) {
-                appendBytes(output().text(), file.path);
-                output().text() += isNullEnded_ ? '\0' : '\n';
-                output().flushWhenLarge();
+                write(file, rows);
             }
         });
+        if (isJson_) {
+            rows.finish();
+        }
         return 0;
     }
 
 private:
+    void write(FileList::File const& file, JsonRows& rows) const {
+        if (isJson_) {
+            rows.begin();
+            rows.addFile(file.path, file.kind);
+        } else {
+            appendBytes(output().text(), file.path);
+            output().text() += isNullEnded_ ? '\0' : '\n';
+            output().flushWhenLarge();
+        }
+    }
+
     bool isNullEnded_ = false;
+    bool isJson_ = false;
 };
 
 } // namespace

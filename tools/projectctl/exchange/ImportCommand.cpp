@@ -3,10 +3,24 @@
 #include "cli/Completes.hpp"
 #include "cli/TextArguments.hpp"
 #include "exchange/ItemImport.hpp"
+#include "output/JsonDocument.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
 
 namespace projectctl {
+
+namespace {
+
+int writeDocument(ItemImport const& import, Unmapped& unmapped) {
+    JsonDocument document(json::imported);
+    document.addNumber("files", import.addedFiles());
+    document.addNumber("labels", import.putLabels());
+    int const result = unmapped.addTo(document);
+    document.finish();
+    return result;
+}
+
+} // namespace
 
 int ImportCommand::run(OpenProject& project) {
     auto const data = load(project);
@@ -19,6 +33,9 @@ int ImportCommand::run(OpenProject& project) {
     project.changedFiles().listed += import.addedFiles();
     project.changedFiles().labelled += import.putLabels();
     if (dryRun_.end(transaction, project)) {
+        if (dryRun_.isJson()) {
+            return writeDocument(import, unmapped);
+        }
         output().say(Message("Imported", import.addedFiles(), import.putLabels()));
     }
     return unmapped.report();

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "output/Failure.hpp"
+#include "output/JsonObject.hpp"
 
 namespace projectctl {
 
@@ -25,7 +26,13 @@ public:
     /// @return the exit code of the command: `finding` if there are any.
     int report();
 
+    /// Writes them as the member "unmapped" instead. @return as report.
+    int addTo(JsonObject& object);
+
 private:
+    void sort();
+    int exitCode() const noexcept;
+
     struct Item {
         std::size_t line;
         std::string reason;

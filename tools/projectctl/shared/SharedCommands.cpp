@@ -7,6 +7,7 @@
 
 #include "cli/CommandGroup.hpp"
 #include "output/Failure.hpp"
+#include "output/NameForms.hpp"
 #include "shared/Commands.hpp"
 
 namespace projectctl {
@@ -27,13 +28,25 @@ project::stores::JournalBackend& requireLog(OpenProject& project) {
     return *project.log();
 }
 
-std::string shownTime(std::chrono::system_clock::time_point time) {
+namespace {
+
+std::string formatted(std::chrono::system_clock::time_point time, char const* form) {
     auto const seconds = std::chrono::system_clock::to_time_t(time);
     std::tm parts{};
     gmtime_r(&seconds, &parts);
     std::array<char, 32> text{};
-    std::strftime(text.data(), text.size(), "%F %T UTC", &parts);
+    std::strftime(text.data(), text.size(), form, &parts);
     return text.data();
+}
+
+} // namespace
+
+std::string shownTime(std::chrono::system_clock::time_point time) {
+    return formatted(time, "%F %T UTC");
+}
+
+std::u16string timeInJson(std::chrono::system_clock::time_point time) {
+    return textOf(formatted(time, "%FT%TZ"));
 }
 
 } // namespace projectctl

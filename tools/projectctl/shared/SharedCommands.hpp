@@ -21,4 +21,7 @@ project::stores::JournalBackend& requireLog(OpenProject& project);
 /// A time as "2024-05-31 17:08:59 UTC".
 std::string shownTime(std::chrono::system_clock::time_point time);
 
+/// A time as JSON documents contain it, "2024-05-31T17:08:59Z".
+std::u16string timeInJson(std::chrono::system_clock::time_point time);
+
 } // namespace projectctl

@@ -4,6 +4,7 @@
 #include <string>
 #include <vector>
 
+#include "output/JsonRows.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "project/ProjectCommand.hpp"
@@ -23,6 +24,7 @@ public:
         auto* const app = tool.add_subcommand("log");
         app->add_option("--count", count_)->check(CLI::Range(1, most));
         app->add_flag("--lines", showsLines_);
+        app->add_flag("--json", isJson_);
         return app;
     }
 
@@ -30,16 +32,7 @@ public:
         auto& journal = requireLog(project).journal();
         auto const records = journal.records(std::nullopt, static_cast<std::size_t>(count_));
         auto const lines = showsLines_ && !records.empty() ? linesSince(journal, records) : Lines();
-        for (auto const& record : records) {
-            output().text() += std::to_string(record.position.version) + '\t' + shownTime(record.time) +
-                               '\t' + record.author + '\t' + record.host + '\t' +
-                               (record.isBody ? "body" : "batch") + '\n';
-            auto const found = lines.find(record.position.version);
-            if (found != lines.end()) {
-                showIndented(found->second);
-            }
-            output().flushWhenLarge();
-        }
+        isJson_ ? writeJson(records, lines) : writeText(records, lines);
         return 0;
     }
 
@@ -62,16 +55,55 @@ private:
         return lines;
     }
 
-    static void showIndented(std::string const& lines) {
-        for (std::size_t begin = 0; begin < lines.size();) {
-            auto const end = std::min(lines.find('\n', begin), lines.size());
-            output().text() += "    " + lines.substr(begin, end - begin) + '\n';
+    static char const* kindOf(JournalRecord const& record) { return record.isBody ? "body" : "batch"; }
+
+    static void writeText(std::vector<JournalRecord> const& records, Lines const& lines) {
+        for (auto const& record : records) {
+            output().text() += std::to_string(record.position.version) + '\t' + shownTime(record.time) +
+                               '\t' + record.author + '\t' + record.host + '\t' + kindOf(record) + '\n';
+            auto const found = lines.find(record.position.version);
+            if (found != lines.end()) {
+                for (auto const& line : linesIn(found->second)) {
+                    output().text() += "    " + line + '\n';
+                }
+            }
+            output().flushWhenLarge();
+        }
+    }
+
+    static void writeJson(std::vector<JournalRecord> const& records, Lines const& lines) {
+        JsonRows rows(json::sharedLog, "entries");
+        for (auto const& record : records) {
+            rows.begin();
+            rows.addNumber("version", record.position.version);
+            rows.addText("time", timeInJson(record.time));
+            rows.addText("author", textOf(record.author));
+            rows.addText("host", textOf(record.host));
+            rows.addText("kind", textOf(kindOf(record)));
+            auto const found = lines.find(record.position.version);
+            if (found != lines.end()) {
+                auto const texts = linesIn(found->second);
+                std::vector<std::u16string> converted(texts.size());
+                std::ranges::transform(texts, converted.begin(), textOf);
+                rows.addList("lines", converted);
+            }
+        }
+        rows.finish();
+    }
+
+    static std::vector<std::string> linesIn(std::string const& text) {
+        std::vector<std::string> result;
+        for (std::size_t begin = 0; begin < text.size();) {
+            auto const end = std::min(text.find('\n', begin), text.size());
+            result.push_back(text.substr(begin, end - begin));
             begin = end + 1;
         }
+        return result;
     }
 
     int count_ = 20;
     bool showsLines_ = false;
+    bool isJson_ = false;
 };
 
 } // namespace

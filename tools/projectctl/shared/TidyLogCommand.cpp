@@ -1,7 +1,9 @@
 #include <chrono>
+#include <cstddef>
 #include <optional>
 #include <string>
 
+#include "output/JsonDocument.hpp"
 #include "output/Output.hpp"
 #include "project/ProjectCommand.hpp"
 #include "shared/SharedCommands.hpp"
@@ -18,23 +20,41 @@ public:
     CLI::App* declare(CLI::App& tool) override {
         auto* const app = tool.add_subcommand("tidy");
         app->add_option("--keep", days_)->check(CLI::Range(0, mostDays));
+        app->add_flag("--json", isJson_);
         return app;
     }
 
     int run(OpenProject& project) override {
         auto& log = requireLog(project);
         project.shield().raise();
-        output().say(Message(log.tidy() ? "LogTidied" : "LogIsTidy"));
+        bool const hasNewBody = log.tidy();
+        std::optional<std::size_t> deleted;
         if (days_) {
-            auto const deleted = log.deleteHistory(firstKept(log.journal()));
-            output().text() += Message("LogEntriesDeleted", deleted).text() + '\n';
+            deleted = log.deleteHistory(firstKept(log.journal()));
         }
+        isJson_ ? writeJson(hasNewBody, deleted) : writeText(hasNewBody, deleted);
         return 0;
     }
 
     bool canRunInBatch() const override { return false; }
 
 private:
+    static void writeJson(bool hasNewBody, std::optional<std::size_t> const& deleted) {
+        JsonDocument document(json::sharedTidy);
+        document.addFlag("newBody", hasNewBody);
+        if (deleted) {
+            document.addNumber("deletedEntries", *deleted);
+        }
+        document.finish();
+    }
+
+    static void writeText(bool hasNewBody, std::optional<std::size_t> const& deleted) {
+        output().say(Message(hasNewBody ? "LogTidied" : "LogIsTidy"));
+        if (deleted) {
+            output().text() += Message("LogEntriesDeleted", *deleted).text() + '\n';
+        }
+    }
+
     static constexpr int mostDays = 36500;
     static constexpr std::size_t page = 1000;
 
@@ -57,6 +77,7 @@ private:
     }
 
     std::optional<int> days_;
+    bool isJson_ = false;
 };
 
 } // namespace
