@@ -121,8 +121,17 @@ TEST(JsonOfVerbs, hasAFormatWithASchemaAndAGoldenDocument) {
 
 class JsonOfEveryVerb : public SampleProject {
 protected:
-    /// The example of the help with --json, which the last program of a pipe gets.
+    /// A call like the example of the help, with --json, which the last program of a pipe gets.
     static std::string withJson(std::string example) {
+        // Their examples change the text, and write a tree.
+        for (auto const* argument :
+             {" 'Engine controller'", " 'Everything that runs on the controller'", " --tree"}) {
+            auto const at = example.find("projectctl init") != std::string::npos ? std::string::npos
+                                                                                 : example.find(argument);
+            if (at != std::string::npos) {
+                example.erase(at, std::string_view(argument).size());
+            }
+        }
         auto const end = std::min({example.size(), example.find(" >"), example.find(" -0 | xargs")});
         example.erase(end);
         return example.find("--json") == std::string::npos ? example + " --json" : example;
