@@ -110,7 +110,7 @@ TEST_F(LogCommand, writesJson) {
     expectValid(log.output);
     EXPECT_THAT(log.output, HasSubstr(R"("subject": "a label", "changes": [)"));
     EXPECT_THAT(log.output,
-                HasSubstr(R"({"subject": "label on file", "change": "added", "name": "src/main.cpp", )"
+                HasSubstr(R"({"subject": "fileLabel", "change": "added", "name": "src/main.cpp", )"
                           R"("category": "Status", "label": "Open", "values": []})"));
 }
 

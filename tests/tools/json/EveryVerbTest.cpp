@@ -27,6 +27,7 @@ std::map<std::string, std::string> const formats{
     {"remove", done},
     {"move", done},
     {"adopt", done},
+    {"sync", done}, // of --rule, as in the example
     {"list", "projectctl-list"},
     {"status", "projectctl-status"},
     {"import git", "projectctl-import"},
@@ -74,6 +75,8 @@ std::map<std::string, std::string> const formats{
     {"shared tidy", "projectctl-shared-tidy"},
     {"shared log", "projectctl-shared-log"},
     {"shared roles", "projectctl-shared-roles"},
+    {"log", "projectctl-log"},
+    {"diff", "projectctl-diff"},
     {"batch", done},
     {"watch", "projectctl-watch"},
     {"help", "projectctl-help"},
@@ -92,9 +95,12 @@ std::vector<VerbDescription> callable(VerbDescription const& verb) {
     return result;
 }
 
+/// The verbs for people and programs; git calls `textconv` and compares the lines that it writes.
 std::vector<VerbDescription> allVerbs() {
     projectctl::DeclaredTool tool(projectctl::verbs());
-    return callable(projectctl::describe(tool.parser()));
+    auto result = callable(projectctl::describe(tool.parser()));
+    std::erase_if(result, [](auto const& verb) { return verb.name == "textconv"; });
+    return result;
 }
 
 /// Whether a folder contains a file for a version of a format.

@@ -128,6 +128,28 @@ TEST_F(GoldenJson, ofResolveShowsTheConflicts) {
     golden({"resolve", "--ours"});
 }
 
+TEST_F(GoldenJson, ofLogAndDiffShowEachKindOfChange) {
+    GitFolder const git(settings_.folder, {{"GIT_AUTHOR_DATE", "2000-01-01T00:00:00Z"}});
+    std::ofstream(settings_.folder / "src/main.cpp") << "int main() {}\n";
+    std::ofstream(settings_.folder / "src/gone") << "nothing\n";
+    ASSERT_EQ(tool({"init"}).exitCode, 0);
+    ASSERT_THAT(tool({"batch"}, "add src/main.cpp src/gone\ncategory create Owner\ngroup create Weekly\n"),
+                SucceedsSilently());
+    git.commitAll();
+    ASSERT_EQ(tool({"move", "src/main.cpp", "src/start.cpp"}).exitCode, 0);
+    ASSERT_THAT(tool({"batch"}, "name Motor\ndescription Turns\nremove src/gone\nadd src/io/pump.cpp\n"
+                                "category rename Owner Keeper\nlabel create Keeper Ann\n"
+                                "label put Keeper Ann src/start.cpp\nentry set src/start.cpp\n"
+                                "group delete Weekly\npath add src\nreference add ../pump\n"),
+                SucceedsSilently());
+    golden({"diff"});
+    git.commitAll();
+
+    auto const log = tool({"log", "--json"});
+    EXPECT_EQ(log.errors, "");
+    expectGolden(std::regex_replace(log.output, std::regex("[0-9a-f]{40}"), "COMMIT"));
+}
+
 TEST_F(GoldenJson, ofWatchShowsEachEvent) {
     ASSERT_EQ(tool({"init"}).exitCode, 0);
     ASSERT_EQ(tool({"add", "src/main.cpp"}).exitCode, 0);

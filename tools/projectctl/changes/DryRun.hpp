@@ -17,8 +17,6 @@ public:
 
     bool isOn() const noexcept { return isOn_; }
 
-    bool isJson() const noexcept { return isJson_; }
-
     /// Ends the transaction of the command: commits it, or, with the option, writes its changes as
     /// ChangeLines does and leaves it to be rolled back. A commit notes how git undoes it.
     /// @return whether it was committed.

@@ -13,8 +13,8 @@ using Subject = DefinitionChange::Subject;
 
 std::u16string_view wordFor(Subject subject) {
     constexpr std::array<std::u16string_view, 12> words{
-        u"name",  u"description", u"file",  u"label on file", u"data of file", u"category",
-        u"label", u"entry point", u"group", u"project path",  u"reference",    u"other"};
+        u"name",  u"description", u"file",  u"fileLabel",   u"fileData",  u"category",
+        u"label", u"entryPoint",  u"group", u"projectPath", u"reference", u"other"};
     return words.at(static_cast<std::size_t>(subject));
 }
 
