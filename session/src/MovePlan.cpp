@@ -12,10 +12,11 @@ namespace project::session {
 
 using metadata::getParentFolder;
 using metadata::isParent;
-using Reason = MoveError::Reason;
 using ZEPHRA::project::management::FileNotInProject;
 
 namespace {
+
+using Reason = MoveError::Reason;
 
 bool isAtOrBelow(Path const& path, Path const& folder) {
     return path == folder || isParent(path, folder);

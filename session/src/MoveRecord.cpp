@@ -20,7 +20,7 @@ namespace {
 constexpr std::string_view title = "moves 1";
 constexpr std::string_view end = "end";
 constexpr char const* temporary = "moves.tmp";
-constexpr char const* ignored = ".gitignore";
+constexpr char const* ignoreFile = ".gitignore";
 constexpr std::string_view ignoredContent = "*\n"; // also in projects that ignore no such folder
 
 void append(std::string& bytes, std::string_view text) {
@@ -69,8 +69,8 @@ void MoveRecord::write(RecordedMoves const& moves) {
     }
     append(bytes, end);
     disk_->makeFolder();
-    if (!disk_->identify(ignored)) {
-        replace(ignored, ignoredContent);
+    if (!disk_->identify(ignoreFile)) {
+        replace(ignoreFile, ignoredContent);
     }
     replace(name, bytes);
     disk_->syncFolder();
@@ -116,8 +116,8 @@ void MoveRecord::remove() {
     }
     disk_->remove(name);
     disk_->remove(temporary);
-    if (disk_->list() == std::vector<std::string>{ignored}) {
-        disk_->remove(ignored);
+    if (disk_->list() == std::vector<std::string>{ignoreFile}) {
+        disk_->remove(ignoreFile);
     }
     disk_->removeFolder(); // unless something is in it
 }
