@@ -4,9 +4,9 @@ namespace projectctl {
 
 using project::stores::DefinitionChange;
 
-using Subject = DefinitionChange::Subject;
-
 namespace {
+
+using Subject = DefinitionChange::Subject;
 
 bool concernsPaths(Subject subject) {
     return subject == Subject::File || subject == Subject::FileLabel || subject == Subject::FileData ||
