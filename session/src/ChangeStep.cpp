@@ -79,7 +79,9 @@ void ChangeStep::commitOutermost() {
     // The step is committed, so observers are called even if it could not be staged.
     auto const slotError = errorOf([&] {
         dispatch(events, *executor_.observers_);
-        dispatch(personalEvents, *executor_.personalObservers_);
+        if (!personalEvents.empty()) {
+            dispatch(personalEvents, *executor_.personalObservers_);
+        }
     });
     for (auto const& error : {personalError, stagingError, slotError}) {
         if (error) {
