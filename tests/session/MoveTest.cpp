@@ -30,6 +30,7 @@ using ::testing::HasSubstr;
 using ::testing::IsEmpty;
 using ::testing::Not;
 using Reason = MoveError::Reason;
+using namespace std::string_view_literals;
 
 /// A project in a repository, with a label to put on files.
 class Moves : public ::testing::Test {
@@ -483,7 +484,7 @@ TEST_F(Moves, aRecordThatWasCopiedWithAFolderMovesNothing) {
     folder.file(u"evil");
     std::filesystem::create_directory(folder.onDisk() / ".projectdata" / "local");
     std::ofstream(folder.onDisk() / ".projectdata" / "local" / "moves")
-        << std::string("moves 1\000123 4 5\0state\0index\0evil\0a2\0\0end\0", 44);
+        << "moves 1\000123 4 5\0state\0index\0evil\0a2\0\0end\0"sv;
     EXPECT_TRUE(session.hasUnfinishedMove());
 
     label(u"a");

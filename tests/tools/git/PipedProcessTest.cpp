@@ -9,6 +9,8 @@
 
 #include <gtest/gtest.h>
 
+#include "texts/Message.hpp"
+
 namespace projectctl {
 namespace {
 
@@ -80,8 +82,10 @@ private:
 };
 
 TEST(PipedProcess, reportsThatThereAreTooManyOpenFiles) {
-    // Clang's sanitizer opens a pipe when it checks the type of the category for the first time.
+    // Clang's sanitizer opens a pipe when it checks a type for the first time, here those of the error and of
+    // its text.
     ASSERT_FALSE(std::error_code(EMFILE, std::generic_category()).message().empty());
+    ASSERT_FALSE(Message("PipeNotCreated").text().empty());
     std::error_code code;
     try {
         NoFurtherFiles const limit;
