@@ -4,6 +4,7 @@
 #include <memory>
 #include <ostream>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <rapidcheck.h>
@@ -21,6 +22,10 @@ void require(bool holds, std::string const& law);
 /// The expected content of a store.
 class TreeModel {
 public:
+    TreeModel() = default;
+
+    explicit TreeModel(Content content) : content_(std::move(content)) {}
+
     void set(std::map<Address, stores::Node> const& nodes);
     void remove(std::vector<Address> const& addresses);
     void create(std::vector<Address> const& addresses);

@@ -126,7 +126,8 @@ public:
         check(0);
         for (auto const& name : volume_->names()) {
             require(name == ".gitattributes" || name == ".gitignore" || name == "project.jsonl" ||
-                        (hadPowerCut_ && name.starts_with("displaced-")),
+                        (hadPowerCut_ && name.starts_with("displaced-")) ||
+                        (repairs_ > 0 && name.starts_with("damaged-")),
                     "something was left in the folder");
         }
     }
@@ -137,6 +138,9 @@ public:
     std::size_t appends() const { return volume_->count("append project.jsonl"); }
 
     std::size_t rewrites() const { return volume_->count("exchange swapping project.jsonl"); }
+
+    /// The number of power cuts that left a damaged text.
+    std::size_t repairs() const { return repairs_; }
 
 private:
     void reopen(std::size_t process) {
@@ -211,17 +215,44 @@ private:
     void cutPower(TreeModel const& after) {
         volume_->powerCut();
         hadPowerCut_ = true;
-        mayLackName_ = false;
+        bool const mayBeDamaged = std::exchange(mayLackName_, false);
         reopenDead(0);
         reopenDead(1);
         auto possible = std::exchange(notDurable_, {});
         possible.push_back(after);
         possible.push_back(model_);
+        if (mayBeDamaged && !backends_[0]->repair().empty()) {
+            ++repairs_;
+            acceptRest(possible);
+            return;
+        }
         auto const found = contentOf(*trees_[0]);
         auto const match = std::find_if(possible.begin(), possible.end(),
                                         [&](TreeModel const& model) { return found == model.visible(); });
         require(match != possible.end(), "the power cut lost a committed batch, or left a part of one");
         model_ = *match;
+    }
+
+    /// The text contained batches of other processes after one that the disk had lost, and was repaired. The
+    /// lost batch may take them with it, but nothing else, and nothing is in the project that never was.
+    void acceptRest(std::vector<TreeModel> const& possible) {
+        reopen(0);
+        auto const found = contentOf(*trees_[0]);
+        for (auto const& entry : found) {
+            require(std::ranges::any_of(possible,
+                                        [&entry](TreeModel const& model) {
+                                            auto const visible = model.visible();
+                                            auto const same = visible.find(entry.first);
+                                            return same != visible.end() && *same == entry;
+                                        }),
+                    "a repaired project contains something that it never did");
+        }
+        for (auto const& entry : possible.front().visible()) { // before the lost batch and those after it
+            bool const isInAll = std::ranges::all_of(
+                possible, [&entry](TreeModel const& model) { return model.visible().contains(entry.first); });
+            require(!isInAll || found.contains(entry.first), "a repair lost something that was durable");
+        }
+        model_ = TreeModel(found);
     }
 
     void check(std::size_t process) { requireEqual(*trees_.at(process), model_); }
@@ -232,7 +263,9 @@ private:
     std::array<std::unique_ptr<TreeMetadataManager>, 2> trees_;
     TreeModel model_;
     bool hadPowerCut_ = false;
-    bool mayLackName_ = false; ///< a disk that failed for good could sync neither the folder nor a new text
+    std::size_t repairs_ = 0;
+    /// A disk that failed for good could sync neither the folder nor a new text, nor mark the text as torn.
+    bool mayLackName_ = false;
     std::vector<TreeModel> notDurable_; ///< contents that a power cut may restore
 };
 
@@ -289,6 +322,40 @@ TEST(TextBackendModel, anOldTextTornByAPowerCutDoesNotReplaceTheNewOne) {
         processes.take({.kind = Kind::PowerCut});
         processes.finish();
     }
+}
+
+/// The disk fails while a batch is synced, and accepts not even a torn tail, so that the next processes
+/// append to a batch that a power cut tears. The store does not promise these batches; it reports the damage,
+/// and all that was durable before can be repaired.
+TEST(TextBackendModel, batchesAfterOneThatAFailedDiskHasLostAreDamageThatCanBeRepaired) {
+    using Kind = Step::Kind;
+    std::size_t repairs = 0;
+    auto const add = [](std::u16string const& name, std::size_t process) {
+        return Step{
+            .kind = Kind::Set, .process = process, .nodes = {{fileAddress(name), stores::plainNode()}}};
+    };
+    for (unsigned seed = 0; seed < 40; ++seed) {
+        Processes processes(
+            {.patience = std::chrono::milliseconds(20), .alwaysRewritten = 0, .bodyToTail = 1}, seed);
+        Step many{.kind = Kind::Set};
+        for (auto const& path : manyFiles(30, u"folder")) {
+            many.nodes.emplace(fileAddress(path), stores::plainNode());
+        }
+        processes.take(many);
+        auto lost = add(u"one", 0);
+        lost.fault = CrashingVolume::InjectedFault::FailsForGood;
+        lost.callsBefore = 8; // the sync of the append
+        processes.take(lost);
+        processes.take(add(u"two", 1));
+        processes.take({.kind = Kind::Remove,
+                        .process = 1,
+                        .addresses = {fileAddress(u"one"), fileAddress(u"two")}}); // the content is as before
+        processes.take({.kind = Kind::PowerCut});
+        processes.take(add(u"three", 0));
+        processes.finish();
+        repairs += processes.repairs();
+    }
+    EXPECT_GT(repairs, 10U);
 }
 
 TEST(TextBackendModel, theSameHoldsForTextsWithTheRealLimits) {
