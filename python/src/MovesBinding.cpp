@@ -1,0 +1,60 @@
+#include <optional>
+#include <utility>
+#include <vector>
+
+#include <pybind11/stl.h>
+
+#include "Bindings.hpp"
+#include "project/session/Move.hpp"
+
+namespace project::python {
+
+namespace py = pybind11;
+
+namespace {
+
+using session::Move;
+
+py::list pairsOf(OpenProject const& project, std::vector<Move> const& moves) {
+    py::list result;
+    for (auto const& move : moves) {
+        result.append(py::make_tuple(project.relative(move.from), project.relative(move.to)));
+    }
+    return result;
+}
+
+py::list move(OpenProject const& project, py::iterable const& sources, py::handle destination) {
+    auto const files = project.absolutes(sources);
+    auto const target = project.absolute(destination);
+    return pairsOf(project, project.run([&](Session& session) { return session.move(files, target); }));
+}
+
+void adopt(OpenProject const& project, std::vector<std::pair<py::object, py::object>> const& pairs) {
+    std::vector<Move> moves;
+    for (auto const& [from, to] : pairs) {
+        moves.push_back({project.absolute(from), project.absolute(to)});
+    }
+    project.run([&](Session& session) { session.adopt(moves); });
+}
+
+py::object takeRecovered(OpenProject const& project) {
+    auto const recovered = project.run([](Session& session) { return session.takeRecoveredMoves(); });
+    if (!recovered) {
+        return py::none();
+    }
+    return py::make_tuple(static_cast<int>(recovered->outcome), pairsOf(project, recovered->moves),
+                          pairsOf(project, recovered->left));
+}
+
+} // namespace
+
+void bindMoves(ProjectClass& project) {
+    project.def("move", &move, py::arg("sources"), py::arg("destination"));
+    project.def("adopt", &adopt, py::arg("moves"));
+    project.def("take_recovered_moves", &takeRecovered);
+    project.def("has_unfinished_move", [](OpenProject const& open) {
+        return open.run([](Session& session) { return session.hasUnfinishedMove(); });
+    });
+}
+
+} // namespace project::python
