@@ -131,7 +131,7 @@ bool DefinitionMove::isPlainAndEmpty(Address const& folder, std::vector<Address>
             return false;
         }
     }
-    auto const steps = folder.getPath();
+    auto const& steps = folder.getPath();
     for (auto const& scope : scopes) {
         auto address = scope;
         for (std::size_t step = 1; step < steps.size(); ++step) {

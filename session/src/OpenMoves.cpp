@@ -38,6 +38,7 @@ std::vector<Move> inOneList(MoveGroups const& groups) {
 
 std::vector<git::FileMove> forGit(std::vector<Move> const& moves) {
     std::vector<git::FileMove> result;
+    result.reserve(moves.size());
     for (auto const& move : moves) {
         result.push_back({move.from, move.to});
     }

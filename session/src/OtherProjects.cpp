@@ -39,6 +39,7 @@ Path movedPath(Path const& path, std::vector<Move> const& moves) {
 /// The place of a project before the moves.
 Path earlierPath(Path const& path, std::vector<Move> const& moves) {
     std::vector<Move> reversed;
+    reversed.reserve(moves.size());
     for (auto const& move : moves) {
         reversed.push_back({move.to, move.from});
     }

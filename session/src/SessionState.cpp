@@ -142,7 +142,7 @@ std::vector<Move> Session::State::move(std::vector<Path> const& sources, Path co
     MovePlan::IsInProject const isListed = [this](Path const& file) {
         return project->getFileManager().isFileInProject(file);
     };
-    auto const planned = MovePlan(root, storeFolder, isListed).onDisk(sources, destination);
+    auto planned = MovePlan(root, storeFolder, isListed).onDisk(sources, destination);
     if (planned.empty()) {
         return planned;
     }
@@ -161,7 +161,7 @@ void Session::State::adopt(std::vector<Move> const& made) {
     MovePlan::IsInProject const isListed = [this](Path const& file) {
         return project->getFileManager().isFileInProject(file);
     };
-    auto const planned = MovePlan(root, storeFolder, isListed).made(made);
+    auto planned = MovePlan(root, storeFolder, isListed).made(made);
     if (planned.empty()) {
         return;
     }

@@ -49,9 +49,11 @@ std::optional<std::u16string> ConfirmedRenames::winner(Votes const& targets) {
 
 /// Everything that moved with its folder, and that source control does not know or does not recognise.
 void ConfirmedRenames::addContentOf(std::u16string const& folder, std::u16string const& to) {
+    auto const belowFolder = folder + u'/';
+    auto const belowTarget = to + u'/';
     for (auto const& rest : before_.pathsBelow(folder)) {
-        auto from = folder + u'/' + rest;
-        auto target = to + u'/' + rest;
+        auto from = belowFolder + rest;
+        auto target = belowTarget + rest;
         if (!before_.has(target) && after_.has(target)) {
             (before_.hasFolder(from) ? folders_ : files_).try_emplace(std::move(from), std::move(target));
         }

@@ -43,7 +43,8 @@ std::string newFolder() {
 std::string indexInfo(GitContents const& contents, std::string const& prefix) {
     std::string result;
     for (auto const& [name, content] : contents) {
-        result += content.mode + ' ' + content.id + '\t' + prefix + name + '\0';
+        result.append(content.mode).append(1, ' ').append(content.id).append(1, '\t');
+        result.append(prefix).append(name).append(1, '\0');
     }
     return result;
 }
