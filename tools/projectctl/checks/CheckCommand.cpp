@@ -5,10 +5,8 @@
 #include <vector>
 
 #include "checks/Commands.hpp"
+#include "checks/DefinitionFindings.hpp"
 #include "checks/FindingForms.hpp"
-#include "checks/MergeSetupCheck.hpp"
-#include "checks/SyncCheck.hpp"
-#include "checks/TreeCheck.hpp"
 #include "cli/CodedFailure.hpp"
 #include "cli/ExitCode.hpp"
 #include "cli/ShownPaths.hpp"
@@ -27,22 +25,6 @@ namespace {
 
 using project::stores::Fault;
 
-std::string_view codeOf(Fault::Kind kind) {
-    switch (kind) {
-    case Fault::Kind::Damage:
-        return code::textDamaged;
-    case Fault::Kind::Conflict:
-        return code::textConflict;
-    case Fault::Kind::Irregular:
-        return code::textIrregular;
-    case Fault::Kind::TornTail:
-        return code::textTornTail;
-    case Fault::Kind::Displaced:
-        break;
-    }
-    return code::textDisplaced;
-}
-
 /// Reports all faults of the project's text, of its definition and of the merge set-up.
 class CheckCommand : public ProjectCommand {
 public:
@@ -60,8 +42,10 @@ public:
             repair(project);
         }
         Progress progress(Message("ProgressCheck"));
-        auto const faults = project.log() == nullptr ? project.faults() : project.log()->check();
-        auto found = allFindings(faults, project);
+        auto const faults = faultsOfDefinition(project);
+        auto const& root = project.root();
+        auto const found =
+            findingsOf(faults, project, isJson_ ? ShownPaths::fromRoot(root) : ShownPaths(root));
         if (isJson_) {
             writeJson(found);
         } else if (form == FindingForm::Text) {
@@ -88,40 +72,6 @@ private:
             throw WrongUse(Message("FormatUnknown", *format_));
         }
         return *format_ == "gcc" ? FindingForm::Gcc : FindingForm::GitHub;
-    }
-
-    /// The worst first.
-    Findings allFindings(std::vector<Fault> const& faults, OpenProject& project) const {
-        Findings result;
-        for (auto const& fault : faults) {
-            result.push_back({Finding::Weight::Fault, codeOf(fault.kind), fault.problem});
-            result.back().line = fault.line;
-        }
-        auto const root = project.root();
-        append(result, TreeCheck(project, isJson_ ? ShownPaths::fromRoot(root) : ShownPaths(root)).run());
-        append(result, findOutOfDate(project, isJson_ ? ShownPaths::fromRoot(root) : ShownPaths(root)));
-        placeInText(result, project);
-        if (!project.isInTransaction()) { // otherwise it has been read already
-            append(result, personalFindings(project));
-        }
-        if (project.log() == nullptr) { // git merges no log
-            checkMergeSetup(root, result);
-        }
-        sortByWeight(result);
-        return result;
-    }
-
-    /// The faults of the personal text. Their lines are not those of the project's text.
-    static Findings personalFindings(OpenProject& project) {
-        auto const file = shown(project::stores::PersonalText::path(project.root()));
-        Findings result;
-        for (auto const& fault : project.access().personalText().check()) {
-            Message const message = fault.line > 0
-                                        ? Message("PersonalFaultAt", file, fault.line, fault.problem)
-                                        : Message("PersonalFault", file, fault.problem);
-            result.push_back(Finding::fault(codeOf(fault.kind), message));
-        }
-        return result;
     }
 
     static bool isAboutSetup(Finding const& finding) { return finding.code.starts_with("merge-"); }

@@ -1,27 +1,18 @@
 #include "exchange/ProjectRows.hpp"
 
 #include <map>
-#include <set>
-#include <utility>
-#include <vector>
 
 #include "exchange/LabelData.hpp"
 #include "output/NameForms.hpp"
 #include "project/FileList.hpp"
+#include "project/LabelsOnFile.hpp"
 #include "project/core/LabelManager.hpp"
 #include "project/labels/CategoryIdentifier.hpp"
 #include "project/labels/LabelIdentifier.hpp"
-#include "project/metadata/TreeSchema.hpp"
 
 namespace projectctl {
 
-namespace fileSchema = project::metadata::schema::files;
-
-using project::metadata::MetadataNode;
-
 namespace {
-
-using LabelUUIDs = std::pair<std::u16string, std::u16string>; ///< of the category and the label
 
 struct LabelNamesOfProject {
     std::u16string category;
@@ -40,24 +31,6 @@ std::map<LabelUUIDs, LabelNamesOfProject> allLabels(OpenProject& project) {
     return result;
 }
 
-/// The labels in the node of a file, each once.
-std::vector<LabelUUIDs> labelsIn(MetadataNode const& node) {
-    std::vector<LabelUUIDs> result;
-    std::set<LabelUUIDs> seen;
-    for (auto const& category : node.getChildren()) {
-        for (auto const& label : category->getChildren()) {
-            LabelUUIDs uuids(category->get(fileSchema::categoryUUIDKey),
-                             label->get(fileSchema::labelUUIDKey));
-            bool const isLabel =
-                category->getType() == fileSchema::categoryType && label->getType() == fileSchema::labelType;
-            if (isLabel && seen.insert(uuids).second) {
-                result.push_back(std::move(uuids));
-            }
-        }
-    }
-    return result;
-}
-
 } // namespace
 
 void visitRows(OpenProject& project, Unmapped& unmapped, RowVisitor const& visitor) {
@@ -66,7 +39,7 @@ void visitRows(OpenProject& project, Unmapped& unmapped, RowVisitor const& visit
     auto const names = allLabels(project);
     files.visit(project.root(), [&](FileList::File const& file) {
         bool isVisited = false;
-        for (auto const& uuids : labelsIn(file.node)) {
+        for (auto const& uuids : labelsOn(file.node)) {
             auto const found = names.find(uuids);
             bool const isNamed =
                 found != names.end() && (!found->second.category.empty() || !found->second.label.empty());

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <map>
 #include <set>
 #include <string>
@@ -13,5 +14,10 @@ namespace projectctl {
 /// @throws Failure if one is missing.
 std::map<std::string, std::string> readBlobs(fl::filesystem::Path const& folder,
                                              std::set<std::string> const& ids);
+
+/// The sizes of contents in bytes, by their ids, without reading the contents. Those that are missing are
+/// left out, and so are ids of zeros. One process of git reads all of them.
+std::map<std::string, std::uint64_t> readBlobSizes(fl::filesystem::Path const& folder,
+                                                   std::set<std::string> const& ids);
 
 } // namespace projectctl

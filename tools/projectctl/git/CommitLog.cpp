@@ -61,9 +61,16 @@ std::vector<LoggedCommit> commitsIn(std::string_view log) {
 
 std::vector<LoggedCommit> readCommitLog(fl::filesystem::Path const& folder,
                                         std::vector<std::string> const& options) {
-    std::vector<std::string> command{
-        "log",         "-m",         "--raw",  "-z",
-        "--no-abbrev", "--no-color", "--root", "--format=%x01%H%x00%P%x00%an%x00%aI%x00%s"};
+    std::vector<std::string> command{"log",
+                                     "-m",
+                                     "--raw",
+                                     "-z",
+                                     "--no-abbrev",
+                                     "--no-color",
+                                     "--root",
+                                     "--no-show-signature",
+                                     "--encoding=UTF-8",
+                                     "--format=%x01%H%x00%P%x00%an%x00%aI%x00%s"};
     command.insert(command.end(), options.begin(), options.end());
     auto const log = runGit(folder, command);
     if (log.exitCode != 0) {

@@ -1,8 +1,6 @@
 #include "history/ChangeJson.hpp"
 
-#include <array>
-#include <cstddef>
-#include <string_view>
+#include "history/ChangeWords.hpp"
 
 namespace projectctl {
 
@@ -10,18 +8,6 @@ namespace {
 
 using project::stores::DefinitionChange;
 using Subject = DefinitionChange::Subject;
-
-std::u16string_view wordFor(Subject subject) {
-    constexpr std::array<std::u16string_view, 12> words{
-        u"name",  u"description", u"file",  u"fileLabel",   u"fileData",  u"category",
-        u"label", u"entryPoint",  u"group", u"projectPath", u"reference", u"other"};
-    return words.at(static_cast<std::size_t>(subject));
-}
-
-std::u16string_view wordFor(DefinitionChange::Kind kind) {
-    constexpr std::array<std::u16string_view, 4> words{u"added", u"removed", u"renamed", u"changed"};
-    return words.at(static_cast<std::size_t>(kind));
-}
 
 void addValues(JsonRows& row, std::vector<DefinitionChange::Value> const& values) {
     row.addKey("values");

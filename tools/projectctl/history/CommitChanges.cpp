@@ -5,16 +5,11 @@
 #include <utility>
 
 #include "git/Blobs.hpp"
+#include "history/TextLog.hpp"
 
 namespace projectctl {
 
 namespace {
-
-/// The change of the text among the changes of a commit; null if there is none.
-RawChange const* changeOf(LoggedCommit const& entry, std::string const& text) {
-    auto const found = std::ranges::find(entry.changes, text, &RawChange::to);
-    return found == entry.changes.end() ? nullptr : &*found;
-}
 
 std::size_t endOfCommit(std::vector<LoggedCommit> const& entries, std::size_t begin) {
     auto end = begin;
@@ -27,18 +22,7 @@ std::size_t endOfCommit(std::vector<LoggedCommit> const& entries, std::size_t be
 } // namespace
 
 void CommitChanges::forEach(Receiver const& receive) {
-    std::string text = project_.textInRepository();
-    for (std::string from = "HEAD"; !from.empty();) {
-        auto const entries =
-            readCommitLog(project_.root(), {"-M", "--full-diff", from, "--", ":(top,literal)" + text});
-        if (!passOn(entries, text, receive)) {
-            return;
-        }
-        auto const* const first = entries.empty() ? nullptr : changeOf(entries.back(), text);
-        bool const isMoved = first != nullptr && first->status == 'R';
-        from = isMoved ? entries.back().parent : "";
-        text = isMoved ? first->from : "";
-    }
+    visitTextLog(project_, {}, [&](TextLog const& part) { return passOn(part.commits, part.text, receive); });
 }
 
 bool CommitChanges::passOn(Entries const& entries, std::string const& text, Receiver const& receive) {
@@ -83,7 +67,7 @@ void CommitChanges::readTexts(Entries const& entries, std::size_t begin, std::si
     std::map<std::string, std::string> kept;
     std::set<std::string> missing;
     for (auto entry = begin; entry < end; ++entry) {
-        if (auto const* const change = changeOf(entries[entry], text)) {
+        if (auto const* const change = changeOfText(entries[entry], text)) {
             for (auto const& id : {change->before, change->after}) {
                 auto known = texts_.extract(id);
                 if (known) {
@@ -99,7 +83,7 @@ void CommitChanges::readTexts(Entries const& entries, std::size_t begin, std::si
 }
 
 CommitChanges::Changes CommitChanges::changesOf(LoggedCommit const& entry, std::string const& text) const {
-    auto const* const change = changeOf(entry, text);
+    auto const* const change = changeOfText(entry, text);
     return change == nullptr
                ? Changes()
                : project::stores::changesBetween(texts_.at(change->before), texts_.at(change->after),

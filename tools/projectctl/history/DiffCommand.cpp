@@ -2,7 +2,6 @@
 #include <string>
 
 #include "cli/TextArguments.hpp"
-#include "git/GitCommand.hpp"
 #include "history/ChangeJson.hpp"
 #include "history/ChangeText.hpp"
 #include "history/Commands.hpp"
@@ -31,7 +30,7 @@ public:
         auto const later = later_ ? std::optional(project.commit(*later_)) : std::nullopt;
         auto const changes = project::stores::changesBetween(
             project.textIn(earlier), later ? project.textIn(*later) : project.textOnDisk(),
-            renames(project, earlier, later));
+            project.renamesIn(project.changedFiles(earlier, later)));
         if (isJson_) {
             JsonRows rows(json::diff, "changes");
             addChanges(rows, changes);
@@ -54,16 +53,6 @@ private:
             *later_ += later_->empty() ? "HEAD" : "";
             *earlier_ += earlier_->empty() ? "HEAD" : "";
         }
-    }
-
-    static std::map<std::u16string, std::u16string>
-    renames(GitProject const& project, std::string const& earlier, std::optional<std::string> const& later) {
-        std::vector<std::string> command{
-            later ? "diff-tree" : "diff-index", "-r", "-z", "--raw", "--no-abbrev", "-M", "-l7000", earlier};
-        if (later) {
-            command.push_back(*later);
-        }
-        return project.renamesIn(readRawChanges(runGit(project.root(), command).output));
     }
 
     std::optional<std::string> earlier_;

@@ -1,9 +1,10 @@
 #include "history/GitProject.hpp"
 
+#include <algorithm>
+#include <charconv>
+#include <cstddef>
 #include <fstream>
 #include <iterator>
-#include <optional>
-#include <string_view>
 #include <system_error>
 
 #include "cli/WorkingFolder.hpp"
@@ -28,14 +29,20 @@ GitProject::GitProject(char const* sharedMessage) : root_(findProjectRoot(workin
     if (isShared(root_)) {
         throw Failure(Message(sharedMessage));
     }
-    try {
-        auto const prefix = runGit(root_, {"rev-parse", "--show-prefix"});
-        if (prefix.exitCode != 0) {
-            throw Failure(Message("HistoryWithoutGit", root_));
-        }
-        prefix_ = firstLineOf(prefix.output);
-    } catch (std::system_error const&) {
+    auto found = at(root_);
+    if (!found) {
         throw Failure(Message("HistoryWithoutGit", root_));
+    }
+    prefix_ = std::move(found->prefix_);
+}
+
+std::optional<GitProject> GitProject::at(Path const& root) {
+    try {
+        auto const prefix = runGit(root, {"rev-parse", "--show-prefix"});
+        return prefix.exitCode == 0 ? std::optional(GitProject(root, firstLineOf(prefix.output)))
+                                    : std::nullopt;
+    } catch (std::system_error const&) { // git is not installed
+        return std::nullopt;
     }
 }
 
@@ -46,21 +53,68 @@ std::string GitProject::textInRepository() const {
 std::map<std::u16string, std::u16string> GitProject::renamesIn(std::vector<RawChange> const& changes) const {
     std::map<std::u16string, std::u16string> result;
     for (auto const& change : changes) {
-        bool const isInProject = change.from.starts_with(prefix_) && change.to.starts_with(prefix_);
-        if (change.status == 'R' && isInProject) {
-            result.emplace(textOf(change.from.substr(prefix_.size())),
-                           textOf(change.to.substr(prefix_.size())));
+        auto const from = pathFromRoot(change.from);
+        auto const to = pathFromRoot(change.to);
+        if (change.status == 'R' && from && to) {
+            result.emplace(*from, *to);
         }
     }
     return result;
 }
 
+std::optional<std::u16string> GitProject::pathFromRoot(std::string_view path) const {
+    return path.starts_with(prefix_) ? std::optional(textOf(std::string(path.substr(prefix_.size()))))
+                                     : std::nullopt;
+}
+
 std::string GitProject::commit(std::string const& revision) const {
-    auto const found = runGit(root_, {"rev-parse", "-q", "--verify", revision + "^{commit}"});
-    if (found.exitCode != 0 || revision.starts_with('-')) {
+    auto found = findCommit(revision);
+    if (!found) {
         throw Failure(Message("CommitUnknown", revision));
     }
-    return firstLineOf(found.output);
+    return *std::move(found);
+}
+
+std::optional<std::string> GitProject::findCommit(std::string const& revision) const {
+    auto const found = runGit(root_, {"rev-parse", "-q", "--verify", revision + "^{commit}"});
+    bool const isFound = found.exitCode == 0 && !revision.starts_with('-');
+    return isFound ? std::optional(firstLineOf(found.output)) : std::nullopt;
+}
+
+/// `git diff` and not `git diff-index`, which regards files as changed that were only touched.
+std::vector<RawChange> GitProject::changedFiles(std::string const& earlier,
+                                                std::optional<std::string> const& later) const {
+    std::vector<std::string> command{"diff",
+                                     "-z",
+                                     "--raw",
+                                     "--no-abbrev",
+                                     "--no-ext-diff",
+                                     "--no-color",
+                                     "--no-relative",
+                                     "--ignore-submodules",
+                                     "-M",
+                                     "-l7000",
+                                     earlier};
+    if (later) {
+        command.push_back(*later);
+    }
+    command.emplace_back("--");
+    return readRawChanges(runGit(root_, command).output);
+}
+
+std::map<std::u16string, std::uint64_t> GitProject::fileSizes(std::string const& commit) const {
+    std::map<std::u16string, std::uint64_t> result;
+    auto const files = runGit(root_, {"ls-tree", "-r", "-l", "-z", commit, "--", "."}).output;
+    for (std::size_t begin = 0; begin < files.size();) { // "<mode> <type> <id> <size>\t<path>"
+        auto const end = std::min(files.find('\0', begin), files.size());
+        auto const tab = std::min(files.find('\t', begin), end);
+        auto const space = files.rfind(' ', tab);
+        std::uint64_t size = 0; // "-" for a submodule
+        std::from_chars(files.data() + space + 1, files.data() + tab, size);
+        result.emplace(textOf(files.substr(tab + 1, end - tab - 1)), size);
+        begin = end + 1;
+    }
+    return result;
 }
 
 std::string GitProject::textIn(std::string const& commit) const {

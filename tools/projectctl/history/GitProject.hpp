@@ -1,7 +1,11 @@
 #pragma once
 
+#include <cstdint>
 #include <map>
+#include <optional>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 #include "fl/filesystem/Path.hpp"
@@ -19,6 +23,9 @@ public:
     /// @throws Failure if there is no such project, or it is not in a repository.
     explicit GitProject(char const* sharedMessage);
 
+    /// The project with a root; nothing if it is not in a repository, or if git is not installed.
+    static std::optional<GitProject> at(Path const& root);
+
     Path const& root() const noexcept { return root_; }
 
     /// The path of the text from the top of the repository.
@@ -28,8 +35,23 @@ public:
     /// out.
     std::map<std::u16string, std::u16string> renamesIn(std::vector<RawChange> const& changes) const;
 
+    /// The path of a file from the project's root; nothing for a file outside the project.
+    /// @param path from the top of the repository.
+    std::optional<std::u16string> pathFromRoot(std::string_view path) const;
+
     /// The id of a commit. @throws Failure if there is no such commit.
     std::string commit(std::string const& revision) const;
+
+    /// The id of a commit; nothing if there is no such commit.
+    std::optional<std::string> findCommit(std::string const& revision) const;
+
+    /// The differences between the tracked files of two commits, renamed ones as one.
+    /// @param later without it, the files on disk are compared.
+    std::vector<RawChange> changedFiles(std::string const& earlier,
+                                        std::optional<std::string> const& later = {}) const;
+
+    /// The sizes of the project's files in a commit, by their paths from the root.
+    std::map<std::u16string, std::uint64_t> fileSizes(std::string const& commit) const;
 
     /// The text in a commit; empty if the commit does not contain the project.
     std::string textIn(std::string const& commit) const;
@@ -38,6 +60,8 @@ public:
     std::string textOnDisk() const;
 
 private:
+    GitProject(Path root, std::string prefix) : root_(std::move(root)), prefix_(std::move(prefix)) {}
+
     Path root_;
     std::string prefix_; ///< the path of the root from the top of the repository, with a "/" at its end
 };
