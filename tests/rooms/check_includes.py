@@ -56,6 +56,7 @@ ROOMS = {
         "checks": ["texts", "output", "cli", "git", "project", "files", "labels", "entrypoints", "references", "merge", "renames"],
         "sync": ["texts", "output", "cli", "git", "project", "changes", "files", "renames"],
         "exchange": ["texts", "output", "cli", "git", "project", "changes", "files"],
+        "report": ["texts", "output", "cli", "git", "project", "files", "references", "history", "checks"],
         "completion": ["texts", "output", "cli", "git", "project", "files", "entrypoints", "references"],
     },
     "src": {

@@ -14,6 +14,7 @@
 #include "project/Commands.hpp"
 #include "references/Commands.hpp"
 #include "renames/Commands.hpp"
+#include "report/Commands.hpp"
 #include "shared/Commands.hpp"
 #include "sync/Commands.hpp"
 #include "watch/Commands.hpp"
@@ -34,6 +35,7 @@ CommandList const& verbs() {
         {"list", "PurposeFiles", makeListCommand},
         {"status", "PurposeFiles", makeStatusCommand},
         {"sync", "PurposeFiles", makeSyncCommand},
+        {"report", "PurposeFiles", makeReportCommand},
         {"import", "PurposeFiles", makeImportCommand},
         {"export", "PurposeFiles", makeExportCommand},
 

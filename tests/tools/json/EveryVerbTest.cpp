@@ -30,6 +30,7 @@ std::map<std::string, std::string> const formats{
     {"sync", done}, // of --rule, as in the example
     {"list", "projectctl-list"},
     {"status", "projectctl-status"},
+    {"report", "projectctl-report"},
     {"import git", "projectctl-import"},
     {"import compile-commands", "projectctl-import"},
     {"import codeowners", "projectctl-import"},

@@ -22,6 +22,16 @@ protected:
             .expect(document);
     }
 
+    /// The size of the page varies with its texts and scripts.
+    void goldenReport() const {
+        auto const page = folder_.onDisk() / "report.html";
+        auto const result = tool({"report", "--output", page.string(), "--json"});
+        EXPECT_EQ(result.errors, "");
+        auto const size = std::to_string(std::filesystem::file_size(page));
+        GoldenDocument({{folder_.onDisk().string(), "/FOLDER"}, {"\"bytes\": " + size, "\"bytes\": 0"}})
+            .expect(result.output);
+    }
+
     void golden(std::vector<std::string> command, std::string_view input = {}) const {
         command.emplace_back("--json");
         auto const result = tool(command, input);
@@ -53,6 +63,7 @@ TEST_F(GoldenJson, everyVerbWritesTheDocumentOfItsVersion) {
     golden({"reference", "list"});
     golden({"export", "jsonl"});
     golden({"help", "root"});
+    goldenReport();
     golden({"batch", "--dry-run"},
            "name Motor\nlabel create Owner Bob\nlabel put Owner Bob src/io\nremove src/gone\n"
            "entry remove src/main.cpp\npath add src\ngroup delete Nightly\ncategory rename Owner Keeper\n");

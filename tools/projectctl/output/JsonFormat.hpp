@@ -37,6 +37,7 @@ inline constexpr JsonFormat message{"projectctl-message", 1}; ///< on standard e
 inline constexpr JsonFormat name{"projectctl-name", 1};
 inline constexpr JsonFormat referenceGraph{"projectctl-reference-graph", 1};
 inline constexpr JsonFormat referenceList{"projectctl-reference-list", 1}; ///< also of `path list`
+inline constexpr JsonFormat report{"projectctl-report", 1};
 inline constexpr JsonFormat resolve{"projectctl-resolve", 1};
 inline constexpr JsonFormat root{"projectctl-root", 1};
 inline constexpr JsonFormat sharedLog{"projectctl-shared-log", 1};
