@@ -122,6 +122,28 @@ test('a click zooms to a folder, and a step of the path zooms back', () => withP
     assert.deepEqual(await crumbs(page), ['Whole project']);
 }));
 
+test('an outline leaves nothing behind, and another measure lays out every folder again', () =>
+    withPage(engine, {}, async (page) => {
+        const pixels = () => page.evaluate(() => {
+            const {canvas} = shownPage.map;
+            const copy = new OffscreenCanvas(canvas.width, canvas.height).getContext('2d');
+            copy.drawImage(canvas, 0, 0);
+            return [...copy.getImageData(0, 0, canvas.width, canvas.height).data].reduce((sum, value, i) =>
+                (sum * 31 + value * (i % 7 + 1)) % 2147483647, 0);
+        });
+        const plain = await pixels();
+        await page.evaluate(() => shownPage.map.select(shownPage.map.root.children[0]));
+        assert.notEqual(await pixels(), plain);
+        await page.evaluate(() => shownPage.map.select(null));
+        assert.equal(await pixels(), plain);
+        await page.evaluate(() => shownPage.map.zoomTo(shownPage.model.paths.indexOf('src') + 1));
+        await page.select('#mapMeasure', 'count');
+        await page.evaluate(() => shownPage.map.zoomTo(0));
+        assert.notEqual(await pixels(), plain);
+        await page.select('#mapMeasure', 'size');
+        assert.equal(await pixels(), plain);
+    }));
+
 test('the pointer shows the path, the size and the labels of a file', () => withPage(engine, {}, async (page) => {
     await chooseColour(page, 'Status');
     const place = await page.evaluate(() => {

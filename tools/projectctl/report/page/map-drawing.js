@@ -4,24 +4,46 @@ class MapDrawing {
     constructor(canvas, tree) {
         this.canvas = canvas;
         this.tree = tree;
-        this.context = canvas.getContext('2d');
+        this.shown = canvas.getContext('2d');
+        this.picture = document.createElement('canvas');
+        this.context = this.picture.getContext('2d');
+        this.pictured = {};
         this.scale = 0;
     }
 
-    /** Adapts the canvas to its size on the page. */
+    /** Adapts the canvas to its size on the page. @return whether it has another size now. */
     resize(width, height) {
-        this.scale = window.devicePixelRatio || 1;
-        this.canvas.width = Math.round(width * this.scale);
-        this.canvas.height = Math.round(height * this.scale);
-        this.fills = new Fills(this.context, this.scale);
+        const scale = window.devicePixelRatio || 1;
+        const size = {width: Math.round(width * scale), height: Math.round(height * scale)};
+        if (scale === this.scale && size.width === this.canvas.width && size.height === this.canvas.height) {
+            return false;
+        }
+        this.scale = scale;
+        Object.assign(this.canvas, size);
+        Object.assign(this.picture, size);
+        this.fills = new Fills(this.context, scale);
+        this.pictured = {};
+        return true;
     }
 
+    /** Shows the map. Its picture is drawn once, and then copied before each outline. */
     draw(root, colouring, shares) {
+        const [frame, ink, surface] = ['frame', 'ink', 'surface'].map(schemeColour);
+        const wanted = {root, colouring, shares, frame, ink, surface};
+        if (Object.keys(wanted).some((part) => wanted[part] !== this.pictured[part])) {
+            Object.assign(this, {frame, ink});
+            this.drawPicture(root, colouring, shares, surface);
+            this.pictured = wanted;
+        }
+        this.shown.setTransform(1, 0, 0, 1, 0, 0);
+        this.shown.drawImage(this.picture, 0, 0);
+        this.shown.setTransform(this.scale, 0, 0, this.scale, 0, 0);
+    }
+
+    drawPicture(root, colouring, shares, surface) {
         const {context} = this;
         context.setTransform(this.scale, 0, 0, this.scale, 0, 0);
-        this.frame = schemeColour('frame');
-        this.ink = schemeColour('ink');
-        context.fillStyle = schemeColour('surface');
+        context.fillStyle = surface;
         context.fillRect(0, 0, root.x1, root.y1);
         context.textBaseline = 'middle';
         context.direction = 'ltr';
@@ -95,7 +117,7 @@ class MapDrawing {
     }
 
     outline(node, colour, width) {
-        const {context} = this;
+        const context = this.shown;
         context.strokeStyle = colour;
         context.lineWidth = width;
         context.strokeRect(node.x0 + width / 2, node.y0 + width / 2,

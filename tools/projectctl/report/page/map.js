@@ -31,6 +31,7 @@ class ProjectMap {
         this.colouring = this.colourings[index].create();
         this.measure = byId('mapMeasure').value;
         this.sums = this.tree.sumsOf(this.measure, this.colouring.showsRemoved);
+        this.layouts = new Map(); // of the folders that were in focus
         this.shares = new GroupShares(this.tree, this.colouring, this.measure);
         this.zoomTo(this.focus);
     }
@@ -52,8 +53,13 @@ class ProjectMap {
 
     layOut() {
         const {width, height} = this.size;
-        this.drawing.resize(width, height);
-        this.root = layOutMap(this.tree, this.sums.weights, this.focus, width, height);
+        if (this.drawing.resize(width, height)) {
+            this.layouts.clear();
+        }
+        if (!this.layouts.has(this.focus)) {
+            this.layouts.set(this.focus, layOutMap(this.tree, this.sums.weights, this.focus, width, height));
+        }
+        this.root = this.layouts.get(this.focus);
     }
 
     /** Lays the map out for another size of its place. The selected node stays selected. */
