@@ -1,7 +1,7 @@
 # Compiles message texts and embeds them in a target.
 
-find_program(GENRB genrb REQUIRED)
-find_program(PKGDATA pkgdata REQUIRED)
+find_program(PROJECT_MANAGEMENT_GENRB genrb REQUIRED)
+find_program(PROJECT_MANAGEMENT_PKGDATA pkgdata REQUIRED)
 
 # project_embed_messages(<target> <package> <locale>.txt...)
 #
@@ -19,7 +19,7 @@ function(project_embed_messages target package)
     get_filename_component(locale "${text}" NAME_WE)
     list(APPEND texts "${CMAKE_CURRENT_SOURCE_DIR}/${text}")
     list(APPEND bundles "${locale}.res")
-    list(APPEND compile COMMAND "${GENRB}" --quiet --encoding UTF-8 --destdir "${folder}"
+    list(APPEND compile COMMAND "${PROJECT_MANAGEMENT_GENRB}" --quiet --encoding UTF-8 --destdir "${folder}"
       "${CMAKE_CURRENT_SOURCE_DIR}/${text}")
   endforeach()
   list(JOIN bundles "\n" bundles)
@@ -27,7 +27,7 @@ function(project_embed_messages target package)
 
   add_custom_command(OUTPUT "${data}"
     ${compile}
-    COMMAND "${PKGDATA}" --quiet --mode common --name ${package} --sourcedir "${folder}" --destdir "${folder}"
+    COMMAND "${PROJECT_MANAGEMENT_PKGDATA}" --quiet --mode common --name ${package} --sourcedir "${folder}" --destdir "${folder}"
       --tempdir "${folder}" bundles.txt
     DEPENDS ${texts} "${folder}/bundles.txt"
     WORKING_DIRECTORY "${folder}" VERBATIM COMMENT "Compiling the texts of ${package}")

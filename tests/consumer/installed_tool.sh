@@ -5,9 +5,9 @@ set -eu
 share=$1/share
 
 for page in man1/projectctl.1 man1/projectctl-label.1 de/man1/projectctl.1 de/man1/projectctl-label.1; do
-    grep -q '^\.Nm projectctl' "$share/man/$page"
+    zgrep -q '^\.Nm projectctl' "$share/man/$page.gz"
 done
-mandoc -T ascii "$share/man/man1/projectctl-label.1" | grep -q "label put"
+mandoc -T ascii "$share/man/man1/projectctl-label.1.gz" | grep -q "label put"
 
 export PATH=$1/bin:$PATH
 folder=$(mktemp -d)
