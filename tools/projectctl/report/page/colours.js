@@ -1,9 +1,9 @@
 // The colours of the map. The text on them is dark in both colour schemes.
 
-const groupColours = ['#5b8fd9', '#d07a3a', '#4f9d69', '#a179cf', '#3b9aa3', '#cf6a94', '#98902f', '#cb6d5d'];
+const groupColours = ['#5b8fd9', '#c97333', '#4f9d69', '#a179cf', '#3b9aa3', '#cf6a94', '#98902f', '#cb6d5d'];
 const noLabelColour = '#868d97';
 const changeColours = {
-    unchanged: '#868d97', added: '#4f9d69', removed: '#cb6d5d', labels: '#d07a3a', content: '#5b8fd9',
+    unchanged: '#868d97', added: '#4f9d69', removed: '#cb6d5d', labels: '#c97333', content: '#5b8fd9',
     renamed: '#a179cf',
 };
 
