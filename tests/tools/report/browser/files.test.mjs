@@ -131,6 +131,17 @@ test('a click on a heading sorts, and another one reverses the order', () => wit
     assert.deepEqual((await shownPaths(page)).slice(0, 3), ['src/new.cpp', 'tools/clean.py', 'docs/readme.md']);
 }));
 
+test('a short list is as high as its rows, and a long one scrolls', () => withPage(pages.hostile, {}, async (page) => {
+    const heights = () => page.$eval('.grid', (grid) => ({shown: grid.clientHeight, all: grid.scrollHeight}));
+    const long = await heights();
+    assert.ok(long.shown < long.all && long.shown <= 640);
+    await page.evaluate(() => shownPage.files.form.set({...noConditions(), search: 'מ'}));
+    await drawn(page);
+    const short = await heights();
+    assert.equal(short.shown, short.all);
+    assert.equal((await page.$$('.rows .row')).length, Math.round((short.shown - 38) / 32));
+}));
+
 test('the keyboard moves through the list, and shows a row on the map', () => withPage(pages.engine, {}, async (page) => {
     await page.focus('.grid');
     const current = () => textOf(page, '.row.current .name');

@@ -5,6 +5,7 @@ import {createEngine, report} from './projects.mjs';
 
 createEngine();
 const engine = report('engine');
+const compared = report('engine', ['--compare', 'HEAD']);
 useBrowser();
 
 /** Copies the canvas, since reading a canvas slows its drawing down. */
@@ -92,6 +93,22 @@ test('a file with several labels of the category shows each of their colours', (
     });
     assert.notEqual(seen[0], seen[1]);
 }));
+
+test('with a comparison, tiles have the colours of the changes, and removed files have tiles too',
+    () => withPage(compared, {}, async (page) => {
+        await page.select('#mapMeasure', 'count');
+        const all = await picture(page);
+        const colours = Object.fromEntries(all.map((node) => [node.path, node.colour]));
+        const expected = await page.evaluate(() => changeColours);
+        assert.equal(colours['src/new.cpp'], expected.added);
+        assert.equal(colours['src/main.cpp'], expected.labels);
+        assert.equal(colours['docs/readme.md'], expected.content);
+        assert.equal(colours['src/io/pump.cpp'], expected.unchanged);
+        assert.ok(all.some((node) => node.isTile && node.path === 'docs/old.md'));
+        await chooseColour(page, 'Status');
+        await drawn(page);
+        assert.ok(!(await picture(page)).some((node) => node.path === 'docs/old.md'));
+    }));
 
 test('a table has the share of each label in each folder', () => withPage(engine, {}, async (page) => {
     await chooseColour(page, 'Status');
