@@ -84,15 +84,16 @@ export function createEngine() {
     writeFileSync(join(scratch, 'engine/unknown.txt'), 'x\n');
 }
 
-/** A project in which a file and a category were renamed since the last commit. */
+/** A project in which a file and a category were renamed, and a folder was removed, since the last commit. */
 export function createRenamed() {
     mkdirSync(join(scratch, 'renamed'), {recursive: true});
     run('renamed', 'git', ['init', '-q', '-b', 'main']);
-    createProject('renamed', 'Renamed', {'src/main.cpp': 'x\n', 'src/old.cpp': 'one line\n'.repeat(20)});
+    createProject('renamed', 'Renamed', {'gone/x.txt': 'x\n', 'src/main.cpp': 'x\n', 'src/old.cpp': 'one line\n'.repeat(20)});
     tool('renamed', 'category', 'create', 'Status');
     commit('renamed', 'First', '2026-03-01T10:00:00+00:00');
     tool('renamed', 'move', 'src/old.cpp', 'src/new.cpp');
     tool('renamed', 'category', 'rename', 'Status', 'State');
+    tool('renamed', 'remove', 'gone');
 }
 
 /** Names that would do harm, or hide, if they were anything but text. */

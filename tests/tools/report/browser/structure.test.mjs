@@ -97,7 +97,12 @@ test('a comparison shows renamed files and categories with their earlier names',
         const found = await page.evaluate(() => findEntries(shownPage.model, {...noConditions(), change: 'renamed'})
             .map((entry) => shownPage.model.paths[entry]));
         assert.deepEqual(found, ['src/new.cpp']);
-        assert.deepEqual(await page.evaluate(() => shownPage.model.paths), ['src', 'src/main.cpp', 'src/new.cpp']);
+        assert.deepEqual(await page.evaluate(() => shownPage.model.paths),
+            ['gone', 'gone/x.txt', 'src', 'src/main.cpp', 'src/new.cpp']);
+        const folders = () => textsOf(page, '#sharesTable td:first-child');
+        assert.deepEqual(await folders(), ['Whole project', 'gone', 'src']);
+        await page.select('#mapColour', '1');
+        assert.deepEqual(await folders(), ['Whole project', 'src']);
     }));
 
 test('a project without a name, files and labels has a page too', () => withPage(report('empty'), {}, async (page) => {

@@ -30,7 +30,8 @@ function linkOfGroup(model, group) {
 function showShares(map) {
     const {tree, shares, colouring, focus} = map;
     byId('sharesTitle').textContent = text('SharesOf', colouring.title);
-    const folders = [focus, ...tree.childrenOf(focus).filter((node) => tree.isFolder(node))];
+    const isShown = (node) => tree.isFolder(node) && (colouring.showsRemoved || !map.model.isRemoved(node - 1));
+    const folders = [focus, ...tree.childrenOf(focus).filter(isShown)];
     const shown = folders.slice(0, mostShownFolders + 1);
     const columns = [{title: text('Folder')}, {title: text('Files'), isNumber: true},
         ...colouring.groups.map((group) => ({title: group.name, isNumber: true}))];
