@@ -8,15 +8,15 @@ skip() { echo "skipped: $*"; exit 77; }
 command -v debootstrap > /dev/null || skip "debootstrap is not installed"
 
 TIMEFORMAT='    (%R s)'
-show() { # show COMMAND...: prints and runs it
-    printf '$ %s\n' "$*"
-    time "$@"
-}
 quietly() { "$@" > "$root.log" 2>&1 || { tail -n 40 "$root.log" >&2; exit 1; }; }
-inside() { show quietly env -i PATH=/usr/sbin:/usr/bin:/sbin:/bin DEBIAN_FRONTEND=noninteractive chroot "$root" "$@"; }
+in_root() { env -i PATH=/usr/sbin:/usr/bin:/sbin:/bin DEBIAN_FRONTEND=noninteractive chroot "$root" "$@"; }
+as_root() { # as_root COMMAND...
+    printf '# %s\n' "$*"
+    time quietly in_root "$@"
+}
 as_user() { # as_user COMMAND-LINE: as a user without rights
     printf '$ %s\n' "$*"
-    time env -i chroot "$root" su - newcomer -c "$*"
+    time in_root su - newcomer -c "$*"
 }
 fail() { echo "$*" >&2; exit 1; }
 
@@ -29,20 +29,21 @@ mirror=$(awk -v codename="$codename" '$3 == codename {print $2; exit}' < <(print
 
 rm -rf "$root"
 mkdir -p "$root"
-show quietly debootstrap --variant=minbase "$codename" "$root" "$mirror"
+echo "# debootstrap"
+time quietly debootstrap --variant=minbase "$codename" "$root" "$mirror"
 printf '%s\n' "${archives[@]}" > "$root/etc/apt/sources.list"
 apt-config dump | { grep -E '^Acquire::(https?|Check|Retries)' || true; } > "$root/etc/apt/apt.conf.d/90machine"
 echo force-unsafe-io > "$root/etc/dpkg/dpkg.cfg.d/fast" # the root is deleted at the end
 cp /etc/resolv.conf /etc/hosts "$root/etc/"
 printf '#!/bin/sh\nexit 101\n' > "$root/usr/sbin/policy-rc.d" # starts no service
 chmod +x "$root/usr/sbin/policy-rc.d"
-inside useradd --create-home --shell /bin/bash newcomer
+as_root useradd --create-home --shell /bin/bash newcomer
 
 # From the packages to a running program.
 cp "$packages"/*.deb "$root/tmp/"
 begin=$EPOCHREALTIME
-inside apt-get update
-inside sh -c 'apt-get install --yes --no-install-recommends /tmp/projectctl_*.deb'
+as_root apt-get update
+as_root sh -c 'apt-get install --yes --no-install-recommends /tmp/projectctl_*.deb'
 as_user projectctl --version
 as_user 'mkdir -p sources/.git/objects sources/.git/refs && echo "ref: refs/heads/main" > sources/.git/HEAD'
 as_user 'cd sources && touch main.cpp && projectctl init && projectctl add main.cpp && projectctl check'
@@ -54,7 +55,7 @@ as_user 'source /usr/share/bash-completion/completions/projectctl && complete -p
 as_user 'zcat /usr/share/man/man1/projectctl.1.gz | grep -q "^.Nm projectctl"'
 
 # The library, for programs.
-inside sh -c 'apt-get install --yes --no-install-recommends /tmp/*.deb g++ cmake make pkg-config'
+as_root sh -c 'apt-get install --yes --no-install-recommends /tmp/*.deb g++ cmake make pkg-config'
 cp -r "$consumer" "$root/home/newcomer/consumer"
 as_user 'cmake -S consumer/find_package -B by_cmake > by_cmake.log && cmake --build by_cmake -j2 >> by_cmake.log' ||
     fail "$(cat "$root/home/newcomer/by_cmake.log")"
@@ -70,7 +71,7 @@ grep -q 'definition of service "nowhere" not found' <<< "$answer" ||
     fail "the library for shared projects was not found"
 
 # Removing the packages leaves nothing of theirs.
-inside sh -c 'apt-get purge --yes projectctl "libproject-*"'
+as_root sh -c 'apt-get purge --yes projectctl "libproject-*"'
 left=$(find "$root/usr" -name '*project_management*' -o -name 'projectctl*' -o -name 'libproject_*')
 [ -z "$left" ] || fail "left after removal: $left"
 rm -rf "$root"
