@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "FileAddition.hpp"
+#include "RenamedFiles.hpp"
 #include "SyncRules.hpp"
 #include "SyncScan.hpp"
 #include "project/core/FileManager.hpp"
@@ -81,6 +82,11 @@ SyncPlan FolderSync::plan() {
     git::GitAdapter git(root_, environment_);
     auto const guard = store_.acquireReadLock();
     return SyncScan(store_, root_, git).run();
+}
+
+std::vector<Move> FolderSync::renamesIn(SyncPlan const& plan) const {
+    git::GitAdapter git(root_, environment_);
+    return renamedFiles(plan, git);
 }
 
 void FolderSync::apply(SyncPlan const& plan, SyncOptions const& options) {

@@ -2,6 +2,7 @@
 
 #include <functional>
 #include <memory>
+#include <vector>
 
 #include "ChangeExecutor.hpp"
 #include "EventQueue.hpp"
@@ -30,6 +31,9 @@ public:
 
     /// As Session::planSync.
     SyncPlan plan();
+
+    /// The files of a plan that were renamed, as SyncPlan::renamed describes.
+    std::vector<Move> renamesIn(SyncPlan const& plan) const;
 
     /// Makes the changes of a plan. Call it in the transaction in which the plan was made.
     void apply(SyncPlan const& plan, SyncOptions const& options);

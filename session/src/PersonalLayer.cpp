@@ -1,11 +1,13 @@
 #include "PersonalLayer.hpp"
 
 #include <algorithm>
+#include <set>
 #include <utility>
 
 #include "project/files/FileLabel.hpp"
 #include "project/files/LabelIDSet.hpp"
 #include "project/metadata/Messages.hpp"
+#include "project/metadata/MetadataFunctions.hpp"
 #include "project/metadata/ProjectException.hpp"
 
 namespace project::session {
@@ -170,6 +172,29 @@ std::vector<Path> PersonalLayer::removeHidden() {
         personal_.remove(hidden);
     });
     return hidden;
+}
+
+std::vector<Move> PersonalLayer::followHidden(std::vector<Move> const& moves) {
+    std::vector<Move> followed;
+    executor_.execute([&] {
+        auto const hidden = hiddenFiles();
+        stores::PathMoves paths;
+        std::set<Path> targets;
+        for (auto const& move : moves) {
+            bool const isPossible = std::ranges::find(hidden, move.from) != hidden.end() &&
+                                    files_.isFileInProject(move.to) && !personal_.contains(move.to);
+            if (isPossible && targets.insert(move.to).second) {
+                paths.add(metadata::getRelativePath(personal_.root(), move.from),
+                          metadata::getRelativePath(personal_.root(), move.to), true);
+                followed.push_back(move);
+            }
+        }
+        if (!followed.empty()) {
+            personal_.move(paths);
+            personal_.steps().raised().input()->dispatchMetadataChange();
+        }
+    });
+    return followed;
 }
 
 bool PersonalLayer::refresh() {

@@ -99,6 +99,7 @@ public:
 
     std::vector<Path> hiddenFiles() override;
     std::vector<Path> removeHidden() override;
+    std::vector<Move> followHidden(std::vector<Move> const& moves) override;
 
     /// Dispatches the events of changes by other programs. @return false if there were none.
     bool refresh();

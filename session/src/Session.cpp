@@ -114,6 +114,12 @@ SyncPlan Session::sync(SyncOptions const& options) {
     }
     auto step = transaction();
     auto plan = planSync(); // the project may have changed before the transaction began
+    if (auto renamed = options.followsRenames ? state_->sync.renamesIn(plan) : std::vector<Move>();
+        !renamed.empty()) {
+        adopt(renamed);
+        plan = planSync();
+        plan.renamed = std::move(renamed);
+    }
     state_->sync.apply(plan, options);
     step.commit();
     return plan;

@@ -77,6 +77,7 @@ SyncPlan SyncScan::run() {
     }
     std::ranges::sort(plan_.added, std::less<>(), &FoundFile::path);
     findMissing();
+    findAbsent();
     findLosses();
     return std::move(plan_);
 }
@@ -191,6 +192,15 @@ void SyncScan::findMissing() {
         auto const path = absolute(folder);
         if (!isFolderWithin(root_, path) || !hasContents(path)) {
             plan_.missing.push_back(path);
+        }
+    }
+}
+
+void SyncScan::findAbsent() {
+    for (auto const& rule : readSyncRules(store_, root_)) {
+        bool const isMissing = std::ranges::find(plan_.missing, rule.folder) != plan_.missing.end();
+        if (!isMissing && !isFolderWithin(root_, rule.folder)) {
+            plan_.absent.push_back(rule.folder);
         }
     }
 }

@@ -34,6 +34,7 @@ private:
     void readNew(Path const& folder, std::vector<FoundFile>& found);
     void remove(std::vector<FoundFile> const& gone);
     void findMissing();
+    void findAbsent();
     void findLosses();
 
     Path absolute(std::u16string const& path) const;

@@ -336,6 +336,36 @@ TEST_F(PersonalLayer, hidesLabelsWhileAnotherBranchIsCheckedOut) {
     EXPECT_THAT(session_.personal().hiddenFiles(), IsEmpty());
 }
 
+TEST_F(PersonalLayer, letsHiddenLabelsFollowAMoveOfAnotherPerson) {
+    put({valve_, engine_, pump_});
+    auto text = projectText();
+    text.replace(text.find("\"valve.cpp\"\n"), std::string("\"valve.cpp\"\n").size(), "\"vent.cpp\"\n");
+    folder_.addFile(".projectdata/project.jsonl", text);
+    auto const vent = folder_.path(u"vent.cpp");
+    test::EventLog log(*session_.personal().events());
+
+    auto const followed = session_.personal().followHidden({{valve_, vent}});
+
+    EXPECT_EQ(followed, (std::vector<Move>{{valve_, vent}}));
+    EXPECT_TRUE(isLabelled(vent));
+    EXPECT_THAT(session_.personal().hiddenFiles(), IsEmpty());
+    EXPECT_THAT(log.take(), ElementsAre(u"metadataChange"));
+}
+
+TEST_F(PersonalLayer, leavesHiddenLabelsWhereTheyCannotFollow) {
+    put({valve_, engine_});
+    auto text = projectText();
+    text.erase(text.find("\"valve.cpp\"\n"), std::string("\"valve.cpp\"\n").size());
+    folder_.addFile(".projectdata/project.jsonl", text);
+
+    EXPECT_THAT(session_.personal().followHidden({{valve_, engine_}}), IsEmpty()) << "it has labels";
+    EXPECT_THAT(session_.personal().followHidden({{valve_, folder_.path(u"none")}}), IsEmpty());
+    EXPECT_THAT(session_.personal().followHidden({{engine_, pump_}}), IsEmpty()) << "it is not hidden";
+
+    EXPECT_THAT(session_.personal().hiddenFiles(), ElementsAre(valve_));
+    EXPECT_TRUE(isLabelled(engine_));
+}
+
 TEST_F(PersonalLayer, deletesHiddenLabelsOnRequest) {
     put({valve_, engine_});
     auto text = projectText();

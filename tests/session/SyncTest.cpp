@@ -548,5 +548,111 @@ TEST_F(SyncInRepository, aFolderStaysInWhichGitTracksAnotherFile) {
     EXPECT_EQ(git_.run({"ls-files", "src"}), "src/a.c\nsrc/io/unlisted.c\n");
 }
 
+TEST_F(SyncInRepository, aFileThatAnotherProgramRenamedKeepsItsLabelsAndItsEntryPoint) {
+    session_.project().getFileManager().add({folder_.file(u"src/old.c", "the pump\n")});
+    auto const label = createLabel();
+    session_.project().getFileManager().addLabels({folder_.path(u"src/old.c")}, {label});
+    EntryPointDefinition entry(folder_.path(u"src/old.c"));
+    session_.project().getEntryPointManager().setEntryPoint(entry);
+    rule(u"src");
+    git_.commitAll();
+    folder_.folder(u"src/io");
+    std::filesystem::rename(folder_.onDisk() / "src/old.c", folder_.onDisk() / "src/io/new.c");
+
+    auto const plan = session_.sync();
+
+    EXPECT_EQ(plan.renamed, (std::vector<Move>{{folder_.path(u"src/old.c"), folder_.path(u"src/io/new.c")}}));
+    EXPECT_THAT(plan.added, IsEmpty());
+    EXPECT_THAT(plan.removed, IsEmpty());
+    EXPECT_EQ(listed(), (Names{u"src", u"src/io", u"src/io/new.c"}));
+    EXPECT_FALSE(session_.project().getFileManager().getLabelIDSets(folder_.path(u"src/io/new.c")).empty());
+    EXPECT_EQ(session_.project().getEntryPointManager().getEntryPoints().front()->getFile(),
+              folder_.path(u"src/io/new.c"));
+    EXPECT_EQ(git_.run({"status", "--porcelain"}),
+              "M  .projectdata/project.jsonl\nR  src/old.c -> src/io/new.c\n");
+}
+
+TEST_F(SyncInRepository, aRenameThatIsStagedIsFollowedToo) {
+    session_.project().getFileManager().add({folder_.file(u"src/old.c", "the pump\n")});
+    rule(u"src");
+    git_.commitAll();
+    git_.run({"mv", "src/old.c", "src/new.c"});
+
+    EXPECT_EQ(session_.sync().renamed.size(), 1U);
+}
+
+TEST_F(SyncInRepository, ofSeveralEqualFilesOnlyThoseOfTheSameNameAreFollowed) {
+    for (auto const* name : {u"src/a/x.c", u"src/a/y.c"}) {
+        session_.project().getFileManager().add({folder_.file(name, "the same\n")});
+    }
+    session_.project().getFileManager().add({folder_.file(u"src/a/empty", "")});
+    session_.project().getFileManager().add({folder_.file(u"src/a/changed", "before\n")});
+    rule(u"src");
+    git_.commitAll();
+    folder_.remove(u"src/a");
+    folder_.file(u"src/b/x.c", "the same\n");
+    folder_.file(u"src/b/z.c", "the same\n");
+    folder_.file(u"src/b/w.c", "the same\n");
+    folder_.file(u"src/b/other", "");
+    folder_.file(u"src/b/changed", "after\n");
+
+    auto const plan = session_.sync();
+
+    EXPECT_EQ(plan.renamed, (std::vector<Move>{{folder_.path(u"src/a/x.c"), folder_.path(u"src/b/x.c")}}));
+    EXPECT_EQ(added(plan), (Names{u"src/b/changed", u"src/b/other", u"src/b/w.c", u"src/b/z.c"}));
+}
+
+TEST_F(SyncInRepository, renamesAreNotFollowedIfTheOptionsSaySo) {
+    session_.project().getFileManager().add({folder_.file(u"src/old.c", "the pump\n")});
+    rule(u"src");
+    git_.commitAll();
+    std::filesystem::rename(folder_.onDisk() / "src/old.c", folder_.onDisk() / "src/new.c");
+
+    auto const plan = session_.sync({.followsRenames = false});
+
+    EXPECT_THAT(plan.renamed, IsEmpty());
+    EXPECT_EQ(removed(plan), Names{u"src/old.c"});
+}
+
+TEST_F(SyncTest, outsideARepositoryNoRenameIsGuessed) {
+    add(u"src/old.c");
+    rule(u"src");
+    std::filesystem::rename(folder_.onDisk() / "src/old.c", folder_.onDisk() / "src/new.c");
+
+    EXPECT_THAT(session_.sync().renamed, IsEmpty());
+    EXPECT_EQ(listed(), (Names{u"src", u"src/new.c"}));
+}
+
+TEST_F(SyncTest, aRuleMovesWithItsFolder) {
+    add(u"src/io/a.c");
+    rule(u"src/io", {u"*.c"});
+
+    session_.move({folder_.path(u"src")}, folder_.path(u"lib"));
+
+    ASSERT_EQ(session_.syncRules().size(), 1U);
+    EXPECT_EQ(session_.syncRules().front(), (SyncRule{folder_.path(u"lib/io"), {u"*.c"}}));
+}
+
+TEST_F(SyncTest, aRuleFollowsAnAdoptedFolder) {
+    add(u"src/a.c");
+    rule(u"src", {u"*.c"});
+    std::filesystem::rename(folder_.onDisk() / "src", folder_.onDisk() / "lib");
+
+    session_.adopt({{folder_.path(u"src"), folder_.path(u"lib")}});
+
+    ASSERT_EQ(session_.syncRules().size(), 1U);
+    EXPECT_EQ(session_.syncRules().front(), (SyncRule{folder_.path(u"lib"), {u"*.c"}}));
+    EXPECT_THAT(session_.planSync().absent, IsEmpty());
+}
+
+TEST_F(SyncTest, thePlanNamesFoldersOfRulesThatDoNotExist) {
+    add(u"src/a.c");
+    rule(u"src");
+    session_.adopt({{folder_.path(u"src/a.c"), folder_.path(u"lib/a.c")}});
+    std::filesystem::rename(folder_.onDisk() / "src", folder_.onDisk() / "lib");
+
+    EXPECT_THAT(session_.planSync().absent, ElementsAre(folder_.path(u"src")));
+}
+
 } // namespace
 } // namespace project::session

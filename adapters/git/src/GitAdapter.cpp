@@ -8,6 +8,7 @@
 #include "index/Staging.hpp"
 #include "repository/RepositoryFinder.hpp"
 #include "repository/TrackedFiles.hpp"
+#include "states/ContentIds.hpp"
 #include "states/StateQuery.hpp"
 
 namespace project::git {
@@ -137,6 +138,30 @@ std::set<fl::filesystem::Path> GitAdapter::trackedBelow(std::vector<Path> const&
         }
     }
     return result;
+}
+
+template <typename Identity>
+std::map<fl::filesystem::Path, std::string> GitAdapter::contents(std::vector<Path> const& files,
+                                                                 Identity const& identity) {
+    std::map<Path, std::string> result;
+    auto* const found = files.empty() ? nullptr : repository();
+    if (found != nullptr) {
+        ContentIds ids(*found);
+        for (auto const& file : files) {
+            if (auto id = identity(ids, file)) {
+                result.emplace(file, *std::move(id));
+            }
+        }
+    }
+    return result;
+}
+
+std::map<fl::filesystem::Path, std::string> GitAdapter::storedContents(std::vector<Path> const& files) {
+    return contents(files, [](ContentIds& ids, Path const& file) { return ids.stored(file); });
+}
+
+std::map<fl::filesystem::Path, std::string> GitAdapter::contentsOnDisk(std::vector<Path> const& files) {
+    return contents(files, [](ContentIds& ids, Path const& file) { return ids.onDisk(file); });
 }
 
 GitAdapter::Batch::Batch(GitAdapter& adapter) : adapter_(adapter) {

@@ -184,7 +184,7 @@ public:
 
     /// Brings the folders that have rules up to date: adds the files that are new on disk, and removes those
     /// that are gone, in one transaction. Files that no rule is above stay as they are. Without a rule,
-    /// nothing changes.
+    /// nothing changes. Files that git shows to be renamed keep their labels and entry points.
     ///
     /// Takes the read lock while it reads the folders, and the write lock only if there is something to do.
     /// @return what was changed.

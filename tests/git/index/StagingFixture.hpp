@@ -2,6 +2,8 @@
 
 #include <stdexcept>
 
+#include <gmock/gmock.h>
+
 #include "git/GitRepository.hpp"
 #include "project/git/GitError.hpp"
 

@@ -224,5 +224,38 @@ TEST_F(Staging, thousandsOfFilesAreOneCall) {
     EXPECT_TRUE(tracked().empty());
 }
 
+TEST_F(Staging, contentsAreEqualIfGitWouldStageThemAlike) {
+    repository.write(".gitattributes", "*.txt text eol=crlf\n*.lfs filter=lfs\n");
+    repository.write("staged", "one\n");
+    repository.write("committed", "two\n");
+    repository.write("lines.txt", "a\nb\n");
+    repository.write("run", "one\n");
+    repository.commitAll();
+    repository.write("staged", "changed on disk\n");
+    repository.run({"rm", "-q", "--cached", "committed"});
+    repository.write("new one", "one\n");
+    repository.write("new two", "two\n");
+    repository.write("new.txt", "a\r\nb\r\n");
+    repository.run({"config", "filter.lfs.clean", "cat"});
+    repository.write("new.lfs", "one\n");
+    folder.addLink("work/link", "one\n");
+    auto const stored = adapter.storedContents(
+        repository.paths({"staged", "committed", "lines.txt", "new one", "nowhere", "d"}));
+    auto const onDisk = adapter.contentsOnDisk(
+        repository.paths({"new one", "new two", "new.txt", "new.lfs", "link", "nowhere", "."}));
+
+    auto const same = [&](char const* before, char const* after) {
+        return stored.at(repository.path(before)) == onDisk.at(repository.path(after));
+    };
+    EXPECT_EQ(stored.size(), 3U);
+    EXPECT_TRUE(same("staged", "new one"));
+    EXPECT_TRUE(same("committed", "new two"));
+    EXPECT_TRUE(same("lines.txt", "new.txt"));
+    EXPECT_TRUE(same("staged", "link")) << "the target of a link is its content";
+    EXPECT_FALSE(same("staged", "new two"));
+    EXPECT_FALSE(onDisk.contains(repository.path("new.lfs"))) << "only git runs filters";
+    EXPECT_EQ(onDisk.size(), 4U);
+}
+
 } // namespace
 } // namespace project::git

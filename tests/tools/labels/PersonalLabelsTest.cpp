@@ -248,5 +248,65 @@ TEST_F(PersonalLabels, canBePutInAProjectThatIsReadOnly) {
     EXPECT_THAT(tool({"label", "find", "Mine"}), Prints("a\nb\n"));
 }
 
+/// Another person's moves, which arrive in a merge.
+class PersonalLabelsAfterMerge : public PersonalLabels {
+protected:
+    void SetUp() override {
+        PersonalLabels::SetUp();
+        std::string lines;
+        for (int line = 0; line < 30; ++line) {
+            lines += std::to_string(line) + '\n';
+        }
+        folder_.addFile("pump.c", lines);
+        ASSERT_THAT(tool({"add", "pump.c"}), SucceedsSilently());
+        createPersonal("Mine", "Later", "pump.c");
+        git_.commitAll();
+        git_.run({"switch", "-q", "-c", "hers"});
+        ASSERT_THAT(tool({"move", "pump.c", "engine.c"}), SucceedsSilently());
+        git_.commitAll();
+        folder_.addFile("engine.c", lines + "more\n");
+        ASSERT_THAT(tool({"move", "engine.c", "motor.c"}), SucceedsSilently());
+        git_.commitAll();
+        // On this side, the person has put the label on the file under its old name.
+        git_.run({"switch", "-q", "main"});
+        ASSERT_THAT(tool({"label", "take", "Mine", "Later", "pump.c", "--personal"}), ::testing::_);
+        ASSERT_THAT(tool({"label", "put", "Mine", "Later", "pump.c", "--personal"}), SucceedsSilently());
+        ASSERT_THAT(tool({"tidy", "--personal"}).exitCode, 0);
+        git_.run({"merge", "-q", "--no-ff", "-m", "hers", "hers"});
+    }
+
+    GitFolder const git_{folder_.onDisk()};
+};
+
+TEST_F(PersonalLabelsAfterMerge, areOfferedAndFollowWhenTheMoveIsAdopted) {
+    EXPECT_THAT(tool({"label", "show", "motor.c"}), SucceedsSilently()) << "the label is hidden";
+
+    EXPECT_THAT(tool({"status", "--renames"}).output,
+                HasSubstr("ren  pump.c -> motor.c (personal labels)\n"));
+    EXPECT_THAT(tool({"status", "--renames", "--json"}).output,
+                HasSubstr("\"from\": \"pump.c\", \"to\": \"motor.c\", \"kind\": \"file\", \"evidence\": "
+                          "\"similarity\""));
+    EXPECT_THAT(tool({"adopt"}), SucceedsSilently());
+
+    EXPECT_THAT(tool({"label", "show", "motor.c"}), Prints("Mine: Later (personal)\n"));
+    EXPECT_EQ(git_.run({"status", "--porcelain"}), "") << "the project has not changed";
+    EXPECT_THAT(tool({"status", "--renames"}).output, Not(HasSubstr("ren ")));
+}
+
+TEST_F(PersonalLabelsAfterMerge, stayHiddenWhereTheFileHasPersonalLabels) {
+    ASSERT_THAT(tool({"label", "put", "Mine", "Later", "motor.c", "--personal"}), SucceedsSilently());
+
+    EXPECT_THAT(tool({"status", "--renames"}).output, Not(HasSubstr("ren ")));
+    EXPECT_THAT(tool({"adopt", "pump.c", "motor.c"}), FailsWith(1, "cannot follow to \"motor.c\""));
+
+    EXPECT_THAT(tool({"tidy", "--personal"}).exitCode, 0);
+}
+
+TEST_F(PersonalLabelsAfterMerge, followAGivenPair) {
+    EXPECT_THAT(tool({"adopt", "pump.c", "a"}), SucceedsSilently());
+
+    EXPECT_THAT(tool({"label", "show", "a"}), Prints("Mine: Later (personal)\n"));
+}
+
 } // namespace
 } // namespace project::test

@@ -229,6 +229,28 @@ TEST_F(RenamesOfMerge, areNotFollowedIfGitIsToldNotTo) {
         HasSubstr("the file \"src\" is removed by ours and changed by theirs, in the file \"src/main.cpp\""));
 }
 
+TEST_F(RenamesOfMerge, areNotFollowedIfGitLooksForNoneInDiffsAndMergesSayNothingElse) {
+    git_.run({"config", "diff.renames", "false"});
+    moveHereAndLabelThere(true);
+
+    EXPECT_EQ(git_.tryTo({"merge", "-q", "-m", "both", "other"}).exitCode, 1);
+    git_.run({"merge", "--abort"});
+
+    git_.run({"config", "merge.renames", "true"});
+    EXPECT_EQ(git_.tryTo({"merge", "-q", "-m", "both", "other"}).exitCode, 0);
+    expectLabelAtTheNewPlace();
+}
+
+TEST_F(RenamesOfMerge, areNotFollowedIfASettingOfOneCallSaysSo) {
+    moveHereAndLabelThere(true);
+
+    EXPECT_EQ(git_.tryTo({"-c", "merge.renames=false", "merge", "-q", "-m", "both", "other"}).exitCode, 1);
+    git_.run({"merge", "--abort"});
+
+    EXPECT_EQ(git_.tryTo({"merge", "-q", "-m", "both", "other"}).exitCode, 0);
+    expectLabelAtTheNewPlace();
+}
+
 TEST_F(RenamesOfMerge, areNotFollowedBeyondGitsLimit) {
     git_.run({"config", "merge.renameLimit", "1"});
     git_.run({"switch", "-q", "-c", "other"});

@@ -190,6 +190,21 @@ TEST_F(SyncCommand, checkReportsAMissingFolder) {
     EXPECT_THAT(tool({"check", "--json"}).output, HasSubstr("\"code\": \"sync-folder-missing\""));
 }
 
+TEST_F(SyncCommand, aRuleWhoseFolderWasLeftBehindIsANote) {
+    folder_.file(u"src/a.c");
+    ASSERT_EQ(tool({"batch"}, "add -r src\nsync --rule src\nadopt src/a.c lib/a.c\n").exitCode, 0);
+    std::filesystem::rename(inFolder("src"), inFolder("lib"));
+
+    EXPECT_THAT(tool({"status", "--json"}).output,
+                HasSubstr("{\"code\": \"sync-folder-absent\", \"fault\": false, \"path\": \"src\""));
+    auto const sync = tool({"sync"});
+    EXPECT_EQ(sync.exitCode, 0);
+    EXPECT_THAT(sync.errors, HasSubstr("warning: the folder \"src\" has a rule and does not exist"));
+
+    ASSERT_EQ(tool({"batch"}, "sync --rule lib\nsync --remove-rule src\n").exitCode, 0);
+    EXPECT_EQ(tool({"sync"}).errors, "");
+}
+
 TEST_F(SyncCommand, aRuleBelowAFolderWithoutOneIsSound) {
     folder_.file(u"src/io/a.c");
     ASSERT_EQ(tool({"batch"}, "sync --rule src/io\nsync\n").exitCode, 0);
@@ -294,6 +309,24 @@ TEST_F(SyncCommandInRepository, renamedFilesKeepTheirLabels) {
 
     EXPECT_THAT(tool({"list", "--label", "Status=Open"}), Prints("src/io/new.c\n"));
     EXPECT_EQ(list(), (Lines{"a", "b", "c", "src", "src/c.c", "src/io", "src/io/new.c"}));
+}
+
+TEST_F(SyncCommandInRepository, aRuleFollowsItsFolderThatAnotherProgramRenamed) {
+    folder_.file(u"src/a.c", "the first\n");
+    folder_.file(u"src/io/b.c", "the second\n");
+    ASSERT_EQ(
+        tool({"batch"}, "add -r src\nsync --rule src --include '**/*.c'\nlabel put Status Open src/a.c\n")
+            .exitCode,
+        0);
+    commit("src");
+    std::filesystem::rename(inFolder("src"), inFolder("lib"));
+
+    EXPECT_THAT(tool({"sync"}), SucceedsSilently());
+
+    EXPECT_THAT(tool({"sync", "--rules"}), Prints("lib --include '**/*.c'\n"));
+    EXPECT_EQ(list(), (Lines{"a", "b", "c", "lib", "lib/a.c", "lib/io", "lib/io/b.c"}));
+    EXPECT_THAT(tool({"list", "--label", "Status=Open"}), Prints("lib/a.c\n"));
+    EXPECT_THAT(tool({"check"}), SucceedsSilently());
 }
 
 TEST_F(SyncCommandInRepository, rulesOfTwoPeopleMerge) {

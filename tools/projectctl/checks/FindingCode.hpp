@@ -40,6 +40,7 @@ inline constexpr std::string_view referenceProjectMissing = "reference-project-m
 inline constexpr std::string_view syncNew = "sync-new";
 inline constexpr std::string_view syncGone = "sync-gone";
 inline constexpr std::string_view syncFolderMissing = "sync-folder-missing";
+inline constexpr std::string_view syncFolderAbsent = "sync-folder-absent";
 
 // Anything else in the definition.
 inline constexpr std::string_view nodeMissing = "node-missing";

@@ -46,6 +46,15 @@ void writeLine(char const* word, std::vector<std::u16string> const& from,
     writeNames(to, shown);
 }
 
+void addPair(JsonRows& rows, Rename const& pair) {
+    rows.begin();
+    rows.addText("from", pair.from);
+    rows.addText("to", pair.to);
+    rows.addText("kind", pair.kind == Kind::Folder ? u"folder" : u"file");
+    rows.addText("evidence", wordOf(pair.evidence));
+    rows.addNumber("similarity", static_cast<std::size_t>(pair.similarity));
+}
+
 } // namespace
 
 void writeRenameLines(Renames const& renames, ShownPaths shown) {
@@ -60,6 +69,11 @@ void writeRenameLines(Renames const& renames, ShownPaths shown) {
         output().text() += '\n';
         output().flushWhenLarge();
     }
+    for (auto const& pair : renames.personal) {
+        writeLine("ren  ", {pair.from}, {pair.to}, shown);
+        output().text() += ' ' + Message("RenamePersonal").text() + '\n';
+        output().flushWhenLarge();
+    }
     for (auto const& group : renames.ambiguous) {
         writeLine("ren? ", group.from, group.to, shown);
         output().text() += ' ' + Message("RenameAmbiguous").text() + '\n';
@@ -69,12 +83,11 @@ void writeRenameLines(Renames const& renames, ShownPaths shown) {
 void writeRenameRows(Renames const& renames) {
     JsonRows rows;
     for (auto const& pair : renames.pairs) {
-        rows.begin();
-        rows.addText("from", pair.from);
-        rows.addText("to", pair.to);
-        rows.addText("kind", pair.kind == Kind::Folder ? u"folder" : u"file");
-        rows.addText("evidence", wordOf(pair.evidence));
-        rows.addNumber("similarity", static_cast<std::size_t>(pair.similarity));
+        addPair(rows, pair);
+    }
+    for (auto const& pair : renames.personal) {
+        addPair(rows, pair);
+        rows.addText("layer", u"personal");
     }
     for (auto const& group : renames.ambiguous) {
         rows.begin();

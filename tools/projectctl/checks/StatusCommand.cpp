@@ -135,8 +135,7 @@ private:
             output().text() +=
                 (problem.isFault() ? bad : note) + ' ' + withoutControls(problem.text, false) + '\n';
         }
-        if (found.added.empty() && found.gone.empty() && found.problems.empty() &&
-            found.renames.pairs.empty() && found.renames.ambiguous.empty()) {
+        if (found.added.empty() && found.gone.empty() && found.problems.empty() && found.renames.isEmpty()) {
             output().say(Message("SameFiles"));
         }
     }

@@ -17,6 +17,11 @@ Findings findOutOfDate(OpenProject& project, ShownPaths shown) {
     for (auto const& folder : plan.missing) {
         add(code::syncFolderMissing, "FindingSyncFolderMissing", folder);
     }
+    for (auto const& folder : plan.absent) {
+        result.push_back(Finding::note(code::syncFolderAbsent,
+                                       Message("FindingSyncFolderAbsent", shown.ofAbsolute(folder)))
+                             .about(project::metadata::getRelativePath(project.root(), folder)));
+    }
     for (auto const& file : plan.added) {
         add(code::syncNew, "FindingSyncNew", file.path);
     }

@@ -1,10 +1,12 @@
 #include <algorithm>
+#include <iterator>
 #include <string>
 #include <vector>
 
 #include "changes/DryRun.hpp"
 #include "cli/CodedFailure.hpp"
 #include "cli/PathArguments.hpp"
+#include "cli/ShownPaths.hpp"
 #include "cli/TextArguments.hpp"
 #include "files/MoveFailure.hpp"
 #include "output/Output.hpp"
@@ -41,42 +43,75 @@ public:
         ProjectTransaction transaction(project);
         auto const moves = pairs_.empty() ? found(project) : given(project);
         try {
-            project.adopt(moves);
+            project.adopt(moves.ofFiles);
         } catch (project::session::MoveError const& error) {
             throw failureOf(error);
         }
-        project.changedFiles().listed += moves.size();
+        followPersonal(project, moves.ofHidden);
+        project.changedFiles().listed += moves.ofFiles.size();
         std::vector<Path> files;
-        std::ranges::transform(moves, std::back_inserter(files), &Move::to);
+        std::ranges::transform(moves.ofFiles, std::back_inserter(files), &Move::to);
         project.stageReturnedLater(files);
         if (dryRun_.end(transaction, project)) {
-            output().say(Message("Adopted", moves.size()));
+            output().say(Message("Adopted", moves.ofFiles.size() + moves.ofHidden.size()));
         }
         return 0;
     }
 
 private:
-    std::vector<Move> given(OpenProject& project) const {
+    struct Moves {
+        std::vector<Move> ofFiles;
+        std::vector<Move> ofHidden; ///< of files that left the project, and whose personal labels are hidden
+    };
+
+    Moves given(OpenProject& project) const {
         auto const paths = absolutePaths(pairs_);
-        std::vector<Move> result;
+        auto const hidden = project.personal().hiddenFiles();
+        Moves result;
         for (std::size_t index = 0; index < paths.size(); index += 2) {
-            project.requireInProject(paths[index]);
-            result.push_back({paths[index], paths[index + 1]});
+            Move const move{paths[index], paths[index + 1]};
+            if (std::ranges::find(hidden, move.from) != hidden.end()) {
+                result.ofHidden.push_back(move);
+            } else {
+                project.requireInProject(move.from);
+                result.ofFiles.push_back(move);
+            }
         }
         return result;
     }
 
-    std::vector<Move> found(OpenProject& project) const {
+    static void followPersonal(OpenProject& project, std::vector<Move> const& moves) {
+        if (moves.empty()) {
+            return;
+        }
+        auto const followed = project.personal().followHidden(moves);
+        for (auto const& move : moves) {
+            if (std::ranges::find(followed, move) == followed.end()) {
+                ShownPaths shown(project.root());
+                std::u16string const from(shown.ofAbsolute(move.from));
+                throw Failure(Message("PersonalNotFollowed", from, shown.ofAbsolute(move.to)));
+            }
+        }
+    }
+
+    static Move absolute(Rename const& rename, OpenProject const& project) {
+        return {project.root() / Path(rename.from), project.root() / Path(rename.to)};
+    }
+
+    Moves found(OpenProject& project) const {
         Progress const progress(Message("ProgressRenames"));
         auto const renames = findRenames(project, similarity_);
-        std::vector<Move> result;
+        Moves result;
         std::size_t guesses = 0;
         for (auto const& rename : renames.pairs) {
             if (rename.evidence == Rename::Evidence::Name && !adoptsGuesses_) {
                 ++guesses;
             } else {
-                result.push_back({project.root() / Path(rename.from), project.root() / Path(rename.to)});
+                result.ofFiles.push_back(absolute(rename, project));
             }
+        }
+        for (auto const& rename : renames.personal) {
+            result.ofHidden.push_back(absolute(rename, project));
         }
         if (guesses > 0) {
             printError(Message("GuessesLeft", guesses));

@@ -16,6 +16,7 @@
 #include "renames/DiskNames.hpp"
 #include "renames/GitContents.hpp"
 #include "renames/Pairing.hpp"
+#include "renames/PersonalRenames.hpp"
 
 namespace projectctl {
 
@@ -214,13 +215,15 @@ private:
 } // namespace
 
 Renames findRenames(OpenProject& project, int similarity) {
+    bool const usesGit = settings().sourceControl && isInGitRepository(project.root());
+    auto const personal = usesGit ? findPersonalRenames(project, similarity) : std::vector<Rename>();
     auto const listed = listedIn(project);
     if (listed.goneFiles.empty() && listed.goneFolders.empty()) {
-        return {};
+        return {{}, {}, personal};
     }
-    auto result = settings().sourceControl && isInGitRepository(project.root())
-                      ? GitSearch(project, listed, similarity).run()
-                      : pairByName(listed.goneFiles, filesOnDisk(project.root(), listed.all));
+    auto result = usesGit ? GitSearch(project, listed, similarity).run()
+                          : pairByName(listed.goneFiles, filesOnDisk(project.root(), listed.all));
+    result.personal = personal;
     pairFolders(result, listed.goneFolders,
                 [&listed](std::u16string const& path) { return listed.all.contains(path); });
     return result;

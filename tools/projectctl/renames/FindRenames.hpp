@@ -16,7 +16,8 @@ constexpr int usualSimilarity = 50;
 /// In a repository, the contents decide: those of the last commit that wrote the project's text, so that
 /// renames that were committed since are found; otherwise the staged ones, otherwise those of the last commit
 /// that contained the file. Files that git ignores are left out. A file without any earlier content is paired
-/// by its name, as are all files outside a repository.
+/// by its name, as are all files outside a repository. Hidden personal labels are paired as
+/// findPersonalRenames does.
 /// @param similarity from 1 to 100.
 /// @throws Failure if git fails.
 Renames findRenames(OpenProject& project, int similarity = usualSimilarity);

@@ -39,6 +39,12 @@ struct AmbiguousRename {
 struct Renames {
     std::vector<Rename> pairs; ///< sorted by the earlier path; a folder precedes its contents
     std::vector<AmbiguousRename> ambiguous;
+
+    /// Files that were in the project and whose personal labels are hidden, with the files of the project
+    /// that they have become.
+    std::vector<Rename> personal = {};
+
+    bool isEmpty() const noexcept { return pairs.empty() && ambiguous.empty() && personal.empty(); }
 };
 
 } // namespace projectctl

@@ -13,9 +13,12 @@ using project::session::SyncPlan;
 
 namespace {
 
-/// The paths that a plan changes.
-std::set<Path> pathsOf(SyncPlan const& plan) {
+/// The paths that a plan changes, and the folders whose rules have to follow.
+std::set<Path> pathsOf(OpenProject& project, SyncPlan const& plan) {
     std::set<Path> result;
+    for (auto const& rule : project.session().syncRules()) {
+        result.insert(rule.folder);
+    }
     for (auto const& file : plan.added) {
         result.insert(file.path);
     }
@@ -29,7 +32,7 @@ std::set<Path> pathsOf(SyncPlan const& plan) {
 
 std::vector<Move> followRenames(OpenProject& project, SyncPlan const& plan) {
     std::vector<Move> result;
-    auto const changed = pathsOf(plan);
+    auto const changed = pathsOf(project, plan);
     for (auto const& rename : findRenames(project).pairs) {
         Move const move{project.root() / Path(rename.from), project.root() / Path(rename.to)};
         bool const isOfPlan = changed.contains(move.from) || changed.contains(move.to);

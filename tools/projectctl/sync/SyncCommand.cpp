@@ -89,6 +89,7 @@ private:
         auto const seen = project.session().planSync();
         warnOfUnreadable(seen);
         if (seen.isEmpty()) {
+            warnOfAbsent(seen, project);
             report({}, seen, project);
             output().say(Message("SyncNothing"));
             return;
@@ -96,7 +97,9 @@ private:
         ProjectTransaction transaction(project);
         auto const renamed = followRenames(project, seen);
         requireFolders(project, project.session().planSync());
-        auto const plan = project.session().sync({isForced_});
+        auto const plan =
+            project.session().sync({.removesMissingFolders = isForced_, .followsRenames = false});
+        warnOfAbsent(plan, project);
         note(renamed, plan, project);
         report(renamed, plan, project);
         if (dryRun_.isOn() && dryRun_.isJson()) {
@@ -138,6 +141,14 @@ private:
     static void warnOfUnreadable(SyncPlan const& plan) {
         for (auto const& folder : plan.unreadable) {
             printWarning(Message("AsReported", problemOf(folder)));
+        }
+    }
+
+    /// Rules whose folder another program may have renamed.
+    static void warnOfAbsent(SyncPlan const& plan, OpenProject& project) {
+        auto shown = ShownPaths(project.root());
+        for (auto const& folder : plan.absent) {
+            printWarning(Message("FindingSyncFolderAbsent", shown.ofAbsolute(folder)));
         }
     }
 

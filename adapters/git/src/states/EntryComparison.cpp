@@ -1,10 +1,9 @@
 #include "states/EntryComparison.hpp"
 
-#include <string>
 #include <tuple>
 
-#include "repository/FileContent.hpp"
-#include "repository/TrackedFiles.hpp"
+#include "repository/LibGit.hpp"
+#include "states/ContentIds.hpp"
 
 namespace project::git {
 
@@ -29,12 +28,6 @@ bool isAsYoungAs(git_index_entry const& entry, FileStamp const& index) {
     }
     return std::tuple(seconds, std::int64_t{entry.mtime.nanoseconds}) >=
            std::tuple(index.seconds, index.nanoseconds);
-}
-
-/// @return false if it cannot be read.
-bool hashLink(git_oid& result, std::string const& name) {
-    auto const target = readLink(name);
-    return target && libgit().git_odb_hash(&result, target->data(), target->size(), GIT_OBJECT_BLOB) == 0;
 }
 
 } // namespace
@@ -62,15 +55,8 @@ bool EntryComparison::isContentModified(git_index_entry const& entry, struct sta
     if (entry.file_size != 0 && entry.file_size != static_cast<std::uint32_t>(onDisk.st_size)) {
         return true; // even if a filter would restore the size: git does not check that either
     }
-    std::string const name = repository_.workTree().onDisk(entry.path);
     git_oid content{};
-    bool isRead = false;
-    if (S_ISLNK(onDisk.st_mode)) {
-        isRead = hashLink(content, name);
-    } else if (rules_.conversionOf(entry.path).foreign.empty()) {
-        isRead = libgit().git_repository_hashfile(&content, repository_.get(), name.c_str(), GIT_OBJECT_BLOB,
-                                                  entry.path) == 0;
-    }
+    bool const isRead = hashOnDisk(content, repository_, rules_, entry.path, onDisk);
     return !isRead || libgit().git_oid_equal(&content, &entry.id) == 0;
 }
 

@@ -8,6 +8,7 @@
 #include "project/core/LabelManager.hpp"
 #include "project/decorators/DispatchableProjectEventBroadcaster.hpp"
 #include "project/session/Export.hpp"
+#include "project/session/Move.hpp"
 
 namespace project::session {
 
@@ -56,6 +57,12 @@ public:
     /// Deletes the personal labels of files that are not in the project now.
     /// @return these files.
     virtual std::vector<fl::filesystem::Path> removeHidden() = 0;
+
+    /// Lets hidden personal labels follow files that somebody else has moved, for example in a commit that was
+    /// merged. A move is left out if its old path is not hidden, its new path is not in the project or has
+    /// personal labels of its own, or another move leads there: its labels stay hidden.
+    /// @return the moves that were followed.
+    virtual std::vector<Move> followHidden(std::vector<Move> const& moves) = 0;
 
 protected:
     Personal() = default;

@@ -7,6 +7,7 @@
 
 #include "fl/filesystem/Path.hpp"
 #include "project/session/DiskFolder.hpp"
+#include "project/session/Move.hpp"
 #include "project/session/Query.hpp"
 
 namespace project::session {
@@ -38,6 +39,9 @@ struct SyncOptions {
     /// Whether everything below a rule's folder may be removed from the project although the folder itself is
     /// missing or empty, as it is when it is not mounted.
     bool removesMissingFolders = false;
+
+    /// Whether files that were renamed keep their labels and entry points: see SyncPlan::renamed.
+    bool followsRenames = true;
 };
 
 /// A file or folder that a synchronisation removes from the project, with what is lost by it.
@@ -51,6 +55,15 @@ struct RemovedFile {
 
 /// What a synchronisation changes. Everything is in the order of the store.
 struct SyncPlan {
+    /// Files that the project has followed to their new paths. Session::planSync leaves them among those that
+    /// are removed and added.
+    ///
+    /// A file that is gone and a new one are the same file if the new one has the content that git has of the
+    /// old one, staged or in the last commit. Where several files have this content, those of the same name
+    /// are; an empty file is followed by its name only. What remains ambiguous is not followed, and neither is
+    /// anything outside a repository.
+    std::vector<Move> renamed = {};
+
     /// New files. The folders above them are added with them.
     std::vector<FoundFile> added;
 
@@ -62,10 +75,14 @@ struct SyncPlan {
     /// the rule would remove.
     std::vector<fl::filesystem::Path> missing;
 
+    /// Folders with a rule that do not exist, and in which there is nothing that the rule would remove. Another
+    /// program may have renamed them: a rule moves with its folder only where the move is adopted.
+    std::vector<fl::filesystem::Path> absent;
+
     /// Folders that could not be read. What is in them stays as it is.
     std::vector<UnreadableFolder> unreadable;
 
-    bool isEmpty() const noexcept { return added.empty() && removed.empty(); }
+    bool isEmpty() const noexcept { return renamed.empty() && added.empty() && removed.empty(); }
 };
 
 } // namespace project::session

@@ -111,9 +111,21 @@ public:
     /// @return paths that begin with the path of their folder, sorted.
     std::set<Path> trackedBelow(std::vector<Path> const& folders);
 
+    /// The identities of the contents that git has of some files: of the staged content, otherwise of that in
+    /// the last commit. Equal contents have equal identities. Files without such a content are left out.
+    /// @param files absolute paths, which need not exist on disk.
+    std::map<Path, std::string> storedContents(std::vector<Path> const& files);
+
+    /// The identities that the contents of some files on disk would have when they are staged. Stores
+    /// nothing. Files that cannot be read, or whose content only git can convert, are left out.
+    /// @param files absolute paths.
+    std::map<Path, std::string> contentsOnDisk(std::vector<Path> const& files);
+
 private:
     template <typename Change>
     void stage(Change const& change);
+    template <typename Identity>
+    std::map<Path, std::string> contents(std::vector<Path> const& files, Identity const& identity);
     template <typename Condition>
     std::set<Path> select(std::vector<Path> const& files, Condition const& condition);
     Repository* repository();
