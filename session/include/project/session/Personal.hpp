@@ -58,9 +58,9 @@ public:
     /// @return these files.
     virtual std::vector<fl::filesystem::Path> removeHidden() = 0;
 
-    /// Lets hidden personal labels follow files that somebody else has moved, for example in a commit that was
-    /// merged. A move is left out if its old path is not hidden, its new path is not in the project or has
-    /// personal labels of its own, or another move leads there: its labels stay hidden.
+    /// Lets hidden personal labels follow files that somebody else has moved, for example in a commit that
+    /// was merged. A move is left out if its old path is not hidden, its new path is not in the project or
+    /// has personal labels of its own, or another move leads there: its labels stay hidden.
     /// @return the moves that were followed.
     virtual std::vector<Move> followHidden(std::vector<Move> const& moves) = 0;
 

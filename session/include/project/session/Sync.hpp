@@ -60,8 +60,8 @@ struct SyncPlan {
     ///
     /// A file that is gone and a new one are the same file if the new one has the content that git has of the
     /// old one, staged or in the last commit. Where several files have this content, those of the same name
-    /// are; an empty file is followed by its name only. What remains ambiguous is not followed, and neither is
-    /// anything outside a repository.
+    /// are; an empty file is followed by its name only. What remains ambiguous is not followed, and neither
+    /// is anything outside a repository.
     std::vector<Move> renamed = {};
 
     /// New files. The folders above them are added with them.
@@ -75,8 +75,8 @@ struct SyncPlan {
     /// the rule would remove.
     std::vector<fl::filesystem::Path> missing;
 
-    /// Folders with a rule that do not exist, and in which there is nothing that the rule would remove. Another
-    /// program may have renamed them: a rule moves with its folder only where the move is adopted.
+    /// Folders with a rule that do not exist, and in which there is nothing that the rule would remove.
+    /// Another program may have renamed them: a rule moves with its folder only where the move is adopted.
     std::vector<fl::filesystem::Path> absent;
 
     /// Folders that could not be read. What is in them stays as it is.
