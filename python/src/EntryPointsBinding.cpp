@@ -56,6 +56,7 @@ EntryValues valuesOf(OpenProject const& project, EntryPoint const& entry) {
 std::vector<EntryValues> entryPoints(OpenProject const& project) {
     auto const entries = project.run([](Session& session) { return entriesOf(session).getEntryPoints(); });
     std::vector<EntryValues> result;
+    result.reserve(entries.size());
     for (auto const& entry : entries) {
         result.push_back(valuesOf(project, *entry));
     }

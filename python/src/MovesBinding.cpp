@@ -31,6 +31,7 @@ py::list move(OpenProject const& project, py::iterable const& sources, py::handl
 
 void adopt(OpenProject const& project, std::vector<std::pair<py::object, py::object>> const& pairs) {
     std::vector<Move> moves;
+    moves.reserve(pairs.size());
     for (auto const& [from, to] : pairs) {
         moves.push_back({project.absolute(from), project.absolute(to)});
     }

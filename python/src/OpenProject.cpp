@@ -100,11 +100,11 @@ Path OpenProject::inFormOfRoot(std::u16string path) const {
     try {
         auto const folder = fl::filesystem::canonical(metadata::getParentFolder(Path(path)), Path());
         auto const name = path.substr(path.rfind(u'/') + 1);
-        auto const found = folder / Path(name);
+        auto found = folder / Path(name);
         if (isWithin(found.native(), root_.native())) {
             return found;
         }
-        auto const whole = fl::filesystem::canonical(Path(path), Path());
+        auto whole = fl::filesystem::canonical(Path(path), Path());
         return whole == root_ ? whole : Path(std::move(path));
     } catch (std::filesystem::filesystem_error const&) {
         return Path(std::move(path));

@@ -51,12 +51,14 @@ std::vector<ReferenceValues> addReferences(OpenProject const& project, bool isPa
     auto const folders = project.absolutes(targets);
     return project.run([&](Session& session) {
         std::vector<FolderReference> added;
+        added.reserve(folders.size());
         for (auto const& folder : folders) {
             added.push_back(isAbsolute ? management::absoluteFolderReference(folder)
                                        : management::relativeFolderReference(folder, session.root()));
         }
         listOf(session, isPath).addReferences(added);
         std::vector<ReferenceValues> result;
+        result.reserve(added.size());
         for (auto const& reference : added) {
             result.push_back(valuesOf(reference));
         }
@@ -74,6 +76,7 @@ void bindReferences(ProjectClass& project) {
         "remove_references",
         [](OpenProject const& open, bool isPath, std::vector<ReferenceValues> const& removed) {
             std::vector<FolderReference> references;
+            references.reserve(removed.size());
             for (auto const& values : removed) {
                 references.push_back(referenceOf(values));
             }

@@ -66,6 +66,7 @@ py::list conflicts(TextMerge const& merge) {
 
 py::bytes text(TextMerge const& merge, std::vector<int> const& choices) {
     std::vector<MergeSide> sides;
+    sides.reserve(choices.size());
     for (auto const choice : choices) {
         sides.push_back(static_cast<MergeSide>(choice));
     }
