@@ -8,7 +8,10 @@ endforeach()
 if(text MATCHES "\\)embedded\"")
   message(FATAL_ERROR "${FILES} contain the end of a raw string")
 endif()
+# Only 65,536 characters of a literal are portable. The compilers that we use have no limit.
 file(WRITE "${OUTPUT}" "#include <string_view>
+
+#pragma GCC diagnostic ignored \"-Woverlength-strings\"
 
 namespace ${NAMESPACE} {
 extern std::string_view const ${NAME};
