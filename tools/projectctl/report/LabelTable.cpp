@@ -11,6 +11,7 @@ namespace {
 template <class Map, class NameOf>
 auto byName(Map const& map, NameOf const& nameOf) {
     std::vector<typename Map::const_pointer> result;
+    result.reserve(map.size());
     for (auto const& item : map) {
         result.push_back(&item);
     }
