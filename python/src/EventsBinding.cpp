@@ -116,7 +116,7 @@ Connection connect(OpenProject const& project, bool isPersonal, std::string cons
     if (event == "metadata_changed") {
         return events.onMetadataChange(withoutArguments(slot));
     }
-    throw py::value_error("there is no event " + event);
+    throw py::value_error("unknown event: " + event);
 }
 
 } // namespace

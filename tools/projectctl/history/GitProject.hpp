@@ -42,7 +42,7 @@ public:
     /// The id of a commit. @throws Failure if there is no such commit.
     std::string commit(std::string const& revision) const;
 
-    /// The id of a commit; nothing if there is no such commit.
+    /// The id of a commit; nothing if it does not exist.
     std::optional<std::string> findCommit(std::string const& revision) const;
 
     /// The differences between the tracked files of two commits, renamed ones as one.

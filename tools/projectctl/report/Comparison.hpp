@@ -38,7 +38,7 @@ struct Comparison {
 
 /// Compares the definition with that of a revision. Files that git knows to be renamed are followed, as by
 /// `diff`.
-/// @throws Failure if there is no such revision, or if it has no definition of the project.
+/// @throws Failure if the revision does not exist, or has no definition of the project.
 Comparison compareWith(std::string const& revision, GitProject const& project, Definition const& now);
 
 } // namespace projectctl

@@ -46,6 +46,20 @@ public:
         flag(value);
     }
 
+    /// Writes a member that is an array of one object for each item.
+    /// @param writeMembers is called with each item, and writes the members of its object.
+    template <class Items, class WriteMembers>
+    void objectsMember(std::string_view name, Items const& items, WriteMembers writeMembers) {
+        key(name);
+        beginArray();
+        for (auto const& item : items) {
+            beginObject();
+            writeMembers(item);
+            endObject();
+        }
+        endArray();
+    }
+
     std::string const& bytes() const noexcept { return bytes_; }
 
 private:

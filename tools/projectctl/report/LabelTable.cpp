@@ -42,27 +42,17 @@ std::size_t LabelTable::setOf(LabelsOnFile const& labels) {
 }
 
 void LabelTable::write(JsonWriter& json) const {
-    json.key("categories");
-    json.beginArray();
-    for (auto const& category : categories_) {
-        json.beginObject();
+    json.objectsMember("categories", categories_, [&json](auto const& category) {
         json.member("uuid", category.uuid);
         json.member("name", category.name);
         json.flagMember("isDeleted", category.isDeleted);
-        json.endObject();
-    }
-    json.endArray();
-    json.key("labels");
-    json.beginArray();
-    for (auto const& label : labels_) {
-        json.beginObject();
+    });
+    json.objectsMember("labels", labels_, [&json](auto const& label) {
         json.numberMember("category", label.category);
         json.member("uuid", label.uuid);
         json.member("name", label.name);
         json.flagMember("isDeleted", label.isDeleted);
-        json.endObject();
-    }
-    json.endArray();
+    });
     json.key("labelSets");
     json.beginArray();
     for (auto const& set : sets_) {

@@ -145,57 +145,38 @@ private:
 
     void writeEntryPoints() {
         namespace entrypoints = project::metadata::schema::entrypoints;
-        json_.key("entryPoints");
-        json_.beginArray();
-        for (auto const& [uuid, entry] : data_.definition.entryPoints) {
-            json_.beginObject();
+        json_.objectsMember("entryPoints", data_.definition.entryPoints, [this](auto const& item) {
+            auto const& entry = item.second;
             json_.member("path", entry.path);
             json_.member("name", entry.name);
             json_.member("type", entry.type);
             json_.member("group", entry.groupUUID.empty() ? entrypoints::defaultGroupUUID : entry.groupUUID);
             json_.flagMember("isVisible", entry.isVisible);
-            json_.endObject();
-        }
-        json_.endArray();
+        });
         auto groups = data_.definition.groups;
         groups.try_emplace(entrypoints::defaultGroupUUID); // which need not be stored
-        json_.key("groups");
-        json_.beginArray();
-        for (auto const& [uuid, name] : groups) {
-            json_.beginObject();
-            json_.member("uuid", uuid);
-            json_.member("name", name);
-            json_.flagMember("isDefault", uuid == entrypoints::defaultGroupUUID);
-            json_.endObject();
-        }
-        json_.endArray();
+        json_.objectsMember("groups", groups, [this](auto const& group) {
+            json_.member("uuid", group.first);
+            json_.member("name", group.second);
+            json_.flagMember("isDefault", group.first == entrypoints::defaultGroupUUID);
+        });
     }
 
     void writeReferences() {
         json_.key("references");
         json_.beginObject();
-        json_.key("projects");
-        json_.beginArray();
-        for (auto const& node : data_.projects) {
+        json_.objectsMember("projects", data_.projects, [this](auto const& node) {
             auto const folder = project::metadata::getRelativePath(data_.root, node.folder);
-            json_.beginObject();
             json_.member("folder", folder.empty() ? std::u16string(u".") : folder);
             json_.member("name", node.name);
             json_.member("state", stateWord(node.state));
             json_.member("problem", node.problem);
-            json_.endObject();
-        }
-        json_.endArray();
+        });
         writeReferenceList();
-        json_.key("projectPath");
-        json_.beginArray();
-        for (auto const& [uuid, reference] : data_.definition.projectPath) {
-            json_.beginObject();
-            json_.member("text", reference.storedPath);
-            json_.member("type", reference.type);
-            json_.endObject();
-        }
-        json_.endArray();
+        json_.objectsMember("projectPath", data_.definition.projectPath, [this](auto const& item) {
+            json_.member("text", item.second.storedPath);
+            json_.member("type", item.second.type);
+        });
         json_.endObject();
     }
 
@@ -217,18 +198,13 @@ private:
     }
 
     void writeFindings() {
-        json_.key("findings");
-        json_.beginArray();
-        for (auto const& finding : data_.findings.findings) {
-            json_.beginObject();
+        json_.objectsMember("findings", data_.findings.findings, [this](auto const& finding) {
             json_.member("source", finding.source);
             json_.member("code", finding.code);
             json_.flagMember("isFault", finding.isFault);
             json_.member("text", finding.text);
             json_.member("path", finding.path);
-            json_.endObject();
-        }
-        json_.endArray();
+        });
         json_.numberMember("omittedFindings", data_.findings.omitted);
     }
 
@@ -236,16 +212,11 @@ private:
         std::map<LabelUUIDs, std::size_t> numbers;
         json_.key("history");
         json_.beginObject();
-        json_.key("labels");
-        json_.beginArray();
-        for (auto const& [uuids, name] : data_.history.labels) {
-            numbers.emplace(uuids, numbers.size());
-            json_.beginObject();
-            json_.member("category", name.category);
-            json_.member("name", name.label);
-            json_.endObject();
-        }
-        json_.endArray();
+        json_.objectsMember("labels", data_.history.labels, [&](auto const& label) {
+            numbers.emplace(label.first, numbers.size());
+            json_.member("category", label.second.category);
+            json_.member("name", label.second.label);
+        });
         json_.key("versions");
         json_.beginArray();
         for (auto const& version : data_.history.versions) {
@@ -287,24 +258,21 @@ private:
         json_.member("revision", comparison.revision);
         writeCommit(comparison.commit);
         writeBefore(comparison.entries);
-        json_.key("other");
-        json_.beginArray();
-        for (auto const& change : comparison.other) {
-            json_.beginObject();
-            json_.member("what", wordFor(change.subject));
-            json_.member("change", wordFor(change.kind));
-            json_.member("name", change.name);
-            if (change.subject != project::stores::DefinitionChange::Subject::FileData &&
-                !change.category.empty()) {
-                json_.member("category", change.category);
-            }
-            if (!change.earlier.empty()) {
-                json_.member("earlier", change.earlier);
-            }
-            json_.endObject();
-        }
-        json_.endArray();
+        json_.objectsMember("other", comparison.other, [this](auto const& change) { writeMembers(change); });
         json_.endObject();
+    }
+
+    void writeMembers(project::stores::DefinitionChange const& change) {
+        json_.member("what", wordFor(change.subject));
+        json_.member("change", wordFor(change.kind));
+        json_.member("name", change.name);
+        if (change.subject != project::stores::DefinitionChange::Subject::FileData &&
+            !change.category.empty()) {
+            json_.member("category", change.category);
+        }
+        if (!change.earlier.empty()) {
+            json_.member("earlier", change.earlier);
+        }
     }
 
     /// The earlier labels and paths of entries, by their indices.
