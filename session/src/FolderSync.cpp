@@ -3,11 +3,12 @@
 #include <algorithm>
 #include <iterator>
 #include <map>
+#include <set>
 #include <utility>
 #include <vector>
 
 #include "FileAddition.hpp"
-#include "RenamedFiles.hpp"
+#include "RenameSearch.hpp"
 #include "SyncRules.hpp"
 #include "SyncScan.hpp"
 #include "project/core/FileManager.hpp"
@@ -84,9 +85,32 @@ SyncPlan FolderSync::plan() {
     return SyncScan(store_, root_, git).run();
 }
 
-std::vector<Move> FolderSync::renamesIn(SyncPlan const& plan) const {
+RenamesFound FolderSync::findRenames(RenameOptions const& options, Path const& writer) {
     git::GitAdapter git(root_, environment_);
-    return renamedFiles(plan, git);
+    auto const guard = store_.acquireReadLock();
+    return RenameSearch(store_, root_, git, writer).run(options);
+}
+
+std::vector<Move> FolderSync::followed(RenamesFound const& renames, SyncPlan const& plan) const {
+    std::set<Path> concerned; // a rule follows with its folder
+    for (auto const& rule : readSyncRules(store_, root_)) {
+        concerned.insert(rule.folder);
+    }
+    for (auto const& file : plan.added) {
+        concerned.insert(file.path);
+    }
+    for (auto const& removed : plan.removed) {
+        concerned.insert(removed.file.path);
+    }
+    std::vector<Move> result;
+    for (auto const& rename : renames.pairs) {
+        Move move{root_ / Path(rename.from), root_ / Path(rename.to)};
+        bool const isConcerned = concerned.contains(move.from) || concerned.contains(move.to);
+        if (isConcerned && rename.evidence != Rename::Evidence::Name) {
+            result.push_back(std::move(move));
+        }
+    }
+    return result;
 }
 
 void FolderSync::apply(SyncPlan const& plan, SyncOptions const& options) {

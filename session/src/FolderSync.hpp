@@ -9,6 +9,7 @@
 #include "project/core/ProjectManager.hpp"
 #include "project/files/FileMetadataManager.hpp"
 #include "project/git/GitEnvironment.hpp"
+#include "project/session/Renames.hpp"
 #include "project/session/Sync.hpp"
 #include "project/stores/TreeMetadataManager.hpp"
 
@@ -32,8 +33,12 @@ public:
     /// As Session::planSync.
     SyncPlan plan();
 
-    /// The files of a plan that were renamed, as SyncPlan::renamed describes.
-    std::vector<Move> renamesIn(SyncPlan const& plan) const;
+    /// As Session::findRenames.
+    /// @param writer as RenameSearch needs it.
+    RenamesFound findRenames(RenameOptions const& options, Path const& writer);
+
+    /// Those of some renames that a synchronisation follows, as SyncPlan::renamed describes.
+    std::vector<Move> followed(RenamesFound const& renames, SyncPlan const& plan) const;
 
     /// Makes the changes of a plan. Call it in the transaction in which the plan was made.
     void apply(SyncPlan const& plan, SyncOptions const& options);

@@ -10,6 +10,7 @@
 #include "SyncRules.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
+#include "project/stores/TextBackend.hpp"
 
 namespace project::session {
 
@@ -103,6 +104,11 @@ bool Session::removeSyncRule(Path const& folder) {
     return state_->sync.remove(folder);
 }
 
+RenamesFound Session::findRenames(RenameOptions const& options) {
+    auto const text = state_->storeFolder / stores::TextBackend::textName;
+    return state_->sync.findRenames(options, isShared() ? state_->root : text);
+}
+
 SyncPlan Session::planSync() {
     return state_->sync.plan();
 }
@@ -114,7 +120,9 @@ SyncPlan Session::sync(SyncOptions const& options) {
     }
     auto step = transaction();
     auto plan = planSync(); // the project may have changed before the transaction began
-    if (auto renamed = options.followsRenames ? state_->sync.renamesIn(plan) : std::vector<Move>();
+    bool const seeksRenames = options.followsRenames && !plan.isEmpty();
+    if (auto renamed = seeksRenames ? state_->sync.followed(findRenames({options.similarity}), plan)
+                                    : std::vector<Move>();
         !renamed.empty()) {
         adopt(renamed);
         plan = planSync();

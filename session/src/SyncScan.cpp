@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "FileAttachments.hpp"
+#include "NewFiles.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/session/DiskFolder.hpp"
 
@@ -101,18 +102,14 @@ Path SyncScan::absolute(std::u16string const& path) const {
 }
 
 void SyncScan::enterNew(std::vector<FoundFile> found) {
-    while (!found.empty()) {
-        std::erase_if(found, [this](FoundFile const& file) { return !isWanted(file); });
-        std::vector<FoundFile> below;
-        for (auto& file : notIgnored(found)) {
-            if (file.kind == FileKind::Folder) {
-                readNew(file.path, below);
-            } else {
-                plan_.added.push_back(std::move(file));
-            }
-        }
-        found = std::move(below);
-    }
+    auto added = filesOf(
+        std::move(found),
+        [this](std::vector<FoundFile> level) {
+            std::erase_if(level, [this](FoundFile const& file) { return !isWanted(file); });
+            return notIgnored(level);
+        },
+        plan_.unreadable);
+    std::ranges::move(added, std::back_inserter(plan_.added));
 }
 
 /// Whether the patterns let a new file be added, or a new folder be entered.
@@ -145,16 +142,6 @@ std::vector<FoundFile> SyncScan::notIgnored(std::vector<FoundFile> const& found)
     std::ranges::copy_if(found, std::back_inserter(result),
                          [&ignored](FoundFile const& file) { return !ignored.contains(file.path); });
     return result;
-}
-
-void SyncScan::readNew(Path const& folder, std::vector<FoundFile>& found) {
-    try {
-        for (auto const& entry : readDiskFolder(folder)) {
-            found.push_back({folder / Path(entry.name), entry.kind});
-        }
-    } catch (std::system_error const& error) {
-        plan_.unreadable.push_back({folder, error.code()});
-    }
 }
 
 /// Of the files that are gone, those that a sparse checkout left out stay, and so do folders in which git

@@ -15,8 +15,7 @@ namespace project::session {
 
 /// Compares the folders that have rules with the disk. The caller holds a guard of the store.
 ///
-/// git is asked only about files that are new. Folders that are not in the project are entered level by
-/// level, so that git is asked once for each level, and nothing that it ignores is read.
+/// git is asked only about files that are new.
 class SyncScan {
 public:
     /// @param store, root, git borrowed.
@@ -31,7 +30,6 @@ private:
     std::vector<FoundFile> notIgnored(std::vector<FoundFile> const& found);
     bool isWanted(FoundFile const& file) const;
     bool usesGit(FoundFile const& file) const;
-    void readNew(Path const& folder, std::vector<FoundFile>& found);
     void remove(std::vector<FoundFile> const& gone);
     void findMissing();
     void findAbsent();

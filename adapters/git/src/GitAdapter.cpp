@@ -9,6 +9,8 @@
 #include "repository/RepositoryFinder.hpp"
 #include "repository/TrackedFiles.hpp"
 #include "states/ContentIds.hpp"
+#include "states/EarlierContents.hpp"
+#include "states/SimilarContents.hpp"
 #include "states/StateQuery.hpp"
 
 namespace project::git {
@@ -140,15 +142,20 @@ std::set<fl::filesystem::Path> GitAdapter::trackedBelow(std::vector<Path> const&
     return result;
 }
 
-template <typename Identity>
-std::map<fl::filesystem::Path, std::string> GitAdapter::contents(std::vector<Path> const& files,
-                                                                 Identity const& identity) {
+std::map<fl::filesystem::Path, std::string> GitAdapter::earlierContents(std::vector<Path> const& files,
+                                                                        Path const& writer) {
+    auto* const found = files.empty() ? nullptr : repository();
+    auto const path = found == nullptr ? std::nullopt : found->workTree().relativeInProject(writer);
+    return path ? git::earlierContents(*found, files, *path) : std::map<Path, std::string>();
+}
+
+std::map<fl::filesystem::Path, std::string> GitAdapter::contentsOnDisk(std::vector<Path> const& files) {
     std::map<Path, std::string> result;
     auto* const found = files.empty() ? nullptr : repository();
     if (found != nullptr) {
         ContentIds ids(*found);
         for (auto const& file : files) {
-            if (auto id = identity(ids, file)) {
+            if (auto id = ids.onDisk(file)) {
                 result.emplace(file, *std::move(id));
             }
         }
@@ -156,12 +163,24 @@ std::map<fl::filesystem::Path, std::string> GitAdapter::contents(std::vector<Pat
     return result;
 }
 
-std::map<fl::filesystem::Path, std::string> GitAdapter::storedContents(std::vector<Path> const& files) {
-    return contents(files, [](ContentIds& ids, Path const& file) { return ids.stored(file); });
-}
-
-std::map<fl::filesystem::Path, std::string> GitAdapter::contentsOnDisk(std::vector<Path> const& files) {
-    return contents(files, [](ContentIds& ids, Path const& file) { return ids.onDisk(file); });
+std::vector<SimilarContent> GitAdapter::similarContents(std::vector<std::string> const& before,
+                                                        std::vector<Path> const& onDisk, int similarity) {
+    std::vector<SimilarContent> result;
+    auto* const found = before.empty() || onDisk.empty() ? nullptr : repository();
+    if (found == nullptr) {
+        return result;
+    }
+    ContentIds contents(*found);
+    SimilarContents similar;
+    for (auto const& id : before) {
+        similar.addBefore(contents.readStored(id).value_or(std::string()));
+    }
+    for (std::size_t position = 0; position < onDisk.size(); ++position) {
+        if (auto const content = contents.readOnDisk(onDisk[position])) {
+            similar.compare(position, *content, similarity, result);
+        }
+    }
+    return result;
 }
 
 GitAdapter::Batch::Batch(GitAdapter& adapter) : adapter_(adapter) {

@@ -11,6 +11,7 @@
 #include "project/session/Move.hpp"
 #include "project/session/Personal.hpp"
 #include "project/session/Query.hpp"
+#include "project/session/Renames.hpp"
 #include "project/session/Sync.hpp"
 #include "project/session/Transaction.hpp"
 #include "project/stores/HistoryLoss.hpp"
@@ -157,6 +158,20 @@ public:
     /// @throws MoveError, for instance if a new path is in the project already and no move leaves it; or
     ///         stores::StoreError or git::GitError. Nothing has changed then.
     void adopt(std::vector<Move> const& moves);
+
+    /// Pairs the files of the project that are missing on disk with files that are not in the project, so
+    /// that adopt can let the project follow them.
+    ///
+    /// In a repository, the contents decide: those of the last commit that wrote the project's text, so that
+    /// renames that were committed since are found; otherwise the staged ones, otherwise those of the last
+    /// commit that contained the file. Equal contents are paired first, then similar ones, as git measures
+    /// them. Files that git ignores are left out, and so are those that a sparse checkout left out. A file
+    /// without any earlier content is paired by its name, as are all files outside a repository: such a pair
+    /// is a guess. Contents that only a filter driver of git can convert are not compared. Changes nothing.
+    ///
+    /// Takes the read lock while it reads the disk and the repository.
+    /// @throws git::GitError if the repository cannot be read.
+    RenamesFound findRenames(RenameOptions const& options = {});
 
     /// The end of a move that another process, or an earlier session, did not finish: the last change has
     /// completed it or rolled it back. Each is returned once.

@@ -239,8 +239,9 @@ TEST_F(Staging, contentsAreEqualIfGitWouldStageThemAlike) {
     repository.run({"config", "filter.lfs.clean", "cat"});
     repository.write("new.lfs", "one\n");
     folder.addLink("work/link", "one\n");
-    auto const stored = adapter.storedContents(
-        repository.paths({"staged", "committed", "lines.txt", "new one", "nowhere", "d"}));
+    auto const stored = adapter.earlierContents(
+        repository.paths({"staged", "committed", "lines.txt", "new one", "nowhere", "d"}),
+        repository.path("nowhere"));
     auto const onDisk = adapter.contentsOnDisk(
         repository.paths({"new one", "new two", "new.txt", "new.lfs", "link", "nowhere", "."}));
 

@@ -19,13 +19,12 @@ void addFile(JsonRows& rows, FoundFile const& file, OpenProject& project) {
 
 } // namespace
 
-void writeAsJson(std::vector<project::session::Move> const& renamed, SyncPlan const& plan, bool isApplied,
-                 OpenProject& project) {
+void writeAsJson(SyncPlan const& plan, bool isApplied, OpenProject& project) {
     JsonDocument document(json::sync);
     document.addFlag("applied", isApplied);
     document.addKey("renamed");
     JsonRows moves;
-    for (auto const& move : renamed) {
+    for (auto const& move : plan.renamed) {
         moves.begin();
         moves.addText("from", project::metadata::getRelativePath(project.root(), move.from));
         moves.addText("to", project::metadata::getRelativePath(project.root(), move.to));

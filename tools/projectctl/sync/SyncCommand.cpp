@@ -1,21 +1,25 @@
 #include <optional>
 #include <set>
 #include <string>
+#include <variant>
 #include <vector>
 
 #include "changes/DryRun.hpp"
 #include "cli/CodedFailure.hpp"
 #include "cli/Completes.hpp"
 #include "cli/PathArguments.hpp"
+#include "cli/Settings.hpp"
 #include "cli/ShownPaths.hpp"
 #include "cli/TextArguments.hpp"
 #include "files/DiskFolder.hpp"
+#include "files/MoveFailure.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "output/Progress.hpp"
 #include "project/ProjectCommand.hpp"
+#include "project/metadata/Messages.hpp"
+#include "project/metadata/ProjectException.hpp"
 #include "sync/Commands.hpp"
-#include "sync/Followed.hpp"
 #include "sync/Losses.hpp"
 #include "sync/PlanJson.hpp"
 #include "sync/RuleForms.hpp"
@@ -26,8 +30,7 @@ namespace {
 
 using project::session::SyncPlan;
 using project::session::SyncRule;
-
-using Moves = std::vector<project::session::Move>;
+using ZEPHRA::project::management::SyncFolderMissing;
 
 /// Brings the folders that have rules up to date, and sets, removes and lists these rules.
 class SyncCommand : public ProjectCommand {
@@ -90,30 +93,39 @@ private:
         warnOfUnreadable(seen);
         if (seen.isEmpty()) {
             warnOfAbsent(seen, project);
-            report({}, seen, project);
+            report(seen, project);
             output().say(Message("SyncNothing"));
             return;
         }
         ProjectTransaction transaction(project);
-        auto const renamed = followRenames(project, seen);
-        requireFolders(project, project.session().planSync());
-        auto const plan =
-            project.session().sync({.removesMissingFolders = isForced_, .followsRenames = false});
+        auto const plan = apply(project);
         warnOfAbsent(plan, project);
-        note(renamed, plan, project);
-        report(renamed, plan, project);
+        note(plan, project);
+        report(plan, project);
         if (dryRun_.isOn() && dryRun_.isJson()) {
             return; // the document contains the changes
         }
         if (dryRun_.end(transaction, project)) {
-            output().say(Message("SyncDone", plan.added.size(), plan.removed.size(), renamed.size()));
+            output().say(Message("SyncDone", plan.added.size(), plan.removed.size(), plan.renamed.size()));
+        }
+    }
+
+    SyncPlan apply(OpenProject& project) const {
+        try {
+            return project.session().sync(
+                {.removesMissingFolders = isForced_, .followsRenames = settings().sourceControl});
+        } catch (project::session::MoveError const& error) {
+            throw failureOf(error);
+        } catch (project::exception::Raised<SyncFolderMissing> const& error) {
+            auto const& folder = std::get<std::u16string>(error.GetBaseMsgIDObj().getArguments().front());
+            throw Failure(Message("SyncFolderMissing", ShownPaths(project.root()).ofAbsolute(Path(folder))));
         }
     }
 
     /// Notes what is staged at the end of the command, and how many files have changed.
-    static void note(Moves const& renamed, SyncPlan const& plan, OpenProject& project) {
+    static void note(SyncPlan const& plan, OpenProject& project) {
         std::vector<Path> files;
-        for (auto const& move : renamed) {
+        for (auto const& move : plan.renamed) {
             files.push_back(move.to);
         }
         for (auto const& file : plan.added) {
@@ -123,18 +135,11 @@ private:
         project.changedFiles().listed += files.size() + plan.removed.size();
     }
 
-    void report(Moves const& renamed, SyncPlan const& plan, OpenProject& project) const {
+    void report(SyncPlan const& plan, OpenProject& project) const {
         if (dryRun_.isJson()) {
-            writeAsJson(renamed, plan, !dryRun_.isOn(), project);
+            writeAsJson(plan, !dryRun_.isOn(), project);
         } else {
             Losses(project, plan).warn();
-        }
-    }
-
-    void requireFolders(OpenProject& project, SyncPlan const& plan) const {
-        if (!plan.missing.empty() && !isForced_) {
-            auto shown = ShownPaths(project.root());
-            throw Failure(Message("SyncFolderMissing", shown.ofAbsolute(plan.missing.front())));
         }
     }
 

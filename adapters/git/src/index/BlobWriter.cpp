@@ -2,11 +2,13 @@
 
 #include <cerrno>
 #include <system_error>
+#include <utility>
 
 #include <git2/sys/odb_backend.h>
 
 #include "project/git/GitError.hpp"
 #include "repository/FileContent.hpp"
+#include "states/ConvertedContent.hpp"
 
 namespace project::git {
 
@@ -14,8 +16,6 @@ namespace {
 
 constexpr auto action = "the file cannot be staged";
 constexpr off_t tooLargeForMemory = off_t{64} << 20;
-
-using FilterHandle = std::unique_ptr<git_filter_list, FreedBy<&LibGitFunctions::git_filter_list_free>>;
 
 } // namespace
 
@@ -55,19 +55,11 @@ bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isC
 }
 
 std::string BlobWriter::convert(TreePath const& path, std::string const& content) const {
-    std::string const name = repository_.workTree().onDisk(path);
-    git_filter_list* filters = nullptr;
-    require(libgit().git_filter_list_load(&filters, repository_.get(), nullptr, path.c_str(),
-                                          GIT_FILTER_TO_ODB, GIT_FILTER_DEFAULT),
-            name, action);
-    FilterHandle const owned(filters);
-    git_buf converted = GIT_BUF_INIT;
-    auto const code =
-        libgit().git_filter_list_apply_to_buffer(&converted, filters, content.data(), content.size());
-    std::string result(converted.ptr == nullptr ? "" : converted.ptr, converted.size);
-    libgit().git_buf_dispose(&converted);
-    require(code, name, action);
-    return result;
+    auto result = convertedContent(repository_, path, content);
+    if (!result) {
+        throwLibGitError(repository_.workTree().onDisk(path), action);
+    }
+    return *std::move(result);
 }
 
 void BlobWriter::store(TreePath const& path, std::string const& content, git_oid& id) const {

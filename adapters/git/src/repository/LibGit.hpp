@@ -27,6 +27,7 @@ struct FreedBy {
 };
 
 using RepositoryHandle = std::unique_ptr<git_repository, FreedBy<&LibGitFunctions::git_repository_free>>;
+using CommitHandle = std::unique_ptr<git_commit, FreedBy<&LibGitFunctions::git_commit_free>>;
 using IndexHandle = std::unique_ptr<git_index, FreedBy<&LibGitFunctions::git_index_free>>;
 using ConfigHandle = std::unique_ptr<git_config, FreedBy<&LibGitFunctions::git_config_free>>;
 using ReferenceHandle = std::unique_ptr<git_reference, FreedBy<&LibGitFunctions::git_reference_free>>;
@@ -34,6 +35,12 @@ using ObjectHandle = std::unique_ptr<git_object, FreedBy<&LibGitFunctions::git_o
 using OdbHandle = std::unique_ptr<git_odb, FreedBy<&LibGitFunctions::git_odb_free>>;
 using BlobHandle = std::unique_ptr<git_blob, FreedBy<&LibGitFunctions::git_blob_free>>;
 using TreeHandle = std::unique_ptr<git_tree, FreedBy<&LibGitFunctions::git_tree_free>>;
+using TreeEntryHandle = std::unique_ptr<git_tree_entry, FreedBy<&LibGitFunctions::git_tree_entry_free>>;
+
+/// The bytes of an id.
+inline std::string bytesOf(git_oid const& id) {
+    return {reinterpret_cast<char const*>(id.id), sizeof id.id};
+}
 
 /// Throws a GitError with the message of libgit2's last error.
 /// @param file the file or folder concerned.

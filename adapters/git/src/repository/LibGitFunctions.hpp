@@ -42,6 +42,10 @@ public:
     decltype(&::git_blob_rawcontent) const git_blob_rawcontent = symbol("git_blob_rawcontent");
     decltype(&::git_blob_rawsize) const git_blob_rawsize = symbol("git_blob_rawsize");
     decltype(&::git_buf_dispose) const git_buf_dispose = symbol("git_buf_dispose");
+    decltype(&::git_commit_free) const git_commit_free = symbol("git_commit_free");
+    decltype(&::git_commit_parent) const git_commit_parent = symbol("git_commit_parent");
+    decltype(&::git_commit_parentcount) const git_commit_parentcount = symbol("git_commit_parentcount");
+    decltype(&::git_commit_tree) const git_commit_tree = symbol("git_commit_tree");
     decltype(&::git_config_add_file_ondisk) const git_config_add_file_ondisk =
         symbol("git_config_add_file_ondisk");
     decltype(&::git_config_entry_free) const git_config_entry_free = symbol("git_config_entry_free");
@@ -90,7 +94,9 @@ public:
         symbol("git_repository_set_workdir");
     decltype(&::git_repository_workdir) const git_repository_workdir = symbol("git_repository_workdir");
     decltype(&::git_tree_entry_byname) const git_tree_entry_byname = symbol("git_tree_entry_byname");
+    decltype(&::git_tree_entry_bypath) const git_tree_entry_bypath = symbol("git_tree_entry_bypath");
     decltype(&::git_tree_entry_filemode) const git_tree_entry_filemode = symbol("git_tree_entry_filemode");
+    decltype(&::git_tree_entry_free) const git_tree_entry_free = symbol("git_tree_entry_free");
     decltype(&::git_tree_entry_id) const git_tree_entry_id = symbol("git_tree_entry_id");
     decltype(&::git_tree_entry_type) const git_tree_entry_type = symbol("git_tree_entry_type");
     decltype(&::git_tree_free) const git_tree_free = symbol("git_tree_free");

@@ -2,15 +2,11 @@
 
 #include "repository/FileContent.hpp"
 #include "repository/LibGit.hpp"
-#include "repository/TrackedFiles.hpp"
+#include "states/ConvertedContent.hpp"
 
 namespace project::git {
 
 namespace {
-
-std::string textOf(git_oid const& id) {
-    return {reinterpret_cast<char const*>(id.id), sizeof id.id};
-}
 
 bool hashLink(git_oid& result, std::string const& name) {
     auto const target = readLink(name);
@@ -30,20 +26,6 @@ bool hashOnDisk(git_oid& id, Repository const& repository, ContentRules& rules, 
                                             path.c_str()) == 0;
 }
 
-std::optional<std::string> ContentIds::stored(fl::filesystem::Path const& file) {
-    auto const path = repository_.workTree().relativeInProject(file);
-    if (!path || path->empty()) {
-        return std::nullopt;
-    }
-    if (auto const entry = trackedAt(repository_.index(), *path)) {
-        bool const isContent = !isSubmodule(*entry) && libgit().git_index_entry_is_conflict(&*entry) == 0;
-        return isContent ? std::optional(textOf(entry->id)) : std::nullopt;
-    }
-    auto const* const committed = repository_.head().find(*path);
-    bool const isContent = committed != nullptr && libgit().git_tree_entry_type(committed) == GIT_OBJECT_BLOB;
-    return isContent ? std::optional(textOf(*libgit().git_tree_entry_id(committed))) : std::nullopt;
-}
-
 std::optional<std::string> ContentIds::onDisk(fl::filesystem::Path const& file) {
     auto const path = repository_.workTree().relativeInProject(file);
     if (!path || path->empty()) {
@@ -56,7 +38,34 @@ std::optional<std::string> ContentIds::onDisk(fl::filesystem::Path const& file) 
     git_oid id{};
     bool const isRead =
         ::lstat(name.c_str(), &found) == 0 && hashOnDisk(id, repository_, rules_, *path, found);
-    return isRead ? std::optional(textOf(id)) : std::nullopt;
+    return isRead ? std::optional(bytesOf(id)) : std::nullopt;
+}
+
+std::optional<std::string> ContentIds::readStored(std::string const& id) const {
+    git_oid key{};
+    libgit().git_oid_fromraw(&key, reinterpret_cast<unsigned char const*>(id.data()));
+    git_blob* found = nullptr;
+    if (libgit().git_blob_lookup(&found, repository_.get(), &key) != 0) {
+        return std::nullopt;
+    }
+    BlobHandle const blob(found);
+    return std::string(static_cast<char const*>(libgit().git_blob_rawcontent(found)),
+                       static_cast<std::size_t>(libgit().git_blob_rawsize(found)));
+}
+
+std::optional<std::string> ContentIds::readOnDisk(fl::filesystem::Path const& file) {
+    auto const path = repository_.workTree().relativeInProject(file);
+    if (!path || path->empty() || !rules_.conversionOf(*path).foreign.empty()) {
+        return std::nullopt;
+    }
+    std::string const name = repository_.workTree().onDisk(*path);
+
+    struct stat found {};
+
+    bool const isFile = ::lstat(name.c_str(), &found) == 0 && S_ISREG(found.st_mode);
+    auto const content =
+        isFile ? readFile(name, Links::NotFollowed, static_cast<std::size_t>(found.st_size)) : std::nullopt;
+    return content ? convertedContent(repository_, *path, *content) : std::nullopt;
 }
 
 } // namespace project::git

@@ -16,19 +16,22 @@ namespace project::git {
 bool hashOnDisk(git_oid& id, Repository const& repository, ContentRules& rules, TreePath const& path,
                 struct stat const& found);
 
-/// The identities by which git knows the contents of files: equal contents have equal identities.
+/// The contents of files, and the identities by which git knows them: equal contents have equal identities.
 class ContentIds {
 public:
     /// @param repository borrowed.
     explicit ContentIds(Repository& repository) : repository_(repository), rules_(repository) {}
 
-    /// Of the staged content of a file or link, otherwise of that in the last commit; nothing if there is
-    /// none.
-    std::optional<std::string> stored(fl::filesystem::Path const& file);
-
     /// Of a file or link on disk, as it would be staged; nothing if it cannot be read, or if only git can
     /// convert its content.
     std::optional<std::string> onDisk(fl::filesystem::Path const& file);
+
+    /// The content that an identity is of; nothing if the repository does not have it.
+    std::optional<std::string> readStored(std::string const& id) const;
+
+    /// The content of a file on disk, as it would be staged; nothing if onDisk returns nothing for it, or if
+    /// it is a link.
+    std::optional<std::string> readOnDisk(fl::filesystem::Path const& file);
 
 private:
     Repository& repository_;

@@ -9,6 +9,7 @@
 #include "project/session/DiskFolder.hpp"
 #include "project/session/Move.hpp"
 #include "project/session/Query.hpp"
+#include "project/session/Renames.hpp"
 
 namespace project::session {
 
@@ -42,6 +43,9 @@ struct SyncOptions {
 
     /// Whether files that were renamed keep their labels and entry points: see SyncPlan::renamed.
     bool followsRenames = true;
+
+    /// From which contents are similar enough for a rename, in percent, from 1 to 100.
+    int similarity = usualSimilarity;
 };
 
 /// A file or folder that a synchronisation removes from the project, with what is lost by it.
@@ -58,10 +62,9 @@ struct SyncPlan {
     /// Files that the project has followed to their new paths. Session::planSync leaves them among those that
     /// are removed and added.
     ///
-    /// A file that is gone and a new one are the same file if the new one has the content that git has of the
-    /// old one, staged or in the last commit. Where several files have this content, those of the same name
-    /// are; an empty file is followed by its name only. What remains ambiguous is not followed, and neither
-    /// is anything outside a repository.
+    /// They are the pairs of Session::findRenames of which the old or the new path would be removed or added,
+    /// or is the folder of a rule. Guesses by the name alone and ambiguous renames are not followed, so
+    /// nothing is outside a repository.
     std::vector<Move> renamed = {};
 
     /// New files. The folders above them are added with them.

@@ -10,6 +10,7 @@
 #include "project/git/Export.hpp"
 #include "project/git/FileMove.hpp"
 #include "project/git/GitEnvironment.hpp"
+#include "project/git/SimilarContent.hpp"
 
 namespace project::git {
 
@@ -111,21 +112,29 @@ public:
     /// @return paths that begin with the path of their folder, sorted.
     std::set<Path> trackedBelow(std::vector<Path> const& folders);
 
-    /// The identities of the contents that git has of some files: of the staged content, otherwise of that in
-    /// the last commit. Equal contents have equal identities. Files without such a content are left out.
+    /// The identities of the contents that files had earlier: in the last commit that changed a file that
+    /// lists them; otherwise the staged content, that of the last commit, or that before the last commit that
+    /// deleted the file. Equal contents have equal identities. Files without such a content are left out.
     /// @param files absolute paths, which need not exist on disk.
-    std::map<Path, std::string> storedContents(std::vector<Path> const& files);
+    /// @param writer the file that lists them, or a folder above all such files.
+    std::map<Path, std::string> earlierContents(std::vector<Path> const& files, Path const& writer);
 
     /// The identities that the contents of some files on disk would have when they are staged. Stores
     /// nothing. Files that cannot be read, or whose content only git can convert, are left out.
     /// @param files absolute paths.
     std::map<Path, std::string> contentsOnDisk(std::vector<Path> const& files);
 
+    /// The similarities of earlier contents with files on disk, as git measures them. Contents that the
+    /// repository does not have, links and files that contentsOnDisk leaves out are similar to nothing.
+    /// @param before identities.
+    /// @param onDisk absolute paths.
+    /// @param similarity the least one, in percent.
+    std::vector<SimilarContent> similarContents(std::vector<std::string> const& before,
+                                                std::vector<Path> const& onDisk, int similarity);
+
 private:
     template <typename Change>
     void stage(Change const& change);
-    template <typename Identity>
-    std::map<Path, std::string> contents(std::vector<Path> const& files, Identity const& identity);
     template <typename Condition>
     std::set<Path> select(std::vector<Path> const& files, Condition const& condition);
     Repository* repository();

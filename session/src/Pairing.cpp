@@ -1,15 +1,20 @@
-#include "renames/Pairing.hpp"
+#include "Pairing.hpp"
 
 #include <algorithm>
+#include <compare>
 #include <cstddef>
+#include <functional>
 #include <iterator>
 #include <map>
+#include <optional>
+#include <set>
 #include <string_view>
+#include <tuple>
 #include <utility>
 
 #include "fl/filesystem/Path.hpp"
 
-namespace projectctl {
+namespace project::session {
 
 namespace {
 
@@ -72,7 +77,7 @@ public:
 
 private:
     void pair(FileContentId const& from, FileContentId const& to) {
-        result_.renames.pairs.push_back({from.path, to.path, Kind::File, Rename::Evidence::Content, 100});
+        result_.renames.pairs.push_back({from.path, to.path, FileKind::File, Rename::Evidence::Content, 100});
     }
 
     void pairNearest(Group& group) {
@@ -122,6 +127,108 @@ private:
     PairedFiles result_;
 };
 
+/// The number of files of each name.
+std::map<std::u16string_view, std::size_t> countNames(std::vector<FileContentId> const& files) {
+    std::map<std::u16string_view, std::size_t> result;
+    for (auto const& file : files) {
+        ++result[nameOf(file.path)];
+    }
+    return result;
+}
+
+class SimilarityPairing {
+public:
+    using Similar = git::SimilarContent;
+
+    SimilarityPairing(std::vector<FileContentId> const& gone, std::vector<FileContentId> const& added)
+        : gone_(gone),
+          added_(added),
+          goneNames_(countNames(gone)),
+          addedNames_(countNames(added)),
+          ofGone_(gone.size()),
+          ofAdded_(added.size()) {}
+
+    RenamesFound run(std::vector<Similar> similar, int similarity) {
+        auto const rank = [this, similarity](Similar const& each) {
+            return std::tuple(isCertainByName(each, similarity), each.hundredths, hasSameName(each));
+        };
+        std::ranges::stable_sort(similar, std::greater<>(), rank);
+        for (auto const& each : similar) {
+            if (!ofGone_[each.before] && !ofAdded_[each.after]) {
+                ofGone_[each.before] = each;
+                ofAdded_[each.after] = each;
+            }
+        }
+        for (auto const& each : similar) {
+            noteRival(each);
+        }
+        return result();
+    }
+
+private:
+    /// The files that are left over, and as similar to one of a pair as the other one of it.
+    struct Rivals {
+        std::set<std::u16string> gone;
+        std::set<std::u16string> added;
+    };
+
+    bool hasSameName(Similar const& each) const {
+        return nameOf(gone_[each.before].path) == nameOf(added_[each.after].path);
+    }
+
+    /// Whether the name, which no other file has, is half of what the contents lack in similarity.
+    bool isCertainByName(Similar const& each, int similarity) const {
+        auto const name = nameOf(gone_[each.before].path);
+        return hasSameName(each) && each.hundredths >= (similarity + 100) * 50 && goneNames_.at(name) == 1 &&
+               addedNames_.at(name) == 1;
+    }
+
+    void noteRival(Similar const& each) {
+        auto const& ofGone = ofGone_[each.before];
+        auto const& ofAdded = ofAdded_[each.after];
+        if (ofGone.has_value() == ofAdded.has_value()) {
+            return;
+        }
+        auto const& pair = ofGone ? *ofGone : *ofAdded;
+        bool const isRival = each.hundredths / 100 >= pair.hundredths / 100;
+        if (isRival && ofGone) {
+            rivals_[pair.before].added.insert(added_[each.after].path);
+        } else if (isRival) {
+            rivals_[pair.before].gone.insert(gone_[each.before].path);
+        }
+    }
+
+    RenamesFound result() {
+        RenamesFound result;
+        for (auto const& pair : ofGone_) {
+            if (!pair) {
+                continue;
+            }
+            auto const& from = gone_[pair->before].path;
+            auto const& to = added_[pair->after].path;
+            if (auto const found = rivals_.find(pair->before); found != rivals_.end()) {
+                auto& [gone, added] = found->second;
+                gone.insert(from);
+                added.insert(to);
+                result.ambiguous.push_back({{gone.begin(), gone.end()}, {added.begin(), added.end()}});
+            } else {
+                result.pairs.push_back(
+                    {from, to, FileKind::File, Rename::Evidence::Similarity, pair->hundredths / 100});
+            }
+        }
+        sortByPath(result.pairs);
+        return result;
+    }
+
+    std::vector<FileContentId> const& gone_;
+    std::vector<FileContentId> const& added_;
+    std::map<std::u16string_view, std::size_t> goneNames_;
+    std::map<std::u16string_view, std::size_t> addedNames_;
+    std::vector<std::optional<Similar>> ofGone_; ///< the pair of each file
+    std::vector<std::optional<Similar>> ofAdded_;
+    std::map<std::size_t, Rivals> rivals_; ///< of pairs, by the file that is gone
+};
+
 } // namespace
 
 PairedFiles pairByContent(std::vector<FileContentId> gone, std::vector<FileContentId> added) {
@@ -141,7 +248,12 @@ PairedFiles pairByContent(std::vector<FileContentId> gone, std::vector<FileConte
     return pairing.finish();
 }
 
-Renames pairByName(std::vector<std::u16string> const& gone, std::vector<std::u16string> const& added) {
+RenamesFound pairBySimilarity(std::vector<FileContentId> const& gone, std::vector<FileContentId> const& added,
+                              std::vector<git::SimilarContent> similar, int similarity) {
+    return SimilarityPairing(gone, added).run(std::move(similar), similarity);
+}
+
+RenamesFound pairByName(std::vector<std::u16string> const& gone, std::vector<std::u16string> const& added) {
     std::map<std::u16string_view, AmbiguousRename> byName;
     for (auto const& path : gone) {
         byName[nameOf(path)].from.push_back(path);
@@ -149,10 +261,10 @@ Renames pairByName(std::vector<std::u16string> const& gone, std::vector<std::u16
     for (auto const& path : added) {
         byName[nameOf(path)].to.push_back(path);
     }
-    Renames result;
+    RenamesFound result;
     for (auto& [name, paths] : byName) {
         if (paths.from.size() == 1 && paths.to.size() == 1) {
-            result.pairs.push_back({paths.from[0], paths.to[0], Kind::File, Rename::Evidence::Name, 0});
+            result.pairs.push_back({paths.from[0], paths.to[0], FileKind::File, Rename::Evidence::Name, 0});
         } else if (!paths.from.empty() && !paths.to.empty()) {
             std::ranges::sort(paths.from);
             std::ranges::sort(paths.to);
@@ -190,4 +302,4 @@ std::u16string newFolderOf(std::u16string const& folder, std::vector<Rename> con
     return result;
 }
 
-} // namespace projectctl
+} // namespace project::session

@@ -1,9 +1,9 @@
-#include "renames/Pairing.hpp"
+#include "Pairing.hpp"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-namespace projectctl {
+namespace project::session {
 namespace {
 
 using ::testing::ElementsAre;
@@ -11,7 +11,7 @@ using ::testing::IsEmpty;
 using Evidence = Rename::Evidence;
 
 Rename same(std::u16string const& from, std::u16string const& to) {
-    return {from, to, Kind::File, Evidence::Content, 100};
+    return {from, to, FileKind::File, Evidence::Content, 100};
 }
 
 TEST(PairingByContent, pairsFilesWithEqualContents) {
@@ -63,18 +63,18 @@ TEST(PairingByContent, pairsEmptyFilesOfOneNameOnly) {
 TEST(PairingByName, guessesWhereANameIsUnique) {
     auto const found = pairByName({u"a/f", u"a/g", u"b/g"}, {u"c/g", u"c/f", u"c/h"});
 
-    EXPECT_THAT(found.pairs, ElementsAre(Rename{u"a/f", u"c/f", Kind::File, Evidence::Name, 0}));
+    EXPECT_THAT(found.pairs, ElementsAre(Rename{u"a/f", u"c/f", FileKind::File, Evidence::Name, 0}));
     EXPECT_THAT(found.ambiguous, ElementsAre(AmbiguousRename{{u"a/g", u"b/g"}, {u"c/g"}}));
 }
 
 class PairingOfFolders : public ::testing::Test {
 protected:
     std::vector<std::u16string> foldersAfter(std::vector<Rename> pairs, std::u16string const& listed = {}) {
-        Renames renames{std::move(pairs), {}};
+        RenamesFound renames{std::move(pairs), {}};
         pairFolders(renames, {u"src", u"src/io"}, [&](std::u16string const& path) { return path == listed; });
         std::vector<std::u16string> result;
         for (auto const& pair : renames.pairs) {
-            if (pair.kind == Kind::Folder) {
+            if (pair.kind == FileKind::Folder) {
                 result.push_back(pair.from + u" " + pair.to);
             }
         }
@@ -97,4 +97,4 @@ TEST_F(PairingOfFolders, leavesAFolderThatWouldTakeThePlaceOfAnother) {
 }
 
 } // namespace
-} // namespace projectctl
+} // namespace project::session

@@ -1,0 +1,16 @@
+#pragma once
+
+#include <cstddef>
+
+namespace project::git {
+
+/// Two contents that are similar: the positions of an earlier one and of a later one in their lists.
+struct SimilarContent {
+    std::size_t before;
+    std::size_t after;
+    int hundredths; ///< their similarity in hundredths of a percent
+
+    friend bool operator==(SimilarContent const&, SimilarContent const&) = default;
+};
+
+} // namespace project::git
