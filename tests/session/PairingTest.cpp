@@ -60,6 +60,53 @@ TEST(PairingByContent, pairsEmptyFilesOfOneNameOnly) {
     EXPECT_THAT(found.renames.ambiguous, IsEmpty());
 }
 
+Rename similar(std::u16string const& from, std::u16string const& to, int similarity) {
+    return {from, to, FileKind::File, Evidence::Similarity, similarity};
+}
+
+TEST(PairingBySimilarity, choosesTheMostSimilarFiles) {
+    auto const found = pairBySimilarity({{u"a", "1"}, {u"b", "2"}}, {{u"c", "3"}, {u"d", "4"}},
+                                        {{0, 0, 6000}, {0, 1, 9000}, {1, 0, 5500}, {1, 1, 8000}}, 50);
+
+    EXPECT_THAT(found.pairs, ElementsAre(similar(u"a", u"d", 90), similar(u"b", u"c", 55)));
+    EXPECT_THAT(found.ambiguous, IsEmpty());
+}
+
+TEST(PairingBySimilarity, prefersTheSameNameIfItIsUniqueAndTheContentsAreSimilarEnough) {
+    std::vector<FileContentId> const gone{{u"src/a", "1"}};
+    std::vector<FileContentId> const added{{u"lib/a", "2"}, {u"lib/b", "3"}};
+
+    EXPECT_THAT(pairBySimilarity(gone, added, {{0, 0, 6000}, {0, 1, 9000}}, 50).pairs,
+                ElementsAre(similar(u"src/a", u"lib/b", 90)));
+    EXPECT_THAT(pairBySimilarity({{u"src/a", "1"}, {u"src/b", "4"}}, added,
+                                 {{0, 0, 7500}, {0, 1, 9000}, {1, 1, 9500}}, 50)
+                    .pairs,
+                ElementsAre(similar(u"src/a", u"lib/a", 75), similar(u"src/b", u"lib/b", 95)));
+}
+
+TEST(PairingBySimilarity, prefersTheSameNameAmongEquallySimilarFilesIfNothingIsLeftOver) {
+    auto const found = pairBySimilarity({{u"x/a", "1"}, {u"x/b", "2"}}, {{u"y/b", "3"}, {u"y/a", "4"}},
+                                        {{0, 0, 6000}, {1, 0, 6000}, {0, 1, 6000}, {1, 1, 6000}}, 50);
+
+    EXPECT_THAT(found.pairs, ElementsAre(similar(u"x/a", u"y/a", 60), similar(u"x/b", u"y/b", 60)));
+}
+
+TEST(PairingBySimilarity, isAmbiguousWhereAFileThatIsLeftOverIsAsSimilar) {
+    auto const added =
+        pairBySimilarity({{u"a", "1"}}, {{u"b", "2"}, {u"c", "3"}}, {{0, 0, 9050}, {0, 1, 9000}}, 50);
+    EXPECT_THAT(added.pairs, IsEmpty());
+    EXPECT_THAT(added.ambiguous, ElementsAre(AmbiguousRename{{u"a"}, {u"b", u"c"}}));
+
+    auto const gone =
+        pairBySimilarity({{u"a", "1"}, {u"b", "2"}}, {{u"c", "3"}}, {{0, 0, 9000}, {1, 0, 9000}}, 50);
+    EXPECT_THAT(gone.pairs, IsEmpty());
+    EXPECT_THAT(gone.ambiguous, ElementsAre(AmbiguousRename{{u"a", u"b"}, {u"c"}}));
+
+    EXPECT_THAT(
+        pairBySimilarity({{u"a", "1"}}, {{u"b", "2"}, {u"c", "3"}}, {{0, 0, 9000}, {0, 1, 8900}}, 50).pairs,
+        ElementsAre(similar(u"a", u"b", 90)));
+}
+
 TEST(PairingByName, guessesWhereANameIsUnique) {
     auto const found = pairByName({u"a/f", u"a/g", u"b/g"}, {u"c/g", u"c/f", u"c/h"});
 

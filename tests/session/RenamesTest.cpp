@@ -46,7 +46,7 @@ protected:
         std::ofstream(folder_.onDisk() / file, std::ios::app) << text;
     }
 
-    TemporaryFolder const folder_;
+    test::TemporaryFolder const folder_;
     Session session_ = Session::create(folder_.root(), u"Pump", {.sourceControl = SourceControl::Off});
 };
 
@@ -55,7 +55,7 @@ class RenamesInRepository : public RenamesTest {
 protected:
     RenamesInRepository() { session_ = Session::open(folder_.root()); }
 
-    GitFolder const git_{folder_.onDisk()};
+    test::GitFolder const git_{folder_.onDisk()};
 };
 
 TEST_F(RenamesInRepository, findsAFileThatWasRenamedAndEdited) {

@@ -167,7 +167,8 @@ public:
     /// commit that contained the file. Equal contents are paired first, then similar ones, as git measures
     /// them. Files that git ignores are left out, and so are those that a sparse checkout left out. A file
     /// without any earlier content is paired by its name, as are all files outside a repository: such a pair
-    /// is a guess. Contents that only a filter driver of git can convert are not compared. Changes nothing.
+    /// is a guess. Contents that only a filter driver of git can convert are paired when they are staged, and
+    /// only with equal ones. Changes nothing.
     ///
     /// Takes the read lock while it reads the disk and the repository.
     /// @throws git::GitError if the repository cannot be read.

@@ -1,3 +1,6 @@
+#include <chrono>
+#include <filesystem>
+
 #include <sys/stat.h>
 
 #include "git/index/StagingFixture.hpp"
@@ -222,6 +225,23 @@ TEST_F(Staging, thousandsOfFilesAreOneCall) {
     EXPECT_EQ(repository.adapterStates(adapter, names), repository.statusStates());
     expectRemovedAsGitDoes(names);
     EXPECT_TRUE(tracked().empty());
+}
+
+TEST_F(Staging, theContentOfAStagedFileIsKnownAlsoIfOnlyGitCanConvertIt) {
+    repository.write(".gitattributes", "*.lfs filter=lfs\n");
+    repository.run({"config", "filter.lfs.clean", "tr a-z A-Z"});
+    repository.write("a.lfs", "one\n");
+    repository.write("changed.lfs", "two\n");
+    auto const before = std::filesystem::file_time_type::clock::now() - std::chrono::hours(1);
+    std::filesystem::last_write_time(repository.onDisk() / "a.lfs", before);
+    repository.commitAll();
+    repository.write("changed.lfs", "three\n");
+    auto const files = repository.paths({"a.lfs", "changed.lfs"});
+
+    auto const onDisk = adapter.contentsOnDisk(files);
+
+    EXPECT_EQ(onDisk.size(), 1U);
+    EXPECT_EQ(onDisk.at(files.front()), adapter.earlierContents(files, repository.root()).at(files.front()));
 }
 
 TEST_F(Staging, contentsAreEqualIfGitWouldStageThemAlike) {

@@ -2,6 +2,7 @@
 
 #include "repository/FileContent.hpp"
 #include "repository/LibGit.hpp"
+#include "repository/TrackedFiles.hpp"
 #include "states/ConvertedContent.hpp"
 
 namespace project::git {
@@ -35,10 +36,18 @@ std::optional<std::string> ContentIds::onDisk(fl::filesystem::Path const& file) 
 
     struct stat found {};
 
+    if (::lstat(name.c_str(), &found) != 0) {
+        return std::nullopt;
+    }
+    auto const staged = trackedAt(repository_.index(), *path);
+    bool const isStaged = staged && (staged->mode & S_IFMT) == (found.st_mode & S_IFMT) &&
+                          libgit().git_index_entry_is_conflict(&*staged) == 0 &&
+                          !comparison_.isModified(*staged, found);
+    if (isStaged) {
+        return bytesOf(staged->id);
+    }
     git_oid id{};
-    bool const isRead =
-        ::lstat(name.c_str(), &found) == 0 && hashOnDisk(id, repository_, rules_, *path, found);
-    return isRead ? std::optional(bytesOf(id)) : std::nullopt;
+    return hashOnDisk(id, repository_, rules_, *path, found) ? std::optional(bytesOf(id)) : std::nullopt;
 }
 
 std::optional<std::string> ContentIds::readStored(std::string const& id) const {

@@ -8,6 +8,7 @@
 #include "fl/filesystem/Path.hpp"
 #include "repository/Repository.hpp"
 #include "rules/ContentRules.hpp"
+#include "states/EntryComparison.hpp"
 
 namespace project::git {
 
@@ -20,10 +21,11 @@ bool hashOnDisk(git_oid& id, Repository const& repository, ContentRules& rules, 
 class ContentIds {
 public:
     /// @param repository borrowed.
-    explicit ContentIds(Repository& repository) : repository_(repository), rules_(repository) {}
+    explicit ContentIds(Repository const& repository)
+        : repository_(repository), rules_(repository), comparison_(repository) {}
 
     /// Of a file or link on disk, as it would be staged; nothing if it cannot be read, or if only git can
-    /// convert its content.
+    /// convert its content. A file that is staged as it is on disk is not read.
     std::optional<std::string> onDisk(fl::filesystem::Path const& file);
 
     /// The content that an identity is of; nothing if the repository does not have it.
@@ -34,8 +36,9 @@ public:
     std::optional<std::string> readOnDisk(fl::filesystem::Path const& file);
 
 private:
-    Repository& repository_;
+    Repository const& repository_;
     ContentRules rules_;
+    EntryComparison comparison_;
 };
 
 } // namespace project::git

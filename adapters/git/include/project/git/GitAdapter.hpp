@@ -120,7 +120,8 @@ public:
     std::map<Path, std::string> earlierContents(std::vector<Path> const& files, Path const& writer);
 
     /// The identities that the contents of some files on disk would have when they are staged. Stores
-    /// nothing. Files that cannot be read, or whose content only git can convert, are left out.
+    /// nothing, and does not read files that are staged as they are. Others that cannot be read, or whose
+    /// content only git can convert, are left out.
     /// @param files absolute paths.
     std::map<Path, std::string> contentsOnDisk(std::vector<Path> const& files);
 
