@@ -28,6 +28,34 @@ namespace {
 
 using RuleNodes = std::map<Path, std::shared_ptr<metadata::MetadataNode>>;
 
+/// The files that are gone and that nothing was paired with. Where a new file is in the place that a folder
+/// would move one of them to, they are not the same file.
+class UnlikeFiles {
+public:
+    UnlikeFiles(Path const& root, RenamesFound const& renames, SyncPlan const& plan) {
+        for (auto const& removed : plan.removed) {
+            if (removed.file.kind == FileKind::File) {
+                gone_.insert(removed.file.path);
+            }
+        }
+        for (auto const& rename : renames.pairs) {
+            gone_.erase(root / Path(rename.from));
+        }
+        std::ranges::transform(plan.added, std::inserter(added_, added_.end()), &FoundFile::path);
+    }
+
+    bool wouldMoveWith(Move const& folder) const {
+        return std::ranges::any_of(gone_, [&](Path const& file) {
+            return metadata::isParent(file, folder.from) &&
+                   added_.contains(folder.to / Path(metadata::getRelativePath(folder.from, file)));
+        });
+    }
+
+private:
+    std::set<Path> gone_;
+    std::set<Path> added_;
+};
+
 } // namespace
 
 FolderSync::FolderSync(Path const& root, git::GitEnvironment environment, stores::TreeMetadataManager& store,
@@ -102,11 +130,14 @@ std::vector<Move> FolderSync::followed(RenamesFound const& renames, SyncPlan con
     for (auto const& removed : plan.removed) {
         concerned.insert(removed.file.path);
     }
+    UnlikeFiles const unlike(root_, renames, plan);
     std::vector<Move> result;
     for (auto const& rename : renames.pairs) {
         Move move{root_ / Path(rename.from), root_ / Path(rename.to)};
         bool const isConcerned = concerned.contains(move.from) || concerned.contains(move.to);
-        if (isConcerned && rename.evidence != Rename::Evidence::Name) {
+        bool const isSure = rename.evidence != Rename::Evidence::Name &&
+                            !(rename.kind == FileKind::Folder && unlike.wouldMoveWith(move));
+        if (isConcerned && isSure) {
             result.push_back(std::move(move));
         }
     }

@@ -281,6 +281,12 @@ void sortByPath(std::vector<Rename>& pairs) {
     });
 }
 
+bool isGuessBelow(std::u16string const& folder, std::vector<Rename> const& pairs) {
+    return std::ranges::any_of(pairs, [inside = folder + u'/'](Rename const& pair) {
+        return pair.evidence == Rename::Evidence::Name && pair.from.starts_with(inside);
+    });
+}
+
 std::u16string newFolderOf(std::u16string const& folder, std::vector<Rename> const& pairs) {
     std::u16string const inside = folder + u'/';
     std::u16string result;

@@ -40,7 +40,7 @@ RenamesFound pairBySimilarity(std::vector<FileContentId> const& gone, std::vecto
 RenamesFound pairByName(std::vector<std::u16string> const& gone, std::vector<std::u16string> const& added);
 
 /// Adds pairs for folders: for one that is gone, if every pair of a file below it leads to the same place
-/// below one other folder, which is not in the project.
+/// below one other folder, which is not in the project. It is a guess if one of these pairs is.
 /// @param goneFolders relative to the root, sorted.
 /// @param isListed whether a path is in the project.
 template <typename IsListed>
@@ -54,6 +54,9 @@ void sortByPath(std::vector<Rename>& pairs);
 /// @param pairs of files, sorted by the earlier path.
 std::u16string newFolderOf(std::u16string const& folder, std::vector<Rename> const& pairs);
 
+/// Whether one of the pairs below a folder is a guess.
+bool isGuessBelow(std::u16string const& folder, std::vector<Rename> const& pairs);
+
 template <typename IsListed>
 void pairFolders(RenamesFound& renames, std::vector<std::u16string> const& goneFolders,
                  IsListed const& isListed) {
@@ -61,7 +64,9 @@ void pairFolders(RenamesFound& renames, std::vector<std::u16string> const& goneF
     for (auto const& folder : goneFolders) {
         auto const to = newFolderOf(folder, renames.pairs);
         if (!to.empty() && to != folder && !isListed(to)) {
-            folders.push_back({folder, to, FileKind::Folder, Rename::Evidence::Folder, 0});
+            auto const evidence =
+                isGuessBelow(folder, renames.pairs) ? Rename::Evidence::Name : Rename::Evidence::Folder;
+            folders.push_back({folder, to, FileKind::Folder, evidence, 0});
         }
     }
     renames.pairs.insert(renames.pairs.end(), folders.begin(), folders.end());

@@ -139,6 +139,15 @@ TEST_F(PairingOfFolders, followsTheFilesIfTheyAgree) {
     EXPECT_THAT(foldersAfter({same(u"src.txt", u"lib.txt")}), IsEmpty());
 }
 
+TEST_F(PairingOfFolders, isAGuessIfTheFilesAre) {
+    RenamesFound renames{{same(u"src/a", u"lib/a"), {u"src/b", u"lib/b", FileKind::File, Evidence::Name, 0}},
+                         {}};
+
+    pairFolders(renames, {u"src"}, [](std::u16string const&) { return false; });
+
+    EXPECT_EQ(renames.pairs.front(), (Rename{u"src", u"lib", FileKind::Folder, Evidence::Name, 0}));
+}
+
 TEST_F(PairingOfFolders, leavesAFolderThatWouldTakeThePlaceOfAnother) {
     EXPECT_THAT(foldersAfter({same(u"src/a", u"lib/a")}, u"lib"), IsEmpty());
 }

@@ -135,7 +135,7 @@ TEST_F(RenamesInRepository, leavesOutWhatASparseCheckoutLeftOut) {
     add(u"out/a", lines(0, 50));
     add(u"in/b", lines(100, 50));
     git_.commitAll();
-    git_.run({"sparse-checkout", "set", "in"});
+    git_.run({"sparse-checkout", "set", "--no-cone", "/*", "!/out/"});
     folder_.file(u"in/copy", lines(0, 50));
 
     EXPECT_TRUE(session_.findRenames().isEmpty());
@@ -177,6 +177,18 @@ TEST_F(RenamesInRepository, syncFollowsFromTheSimilarityOfItsOptions) {
     append("src/new", lines(500, 10));
 
     EXPECT_THAT(session_.sync({.similarity = 99}).renamed, IsEmpty());
+}
+
+TEST_F(RenamesTest, aFolderOfGuessesIsAGuessAndSyncDoesNotFollowIt) {
+    add(u"a/x", "1\n");
+    session_.setSyncRule({folder_.root()});
+    rename("a/x", "b/x");
+    folder_.remove(u"a");
+
+    EXPECT_THAT(session_.findRenames().pairs,
+                ElementsAre(Rename{u"a", u"b", FileKind::Folder, Evidence::Name, 0},
+                            file(u"a/x", u"b/x", Evidence::Name, 0)));
+    EXPECT_THAT(session_.sync({.removesMissingFolders = true}).renamed, IsEmpty());
 }
 
 TEST_F(RenamesTest, outsideARepositoryNamesAreAGuess) {
