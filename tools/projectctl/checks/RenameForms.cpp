@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "output/JsonRows.hpp"
+#include "output/Kind.hpp"
 #include "output/NameForms.hpp"
 #include "output/Output.hpp"
 #include "texts/Message.hpp"

@@ -9,6 +9,7 @@
 
 #include "git/GitCommand.hpp"
 #include "git/RawChanges.hpp"
+#include "output/Kind.hpp"
 #include "output/NameForms.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 
