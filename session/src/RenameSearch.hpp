@@ -14,6 +14,8 @@
 
 namespace project::session {
 
+using fl::filesystem::Path;
+
 /// Pairs the files of the project that are missing on disk with files that are not in the project, as
 /// Session::findRenames describes. The caller holds a guard of the store.
 class RenameSearch {
