@@ -16,7 +16,8 @@ protected:
         auto const found = adapter.earlierContents({repository.path(name)}, repository.path("list"));
         std::string result;
         for (auto const& [file, id] : found) {
-            for (unsigned char const byte : id) {
+            for (char const character : id) {
+                auto const byte = static_cast<unsigned char>(character);
                 result += "0123456789abcdef"[byte >> 4U];
                 result += "0123456789abcdef"[byte & 15U];
             }
