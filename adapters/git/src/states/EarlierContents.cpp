@@ -47,6 +47,7 @@ std::map<Path, std::string> earlierContents(Repository& repository, std::vector<
         }
     }
     std::vector<TreePath> sought;
+    sought.reserve(unknown.size());
     for (auto const& [path, file] : unknown) {
         sought.push_back(path);
     }
