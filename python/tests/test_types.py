@@ -23,8 +23,9 @@ def mypy(*arguments: str | Path, folder: Path) -> str:
     return done.stdout
 
 
-def test_the_stubs_describe_the_module(tmp_path: Path) -> None:
-    mypy("mypy.stubtest", "project_management", folder=tmp_path)
+def test_the_stub_describes_the_module_in_cpp(tmp_path: Path) -> None:
+    mypy("mypy.stubtest", "project_management._core", "--allowlist", Path(__file__).parent / "stubtest-allowlist.txt",
+         folder=tmp_path)
 
 
 def test_the_package_the_guide_and_the_example_are_strictly_typed(tmp_path: Path) -> None:
