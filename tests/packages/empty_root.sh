@@ -54,6 +54,11 @@ grep -q main.cpp "$root/home/newcomer/sources/.git/index" || fail "the file is n
 as_user 'source /usr/share/bash-completion/completions/projectctl && complete -p projectctl'
 as_user 'zcat /usr/share/man/man1/projectctl.1.gz | grep -q "^.Nm projectctl"'
 
+# The Python module alone, without the tool's libraries.
+as_root sh -c 'apt-get install --yes --no-install-recommends /tmp/python3-project-management_*.deb'
+as_user 'python3 -c "import project_management as pm; print(list(pm.open(\"sources\").files))"' | grep -q main.cpp ||
+    fail "the Python module does not list the file"
+
 # The library, for programs.
 as_root sh -c 'apt-get install --yes --no-install-recommends /tmp/*.deb g++ cmake make pkg-config'
 cp -r "$consumer" "$root/home/newcomer/consumer"
