@@ -1,0 +1,7 @@
+#include <cstdio>
+
+extern char const* extra;
+
+int main() {
+    std::puts(extra);
+}

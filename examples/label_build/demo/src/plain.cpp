@@ -1,0 +1,1 @@
+char const* extra = "plain";
