@@ -22,10 +22,15 @@ class PROJECT_MANAGEMENT_EXPORT ProjectManager {
 public:
     virtual ~ProjectManager();
 
+    /// The files that users start from.
     virtual EntryPointManager& getEntryPointManager() = 0;
+    /// The files and folders of the project, and the labels on them.
     virtual FileManager& getFileManager() = 0;
+    /// The categories and labels that files can have.
     virtual LabelManager& getLabelManager() = 0;
+    /// The references to other projects.
     virtual ProjectReferenceManager& getProjectReferenceManager() = 0;
+    /// The folders on the project path.
     virtual ProjectPathManager& getProjectPathManager() = 0;
 
     /// Stores the project's name. An empty name reads like no name. Takes the write lock.

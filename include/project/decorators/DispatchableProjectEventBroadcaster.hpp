@@ -24,6 +24,7 @@ public:
     Connection onFileListUpdate(FilesSlot const& slot) override;
     Connection onMetadataChange(Slot const& slot) override;
     Connection onLabelModified(LabelSlot const& slot) override;
+    /// A category was deleted.
     Connection onCategoryDeleted(CategorySlot const& slot) override;
     Connection onCategoryAdded(CategorySlot const& slot) override;
     Connection onCategoryRenamed(CategorySlot const& slot) override;
@@ -33,19 +34,29 @@ public:
     Connection onPathChanged(Slot const& slot) override;
     Connection onReferencesChanged(Slot const& slot) override;
 
+    /// Calls the slots of onFileListUpdate.
     void dispatchOnFileListUpdate(std::vector<Path> const& files);
+    /// Calls the slots of onFileLabelsChanged.
     void dispatchFileLabelsChanged(std::vector<Path> const& files);
 
     /// Also for applications, to report changes of their own data.
     void dispatchMetadataChange();
 
+    /// Calls the slots of onEntryPointsChanged.
     void dispatchEntryPointsChanged();
+    /// Calls the slots of onNameChanged.
     void dispatchNameChanged();
+    /// Calls the slots of onPathChanged.
     void dispatchPathChanged();
+    /// Calls the slots of onReferencesChanged.
     void dispatchReferencesChanged();
+    /// Calls the slots of onLabelModified.
     void dispatchLabelModified(Label const& label);
+    /// Calls the slots of onCategoryDeleted.
     void dispatchCategoryDeleted(CategoryIdentifier const& category);
+    /// Calls the slots of onCategoryAdded.
     void dispatchCategoryAdded(CategoryIdentifier const& category);
+    /// Calls the slots of onCategoryRenamed.
     void dispatchCategoryRenamed(CategoryIdentifier const& category);
 
 private:

@@ -30,10 +30,15 @@ class Label;
 /// about to call may run once more after it was disconnected.
 class PROJECT_MANAGEMENT_EXPORT ProjectEventBroadcaster {
 public:
+    /// A connected slot. Disconnecting it ends the calls.
     using Connection = boost::signals2::connection;
+    /// A function without arguments.
     using Slot = boost::signals2::slot<void()>;
+    /// A function that gets absolute paths.
     using FilesSlot = boost::signals2::slot<void(std::vector<Path> const&)>;
+    /// A function that gets a label.
     using LabelSlot = boost::signals2::slot<void(Label const&)>;
+    /// A function that gets a category.
     using CategorySlot = boost::signals2::slot<void(CategoryIdentifier const&)>;
 
     virtual ~ProjectEventBroadcaster();
@@ -51,6 +56,7 @@ public:
     /// A label was created or deleted; the event does not say which.
     virtual Connection onLabelModified(LabelSlot const& slot) = 0;
 
+    /// A category was deleted.
     virtual Connection onCategoryDeleted(CategorySlot const& slot) = 0;
 
     /// A category was created, or created again with other flags.

@@ -27,8 +27,10 @@ public:
     /// Returns the file, absolute.
     virtual Path getFile() const = 0;
 
+    /// Returns the type, which says when users start from the file.
     virtual EntryPointType getType() const = 0;
 
+    /// Returns whether user interfaces show the entry point.
     virtual bool isVisible() const = 0;
 
     /// Returns a copy of the group, which the caller owns; null if the entry point has no group.
@@ -52,6 +54,7 @@ public:
     /// Copies everything except the UUID, deliberately: the copy is an entry point of its own. When it is
     /// stored, it takes the UUID of its file's entry point.
     EntryPointDefinition(EntryPoint const& other);
+    /// The same.
     EntryPointDefinition(EntryPointDefinition const& other);
 
     /// Moving keeps the UUID.
@@ -68,9 +71,13 @@ public:
     std::optional<std::u16string> getExtensionData(std::u16string const& key) const override;
     std::vector<std::u16string> getExtensionKeys() const override;
 
+    /// Sets the name. Returns this object, as all setters do.
     EntryPointDefinition& setName(std::u16string const& name);
+    /// Sets the type.
     EntryPointDefinition& setType(EntryPointType type);
+    /// Sets the UUID, whose form is not checked.
     EntryPointDefinition& setUUID(std::u16string const& uuid);
+    /// Sets whether user interfaces show the entry point.
     EntryPointDefinition& setVisible(bool visible);
 
     /// Sets the group to a copy of the argument. Later changes of the argument have no effect.

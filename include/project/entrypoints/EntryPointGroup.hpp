@@ -11,6 +11,7 @@ class PROJECT_MANAGEMENT_EXPORT EntryPointGroup {
 public:
     virtual ~EntryPointGroup();
 
+    /// Returns the name that users see.
     virtual std::u16string getName() const = 0;
 
     /// Returns the UUID, which identifies the group. It is empty for a group that was not stored yet and was
@@ -24,6 +25,7 @@ public:
     /// A group without a UUID.
     explicit EntryPointGroupDefinition(std::u16string const& name);
 
+    /// A group with a given UUID, whose form is not checked.
     EntryPointGroupDefinition(std::u16string const& name, std::u16string const& uuid);
 
     /// Copies the name and the UUID of a group.

@@ -13,6 +13,9 @@ using fl::filesystem::Path;
 /// A label on a file, with its data.
 class PROJECT_MANAGEMENT_EXPORT FileLabel : public Label {
 public:
+    /// A label on a file.
+    /// @param file absolute.
+    /// @param data of the label on this file; empty if it has none.
     FileLabel(CategoryIdentifier category, LabelIdentifier labelIdentifier, Path file, std::u16string data);
 
     /// A label without data.

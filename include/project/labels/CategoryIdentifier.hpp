@@ -19,6 +19,7 @@ public:
 
     std::u16string getUUID() const override;
 
+    /// Returns the name that users see.
     virtual std::u16string getName() const;
 
     /// Returns true if the category must not be renamed or deleted.
@@ -51,8 +52,11 @@ public:
     CategoryDefinition(std::u16string const& name, std::u16string const& uuid);
 
     // Each setter returns this object.
+    /// Sets whether the category must not be renamed or deleted. Returns this object, as all setters do.
     CategoryDefinition& setIsReadOnly(bool readOnly);
+    /// Sets whether a file can have at most one label of this category.
     CategoryDefinition& setIsSingleValued(bool singleValued);
+    /// Sets the type of the data that the category's labels have on a file.
     CategoryDefinition& setDataType(std::u16string dataType);
 };
 

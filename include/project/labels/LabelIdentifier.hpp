@@ -15,10 +15,12 @@ namespace project::management {
 /// is changed.
 class PROJECT_MANAGEMENT_EXPORT LabelIdentifier : private Unique {
 public:
+    /// A label with these properties. The form of the UUID is not checked.
     LabelIdentifier(std::u16string uuid, std::u16string name, LabelReadOnlyState state);
 
     std::u16string getUUID() const override;
 
+    /// Returns the name that users see.
     virtual std::u16string getName() const;
 
     /// Returns whether the label may be deleted. Despite the name it is a state with three values.
@@ -27,6 +29,7 @@ public:
     /// Compares the UUID, the name and the state. Two values for the same label differ if it was changed
     /// between the two reads.
     bool operator==(LabelIdentifier const& other) const;
+    /// Compares the same properties.
     bool operator!=(LabelIdentifier const& other) const;
 
 private:

@@ -6,11 +6,11 @@
 #include "project/metadata/Export.hpp"
 #include "resource_core/BaseMsgID.hpp"
 
-/// The messages of the library, one class for each, in the catalog "ZEPHRA:project:management".
+/// The messages of the library, one class for each, in the catalog `ZEPHRA:project:management`.
 ///
 /// The name of a class is the key of its text in src/metadata/messages, spelling included. Its constructor
-/// takes the text's arguments in order, as UTF-16 text. ::project is written in full throughout, because
-/// project alone would mean this namespace.
+/// takes the text's arguments in order, as UTF-16 text. The outer namespace project is written with
+/// leading colons throughout, because project alone would mean this namespace.
 namespace ZEPHRA::project::management {
 
 /// The type of a message's argument: std::u16string, or anything that converts to it, such as a literal.
@@ -27,6 +27,7 @@ PROJECT_METADATA_EXPORT ::resource_core::BaseMsgID entryPointGroupDefaultName();
 /// The file or folder is not in the project.
 class PROJECT_METADATA_EXPORT FileNotInProject : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit FileNotInProject(Text const& path) : BaseMsgID(projectCatalog(), "FileNotInProject", 1) {
         setArgument(0, std::u16string(path));
@@ -36,6 +37,7 @@ public:
 /// The path is inside the folder that contains the store's own files.
 class PROJECT_METADATA_EXPORT FileIsMetadataError : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit FileIsMetadataError(Text const& path) : BaseMsgID(projectCatalog(), "FileIsMetadataError", 1) {
         setArgument(0, std::u16string(path));
@@ -45,6 +47,7 @@ public:
 /// The path is outside the project's root.
 class PROJECT_METADATA_EXPORT FileNotInProjectRoot : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Path, MessageText ProjectRoot>
     FileNotInProjectRoot(Path const& path, ProjectRoot const& projectRoot)
         : BaseMsgID(projectCatalog(), "FileNotInProjectRoot", 2) {
@@ -56,6 +59,7 @@ public:
 /// The path is below the project's root, but does not exist on disk.
 class PROJECT_METADATA_EXPORT FileDoesNotExistError : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit FileDoesNotExistError(Text const& path)
         : BaseMsgID(projectCatalog(), "FileDoesNotExistError", 1) {
@@ -67,6 +71,7 @@ public:
 /// belongs to the store or to source control.
 class PROJECT_METADATA_EXPORT SyncFolderUnsuitable : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit SyncFolderUnsuitable(Text const& path) : BaseMsgID(projectCatalog(), "SyncFolderUnsuitable", 1) {
         setArgument(0, std::u16string(path));
@@ -77,6 +82,7 @@ public:
 /// below it.
 class PROJECT_METADATA_EXPORT SyncFolderMissing : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit SyncFolderMissing(Text const& path) : BaseMsgID(projectCatalog(), "SyncFolderMissing", 1) {
         setArgument(0, std::u16string(path));
@@ -86,6 +92,7 @@ public:
 /// The project's root cannot be removed from its own project.
 class PROJECT_METADATA_EXPORT RootFolderNotRemoveable : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit RootFolderNotRemoveable(Text const& path)
         : BaseMsgID(projectCatalog(), "RootFolderNotRemoveable", 1) {
@@ -96,6 +103,7 @@ public:
 /// An entry point group with this UUID exists already.
 class PROJECT_METADATA_EXPORT EntryPointGroupUUIDDefined : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit EntryPointGroupUUIDDefined(Text const& uuid)
         : BaseMsgID(projectCatalog(), "EntryPointGroupUUIDDefined", 1) {
@@ -106,6 +114,7 @@ public:
 /// An entry point group with this name exists already.
 class PROJECT_METADATA_EXPORT EntryPointGroupNameDefined : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit EntryPointGroupNameDefined(Text const& name)
         : BaseMsgID(projectCatalog(), "EntryPointGroupNameDefined", 1) {
@@ -116,6 +125,7 @@ public:
 /// The name is not that of an entry point type. The exception is always nested over std::out_of_range.
 class PROJECT_METADATA_EXPORT EntryPointTypeUndefined : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit EntryPointTypeUndefined(Text const& typeName)
         : BaseMsgID(projectCatalog(), "EntryPointTypeUndefined", 1) {
@@ -138,6 +148,7 @@ public:
 /// The category does not exist.
 class PROJECT_METADATA_EXPORT CategoryDoesNotExist : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit CategoryDoesNotExist(Text const& categoryName)
         : BaseMsgID(projectCatalog(), "CategoryDoesNotExist", 1) {
@@ -148,6 +159,7 @@ public:
 /// A category with this UUID does not exist.
 class PROJECT_METADATA_EXPORT CategoryDoesNotExistsByUUID : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit CategoryDoesNotExistsByUUID(Text const& uuid)
         : BaseMsgID(projectCatalog(), "CategoryDoesNotExistsByUUID", 1) {
@@ -158,6 +170,7 @@ public:
 /// A category with this name exists already.
 class PROJECT_METADATA_EXPORT CategoryExistsByName : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit CategoryExistsByName(Text const& categoryName)
         : BaseMsgID(projectCatalog(), "CategoryExistsByName", 1) {
@@ -168,6 +181,7 @@ public:
 /// The category has a label with this name already.
 class PROJECT_METADATA_EXPORT LabelExistsByName : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText CategoryName, MessageText LabelName>
     LabelExistsByName(CategoryName const& categoryName, LabelName const& labelName)
         : BaseMsgID(projectCatalog(), "LabelExistsByName", 2) {
@@ -179,6 +193,7 @@ public:
 /// A label with this UUID does not exist.
 class PROJECT_METADATA_EXPORT LabelDoesNotExistsByUUID : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit LabelDoesNotExistsByUUID(Text const& uuid)
         : BaseMsgID(projectCatalog(), "LabelDoesNotExistsByUUID", 1) {
@@ -189,6 +204,7 @@ public:
 /// The name is not that of a label state. The exception is always nested over std::out_of_range.
 class PROJECT_METADATA_EXPORT LabelReadOnlyStateUndefined : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit LabelReadOnlyStateUndefined(Text const& stateName)
         : BaseMsgID(projectCatalog(), "LabelReadOnlyStateUndefined", 1) {
@@ -199,6 +215,7 @@ public:
 /// The folder is on the project path already.
 class PROJECT_METADATA_EXPORT DuplicatePathEntryException : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit DuplicatePathEntryException(Text const& path)
         : BaseMsgID(projectCatalog(), "DuplicatePathEntryException", 1) {
@@ -209,6 +226,7 @@ public:
 /// The folder is referenced as a project already.
 class PROJECT_METADATA_EXPORT DuplicateReferenceException : public ::resource_core::BaseMsgID {
 public:
+    /// The message with its arguments.
     template <MessageText Text>
     explicit DuplicateReferenceException(Text const& path)
         : BaseMsgID(projectCatalog(), "DuplicateReferenceException", 1) {

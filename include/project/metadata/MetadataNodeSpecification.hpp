@@ -18,10 +18,12 @@ public:
     /// Creates a node without a type, keys and nested nodes.
     MetadataNodeSpecification();
 
+    /// A node of this type, without keys and nested nodes.
     explicit MetadataNodeSpecification(std::u16string type);
 
     /// Copies the type, the keys and the nested nodes of another node.
     MetadataNodeSpecification(MetadataNode const& other);
+    /// A deep copy.
     MetadataNodeSpecification(MetadataNodeSpecification const& other);
     MetadataNodeSpecification& operator=(MetadataNodeSpecification const&) = delete;
     ~MetadataNodeSpecification() override;

@@ -26,12 +26,14 @@ public:
     /// Returns the address of the tree's root.
     static MetadataPath root() noexcept { return MetadataPath(LastStep(), nullptr); }
 
+    /// Shares the steps with the other address.
     MetadataPath(MetadataPath const& other) noexcept;
     MetadataPath& operator=(MetadataPath const& other) noexcept;
 
     /// Leaves the root's address in the other one.
     MetadataPath(MetadataPath&& other) noexcept : step_(std::exchange(other.step_, nullptr)) {}
 
+    /// Takes the steps of the other address.
     MetadataPath& operator=(MetadataPath&& other) noexcept {
         std::swap(step_, other.step_);
         return *this;

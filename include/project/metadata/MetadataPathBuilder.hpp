@@ -15,6 +15,7 @@ public:
     /// Appends all steps of an address.
     MetadataPathBuilder& add(MetadataPath const& path);
 
+    /// Returns the address of the steps that were added so far.
     MetadataPath build() const;
 
 private:

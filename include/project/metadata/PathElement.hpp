@@ -9,6 +9,7 @@ namespace project::metadata {
 /// A step of an address in the metadata tree: a type and a location.
 class PathElement {
 public:
+    /// A step with this type and this location.
     PathElement(std::u16string type, std::u16string location)
         : type_(std::move(type)), location_(std::move(location)) {}
 

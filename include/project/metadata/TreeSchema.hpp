@@ -23,15 +23,15 @@ namespace project::metadata::schema::information {
 
 /// The only step of the name's address, and the name's key.
 inline constexpr char16_t const* nameType = u"Info";
-inline constexpr char16_t const* nameLocation = u"ProjectData";
-inline constexpr char16_t const* nameKey = u"Name";
+inline constexpr char16_t const* nameLocation = u"ProjectData"; ///< the location of that step
+inline constexpr char16_t const* nameKey = u"Name";             ///< the key of the name
 
 /// The two steps of the description's address, and the description's key. It is the only key in lower case.
 inline constexpr char16_t const* extensionsType = u"Root";
-inline constexpr char16_t const* extensionsLocation = u"Extensions";
-inline constexpr char16_t const* descriptionType = u"Extension";
-inline constexpr char16_t const* descriptionLocation = u"Information";
-inline constexpr char16_t const* descriptionKey = u"description";
+inline constexpr char16_t const* extensionsLocation = u"Extensions";   ///< the location of the first step
+inline constexpr char16_t const* descriptionType = u"Extension";       ///< the type of the second step
+inline constexpr char16_t const* descriptionLocation = u"Information"; ///< the location of the second step
+inline constexpr char16_t const* descriptionKey = u"description";      ///< the key of the description
 
 } // namespace project::metadata::schema::information
 
@@ -49,23 +49,23 @@ inline constexpr char16_t const* fileType = u"File";
 
 /// The step of the marker below a folder. Its node has no keys.
 inline constexpr char16_t const* markerType = u"DIR_SIGNIFIER";
-inline constexpr char16_t const* markerLocation = u"1";
+inline constexpr char16_t const* markerLocation = u"1"; ///< the location of that step
 
 /// A nested node of a file in the file list: a category of which the file has labels.
 inline constexpr char16_t const* categoryType = u"Category";
-inline constexpr char16_t const* categoryUUIDKey = u"UUID";
+inline constexpr char16_t const* categoryUUIDKey = u"UUID"; ///< the category
 
 /// A nested node of such a category: a label of the file. The managers read its value and never write it.
 inline constexpr char16_t const* labelType = u"Label";
-inline constexpr char16_t const* labelUUIDKey = u"UUID";
-inline constexpr char16_t const* labelValueKey = u"Value";
+inline constexpr char16_t const* labelUUIDKey = u"UUID";   ///< the label
+inline constexpr char16_t const* labelValueKey = u"Value"; ///< its value
 
 /// The step of a file's label data. The nested nodes of its node are the records, of any type. The managers
 /// read and remove records and never write them.
 inline constexpr char16_t const* labelDataType = u"LabelData";
-inline constexpr char16_t const* labelDataLocation = u"Data";
-inline constexpr char16_t const* recordUUIDKey = u"UUID"; ///< the label that the record belongs to
-inline constexpr char16_t const* recordValueKey = u"Value";
+inline constexpr char16_t const* labelDataLocation = u"Data"; ///< the location of that step
+inline constexpr char16_t const* recordUUIDKey = u"UUID";     ///< the label that the record belongs to
+inline constexpr char16_t const* recordValueKey = u"Value";   ///< the data
 
 } // namespace project::metadata::schema::files
 
@@ -77,13 +77,13 @@ inline constexpr char16_t const* rulesScope = u"SyncRules";
 
 /// A key of a rule. Any text but gitIgnoreOff, and none, says that git's ignore rules apply.
 inline constexpr char16_t const* gitIgnoreKey = u"GitIgnore";
-inline constexpr char16_t const* gitIgnoreOff = u"0";
+inline constexpr char16_t const* gitIgnoreOff = u"0"; ///< git's ignore rules do not apply
 
 /// Nested nodes of a rule: one pattern each. Their identity is their content, so that the patterns of two
 /// people merge like two sets.
 inline constexpr char16_t const* includeType = u"Include";
-inline constexpr char16_t const* excludeType = u"Exclude";
-inline constexpr char16_t const* patternKey = u"Pattern";
+inline constexpr char16_t const* excludeType = u"Exclude"; ///< a pattern of files that are not added
+inline constexpr char16_t const* patternKey = u"Pattern";  ///< the pattern
 
 } // namespace project::metadata::schema::sync
 
@@ -95,19 +95,19 @@ inline constexpr char16_t const* categoriesType = u"Categories";
 
 /// A category, by UUID.
 inline constexpr char16_t const* categoryType = u"Category";
-inline constexpr char16_t const* categoryNameKey = u"Name";
-inline constexpr char16_t const* categoryDataTypeKey = u"DataType";
-inline constexpr char16_t const* categoryReadOnlyKey = u"ReadOnly";         ///< flagTrue or flagFalse
+inline constexpr char16_t const* categoryNameKey = u"Name";         ///< the name that users see
+inline constexpr char16_t const* categoryDataTypeKey = u"DataType"; ///< the type of the data of its labels
+inline constexpr char16_t const* categoryReadOnlyKey = u"ReadOnly"; ///< flagTrue or flagFalse
 inline constexpr char16_t const* categorySingleValuedKey = u"SingleValued"; ///< flagTrue or flagFalse
 
 /// A label below its category, by UUID.
 inline constexpr char16_t const* labelType = u"Label";
-inline constexpr char16_t const* labelNameKey = u"Name";
+inline constexpr char16_t const* labelNameKey = u"Name";         ///< the name that users see
 inline constexpr char16_t const* labelReadOnlyKey = u"ReadOnly"; ///< the text of a LabelReadOnlyState
 
 /// The two texts of a flag. Any other text counts as flagFalse.
 inline constexpr char16_t const* flagTrue = u"1";
-inline constexpr char16_t const* flagFalse = u"0";
+inline constexpr char16_t const* flagFalse = u"0"; ///< no
 
 } // namespace project::metadata::schema::categories
 
@@ -119,27 +119,27 @@ inline constexpr char16_t const* entryPointsType = u"EntryPoints";
 
 /// An entry point, by UUID.
 inline constexpr char16_t const* entryPointType = u"EntryPoint";
-inline constexpr char16_t const* fileKey = u"File"; ///< relative to the project's root, with "/"
-inline constexpr char16_t const* nameKey = u"Name";
-inline constexpr char16_t const* typeKey = u"Type";       ///< the name of an EntryPointType
-inline constexpr char16_t const* visibleKey = u"Visible"; ///< visible or hidden
-inline constexpr char16_t const* groupUUIDKey = u"GroupUUID";
+inline constexpr char16_t const* fileKey = u"File";           ///< relative to the project's root, with "/"
+inline constexpr char16_t const* nameKey = u"Name";           ///< the name that users see
+inline constexpr char16_t const* typeKey = u"Type";           ///< the name of an EntryPointType
+inline constexpr char16_t const* visibleKey = u"Visible";     ///< visible or hidden
+inline constexpr char16_t const* groupUUIDKey = u"GroupUUID"; ///< the group; absent if it has none
 
 /// The two values of visibleKey. Any text but hidden counts as visible.
 inline constexpr char16_t const* visible = u"1";
-inline constexpr char16_t const* hidden = u"0";
+inline constexpr char16_t const* hidden = u"0"; ///< not shown
 
 /// A nested node of an entry point: one pair of its extension data.
 inline constexpr char16_t const* extensionType = u"Extension";
-inline constexpr char16_t const* extensionNameKey = u"Name";
-inline constexpr char16_t const* extensionValueKey = u"Value";
+inline constexpr char16_t const* extensionNameKey = u"Name";   ///< the key of the pair
+inline constexpr char16_t const* extensionValueKey = u"Value"; ///< the value of the pair
 
 /// Type of the first step of the groups. No node is stored there.
 inline constexpr char16_t const* groupsType = u"EntryPointGroups";
 
 /// A group, by UUID.
 inline constexpr char16_t const* groupType = u"EntryPointGroup";
-inline constexpr char16_t const* groupNameKey = u"Name";
+inline constexpr char16_t const* groupNameKey = u"Name"; ///< the name that users see
 
 /// UUID of the default group, which every project has and which has no node.
 inline constexpr char16_t const* defaultGroupUUID = u"default";
@@ -152,7 +152,7 @@ namespace project::metadata::schema::references {
 
 /// Types of the first steps. No node is stored there.
 inline constexpr char16_t const* projectPathType = u"ProjectPath";
-inline constexpr char16_t const* referencesType = u"References";
+inline constexpr char16_t const* referencesType = u"References"; ///< the type for the references
 
 /// A reference in either subtree, by UUID.
 inline constexpr char16_t const* referenceType = u"Reference";
@@ -161,6 +161,6 @@ inline constexpr char16_t const* typeKey = u"Type";      ///< relative or absolu
 
 /// The two values of typeKey.
 inline constexpr char16_t const* relative = u"Relative";
-inline constexpr char16_t const* absolute = u"Absolute";
+inline constexpr char16_t const* absolute = u"Absolute"; ///< the stored path is absolute
 
 } // namespace project::metadata::schema::references

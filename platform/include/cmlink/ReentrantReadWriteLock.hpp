@@ -24,6 +24,7 @@ namespace cmlink {
 /// The lock must outlive its guards.
 class PROJECT_PLATFORM_EXPORT ReentrantReadWriteLock {
 public:
+    /// The two kinds of guards.
     enum class Access { Read, Write };
 
     /// Functions that run when the process takes its first guard and when it releases its last one. `first`
@@ -33,13 +34,14 @@ public:
     /// may take this lock. Between a `first` for writing and its `last`, only one thread has guards; between
     /// a `first` for reading and its `last`, all guards are read guards.
     struct Hooks {
-        std::function<void(Access)> first;
-        std::function<void()> last;
+        std::function<void(Access)> first; ///< runs before the first guard
+        std::function<void()> last;        ///< runs after the last guard
     };
 
     class LockGuard;
 
     ReentrantReadWriteLock();
+    /// A lock with hooks, either of which may be empty.
     explicit ReentrantReadWriteLock(Hooks hooks);
     ~ReentrantReadWriteLock();
     ReentrantReadWriteLock(ReentrantReadWriteLock const&) = delete;

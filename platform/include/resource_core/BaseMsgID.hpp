@@ -14,6 +14,7 @@ namespace resource_core {
 /// its text. It does not contain the text, so that the language is chosen when the text is requested.
 class PROJECT_PLATFORM_EXPORT BaseMsgID {
 public:
+    /// A number, or text: narrow text is UTF-8.
     using Argument = std::variant<long, std::string, std::u16string>;
 
     /// @param catalogName the name with which the catalog is registered in fl::i18n::MessageCatalog.
@@ -27,8 +28,10 @@ public:
     /// Returns the arguments, beginning with that for {0}. Narrow strings are UTF-8.
     std::vector<Argument> const& getArguments() const noexcept { return arguments_; }
 
+    /// Returns the name of the catalog.
     std::string const& getCatalogName() const noexcept { return catalogName_; }
 
+    /// Returns the key of the text in the catalog.
     std::string const& getMessageName() const noexcept { return messageName_; }
 
 protected:

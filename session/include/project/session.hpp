@@ -39,7 +39,9 @@ enum class SourceControl {
     Off,
 };
 
+/// How a session behaves. The defaults suit an application with a person in front of it.
 struct Options {
+    /// How the session treats the git repository.
     SourceControl sourceControl = SourceControl::EachChange;
 
     /// Whether GIT_DIR and the other variables of git's environment apply, as they do for the git command.

@@ -22,8 +22,10 @@ public:
     /// Returns a text besides what(), which is usually empty.
     std::u16string const& getText() const noexcept { return text_; }
 
+    /// The stack of the thread that created the exception.
     foundation::core::diag::stacktrace_base& getStackTrace() noexcept { return stackTrace_; }
 
+    /// The same.
     foundation::core::diag::stacktrace_base const& getStackTrace() const noexcept { return stackTrace_; }
 
 private:

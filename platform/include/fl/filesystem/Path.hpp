@@ -50,8 +50,11 @@ PROJECT_PLATFORM_EXPORT std::strong_ordering compare_elements(std::u16string_vie
 template <typename Narrow, typename Unit>
 class basic_path {
 public:
+    /// The unit of narrow text.
     using narrow_type = Narrow;
+    /// The unit of the text.
     using value_type = Unit;
+    /// The text.
     using string_type = std::basic_string<Unit>;
 
     /// An empty path.
@@ -60,29 +63,35 @@ public:
     /// A path with this text, of any code units. Implicit, because callers have text.
     basic_path(string_type text) : native_(detail::make_native_form(std::move(text), true)) {}
 
+    /// The same, for a literal.
     basic_path(Unit const* text) : basic_path(string_type(text)) {}
 
     /// Returns the text, as UTF-16 code units.
     string_type const& native() const noexcept { return native_; }
 
+    /// Returns true for a path without text.
     bool empty() const noexcept { return native_.empty(); }
 
     /// Returns true if the text is in native form, which every constructor ensures.
     bool isNativeForm() const noexcept { return isNativeForm_; }
 
+    /// Appends a path behind a separator.
     basic_path& operator/=(basic_path const& right) {
         native_ = detail::concatenate_pathname(std::move(native_), right.native_);
         return *this;
     }
 
+    /// Returns both paths with a separator between them.
     friend basic_path operator/(basic_path left, basic_path const& right) { return left /= right; }
 
+    /// Compares the texts.
     friend bool operator==(basic_path const& left, basic_path const& right) noexcept {
         // Most unequal paths differ in length. The comparison of the texts would compare their common
         // beginning.
         return left.native_.size() == right.native_.size() && left.native_ == right.native_;
     }
 
+    /// Compares element by element.
     friend bool operator<(basic_path const& left, basic_path const& right) noexcept {
         return std::is_lt(detail::compare_elements(left.native_, right.native_));
     }

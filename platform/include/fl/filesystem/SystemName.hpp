@@ -15,6 +15,7 @@ namespace fl::filesystem {
 /// throw: it is for loops over very many paths. The object has some 4 KiB and belongs on the stack.
 class PROJECT_PLATFORM_EXPORT SystemName {
 public:
+    /// The name of the path in the bytes of the system.
     explicit SystemName(Path const& path) noexcept;
     SystemName(SystemName const&) = delete;
     SystemName& operator=(SystemName const&) = delete;

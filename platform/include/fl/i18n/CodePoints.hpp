@@ -8,22 +8,27 @@
 /// these functions. None of them allocates, except appendUtf8, and none throws.
 namespace fl::i18n {
 
+/// The first code point that UTF-8 writes with more than one byte.
 inline constexpr char32_t firstBeyondAscii = 0x80;
 inline constexpr char32_t firstOfFourBytes =
     0x10000; ///< the first code point with a pair of surrogates in UTF-16
+/// The last code point of Unicode.
 inline constexpr char32_t lastCodePoint = 0x10FFFF;
 
 /// The number of bytes of the longest code point in UTF-8.
 inline constexpr std::size_t longestUtf8 = 4;
 
+/// Returns true for the first unit of a pair in UTF-16.
 constexpr bool isHighSurrogate(char32_t unit) noexcept {
     return unit >= 0xD800 && unit <= 0xDBFF;
 }
 
+/// Returns true for the second unit of a pair in UTF-16.
 constexpr bool isLowSurrogate(char32_t unit) noexcept {
     return unit >= 0xDC00 && unit <= 0xDFFF;
 }
 
+/// Returns true for either unit of a pair.
 constexpr bool isSurrogate(char32_t unit) noexcept {
     return unit >= 0xD800 && unit <= 0xDFFF;
 }
@@ -33,6 +38,7 @@ constexpr char16_t highSurrogate(char32_t codePoint) noexcept {
     return static_cast<char16_t>(0xD800U + ((codePoint - firstOfFourBytes) >> 10U));
 }
 
+/// Returns the second unit of the pair for a code point beyond 0xFFFF.
 constexpr char16_t lowSurrogate(char32_t codePoint) noexcept {
     return static_cast<char16_t>(0xDC00U + ((codePoint - firstOfFourBytes) & 0x3FFU));
 }
@@ -96,8 +102,8 @@ inline void appendUtf8(std::string& out, char32_t codePoint) {
 
 /// A code point and the number of bytes that it has in UTF-8; 0 where the bytes are not well-formed UTF-8.
 struct Utf8CodePoint {
-    char32_t codePoint;
-    std::size_t length;
+    char32_t codePoint; ///< the decoded character
+    std::size_t length; ///< the number of its bytes
 };
 
 /// Decodes the code point at a position within the bytes. Overlong forms, surrogates, code points beyond the

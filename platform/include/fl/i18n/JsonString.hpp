@@ -17,7 +17,7 @@ enum class JsonEscapes {
 };
 
 /// Appends the content of a text, without quotes. The escape of a character is the one with a letter where
-/// JSON has one, else \u with lower-case digits.
+/// JSON has one, else `\u` with lower-case digits.
 PROJECT_PLATFORM_EXPORT void appendJsonContent(std::string& out, std::u16string_view text,
                                                JsonEscapes escapes = JsonEscapes::Required);
 

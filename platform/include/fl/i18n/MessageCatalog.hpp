@@ -29,6 +29,7 @@ public:
     /// Returns the locale that is used where no other is given; "en" until it is set.
     static std::string getGlobalLocale();
 
+    /// Sets the locale that is used where no other is given.
     static void setGlobalLocale(std::string locale);
 
     /// Registers a catalog. A second catalog with the same name is ignored.

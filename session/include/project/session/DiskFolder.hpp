@@ -15,14 +15,14 @@ using fl::filesystem::Path;
 
 /// A file or folder on disk that a project can contain. A symbolic link counts as a file.
 struct DiskEntry {
-    std::u16string name;
-    FileKind kind;
+    std::u16string name; ///< the name in its folder
+    FileKind kind;       ///< a file or a folder
 };
 
 /// A folder that cannot be read.
 struct UnreadableFolder {
-    Path folder;
-    std::error_code problem;
+    Path folder;             ///< absolute
+    std::error_code problem; ///< why it cannot be read
 };
 
 /// The entries of a folder on disk, sorted by name in code units.

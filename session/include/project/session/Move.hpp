@@ -11,21 +11,22 @@ namespace project::session {
 
 /// A file or folder with its old and its new path, both absolute. A folder moves with everything below it.
 struct Move {
-    fl::filesystem::Path from;
-    fl::filesystem::Path to;
+    fl::filesystem::Path from; ///< the old path, absolute
+    fl::filesystem::Path to;   ///< the new path, absolute
 
     friend bool operator==(Move const&, Move const&) = default;
 };
 
 /// The end of a move that a process did not finish, because it was killed or the power failed.
 struct RecoveredMoves {
+    /// How the move ended.
     enum class Outcome {
         Completed,  ///< the definition contained the new paths: git's index has them now as well
         RolledBack, ///< it did not: the files have their old paths again
     };
 
-    Outcome outcome;
-    std::vector<Move> moves;
+    Outcome outcome;         ///< how the moves ended
+    std::vector<Move> moves; ///< all moves of the change
 
     /// Those whose files stay where they are, because another program has put something in their place.
     std::vector<Move> left;
@@ -36,6 +37,7 @@ struct RecoveredMoves {
 /// A move that is not possible. Nothing has changed.
 class PROJECT_SESSION_EXPORT MoveError : public computils::exception::StackTraceRecordingException {
 public:
+    /// The condition that is not met.
     enum class Reason {
         IsRoot,            ///< the project's own folder
         IsMissing,         ///< the file is not on disk
@@ -54,12 +56,16 @@ public:
     /// @param problem of the system, for DiskFailed.
     MoveError(Reason reason, Move move, std::string problem = {});
 
+    /// A sentence with both paths, in UTF-8.
     char const* what() const noexcept override { return text_.c_str(); }
 
+    /// Returns the condition that is not met.
     Reason reason() const noexcept { return reason_; }
 
+    /// Returns the move that is not possible.
     Move const& move() const noexcept { return move_; }
 
+    /// Returns the text of the system, for DiskFailed.
     std::string const& problem() const noexcept { return problem_; }
 
 private:

@@ -11,8 +11,8 @@ namespace project::session {
 
 /// A label, or any label of a category.
 struct LabelChoice {
-    std::u16string categoryUUID;
-    std::u16string labelUUID; ///< empty for any label of the category
+    std::u16string categoryUUID; ///< of the category
+    std::u16string labelUUID;    ///< empty for any label of the category
 };
 
 /// The labels that conditions concern: those of the project, personal ones, or both.
@@ -32,6 +32,7 @@ struct Query {
     /// The file has none of these labels.
     std::vector<LabelChoice> absentLabels = {};
 
+    /// The entry is a file, or is a folder.
     std::optional<FileKind> kind = {};
 
     /// A pattern for the whole path, relative to the root. Elements of the path are separated by `/`:
@@ -59,7 +60,7 @@ struct Query {
 /// A file or folder that a query has found.
 struct FoundFile {
     fl::filesystem::Path path; ///< absolute
-    FileKind kind;
+    FileKind kind;             ///< a file or a folder
 
     friend bool operator==(FoundFile const&, FoundFile const&) = default;
 };

@@ -36,6 +36,7 @@ struct SyncRule {
     friend bool operator==(SyncRule const&, SyncRule const&) = default;
 };
 
+/// How Session::sync behaves.
 struct SyncOptions {
     /// Whether everything below a rule's folder may be removed from the project although the folder itself is
     /// missing or empty, as it is when it is not mounted.
@@ -50,10 +51,11 @@ struct SyncOptions {
 
 /// A file or folder that a synchronisation removes from the project, with what is lost by it.
 struct RemovedFile {
-    FoundFile file;
-    std::vector<LabelChoice> labels;
+    FoundFile file;                          ///< the file or folder
+    std::vector<LabelChoice> labels;         ///< those that it has
     std::vector<std::u16string> entryPoints; ///< their names
 
+    /// Returns true if the removal loses a label or an entry point.
     bool isAnythingLost() const noexcept { return !labels.empty() || !entryPoints.empty(); }
 };
 
@@ -86,6 +88,7 @@ struct SyncPlan {
     /// Folders that could not be read. What is in them stays as it is.
     std::vector<UnreadableFolder> unreadable;
 
+    /// Returns true if there is nothing to do.
     bool isEmpty() const noexcept { return renamed.empty() && added.empty() && removed.empty(); }
 };
 

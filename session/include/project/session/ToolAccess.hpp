@@ -24,7 +24,7 @@ namespace project::session {
 struct VisitedFile {
     std::u16string const& path; ///< relative to the root
     std::size_t depth;          ///< number of folders between it and the path at which the visit began
-    FileKind kind;
+    FileKind kind;              ///< a file or a folder
     metadata::MetadataNode const& node; ///< the value stored for it
 };
 
@@ -42,7 +42,7 @@ struct DiskDifferences {
 
     std::vector<FoundFile> gone; ///< in the project but not on disk; a folder before its contents
 
-    std::vector<UnreadableFolder> unreadable;
+    std::vector<UnreadableFolder> unreadable; ///< folders that could not be compared
 };
 
 /// The parts of a session that only projectctl needs: it checks, repairs and merges the text itself.

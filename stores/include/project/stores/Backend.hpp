@@ -23,6 +23,7 @@ public:
     /// @return the changes of other processes since the last call.
     virtual Changes enter(Access access) = 0;
 
+    /// Ends what enter has begun: the process has released its last guard.
     virtual void leave() noexcept = 0;
 
     /// Passes on the addresses directly below one address; none for an address that does not exist. A batch

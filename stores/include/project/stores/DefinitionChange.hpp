@@ -11,6 +11,7 @@ namespace project::stores {
 
 /// A change between two versions of a project's definition, in terms of the project instead of its text.
 struct DefinitionChange {
+    /// The part of the definition that has changed.
     enum class Subject {
         Name,        ///< of the project
         Description, ///< of the project
@@ -26,20 +27,21 @@ struct DefinitionChange {
         Other,       ///< an address that none of the others describes
     };
 
+    /// How it has changed.
     enum class Kind { Added, Removed, Renamed, Changed };
 
     /// One setting, by its key in the tree; for a group, its name instead of its UUID. An empty value and an
     /// absent one are alike.
     struct Value {
-        std::u16string key;
-        std::u16string before;
-        std::u16string after;
+        std::u16string key;    ///< the name of the setting
+        std::u16string before; ///< its earlier value
+        std::u16string after;  ///< its later value
 
         friend bool operator==(Value const&, Value const&) = default;
     };
 
-    Subject subject;
-    Kind kind;
+    Subject subject; ///< the part of the definition
+    Kind kind;       ///< how it has changed
 
     /// The name or path: the later one, except of something that was removed. For a label on a file, its data
     /// and an entry point, the path of the file. Paths are relative to the project's root.

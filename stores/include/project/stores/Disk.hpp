@@ -13,9 +13,9 @@ namespace project::stores {
 
 /// The properties that distinguish one state of a file from another without reading the file.
 struct FileIdentity {
-    std::uint64_t device = 0;
-    std::uint64_t inode = 0;
-    std::uint64_t size = 0;
+    std::uint64_t device = 0;  ///< the file system
+    std::uint64_t inode = 0;   ///< the file in it
+    std::uint64_t size = 0;    ///< in bytes
     std::int64_t modified = 0; ///< nanoseconds since 1970
     std::int64_t changed = 0;  ///< nanoseconds since 1970
     bool isRegular = true;     ///< false for links, pipes and folders, which are never opened
@@ -23,6 +23,7 @@ struct FileIdentity {
 
     friend bool operator==(FileIdentity const&, FileIdentity const&) = default;
 
+    /// Returns true for the same file, also in another state.
     bool isSameFile(FileIdentity const& other) const noexcept {
         return device == other.device && inode == other.inode;
     }
@@ -35,13 +36,13 @@ struct FileIdentity {
 
 /// The bytes that were read from a file.
 struct FileContent {
-    std::string bytes;
+    std::string bytes;     ///< the content
     FileIdentity identity; ///< from before the read, so that the next check finds a change during the read
 };
 
 /// The state of a file after the disk wrote it.
 struct WrittenFile {
-    FileIdentity identity;
+    FileIdentity identity; ///< the new state
     bool isStamped; ///< its time is one that no other write produces, so that any other write is detected
 };
 
@@ -81,6 +82,7 @@ public:
 
     /// Excludes other writers; waits for the current one. @return false when the time has run out.
     virtual bool lock(std::chrono::milliseconds patience) = 0;
+    /// Admits other writers.
     virtual void unlock() noexcept = 0;
 
     /// The lock holder, for a message: its process number and command as far as they can be found out, or an

@@ -29,6 +29,7 @@ public:
     /// A server accepts no batch with more bytes. A longer one is committed with a body.
     static constexpr std::size_t longestBatch = std::size_t{1} << 20;
 
+    /// The result of an append.
     enum class Appended {
         Stored,     ///< the entry is durable, and stored once, however often it was sent
         Superseded, ///< the newest entry is not the one before it: another client has written, or the server

@@ -25,6 +25,7 @@ namespace project::stores {
 /// files are written but those of the cache.
 class PROJECT_STORES_EXPORT JournalBackend : public Backend {
 public:
+    /// How the backend treats the log.
     struct Options {
         /// How long to wait for another writer.
         std::chrono::milliseconds patience = std::chrono::seconds(10);
@@ -47,21 +48,22 @@ public:
 
     /// The size of the log's current part, and its newest entry.
     struct Status {
-        JournalPosition newest;
-        std::size_t bodySize;
-        std::size_t tailSize;
+        JournalPosition newest; ///< the newest entry
+        std::size_t bodySize;   ///< bytes of the newest body
+        std::size_t tailSize;   ///< bytes of the batches after it
     };
 
     /// The entries that a repair has set aside. They stay in the log until its history is deleted.
     struct SetAside {
-        std::uint64_t first;
-        std::uint64_t last;
-        bool isNothingLost; ///< this client had read them before they were damaged
+        std::uint64_t first; ///< the oldest version
+        std::uint64_t last;  ///< the newest version
+        bool isNothingLost;  ///< this client had read them before they were damaged
     };
 
     /// @param cache may be null.
     JournalBackend(std::unique_ptr<Journal> journal, Options options,
                    std::unique_ptr<JournalCache> cache = nullptr);
+    /// A backend with the default options and without a cache.
     explicit JournalBackend(std::unique_ptr<Journal> journal);
     /// Stores the text in the cache if it has changed.
     ~JournalBackend() override;
@@ -70,6 +72,7 @@ public:
     /// @throws StoreError with the kind Busy if another client holds the lock, Unreachable if the server does
     ///         not answer, Damaged if nothing of the log is readable.
     Changes enter(Access access) override;
+    /// Releases the lock of a writer.
     void leave() noexcept override;
     using Backend::load;
     void load(Address const& parent, ChildSink& children) override;

@@ -10,8 +10,8 @@ namespace project::stores {
 
 /// The definition of a shared project as a client has seen it last.
 struct CachedText {
-    JournalPosition position;
-    std::string text; ///< body and tail
+    JournalPosition position; ///< of the newest entry in it
+    std::string text;         ///< body and tail
 };
 
 /// Keeps the definition of a shared project between processes, so that a short command fetches only the new

@@ -29,25 +29,25 @@ struct JournalPosition {
 /// lines of that batch too: a reader that has the state before applies them and computes the body, instead of
 /// fetching it.
 struct JournalEntry {
-    JournalPosition position;
-    bool isBody = false; ///< otherwise it is a batch
-    std::string after;   ///< the sum of the entry before; empty for version 1
-    std::string lines;   ///< with line ends; empty for a body without a batch, and where look leaves it out
+    JournalPosition position; ///< its version and its identity
+    bool isBody = false;      ///< otherwise it is a batch
+    std::string after;        ///< the sum of the entry before; empty for version 1
+    std::string lines; ///< with line ends; empty for a body without a batch, and where look leaves it out
 };
 
 /// An entry to be appended. The views are valid during the call that receives it.
 struct NewJournalEntry {
-    JournalPosition position;
-    bool isBody = false;
-    std::string_view after;
-    std::string_view lines; ///< at most Journal::longestBatch bytes
-    std::string_view body;  ///< of a body, otherwise empty
+    JournalPosition position; ///< its version and its identity
+    bool isBody = false;      ///< whether it is a body; otherwise it is a batch
+    std::string_view after;   ///< the sum of the entry before it
+    std::string_view lines;   ///< at most Journal::longestBatch bytes
+    std::string_view body;    ///< of a body, otherwise empty
 };
 
 /// The author and time of an entry, for people.
 struct JournalRecord {
-    JournalPosition position;
-    bool isBody = false;
+    JournalPosition position;                   ///< its version and its identity
+    bool isBody = false;                        ///< whether it is a body; otherwise it is a batch
     std::string author;                         ///< the user as the server authenticated it
     std::string host;                           ///< as the author's client reported it; may be empty
     std::chrono::system_clock::time_point time; ///< by the server's clock

@@ -9,6 +9,7 @@ namespace project::stores {
 class PROJECT_STORES_EXPORT MemoryBackend : public Backend {
 public:
     Changes enter(Access access) override;
+    /// Does nothing.
     void leave() noexcept override;
     using Backend::load;
     void load(Address const& parent, ChildSink& children) override;

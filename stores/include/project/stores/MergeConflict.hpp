@@ -15,16 +15,17 @@ enum class MergeSide { Ours, Theirs };
 /// A value in the common version and in both sides of a merge.
 template <typename T>
 struct ThreeWay {
-    T base;
-    T ours;
-    T theirs;
+    T base;   ///< in the common version
+    T ours;   ///< on our side
+    T theirs; ///< on their side
 
+    /// Returns the value of one side.
     T const& of(MergeSide side) const noexcept { return side == MergeSide::Ours ? ours : theirs; }
 };
 
 /// One step from a node down to one nested in it.
 struct NestedStep {
-    std::u16string type;
+    std::u16string type;  ///< of the nested node
     std::u16string key;   ///< the identifying key, "UUID" or "Name"
     std::u16string value; ///< the value of that key
     std::size_t earlier;  ///< the number of preceding siblings with the same identity
@@ -32,6 +33,7 @@ struct NestedStep {
 
 /// Two changes that the merge cannot combine, so that a person must choose one.
 struct MergeConflict {
+    /// The contradiction.
     enum class Kind {
         Key,     ///< both sides set a key to different values, or one set and the other removed it
         Type,    ///< both sides changed the node's type
@@ -40,8 +42,8 @@ struct MergeConflict {
                  ///< something there
     };
 
-    Kind kind;
-    Address address;
+    Kind kind;       ///< the contradiction
+    Address address; ///< of the node
 
     /// The path from the node of the address to the nested node; empty for the node itself.
     std::vector<NestedStep> nested;

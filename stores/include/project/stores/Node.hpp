@@ -22,8 +22,8 @@ PROJECT_STORES_EXPORT Node const& plainNode();
 
 /// One address directly below another.
 struct Child {
-    metadata::PathElement element;
-    Node node;        ///< null if no node is stored there
+    metadata::PathElement element; ///< the last step of its address
+    Node node;                     ///< null if no node is stored there
     bool isCreated;   ///< there is no node, and the address exists even if nothing is stored below it
     bool hasChildren; ///< something is stored below it
 };
@@ -34,11 +34,11 @@ using Children = std::vector<Child>;
 
 /// A Child while it is passed on. What it refers to is valid during the call that receives it.
 struct LoadedChild {
-    std::u16string_view type;
-    std::u16string_view location;
-    Node const& node;
-    bool isCreated;
-    bool hasChildren;
+    std::u16string_view type;     ///< of the last step of its address
+    std::u16string_view location; ///< of the last step of its address
+    Node const& node;             ///< null if the address has none
+    bool isCreated;               ///< whether createPaths created the address
+    bool hasChildren;             ///< whether there is an address below it
 };
 
 /// Receives the children of one address, sorted by element, each element once.
@@ -46,6 +46,7 @@ class PROJECT_STORES_EXPORT ChildSink {
 public:
     virtual ~ChildSink() = default;
 
+    /// Receives one address. It is valid during the call.
     virtual void add(LoadedChild const& child) = 0;
 
 protected:
@@ -57,8 +58,10 @@ protected:
 /// Collects children in a list.
 class PROJECT_STORES_EXPORT ChildCollector : public ChildSink {
 public:
+    /// Keeps a copy of the address.
     void add(LoadedChild const& child) override;
 
+    /// Returns the addresses that were received.
     Children take() noexcept { return std::move(children_); }
 
 private:

@@ -27,6 +27,7 @@ public:
     /// Removes the move from a path, if there is one.
     void remove(std::u16string_view from);
 
+    /// Returns true if there are no moves.
     bool empty() const noexcept { return entries_.empty(); }
 
     /// The new path of a file or folder; nothing if it does not move.
@@ -46,11 +47,13 @@ public:
     /// The moves in the other direction.
     PathMoves reversed() const;
 
+    /// The new path of a file or folder.
     struct Target {
-        std::u16string path;
-        bool isTree;
+        std::u16string path; ///< relative to the root
+        bool isTree;         ///< whether everything below it moves as well
     };
 
+    /// The new paths by the old ones.
     using Entries = std::map<std::u16string, Target, std::less<>>;
 
     /// The moves by the earlier path.

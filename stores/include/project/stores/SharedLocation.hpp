@@ -12,6 +12,7 @@ namespace project::stores {
 /// Where the definition of a shared project is stored: the content of the file `store.json` in the folder in
 /// which other projects have their text. The file is committed to source control. It contains no secret.
 struct PROJECT_STORES_EXPORT SharedLocation {
+    /// The name of the file.
     static char16_t const* const fileName;
 
     /// The name of the folder beside the file in which a client keeps the last state.

@@ -11,12 +11,12 @@ namespace project::stores {
 
 /// A project on a server, as its users see it.
 struct SharedProject {
-    std::string id; ///< a UUID in lower case, 36 characters
-    std::string name;
-    int format = 0;
-    std::string reader; ///< members of this role read the project
-    std::string writer; ///< members of this role write it
-    bool isWritable = false;
+    std::string id;          ///< a UUID in lower case, 36 characters
+    std::string name;        ///< for people
+    int format = 0;          ///< of its log
+    std::string reader;      ///< members of this role read the project
+    std::string writer;      ///< members of this role write it
+    bool isWritable = false; ///< whether the user may change it
 };
 
 /// A server with projects that teams share. An adapter implements it in a library of its own.

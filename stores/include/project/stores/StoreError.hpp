@@ -36,14 +36,19 @@ public:
     /// "file:line: problem. remedy", in UTF-8.
     char const* what() const noexcept override { return text_.c_str(); }
 
+    /// Returns the kind, which says how a caller can react.
     Kind kind() const noexcept { return kind_; }
 
+    /// Returns the file concerned, in the system's bytes, or the name of the log.
     std::string const& file() const noexcept { return file_; }
 
+    /// Returns the line, counted from 1; 0 if the error has none.
     std::size_t line() const noexcept { return line_; }
 
+    /// Returns the problem, as a clause without a full stop.
     std::string const& problem() const noexcept { return problem_; }
 
+    /// Returns the action that solves the problem, as a sentence; may be empty.
     std::string const& remedy() const noexcept { return remedy_; }
 
 private:

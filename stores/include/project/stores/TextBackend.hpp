@@ -17,6 +17,7 @@ namespace project::stores {
 /// before the first guard, and nothing is written before the first batch.
 class PROJECT_STORES_EXPORT TextBackend : public Backend {
 public:
+    /// How the backend treats the text.
     struct Options {
         /// How long to wait for another writer, and for a text that is incomplete.
         std::chrono::milliseconds patience = std::chrono::seconds(10);
@@ -44,11 +45,13 @@ public:
 
     /// @param disk the store's folder.
     explicit TextBackend(std::unique_ptr<Disk> disk);
+    /// A backend over a folder. Does not access the disk yet.
     TextBackend(std::unique_ptr<Disk> disk, Options options);
     /// Tidies the text if this object has written and no other process is writing.
     ~TextBackend() override;
 
     Changes enter(Access access) override;
+    /// Releases the lock of a writer.
     void leave() noexcept override;
     using Backend::load;
     void load(Address const& parent, ChildSink& children) override;

@@ -14,6 +14,7 @@ namespace project::stores {
 /// The files that one side of a merge renamed, as source control knows them. Paths are relative to the
 /// project's root.
 struct SideRenames {
+    /// Paths by paths.
     using Paths = std::map<std::u16string, std::u16string>;
 
     Paths renamed; ///< the path in the common version, and the side's path

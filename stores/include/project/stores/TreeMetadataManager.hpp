@@ -28,11 +28,15 @@ public:
     cmlink::ReentrantReadWriteLock::LockGuard acquireWriteLock() override;
     Path getMetadataRoot() override;
     std::unique_ptr<metadata::MetadataNode> getNode(metadata::MetadataPath const& path) override;
+    /// As metadata::MetadataManager::setNodes.
     void setNodes(std::map<metadata::MetadataPath, std::shared_ptr<metadata::MetadataNode>>& nodes) override;
     bool hasNode(metadata::MetadataPath const& path) override;
     std::vector<metadata::MetadataPath> getChildNodes(metadata::MetadataPath const& path) override;
+    /// As metadata::MetadataManager::subscribe.
     void subscribe(std::weak_ptr<metadata::FileChangeRequestListener> listener) override;
+    /// As metadata::MetadataManager::removeNodes.
     void removeNodes(std::vector<metadata::MetadataPath>& paths) override;
+    /// As metadata::MetadataManager::createPaths.
     void createPaths(std::vector<metadata::MetadataPath>& paths) override;
     bool pathExists(metadata::MetadataPath path) override;
 

@@ -33,6 +33,7 @@ class RepositoryFinder;
 /// `safe.directory` does not list.
 class PROJECT_GIT_EXPORT GitAdapter final : public cmlink::CMAdapter {
 public:
+    /// The path type of the whole library.
     using Path = fl::filesystem::Path;
 
     class Batch;
@@ -152,6 +153,7 @@ private:
 /// Without publish, the index stays unchanged. An adapter has one batch at a time, and must outlive it.
 class PROJECT_GIT_EXPORT GitAdapter::Batch {
 public:
+    /// Begins a batch. Does not access the repository.
     explicit Batch(GitAdapter& adapter);
 
     /// Releases the lock.

@@ -29,12 +29,16 @@ public:
     /// "file: problem. remedy".
     char const* what() const noexcept override { return text_.c_str(); }
 
+    /// Returns the reason.
     Kind kind() const noexcept { return kind_; }
 
+    /// Returns the file or folder concerned, in the system's bytes; may be empty.
     std::string const& file() const noexcept { return file_; }
 
+    /// Returns the problem, as a clause without a full stop.
     std::string const& problem() const noexcept { return problem_; }
 
+    /// Returns the action that solves the problem, as a sentence; may be empty.
     std::string const& remedy() const noexcept { return remedy_; }
 
 private:

@@ -15,6 +15,7 @@ using stores::SharedProject;
 /// The projects in the database of a service.
 class PROJECT_POSTGRESQL_EXPORT SharedProjects : public stores::SharedServer {
 public:
+    /// Remembers the settings. The first operation connects.
     explicit SharedProjects(ServiceSettings settings);
 
     std::vector<SharedProject> list() const override;

@@ -16,6 +16,7 @@ public:
     /// A return address, as the unwinder reports it.
     using Frame = void const*;
 
+    /// The largest number of frames that are recorded.
     static constexpr std::size_t maximumFrames = 128;
 
     stacktrace_base() noexcept;
