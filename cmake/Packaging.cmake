@@ -26,7 +26,8 @@ if(TARGET project_postgresql) # with an export of its own, so that it can be lef
     COMPONENT postgresql)
 endif()
 
-install(DIRECTORY docs/json DESTINATION "${CMAKE_INSTALL_DATADIR}/project-management" COMPONENT tool)
+install(DIRECTORY docs/json DESTINATION "${CMAKE_INSTALL_DATADIR}/project-management" COMPONENT tool
+  FILES_MATCHING PATTERN "*.schema.json")
 
 # The modules of pkg-config that a program links with static libraries, because the libraries use them.
 set(private_modules)

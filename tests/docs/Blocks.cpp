@@ -14,8 +14,10 @@ namespace {
 class CapturedOutput {
 public:
     CapturedOutput() : earlier_(std::cout.rdbuf(text_.rdbuf())) {}
+
     CapturedOutput(CapturedOutput const&) = delete;
     CapturedOutput& operator=(CapturedOutput const&) = delete;
+
     ~CapturedOutput() { std::cout.rdbuf(earlier_); }
 
     std::string text() const { return text_.str(); }
@@ -25,11 +27,13 @@ private:
     std::streambuf* earlier_;
 };
 
-/// An empty working folder with the files that the pages mention.
+/// A working folder with the files and folders that the pages mention.
 class WorkingFolder {
 public:
     WorkingFolder() : earlier_(std::filesystem::current_path()), path_(folder_.onDisk() / "controller") {
-        std::filesystem::create_directories(path_ / "src" / "io");
+        for (char const* name : {"src/io", "engine", "pump", "my-sources"}) {
+            std::filesystem::create_directories(path_ / name);
+        }
         std::filesystem::current_path(path_);
         for (char const* name : {"readme.md", "src/main.cpp", "src/valve.cpp", "src/io/pump.cpp"}) {
             std::ofstream(path_ / name) << "// " << name << '\n';
@@ -38,6 +42,7 @@ public:
 
     WorkingFolder(WorkingFolder const&) = delete;
     WorkingFolder& operator=(WorkingFolder const&) = delete;
+
     ~WorkingFolder() { std::filesystem::current_path(earlier_); }
 
 private:

@@ -9,6 +9,8 @@ from pathlib import Path
 from urllib.parse import unquote, urldefrag
 
 LOADED = {("script", "src"), ("img", "src"), ("iframe", "src"), ("source", "src"), ("object", "data")}
+# Doxygen writes this link for a class whose nested classes are all private.
+DOXYGEN_MISTAKES = {"#nested-classes"}
 LOADED_BY_LINK = {"stylesheet", "icon", "preload", "modulepreload", "manifest"}
 
 
@@ -45,7 +47,7 @@ def problems_of(path, pages):
         if is_remote(address):
             yield f"{path}: loads {address} from the network"
     for address in page.links + page.loaded:
-        if is_remote(address) or address.startswith(("data:", "mailto:", "javascript:")):
+        if address in DOXYGEN_MISTAKES or is_remote(address) or address.startswith(("data:", "mailto:", "javascript:")):
             continue
         file, anchor = urldefrag(address)
         target = (path.parent / unquote(file).split("?")[0]).resolve() if file else path
