@@ -1,6 +1,8 @@
 #include "project/session.hpp"
 
 #include <algorithm>
+#include <stdexcept>
+#include <string>
 #include <utility>
 
 #include "ChangeStep.hpp"
@@ -15,6 +17,17 @@
 namespace project::session {
 
 using std::chrono::milliseconds;
+
+namespace {
+
+void requirePercentage(int similarity) {
+    if (similarity < 1 || similarity > 100) {
+        throw std::invalid_argument("a similarity is from 1 to 100 percent, not " +
+                                    std::to_string(similarity));
+    }
+}
+
+} // namespace
 
 Session Session::open(Path const& root, Options options) {
     Session result(std::make_unique<State>(root, options));
@@ -105,6 +118,7 @@ bool Session::removeSyncRule(Path const& folder) {
 }
 
 RenamesFound Session::findRenames(RenameOptions const& options) {
+    requirePercentage(options.similarity);
     auto const text = state_->storeFolder / stores::TextBackend::textName;
     return state_->sync.findRenames(options, isShared() ? state_->root : text);
 }
@@ -114,6 +128,7 @@ SyncPlan Session::planSync() {
 }
 
 SyncPlan Session::sync(SyncOptions const& options) {
+    requirePercentage(options.similarity);
     auto seen = planSync();
     if (seen.isEmpty()) {
         return seen;

@@ -1,5 +1,6 @@
 #include <filesystem>
 #include <fstream>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -167,6 +168,16 @@ TEST_F(RenamesInRepository, syncFollowsAFileThatWasRenamedAndEdited) {
     EXPECT_EQ(plan.renamed, (std::vector<Move>{{folder_.path(u"src/a"), folder_.path(u"src/new")}}));
     ASSERT_EQ(plan.added.size(), 1U);
     EXPECT_EQ(plan.added.front().path, folder_.path(u"src/unlike"));
+}
+
+TEST_F(RenamesTest, refuseASimilarityThatIsNotAPercentage) {
+    for (int const similarity : {-1, 0, 101}) {
+        EXPECT_THROW(session_.findRenames({.similarity = similarity}), std::invalid_argument) << similarity;
+        EXPECT_THROW(session_.sync({.similarity = similarity}), std::invalid_argument) << similarity;
+    }
+    for (int const similarity : {1, 100}) {
+        EXPECT_TRUE(session_.findRenames({.similarity = similarity}).isEmpty()) << similarity;
+    }
 }
 
 TEST_F(RenamesInRepository, syncFollowsFromTheSimilarityOfItsOptions) {

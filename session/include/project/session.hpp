@@ -173,6 +173,7 @@ public:
     /// only with equal ones. Changes nothing.
     ///
     /// Takes the read lock while it reads the disk and the repository.
+    /// @throws std::invalid_argument if the similarity is not from 1 to 100.
     /// @throws git::GitError if the repository cannot be read.
     RenamesFound findRenames(RenameOptions const& options = {});
 
@@ -208,6 +209,7 @@ public:
     /// @return what was changed.
     /// @throws exception SyncFolderMissing if the folder of a rule is missing or empty, unless the options
     ///         allow it. Nothing changes.
+    /// @throws std::invalid_argument if the similarity is not from 1 to 100.
     /// @throws git::GitError if git's ignore rules cannot be read.
     SyncPlan sync(SyncOptions const& options = {});
 
