@@ -66,8 +66,8 @@ struct SyncPlan {
     ///
     /// They are the pairs of Session::findRenames of which the old or the new path would be removed or added,
     /// or is the folder of a rule. Guesses by the name alone and ambiguous renames are not followed, so
-    /// nothing is outside a repository. Neither is a folder if a file of it that is gone would get the place of
-    /// a new file that it is not a pair with.
+    /// nothing is outside a repository. Neither is a folder if a file of it that is gone would get the place
+    /// of a new file that it is not a pair with.
     std::vector<Move> renamed = {};
 
     /// New files. The folders above them are added with them.
