@@ -50,7 +50,7 @@ def test_the_blocks_of_python_and_of_cpp_create_the_same(repository: Path, capfd
 
 def test_the_page_of_labels_shows_its_table_and_plot(repository: Path, capsys: pytest.CaptureFixture[str]) -> None:
     run("python-labels.md")
-    (table,) = blocks_of(GUIDE / "python-labels.md", "")
+    (table,) = blocks_of(GUIDE / "python-labels.md", "text")
     assert capsys.readouterr().out == table
     drawn = re.findall(r"<!-- (.*?) -->", Path("labels.svg").read_text())
     assert "Labels by folder" in drawn and {"Open", "Released", "Reviewed", "none"} <= set(drawn)

@@ -1,10 +1,13 @@
 #!/usr/bin/env bash
-# example.sh EXAMPLE BUILD COMPILER PREFIX: builds an example as a project of its own, against the library that is
-# installed under a prefix, and runs its tests.
+# example.sh EXAMPLE WORK COMPILER PREFIX: copies an example, as people do, and runs the commands of its page, which build it
+# against the library that is installed under a prefix, and run its tests.
 set -euo pipefail
-example=$1 build=$2 compiler=$3 prefix=$4
-rm -rf "$build"
-cmake -S "$example" -B "$build" -G Ninja -DCMAKE_CXX_COMPILER="$compiler" -DCMAKE_PREFIX_PATH="$prefix" \
-    -DCMAKE_CXX_COMPILER_LAUNCHER=ccache -DCMAKE_UNITY_BUILD=ON > /dev/null
-cmake --build "$build"
-ctest --test-dir "$build" --output-on-failure --no-tests=error
+example=$1 work=$2
+export CXX=$3 CMAKE_PREFIX_PATH=$4 CMAKE_GENERATOR=Ninja CMAKE_CXX_COMPILER_LAUNCHER=ccache CTEST_OUTPUT_ON_FAILURE=1
+rm -rf "$work"
+cp -r "$example" "$work"
+cd "$work"
+commands=$(sed -n '/^```console$/,/^```$/s/^\$ //p' README.md)
+[ -n "$commands" ] || { echo "the page has no commands" >&2; exit 1; }
+bash -euo pipefail -c "$commands" | tee output
+grep -q "100% tests passed" output # and there are tests

@@ -2,6 +2,10 @@
 
     <!-- before: COMMANDS -->     run first, and not shown: commands of a session, statements of C++
     <!-- new folder -->           the session begins again in an empty folder
+    <!-- meanwhile: COMMANDS -->  run while the one command of a session runs, which is then interrupted
+    <!-- terminal -->             the commands of a session write to a terminal
+    <!-- file: NAME -->           the session stores the block in this file
+    <!-- input: COMMAND -->       the session runs this command, which reads the block
     <!-- definitions -->          C++ at namespace scope, for the blocks that follow
     <!-- arguments: WORDS -->     of a C++ program
     <!-- output -->               the text that the block in front of this one has written
@@ -10,7 +14,8 @@
 import re
 from dataclasses import dataclass, field
 
-COMMENT = re.compile(r"<!--\s*(before|new folder|definitions|arguments|output|not run)(?::\s*(.*?))?\s*-->", re.DOTALL)
+NOTES = "before|new folder|meanwhile|terminal|file|input|definitions|arguments|output|not run"
+COMMENT = re.compile(rf"<!--\s*({NOTES})(?::\s*(.*?))?\s*-->", re.DOTALL)
 
 
 @dataclass

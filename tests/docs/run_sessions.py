@@ -1,24 +1,31 @@
-"""Runs the shell sessions of a page in an empty folder, and compares their output with the page.
+"""Runs the shell sessions of a page in an empty home folder, and compares their output with the page.
 
-    run_sessions.py PAGE WORK [PATH...]
+    run_sessions.py PAGE [PATH...]
 
 The blocks of one page are one session: a shell keeps its folder and its variables from block to block. In the output, three
-dots stand for any text, or, alone on a line, for any number of lines; a UUID stands for any UUID. The home folder of
-the session is shown as /home/ada. A command that fails must have output, which says so.
+dots stand for any text, or, alone on a line, for any number of lines; a UUID, a hash and the time of a server stand for
+any other. The home folder of the session is shown as /home/ada. A command that fails must have output, which says
+so.
 """
 import os
 import re
-import shutil
+import shlex
 import signal
 import subprocess
 import sys
+import tempfile
 from pathlib import Path
 
 from markdown_blocks import read_blocks
 
-UUID = re.compile(r"[0-9a-f]{8}-[0-9a-f]{4}-[0-9a-f]{4}-[0-9a-f]{4}-[0-9a-f]{12}")
+# What differs from run to run: text of this form on the page stands for any other text of the form.
+FORMS = {"any": r"\.\.\.", "uuid": r"[0-9a-f]{8}-[0-9a-f]{4}-[0-9a-f]{4}-[0-9a-f]{4}-[0-9a-f]{12}", "hash": r"\b(?:[0-9a-f]{10}|[0-9a-f]{16})\b",
+         "time": r"\d{4}-\d\d-\d\d \d\d:\d\d:\d\d UTC"}
+VARYING = re.compile("|".join(f"(?P<{name}>{form})" for name, form in FORMS.items()))
 HERE_DOCUMENT = re.compile(r"<<-?\s*['\"]?(\w+)['\"]?")
 SECONDS_FOR_A_COMMAND = 120
+# The exit code of a shell that lacks a program which the session needs.
+NOT_POSSIBLE = 77
 
 
 def commands_of(block):
@@ -50,28 +57,53 @@ def commands_of(block):
     return commands
 
 
+def pattern_of(line):
+    """The lines that a line of the page stands for, as a regular expression."""
+    if line.strip() == "...":
+        return r"(?:.*\n)*"
+    pattern, end = "", 0
+    for match in VARYING.finditer(line):
+        form = ".*" if match.lastgroup == "any" else FORMS[match.lastgroup]
+        pattern += re.escape(line[end:match.start()]) + form
+        end = match.end()
+    return pattern + re.escape(line[end:]) + r"\n"
+
+
 def is_expected(actual, expected):
     """Whether the lines of the output are those of the page."""
-    pattern = []
-    for line in expected:
-        if line.strip() == "...":
-            pattern.append(r"(?:.*\n)*")
-        else:
-            words = UUID.sub("\0", line).split("...")
-            pattern.append(".*".join(re.escape(word) for word in words).replace("\0", UUID.pattern) + r"\n")
-    return re.fullmatch("".join(pattern), "".join(line + "\n" for line in actual)) is not None
+    return re.fullmatch("".join(map(pattern_of, expected)), "".join(line + "\n" for line in actual)) is not None
+
+
+def on_terminal(command):
+    """The command with a terminal for its output."""
+    return f"script --quiet --return --command {shlex.quote(command)} /dev/null | tr -d '\\r'"
+
+
+def interrupted(command, meanwhile, lines):
+    """Runs one command while another one runs, which is interrupted as soon as it has written a number of lines."""
+    return f"""
+output=$(mktemp)
+written() {{ for _ in {{1..100}}; do [ "$(wc -l < "$output")" -ge "$1" ] && return; sleep 0.1; done; return 1; }}
+set -m
+( {command} ) > "$output" 2>&1 &
+set +m
+{meanwhile}
+written {lines}
+kill -INT -- -$!
+wait $! || true
+cat "$output" && rm "$output"
+"""
 
 
 class Shell:
     """A shell that runs one command after the other."""
 
-    def __init__(self, page, work, paths):
+    def __init__(self, work, paths):
         self.work = work
         self.home = work / "home" / "ada"
-        shutil.rmtree(work, ignore_errors=True)
         environment = {name: os.environ[name] for name in ("PATH", "LD_LIBRARY_PATH", "CXX", "CC") if name in os.environ}
         environment.update(
-            HOME=str(self.home), PAGE=str(page), PATH=":".join(paths + [environment["PATH"]]), LC_ALL="C.UTF-8", TERM="dumb",
+            HOME=str(self.home), ROOT=str(Path(__file__).resolve().parents[2]), PATH=":".join(paths + [environment["PATH"]]), LC_ALL="C.UTF-8", TERM="dumb",
             GIT_CONFIG_NOSYSTEM="1", GIT_AUTHOR_NAME="Ada Lovelace", GIT_AUTHOR_EMAIL="ada@example.invalid",
             GIT_COMMITTER_NAME="Ada Lovelace", GIT_COMMITTER_EMAIL="ada@example.invalid",
             ASAN_OPTIONS="detect_leaks=0")
@@ -96,7 +128,8 @@ class Shell:
                     lines.pop()
                 return int(end[1]), lines
             lines.append(line.rstrip("\n").replace(str(self.home), "/home/ada"))
-        raise SystemExit(f"the shell has ended: {command}\n" + "\n".join(lines))
+        print(f"the shell has ended: {command}", *lines, sep="\n")
+        sys.exit(NOT_POSSIBLE if self.process.wait() == NOT_POSSIBLE else 1)
 
     def begin_again(self):
         self.run(f"cd '{self.home}' && find . -mindepth 1 -delete")
@@ -104,6 +137,7 @@ class Shell:
     def end(self):
         self.process.stdin.close()
         self.process.wait()
+        self.process.stdout.close()
 
 
 def run_page(page, shell):
@@ -114,17 +148,25 @@ def run_page(page, shell):
     def prepare(commands, number):
         code, output = shell.run(commands)
         if code:
-            problems.append(f"{page}:{number}: 'before' has failed\n" + "\n".join(output))
+            problems.append(f"{page}:{number}: hidden commands have failed, or those that read the block\n" + "\n".join(output))
 
     for block in read_blocks(str(page), page.read_text()):
-        if block.language != "console" or "not run" in block.notes:
+        if "not run" in block.notes or not (block.language == "console" or {"file", "input"} & set(block.notes)):
             continue
         if "new folder" in block.notes:
             shell.begin_again()
         if "before" in block.notes:
             prepare(block.notes["before"], block.line)
+        if block.language != "console":
+            reader = block.notes.get("input") or f"cat > {block.notes['file']}"
+            prepare(f"{reader} <<'END OF BLOCK'\n{block.text}\nEND OF BLOCK", block.line)
+            count += 1
+            continue
         for command, expected, number in commands_of(block):
-            code, output = shell.run(command)
+            run = on_terminal(command) if "terminal" in block.notes else command
+            if "meanwhile" in block.notes:
+                run = interrupted(command, block.notes["meanwhile"], sum(line.strip() != "..." for line in expected))
+            code, output = shell.run(run)
             count += 1
             if not is_expected(output, expected):
                 problems.append(f"{page}:{number}: $ {command}\n  the page shows:\n    " + "\n    ".join(expected) +
@@ -135,10 +177,11 @@ def run_page(page, shell):
 
 
 def main():
-    page, work, *paths = sys.argv[1:]
-    shell = Shell(Path(page).resolve(), Path(work).resolve(), paths)
-    problems, count = run_page(Path(page), shell)
-    shell.end()
+    page, *paths = sys.argv[1:]
+    with tempfile.TemporaryDirectory() as work:  # outside of this repository, which the tool would find
+        shell = Shell(Path(work), [str(Path(path).resolve()) for path in paths])
+        problems, count = run_page(Path(page), shell)
+        shell.end()
     print("\n".join(problems), f"{count} commands, {len(problems)} problems", sep="\n")
     if not count:
         raise SystemExit(f"{page}: there is no session")
