@@ -20,17 +20,19 @@ from .project import (HistoryLoss, Personal, Project, Snapshot, SourceControl, T
                       is_project, open)
 from .queries import Condition, Layers
 from .references import Edge, FolderReference, Node, ProjectGraph, References
+from .renames import AmbiguousRename, Rename, RenamesFound
 from .scopes import MetadataNode, Scope, Scopes
 from .sync import RemovedFile, SyncPlan, SyncRule, SyncRules
 from .texts import DefinitionChange, Merge, MergeConflict, Side, ValueChange, changes_between, merge
 
 __all__ = [
-    "Categories", "Category", "Change", "Condition", "Connection", "DefinitionChange", "Edge", "EntryPoint",
-    "EntryPointGroup", "EntryPointGroups", "EntryPoints", "Event", "Events", "File", "FileKind", "FileLabels",
-    "Files", "FolderReference", "HistoryLoss", "Ignore", "Label", "LabelState", "Labels", "Layers", "Merge",
-    "MergeConflict", "MetadataNode", "Move", "Node", "Personal", "Project", "ProjectGraph", "RecoveredMoves",
-    "References", "RemovedFile", "Scope", "Scopes", "Side", "Snapshot", "SourceControl", "SyncPlan", "SyncRule",
-    "SyncRules", "Transaction", "ValueChange", "changes_between", "create_shared", "git_ignored", "is_project",
-    "language", "merge", "open", "set_language", "watch",
+    "AmbiguousRename", "Categories", "Category", "Change", "Condition", "Connection", "DefinitionChange",
+    "Edge", "EntryPoint", "EntryPointGroup", "EntryPointGroups", "EntryPoints", "Event", "Events", "File",
+    "FileKind", "FileLabels", "Files", "FolderReference", "HistoryLoss", "Ignore", "Label", "LabelState",
+    "Labels", "Layers", "Merge", "MergeConflict", "MetadataNode", "Move", "Node", "Personal", "Project",
+    "ProjectGraph", "RecoveredMoves", "References", "RemovedFile", "Rename", "RenamesFound", "Scope", "Scopes",
+    "Side", "Snapshot", "SourceControl", "SyncPlan", "SyncRule", "SyncRules", "Transaction", "ValueChange",
+    "changes_between", "create_shared", "git_ignored", "is_project", "language", "merge", "open",
+    "set_language", "watch",
 ]
 __all__ += errors.__all__

@@ -18,6 +18,7 @@ from .files import File, Files, PathArgument
 from .labels import Categories
 from .moves import Move, RecoveredMoves
 from .references import ProjectGraph, References, graph_of
+from .renames import RenamesFound, require_percent
 from .scopes import Scopes
 from .sync import SyncPlan, SyncRules
 
@@ -114,6 +115,14 @@ class Personal:
     def remove_hidden(self) -> list[str]:
         """Deletes the personal labels of these files. Returns the files."""
         return self._project._core.remove_hidden()
+
+    def follow_hidden(self, moves: Mapping[PathArgument, PathArgument]) -> list[Move]:
+        """Lets hidden personal labels follow files that somebody else has moved: old paths to new ones.
+
+        A move is left out if its old path is not hidden, or its new path is not in the project or has personal
+        labels of its own. Returns the moves that were followed.
+        """
+        return [Move(*pair) for pair in self._project._core.follow_hidden(list(moves.items()))]
 
 
 class Project:
@@ -217,6 +226,15 @@ class Project:
         """Lets the definition follow moves on disk that another program has made: old paths to new ones."""
         self._core.adopt(list(moves.items()))
 
+    def find_renames(self, *, similarity: int = 50, uses_git: bool = True) -> RenamesFound:
+        """Pairs the files that are missing on disk with files that are not in the project, for adopt. Changes nothing.
+
+        In a repository, the contents decide: equal ones, and similar ones from this percentage on. Without git,
+        the names do, and each pair is a guess.
+        """
+        require_percent(similarity)
+        return RenamesFound._of(self._core.find_renames(similarity, uses_git))
+
     def take_recovered_moves(self) -> RecoveredMoves | None:
         """The end of a move that another process did not finish. Each is returned once."""
         content = self._core.take_recovered_moves()
@@ -235,9 +253,16 @@ class Project:
         """What sync would change."""
         return SyncPlan._of(self._core.plan_sync(File, self))
 
-    def sync(self, *, removes_missing_folders: bool = False) -> SyncPlan:
-        """Adds the new files of folders with rules, and removes those that are gone. Returns what it changed."""
-        return SyncPlan._of(self._core.sync(File, self, removes_missing_folders))
+    def sync(self, *, removes_missing_folders: bool = False, follows_renames: bool = True,
+             similarity: int = 50) -> SyncPlan:
+        """Adds the new files of folders with rules, and removes those that are gone. Returns what it changed.
+
+        Files that git shows to be renamed keep their labels and entry points, from this similarity of their
+        contents on, in percent. Raises SyncFolderMissing if the folder of a rule is missing or empty, unless
+        removes_missing_folders allows that.
+        """
+        require_percent(similarity)
+        return SyncPlan._of(self._core.sync(File, self, removes_missing_folders, follows_renames, similarity))
 
     def take_history_loss(self) -> HistoryLoss | None:
         """For a shared project: a loss of history that was found since the last call."""

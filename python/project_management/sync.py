@@ -7,6 +7,7 @@ from dataclasses import dataclass
 from typing import TYPE_CHECKING, Any
 
 from .files import File, PathArgument
+from .moves import Move
 
 if TYPE_CHECKING:
     from .project import Project
@@ -26,7 +27,7 @@ class SyncRule:
 
 @dataclass(frozen=True)
 class RemovedFile:
-    """A file that a synchronisation removes, with the number of its labels and the names of its entry points."""
+    """A file that a synchronisation removes, with its labels and the names of its entry points."""
 
     file: File
     labels: tuple[tuple[str, str], ...]  #: as UUIDs of categories and labels
@@ -37,19 +38,22 @@ class RemovedFile:
 class SyncPlan:
     """What a synchronisation changes, or has changed."""
 
+    renamed: tuple[Move, ...]  #: files that the project has followed; plan_sync leaves them in removed and added
     added: tuple[File, ...]
     removed: tuple[RemovedFile, ...]
-    missing: tuple[str, ...]  #: folders with a rule that are missing or empty
+    missing: tuple[str, ...]  #: folders with a rule that are missing or empty, although files below them are listed
+    absent: tuple[str, ...]  #: folders with a rule that do not exist, and below which nothing is listed
     unreadable: tuple[tuple[str, int], ...]  #: folders that could not be read, with the system's error numbers
 
     @classmethod
     def _of(cls, content: tuple[Any, ...]) -> SyncPlan:
-        added, removed, missing, unreadable = content
+        renamed, added, removed, missing, absent, unreadable = content
         files = (RemovedFile(file, tuple(labels), tuple(entries)) for file, labels, entries in removed)
-        return cls(tuple(added), tuple(files), tuple(missing), tuple(unreadable))
+        return cls(tuple(Move(*pair) for pair in renamed), tuple(added), tuple(files), tuple(missing), tuple(absent),
+                   tuple(unreadable))
 
     def __bool__(self) -> bool:
-        return bool(self.added or self.removed)
+        return bool(self.renamed or self.added or self.removed)
 
 
 class SyncRules:

@@ -21,6 +21,7 @@ void bindReferences(ProjectClass& project);
 void bindScopes(ProjectClass& project);
 void bindEvents(pybind11::module_& module, ProjectClass& project);
 void bindMoves(ProjectClass& project);
+void bindRenames(ProjectClass& project);
 void bindSync(ProjectClass& project);
 void bindTexts(pybind11::module_& module);
 

@@ -17,6 +17,7 @@ PYBIND11_MODULE(_core, module) {
     bindScopes(project);
     bindEvents(module, project);
     bindMoves(project);
+    bindRenames(project);
     bindSync(project);
     bindTexts(module);
 }

@@ -29,13 +29,27 @@ py::list move(OpenProject const& project, py::iterable const& sources, py::handl
     return pairsOf(project, project.run([&](Session& session) { return session.move(files, target); }));
 }
 
-void adopt(OpenProject const& project, std::vector<std::pair<py::object, py::object>> const& pairs) {
+/// Old and new paths, as a caller gave them.
+using Pairs = std::vector<std::pair<py::object, py::object>>;
+
+std::vector<Move> movesOf(OpenProject const& project, Pairs const& pairs) {
     std::vector<Move> moves;
     moves.reserve(pairs.size());
     for (auto const& [from, to] : pairs) {
         moves.push_back({project.absolute(from), project.absolute(to)});
     }
+    return moves;
+}
+
+void adopt(OpenProject const& project, Pairs const& pairs) {
+    auto const moves = movesOf(project, pairs);
     project.run([&](Session& session) { session.adopt(moves); });
+}
+
+py::list followHidden(OpenProject const& project, Pairs const& pairs) {
+    auto const moves = movesOf(project, pairs);
+    return pairsOf(project,
+                   project.run([&](Session& session) { return session.personal().followHidden(moves); }));
 }
 
 py::object takeRecovered(OpenProject const& project) {
@@ -52,6 +66,7 @@ py::object takeRecovered(OpenProject const& project) {
 void bindMoves(ProjectClass& project) {
     project.def("move", &move, py::arg("sources"), py::arg("destination"));
     project.def("adopt", &adopt, py::arg("moves"));
+    project.def("follow_hidden", &followHidden, py::arg("moves"));
     project.def("take_recovered_moves", &takeRecovered);
     project.def("has_unfinished_move", [](OpenProject const& open) {
         return open.run([](Session& session) { return session.hasUnfinishedMove(); });

@@ -9,8 +9,10 @@ import re
 import sys
 from pathlib import Path
 
-HEAD = """#include <fstream>
+HEAD = """#include <filesystem>
+#include <fstream>
 #include <iostream>
+#include <vector>
 
 #include <project/metadata/MetadataNodeSpecification.hpp>
 #include <project/session.hpp>
