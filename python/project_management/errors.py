@@ -11,6 +11,8 @@ import errno
 import os
 from typing import ClassVar
 
+from .messages import message
+
 __all__ = [
     "Error", "ProjectException", "FileNotInProject", "FileIsMetadataError", "FileNotInProjectRoot",
     "FileDoesNotExistError", "SyncFolderUnsuitable", "SyncFolderMissing", "RootFolderNotRemoveable",
@@ -18,7 +20,7 @@ __all__ = [
     "CanNotModifyReadOnlyCategory", "CanNotModifyReadOnlyLabel", "CategoryDoesNotExist",
     "CategoryDoesNotExistsByUUID", "CategoryExistsByName", "LabelExistsByName", "LabelDoesNotExistsByUUID",
     "LabelReadOnlyStateUndefined", "DuplicatePathEntryException", "DuplicateReferenceException", "StoreError",
-    "NotAProject", "GitError", "MoveError", "ProjectClosed",
+    "NotAProject", "GitError", "MoveError", "LabelDataInvalid", "ProjectClosed",
 ]
 
 
@@ -39,6 +41,9 @@ class ProjectException(Error):
     #: The names of the attributes with the message's arguments, in their order.
     argument_names: ClassVar[tuple[str, ...]] = ()
 
+    #: Whether they are paths, which have the form of os.fsdecode.
+    has_paths: ClassVar[bool] = False
+
     def __init__(self, text: str, *arguments: str) -> None:
         super().__init__(text)
         self.args = (text, *arguments)
@@ -48,6 +53,7 @@ class ProjectException(Error):
 
 class _OfPath(ProjectException):
     argument_names = ("path",)
+    has_paths = True
 
     #: The file or folder, absolute.
     path: str
@@ -75,6 +81,7 @@ class FileNotInProjectRoot(ProjectException, ValueError):
     """The path is outside the project's root."""
 
     argument_names = ("path", "project_root")
+    has_paths = True
     path: str
     project_root: str
 
@@ -87,6 +94,9 @@ class FileDoesNotExistError(_OfPath, FileNotFoundError):
         self.errno = errno.ENOENT
         self.strerror = os.strerror(errno.ENOENT)
         self.filename = path
+
+    def __reduce__(self) -> tuple[type[FileDoesNotExistError], tuple[str, ...]]:
+        return type(self), (self.text, self.path)  # that of OSError has the file name once more
 
 
 class SyncFolderUnsuitable(_OfPath, ValueError):
@@ -233,5 +243,21 @@ class MoveError(Error):
         self.problem = problem
 
 
+class LabelDataInvalid(Error, ValueError):
+    """The text is not data of the type that the label's category has."""
+
+    def __init__(self, data: str, data_type: str, category: str) -> None:
+        super().__init__(message("LabelDataInvalid", data, data_type, category))
+        self.args = (data, data_type, category)
+        self.data = data
+        self.data_type = data_type
+        #: The name of the category.
+        self.category = category
+
+
 class ProjectClosed(Error, ValueError):
     """The project is closed."""
+
+    def __init__(self) -> None:
+        super().__init__(message("ProjectClosed"))
+        self.args = ()

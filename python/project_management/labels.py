@@ -7,6 +7,7 @@ from collections.abc import Iterable, Iterator, MutableMapping
 from typing import TYPE_CHECKING, overload
 
 from . import _core
+from .errors import LabelDataInvalid
 from .queries import Condition
 
 if TYPE_CHECKING:
@@ -53,7 +54,10 @@ class Label:
         return LabelState(self._values[2])
 
     def put_on(self, paths: Iterable[PathArgument], data: str | None = None) -> None:
-        """Puts the label on files as one step, with data. Without data, files that have it keep theirs."""
+        """Puts the label on files as one step, with data. Without data, files that have it keep theirs.
+
+        Raises LabelDataInvalid if the data does not suit the data type of the category.
+        """
         self.category._require_valid(data)
         self.category._project._core.add_label(self.category._is_personal, paths, self.category._values,
                                                self._values, data)
@@ -152,7 +156,7 @@ class Category:
 
     def _require_valid(self, data: str | None) -> None:
         if data and not self.is_valid_data(data):
-            raise ValueError(f"{data!r} is not data of the type {self.data_type}")
+            raise LabelDataInvalid(data, self.data_type, self.name)
 
     @overload
     def __eq__(self, other: str | Label) -> Condition: ...  # type: ignore[misc]

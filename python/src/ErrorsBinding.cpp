@@ -37,9 +37,18 @@ void raise(char const* name, Arguments&&... arguments) {
     PyErr_SetObject(type.ptr(), type(std::forward<Arguments>(arguments)...).ptr());
 }
 
-py::object argumentOf(resource_core::BaseMsgID::Argument const& argument) {
+/// A name on disk, as os.fsdecode returns it.
+py::str fromNameBytes(std::string const& name) {
+    auto* const result = PyUnicode_DecodeFSDefaultAndSize(name.data(), static_cast<py::ssize_t>(name.size()));
+    if (result == nullptr) {
+        throw py::error_already_set();
+    }
+    return py::reinterpret_steal<py::str>(result);
+}
+
+py::object argumentOf(resource_core::BaseMsgID::Argument const& argument, bool isPath) {
     if (auto const* const text = std::get_if<std::u16string>(&argument)) {
-        return fromUtf16(*text);
+        return isPath ? fromPath(*text) : fromUtf16(*text);
     }
     if (auto const* const bytes = std::get_if<std::string>(&argument)) {
         return fromBytes(*bytes);
@@ -48,11 +57,13 @@ py::object argumentOf(resource_core::BaseMsgID::Argument const& argument) {
 }
 
 py::object errorOf(resource_core::BaseMsgID const& message, std::u16string const& text) {
+    auto const type = errorClass(message.getMessageName().c_str());
+    bool const hasPaths = type.attr("has_paths").cast<bool>();
     py::list arguments;
     for (auto const& argument : message.getArguments()) {
-        arguments.append(argumentOf(argument));
+        arguments.append(argumentOf(argument, hasPaths));
     }
-    return errorClass(message.getMessageName().c_str())(fromUtf16(text), *arguments);
+    return type(fromUtf16(text), *arguments);
 }
 
 /// An error of the catalog: the class has the message's name, and the arguments are those of the message.
@@ -77,17 +88,18 @@ void translate(std::exception_ptr thrown) {
     } catch (foundation::core::except::IMsgIDException const& error) {
         raiseMessage(error);
     } catch (stores::StoreError const& error) {
-        raise("StoreError", fromBytes(error.what()), static_cast<int>(error.kind()), fromBytes(error.file()),
-              error.line(), fromBytes(error.problem()), fromBytes(error.remedy()));
+        raise("StoreError", fromBytes(error.what()), static_cast<int>(error.kind()),
+              fromNameBytes(error.file()), error.line(), fromBytes(error.problem()),
+              fromBytes(error.remedy()));
     } catch (git::GitError const& error) {
-        raise("GitError", fromBytes(error.what()), static_cast<int>(error.kind()), fromBytes(error.file()),
-              fromBytes(error.problem()), fromBytes(error.remedy()));
+        raise("GitError", fromBytes(error.what()), static_cast<int>(error.kind()),
+              fromNameBytes(error.file()), fromBytes(error.problem()), fromBytes(error.remedy()));
     } catch (session::MoveError const& error) {
         raise("MoveError", fromBytes(error.what()), static_cast<int>(error.reason()),
               fromPath(error.move().from.native()), fromPath(error.move().to.native()),
               fromBytes(error.problem()));
-    } catch (ClosedError const& error) {
-        raise("ProjectClosed", error.what());
+    } catch (ClosedError const&) {
+        raise("ProjectClosed");
     } catch (std::filesystem::filesystem_error const& error) {
         raiseSystemError(error, error.path1().c_str());
     } catch (std::system_error const& error) {

@@ -99,11 +99,13 @@ std::vector<FoundFile> findAny(Session& session, std::vector<Query> const& queri
 
 py::list find(OpenProject const& project, py::handle type, py::handle owner,
               std::vector<Alternative> const& alternatives, py::iterable const& below,
-              std::optional<std::u16string> glob, std::optional<int> kind, bool isEntryPoint,
-              bool isUnlabelled, int layers) {
+              std::optional<Path> const& glob, std::optional<int> kind, bool isEntryPoint, bool isUnlabelled,
+              int layers) {
     Query query;
     query.paths = project.absolutes(below);
-    query.glob = std::move(glob);
+    if (glob) {
+        query.glob = glob->native();
+    }
     if (kind) {
         query.kind = static_cast<session::FileKind>(*kind);
     }

@@ -3,11 +3,14 @@
 from __future__ import annotations
 
 import os
+import pickle
 import subprocess
 import sys
 import threading
 from pathlib import Path
 
+import networkx  # type: ignore[import]
+import pandas  # type: ignore[import]
 import project_management as pm
 import pytest
 
@@ -31,8 +34,10 @@ def test_data_must_suit_the_data_type(p: pm.Project) -> None:
     logical = p.categories.create("Checked", data_type="Logical")
     label = logical.labels.create("By hand")
     assert logical.is_valid_data("true") and not logical.is_valid_data("yes")
-    with pytest.raises(ValueError):
+    with pytest.raises(ValueError) as caught:
         label.put_on(["readme.md"], "yes")
+    assert isinstance(caught.value, pm.LabelDataInvalid)
+    assert (caught.value.data, caught.value.data_type, caught.value.category) == ("yes", "Logical", "Checked")
     assert len(p.files["readme.md"].labels) == 0
 
 
@@ -106,7 +111,6 @@ def test_entry_points_are_a_mapping(p: pm.Project) -> None:
 
 
 def test_references_form_a_graph(p: pm.Project, tmp_path: Path) -> None:
-    pandas, networkx = pytest.importorskip("pandas"), pytest.importorskip("networkx")
     (tmp_path / "library").mkdir()
     with pm.open(tmp_path / "engine/../library", create_as="Library") as library:
         library.references.add(p.root)
@@ -271,6 +275,58 @@ def test_the_language_can_be_chosen(p: pm.Project) -> None:
         pm.set_language(before)
 
 
+GERMAN = """
+import sys, project_management as pm
+for name in pm.errors.__all__:
+    assert issubclass(getattr(pm, name), pm.Error), name
+
+def shown(error, function, *arguments):
+    try:
+        function(*arguments)
+    except error as raised:
+        print(raised)
+    else:
+        raise AssertionError("no error")
+
+with pm.open(sys.argv[1]) as p:
+    shown(pm.FileDoesNotExistError, p.files.add, "nowhere")
+    shown(pm.CategoryExistsByName, p.categories.create, p.categories.create("Status", data_type="Logical").name)
+    label = p.categories["Status"].labels.create("Open")
+    shown(pm.LabelDataInvalid, label.put_on, ["readme.md"], "yes")
+    p.references.add("../library")
+    shown(pm.DuplicateReferenceException, p.references.add, "../library")
+    shown(pm.SyncFolderUnsuitable, p.sync_rules.set, "nowhere")
+shown(pm.ProjectClosed, p.refresh)
+"""
+
+
+def test_every_error_of_the_package_and_of_the_catalog_is_german(p: pm.Project) -> None:
+    done = subprocess.run([sys.executable, "-X", "utf8", "-c", GERMAN, p.root], check=True, capture_output=True,
+                          encoding="utf-8", env=os.environ | {"LC_ALL": "de_DE.UTF-8"})
+    texts = done.stdout.splitlines()
+    assert len(texts) == 6
+    for text, german in zip(texts, ("Projekt", "Kategorie", "kein Wert vom Typ", "verwiesen", "Ordner", "geschlossen")):
+        assert german in text
+
+
+def test_the_package_has_each_of_its_messages_in_both_languages() -> None:
+    from project_management import messages
+    assert messages._ENGLISH.keys() == messages._GERMAN.keys()
+    assert {name for name in pm.errors.__all__ if name in messages._ENGLISH} == set(messages._ENGLISH)
+
+
+def test_errors_survive_pickling(p: pm.Project) -> None:
+    """They come back from other processes, for example those of concurrent.futures."""
+    p.close()
+    errors = [pm.FileDoesNotExistError("text", "/path"), pm.FileNotInProjectRoot("text", "/path", "/root"),
+              pm.StoreError("text", 1, "file", 3, "problem", "remedy"), pm.NotAProject("text", 0, "file", 0, "", ""),
+              pm.GitError("text", 1, "file", "problem", "remedy"), pm.MoveError("text", 3, "/from", "/to", ""),
+              pm.LabelDataInvalid("yes", "Logical", "Checked"), pm.ProjectClosed()]
+    for error in errors:
+        copy = pickle.loads(pickle.dumps(error))
+        assert type(copy) is type(error) and str(copy) == str(error) and vars(copy) == vars(error)
+
+
 def test_a_closed_project_says_so(folder: Path) -> None:
     with pm.open(folder, create_as="Engine") as p:
         transaction = p.transaction()
@@ -279,4 +335,4 @@ def test_a_closed_project_says_so(folder: Path) -> None:
         with pytest.raises(pm.ProjectClosed):
             use()
     p.close()
-    assert p.is_closed and "closed" in repr(p) and isinstance(pm.ProjectClosed("x"), ValueError)
+    assert p.is_closed and "closed" in repr(p) and issubclass(pm.ProjectClosed, ValueError)
