@@ -3,13 +3,15 @@
 
     files.py PROGRAM [FILES] [ROUNDS]     PROGRAM is the target project_python_benchmark, of the build of the module
 
-Each round runs all of them in random order, in new processes and folders. Prints the medians as a table of Markdown.
+Each round runs all of them in random order, each in a new process and a new project. Prints the medians as a table of
+Markdown.
 """
 
 from __future__ import annotations
 
 import os
 import random
+import shutil
 import sqlite3
 import statistics
 import subprocess
@@ -70,13 +72,19 @@ def run_sqlite(folder: str, paths: list[str]) -> None:
         "SELECT path, folder FROM labels JOIN files USING (path) WHERE label = 'Reviewed' ORDER BY path").fetchall()))
 
 
-def times(command: list[str], paths: list[str]) -> dict[str, tuple[float, int]]:
-    with tempfile.TemporaryDirectory() as folder:
-        for path in paths:
-            Path(folder, path).parent.mkdir(parents=True, exist_ok=True)
-            Path(folder, path).touch()
-        shown = subprocess.run([*command, folder], input="\n".join(paths) + "\n", text=True, check=True,
-                               stdout=subprocess.PIPE).stdout
+def create(folder: str, paths: list[str]) -> None:
+    for above in {os.path.dirname(path) for path in paths}:
+        os.makedirs(os.path.join(folder, above))
+    for path in paths:
+        os.close(os.open(os.path.join(folder, path), os.O_CREAT | os.O_WRONLY))
+
+
+def times(command: list[str], folder: str, paths: list[str]) -> dict[str, tuple[float, int]]:
+    shown = subprocess.run([*command, folder], input="\n".join(paths) + "\n", text=True, check=True,
+                           stdout=subprocess.PIPE).stdout
+    shutil.rmtree(os.path.join(folder, ".projectdata"), ignore_errors=True)
+    for database in Path(folder).glob("files.db*"):
+        database.unlink()
     lines = (line.split() for line in shown.splitlines())
     return {name: (float(seconds), int(count)) for name, seconds, count in lines}
 
@@ -87,13 +95,15 @@ def main() -> None:
     commands = {"module": [sys.executable, __file__, "--module"], "C++": [sys.argv[1]],
                 "sqlite3": [sys.executable, __file__, "--sqlite"]}
     results: dict[tuple[str, str], list[float]] = {}
-    for _ in range(rounds):
-        counts: dict[str, set[int]] = {}
-        for name in random.sample(list(commands), len(commands)):
-            for operation, (seconds, count) in times(commands[name], paths).items():
-                results.setdefault((name, operation), []).append(seconds)
-                counts.setdefault(operation, set()).add(count)
-        assert all(len(each) == 1 for each in counts.values()), f"they do not do the same: {counts}"
+    with tempfile.TemporaryDirectory() as folder:
+        create(folder, paths)
+        for _ in range(rounds):
+            counts: dict[str, set[int]] = {}
+            for name in random.sample(list(commands), len(commands)):
+                for operation, (seconds, count) in times(commands[name], folder, paths).items():
+                    results.setdefault((name, operation), []).append(seconds)
+                    counts.setdefault(operation, set()).add(count)
+            assert all(len(each) == 1 for each in counts.values()), f"they do not do the same: {counts}"
     print(f"| {files:,} files | module | C++ | ratio | sqlite3 | ratio |\n|---|--:|--:|--:|--:|--:|")
     for operation, title in OPERATIONS.items():
         module, cpp, sqlite = (statistics.median(results[name, operation]) for name in ("module", "C++", "sqlite3"))

@@ -65,6 +65,25 @@ PyMemberDef fileMembers[] = {
     {nullptr, 0, 0, 0, nullptr},
 };
 
+/// Keeps the collector of garbage from running as long as it exists. Each of its runs would visit the objects
+/// of a list that grows, none of which is garbage.
+class WithoutCollector {
+public:
+    WithoutCollector() : wasEnabled_(PyGC_Disable() != 0) {}
+
+    WithoutCollector(WithoutCollector const&) = delete;
+    WithoutCollector& operator=(WithoutCollector const&) = delete;
+
+    ~WithoutCollector() {
+        if (wasEnabled_) {
+            PyGC_Enable();
+        }
+    }
+
+private:
+    bool wasEnabled_;
+};
+
 template <typename Function>
 void* slot(Function* function) {
     return reinterpret_cast<void*>(function);
@@ -99,6 +118,7 @@ FileObjects::FileObjects(OpenProject const& open, py::handle type, py::handle pr
 }
 
 py::list FileObjects::of(std::vector<session::FoundFile> const& files) const {
+    WithoutCollector const withoutCollector;
     py::list result(files.size());
     for (std::size_t i = 0; i < files.size(); ++i) {
         PyList_SET_ITEM(result.ptr(), static_cast<py::ssize_t>(i), create(files[i]).release().ptr());

@@ -97,6 +97,7 @@ Path OpenProject::inFormOfRoot(std::u16string path) const {
     if (isWithin(path, root_.native())) {
         return path;
     }
+    WithoutGil const withoutGil; // what follows asks the disk
     try {
         auto const folder = fl::filesystem::canonical(metadata::getParentFolder(Path(path)), Path());
         auto const name = path.substr(path.rfind(u'/') + 1);
