@@ -8,6 +8,8 @@
 #include <system_error>
 #include <utility>
 
+#include "texts/ErrorTexts.hpp"
+
 namespace cmlink {
 
 /// The state that all threads share: the threads that have the lock, and those that are next. A thread
@@ -171,7 +173,7 @@ ReentrantReadWriteLock::LockGuard ReentrantReadWriteLock::acquire(Access access)
         if (access == Access::Write && held->access == Access::Read) {
             // Two threads that read and wait for the write lock would wait for each other forever.
             throw std::system_error(std::make_error_code(std::errc::resource_deadlock_would_occur),
-                                    "A thread with a read guard cannot wait for the write lock");
+                                    fl::i18n::errorTexts.get("ReaderWantsToWrite"));
         }
         ++held->guards;
         return LockGuard(*this);

@@ -7,6 +7,7 @@
 #include "fl/filesystem/Path.hpp"
 #include "fl/filesystem/SystemName.hpp"
 #include "fl/i18n/Utf8.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace fl::filesystem {
 
@@ -40,8 +41,7 @@ std::filesystem::path toSystem(Path const& path) {
     std::string bytes(3 * text.size() + 3, '\0');
     std::optional<std::size_t> const length = encodeName(text, bytes);
     if (!length) {
-        throw std::filesystem::filesystem_error("This path cannot be the name of a file",
-                                                fl::i18n::toUtf8(text),
+        throw std::filesystem::filesystem_error(i18n::errorTexts.get("NotAName"), fl::i18n::toUtf8(text),
                                                 std::make_error_code(std::errc::illegal_byte_sequence));
     }
     bytes.resize(*length);
