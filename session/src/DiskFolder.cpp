@@ -15,6 +15,7 @@
 #include "fl/filesystem/SystemName.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::session {
 
@@ -74,7 +75,7 @@ std::u16string toText(std::string_view name) {
 
 [[noreturn]] void fail(Path const& folder, int error) {
     throw std::system_error(error, std::generic_category(),
-                            "the folder \"" + fl::i18n::toUtf8(folder.native()) + "\" cannot be read");
+                            errorTexts.get("FolderUnreadable", fl::i18n::toUtf8(folder.native())));
 }
 
 } // namespace

@@ -2,6 +2,7 @@
 
 #include "fl/i18n/Utf8.hpp"
 #include "project/session/Move.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::session {
 
@@ -9,32 +10,33 @@ namespace {
 
 using Reason = MoveError::Reason;
 
+/// The name of the text.
 char const* textOf(Reason reason) {
     switch (reason) {
     case Reason::IsRoot:
-        return "the project's own folder cannot be moved";
+        return "MoveOfRoot";
     case Reason::IsMissing:
-        return "the file is not on disk";
+        return "MoveOfMissing";
     case Reason::IsNested:
-        return "the folder above it moves as well";
+        return "MoveNested";
     case Reason::Exists:
-        return "there is a file or folder already";
+        return "MoveOntoExisting";
     case Reason::IsInProject:
-        return "the path is in the project already";
+        return "MoveOntoListed";
     case Reason::LeavesProject:
-        return "the path is outside the project's folder";
+        return "MoveOutOfProject";
     case Reason::EntersStore:
-        return "the path is in the folder of the project's definition";
+        return "MoveIntoStore";
     case Reason::EntersItself:
-        return "a folder cannot be moved into itself";
+        return "MoveIntoItself";
     case Reason::HasNoFolder:
-        return "there is no folder";
+        return "MoveWithoutFolder";
     case Reason::IsBeyondLink:
-        return "there is a symbolic link above the path";
+        return "MoveBeyondLink";
     case Reason::IsOtherFileSystem:
-        return "the path is on another file system";
+        return "MoveToOtherFileSystem";
     case Reason::DiskFailed:
-        return "the file cannot be moved";
+        return "MoveFailed";
     }
     return "";
 }
@@ -44,8 +46,9 @@ char const* textOf(Reason reason) {
 MoveError::MoveError(Reason reason, Move move, std::string problem)
     : reason_(reason), move_(std::move(move)), problem_(std::move(problem)) {
     getStackTrace().capture(0);
+    std::string const clause = errorTexts.get(textOf(reason_)) + (problem_.empty() ? "" : ": " + problem_);
     text_ = fl::i18n::toUtf8(move_.from.native()) + " -> " + fl::i18n::toUtf8(move_.to.native()) + ": " +
-            textOf(reason_) + (problem_.empty() ? "" : ": " + problem_) + '.';
+            clause + '.';
 }
 
 } // namespace project::session

@@ -13,6 +13,7 @@
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
 #include "project/stores/TextBackend.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::session {
 
@@ -39,8 +40,8 @@ Session Session::create(Path const& root, std::u16string const& name, Options op
     Session result(std::make_unique<State>(root, options));
     if (!result.state_->createProject(name)) {
         throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(result.root().native()),
-                                 0, "there is a project in this folder already",
-                                 "Open it, or choose another folder.");
+                                 0, errorTexts.get("ProjectExists"),
+                                 errorTexts.get("RemedyOfExistingProject"));
     }
     return result;
 }

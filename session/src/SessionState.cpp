@@ -17,6 +17,7 @@
 #include "fl/i18n/Utf8.hpp"
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::session {
 
@@ -103,7 +104,7 @@ void Session::State::requireProject() const {
     auto const status = std::filesystem::symlink_status(fl::filesystem::toSystem(stored.file()), error);
     if (status.type() == std::filesystem::file_type::not_found) {
         throw StoreError(StoreError::Kind::Refused, fl::i18n::toUtf8(root.native()), 0,
-                         "there is no project in this folder", "Check the path, or create a project there.");
+                         errorTexts.get("ProjectMissing"), errorTexts.get("RemedyOfMissingProject"));
     }
 }
 

@@ -7,6 +7,7 @@
 #include "SessionState.hpp"
 #include "fl/i18n/Utf8.hpp"
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::session {
 
@@ -31,8 +32,7 @@ stores::JournalBackend* ToolAccess::log() noexcept {
 stores::TextBackend& ToolAccess::text() {
     if (state_.stored.text() == nullptr) {
         throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(state_.root.native()), 0,
-                                 "is stored on a server, and this works on a text only",
-                                 "\"projectctl shared\" has the commands for such a project.");
+                                 errorTexts.get("NotAText"), errorTexts.get("RemedyOfServer"));
     }
     return *state_.stored.text();
 }

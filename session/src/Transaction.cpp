@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "ChangeStep.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::session {
 
@@ -16,7 +17,7 @@ Transaction::~Transaction() = default;
 
 void Transaction::commit() {
     if (!step_) {
-        throw std::logic_error("a transaction was committed that has been moved from");
+        throw std::logic_error(errorTexts.get("TransactionMoved"));
     }
     step_->commit();
 }

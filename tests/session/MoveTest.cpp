@@ -12,8 +12,10 @@
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/metadata/ProjectException.hpp"
 #include "project/session.hpp"
+#include "project/stores/StoreError.hpp"
 #include "support/EventLog.hpp"
 #include "support/GitFolder.hpp"
+#include "support/GlobalLocale.hpp"
 #include "support/TemporaryFolder.hpp"
 
 namespace project::session {
@@ -492,6 +494,34 @@ TEST_F(Moves, aRecordThatWasCopiedWithAFolderMovesNothing) {
     EXPECT_TRUE(isOnDisk("a"));
     EXPECT_FALSE(session.hasUnfinishedMove());
     EXPECT_EQ(session.takeRecoveredMoves(), std::nullopt);
+}
+
+TEST_F(Moves, anErrorIsInTheLanguageOfTheProcess) {
+    add({u"gone"});
+    std::filesystem::remove(folder.onDisk() / "gone");
+    test::GlobalLocale const language("de_DE");
+    auto const from = (folder.onDisk() / "gone").string();
+    auto const to = (folder.onDisk() / "back").string();
+
+    try {
+        move({u"gone"}, u"back");
+        FAIL() << "nothing was thrown";
+    } catch (MoveError const& error) {
+        EXPECT_EQ(error.what(), from + " -> " + to + ": die Datei ist nicht auf der Festplatte.");
+    }
+}
+
+TEST_F(Moves, theErrorOfTheSessionIsInTheLanguageOfTheProcess) {
+    test::GlobalLocale const language("de_DE");
+    test::TemporaryFolder const empty;
+
+    try {
+        Session::open(empty.root());
+        FAIL() << "nothing was thrown";
+    } catch (stores::StoreError const& error) {
+        EXPECT_EQ(error.problem(), "in diesem Ordner gibt es kein Projekt");
+        EXPECT_EQ(error.remedy(), "Prüfen Sie den Pfad, oder legen Sie dort ein Projekt an.");
+    }
 }
 
 } // namespace

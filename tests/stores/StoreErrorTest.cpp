@@ -1,8 +1,12 @@
 #include "project/stores/StoreError.hpp"
 
+#include <cerrno>
 #include <type_traits>
 
+#include "disk/SystemError.hpp"
 #include "project/metadata/ProjectException.hpp"
+#include "support/GlobalLocale.hpp"
+#include "text/ProjectText.hpp"
 
 namespace project::stores {
 namespace {
@@ -51,6 +55,39 @@ TEST(StoreError, isCaughtAsAStandardExceptionButNotAsAnErrorOfTheProject) {
             }
         },
         StoreError);
+}
+
+/// The error of a full disk.
+std::string fullDisk() {
+    try {
+        throwSystemError("/p/project.jsonl", "CannotWrite", ENOSPC);
+    } catch (StoreError const& error) {
+        return error.what();
+    }
+}
+
+TEST(StoreError, isEnglishUntilALanguageIsChosen) {
+    EXPECT_EQ(fullDisk(), "/p/project.jsonl: cannot be written: No space left on device. "
+                          "Make room on the disk and try again.");
+}
+
+TEST(StoreError, isInTheLanguageOfTheProcess) {
+    test::GlobalLocale const language("de_DE");
+
+    EXPECT_EQ(fullDisk(), "/p/project.jsonl: kann nicht geschrieben werden: No space left on device. "
+                          "Schaffen Sie Platz auf der Festplatte, und versuchen Sie es noch einmal.");
+}
+
+TEST(Fault, isInTheLanguageOfTheProcess) {
+    std::string text = ProjectText::empty().body();
+    text.insert(text.find('\n') + 1, "nonsense\n");
+    test::GlobalLocale const language("de_DE");
+
+    auto const read = ProjectText::read(text, "project.jsonl");
+
+    ASSERT_TRUE(read);
+    ASSERT_EQ(read->faults().size(), 1u);
+    EXPECT_EQ(read->faults()[0].problem, "die Zeile ist kein gültiges JSON");
 }
 
 } // namespace

@@ -12,6 +12,7 @@
 #include "journal/ProjectLock.hpp"
 #include "journal/ServerSession.hpp"
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::postgresql {
 
@@ -125,9 +126,8 @@ public:
         auto bytes = isThere ? readPieces(answers[1], answers[0].number(0, 0)) : std::nullopt;
         if (!bytes) {
             throw StoreError(StoreError::Kind::Damaged, where_, 0,
-                             "the body of version " + version +
-                                 (isThere ? " is unreadable or incomplete" : " is not on the server"),
-                             "Ask the owner of the project to restore it from a backup.");
+                             errorTexts.get(isThere ? "BodyUnreadable" : "BodyMissing", version),
+                             errorTexts.get("RemedyOfMissingBody"));
         }
         return std::move(*bytes);
     }
@@ -163,8 +163,8 @@ public:
         auto const deadline = session_.deadline();
         auto const answers = run(deadline, [&] { return session_.run({{isOwner, {}}}, deadline); });
         if (answers[0].rows() == 0 || answers[0].number(0, 0) == 0) {
-            throw StoreError(StoreError::Kind::Refused, where_, 0,
-                             "only the owner of the project may do this", "Ask the owner.");
+            throw StoreError(StoreError::Kind::Refused, where_, 0, errorTexts.get("OwnerOnly"),
+                             errorTexts.get("RemedyOfOwnerOnly"));
         }
     }
 
@@ -194,8 +194,8 @@ private:
                 return std::move(*result);
             }
             if (deadline.isOver()) { // somebody replaces the body again and again
-                throw StoreError(StoreError::Kind::Busy, where_, 0, "the project changed while it was read",
-                                 "Try again.");
+                throw StoreError(StoreError::Kind::Busy, where_, 0, errorTexts.get("ChangedMeanwhile"),
+                                 errorTexts.get("TryAgain"));
             }
         }
     }

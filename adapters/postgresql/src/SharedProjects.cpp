@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "fl/i18n/MessageCatalog.hpp"
 #include "journal/ProjectId.hpp"
 #include "journal/ServerSession.hpp"
 #include "project/postgresql/PostgresJournal.hpp"
@@ -119,7 +120,8 @@ std::unique_ptr<stores::Journal> SharedProjects::open(std::string const& id) con
 
 } // namespace project::postgresql
 
-project::stores::SharedServer* project_make_shared_server(char const* service) {
+project::stores::SharedServer* project_make_shared_server(char const* service, char const* locale) {
+    fl::i18n::MessageCatalog::setGlobalLocale(locale);
     project::postgresql::ServiceSettings settings;
     settings.service = service;
     return new project::postgresql::SharedProjects(std::move(settings)); // owned by the caller

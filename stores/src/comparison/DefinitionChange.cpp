@@ -10,6 +10,7 @@
 #include "project/stores/StoreError.hpp"
 #include "text/TextDifference.hpp"
 #include "text/TextReader.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -24,8 +25,7 @@ TextBody readVersion(std::string_view text, char const* name) {
     }
     auto reading = readText(std::string(text), name);
     if (!reading) {
-        throw StoreError(StoreError::Kind::Damaged, name, 0, "the text ends before the last line of its body",
-                         "");
+        throw StoreError(StoreError::Kind::Damaged, name, 0, errorTexts.get("TextUnfinished"), "");
     }
     bool const isTidy = reading->isCanonical && reading->content.overlay().empty();
     return isTidy ? std::move(reading->content.body()) : reading->content.write({});

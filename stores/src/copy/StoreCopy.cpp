@@ -9,6 +9,7 @@
 #include "journal/UnfinishedCopy.hpp"
 #include "project/stores/StoreError.hpp"
 #include "text/ProjectText.hpp"
+#include "texts/ErrorTexts.hpp"
 #include "writing/StoreFiles.hpp"
 
 namespace project::stores {
@@ -34,8 +35,8 @@ void ignoreFilesOfBothKinds(Disk& disk, FileChanges& changes) {
 }
 
 [[noreturn]] void throwTaken(Disk const& disk, char const* name) {
-    throw StoreError(StoreError::Kind::Refused, disk.folder() + '/' + name, 0, "exists already",
-                     "Move it to another place.");
+    throw StoreError(StoreError::Kind::Refused, disk.folder() + '/' + name, 0,
+                     errorTexts.get("ExistsAlready"), errorTexts.get("RemedyOfExisting"));
 }
 
 /// Deletes the new file again, unless the old one was set aside already.
@@ -69,8 +70,8 @@ void exchange(Disk& disk, std::string const& temporary, char const* fresh, std::
             throw;
         }
         throw StoreError(StoreError::Kind::OutcomeUnknown, error.file(), 0,
-                         "the folder may lead to the copy or not: " + error.problem(),
-                         "The next command will show it.");
+                         errorTexts.get("CopyUncertain", error.problem()),
+                         errorTexts.get("RemedyOfUncertainCopy"));
     }
     changes.added.push_back(pathIn(disk, fresh));
     changes.removed.push_back(pathIn(disk, old));
@@ -83,9 +84,8 @@ std::string canonicalText(Disk& disk) {
     auto const file = StoreFiles::pathOfText(disk);
     auto const text = content ? ProjectText::read(content->bytes, file) : std::nullopt;
     if (!text || text->hasFault(Fault::Kind::Damage) || text->hasFault(Fault::Kind::Conflict)) {
-        throw StoreError(StoreError::Kind::Damaged, file, 0,
-                         "is missing, incomplete, damaged or contains conflicts",
-                         "Repair it with \"projectctl check --repair\" or \"projectctl resolve\" first.");
+        throw StoreError(StoreError::Kind::Damaged, file, 0, errorTexts.get("CopyOfFaulty"),
+                         errorTexts.get("RemedyOfFaultyCopy"));
     }
     return text->rewrittenWith({}).body();
 }
@@ -101,7 +101,7 @@ FileChanges replaceTextByLocation(Disk& disk, SharedLocation const& location) {
 FileChanges replaceLocationByText(Disk& disk, std::string_view text) {
     FileChanges changes;
     if (!disk.openFolder()) {
-        throw StoreError(StoreError::Kind::Refused, disk.folder(), 0, "does not exist", "");
+        throw StoreError(StoreError::Kind::Refused, disk.folder(), 0, errorTexts.get("DoesNotExist"), "");
     }
     FolderGuard const guard(disk);
     ignoreFilesOfBothKinds(disk, changes);

@@ -9,6 +9,7 @@
 #include <unistd.h>
 
 #include "disk/SystemError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -49,9 +50,8 @@ private:
 
 void requireReadableLength(std::uint64_t length, std::string const& name) {
     if (length > Disk::longestFile) {
-        throw StoreError(StoreError::Kind::Damaged, name, 0,
-                         "is longer than 1 GiB, the limit for a project's text",
-                         "Move it away, and restore the project's own file.");
+        throw StoreError(StoreError::Kind::Damaged, name, 0, errorTexts.get("TooLong"),
+                         errorTexts.get("RestoreOwnFile"));
     }
 }
 
@@ -105,20 +105,19 @@ FileIdentity identifyOpenFile(int file, std::string const& name) {
     struct stat status {};
 
     if (::fstat(file, &status) != 0) {
-        throwSystemError(name, "cannot be examined", errno);
+        throwSystemError(name, "CannotExamine", errno);
     }
     if (!S_ISREG(status.st_mode)) {
-        throw StoreError(StoreError::Kind::Damaged, name, 0, "is not a regular file",
-                         "Move it away, and restore the project's own file.");
+        throw StoreError(StoreError::Kind::Damaged, name, 0, errorTexts.get("NotAFile"),
+                         errorTexts.get("RestoreOwnFile"));
     }
     return toIdentity(status);
 }
 
 void requireWritableLength(std::uint64_t length, std::string const& name) {
     if (length > Disk::longestFile) {
-        throw StoreError(StoreError::Kind::Refused, name, 0,
-                         "would become longer than 1 GiB, the limit for a project's text",
-                         "Split the project.");
+        throw StoreError(StoreError::Kind::Refused, name, 0, errorTexts.get("WouldBeTooLong"),
+                         errorTexts.get("RemedyOfLength"));
     }
 }
 
@@ -136,7 +135,7 @@ std::string readFrom(int file, std::uint64_t offset, std::uint64_t expectedSize,
                            static_cast<off_t>(offset + length));
         });
         if (count < 0) {
-            throwSystemError(name, "cannot be read", errno);
+            throwSystemError(name, "CannotRead", errno);
         }
         if (count == 0) {
             break;
@@ -156,7 +155,7 @@ void writeAll(int file, std::string_view bytes, std::string const& name) {
     while (!bytes.empty()) {
         auto const count = repeatWhenInterrupted([&] { return ::write(file, bytes.data(), bytes.size()); });
         if (count < 0) {
-            throwSystemError(name, "cannot be written", errno);
+            throwSystemError(name, "CannotWrite", errno);
         }
         bytes.remove_prefix(static_cast<std::size_t>(count));
     }

@@ -15,6 +15,7 @@
 
 #include "disk/QueuePlace.hpp"
 #include "disk/SystemError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -34,7 +35,7 @@ constexpr auto longestDelayOfFirst = std::chrono::milliseconds(200);
 bool tryLock(int folder, std::string const& name) {
     int const result = repeatWhenInterrupted([folder] { return ::flock(folder, LOCK_EX | LOCK_NB); });
     if (result != 0 && errno != EWOULDBLOCK) {
-        throwSystemError(name, "cannot be locked", errno);
+        throwSystemError(name, "CannotLock", errno);
     }
     return result == 0;
 }
@@ -166,7 +167,8 @@ std::string findLockHolder(int folder) {
         words >> number >> kind >> advisory >> access >> process >> place;
         if (kind == "FLOCK" && isLockOn(place, status)) {
             std::string const command = commandOf(process);
-            return "process " + process + (command.empty() ? "" : " (" + command + ")");
+            return command.empty() ? errorTexts.get("LockHolder", process)
+                                   : errorTexts.get("LockHolderNamed", process, command);
         }
     }
     return {};

@@ -15,6 +15,7 @@
 #include "disk/ForkSafeDescriptor.hpp"
 #include "disk/SystemError.hpp"
 #include "disk/SystemFolder.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -32,7 +33,7 @@ std::optional<FileIdentity> identifyIn(int folder, std::string const& path, std:
         if (errno == ENOENT || errno == ENOTDIR) {
             return std::nullopt;
         }
-        throwSystemError(name, "cannot be examined", errno);
+        throwSystemError(name, "CannotExamine", errno);
     }
     return toIdentity(status);
 }
@@ -141,10 +142,10 @@ bool SystemDisk::openFile(ForkSafeDescriptor& file, std::string const& name, int
     }
     if (errno == ELOOP || errno == ENXIO) { // a link, or a pipe without a reader
         throw StoreError(StoreError::Kind::Damaged, folder_.pathOf(name), 0,
-                         errno == ELOOP ? "is a symbolic link" : "is not a regular file",
-                         "Move it away, and restore the project's own file.");
+                         errorTexts.get(errno == ELOOP ? "IsLink" : "NotAFile"),
+                         errorTexts.get("RestoreOwnFile"));
     }
-    throwSystemError(folder_.pathOf(name), "cannot be opened", errno);
+    throwSystemError(folder_.pathOf(name), "CannotOpen", errno);
 }
 
 std::optional<FileContent> SystemDisk::read(std::string const& name, std::uint64_t offset) {
@@ -185,7 +186,7 @@ WrittenFile SystemDisk::create(std::string const& name, std::string_view bytes,
     int const flags = O_WRONLY | O_CREAT | O_EXCL | safely;
     writtenName_ = folder_.pathOf(name);
     if (!written_.open([&] { return ::openat(folder, name.c_str(), flags, 0666); })) {
-        throwSystemError(writtenName_, "cannot be created", errno);
+        throwSystemError(writtenName_, "CannotCreate", errno);
     }
     try {
         if (like) {
@@ -196,7 +197,7 @@ WrittenFile SystemDisk::create(std::string const& name, std::string_view bytes,
         if (auto const created = stamp(written_.get())) {
             return *created;
         }
-        throwSystemError(writtenName_, "cannot be examined", errno);
+        throwSystemError(writtenName_, "CannotExamine", errno);
     } catch (...) {
         written_.close();
         ::unlinkat(folder, name.c_str(), 0);
@@ -210,7 +211,7 @@ void SystemDisk::sync() {
     int const syncError = synced != 0 ? errno : 0;
     int const closeError = written_.close(); // some file systems report a full disk only here
     if (syncError != 0 || closeError != 0) {
-        throwSystemError(writtenName_, "cannot be synced", syncError != 0 ? syncError : closeError);
+        throwSystemError(writtenName_, "CannotSync", syncError != 0 ? syncError : closeError);
     }
 }
 
@@ -220,7 +221,7 @@ bool SystemDisk::exchange(std::string const& left, std::string const& right) {
         return true;
     }
     if (!isUnsupported(errno)) {
-        throwSystemError(folder_.pathOf(right), "cannot be replaced", errno);
+        throwSystemError(folder_.pathOf(right), "CannotReplace", errno);
     }
     return false;
 }
@@ -228,7 +229,7 @@ bool SystemDisk::exchange(std::string const& left, std::string const& right) {
 void SystemDisk::rename(std::string const& from, std::string const& to) {
     int const folder = folder_.get();
     if (::renameat(folder, from.c_str(), folder, to.c_str()) != 0) {
-        throwSystemError(folder_.pathOf(to), "cannot be replaced", errno);
+        throwSystemError(folder_.pathOf(to), "CannotReplace", errno);
     }
 }
 
@@ -245,7 +246,7 @@ bool SystemDisk::renameToFree(std::string const& from, std::string const& to) {
         result = ::renameat(folder, from.c_str(), folder, to.c_str());
     }
     if (result != 0 && errno != EEXIST) {
-        throwSystemError(folder_.pathOf(to), "cannot be created", errno);
+        throwSystemError(folder_.pathOf(to), "CannotCreate", errno);
     }
     return result == 0;
 }
@@ -255,7 +256,7 @@ bool SystemDisk::remove(std::string const& name) {
         return true;
     }
     if (errno != ENOENT) {
-        throwSystemError(folder_.pathOf(name), "cannot be deleted", errno);
+        throwSystemError(folder_.pathOf(name), "CannotDelete", errno);
     }
     return false;
 }
@@ -263,7 +264,7 @@ bool SystemDisk::remove(std::string const& name) {
 void SystemDisk::syncFolder() {
     int const folder = folder_.get();
     if (repeatWhenInterrupted([folder] { return ::fsync(folder); }) != 0) {
-        throwSystemError(folder_.path(), "cannot be synced", errno);
+        throwSystemError(folder_.path(), "CannotSync", errno);
     }
 }
 
@@ -276,7 +277,7 @@ std::vector<std::string> SystemDisk::list() {
         if (opened >= 0) {
             ::close(opened);
         }
-        throwSystemError(folder_.path(), "cannot be listed", error);
+        throwSystemError(folder_.path(), "CannotList", error);
     }
     std::unique_ptr<DIR, decltype([](DIR* folder) { ::closedir(folder); })> const closing(stream);
     std::vector<std::string> names;
@@ -289,7 +290,7 @@ std::vector<std::string> SystemDisk::list() {
         errno = 0;
     }
     if (errno != 0) {
-        throwSystemError(folder_.path(), "cannot be listed", errno);
+        throwSystemError(folder_.path(), "CannotList", errno);
     }
     return names;
 }

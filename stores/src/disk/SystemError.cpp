@@ -3,56 +3,57 @@
 #include <cerrno>
 #include <system_error>
 
+#include "texts/ErrorTexts.hpp"
+
 namespace project::stores {
 
 namespace {
 
+/// The name of the text.
 char const* remedyFor(int error) {
     switch (error) {
     case ENOSPC:
-        return "Make room on the disk and try again.";
+        return "RemedyOfFullDisk";
     case EDQUOT:
-        return "Make room within the quota and try again.";
+        return "RemedyOfQuota";
     case EFBIG:
-        return "Raise the limit on the size of files (ulimit -f) and try again.";
+        return "RemedyOfFileLimit";
     case EACCES:
     case EPERM:
-        return "Check the owner and the permissions of the file and of its folder.";
+        return "RemedyOfPermission";
     case EROFS:
-        return "The file system is read-only: mount it writable, or work on a copy.";
+        return "RemedyOfReadOnly";
     case EMFILE:
     case ENFILE:
-        return "Close some files or raise the limit on open files (ulimit -n), and try again.";
+        return "RemedyOfOpenFiles";
     case EIO:
-        return "The disk is failing: check the system's log, and keep a copy of the project elsewhere.";
+        return "RemedyOfFailingDisk";
     case ENOENT:
     case ENOTDIR:
-        return "Check whether the project was moved or deleted.";
+        return "RemedyOfMissing";
     case ESTALE:
-        return "Reopen the project.";
+        return "RemedyOfStale";
     case ENOMEM:
-        return "Free some memory and try again.";
+        return "RemedyOfMemory";
     case ENAMETOOLONG:
     case EILSEQ:
-        return "The file system does not accept the name: keep the project under a shorter path, or on "
-               "another file "
-               "system.";
+        return "RemedyOfName";
     case EINVAL:
     case ENOSYS:
     case EOPNOTSUPP:
     case ENOLCK:
-        return "The file system does not support an operation that the store needs: keep the project on "
-               "another file system.";
+        return "RemedyOfUnsupported";
     default:
-        return "Try again; if the error persists, check the system's log.";
+        return "RemedyOfOtherError";
     }
 }
 
 } // namespace
 
-void throwSystemError(std::string const& file, char const* action, int error) {
+void throwSystemError(std::string const& file, char const* problem, int error) {
     throw StoreError(StoreError::Kind::DiskFailed, file, 0,
-                     std::string(action) + ": " + std::generic_category().message(error), remedyFor(error));
+                     errorTexts.get(problem, std::generic_category().message(error)),
+                     errorTexts.get(remedyFor(error)));
 }
 
 } // namespace project::stores

@@ -8,9 +8,9 @@
 namespace project::stores {
 
 /// Throws the StoreError for a failed system call, with the system's description of the error and a remedy.
-/// @param action the action that failed, for example "cannot be read".
+/// @param problem the name of the text of the problem, for example "CannotRead".
 /// @param error the error number of the system.
-[[noreturn]] void throwSystemError(std::string const& file, char const* action, int error);
+[[noreturn]] void throwSystemError(std::string const& file, char const* problem, int error);
 
 /// Repeats a call as long as signals interrupt it.
 /// @param call returns a negative number, with errno set, if it fails.

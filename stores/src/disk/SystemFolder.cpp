@@ -9,6 +9,7 @@
 
 #include "disk/FileTransfer.hpp"
 #include "disk/SystemError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -19,23 +20,22 @@ SystemFolder::SystemFolder(std::string root, std::string const& name)
 int SystemFolder::get() const {
     requireOwnProcess();
     if (!folder_.isOpen()) {
-        throwSystemError(path_, "cannot be used", ENOENT);
+        throwSystemError(path_, "CannotUse", ENOENT);
     }
     return folder_.get();
 }
 
 void SystemFolder::requireOwnProcess() const {
     if (folder_.isInForkedChild()) {
-        throw StoreError(StoreError::Kind::Refused, path_, 0,
-                         "was opened by the parent process before a fork",
-                         "Reopen the project in the child process.");
+        throw StoreError(StoreError::Kind::Refused, path_, 0, errorTexts.get("OpenedBeforeFork"),
+                         errorTexts.get("RemedyOfFork"));
     }
 }
 
 void SystemFolder::openRoot(ForkSafeDescriptor& root, int flags) const {
     requireOwnProcess();
     if (!root.open([&] { return ::open(root_.c_str(), flags | O_DIRECTORY | O_CLOEXEC); })) {
-        throwSystemError(root_, "cannot be opened", errno);
+        throwSystemError(root_, "CannotOpen", errno);
     }
 }
 
@@ -52,12 +52,12 @@ bool SystemFolder::openIn(int root) {
         if (errno == ENOENT) {
             return false;
         }
-        throwSystemError(path_, "cannot be examined", errno);
+        throwSystemError(path_, "CannotExamine", errno);
     }
     if (!S_ISDIR(status.st_mode)) {
         throw StoreError(StoreError::Kind::Damaged, path_, 0,
-                         S_ISLNK(status.st_mode) ? "is a symbolic link" : "is not a folder",
-                         "Move it away: the store needs a folder of its own there and follows no links.");
+                         errorTexts.get(S_ISLNK(status.st_mode) ? "IsLink" : "NotAFolder"),
+                         errorTexts.get("RemedyOfTakenFolder"));
     }
     if (folder_.isOpen() && identity_.isSameFile(toIdentity(status))) {
         return true;
@@ -65,7 +65,7 @@ bool SystemFolder::openIn(int root) {
     int const flags = O_RDONLY | O_DIRECTORY | O_NOFOLLOW | O_CLOEXEC;
     if (!folder_.open([&] { return ::openat(root, name_.c_str(), flags); }) ||
         ::fstat(folder_.get(), &status) != 0) {
-        throwSystemError(path_, "cannot be opened", errno);
+        throwSystemError(path_, "CannotOpen", errno);
     }
     identity_ = toIdentity(status);
     return true;
@@ -76,17 +76,17 @@ bool SystemFolder::make() {
     openRoot(root, O_RDONLY);
     bool const isCreated = ::mkdirat(root.get(), name_.c_str(), 0777) == 0;
     if (!isCreated && errno != EEXIST) {
-        throwSystemError(path_, "cannot be created", errno);
+        throwSystemError(path_, "CannotCreate", errno);
     }
     if (!openIn(root.get())) {
-        throwSystemError(path_, "cannot be opened", ENOENT);
+        throwSystemError(path_, "CannotOpen", ENOENT);
     }
     if (repeatWhenInterrupted([&root] { return ::fsync(root.get()); }) != 0) {
         auto const error = errno;
         if (isCreated) {
             remove();
         }
-        throwSystemError(root_, "cannot be synced", error);
+        throwSystemError(root_, "CannotSync", error);
     }
     return isCreated;
 }
@@ -119,7 +119,7 @@ bool SystemFolder::isInPlace() const {
             return false;
         }
         // Not false: the caller would report that the batch is not in the project.
-        throwSystemError(path_, "cannot be examined", errno);
+        throwSystemError(path_, "CannotExamine", errno);
     }
     return S_ISDIR(status.st_mode) && identity_.isSameFile(toIdentity(status));
 }

@@ -12,16 +12,13 @@
 #include "text/ProjectText.hpp"
 #include "text/TextDifference.hpp"
 #include "text/TextTail.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
 using Clock = std::chrono::steady_clock;
 
 namespace {
-
-char const* const setAsideOrRestore = "A damaged log is not written. Run \"projectctl check\" to see the "
-                                      "damage, and \"projectctl check --repair\" "
-                                      "to set it aside; or replace the definition by a copy.";
 
 /// A batch between write and keep.
 struct PendingEntry {
@@ -212,22 +209,23 @@ void JournalBackend::State::requireNoReset() const {
     auto const& loss = seen_.loss();
     if (loss && loss->kind == HistoryLoss::Kind::Reset) {
         throw StoreError(StoreError::Kind::Refused, journal->name(), 0,
-                         "the server was reset to an earlier state: version " + std::to_string(loss->seen) +
-                             " was seen, and the newest version is now " + std::to_string(loss->found),
-                         "Check which changes are missing. \"projectctl shared status\" accepts the loss.");
+                         errorTexts.get("ServerReset", loss->seen, loss->found),
+                         errorTexts.get("RemedyOfReset"));
     }
 }
 
 StoreError JournalBackend::State::damageError() const {
-    return StoreError(StoreError::Kind::Damaged, journal->name(), 0, problemOf(seen_), setAsideOrRestore);
+    return StoreError(StoreError::Kind::Damaged, journal->name(), 0, problemOf(seen_),
+                      errorTexts.get("RemedyOfDamagedLog"));
 }
 
 /// Describes the damage of a log.
 std::string JournalBackend::State::problemOf(SeenLog const& log) const {
     std::uint64_t const version = log.damage()->version;
     std::uint64_t const later = log.newest().version - version;
-    return "version " + std::to_string(version) + " is damaged: " + log.damage()->problem +
-           (later > 0 ? "; " + std::to_string(later) + " later entries cannot be applied" : "");
+    std::string const& problem = log.damage()->problem;
+    return later > 0 ? errorTexts.get("LogDamagedBeforeLater", version, problem, later)
+                     : errorTexts.get("LogDamaged", version, problem);
 }
 
 /// A batch is committed with a body if it is the first, if it is long, or if the tail becomes long compared
@@ -280,9 +278,8 @@ JournalPosition JournalBackend::State::append(JournalPosition const& after, std:
     entry.body = body != nullptr ? std::string_view(body->body()) : std::string_view();
     auto const lastCheck = std::exchange(lastCheck_, std::nullopt); // the next guard checks if this throws
     if (journal->append(entry) == Journal::Appended::Superseded) {
-        throw StoreError(StoreError::Kind::Busy, journal->name(), 0,
-                         "another client wrote at this moment, and the batch is not in the project",
-                         "Try again.");
+        throw StoreError(StoreError::Kind::Busy, journal->name(), 0, errorTexts.get("WrittenByClient"),
+                         errorTexts.get("TryAgain"));
     }
     lastCheck_ = lastCheck;
     return entry.position;
@@ -304,10 +301,9 @@ std::string JournalBackend::State::text() {
 }
 
 void JournalBackend::State::replace(std::string text) {
-    auto const next = ProjectText::read(std::move(text), "the new text");
+    auto const next = ProjectText::read(std::move(text), errorTexts.get("NewText"));
     if (!next || next->hasFault(Fault::Kind::Damage) || next->hasFault(Fault::Kind::Conflict)) {
-        throw StoreError(StoreError::Kind::Refused, journal->name(), 0,
-                         "the new text is incomplete, damaged or contains conflict markers", "");
+        throw StoreError(StoreError::Kind::Refused, journal->name(), 0, errorTexts.get("NewTextFaulty"), "");
     }
     Unlocking const unlocking(*this);
     lockAndCheck();
@@ -344,9 +340,8 @@ std::size_t JournalBackend::State::deleteHistory(std::uint64_t version) {
     Changes ignored;
     if (!kept.readFrom(*body, ignored) || kept.damage()) {
         throw StoreError(StoreError::Kind::Damaged, journal->name(), 0,
-                         "the entries from version " + std::to_string(body->version) +
-                             " on are damaged, and the history before them is not deleted",
-                         setAsideOrRestore);
+                         errorTexts.get("HistoryDamaged", body->version),
+                         errorTexts.get("RemedyOfDamagedLog"));
     }
     return journal->deleteBefore(body->version);
 }
@@ -388,8 +383,8 @@ std::optional<JournalBackend::SetAside> JournalBackend::State::repair() {
     journal->requireOwner();
     if (!seen_.hasRead()) {
         throw StoreError(StoreError::Kind::Damaged, journal->name(), 0,
-                         problemOf(log) + "; nothing before it is readable",
-                         "Replace the definition by a copy.");
+                         errorTexts.get("LogUnreadable", problemOf(log)),
+                         errorTexts.get("RemedyOfUnreadableLog"));
     }
     // This client has read at least as much as is readable now, and perhaps more, before it was damaged.
     SetAside const result{log.damage()->version, log.newest().version, !seen_.damage()};

@@ -8,14 +8,9 @@
 #include "project/stores/StoreError.hpp"
 #include "text/TextDifference.hpp"
 #include "text/TextTail.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
-
-namespace {
-
-char const* const wrongChecksum = "its checksum is wrong";
-
-} // namespace
 
 bool SeenLog::begin(CachedText cached) {
     std::optional<ProjectText> text;
@@ -104,7 +99,7 @@ void SeenLog::readAll(JournalLook look, Changes& changes) {
     JournalEntry const& first = look.entries.front();
     ReadBody body;
     if (!first.isBody) {
-        body.problem = "no body precedes it";
+        body.problem = errorTexts.get("BodyMissing");
     } else {
         body = look.body ? readBody(*std::move(look.body), first.position) : fetchBody(first.position);
     }
@@ -146,11 +141,11 @@ std::string SeenLog::applyBatch(JournalEntry const& entry, Changes& changes) {
         return problem;
     }
     if (closingSum(entry.lines) != entry.position.sum) {
-        return wrongChecksum;
+        return errorTexts.get("SumWrong");
     }
     auto differences = text_.extend(entry.lines);
     if (!differences) {
-        return wrongChecksum;
+        return errorTexts.get("SumWrong");
     }
     position_ = entry.position;
     addChanges(changes, {false, std::move(*differences)});
@@ -206,9 +201,9 @@ bool SeenLog::computeBody(JournalEntry const& entry, Changes& changes) {
 /// The reason why an entry does not follow the text; empty if it does.
 std::string SeenLog::problemOfChain(JournalEntry const& entry) const {
     if (entry.position.version != position_.version + 1) {
-        return "an entry before it is missing";
+        return errorTexts.get("EntryMissing");
     }
-    return entry.after == position_.sum ? "" : "it does not follow the entry before it";
+    return entry.after == position_.sum ? std::string() : errorTexts.get("EntryUnchained");
 }
 
 SeenLog::ReadBody SeenLog::fetchBody(JournalPosition const& position) {
@@ -230,7 +225,7 @@ SeenLog::ReadBody SeenLog::readBody(std::string bytes, JournalPosition const& po
         return {std::nullopt, error.problem()};
     }
     if (!text || !text->isTidy() || text->sum() != position.sum) {
-        return {std::nullopt, wrongChecksum};
+        return {std::nullopt, errorTexts.get("SumWrong")};
     }
     return {std::move(text), {}};
 }

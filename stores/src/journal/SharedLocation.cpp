@@ -10,6 +10,7 @@
 #include "project/metadata/MetadataFunctions.hpp"
 #include "project/stores/StoreError.hpp"
 #include "project/stores/TextBackend.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -20,14 +21,14 @@ namespace {
 
 [[noreturn]] void throwDamaged(Disk const& disk, std::string const& problem) {
     throw StoreError(StoreError::Kind::Damaged, disk.folder() + '/' + LocationFile::name, 0, problem,
-                     "Restore the file from source control.");
+                     errorTexts.get("RemedyOfLocation"));
 }
 
 /// Reads one member, whose value is a string.
 bool readMember(JsonReader& json, std::string_view name, std::string& value) {
     std::string_view found;
     std::string_view content;
-    bool const isRead = json.string(found) && (found == name || json.fail("an unknown member")) &&
+    bool const isRead = json.string(found) && (found == name || json.fail("MemberUnknown")) &&
                         json.expect(':') && json.string(content);
     if (isRead) {
         value = fl::i18n::toUtf8(decodeJsonContent(content));
@@ -37,7 +38,7 @@ bool readMember(JsonReader& json, std::string_view name, std::string& value) {
 
 bool readVersion(JsonReader& json, unsigned long& version) {
     std::string_view found;
-    return json.string(found) && (found == "version" || json.fail("an unknown member")) && json.expect(':') &&
+    return json.string(found) && (found == "version" || json.fail("MemberUnknown")) && json.expect(':') &&
            json.number(version);
 }
 
@@ -48,18 +49,17 @@ SharedLocation parse(Disk const& disk, std::string_view bytes) {
     unsigned long version = 0;
     if (!json.expect('{') || !readMember(json, "format", format) || format != "project-store" ||
         !json.expect(',') || !readVersion(json, version)) {
-        throwDamaged(disk, "is not the location of a shared project");
+        throwDamaged(disk, errorTexts.get("NotALocation"));
     }
     if (version != 1) {
         throw StoreError(StoreError::Kind::Refused, disk.folder() + '/' + LocationFile::name, 0,
-                         "has the later format " + std::to_string(version),
-                         "Use a later version of this program.");
+                         errorTexts.get("LocationFormat", version), errorTexts.get("RemedyOfLocationFormat"));
     }
     bool const isRead = json.expect(',') && readMember(json, "kind", result.kind) && json.expect(',') &&
                         readMember(json, "service", result.service) && json.expect(',') &&
                         readMember(json, "project", result.project) && json.expect('}') && json.end();
     if (!isRead) {
-        throwDamaged(disk, std::string("is unreadable: ") + json.problem());
+        throwDamaged(disk, errorTexts.get("LocationUnreadable", json.problemText()));
     }
     return result;
 }
@@ -82,8 +82,8 @@ bool createFile(Disk& disk, char const* name, std::string_view content, FileChan
 }
 
 [[noreturn]] void throwTaken(Disk const& disk) {
-    throw StoreError(StoreError::Kind::Refused, disk.folder(), 0, "contains a project already",
-                     "Open it, or choose another folder.");
+    throw StoreError(StoreError::Kind::Refused, disk.folder(), 0, errorTexts.get("ProjectExists"),
+                     errorTexts.get("RemedyOfExistingProject"));
 }
 
 } // namespace
@@ -107,7 +107,7 @@ std::optional<SharedLocation> readSharedLocation(Disk& disk) {
         return std::nullopt;
     }
     if (containsBoth(disk) && !finishCopyOfOther(disk) && containsBoth(disk)) {
-        throwDamaged(disk, "says that the project is stored on a server, and there is a text beside it");
+        throwDamaged(disk, errorTexts.get("LocationBesideText"));
     }
     auto const content = disk.read(LocationFile::name, 0);
     if (!content) {

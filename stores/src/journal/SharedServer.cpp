@@ -5,7 +5,9 @@
 
 #include <dlfcn.h>
 
+#include "fl/i18n/MessageCatalog.hpp"
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -17,12 +19,12 @@ bool isLowerCase(std::string_view text) {
 
 void requireNames(std::string const& kind, std::string const& service) {
     if (!isLowerCase(kind)) {
-        throw StoreError(StoreError::Kind::Refused, kind, 0, "is not a kind of server",
-                         "Use lower-case letters, for example \"postgresql\".");
+        throw StoreError(StoreError::Kind::Refused, kind, 0, errorTexts.get("NotAKind"),
+                         errorTexts.get("RemedyOfKind"));
     }
     if (service.empty() || service.find_first_of("=:/") != std::string::npos) {
-        throw StoreError(StoreError::Kind::Refused, service, 0, "is not the name of a service",
-                         "Give the server a name in the configuration of its client library, and use that.");
+        throw StoreError(StoreError::Kind::Refused, service, 0, errorTexts.get("NotAService"),
+                         errorTexts.get("RemedyOfService"));
     }
 }
 
@@ -33,8 +35,9 @@ void* loadLibrary(std::string const& kind) {
     if (library == nullptr) {
         char const* const reason = dlerror();
         throw StoreError(StoreError::Kind::Refused, name, 0,
-                         "cannot be loaded" + (reason == nullptr ? "" : ": " + std::string(reason)),
-                         "The project is stored on a server. Install the library for " + kind + " projects.");
+                         reason == nullptr ? errorTexts.get("CannotLoad")
+                                           : errorTexts.get("CannotLoadBecause", reason),
+                         errorTexts.get("RemedyOfLoading", kind));
     }
     return library;
 }
@@ -46,11 +49,11 @@ std::unique_ptr<SharedServer> connectTo(std::string const& kind, std::string con
     auto* const make =
         reinterpret_cast<MakeSharedServer>(dlsym(loadLibrary(kind), "project_make_shared_server"));
     if (make == nullptr) {
-        throw StoreError(StoreError::Kind::Refused, "libproject_" + kind, 0,
-                         "is not a library for shared projects",
-                         "Install the library of the same version as this program.");
+        throw StoreError(StoreError::Kind::Refused, "libproject_" + kind, 0, errorTexts.get("NotALibrary"),
+                         errorTexts.get("RemedyOfLibrary"));
     }
-    return std::unique_ptr<SharedServer>(make(service.c_str()));
+    return std::unique_ptr<SharedServer>(
+        make(service.c_str(), fl::i18n::MessageCatalog::getGlobalLocale().c_str()));
 }
 
 } // namespace project::stores

@@ -10,6 +10,7 @@
 #include "journal/LocationFile.hpp"
 #include "project/stores/StoreError.hpp"
 #include "project/stores/TextBackend.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -31,7 +32,7 @@ std::string markFor(Disk& disk, std::string const& old) {
 FolderGuard::FolderGuard(Disk& disk) : disk_(disk) {
     if (!disk.lock(patience)) {
         throw StoreError(StoreError::Kind::Busy, disk.folder(), 0,
-                         "another process holds the lock: " + disk.lockHolder(), "Try again.");
+                         errorTexts.get("LockHeld", disk.lockHolder()), errorTexts.get("TryAgain"));
     }
 }
 

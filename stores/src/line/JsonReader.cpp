@@ -2,6 +2,8 @@
 
 #include <limits>
 
+#include "texts/ErrorTexts.hpp"
+
 namespace project::stores {
 
 char JsonReader::peek() noexcept {
@@ -19,6 +21,10 @@ bool JsonReader::fail(char const* problem) noexcept {
     return false;
 }
 
+std::string JsonReader::problemText() const {
+    return problem_ == nullptr ? std::string() : errorTexts.get(problem_);
+}
+
 bool JsonReader::accept(char character) noexcept {
     if (peek() != character) {
         return false;
@@ -28,12 +34,12 @@ bool JsonReader::accept(char character) noexcept {
 }
 
 bool JsonReader::expect(char character) noexcept {
-    return accept(character) || fail("the line is not valid JSON");
+    return accept(character) || fail("NotJson");
 }
 
 bool JsonReader::string(std::string_view& content) noexcept {
     if (!accept('"')) {
-        return fail("a string is missing");
+        return fail("StringMissing");
     }
     JsonContentScan const scan = scanJsonContent(text_, at_);
     if (scan.problem != nullptr) {
@@ -47,7 +53,7 @@ bool JsonReader::string(std::string_view& content) noexcept {
 bool JsonReader::word(std::string_view expected) noexcept {
     peek();
     if (problem_ != nullptr || text_.substr(at_, expected.size()) != expected) {
-        return fail("the line is not valid JSON");
+        return fail("NotJson");
     }
     at_ += expected.size();
     return true;
@@ -60,18 +66,18 @@ bool JsonReader::number(unsigned long& value) noexcept {
     while (at_ < text_.size() && text_[at_] >= '0' && text_[at_] <= '9') {
         auto const digit = static_cast<unsigned long>(text_[at_] - '0');
         if (value > (std::numeric_limits<unsigned long>::max() - digit) / 10) {
-            return fail("a number is too large");
+            return fail("NumberTooLarge");
         }
         value = value * 10 + digit;
         ++at_;
     }
     bool const hasLeadingZero = first == '0' && at_ - from > 1;
-    return (problem_ == nullptr && at_ > from && !hasLeadingZero) || fail("a whole number is missing");
+    return (problem_ == nullptr && at_ > from && !hasLeadingZero) || fail("NumberMissing");
 }
 
 bool JsonReader::end() noexcept {
     peek();
-    return problem_ == nullptr && (at_ == text_.size() || fail("the line continues after its end"));
+    return problem_ == nullptr && (at_ == text_.size() || fail("LineContinues"));
 }
 
 } // namespace project::stores

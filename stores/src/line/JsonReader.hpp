@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstddef>
+#include <string>
 #include <string_view>
 
 #include "line/JsonText.hpp"
@@ -9,8 +10,8 @@ namespace project::stores {
 
 /// Reads one JSON value strictly, member by member, in the order in which the caller expects them.
 ///
-/// After the first error, every operation returns false, and problem returns the reason. The text must
-/// outlive the reader. Allocates nothing.
+/// After the first error, every operation returns false, and problem returns the name of its text. The text
+/// must outlive the reader. Reading allocates nothing.
 class JsonReader {
 public:
     explicit JsonReader(std::string_view text) noexcept : text_(text) {}
@@ -36,11 +37,14 @@ public:
     /// True at the end of the text. Anything that follows is an error.
     bool end() noexcept;
 
-    /// Records an error that the caller found. @return false.
+    /// Records an error that the caller found. @param problem the name of its text. @return false.
     bool fail(char const* problem) noexcept;
 
-    /// The first error, or null.
+    /// The name of the text of the first error, or null.
     char const* problem() const noexcept { return problem_; }
+
+    /// The text of the first error, in the language of the process; empty if there is none.
+    std::string problemText() const;
 
 private:
     /// Skips white space. @return the next character, or 0 at the end and after an error.

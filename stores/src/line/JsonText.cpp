@@ -229,22 +229,22 @@ JsonContentScan scanJsonContent(std::string_view text, std::size_t from) noexcep
         } else if (byte == '"') {
             return {at, escapes.isCanonical(), nullptr};
         } else if (byte < 0x20) {
-            return {at, false, "a string contains a control character"};
+            return {at, false, "StringWithControl"};
         } else if (byte == '\\') {
             std::size_t const length = escapes.length(text, at);
             if (length == 0) {
-                return {at, false, "a string contains an invalid escape"};
+                return {at, false, "StringWithWrongEscape"};
             }
             at += length;
         } else {
             std::size_t const length = decodeUtf8(text, at).length;
             if (length == 0) {
-                return {at, false, "a string is not valid UTF-8"};
+                return {at, false, "StringNotUtf8"};
             }
             at += length;
         }
     }
-    return {at, false, "a string has no closing quote"};
+    return {at, false, "StringOpen"};
 }
 
 } // namespace project::stores

@@ -55,7 +55,7 @@ std::strong_ordering compareJsonContents(std::string_view left, std::string_view
 struct JsonContentScan {
     std::size_t end;     ///< the position of the closing quote; undefined if there is a problem
     bool isCanonical;    ///< appendJsonContent would write the same bytes
-    char const* problem; ///< null if the content is well-formed up to its closing quote
+    char const* problem; ///< the name of a text; null if the content is well-formed up to its closing quote
 };
 
 /// Checks the content of a string from its first byte to its closing quote: UTF-8, escapes, control

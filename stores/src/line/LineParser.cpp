@@ -93,7 +93,7 @@ private:
         } else {
             appendJsonContent(path_, decodeJsonContent(content));
         }
-        return isPathContent(path_) || reader_.fail("the path has an empty name or too many steps");
+        return isPathContent(path_) || reader_.fail("PathWrong");
     }
 
     bool steps() {
@@ -102,14 +102,13 @@ private:
         }
         do {
             if (steps_.size() == 2 * deepestAddress) {
-                return reader_.fail("the address has too many steps");
+                return reader_.fail("AddressTooLong");
             }
             if (!reader_.string(steps_.emplace_back())) {
                 return false;
             }
         } while (reader_.accept(','));
-        return reader_.expect(']') &&
-               (steps_.size() % 2 == 0 || reader_.fail("the last step of the address has no location"));
+        return reader_.expect(']') && (steps_.size() % 2 == 0 || reader_.fail("AddressOpen"));
     }
 
     bool object() {
@@ -133,7 +132,7 @@ private:
     bool lineMember(std::string_view name) {
         if (name == "file" || name == "at" || name == "remove") {
             if (!std::exchange(addressMember_, name).empty()) {
-                return reader_.fail("the line has two addresses");
+                return reader_.fail("AddressTwice");
             }
             bool const isPath = name == "file" || (name == "remove" && reader_.isNext('"'));
             return isPath ? path() : steps();
@@ -157,7 +156,7 @@ private:
         if (name == "children" && !node.children) {
             return children(node.children.emplace(), nesting + 1);
         }
-        return reader_.fail("the line has an unknown or a duplicate member");
+        return reader_.fail("MemberWrong");
     }
 
     bool keys(std::map<std::u16string, std::u16string>& keys) {
@@ -173,7 +172,7 @@ private:
             std::size_t const before = keys.size();
             keys.try_emplace(keys.end(), decodeJsonContent(key), decodeJsonContent(value));
             if (keys.size() == before) {
-                return reader_.fail("a key occurs twice");
+                return reader_.fail("KeyTwice");
             }
         } while (reader_.accept(','));
         return reader_.expect('}');
@@ -181,7 +180,7 @@ private:
 
     bool children(std::vector<WrittenNode>& children, std::size_t nesting) {
         if (nesting > deepestNesting) {
-            return reader_.fail("nodes are nested too deeply");
+            return reader_.fail("NodesTooDeep");
         }
         if (!reader_.expect('[') || reader_.accept(']')) {
             return reader_.problem() == nullptr;
@@ -192,7 +191,7 @@ private:
                 return false;
             }
             if (!child.type) {
-                return reader_.fail("a nested node has no type");
+                return reader_.fail("NodeWithoutType");
             }
         } while (reader_.accept(','));
         return reader_.expect(']');
@@ -201,12 +200,12 @@ private:
     /// Checks that the members of an object form a line.
     bool complete() {
         if (addressMember_.empty()) {
-            return reader_.fail("the line has no address");
+            return reader_.fail("AddressMissing");
         }
         bool const hasNode = node_.type || node_.keys || node_.children;
         bool const isRemoval = addressMember_ == "remove";
         if ((isCreated_ && hasNode) || (isRemoval && (isCreated_ || hasNode))) {
-            return reader_.fail("the members of the line contradict each other");
+            return reader_.fail("MembersContradict");
         }
         kind_ = isRemoval ? Change::Kind::Remove : isCreated_ ? Change::Kind::Create : Change::Kind::Set;
         return true;
@@ -234,7 +233,7 @@ ParsedLine parseLine(std::string_view line) {
 ParsedLine parseBodyLine(std::string_view line) {
     ParsedLine parsed = parseLine(line);
     if (parsed.change && parsed.change->kind == Change::Kind::Remove) {
-        return {std::nullopt, "the body contains a removal"};
+        return {std::nullopt, "RemovalInBody"};
     }
     return parsed;
 }

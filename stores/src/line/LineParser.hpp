@@ -11,7 +11,7 @@ namespace project::stores {
 /// A line that was read, or the reason why it is unreadable.
 struct ParsedLine {
     std::optional<Change> change;
-    char const* problem; ///< a clause; null if there is a change
+    char const* problem; ///< the name of the text of a clause; null if there is a change
 };
 
 /// Reads any line of a body or a batch, whatever the order of its members and its white space.

@@ -8,6 +8,7 @@
 #include "line/JsonText.hpp"
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -114,12 +115,11 @@ void appendNestedNode(std::string& out, MetadataNode const& node) {
 
 void requireWritable(Change const& change) {
     if (change.address.depth() > deepestAddress) {
-        throw StoreError(StoreError::Kind::Refused, "", 0, "an address has more than 4096 steps",
-                         "Give the file a shorter path.");
+        throw StoreError(StoreError::Kind::Refused, "", 0, errorTexts.get("AddressTooDeep"),
+                         errorTexts.get("RemedyOfDeepAddress"));
     }
     if (change.node && !nestsWithin(*change.node, deepestNesting)) {
-        throw StoreError(StoreError::Kind::Refused, "", 0, "a node has more than 100 levels of nested nodes",
-                         "");
+        throw StoreError(StoreError::Kind::Refused, "", 0, errorTexts.get("NestedTooDeep"), "");
     }
 }
 

@@ -13,6 +13,7 @@
 #include "text/ConflictReader.hpp"
 #include "text/TextLines.hpp"
 #include "text/TextReader.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -31,12 +32,12 @@ TextReading readUndamaged(std::string_view text, char const* version) {
         auto const lines = static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
         throw StoreError(StoreError::Kind::Damaged, version,
                          lines + (text.empty() || text.back() != '\n' ? 1 : 0),
-                         "the text ends before the last line of its body", "");
+                         errorTexts.get("TextUnfinished"), "");
     }
     if (auto const* const damage = firstFault(*reading, Fault::Kind::Damage)) {
         throw StoreError(StoreError::Kind::Damaged, version, damage->line,
-                         "the text is damaged: " + damage->problem,
-                         "Repair that version before you merge it.");
+                         errorTexts.get("VersionDamaged", damage->problem),
+                         errorTexts.get("RemedyOfDamagedVersion"));
     }
     return *std::move(reading);
 }
@@ -50,8 +51,7 @@ TextBody readSide(std::string_view text, char const* version) {
     auto reading = readUndamaged(text, version);
     if (auto const* const conflict = firstFault(reading, Fault::Kind::Conflict)) {
         throw StoreError(StoreError::Kind::Conflict, version, conflict->line,
-                         "another merge left conflict markers",
-                         "Resolve the conflicts in that version before you merge it.");
+                         errorTexts.get("VersionConflicted"), errorTexts.get("RemedyOfConflictedVersion"));
     }
     return bodyOf(std::move(reading));
 }
@@ -140,7 +140,7 @@ std::vector<MergeConflict> const& TextMerge::conflicts() const noexcept {
 
 std::string TextMerge::text(std::vector<MergeSide> const& choices) const {
     if (choices.size() != conflicts().size()) {
-        throw std::invalid_argument("a merge needs one choice for each of its conflicts");
+        throw std::invalid_argument(errorTexts.get("ChoicesWrong"));
     }
     MergeSide const* next = choices.data();
     return state_->text([&](MergeSite const& site) {

@@ -9,6 +9,7 @@
 #include "text/TextLines.hpp"
 #include "text/TextSum.hpp"
 #include "text/TextTail.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -37,8 +38,7 @@ Sides split(std::string const& bytes) {
             continue;
         }
         if (marker == MergeMarker::Ours || within == MergeMarker::None) {
-            sides.faults.push_back(
-                {Fault::Kind::Conflict, line.number, "a merge left conflict markers here"});
+            sides.faults.push_back({Fault::Kind::Conflict, line.number, errorTexts.get("ConflictMarkers")});
         }
         bool const isEnd =
             marker == MergeMarker::End || (marker == MergeMarker::Theirs && within == MergeMarker::None);
@@ -85,7 +85,7 @@ private:
         if (parsed.change) {
             content.join(*parsed.change);
         } else if (!line.text.empty()) {
-            faults.push_back({Fault::Kind::Damage, line.number, parsed.problem});
+            faults.push_back({Fault::Kind::Damage, line.number, errorTexts.get(parsed.problem)});
             damage.emplace(line.number, line.whole);
         }
     }

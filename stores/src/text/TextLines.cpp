@@ -2,6 +2,7 @@
 
 #include "line/JsonReader.hpp"
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -36,13 +37,12 @@ bool checkFirstLine(std::string_view line, bool hasEnd, std::string const& file)
     }
     FirstLine const first = readFirstLine(line);
     if (first.version > version) {
-        throw StoreError(StoreError::Kind::Refused, file, 1,
-                         "the text has version " + std::to_string(first.version) + " of the format",
-                         "Use a newer version of the program.");
+        throw StoreError(StoreError::Kind::Refused, file, 1, errorTexts.get("LaterFormat", first.version),
+                         errorTexts.get("RemedyOfLaterFormat"));
     }
     if (first.version != version || !first.isComplete) {
-        throw StoreError(StoreError::Kind::Damaged, file, 1, "the file is not a project definition",
-                         "Move the file away, or restore the right one, for example from source control.");
+        throw StoreError(StoreError::Kind::Damaged, file, 1, errorTexts.get("NotADefinition"),
+                         errorTexts.get("RemedyOfNotADefinition"));
     }
     return hasEnd;
 }

@@ -10,6 +10,7 @@
 #include "text/TextLines.hpp"
 #include "text/TextSum.hpp"
 #include "text/TextTail.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -105,7 +106,7 @@ private:
         reading_.isCanonical = false;
         ParsedLine parsed = parseBodyLine(line.text);
         if (line.text.empty()) {
-            fault(Fault::Kind::Irregular, "the line is empty");
+            fault(Fault::Kind::Irregular, "LineEmpty");
         } else if (!parsed.change) {
             fault(Fault::Kind::Damage, parsed.problem);
             reading_.damage.emplace(line.number, line.whole);
@@ -119,9 +120,9 @@ private:
         AddressText address(change.address);
         auto const order = compare(last_, address.view());
         if (std::is_gt(order)) {
-            fault(Fault::Kind::Irregular, "the line is out of order");
+            fault(Fault::Kind::Irregular, "LineOutOfOrder");
         } else if (std::is_eq(order)) {
-            fault(Fault::Kind::Irregular, "the line has the same address as the line before it");
+            fault(Fault::Kind::Irregular, "LineRepeated");
         } else {
             lastText_ = std::move(address);
             last_ = lastText_.view();
@@ -143,7 +144,7 @@ private:
         bool const hasEnd = lines.empty() ? body_.bytes().ends_with('\n') : lines.back().hasEnd();
         if (!hasEnd && !isTorn) {
             number_ = lines.empty() ? number_ - 1 : lines.back().number;
-            fault(Fault::Kind::Irregular, "the last line has no line end");
+            fault(Fault::Kind::Irregular, "LineEndMissing");
         }
         return Outcome::Complete;
     }
@@ -160,7 +161,10 @@ private:
         return tail.isTorn;
     }
 
-    void fault(Fault::Kind kind, char const* problem) { reading_.faults.push_back({kind, number_, problem}); }
+    /// @param problem the name of its text.
+    void fault(Fault::Kind kind, char const* problem) {
+        reading_.faults.push_back({kind, number_, errorTexts.get(problem)});
+    }
 
     TextReading reading_;
     TextBody& body_;

@@ -9,6 +9,7 @@
 #include "line/LineParser.hpp"
 #include "line/NodeLine.hpp"
 #include "text/TextSum.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -115,8 +116,8 @@ private:
     struct Suspect {
         Lines lines; ///< including the closing line
         std::size_t line;
-        std::string problem;
-        bool isUnreadable; ///< a line of it is
+        char const* problem; ///< the name of its text
+        bool isUnreadable;   ///< a line of it is
     };
 
     /// @param before the lines since the previous closing line.
@@ -141,8 +142,7 @@ private:
         if (parsed.unreadable != nullptr) {
             suspects_.push_back({lines, parsed.unreadable->number, parsed.problem, true});
         } else {
-            suspects_.push_back(
-                {lines, closingLine.number, "the checksum of the batch that ends here is wrong", false});
+            suspects_.push_back({lines, closingLine.number, "BatchSumWrong", false});
         }
     }
 
@@ -151,12 +151,11 @@ private:
         bool const isAfterDamage = !suspects_.empty() || !extra.empty();
         addSuspectsAsDamage();
         if (!extra.empty()) {
-            addDamage(extra, extra.front().number, "a batch has no closing line");
+            addDamage(extra, extra.front().number, "BatchOpen");
         }
         bool const isChained = isAfterDamage || closing.after == reading_.nextAfter;
         if (!isChained) {
-            addFault(Fault::Kind::Irregular, closingLine.number,
-                     "the batch that ends here does not chain to the text before it");
+            addFault(Fault::Kind::Irregular, closingLine.number, "BatchUnchained");
         }
         reading_.batches.push_back({std::move(changes), isChained, std::string(closing.sum)});
     }
@@ -177,7 +176,7 @@ private:
         addSuspectsAsDamage();
         if (line) {
             reading_.isTorn = true;
-            addFault(Fault::Kind::TornTail, *line, "the batch that begins here is incomplete");
+            addFault(Fault::Kind::TornTail, *line, "BatchTorn");
         }
     }
 
@@ -188,15 +187,15 @@ private:
         suspects_.clear();
     }
 
-    void addDamage(Lines lines, std::size_t line, std::string problem) {
-        addFault(Fault::Kind::Damage, line, std::move(problem));
+    void addDamage(Lines lines, std::size_t line, char const* problem) {
+        addFault(Fault::Kind::Damage, line, problem);
         for (TextLine const& damaged : lines) {
             reading_.damage.emplace(damaged.number, damaged.whole);
         }
     }
 
-    void addFault(Fault::Kind kind, std::size_t line, std::string problem) {
-        reading_.faults.push_back({kind, line, std::move(problem)});
+    void addFault(Fault::Kind kind, std::size_t line, char const* problem) {
+        reading_.faults.push_back({kind, line, errorTexts.get(problem)});
     }
 
     TailReading reading_;

@@ -6,6 +6,8 @@
 #include <stdexcept>
 #include <utility>
 
+#include "texts/ErrorTexts.hpp"
+
 namespace project::stores {
 
 namespace {
@@ -82,7 +84,7 @@ void Chunk::setState(std::size_t index, Node node, bool isCreated) {
 void Chunk::insert(std::size_t index, NewElement const& element, Place place) {
     std::size_t const length = element.name.size();
     if (length > std::numeric_limits<std::uint32_t>::max() - names_.size()) {
-        throw std::length_error("the locations in the metadata tree are too long");
+        throw std::length_error(errorTexts.get("LocationsTooLong"));
     }
     bool const isNowPlain = isPlain(place.node);
     bool const isRecorded = (place.node && !isNowPlain) || !place.below.isNone();

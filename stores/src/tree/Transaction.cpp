@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "project/stores/TreeMetadataManager.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::stores {
 
@@ -37,11 +38,10 @@ void Transaction::commit() {
 
 void Transaction::requireInnermost() const {
     if (thread_ != std::this_thread::get_id()) {
-        throw std::logic_error("a transaction was committed on another thread than the one that began it");
+        throw std::logic_error(errorTexts.get("CommitOnOtherThread"));
     }
     if (!guard_ || !store_->isInnermost(number_)) {
-        throw std::logic_error(
-            "a transaction was committed that has ended already, or before one that is nested in it");
+        throw std::logic_error(errorTexts.get("CommitOutOfOrder"));
     }
 }
 

@@ -6,6 +6,7 @@
 
 #include "project/metadata/MetadataNodeSpecification.hpp"
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 #include "tree/ChangeLog.hpp"
 #include "tree/ListenerList.hpp"
 #include "tree/MetadataTree.hpp"
@@ -88,8 +89,7 @@ void TreeMetadataManager::State::enter(Access access) {
 void TreeMetadataManager::State::requireNotCommitting() const {
     if (committing) {
         throw StoreError(StoreError::Kind::Refused, fl::filesystem::toSystem(metadataRoot).string(), 0,
-                         "a listener wrote to the store while it was notified of a write",
-                         "The listener must write after the operation has returned.");
+                         errorTexts.get("ListenerWrote"), errorTexts.get("RemedyOfListener"));
     }
 }
 
@@ -154,8 +154,7 @@ void TreeMetadataManager::setNodes(std::map<Address, std::shared_ptr<MetadataNod
     MetadataTree::Search search(state_->tree);
     for (auto const& [address, node] : nodes) {
         if (!node || address.depth() == 0) {
-            throw std::invalid_argument(node ? "a node cannot be stored at the root of the metadata tree"
-                                             : "a null node was given to the metadata store");
+            throw std::invalid_argument(errorTexts.get(node ? "NodeAtRoot" : "NodeIsNull"));
         }
         auto const& before = search.node(address);
         if (!before || !isEqual(*before, *node)) {

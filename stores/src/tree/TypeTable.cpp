@@ -3,6 +3,8 @@
 #include <bit>
 #include <stdexcept>
 
+#include "texts/ErrorTexts.hpp"
+
 namespace project::stores {
 
 namespace {
@@ -31,7 +33,7 @@ TypeTable::Index TypeTable::index(std::u16string_view type) {
     auto const index = static_cast<Index>(indexes_.size());
     auto const [segment, size, offset] = positionOf(index);
     if (segment == segmentCount) {
-        throw std::length_error("the metadata tree has too many types");
+        throw std::length_error(errorTexts.get("TypesTooMany"));
     }
     auto& types = segments_[segment];
     if (!types) {

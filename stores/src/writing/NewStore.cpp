@@ -4,6 +4,7 @@
 
 #include "project/stores/StoreError.hpp"
 #include "text/ProjectText.hpp"
+#include "texts/ErrorTexts.hpp"
 #include "writing/Leftovers.hpp"
 #include "writing/StoreFiles.hpp"
 
@@ -24,8 +25,7 @@ FileChanges NewStore::createFiles() {
     createFile(StoreFiles::text, text.body(), changes);
     if (created_.empty() || created_.back().name != StoreFiles::text) {
         throw StoreError(StoreError::Kind::Busy, StoreFiles::pathOfText(disk_), 0,
-                         "was created by another program at this moment, and the batch is not in the project",
-                         "Try again.");
+                         errorTexts.get("CreatedByProgram"), errorTexts.get("TryAgain"));
     }
     seen_.replaced(std::move(text), created_.back().file);
     disk_.syncFolder();

@@ -7,6 +7,7 @@
 
 #include "project/stores/StoreError.hpp"
 #include "project/stores/SystemDisk.hpp"
+#include "texts/ErrorTexts.hpp"
 #include "writing/StoreFiles.hpp"
 
 namespace project::stores {
@@ -79,7 +80,7 @@ void ignorePersonalText(Disk& disk) {
         }
     }
     throw StoreError(StoreError::Kind::Busy, disk.folder() + '/' + StoreFiles::ignored, 0,
-                     "is being changed by another program", "Try again.");
+                     errorTexts.get("ChangedByProgram"), errorTexts.get("TryAgain"));
 }
 
 } // namespace project::stores

@@ -5,6 +5,7 @@
 
 #include "project/stores/StoreError.hpp"
 #include "text/TextDifference.hpp"
+#include "texts/ErrorTexts.hpp"
 #include "writing/StoreFiles.hpp"
 
 namespace project::stores {
@@ -39,11 +40,9 @@ Changes SeenText::checkForChanges(milliseconds patience) {
     milliseconds nap(1);
     while (!checkOnce(changes, waited >= std::min(patience, longestWithoutText))) {
         if (waited >= patience) {
-            throw StoreError(
-                StoreError::Kind::Damaged, StoreFiles::pathOfText(disk_), 0,
-                seen_ ? "is missing or ends before its last line" : "ends before its last line",
-                "If git or an editor is writing it, try again when that has finished; otherwise restore "
-                "a complete text, for example with git checkout.");
+            throw StoreError(StoreError::Kind::Damaged, StoreFiles::pathOfText(disk_), 0,
+                             errorTexts.get(seen_ ? "MissingOrEndsEarly" : "EndsEarly"),
+                             errorTexts.get("RemedyOfUnfinished"));
         }
         nap = std::min(nap, patience - waited);
         disk_.pause(nap);

@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "texts/ErrorTexts.hpp"
 #include "writing/Leftovers.hpp"
 #include "writing/StoreFiles.hpp"
 
@@ -11,8 +12,7 @@ namespace {
 
 /// The remedy after a failure with an unknown outcome.
 std::string reopenAfter(StoreError const& failure) {
-    return failure.remedy() + (failure.remedy().empty() ? "" : " ") +
-           "Then reopen the project, and check whether the last change is there.";
+    return failure.remedy() + (failure.remedy().empty() ? "" : " ") + errorTexts.get("ThenReopenAndCheck");
 }
 
 } // namespace
@@ -38,7 +38,7 @@ void StoreWriter::append(std::string_view lines) {
         if (!disk_.isFolderInPlace()) {
             // The folder was moved away with the batch in it. The batch must not return with the folder.
             rollBack(written->identity, StoreError(StoreError::Kind::Busy, StoreFiles::pathOfText(disk_), 0,
-                                                   "was moved away", ""));
+                                                   errorTexts.get("MovedAway"), ""));
         }
         throwReplaced();
     }
@@ -98,8 +98,7 @@ void StoreWriter::rewrite(ProjectText next) {
 void StoreWriter::requireKnownOutcome() const {
     if (isOutcomeUnknown_) {
         throw StoreError(StoreError::Kind::Refused, StoreFiles::pathOfText(disk_), 0,
-                         "is not written any more, since an earlier write failed with an unknown outcome",
-                         "Reopen the project, and check whether the last change is there.");
+                         errorTexts.get("OutcomeUnknown"), errorTexts.get("ReopenAndCheck"));
     }
 }
 
@@ -114,8 +113,7 @@ std::optional<StoreWriter::Replacement> StoreWriter::replace(std::string_view by
         auto const swapping = StoreFiles::swapping(expected, file.identity);
         if (!disk_.renameToFree(name, swapping)) {
             throw StoreError(StoreError::Kind::Damaged, disk_.folder() + "/" + swapping, 0,
-                             "exists, although the store needs the name for a new text",
-                             "Move it away and try again.");
+                             errorTexts.get("NameNeeded"), errorTexts.get("RemedyOfNeededName"));
         }
         name = swapping;
         return exchange(name, file, expected);
@@ -185,9 +183,7 @@ void StoreWriter::undoExchange(std::string const& name, FileIdentity const& ours
     } catch (StoreError const& failure) {
         setOutcomeUnknown(ours);
         throw StoreError(StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
-                         failure.problem() + "; the other program's text is restored, but after a power "
-                                             "failure the batch may be in the project",
-                         reopenAfter(failure));
+                         errorTexts.get("OtherTextRestored", failure.problem()), reopenAfter(failure));
     }
     if (!removeOwn(name, ours)) {
         setAside(disk_, name); // another program has replaced it in between
@@ -202,12 +198,8 @@ void StoreWriter::throwNotRestored(std::string const& name, FileIdentity const& 
     } catch (StoreError const&) {
         // It keeps its name, and the next writer restores it or sets it aside.
     }
-    throw StoreError(
-        StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
-        "was perhaps replaced by another program while a batch was written, and could not be restored: "
-        "it is now " +
-            aside + ", and the text in its place contains the batch",
-        "Compare the two files and keep the right one.");
+    throw StoreError(StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
+                     errorTexts.get("OtherTextNotRestored", aside), errorTexts.get("RemedyOfNotRestored"));
 }
 
 /// The path leads elsewhere now. If the folder was moved away, the batch must not return with it.
@@ -223,7 +215,7 @@ void StoreWriter::abandon(Replacement const& replacement) {
 /// be trusted any more, so the text without the batch is written to a new file, byte for byte: conflict
 /// markers and damage survive a write that failed.
 void StoreWriter::rollBack(FileIdentity const& current, StoreError const& failure) {
-    std::string reason = "another program wrote into it at the same time";
+    std::string reason = errorTexts.get("WrittenByProgram");
     try {
         auto before = seen_.text().bytes();
         if (auto const replacement = replace(before, current)) {
@@ -242,9 +234,7 @@ void StoreWriter::rollBack(FileIdentity const& current, StoreError const& failur
     }
     setOutcomeUnknown(current);
     throw StoreError(StoreError::Kind::OutcomeUnknown, StoreFiles::pathOfText(disk_), 0,
-                     failure.problem() + "; writing the text without the last batch failed too (" + reason +
-                         "): it is unknown whether the batch is in the project",
-                     reopenAfter(failure));
+                     errorTexts.get("RollbackFailed", failure.problem(), reason), reopenAfter(failure));
 }
 
 /// Makes this object refuse further writes. The system's cached content of the text may differ from the disk,
@@ -296,11 +286,8 @@ bool StoreWriter::removeOwn(std::string const& name, FileIdentity const& ours) {
 }
 
 void StoreWriter::throwReplaced() const {
-    throw StoreError(
-        StoreError::Kind::Busy, StoreFiles::pathOfText(disk_), 0,
-        "was replaced, changed or moved by another program at this moment, and the batch is not in "
-        "the project",
-        "Try again.");
+    throw StoreError(StoreError::Kind::Busy, StoreFiles::pathOfText(disk_), 0,
+                     errorTexts.get("ReplacedByProgram"), errorTexts.get("TryAgain"));
 }
 
 } // namespace project::stores

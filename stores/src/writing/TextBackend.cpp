@@ -8,6 +8,7 @@
 #include "text/ProjectText.hpp"
 #include "text/TextDifference.hpp"
 #include "text/TextTail.hpp"
+#include "texts/ErrorTexts.hpp"
 #include "writing/Leftovers.hpp"
 #include "writing/NewStore.hpp"
 #include "writing/SeenText.hpp"
@@ -26,9 +27,6 @@ Path TextBackend::textPath(Path const& projectRoot) {
 }
 
 namespace {
-
-char const* const resolveTheConflict =
-    "Resolve the conflict with \"projectctl resolve\" or in an editor, and try again.";
 
 /// A batch between write and keep: either the lines to append, or the new text.
 struct Pending {
@@ -83,6 +81,7 @@ private:
     /// Locks the folder and checks for changes. @return false if there is no text.
     bool lockAndCheck(milliseconds patience);
     void requireWritable() const;
+    /// @param remedy the name of its text.
     void requireNoFault(Fault::Kind kind, char const* remedy) const;
     FileChanges createStore();
     Pending prepare(Batch const& batch) const;
@@ -132,8 +131,9 @@ bool TextBackend::State::lock(milliseconds patience) {
         if (!disk_->lock(patience)) {
             auto const holder = disk_->lockHolder();
             throw StoreError(StoreError::Kind::Busy, disk_->folder(), 0,
-                             "is locked by " + (holder.empty() ? "another process" : holder),
-                             "Try again when it has finished.");
+                             holder.empty() ? errorTexts.get("LockedByOther")
+                                            : errorTexts.get("LockedBy", holder),
+                             errorTexts.get("RemedyOfLock"));
         }
         isLocked_ = true;
         if (disk_->isFolderInPlace()) {
@@ -193,10 +193,8 @@ FileChanges TextBackend::State::write(Batch const& batch) {
 
 void TextBackend::State::requireWritable() const {
     writer_.requireKnownOutcome();
-    requireNoFault(Fault::Kind::Conflict, resolveTheConflict);
-    requireNoFault(Fault::Kind::Damage,
-                   "A damaged text is not written. Run \"projectctl check\" to see all of the damage, and "
-                   "\"projectctl check --repair\" to set it aside.");
+    requireNoFault(Fault::Kind::Conflict, "RemedyOfConflict");
+    requireNoFault(Fault::Kind::Damage, "RemedyOfDamage");
 }
 
 void TextBackend::State::requireNoFault(Fault::Kind kind, char const* remedy) const {
@@ -209,7 +207,7 @@ void TextBackend::State::requireNoFault(Fault::Kind kind, char const* remedy) co
     if (found != faults.end()) {
         throw StoreError(kind == Fault::Kind::Conflict ? StoreError::Kind::Conflict
                                                        : StoreError::Kind::Damaged,
-                         pathOfText(), found->line, found->problem, remedy);
+                         pathOfText(), found->line, found->problem, errorTexts.get(remedy));
     }
 }
 
@@ -223,10 +221,8 @@ FileChanges TextBackend::State::createStore() {
         checkForChanges(options_.patience);
         if (seen_.exists()) {
             // The batch assumes an empty project.
-            throw StoreError(
-                StoreError::Kind::Busy, pathOfText(), 0,
-                "was created by another process at this moment, and the batch is not in the project",
-                "Try again.");
+            throw StoreError(StoreError::Kind::Busy, pathOfText(), 0, errorTexts.get("CreatedByProcess"),
+                             errorTexts.get("TryAgain"));
         }
     }
     return newStore_.createFiles();
@@ -297,7 +293,7 @@ std::string TextBackend::State::repair() {
         return {};
     }
     writer_.requireKnownOutcome();
-    requireNoFault(Fault::Kind::Conflict, resolveTheConflict);
+    requireNoFault(Fault::Kind::Conflict, "RemedyOfConflict");
     auto const damaged = seen_.text().damagedLines();
     if (damaged.empty()) {
         return {};
@@ -314,15 +310,13 @@ std::string TextBackend::State::repair() {
 void TextBackend::State::resolve(std::string resolved) {
     auto const next = ProjectText::read(std::move(resolved), pathOfText());
     if (!next || next->hasFault(Fault::Kind::Damage) || next->hasFault(Fault::Kind::Conflict)) {
-        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0,
-                         "the new text is incomplete, damaged or contains conflict markers", "");
+        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0, errorTexts.get("NewTextFaulty"), "");
     }
     Unlocking const unlocking(*this);
     seen_.distrust();
     bool const isThere = lockAndCheck(options_.patience);
     if (!isThere || !seen_.text().hasFault(Fault::Kind::Conflict)) {
-        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0, "the text contains no conflict markers",
-                         "");
+        throw StoreError(StoreError::Kind::Refused, pathOfText(), 0, errorTexts.get("NoConflictMarkers"), "");
     }
     writer_.requireKnownOutcome();
     writer_.rewrite(next->rewrittenWith({}));
@@ -342,10 +336,7 @@ std::vector<Fault> TextBackend::State::check() {
     if (disk_->openFolder()) {
         for (auto const& name : disk_->list()) {
             if (StoreFiles::isDisplaced(name)) {
-                faults.push_back(
-                    {Fault::Kind::Displaced, 0,
-                     name + " is not a file of the store: another program created it at a name that "
-                            "the store needed, or in place of the text"});
+                faults.push_back({Fault::Kind::Displaced, 0, errorTexts.get("Displaced", name)});
             }
         }
     }

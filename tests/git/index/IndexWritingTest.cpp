@@ -13,6 +13,7 @@
 #include "git/GitRepository.hpp"
 #include "project/git/GitError.hpp"
 #include "support/ChildProcess.hpp"
+#include "support/GlobalLocale.hpp"
 #include "support/ReplacementCount.hpp"
 #include "support/Waiting.hpp"
 
@@ -97,6 +98,24 @@ TEST_F(IndexWriting, aLockedIndexIsAnErrorThatNamesTheLockFileAndTryingAgainWork
     EXPECT_EQ(stateOf("old"), 6);
     EXPECT_EQ(repository.statusStates(), (States{{"a", 5}, {"old", 6}}));
     expectNothingLeftBehind();
+}
+
+TEST_F(IndexWriting, anErrorIsInTheLanguageOfTheProcess) {
+    repository.write("a");
+    std::ofstream(lockFile()).close();
+    test::GlobalLocale const language("de_DE");
+
+    try {
+        add({"a"});
+        FAIL() << "nothing was thrown";
+    } catch (GitError const& error) {
+        EXPECT_EQ(error.problem(),
+                  "der Index ist gesperrt: git läuft in diesem Repository oder wurde gewaltsam beendet");
+        EXPECT_EQ(error.remedy(),
+                  "Versuchen Sie es noch einmal, wenn git fertig ist; läuft git nicht, löschen "
+                  "Sie diese Datei und versuchen Sie es noch einmal.");
+        EXPECT_EQ(error.what(), lockFile().string() + ": " + error.problem() + ". " + error.remedy());
+    }
 }
 
 TEST_F(IndexWriting, aLockDoesNotBlockQueries) {

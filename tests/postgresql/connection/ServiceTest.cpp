@@ -11,6 +11,7 @@
 #include "postgresql/SharedProjectFixture.hpp"
 #include "support/ChildProcess.hpp"
 #include "support/EnvironmentVariable.hpp"
+#include "support/GlobalLocale.hpp"
 
 namespace project::postgresql {
 
@@ -54,6 +55,14 @@ TEST_F(ServiceTest, aServiceThatDoesNotExistIsNamed) {
     EXPECT_EQ(error.kind(), StoreError::Kind::Refused);
     EXPECT_THAT(error.what(), AllOf(HasSubstr("no such service: the service cannot be used"),
                                     HasSubstr("~/.pg_service.conf")));
+}
+
+TEST_F(ServiceTest, anErrorIsInTheLanguageOfTheProcess) {
+    test::GlobalLocale const language("de_DE");
+
+    EXPECT_THAT(errorWith("no such service").what(),
+                AllOf(HasSubstr("no such service: der Dienst kann nicht benutzt werden: "),
+                      HasSubstr("Tragen Sie den Dienst in die Dienstdatei von libpq ein")));
 }
 
 TEST_F(ServiceTest, anUnreadableConnectionStringIsRefused) {

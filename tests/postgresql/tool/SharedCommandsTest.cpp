@@ -191,6 +191,15 @@ TEST_F(SharedCommands, aServiceThatDoesNotExistIsNamed) {
     EXPECT_THAT(elsewhere({"list"}), FailsWith(1, "nosuchservice: the service cannot be used"));
 }
 
+/// The library of the server is loaded, and has texts and a language of its own.
+TEST_F(SharedCommands, errorsOfTheServerAreInTheLanguageOfTheUser) {
+    settings_.environment["LANG"] = "de_DE.UTF-8";
+
+    EXPECT_THAT(tool({"init", "--store", "nosuchservice"}),
+                FailsWith(1, "nosuchservice: der Dienst kann nicht benutzt werden"));
+    EXPECT_THAT(tool({"init", "--store", "rita"}), FailsWith(1, "der Benutzer darf das nicht"));
+}
+
 TEST_F(SharedCommands, aDatabaseThatIsNotOursIsRefused) {
     addService("foreign", sharedServer().connection("owner", "postgres"));
 

@@ -91,6 +91,41 @@ TEST_F(German, warningsAndFindings) {
     EXPECT_THAT(result.output, HasSubstr("die Datei „lost/file“ ist im Projekt, aber ihr Ordner nicht"));
 }
 
+TEST_F(German, errorsOfTheStore) {
+    insertLineBefore("\"a\"", "nonsense");
+
+    EXPECT_THAT(tool({"add", "b"}),
+                FailsWith(5,
+                          ": die Zeile ist kein gültiges JSON. Ein beschädigter Text wird nicht geschrieben. "
+                          "„projectctl check“ zeigt alle Schäden"));
+    EXPECT_THAT(tool({"check"}).output, HasSubstr("die Zeile ist kein gültiges JSON"));
+}
+
+TEST_F(German, errorsOfTheStoreWithTheOtherVariablesOfTheLocale) {
+    writeText("hello\n");
+    for (auto const* variable : {"LC_MESSAGES", "LC_ALL"}) {
+        settings_.environment["LANG"] = "C";
+        settings_.environment[variable] = "de_DE.UTF-8";
+
+        EXPECT_THAT(tool({"list"}), FailsWith(5, "die Datei ist keine Projektdefinition"));
+
+        settings_.environment.erase(variable);
+        EXPECT_THAT(tool({"list"}), FailsWith(5, "the file is not a project definition"));
+    }
+}
+
+TEST_F(German, errorsOfGit) {
+    ASSERT_EQ(runProgram({"git", "init", "-q"}, settings_).exitCode, 0);
+    folder_.addFile(".git/index.lock");
+
+    EXPECT_THAT(tool({"add", "b"}), FailsWith(4, "der Index ist gesperrt: git läuft in diesem Repository"));
+}
+
+TEST_F(German, aLineOfAnImport) {
+    EXPECT_THAT(tool({"import", "jsonl"}, "nonsense\n").errors,
+                HasSubstr("kein Objekt, dessen Mitglieder Texte sind: die Zeile ist kein gültiges JSON"));
+}
+
 TEST_F(German, documentsDifferFromEnglishOnesInTheirTextsOnly) {
     static std::regex const text(R"re("text": "(?:[^"\\]|\\.)*")re");
     addFault();

@@ -2,6 +2,7 @@
 #include <regex>
 #include <set>
 
+#include "support/CatalogSource.hpp"
 #include "support/GlobalLocale.hpp"
 #include "texts/Message.hpp"
 #include "tools/texts/CatalogSource.hpp"
@@ -49,30 +50,12 @@ TEST_P(Messages, showTheirArguments) {
 
 INSTANTIATE_TEST_SUITE_P(InBothLanguages, Messages, ::testing::Values("en", "de"));
 
-/// The sources of the tool, by their paths.
-std::map<std::string, std::string> sources() {
-    std::map<std::string, std::string> result;
-    for (auto const& entry : std::filesystem::recursive_directory_iterator(PROJECTCTL_SOURCES)) {
-        if (entry.path().extension() == ".cpp" || entry.path().extension() == ".hpp") {
-            std::ifstream file(entry.path(), std::ios::binary);
-            result[entry.path().lexically_relative(PROJECTCTL_SOURCES).string()] = {
-                std::istreambuf_iterator<char>(file), {}};
-        }
-    }
-    return result;
-}
-
-std::set<std::string> matchesIn(std::string const& text, std::regex const& expression) {
-    return {std::sregex_token_iterator(text.begin(), text.end(), expression, 1),
-            std::sregex_token_iterator()};
-}
-
 TEST(MessageKeys, ofTheSourcesAreInTheCatalogAndNoOthers) {
     static std::regex const used(R"re(Message\(\s*"(\w+)"\s*[,)])re");
     static std::regex const word(R"re("([A-Z]\w+)")re");
     auto const texts = readTexts("messages", "root");
     std::set<std::string> words;
-    for (auto const& [path, source] : sources()) {
+    for (auto const& [path, source] : sourcesBelow(PROJECTCTL_SOURCES)) {
         for (auto const& key : matchesIn(source, used)) {
             EXPECT_TRUE(texts.contains(key)) << path << ": " << key;
         }
@@ -87,7 +70,6 @@ TEST(MessageKeys, ofTheSourcesAreInTheCatalogAndNoOthers) {
 
 /// Texts of at least three words are for people. Those of programs are listed here.
 TEST(Sentences, areInTheCatalogsOnly) {
-    static std::regex const comment(R"(//[^\n]*)");
     static std::regex const sentence(
         R"re("((?:[^"\\\n]|\\.)*[A-Za-z]{2,} [a-z]{2,} [a-z]{2,}(?:[^"\\\n]|\\.)*)")re");
     std::set<std::string> const ofPrograms{
@@ -97,9 +79,9 @@ TEST(Sentences, areInTheCatalogsOnly) {
         "manual/GuidePage.cpp",     // a page in English
         "manual.cpp",               // a program of the build
     };
-    for (auto const& [path, source] : sources()) {
+    for (auto const& [path, source] : sourcesBelow(PROJECTCTL_SOURCES)) {
         if (!ofPrograms.contains(path)) {
-            EXPECT_THAT(matchesIn(std::regex_replace(source, comment, ""), sentence), IsEmpty()) << path;
+            EXPECT_THAT(matchesIn(withoutComments(source), sentence), IsEmpty()) << path;
         }
     }
 }

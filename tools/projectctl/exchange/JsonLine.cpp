@@ -25,7 +25,7 @@ JsonTexts readJsonLine(std::string_view line) {
         }
     }
     if (!isValid || !reader.expect('}') || !reader.end()) {
-        throw Failure(Message("NotAnObject", reader.problem()));
+        throw Failure(Message("NotAnObject", reader.problemText()));
     }
     return result;
 }

@@ -9,12 +9,13 @@
 #include "project/git/GitError.hpp"
 #include "repository/FileContent.hpp"
 #include "states/ConvertedContent.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
 namespace {
 
-constexpr auto action = "the file cannot be staged";
+constexpr auto problem = "NotStaged";
 constexpr off_t tooLargeForMemory = off_t{64} << 20;
 
 } // namespace
@@ -23,12 +24,12 @@ BlobWriter::BlobWriter(Repository const& repository) : repository_(repository) {
     std::string const folder = libgit().git_repository_commondir(repository.get()) + std::string("objects");
     git_odb* objects = nullptr;
     git_odb_backend* backend = nullptr;
-    require(libgit().git_odb_new(&objects), folder, action);
+    require(libgit().git_odb_new(&objects), folder, problem);
     objects_.reset(objects);
-    require(libgit().git_odb_backend_loose(&backend, folder.c_str(), -1, 0, 0, 0), folder, action);
+    require(libgit().git_odb_backend_loose(&backend, folder.c_str(), -1, 0, 0, 0), folder, problem);
     if (auto const code = libgit().git_odb_add_backend(objects, backend, 1); code < 0) {
         backend->free(backend);
-        require(code, folder, action);
+        require(code, folder, problem);
     }
 }
 
@@ -36,7 +37,7 @@ bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isC
     std::string const name = repository_.workTree().onDisk(path);
     if (S_ISREG(onDisk.st_mode) && onDisk.st_size > tooLargeForMemory) {
         auto const code = libgit().git_blob_create_from_workdir(&id, repository_.get(), path.c_str());
-        require(code == GIT_ENOTFOUND ? 0 : code, name, action);
+        require(code == GIT_ENOTFOUND ? 0 : code, name, problem);
         return code == 0;
     }
     auto const content = S_ISLNK(onDisk.st_mode)
@@ -47,8 +48,8 @@ bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isC
     }
     if (!content) {
         throw GitError(GitError::Kind::Failed, name,
-                       "the file cannot be read: " + std::generic_category().message(errno),
-                       "Check its permissions, and try again.");
+                       errorTexts.get("FileUnreadable", std::generic_category().message(errno)),
+                       errorTexts.get("RemedyOfUnreadableFile"));
     }
     store(path, isConverted && S_ISREG(onDisk.st_mode) ? convert(path, *content) : *content, id);
     return true;
@@ -57,14 +58,14 @@ bool BlobWriter::write(TreePath const& path, struct stat const& onDisk, bool isC
 std::string BlobWriter::convert(TreePath const& path, std::string const& content) const {
     auto result = convertedContent(repository_, path, content);
     if (!result) {
-        throwLibGitError(repository_.workTree().onDisk(path), action);
+        throwLibGitError(repository_.workTree().onDisk(path), problem);
     }
     return *std::move(result);
 }
 
 void BlobWriter::store(TreePath const& path, std::string const& content, git_oid& id) const {
     require(libgit().git_odb_write(&id, objects_.get(), content.data(), content.size(), GIT_OBJECT_BLOB),
-            repository_.workTree().onDisk(path), action);
+            repository_.workTree().onDisk(path), problem);
 }
 
 } // namespace project::git

@@ -10,6 +10,7 @@
 #include <unistd.h>
 
 #include "project/git/GitError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
@@ -17,8 +18,8 @@ namespace {
 
 [[noreturn]] void throwUnwritable(std::string const& file, int error) {
     throw GitError(GitError::Kind::Failed, file,
-                   "the index cannot be written: " + std::generic_category().message(error),
-                   "Check the permissions of the repository and the free space on its disk, and try again.");
+                   errorTexts.get("IndexUnwritable", std::generic_category().message(error)),
+                   errorTexts.get("RemedyOfUnwritableIndex"));
 }
 
 /// A file that is open for writing; created if it does not exist.
@@ -64,9 +65,8 @@ IndexLock::IndexLock(std::string index)
     : index_(std::move(index)), lock_(index_ + ".lock"), newIndex_(index_ + ".lock.new") {
     auto const descriptor = ::open(lock_.c_str(), O_CREAT | O_EXCL | O_WRONLY | O_CLOEXEC, 0666);
     if (descriptor < 0 && errno == EEXIST) {
-        throw GitError(GitError::Kind::Busy, lock_,
-                       "the index is locked: git is running in this repository, or was killed",
-                       "Try again when it has ended; if git is not running, delete this file and try again.");
+        throw GitError(GitError::Kind::Busy, lock_, errorTexts.get("IndexLocked"),
+                       errorTexts.get("RemedyOfLockedIndex"));
     }
     if (descriptor < 0) {
         throwUnwritable(lock_, errno);

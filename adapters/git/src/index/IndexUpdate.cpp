@@ -7,6 +7,7 @@
 #include "repository/DiskEntry.hpp"
 #include "repository/TrackedFiles.hpp"
 #include "states/EntryComparison.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
@@ -14,8 +15,8 @@ namespace {
 
 void requireIntact(IndexContent const& index, std::string const& file) {
     if (!index.hasValidChecksum()) {
-        throw GitError(GitError::Kind::Failed, file, "the index is damaged: its checksum is wrong",
-                       "Delete it, and enter `git reset` to create it again.");
+        throw GitError(GitError::Kind::Failed, file, errorTexts.get("IndexSumWrong"),
+                       errorTexts.get("RemedyOfWrongSum"));
     }
 }
 
@@ -65,13 +66,13 @@ void IndexUpdate::publish() {
 /// libgit2 checks the names: an index must not contain some that other systems treat as ".git".
 void IndexUpdate::requireValidNames(IndexChanges const& changes) const {
     git_index* created = nullptr;
-    require(libgit().git_index_new(&created), repository_.indexFile(), "the index cannot be written");
+    require(libgit().git_index_new(&created), repository_.indexFile(), "IndexNotWritten");
     IndexHandle const checked(created);
     for (auto const& [path, staged] : changes.staged) {
         auto entry = staged;
         entry.path = path.c_str();
         require(libgit().git_index_add(created, &entry), repository_.workTree().onDisk(path),
-                "the index cannot contain the file");
+                "IndexCannotContain");
     }
 }
 

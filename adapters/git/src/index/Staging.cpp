@@ -6,6 +6,7 @@
 #include "rules/ContentRules.hpp"
 #include "states/EntryComparison.hpp"
 #include "states/WorkTreeFolders.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
@@ -13,20 +14,19 @@ namespace {
 
 void requireNothingForeign(std::string const& file, Conversion const& conversion) {
     if (!conversion.foreign.empty()) {
-        throw GitError(GitError::Kind::Refused, file,
-                       "the file cannot be staged here: " + conversion.foreign + " has to be applied to it",
-                       "Stage it with `git add`, then try again.");
+        throw GitError(GitError::Kind::Refused, file, errorTexts.get("StagedByGitOnly", conversion.foreign),
+                       errorTexts.get("RemedyOfStaging"));
     }
 }
 
 void requireMovable(git_index_entry const& entry, std::string const& file) {
     if (isSubmodule(entry)) {
-        throw GitError(GitError::Kind::Refused, file, "a submodule cannot be moved here",
-                       "Move it with `git mv`, which also changes its settings.");
+        throw GitError(GitError::Kind::Refused, file, errorTexts.get("SubmoduleMoved"),
+                       errorTexts.get("RemedyOfSubmodule"));
     }
     if (((entry.flags & GIT_INDEX_ENTRY_STAGEMASK) >> GIT_INDEX_ENTRY_STAGESHIFT) != 0) {
-        throw GitError(GitError::Kind::Refused, file, "the file is in a conflict of git and cannot be moved",
-                       "Resolve the conflict, enter `git add` for the file, and try again.");
+        throw GitError(GitError::Kind::Refused, file, errorTexts.get("ConflictMoved"),
+                       errorTexts.get("RemedyOfConflict"));
     }
 }
 

@@ -7,7 +7,7 @@ namespace project::git {
 
 namespace {
 
-constexpr auto headUnreadable = "the last commit cannot be read";
+constexpr auto headUnreadable = "HeadUnreadable";
 
 } // namespace
 

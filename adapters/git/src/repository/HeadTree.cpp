@@ -4,7 +4,7 @@ namespace project::git {
 
 namespace {
 
-constexpr auto unreadable = "the last commit cannot be read";
+constexpr auto unreadable = "HeadUnreadable";
 
 } // namespace
 

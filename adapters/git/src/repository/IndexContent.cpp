@@ -7,6 +7,7 @@
 #include <nettle/sha1.h>
 
 #include "project/git/GitError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
@@ -36,10 +37,8 @@ std::uint16_t flagsAt(char const* bytes) {
 }
 
 [[noreturn]] void throwUnreadable(std::string const& file, std::string const& reason) {
-    throw GitError(GitError::Kind::Failed, file, "the index cannot be read: " + reason,
-                   "If `git status` reads it, it has a format that this library does not know. "
-                   "`git update-index --no-split-index --index-version 2` and "
-                   "`git sparse-checkout reapply --no-sparse-index` write it in a known format.");
+    throw GitError(GitError::Kind::Failed, file, errorTexts.get("IndexUnreadable", reason),
+                   errorTexts.get("RemedyOfUnknownIndex"));
 }
 
 } // namespace
@@ -65,7 +64,7 @@ IndexContent::IndexContent(std::string bytes, std::string const& file) : bytes_(
         }
         requireKnownExtensions(end_, file);
     } catch (NotAnIndex) {
-        throwUnreadable(file, "it is damaged");
+        throwUnreadable(file, errorTexts.get("IndexDamaged"));
     }
 }
 
@@ -74,7 +73,7 @@ void IndexContent::readHeader(std::string const& file) {
                   bytes_.size() <= std::numeric_limits<std::uint32_t>::max());
     version_ = numberAt(bytes_.data() + 4);
     if (version_ < 2 || version_ > 4) {
-        throwUnreadable(file, "its version is " + std::to_string(version_));
+        throwUnreadable(file, errorTexts.get("IndexVersion", version_));
     }
 }
 
@@ -133,7 +132,7 @@ void IndexContent::requireKnownExtensions(std::size_t offset, std::string const&
         requireFormat(end - offset >= 8);
         auto const name = bytes_.substr(offset, 4);
         if (name[0] < 'A' || name[0] > 'Z') {
-            throwUnreadable(file, "it has the extension \"" + name + '"');
+            throwUnreadable(file, errorTexts.get("IndexExtension", name));
         }
         auto const size = std::size_t{numberAt(bytes_.data() + offset + 4)};
         requireFormat(size <= end - offset - 8);

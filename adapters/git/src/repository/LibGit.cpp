@@ -5,6 +5,7 @@
 #include <unistd.h>
 
 #include "project/git/GitError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
@@ -28,7 +29,7 @@ void ignoreUnreadable(git_config_level_t level, char const* file) {
 } // namespace
 
 LibGit::LibGit() {
-    require(libgit().git_libgit2_init(), "", "libgit2 cannot be used");
+    require(libgit().git_libgit2_init(), "", "LibGitFailed");
     ignoreUnreadable(GIT_CONFIG_LEVEL_GLOBAL, ".gitconfig");
     ignoreUnreadable(GIT_CONFIG_LEVEL_XDG, "config");
 }
@@ -37,15 +38,16 @@ LibGit::~LibGit() {
     libgit().git_libgit2_shutdown();
 }
 
-void throwLibGitError(std::string const& file, std::string const& action, std::string const& remedy) {
+void throwLibGitError(std::string const& file, char const* problem) {
     auto const* const error = libgit().git_error_last();
     throw GitError(GitError::Kind::Failed, file,
-                   action + (error == nullptr ? "" : ": " + std::string(error->message)), remedy);
+                   errorTexts.get(problem) + (error == nullptr ? "" : ": " + std::string(error->message)),
+                   "");
 }
 
-void require(int code, std::string const& file, char const* action) {
+void require(int code, std::string const& file, char const* problem) {
     if (code < 0) {
-        throwLibGitError(file, action);
+        throwLibGitError(file, problem);
     }
 }
 

@@ -44,12 +44,11 @@ inline std::string bytesOf(git_oid const& id) {
 
 /// Throws a GitError with the message of libgit2's last error.
 /// @param file the file or folder concerned.
-/// @param action the failure, for example "the index cannot be read".
-[[noreturn]] void throwLibGitError(std::string const& file, std::string const& action,
-                                   std::string const& remedy = "");
+/// @param problem the name of the text of the problem, for example "IndexNotRead".
+[[noreturn]] void throwLibGitError(std::string const& file, char const* problem);
 
 /// The same if a call of libgit2 returned an error code.
-void require(int code, std::string const& file, char const* action);
+void require(int code, std::string const& file, char const* problem);
 
 /// Whether there is a repository at a folder or above it, regardless of its owner.
 /// @param ceiling the folder above that the search does not reach; empty for a search up to the root.

@@ -5,6 +5,7 @@
 #include <dlfcn.h>
 
 #include "project/git/GitError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
@@ -15,8 +16,9 @@ char const* const libraryName = PROJECT_GIT_LIBGIT2_SONAME;
 [[noreturn]] void throwNotLoaded() {
     auto const* const reason = dlerror();
     throw GitError(GitError::Kind::Failed, libraryName,
-                   "libgit2 cannot be loaded" + (reason == nullptr ? "" : ": " + std::string(reason)),
-                   "Install the package of libgit2, or turn source control off.");
+                   reason == nullptr ? errorTexts.get("LibGitMissing")
+                                     : errorTexts.get("LibGitMissingBecause", reason),
+                   errorTexts.get("RemedyOfMissingLibGit"));
 }
 
 void* openLibrary() {

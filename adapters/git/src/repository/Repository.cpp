@@ -7,6 +7,7 @@
 #include "project/git/GitError.hpp"
 #include "repository/FileContent.hpp"
 #include "repository/TrackedFiles.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
@@ -15,7 +16,7 @@ namespace {
 ConfigHandle configOf(git_repository* repository) {
     git_config* config = nullptr;
     require(libgit().git_repository_config(&config, repository), libgit().git_repository_path(repository),
-            "the configuration cannot be read");
+            "ConfigurationUnreadable");
     return ConfigHandle(config);
 }
 
@@ -46,7 +47,7 @@ void Repository::addWorkTreeConfiguration() {
     if (isSet("extensions.worktreeConfig", false) && FileStamp::of(file) != FileStamp()) {
         require(
             libgit().git_config_add_file_ondisk(config_.get(), file.c_str(), GIT_CONFIG_LEVEL_APP, get(), 1),
-            file, "the configuration cannot be read");
+            file, "ConfigurationUnreadable");
     }
 }
 
@@ -70,8 +71,8 @@ void Repository::readIndex() {
     }
     if (!bytes) {
         throw GitError(GitError::Kind::Failed, indexFile_,
-                       "the index cannot be read: " + std::generic_category().message(errno),
-                       "Check the permissions of the repository, and try again.");
+                       errorTexts.get("IndexUnreadable", std::generic_category().message(errno)),
+                       errorTexts.get("RemedyOfUnreadableIndex"));
     }
     index_ = std::make_shared<IndexContent>(*std::move(bytes), indexFile_);
 }

@@ -6,16 +6,15 @@
 
 #include "fl/filesystem/SystemName.hpp"
 #include "project/git/GitError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::git {
 
 namespace {
 
 [[noreturn]] void throwOwnerError(std::string const& place) {
-    throw GitError(
-        GitError::Kind::Refused, place, "the repository cannot be used: it belongs to another user",
-        "If you trust its owner, enter `git config --global --add safe.directory` with the top folder "
-        "of its work tree.");
+    throw GitError(GitError::Kind::Refused, place, errorTexts.get("OtherOwner"),
+                   errorTexts.get("RemedyOfOtherOwner"));
 }
 
 /// @return null if there is none.
@@ -28,7 +27,7 @@ RepositoryHandle openAround(char const* root) {
         throwOwnerError(root);
     }
     if (code != GIT_ENOTFOUND) {
-        require(code, root, "the repository cannot be opened");
+        require(code, root, "RepositoryNotOpened");
     }
     return RepositoryHandle(found);
 }
@@ -37,7 +36,7 @@ RepositoryHandle openNamed(char const* repository) {
     git_repository* found = nullptr;
     auto const flags = GIT_REPOSITORY_OPEN_NO_SEARCH | GIT_REPOSITORY_OPEN_NO_DOTGIT;
     require(libgit().git_repository_open_ext(&found, repository, flags, nullptr), repository,
-            "the repository that GIT_DIR names cannot be opened");
+            "GitDirNotOpened");
     return RepositoryHandle(found);
 }
 
@@ -47,8 +46,7 @@ void setWorkTreeTo(git_repository* repository, std::filesystem::path const& fold
     if (current != nullptr && std::filesystem::equivalent(current, folder, missing)) {
         return; // libgit2 1.5.1 leaks memory when it is given the folder that it already has
     }
-    require(libgit().git_repository_set_workdir(repository, folder.c_str(), 0), folder,
-            "the work tree cannot be used");
+    require(libgit().git_repository_set_workdir(repository, folder.c_str(), 0), folder, "WorkTreeNotUsed");
 }
 
 /// git's own rule (git(1), "The Git Repository"): with GIT_DIR alone, the working folder is the work tree.
@@ -60,7 +58,7 @@ void setWorkTree(git_repository* repository) {
     }
     git_config* config = nullptr;
     require(libgit().git_repository_config(&config, repository), libgit().git_repository_path(repository),
-            "the configuration cannot be read");
+            "ConfigurationUnreadable");
     ConfigHandle const owned(config);
     git_config_entry* entry = nullptr;
     int isBare = 0;
@@ -74,9 +72,9 @@ void setWorkTree(git_repository* repository) {
 /// For libgit2, which reads attributes from the index.
 void setIndex(git_repository* repository, char const* file) {
     git_index* index = nullptr;
-    require(libgit().git_index_open(&index, file), file, "the index cannot be read");
+    require(libgit().git_index_open(&index, file), file, "IndexNotRead");
     IndexHandle const owned(index);
-    require(libgit().git_repository_set_index(repository, index), file, "the index cannot be used");
+    require(libgit().git_repository_set_index(repository, index), file, "IndexNotUsed");
 }
 
 /// libgit2 1.5 can read these variables itself, but returns an error if GIT_WORK_TREE is set.

@@ -6,6 +6,8 @@
 
 #include <strings.h>
 
+#include "texts/ErrorTexts.hpp"
+
 namespace project::git {
 
 namespace {
@@ -51,11 +53,11 @@ Conversion ContentRules::conversionOf(TreePath const& path) {
     std::string const driver = valueOf(values, "filter").text;
     std::string const encoding = valueOf(values, "working-tree-encoding").text;
     if (!driver.empty() && isConfigured(driver)) {
-        result.foreign = "the filter driver \"" + driver + '"';
+        result.foreign = errorTexts.get("FilterDriver", driver);
     } else if (!encoding.empty() && !isPlainUtf8(encoding)) {
-        result.foreign = "the encoding \"" + encoding + '"';
+        result.foreign = errorTexts.get("Encoding", encoding);
     } else if (result.isNeeded && !isKnownToLibGit(path, values)) {
-        result.foreign = "an attribute of an unknown form";
+        result.foreign = errorTexts.get("UnknownAttribute");
     }
     return result;
 }
@@ -65,7 +67,7 @@ bool ContentRules::isKnownToLibGit(TreePath const& path, AttributeRules::Values 
     std::array<char const*, converting.size()> found{};
     require(libgit().git_attr_get_many(found.data(), repository_.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX,
                                        path.c_str(), names.size(), names.data()),
-            repository_.workTree().onDisk(path), "the attributes of the file cannot be read");
+            repository_.workTree().onDisk(path), "AttributesUnreadable");
     bool const isTextGiven = valueOf(values, "text") != AttributeValue();
     return std::equal(names.begin(), names.end(), found.begin(),
                       [&](std::string_view name, char const* attribute) {

@@ -7,6 +7,7 @@
 #include <libpq-fe.h>
 
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::postgresql {
 
@@ -70,13 +71,12 @@ OptionList resolve(std::string const& service) {
             return options;
         }
     }
-    std::string problem = probe != nullptr ? PQerrorMessage(probe.get()) : "out of memory";
+    std::string problem = probe != nullptr ? PQerrorMessage(probe.get()) : errorTexts.get("OutOfMemory");
     while (!problem.empty() && problem.back() == '\n') {
         problem.pop_back();
     }
     throw StoreError(StoreError::Kind::Refused, ConnectOptions::nameOf(service), 0,
-                     "the service cannot be used: " + problem,
-                     "Add the service to libpq's service file, ~/.pg_service.conf.");
+                     errorTexts.get("ServiceUnusable", problem), errorTexts.get("RemedyOfService"));
 }
 
 } // namespace
@@ -113,7 +113,7 @@ std::string ConnectOptions::nameOf(std::string const& service) {
             name += (name.empty() ? "" : " ") + std::string(option->val);
         }
     }
-    return name.empty() ? "the server" : name;
+    return name.empty() ? errorTexts.get("TheServer") : name;
 }
 
 std::vector<char const*> ConnectOptions::keywords() const {

@@ -10,6 +10,7 @@
 #include <unistd.h>
 
 #include "connection/ServerError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::postgresql {
 
@@ -55,7 +56,7 @@ Connection::Connection(ConnectOptions const& options, std::string where, Deadlin
       process_(::getpid()),
       handle_(PQconnectStartParams(options.keywords().data(), options.values().data(), 1)) {
     if (handle_ == nullptr) {
-        throw StoreError(StoreError::Kind::DiskFailed, where_, 0, "no memory is left for a connection", "");
+        throw StoreError(StoreError::Kind::DiskFailed, where_, 0, errorTexts.get("NoMemory"), "");
     }
     auto const finish = [](PGconn* handle) { PQfinish(handle); };
     std::unique_ptr<PGconn, decltype(finish)> guard(handle_, finish);
@@ -68,7 +69,7 @@ Connection::Connection(ConnectOptions const& options, std::string where, Deadlin
         }
         short const events = state == PGRES_POLLING_READING ? POLLIN : POLLOUT;
         if (!awaitDescriptor(PQsocket(handle_), events, deadline)) {
-            throw ConnectionLost(where_, "no connection in the time for it");
+            throw ConnectionLost(where_, errorTexts.get("ConnectionTimedOut"));
         }
         state = PQconnectPoll(handle_);
     }
@@ -128,7 +129,8 @@ std::string Connection::quoted(std::string const& identifier) const {
     std::unique_ptr<char, decltype(finish)> const text(
         PQescapeIdentifier(handle_, identifier.data(), identifier.size()), finish);
     if (text == nullptr) {
-        throw StoreError(StoreError::Kind::Refused, where_, 0, "the name cannot be used: " + identifier, "");
+        throw StoreError(StoreError::Kind::Refused, where_, 0, errorTexts.get("NameUnusable", identifier),
+                         "");
     }
     return text.get();
 }
@@ -237,7 +239,7 @@ void Connection::flush(Limits const& limits) {
 void Connection::waitFor(short events, Limits const& limits) {
     auto const limit = std::min(limits.whole.remaining(), limits.silence);
     if (!awaitDescriptor(PQsocket(handle_), events, Deadline(limit))) {
-        throw ConnectionLost(where_, "no answer in " + inSeconds(limit));
+        throw ConnectionLost(where_, errorTexts.get("NoAnswer", inSeconds(limit)));
     }
 }
 

@@ -6,6 +6,8 @@
 
 #include <unistd.h>
 
+#include "texts/ErrorTexts.hpp"
+
 namespace project::postgresql {
 
 namespace {
@@ -16,29 +18,23 @@ using stores::StoreError;
 struct Meaning {
     std::string_view code; ///< its beginning
     StoreError::Kind kind;
-    char const* problem;
-    char const* remedy;
+    char const* problem; ///< the name of its text
+    char const* remedy;  ///< the same; may be empty
 };
 
-constexpr char const* askForAccess = "Check the user and the password in libpq's configuration.";
-constexpr char const* askForRights = "Ask the owner of the project for a role that may do this.";
-constexpr char const* askForSetup =
-    "Check the service's database, or ask the administrator to prepare it with setup.sql.";
-
 constexpr auto meanings = std::to_array<Meaning>({
-    {"28", StoreError::Kind::Refused, "the server refused the user", askForAccess},
-    {"3D000", StoreError::Kind::Refused, "the database does not exist", askForSetup},
-    {"3F000", StoreError::Kind::Refused, "the database does not contain shared projects", askForSetup},
-    {"42P01", StoreError::Kind::Refused, "the database does not contain shared projects", askForSetup},
-    {"42703", StoreError::Kind::Refused, "the database was prepared for another version", askForSetup},
-    {"42501", StoreError::Kind::Refused, "the user may not do this", askForRights},
-    {"42710", StoreError::Kind::Refused, "the role exists already", ""},
-    {"23505", StoreError::Kind::Refused, "the project exists already", ""},
-    {"23", StoreError::Kind::Refused, "the server refused the values", ""},
-    {"22", StoreError::Kind::Refused, "the server refused the values", ""},
-    {"53100", StoreError::Kind::DiskFailed, "the server's disk is full",
-     "Tell the administrator of the server."},
-    {"55P03", StoreError::Kind::Busy, "another process holds the lock", "Try again later."},
+    {"28", StoreError::Kind::Refused, "UserRefused", "RemedyOfAccess"},
+    {"3D000", StoreError::Kind::Refused, "DatabaseMissing", "RemedyOfSetup"},
+    {"3F000", StoreError::Kind::Refused, "DatabaseEmpty", "RemedyOfSetup"},
+    {"42P01", StoreError::Kind::Refused, "DatabaseEmpty", "RemedyOfSetup"},
+    {"42703", StoreError::Kind::Refused, "DatabaseOfOtherVersion", "RemedyOfSetup"},
+    {"42501", StoreError::Kind::Refused, "NotPermitted", "RemedyOfRights"},
+    {"42710", StoreError::Kind::Refused, "RoleExists", ""},
+    {"23505", StoreError::Kind::Refused, "ProjectExists", ""},
+    {"23", StoreError::Kind::Refused, "ValuesRefused", ""},
+    {"22", StoreError::Kind::Refused, "ValuesRefused", ""},
+    {"53100", StoreError::Kind::DiskFailed, "ServerDiskFull", "RemedyOfFullDisk"},
+    {"55P03", StoreError::Kind::Busy, "LockHeld", "TryAgainLater"},
 });
 
 /// Codes with which a server ends a session, or refuses one for now.
@@ -68,13 +64,12 @@ std::string asClause(std::string_view message) {
 [[noreturn]] void throwMeaning(std::string const& where, std::string_view code, std::string const& message) {
     for (auto const& meaning : meanings) {
         if (code.starts_with(meaning.code)) {
-            throw StoreError(meaning.kind, where, 0, std::string(meaning.problem) + ": " + message,
-                             meaning.remedy);
+            throw StoreError(meaning.kind, where, 0, errorTexts.get(meaning.problem, message),
+                             *meaning.remedy == '\0' ? "" : errorTexts.get(meaning.remedy));
         }
     }
-    throw StoreError(StoreError::Kind::DiskFailed, where, 0,
-                     "the server failed: " + message + " (" + std::string(code) + ")",
-                     "Look for the reason in the server's log.");
+    throw StoreError(StoreError::Kind::DiskFailed, where, 0, errorTexts.get("ServerFailed", message, code),
+                     errorTexts.get("RemedyOfFailure"));
 }
 
 /// The last code in a verbose message: with several hosts, that of the last one. Such a message contains
@@ -98,8 +93,8 @@ std::string_view codeIn(std::string_view message) {
 
 ConnectionLost::ConnectionLost(std::string where, std::string const& reason)
     : StoreError(Kind::Unreachable, std::move(where), 0,
-                 "the server cannot be reached: " + (reason.empty() ? "the connection was closed" : reason),
-                 "Check the network and the server, and try again.") {
+                 errorTexts.get("Unreachable", reason.empty() ? errorTexts.get("ConnectionClosed") : reason),
+                 errorTexts.get("RemedyOfUnreachable")) {
 }
 
 void throwConnectError(std::string const& where, std::string_view message) {
@@ -109,12 +104,12 @@ void throwConnectError(std::string const& where, std::string_view message) {
         throwMeaning(where, code, shown);
     }
     if (shown.find("certificate") != std::string::npos || shown.find("support SSL") != std::string::npos) {
-        throw StoreError(StoreError::Kind::Refused, where, 0, "the connection is not secure: " + shown,
-                         "Check the certificates, and sslrootcert in libpq's configuration.");
+        throw StoreError(StoreError::Kind::Refused, where, 0, errorTexts.get("NotSecure", shown),
+                         errorTexts.get("RemedyOfNotSecure"));
     }
     if (shown.find("no password supplied") != std::string::npos) {
-        throw StoreError(StoreError::Kind::Refused, where, 0, "the server requires a password: " + shown,
-                         askForAccess);
+        throw StoreError(StoreError::Kind::Refused, where, 0, errorTexts.get("PasswordRequired", shown),
+                         errorTexts.get("RemedyOfAccess"));
     }
     throw ConnectionLost(where, shown);
 }
@@ -150,8 +145,8 @@ void throwStatementError(std::string const& where, PGresult const* result) {
 
 void refuseAfterFork(pid_t owner, std::string const& where) {
     if (::getpid() != owner) {
-        throw StoreError(StoreError::Kind::Refused, where, 0, "the connection belongs to the parent process",
-                         "Open the project again after a fork.");
+        throw StoreError(StoreError::Kind::Refused, where, 0, errorTexts.get("OpenedBeforeFork"),
+                         errorTexts.get("RemedyOfFork"));
     }
 }
 

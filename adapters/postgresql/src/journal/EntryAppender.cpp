@@ -7,6 +7,7 @@
 
 #include "journal/BodyPieces.hpp"
 #include "journal/LookRows.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::postgresql {
 
@@ -71,8 +72,8 @@ Appended EntryAppender::append() {
             throw;
         }
         throw StoreError(StoreError::Kind::OutcomeUnknown, session_.where(), 0,
-                         "the change may be stored or not: " + error.problem(),
-                         "The next check for changes will show it.");
+                         errorTexts.get("ChangeUncertain", error.problem()),
+                         errorTexts.get("RemedyOfUncertainChange"));
     }
 }
 
@@ -143,7 +144,7 @@ void EntryAppender::passBarrier() {
         throwNoProject(session_.where());
     }
     if (session_.connection().hasWarned()) {
-        throw ConnectionLost(session_.where(), "a commit did not wait for its standby");
+        throw ConnectionLost(session_.where(), errorTexts.get("StandbyNotAwaited"));
     }
 }
 

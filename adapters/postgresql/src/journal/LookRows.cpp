@@ -2,6 +2,7 @@
 
 #include "journal/BodyPieces.hpp"
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::postgresql {
 
@@ -45,9 +46,8 @@ JournalEntry entryAt(Result const& rows, int row) {
 void requireKnownFormat(std::int64_t format, std::string const& where) {
     if (format > knownFormat) {
         throw StoreError(StoreError::Kind::Refused, where, 0,
-                         "the project has the format " + std::to_string(format) +
-                             ", and this version knows " + std::to_string(knownFormat),
-                         "Install a newer version.");
+                         errorTexts.get("LaterFormat", format, knownFormat),
+                         errorTexts.get("RemedyOfLaterFormat"));
     }
 }
 
@@ -108,9 +108,8 @@ std::optional<std::string> readPieces(Result const& rows, std::int64_t count) {
 }
 
 void throwNoProject(std::string const& where) {
-    throw StoreError(StoreError::Kind::Refused, where, 0,
-                     "the project is not on the server, or the user has no role of it",
-                     "Ask the owner of the project for a role of it, or whether the project was deleted.");
+    throw StoreError(StoreError::Kind::Refused, where, 0, errorTexts.get("ProjectMissing"),
+                     errorTexts.get("RemedyOfMissingProject"));
 }
 
 } // namespace project::postgresql

@@ -5,6 +5,7 @@
 #include <string_view>
 
 #include "project/stores/StoreError.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::postgresql {
 
@@ -17,8 +18,8 @@ void requireUuid(std::string const& text, std::string const& where) {
         isUuid = form[i] == '-' ? symbol == '-' : isDigit;
     }
     if (!isUuid) {
-        throw stores::StoreError(stores::StoreError::Kind::Refused, where, 0, "not a UUID: " + text,
-                                 "Give the identifier of the project, in lower case.");
+        throw stores::StoreError(stores::StoreError::Kind::Refused, where, 0,
+                                 errorTexts.get("NotAUuid", text), errorTexts.get("RemedyOfUuid"));
     }
 }
 

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "journal/ProjectId.hpp"
+#include "texts/ErrorTexts.hpp"
 
 namespace project::postgresql {
 
@@ -79,7 +80,7 @@ void ProjectLock::release(std::vector<Call> const& next) noexcept {
 
 void ProjectLock::require() const {
     if (!isWanted_) {
-        throw StoreError(StoreError::Kind::Refused, session_.where(), 0, "the lock is not held", "");
+        throw StoreError(StoreError::Kind::Refused, session_.where(), 0, errorTexts.get("LockNotHeld"), "");
     }
 }
 
@@ -90,14 +91,15 @@ bool ProjectLock::isHeld() const {
 void ProjectLock::throwHolder(Deadline const& deadline) {
     auto const answers = session_.run({{lockHolder, {{key_}}}}, deadline);
     auto const& rows = answers[0];
-    std::string holder = "another process";
+    std::string holder = errorTexts.get("OtherProcess");
     if (rows.rows() > 0) {
         auto const program = rows.text(0, 1);
-        holder = rows.text(0, 0) + (program.empty() ? "" : " with " + program) + " (server process " +
-                 std::to_string(rows.number(0, 2)) + ")";
+        holder = program.empty()
+                     ? errorTexts.get("Holder", rows.text(0, 0), rows.number(0, 2))
+                     : errorTexts.get("HolderWithProgram", rows.text(0, 0), program, rows.number(0, 2));
     }
-    throw StoreError(StoreError::Kind::Busy, session_.where(), 0, "the lock is held by " + holder,
-                     "Try again later, or ask the holder.");
+    throw StoreError(StoreError::Kind::Busy, session_.where(), 0, errorTexts.get("LockHeldBy", holder),
+                     errorTexts.get("RemedyOfLock"));
 }
 
 } // namespace project::postgresql

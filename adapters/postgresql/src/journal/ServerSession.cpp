@@ -4,6 +4,8 @@
 
 #include <unistd.h>
 
+#include "texts/ErrorTexts.hpp"
+
 namespace project::postgresql {
 
 namespace {
@@ -84,9 +86,8 @@ void ServerSession::post(std::vector<Call> const& calls) noexcept {
 
 void ServerSession::requireProcess(std::int64_t process) const {
     if (process != connection_->serverProcess()) {
-        throw StoreError(StoreError::Kind::Refused, where_, 0,
-                         "the service leads to a connection pooler, where no lock can be held",
-                         "Let the service lead to the server itself.");
+        throw StoreError(StoreError::Kind::Refused, where_, 0, errorTexts.get("Pooler"),
+                         errorTexts.get("RemedyOfPooler"));
     }
 }
 
@@ -94,8 +95,7 @@ void ServerSession::introduce(Deadline const& deadline) {
     auto const results = run({{configure, {}}, {identify, {}}}, deadline);
     auto const& identity = results.back();
     if (identity.rows() != 1) {
-        throw StoreError(StoreError::Kind::Refused, where_, 0, "the server does not show its own processes",
-                         "");
+        throw StoreError(StoreError::Kind::Refused, where_, 0, errorTexts.get("ProcessesHidden"), "");
     }
     requireProcess(identity.number(0, 0));
     current_ = {static_cast<int>(identity.number(0, 0)), identity.text(0, 1)};
@@ -109,7 +109,7 @@ void ServerSession::endFormerProcesses(Deadline const& deadline) {
         Deadline const end = deadline.within(timeToEnd);
         while (run({{isRunning, identity}}, deadline).front().rows() > 0) {
             if (end.isOver()) {
-                throw ConnectionLost(where_, "a former process of this session is still running");
+                throw ConnectionLost(where_, errorTexts.get("FormerProcess"));
             }
             std::this_thread::sleep_for(shortPause);
         }

@@ -35,6 +35,9 @@ struct RecoveredMoves {
 };
 
 /// A move that is not possible. Nothing has changed.
+///
+/// Its text is in the language that fl::i18n::MessageCatalog has when the error is created: English, unless
+/// the application chose another.
 class PROJECT_SESSION_EXPORT MoveError : public computils::exception::StackTraceRecordingException {
 public:
     /// The condition that is not met.

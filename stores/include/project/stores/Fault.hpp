@@ -18,7 +18,7 @@ struct Fault {
 
     Kind kind;           ///< the kind of deviation
     std::size_t line;    ///< counted from 1; 0 if the fault has no line
-    std::string problem; ///< a clause in UTF-8
+    std::string problem; ///< a clause in UTF-8, in the language of fl::i18n::MessageCatalog
 };
 
 } // namespace project::stores

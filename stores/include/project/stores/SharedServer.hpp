@@ -63,7 +63,10 @@ PROJECT_STORES_EXPORT std::unique_ptr<SharedServer> connectTo(std::string const&
 
 /// The function of an adapter's library that creates its server: `project_make_shared_server`, with C
 /// linkage.
+/// @param locale for the errors of the library, as in fl::i18n::MessageCatalog. A program that is linked to
+/// static
+///        libraries has a catalog of its own.
 /// @return owned by the caller.
-using MakeSharedServer = SharedServer* (*)(char const* service);
+using MakeSharedServer = SharedServer* (*)(char const* service, char const* locale);
 
 } // namespace project::stores

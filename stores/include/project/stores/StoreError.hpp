@@ -12,6 +12,9 @@ namespace project::stores {
 ///
 /// It is not a project::exception::ProjectException: managers drop some of those as stale data, and a failing
 /// disk must never be mistaken for stale data.
+///
+/// The stores write the problem and the remedy in the language that fl::i18n::MessageCatalog has when the
+/// error is created: English, unless the application chose another. The system's own texts stay as they are.
 class PROJECT_STORES_EXPORT StoreError : public computils::exception::StackTraceRecordingException {
 public:
     /// The reason, as far as a caller can act on it. With every kind except OutcomeUnknown, the batch of the

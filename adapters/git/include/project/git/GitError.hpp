@@ -12,6 +12,9 @@ namespace project::git {
 ///
 /// It is not a project::exception::ProjectException: managers drop some of those as stale data, and a failing
 /// repository must never be mistaken for stale data.
+///
+/// The adapter writes the problem and the remedy in the language that fl::i18n::MessageCatalog has when the
+/// error is created: English, unless the application chose another. The texts of libgit2 stay as they are.
 class PROJECT_GIT_EXPORT GitError : public computils::exception::StackTraceRecordingException {
 public:
     /// The reason, as far as a caller can act on it. With every kind, the index is unchanged.

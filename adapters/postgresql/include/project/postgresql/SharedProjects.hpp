@@ -37,4 +37,4 @@ private:
 
 /// Creates the server of a service for stores::connectTo, which finds this function by its name.
 extern "C" PROJECT_POSTGRESQL_EXPORT project::stores::SharedServer*
-project_make_shared_server(char const* service);
+project_make_shared_server(char const* service, char const* locale);
