@@ -84,11 +84,3 @@ def test_an_error_of_git_is_german(repository: Path) -> None:
             project.files.add("src/main.cpp")
 
     assert raised.value.problem.startswith("der Index ist gesperrt: git läuft in diesem Repository")
-
-
-@pytest.mark.usefixtures("german")
-def test_an_error_of_the_catalog_is_german(p: pm.Project) -> None:
-    with pytest.raises(pm.FileNotInProject) as raised:
-        p.files.remove("src/gone.cpp")
-
-    assert "ist nicht im Projekt" in str(raised.value)

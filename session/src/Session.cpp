@@ -23,8 +23,7 @@ namespace {
 
 void requirePercentage(int similarity) {
     if (similarity < 1 || similarity > 100) {
-        throw std::invalid_argument("a similarity is from 1 to 100 percent, not " +
-                                    std::to_string(similarity));
+        throw std::invalid_argument(errorTexts.get("SimilarityWrong", similarity));
     }
 }
 
