@@ -46,6 +46,7 @@ asm(".pushsection .rodata\n"
 ]=])
   target_sources(${target} PRIVATE "${folder}/${package}.cpp")
   set_source_files_properties("${folder}/${package}.cpp" TARGET_DIRECTORY ${target}
-    PROPERTIES OBJECT_DEPENDS "${data}" SKIP_PRECOMPILE_HEADERS ON)
+    PROPERTIES OBJECT_DEPENDS "${data}" SKIP_PRECOMPILE_HEADERS ON
+    SKIP_UNITY_BUILD_INCLUSION ON) # the object of a group would not depend on the data
   add_dependencies(${target} ${package}_data)
 endfunction()
