@@ -6,6 +6,7 @@ example=$1 work=$2
 export CXX=$3 CMAKE_PREFIX_PATH=$4 CMAKE_GENERATOR=Ninja CMAKE_CXX_COMPILER_LAUNCHER=ccache CTEST_OUTPUT_ON_FAILURE=1
 rm -rf "$work"
 cp -r "$example" "$work"
+rm -rf "$work/build" # of somebody who has built it there
 cd "$work"
 commands=$(sed -n '/^```console$/,/^```$/s/^\$ //p' README.md)
 [ -n "$commands" ] || { echo "the page has no commands" >&2; exit 1; }

@@ -6,6 +6,7 @@
     <!-- terminal -->             the commands of a session write to a terminal
     <!-- file: NAME -->           the session stores the block in this file
     <!-- input: COMMAND -->       the session runs this command, which reads the block
+    <!-- installed -->            only in the test of the page that has an installed library
     <!-- definitions -->          C++ at namespace scope, for the blocks that follow
     <!-- arguments: WORDS -->     of a C++ program
     <!-- output -->               the text that the block in front of this one has written
@@ -14,7 +15,7 @@
 import re
 from dataclasses import dataclass, field
 
-NOTES = "before|new folder|meanwhile|terminal|file|input|definitions|arguments|output|not run"
+NOTES = "before|new folder|meanwhile|terminal|file|input|installed|definitions|arguments|output|not run"
 COMMENT = re.compile(rf"<!--\s*({NOTES})(?::\s*(.*?))?\s*-->", re.DOTALL)
 
 

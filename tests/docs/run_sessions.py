@@ -1,12 +1,13 @@
 """Runs the shell sessions of a page in an empty home folder, and compares their output with the page.
 
-    run_sessions.py PAGE [PATH...]
+    run_sessions.py [--installed PREFIX] PAGE [PATH...]
 
 The blocks of one page are one session: a shell keeps its folder and its variables from block to block. In the output, three
 dots stand for any text, or, alone on a line, for any number of lines; a UUID, a hash and the time of a server stand for
 any other. The home folder of the session is shown as /home/ada. A command that fails must have output, which says
 so.
 """
+import argparse
 import os
 import re
 import shlex
@@ -98,7 +99,7 @@ cat "$output" && rm "$output"
 class Shell:
     """A shell that runs one command after the other."""
 
-    def __init__(self, work, paths):
+    def __init__(self, work, paths, prefix=None):
         self.work = work
         self.home = work / "home" / "ada"
         environment = {name: os.environ[name] for name in ("PATH", "LD_LIBRARY_PATH", "CXX", "CC") if name in os.environ}
@@ -107,6 +108,9 @@ class Shell:
             GIT_CONFIG_NOSYSTEM="1", GIT_AUTHOR_NAME="Ada Lovelace", GIT_AUTHOR_EMAIL="ada@example.invalid",
             GIT_COMMITTER_NAME="Ada Lovelace", GIT_COMMITTER_EMAIL="ada@example.invalid",
             ASAN_OPTIONS="detect_leaks=0")
+        if prefix:
+            flags = next(prefix.rglob("project-management.pc")).parent
+            environment.update(PKG_CONFIG_PATH=str(flags), LD_LIBRARY_PATH=str(flags.parent))
         self.home.mkdir(parents=True)
         self.process = subprocess.Popen(["bash", "--norc"], stdin=subprocess.PIPE, stdout=subprocess.PIPE,
                                         stderr=subprocess.STDOUT, env=environment, cwd=self.home, text=True,
@@ -140,7 +144,14 @@ class Shell:
         self.process.stdout.close()
 
 
-def run_page(page, shell):
+def is_run(block, is_installed):
+    """Whether the session uses a block."""
+    if "not run" in block.notes or "installed" in block.notes and not is_installed:
+        return False
+    return block.language == "console" or bool({"file", "input"} & set(block.notes))
+
+
+def run_page(page, shell, is_installed=False):
     """Runs all sessions of a page. Returns the differences, and the number of commands that ran."""
     problems = []
     count = 0
@@ -151,7 +162,7 @@ def run_page(page, shell):
             problems.append(f"{page}:{number}: hidden commands have failed, or those that read the block\n" + "\n".join(output))
 
     for block in read_blocks(str(page), page.read_text()):
-        if "not run" in block.notes or not (block.language == "console" or {"file", "input"} & set(block.notes)):
+        if not is_run(block, is_installed):
             continue
         if "new folder" in block.notes:
             shell.begin_again()
@@ -177,14 +188,18 @@ def run_page(page, shell):
 
 
 def main():
-    page, *paths = sys.argv[1:]
+    parser = argparse.ArgumentParser()
+    parser.add_argument("--installed", type=Path, metavar="PREFIX", dest="prefix")
+    parser.add_argument("page", type=Path)
+    parser.add_argument("paths", type=Path, nargs="*")
+    arguments = parser.parse_args()
     with tempfile.TemporaryDirectory() as work:  # outside of this repository, which the tool would find
-        shell = Shell(Path(work), [str(Path(path).resolve()) for path in paths])
-        problems, count = run_page(Path(page), shell)
+        shell = Shell(Path(work), [str(path.resolve()) for path in arguments.paths], arguments.prefix)
+        problems, count = run_page(arguments.page, shell, arguments.prefix is not None)
         shell.end()
     print("\n".join(problems), f"{count} commands, {len(problems)} problems", sep="\n")
     if not count:
-        raise SystemExit(f"{page}: there is no session")
+        raise SystemExit(f"{arguments.page}: there is no session")
     sys.exit(1 if problems else 0)
 
 

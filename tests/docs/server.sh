@@ -59,7 +59,5 @@ END
   as_server "$programs/pg_ctl" --pgdata "$folder/data" --log "$folder/log" --wait start >/dev/null
 }
 
-# A statement, as the superuser: sql [DATABASE]
-sql() {
-  PGPASSWORD=secret psql --no-psqlrc --quiet --set ON_ERROR_STOP=1 "host=db.example user=postgres sslmode=require dbname=${1:-postgres}"
-}
+# Statements of its input, as the superuser.
+sql() { PGPASSWORD=secret psql --no-psqlrc --quiet --set ON_ERROR_STOP=1 "host=db.example user=postgres sslmode=require dbname=postgres"; }

@@ -84,6 +84,11 @@ class Blocks(unittest.TestCase):
         self.assertEqual(self.problems_of("```meson\nx\n```", "docs/guide/builds.md"), [])
         self.assertEqual(len(self.problems_of("```meson\nx\n```")), 1)
 
+    def test_a_session_with_an_installed_library_is_tested_on_the_page_of_that_test_only(self):
+        page = "<!-- installed -->\n```console\n$ true\n```"
+        self.assertEqual(self.problems_of(page, "docs/guide/start.md"), [])
+        self.assertEqual(len(self.problems_of(page, "docs/run.md")), 1)
+
     def test_statements_that_no_session_runs_are_a_problem(self):
         self.assertEqual(self.problems_of("<!-- input: sql -->\n```sql\nSELECT 1;\n```", "docs/run.md"), [])
         self.assertEqual(len(self.problems_of("```sql\nSELECT 1;\n```", "docs/run.md")), 1)

@@ -114,8 +114,26 @@ TEST_F(BatchCommand, runsNoLineIfOneIsUnknownOrHasWrongArguments) {
 }
 
 TEST_F(BatchCommand, refusesCommandsThatAreNotAboutTheOpenProject) {
-    for (auto const* command : {"init", "root", "setup", "watch", "tidy", "resolve", "merge a b c",
-                                "check --repair", "references --graph", "batch", "batch lines"}) {
+    for (auto const* command : {"init",
+                                "root",
+                                "setup",
+                                "watch",
+                                "tidy",
+                                "resolve",
+                                "merge a b c",
+                                "check --repair",
+                                "references --graph",
+                                "batch",
+                                "batch lines",
+                                "report",
+                                "log",
+                                "diff",
+                                "textconv a",
+                                "copy --to team",
+                                "shared status",
+                                "shared log",
+                                "shared roles",
+                                "shared tidy"}) {
         expectRefused(std::string("remove a\n") + command, 2, "cannot be part of a batch");
     }
     for (auto const* command : {"-C src list", "list --full-name", "add a --no-source-control"}) {

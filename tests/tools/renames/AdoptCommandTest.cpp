@@ -123,7 +123,7 @@ TEST_F(AdoptInRepository, listsAmbiguousFilesAndAdoptsTheOthers) {
     auto const adopted = tool({"adopt"});
 
     EXPECT_EQ(adopted.exitCode, 0);
-    EXPECT_THAT(adopted.errors, HasSubstr("1 groups of files are ambiguous"));
+    EXPECT_THAT(adopted.errors, HasSubstr("1 group of files is ambiguous and was left out"));
     EXPECT_THAT(tool({"list"}), Prints("a.c\nsrc\nsrc/b.c\nsrc/io\nsrc/io/c.c\ntop\n"));
     ASSERT_THAT(tool({"adopt", "top", "two"}), SucceedsSilently());
     EXPECT_THAT(tool({"label", "find", "Status"}), Prints("src\nsrc/b.c\ntwo\n"));
@@ -191,7 +191,7 @@ TEST_F(AdoptCommand, guessesByTheNameOutsideARepository) {
     EXPECT_EQ(renames(), "ren? src/a.c -> lib/a.c (a guess, by its name)\n"
                          "ren? src/io/c.c -> lib/c.c, lib/new/c.c (ambiguous)\n");
     auto const before = readText();
-    EXPECT_THAT(tool({"adopt"}).errors, AllOf(HasSubstr("1 renames are guesses"), HasSubstr("ambiguous")));
+    EXPECT_THAT(tool({"adopt"}).errors, AllOf(HasSubstr("1 rename is a guess"), HasSubstr("ambiguous")));
     EXPECT_EQ(readText(), before);
     EXPECT_EQ(tool({"adopt", "--guesses"}).exitCode, 0);
 
