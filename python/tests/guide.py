@@ -23,10 +23,10 @@ int main() {
 """
 
 
-def blocks_of(page: Path, language: str) -> list[str]:
-    """The contents of the blocks in a language, in order."""
-    blocks = re.findall(r"^```(\w*)\n(.*?)^```$", page.read_text(), re.MULTILINE | re.DOTALL)
-    return [content for of, content in blocks if of == language]
+def blocks_of(page: Path, language: str, *, on_server: bool = False) -> list[str]:
+    """The contents of the blocks in a language, in order: those that need a server, or all others."""
+    blocks = re.findall(r"^(<!-- on a server -->\n)?^```(\w*)\n(.*?)^```$", page.read_text(), re.MULTILINE | re.DOTALL)
+    return [content for comment, of, content in blocks if of == language and bool(comment) == on_server]
 
 
 def cpp_program(page: Path) -> str:

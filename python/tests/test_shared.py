@@ -10,7 +10,10 @@ from pathlib import Path
 
 import project_management as pm
 import pytest
+from guide import blocks_of
 from server import Server, programs
+
+GUIDE = Path(__file__).parents[2] / "docs/guide/python.md"
 
 # Programs of a second process, with the project's folder as their argument.
 CHANGE = """
@@ -124,6 +127,18 @@ def test_a_server_that_has_stopped_is_unreachable(shared: pm.Project, server: Se
         finally:
             server.start()
         assert patient.files.add("src/io/pump.cpp") == 1 and "src/io/pump.cpp" in shared.files
+
+
+def test_the_block_of_the_guide_creates_a_project(server: Server, folder: Path, monkeypatch: pytest.MonkeyPatch) -> None:
+    monkeypatch.setenv("PGSERVICEFILE", str(server.service_file))
+    monkeypatch.chdir(folder.parent)
+    folder.rename("engine")
+    (block,) = blocks_of(GUIDE, "python", on_server=True)
+    names: dict[str, object] = {"pm": pm}
+    exec(compile(block, str(GUIDE), "exec"), names)
+    p = names["p"]
+    assert isinstance(p, pm.Project) and p.name == "Engine controller" and p.is_shared
+    p.close()
 
 
 def test_a_service_that_is_not_configured_is_refused(shared: pm.Project, tmp_path: Path) -> None:

@@ -3,19 +3,9 @@
 # The server has the host names of the page: clients find it at PGHOSTADDR and PGPORT, whatever host they name. Only TLS is
 # accepted, with a certificate for db.example, whose authority is the file authority.pem of the home folder. The superuser is
 # postgres, with the password `secret`.
-programs=$(ls -d /usr/lib/postgresql/*/bin 2>/dev/null | sort -V | tail -1)
+. "$ROOT/scripts/postgresql.sh"
 [ -n "$programs" ] || { echo "the package postgresql is not installed: no server to test with"; exit 77; }
 servers=()
-
-# Servers refuse to run as root.
-as_server() { if [ "$(id -u)" = 0 ]; then setpriv --reuid=postgres --regid=postgres --clear-groups "$@"; else "$@"; fi; }
-
-# The system gives no port below 32,768 to a client, so a client cannot connect to itself.
-free_port() {
-  local port=$((20000 + $$ % 5000))
-  while (exec 3<>"/dev/tcp/127.0.0.1/$port") 2>/dev/null; do port=$((port + 1)); done
-  echo "$port"
-}
 
 stop_servers() {
   local folder
@@ -41,7 +31,7 @@ start_server() {
   folder=$(mktemp -d)
   servers+=("$folder")
   export PGHOSTADDR=127.0.0.1 PGPORT
-  PGPORT=$(free_port)
+  PGPORT=$(free_port $((20000 + $$ % 5000)))
   certify "$folder"
   echo secret >"$folder/password"
   [ "$(id -u)" != 0 ] || chown -R postgres "$folder"
