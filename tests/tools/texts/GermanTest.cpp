@@ -129,12 +129,16 @@ TEST_F(German, aLineOfAnImport) {
 TEST_F(German, documentsDifferFromEnglishOnesInTheirTextsOnly) {
     static std::regex const text(R"re("text": "(?:[^"\\]|\\.)*")re");
     addFault();
+    insertLineBefore("\"a\"", "nonsense");
     auto const withoutTexts = [this](std::vector<std::string> const& arguments) {
         auto const result = tool(arguments);
         return std::regex_replace(result.output + result.errors, text, "");
     };
-    for (auto const& arguments : std::vector<std::vector<std::string>>{
-             {"check", "--json"}, {"status", "--json"}, {"list", "fehlt", "--json"}, {"lsit", "--json"}}) {
+    for (auto const& arguments : std::vector<std::vector<std::string>>{{"check", "--json"},
+                                                                       {"status", "--json"},
+                                                                       {"list", "fehlt", "--json"},
+                                                                       {"lsit", "--json"},
+                                                                       {"add", "b", "--json"}}) {
         settings_.environment["LANG"] = "de_DE.UTF-8";
         auto const german = withoutTexts(arguments);
         settings_.environment["LANG"] = "C";

@@ -54,6 +54,7 @@ inline constexpr char const* usualServerKind = "postgresql";
 
 /// The server of a service. The first call for a kind loads the adapter's library, `libproject_<kind>`, which
 /// only applications with shared projects need; it is never unloaded. Does not connect.
+/// Errors of the library are in the language that fl::i18n::MessageCatalog has at the time of this call.
 /// @param kind of the server, in lower-case letters, for example "postgresql".
 /// @param service the name of the service in the configuration of the adapter. A name and not an address: a
 ///        project's files may come from anybody, and must not decide to which machine a program connects.
@@ -63,9 +64,8 @@ PROJECT_STORES_EXPORT std::unique_ptr<SharedServer> connectTo(std::string const&
 
 /// The function of an adapter's library that creates its server: `project_make_shared_server`, with C
 /// linkage.
-/// @param locale for the errors of the library, as in fl::i18n::MessageCatalog. A program that is linked to
-/// static
-///        libraries has a catalog of its own.
+/// @param locale for the errors of the library: a program that is linked to static libraries has a
+///        fl::i18n::MessageCatalog of its own.
 /// @return owned by the caller.
 using MakeSharedServer = SharedServer* (*)(char const* service, char const* locale);
 
