@@ -2,9 +2,11 @@
 
 #include <algorithm>
 #include <array>
+#include <atomic>
 #include <map>
 #include <mutex>
 #include <optional>
+#include <set>
 #include <utility>
 #include <variant>
 #include <vector>
@@ -25,9 +27,11 @@ constexpr char const* rootLocale = "root";
 
 /// The settings of the process.
 struct Settings {
-    std::mutex mutex;
-    std::string globalLocale = "en";
-    std::map<std::string, std::string> packages; // by catalog name
+    std::mutex mutex;                    ///< of the changes, and of the packages
+    std::set<std::string> locales{"en"}; ///< all that were ever chosen
+    /// One of them. Read without a lock: a child process may create an error after a fork.
+    std::atomic<std::string const*> globalLocale = &*locales.begin();
+    std::map<std::string, std::string> packages; ///< by catalog name
 };
 
 /// Never destroyed: errors may be raised while static objects are destroyed.
@@ -180,15 +184,13 @@ std::u16string MessageCatalog::get_message(resource_core::BaseMsgID const& messa
 }
 
 std::string MessageCatalog::getGlobalLocale() {
-    Settings& all = settings();
-    std::lock_guard const guard(all.mutex);
-    return all.globalLocale;
+    return *settings().globalLocale.load();
 }
 
 void MessageCatalog::setGlobalLocale(std::string locale) {
     Settings& all = settings();
     std::lock_guard const guard(all.mutex);
-    all.globalLocale = std::move(locale);
+    all.globalLocale = &*all.locales.insert(std::move(locale)).first;
 }
 
 void MessageCatalog::registerCatalog(std::string const& catalogName, std::string const& packageName,

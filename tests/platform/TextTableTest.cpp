@@ -1,11 +1,15 @@
 #include "fl/i18n/TextTable.hpp"
 
 #include <array>
+#include <atomic>
 #include <string>
+#include <thread>
 #include <utility>
 
 #include <gtest/gtest.h>
 #include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 #include "platform/TestMessage.hpp"
 #include "support/GlobalLocale.hpp"
@@ -109,6 +113,45 @@ TEST(TextTable, needsNoDescriptor) {
     NoDescriptors const none;
 
     EXPECT_EQ(table.get("Greeting", "Ann", "late"), "late, hallo Ann");
+}
+
+/// Changes the language again and again.
+class ChangingLanguage {
+public:
+    ChangingLanguage() {
+        thread_ = std::thread([this] {
+            while (!isEnding_) {
+                MessageCatalog::setGlobalLocale("de");
+            }
+        });
+    }
+
+    ChangingLanguage(ChangingLanguage const&) = delete;
+    ChangingLanguage& operator=(ChangingLanguage const&) = delete;
+
+    ~ChangingLanguage() {
+        isEnding_ = true;
+        thread_.join();
+    }
+
+private:
+    GlobalLocale const german_{"de"};
+    std::atomic<bool> isEnding_ = false;
+    std::thread thread_;
+};
+
+TEST(TextTable, neverWaitsForAThreadThatAForkHasLeftBehind) {
+    ChangingLanguage const changing;
+    for (int child = 0; child < 100; ++child) {
+        pid_t const process = ::fork();
+        if (process == 0) {
+            ::alarm(10);
+            ::_exit(table.get("Greeting", "Ann", "late") == "late, hallo Ann" ? 0 : 1);
+        }
+        int status = -1;
+        ASSERT_EQ(::waitpid(process, &status, 0), process);
+        ASSERT_EQ(status, 0) << "child " << child;
+    }
 }
 
 } // namespace

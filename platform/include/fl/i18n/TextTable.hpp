@@ -14,8 +14,8 @@ namespace fl::i18n {
 ///
 /// An error of a store is created while the disk, the memory or the file descriptors fail, and its arguments
 /// are the bytes of names on disk. So the texts are constants of the library: finding one takes no system
-/// call and part of a microsecond, and arguments are inserted byte for byte. MessageCatalog formats with ICU:
-/// it converts arguments to UTF-16, and has no text at all when ICU fails.
+/// call, no lock and part of a microsecond, and arguments are inserted byte for byte. MessageCatalog formats
+/// with ICU: it converts arguments to UTF-16, and has no text at all when ICU fails.
 ///
 /// project_compile_texts in cmake/TextTables.cmake creates a table. Any thread may call all operations.
 class PROJECT_PLATFORM_EXPORT TextTable {
