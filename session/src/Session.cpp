@@ -1,8 +1,10 @@
 #include "project/session.hpp"
 
 #include <algorithm>
+#include <filesystem>
 #include <stdexcept>
 #include <string>
+#include <system_error>
 #include <utility>
 
 #include "ChangeStep.hpp"
@@ -27,6 +29,16 @@ void requirePercentage(int similarity) {
     }
 }
 
+/// A project is created in an existing folder only, so that a mistyped path creates nothing.
+void requireFolder(Path const& folder) {
+    std::error_code error; // a folder that cannot be seen may exist: the store reports why it cannot use it
+    auto const status = std::filesystem::status(fl::filesystem::toSystem(folder), error);
+    if (status.type() == std::filesystem::file_type::not_found) {
+        throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(folder.native()), 0,
+                                 errorTexts.get("FolderMissing"), errorTexts.get("RemedyOfMissingFolder"));
+    }
+}
+
 } // namespace
 
 Session Session::open(Path const& root, Options options) {
@@ -36,6 +48,7 @@ Session Session::open(Path const& root, Options options) {
 }
 
 Session Session::create(Path const& root, std::u16string const& name, Options options) {
+    requireFolder(root);
     Session result(std::make_unique<State>(root, options));
     if (!result.state_->createProject(name)) {
         throw stores::StoreError(stores::StoreError::Kind::Refused, fl::i18n::toUtf8(result.root().native()),
@@ -46,6 +59,7 @@ Session Session::create(Path const& root, std::u16string const& name, Options op
 }
 
 Session Session::openOrCreate(Path const& root, std::u16string const& name, Options options) {
+    requireFolder(root);
     Session result(std::make_unique<State>(root, options));
     result.state_->createProject(name);
     return result;
@@ -53,6 +67,7 @@ Session Session::openOrCreate(Path const& root, std::u16string const& name, Opti
 
 Session Session::createShared(Path const& root, std::u16string const& name, SharedStore const& shared,
                               Options options) {
+    requireFolder(root);
     NewSharedProject project(root, name, shared);
     Session result(std::make_unique<State>(root, options));
     result.state_->createProject(name);

@@ -6,7 +6,6 @@
 #include <gtest/gtest.h>
 
 #include "project/session.hpp"
-#include "project/stores/StoreError.hpp"
 #include "support/TemporaryFolder.hpp"
 
 namespace project::session {
@@ -14,6 +13,8 @@ namespace {
 
 using stores::StoreError;
 using ::testing::ElementsAre;
+using ::testing::EndsWith;
+using ::testing::ThrowsMessage;
 
 /// Runs an action that must fail. @return the kind of its StoreError.
 std::optional<StoreError::Kind> kindOfErrorIn(std::function<void()> const& action) {
@@ -58,6 +59,24 @@ TEST_F(Sessions, doNotCreateASecondProjectInAFolder) {
 TEST_F(Sessions, openAnExistingProjectOrCreateOne) {
     EXPECT_EQ(Session::openOrCreate(folder_.root(), u"Engine").project().getName(), u"Engine");
     EXPECT_EQ(Session::openOrCreate(folder_.root(), u"Pump").project().getName(), u"Engine");
+}
+
+TEST_F(Sessions, areNotCreatedInAFolderThatDoesNotExist) {
+    auto const missing = folder_.root() / u"missing";
+    std::vector<std::function<void()>> const attempts = {
+        [&] { Session::create(missing, u"Engine"); },
+        [&] { Session::openOrCreate(missing, u"Engine"); },
+        [&] {
+            Session::createShared(missing, u"Engine", {"service", "reader", "writer"});
+        },
+    };
+
+    for (auto const& attempt : attempts) {
+        EXPECT_THAT(attempt,
+                    ThrowsMessage<StoreError>(EndsWith(
+                        "missing: the folder does not exist. Create the folder, or check the path.")));
+    }
+    EXPECT_FALSE(std::filesystem::exists(folder_.onDisk() / "missing"));
 }
 
 TEST_F(Sessions, convertTheRootToCanonicalForm) {

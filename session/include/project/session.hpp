@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "project/git/GitError.hpp"
 #include "project/management.hpp"
 #include "project/session/Export.hpp"
 #include "project/session/Move.hpp"
@@ -16,6 +17,7 @@
 #include "project/session/Transaction.hpp"
 #include "project/stores/HistoryLoss.hpp"
 #include "project/stores/SharedServer.hpp"
+#include "project/stores/StoreError.hpp"
 
 namespace project::session {
 
@@ -89,18 +91,21 @@ public:
     static Session open(Path const& root, Options options = {});
 
     /// Creates a project in a folder.
-    /// @throws stores::StoreError if the folder already contains a project, perhaps one that another process
-    ///         has created at the same time.
+    /// @param root an existing folder.
+    /// @throws stores::StoreError if the folder does not exist, or already contains a project, perhaps one
+    ///         that another process has created at the same time.
     static Session create(Path const& root, std::u16string const& name, Options options = {});
 
     /// Opens the project in a folder, or creates it if there is none.
+    /// @param root an existing folder. It is not created, so that a mistyped path creates nothing.
     /// @param name the name of a project that is created.
+    /// @throws stores::StoreError if the folder does not exist.
     static Session openOrCreate(Path const& root, std::u16string const& name, Options options = {});
 
     /// Creates a project that a team shares: on the server, and a file in the folder that leads to it, which
     /// is staged and belongs into source control. Every session that opens the folder uses the server.
-    /// @throws stores::StoreError if the folder already contains a project, the server is unreachable, or the
-    ///         user may not create projects. Nothing stays behind.
+    /// @throws stores::StoreError if the folder does not exist or already contains a project, the server is
+    ///         unreachable, or the user may not create projects. Nothing stays behind.
     static Session createShared(Path const& root, std::u16string const& name, SharedStore const& shared,
                                 Options options = {});
 
