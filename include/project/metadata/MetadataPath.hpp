@@ -100,13 +100,16 @@ private:
     Step const* step_;
 };
 
+/// Compares two addresses step by step, from the root down. An address precedes everything below it.
 PROJECT_METADATA_EXPORT std::strong_ordering compare(MetadataPath const& left,
                                                      MetadataPath const& right) noexcept;
 
+/// Returns whether an address precedes another one, as compare orders them.
 inline bool operator<(MetadataPath const& left, MetadataPath const& right) noexcept {
     return std::is_lt(compare(left, right));
 }
 
+/// Returns whether two addresses have the same steps.
 inline bool operator==(MetadataPath const& left, MetadataPath const& right) noexcept {
     return std::is_eq(compare(left, right));
 }

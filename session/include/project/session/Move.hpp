@@ -38,6 +38,8 @@ struct RecoveredMoves {
 ///
 /// Its text is in the language that fl::i18n::MessageCatalog has when the error is created: English, unless
 /// the application chose another.
+///
+/// @ingroup errors
 class PROJECT_SESSION_EXPORT MoveError : public computils::exception::StackTraceRecordingException {
 public:
     /// The condition that is not met.

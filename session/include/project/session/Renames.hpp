@@ -10,6 +10,7 @@ namespace project::session {
 /// The similarity from which two files are a pair, unless the caller chooses another one, in percent.
 constexpr int usualSimilarity = 50;
 
+/// How Session::findRenames searches.
 struct RenameOptions {
     /// From which two contents are similar, in percent, from 1 to 100.
     int similarity = usualSimilarity;
@@ -29,10 +30,10 @@ struct Rename {
     };
 
     std::u16string from; ///< relative to the project's root
-    std::u16string to;
-    FileKind kind;
-    Evidence evidence;
-    int similarity; ///< in percent; 0 if the contents are unknown
+    std::u16string to;   ///< relative to the project's root
+    FileKind kind;       ///< a file or a folder
+    Evidence evidence;   ///< the reason for the pair
+    int similarity;      ///< in percent; 0 if the contents are unknown
 
     friend bool operator==(Rename const&, Rename const&) = default;
 };
@@ -47,9 +48,10 @@ struct AmbiguousRename {
 
 /// The result of a search for renames.
 struct RenamesFound {
-    std::vector<Rename> pairs; ///< sorted by the earlier path; a folder precedes its contents
-    std::vector<AmbiguousRename> ambiguous;
+    std::vector<Rename> pairs;              ///< sorted by the earlier path; a folder precedes its contents
+    std::vector<AmbiguousRename> ambiguous; ///< not among the pairs
 
+    /// Returns true if nothing was found.
     bool isEmpty() const noexcept { return pairs.empty() && ambiguous.empty(); }
 };
 

@@ -7,6 +7,7 @@
 
 namespace project::stores {
 
+/// The access of a guard: to read or to write.
 using Access = cmlink::ReentrantReadWriteLock::Access;
 
 /// The storage behind a TreeMetadataManager.

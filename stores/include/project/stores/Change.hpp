@@ -23,6 +23,7 @@ struct Change {
     Node node;       ///< of Set, not null; otherwise null
 };
 
+/// The changes of one write, in their order.
 using Batch = std::vector<Change>;
 
 /// A change of another process at one address: a node was added, deleted or replaced, or the address was

@@ -11,6 +11,7 @@
 
 namespace project::stores {
 
+/// The address of a node.
 using Address = metadata::MetadataPath;
 
 /// A stored node. It never changes once it is stored, and its users share it. Null where none is stored.

@@ -6,9 +6,9 @@ namespace project::git {
 
 /// Two contents that are similar: the positions of an earlier one and of a later one in their lists.
 struct SimilarContent {
-    std::size_t before;
-    std::size_t after;
-    int hundredths; ///< their similarity in hundredths of a percent
+    std::size_t before; ///< the position of the earlier one
+    std::size_t after;  ///< the position of the later one
+    int hundredths;     ///< their similarity in hundredths of a percent
 
     friend bool operator==(SimilarContent const&, SimilarContent const&) = default;
 };
