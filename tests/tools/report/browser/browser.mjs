@@ -31,21 +31,27 @@ export function useBrowser() {
     });
 }
 
-/** Opens a page. `page.noises` are its console messages, errors, dialogs and requests. */
-export async function openPage(file, {scheme = 'light', width = 1280, hash = ''} = {}) {
+/** An empty page. `page.noises` are its console messages, errors, dialogs, and requests outside the allowed address. */
+export async function newPage(allowed, {scheme = 'light', width = 1280} = {}) {
     const page = await browser.newPage();
-    const url = pathToFileURL(file).href;
     page.setDefaultTimeout(patience);
     page.noises = [];
     page.on('console', (message) => page.noises.push(`console: ${message.text()}`));
     page.on('pageerror', (error) => page.noises.push(`error: ${error.message}`));
-    page.on('request', (request) => request.url().startsWith(url) || page.noises.push(`request: ${request.url()}`));
+    page.on('request', (request) => request.url().startsWith(allowed) || page.noises.push(`request: ${request.url()}`));
     page.on('dialog', async (dialog) => {
         page.noises.push(`dialog: ${dialog.message()}`);
         await dialog.dismiss();
     });
     await page.setViewport({width, height: 900});
     await page.emulateMediaFeatures([{name: 'prefers-color-scheme', value: scheme}]);
+    return page;
+}
+
+/** Opens the page of a report. */
+export async function openPage(file, {hash = '', ...options} = {}) {
+    const url = pathToFileURL(file).href;
+    const page = await newPage(url, options);
     await page.goto(url + hash);
     await page.waitForFunction(() => document.documentElement.dataset.ready === 'true');
     return page;
