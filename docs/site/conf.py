@@ -12,6 +12,7 @@ project = "project-management"
 extensions = ["myst_parser"]
 exclude_patterns = ["site"]
 myst_heading_anchors = 4
+smartquotes = False  # the options of commands have two hyphens
 html_theme = "furo"
 html_title = "project-management"
 html_static_path = ["style"]

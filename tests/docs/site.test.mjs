@@ -81,6 +81,8 @@ function faults() {
     if (headings !== 1) {
         found.push(`has ${headings} headings of the first level`);
     }
+    const dashes = document.querySelector('article')?.innerText.match(/\s–\w+/g) ?? [];
+    found.push(...dashes.map((option) => `shows a dash for the hyphens of${option}`));
     for (const image of document.images) {
         if (image.getClientRects().length && image.naturalWidth === 0) {
             found.push(`does not show ${image.src}`);
