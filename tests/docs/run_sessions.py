@@ -84,7 +84,7 @@ def interrupted(command, meanwhile, lines):
     """Runs one command while another one runs, which is interrupted as soon as it has written a number of lines."""
     return f"""
 output=$(mktemp)
-written() {{ for _ in {{1..100}}; do [ "$(wc -l < "$output")" -ge "$1" ] && return; sleep 0.1; done; return 1; }}
+written() {{ for _ in {{1..600}}; do [ "$(wc -l < "$output")" -ge "$1" ] && return; sleep 0.1; done; return 1; }}
 set -m
 ( {command} ) > "$output" 2>&1 &
 set +m

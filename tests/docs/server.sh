@@ -31,7 +31,7 @@ start_server() {
   folder=$(mktemp -d)
   servers+=("$folder")
   export PGHOSTADDR=127.0.0.1 PGPORT
-  PGPORT=$(free_port $((20000 + $$ % 5000)))
+  PGPORT=$(free_port $((20000 + $$ % 1250 * 4)))
   certify "$folder"
   echo secret >"$folder/password"
   [ "$(id -u)" != 0 ] || chown -R postgres "$folder"
