@@ -1,6 +1,7 @@
 #!/usr/bin/python3 -IS
 """Doxygen reads the headers through this. It puts the names of each header into a group of the reference, and leaves out
-the copies, moves and comparisons that the compiler generates: their meaning is that of the language.
+the copies, moves and comparisons that the compiler generates and that no comment describes: their meaning is that of the
+language.
 
     reference_filter.py HEADER
 """
@@ -38,7 +39,7 @@ GENERATED = re.compile("|".join([
     rf"^ *{OWN}& operator=\({OWN}( const)?&&?( other)?\)( noexcept)?( = default)?;$",
     rf"^ *{OWN}\({OWN}&&( other)?\)( noexcept)?( = default)?;$",
     rf"^ *(virtual )?~{OWN}\(\)( noexcept)?( override)?( = default)?;$",
-]), re.MULTILINE)
+]))
 
 
 def group_of(header):
@@ -47,9 +48,15 @@ def group_of(header):
                 None)
 
 
+def without_generated(lines):
+    """The lines without what the compiler generates. A described operation stays: its comment would describe the next one."""
+    return [line if not GENERATED.match(line) or before.lstrip().startswith("///") else ""
+            for before, line in zip(["", *lines], lines)]
+
+
 def filtered(header, text):
     """The text that Doxygen gets. Each line keeps its number."""
-    text = GENERATED.sub("", text)
+    text = "\n".join(without_generated(text.split("\n")))
     group = group_of(header)
     if not group:
         return text

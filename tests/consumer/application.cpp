@@ -4,8 +4,7 @@
 #include <filesystem>
 #include <string>
 
-#include <project/git/GitError.hpp>
-#include <project/session.hpp>
+#include <project/session.hpp> // also declares the errors of a session
 
 int main() {
     auto pattern = (std::filesystem::temp_directory_path() / "project-consumer-XXXXXX").string();
@@ -20,5 +19,9 @@ int main() {
         return isThere ? 0 : 1;
     } catch (project::git::GitError const&) {
         return 2;
+    } catch (project::session::MoveError const&) {
+        return 3;
+    } catch (project::stores::StoreError const&) {
+        return 4;
     }
 }
