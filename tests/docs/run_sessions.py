@@ -110,7 +110,7 @@ class Shell:
             ASAN_OPTIONS="detect_leaks=0")
         if prefix:
             flags = next(prefix.rglob("project-management.pc")).parent
-            environment.update(PKG_CONFIG_PATH=str(flags), LD_LIBRARY_PATH=str(flags.parent))
+            environment.update(PKG_CONFIG_PATH=str(flags), CMAKE_PREFIX_PATH=str(prefix.resolve()), LD_LIBRARY_PATH=str(flags.parent))
         self.home.mkdir(parents=True)
         self.process = subprocess.Popen(["bash", "--norc"], stdin=subprocess.PIPE, stdout=subprocess.PIPE,
                                         stderr=subprocess.STDOUT, env=environment, cwd=self.home, text=True,
