@@ -15,12 +15,13 @@ import signal
 import subprocess
 import sys
 import tempfile
+import threading
 from pathlib import Path
 
 from markdown_blocks import read_blocks
 
 # What differs from run to run: text of this form on the page stands for any other text of the form.
-FORMS = {"any": r"\.\.\.", "uuid": r"[0-9a-f]{8}-[0-9a-f]{4}-[0-9a-f]{4}-[0-9a-f]{4}-[0-9a-f]{12}", "hash": r"\b(?:[0-9a-f]{10}|[0-9a-f]{16})\b",
+FORMS = {"any": r"(?<!\.)\.\.\.(?!\.)", "uuid": r"[0-9a-f]{8}-[0-9a-f]{4}-[0-9a-f]{4}-[0-9a-f]{4}-[0-9a-f]{12}", "hash": r"\b(?:[0-9a-f]{10}|[0-9a-f]{16})\b",
          "time": r"\d{4}-\d\d-\d\d \d\d:\d\d:\d\d UTC"}
 VARYING = re.compile("|".join(f"(?P<{name}>{form})" for name, form in FORMS.items()))
 HERE_DOCUMENT = re.compile(r"<<-?\s*['\"]?(\w+)['\"]?")
@@ -99,7 +100,8 @@ cat "$output" && rm "$output"
 class Shell:
     """A shell that runs one command after the other."""
 
-    def __init__(self, work, paths, prefix=None):
+    def __init__(self, work, paths, prefix=None, seconds=SECONDS_FOR_A_COMMAND):
+        self.seconds = seconds
         self.work = work
         self.home = work / "home" / "ada"
         environment = {name: os.environ[name] for name in ("PATH", "LD_LIBRARY_PATH", "CXX", "CC") if name in os.environ}
@@ -123,16 +125,20 @@ class Shell:
         self.process.stdin.write(f". '{script}' 2>&1 < /dev/null; printf '\\n@%s@\\n' $?\n")
         self.process.stdin.flush()
         lines = []
-        signal.alarm(SECONDS_FOR_A_COMMAND)
-        for line in self.process.stdout:
-            end = re.fullmatch(r"@(\d+)@\n", line)
-            if end:
-                signal.alarm(0)
-                if lines and lines[-1] == "":
-                    lines.pop()
-                return int(end[1]), lines
-            lines.append(line.rstrip("\n").replace(str(self.home), "/home/ada"))
-        print(f"the shell has ended: {command}", *lines, sep="\n")
+        # Its end closes the pipe that is read below.
+        late = threading.Timer(self.seconds, os.killpg, (self.process.pid, signal.SIGTERM))
+        late.start()
+        try:
+            for line in self.process.stdout:
+                end = re.fullmatch(r"@(\d+)@\n", line)
+                if end:
+                    if lines and lines[-1] == "":
+                        lines.pop()
+                    return int(end[1]), lines
+                lines.append(line.rstrip("\n").replace(str(self.home), "/home/ada"))
+        finally:
+            late.cancel()
+        print(f"the shell has ended, or a command took more than {self.seconds} s: {command}", *lines, sep="\n")
         sys.exit(NOT_POSSIBLE if self.process.wait() == NOT_POSSIBLE else 1)
 
     def begin_again(self):

@@ -2,6 +2,8 @@
 
     test_checks.py PROJECTCTL
 """
+import contextlib
+import io
 import sys
 import tempfile
 import unittest
@@ -24,10 +26,10 @@ class Folder(unittest.TestCase):
 class Sessions(Folder):
     """Each test has a page of one session."""
 
-    def problems_of(self, page):
+    def problems_of(self, page, **limits):
         path = self.folder / "page.md"
         path.write_text(page)
-        shell = Shell(Path(tempfile.mkdtemp(dir=self.folder)), [])
+        shell = Shell(Path(tempfile.mkdtemp(dir=self.folder)), [], **limits)
         self.addCleanup(shell.end)
         return run_page(path, shell)[0]
 
@@ -59,6 +61,17 @@ class Sessions(Folder):
         self.assertEqual(self.problems_of("<!-- terminal -->\n```console\n$ test -t 1 && echo yes\nyes\n```"), [])
         self.assertEqual(len(self.problems_of("```console\n$ test -t 1 && echo yes\nyes\n```")), 1)
 
+    def test_a_command_that_does_not_end_is_ended_and_shown(self):
+        with contextlib.redirect_stdout(io.StringIO()) as shown, self.assertRaises(SystemExit) as ended:
+            self.problems_of("```console\n$ echo one; sleep 99\none\n```", seconds=0.5)
+        self.assertEqual(ended.exception.code, 1)
+        self.assertIn("sleep 99\none\n", shown.getvalue())
+
+    def test_a_session_that_lacks_a_program_is_skipped(self):
+        with contextlib.redirect_stdout(io.StringIO()), self.assertRaises(SystemExit) as ended:
+            self.problems_of("```console\n$ exit 77\n```")
+        self.assertEqual(ended.exception.code, 77)
+
     def test_text_that_varies_stands_for_text_of_its_form_only(self):
         self.assertTrue(is_expected(["3f0c6a5e-6c5e-4a8e-9d55-0a5b2f8a4c11 4f0c1b2a9d"],
                                     ["00000000-0000-0000-0000-000000000000 91d3e07c55"]))
@@ -66,6 +79,8 @@ class Sessions(Folder):
         self.assertTrue(is_expected(["2026-11-23 01:48:16 UTC"], ["2026-03-01 09:12:44 UTC"]))
         self.assertFalse(is_expected(["one", "two"], ["one"]))
         self.assertTrue(is_expected(["one", "two"], ["one", "..."]))
+        self.assertTrue(is_expected(["one two three"], ["one ... three"]))
+        self.assertFalse(is_expected(["name    Passed"], ["name....Passed"]))
 
 
 class Blocks(unittest.TestCase):
