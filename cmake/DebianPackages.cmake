@@ -85,11 +85,16 @@ project_add_package(development NAME libproject-management-dev SECTION libdevel
  libraries, and a CMake function for builds that compile the files of a project."
   DEPENDS "libboost-dev (>= 1.74), libicu-dev (>= 72)" SUGGESTS "projectctl (= ${PROJECT_VERSION})"
   NEEDS runtime postgresql)
-project_add_package(python NAME python3-project-management SECTION python
-  SUMMARY "manages the definition of an engineering project (Python module)"
-  DESCRIPTION "The files of a project, labels on them, its entry points and its references
+if(PROJECT_MANAGEMENT_PYTHON)
+  get_property(python_package GLOBAL PROPERTY project_python_package)
+  project_add_package(python NAME python3-project-management SECTION python
+    SUMMARY "manages the definition of an engineering project (Python module)"
+    DESCRIPTION "The files of a project, labels on them, its entry points and its references
  to other projects, for Python programs."
-  DEPENDS "python3 (>= 3.11), python3 (<< 3.12), ${libgit2_package}"
-  SUGGESTS "python3-networkx, python3-pandas, libproject-postgresql${project_soversion} (= ${PROJECT_VERSION})")
+    DEPENDS "${python_package}, ${libgit2_package}"
+    SUGGESTS "python3-networkx, python3-pandas, libproject-postgresql${project_soversion} (= ${PROJECT_VERSION})")
+  set(python_scripts "${CMAKE_CURRENT_SOURCE_DIR}/packaging/debian/python")
+  set(CPACK_DEBIAN_PYTHON_PACKAGE_CONTROL_EXTRA "${python_scripts}/postinst;${python_scripts}/prerm")
+endif()
 
 include(CPack)

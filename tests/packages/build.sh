@@ -30,4 +30,7 @@ expect projectctl 'share/fish/vendor_completions\.d/projectctl\.fish'
 expect python3-project-management 'lib/python3/dist-packages/project_management/__init__\.py'
 expect python3-project-management 'lib/python3/dist-packages/project_management/_core\.cpython-311-[a-z0-9_-]*\.so'
 expect python3-project-management 'lib/python3/dist-packages/project_management/py\.typed'
+depends=$(dpkg-deb --field packages/python3-project-management_*.deb Depends)
+[[ $depends =~ "python3 (>= 3.11~), python3 (<< 3.12)" ]] ||
+    { echo "python3-project-management does not depend on the Python that it is built for: $depends" >&2; exit 1; }
 expect projectctl 'share/project-management/json/[a-z0-9-]*\.schema\.json'

@@ -58,6 +58,10 @@ as_user 'zcat /usr/share/man/man1/projectctl.1.gz | grep -q "^.Nm projectctl"'
 as_root sh -c 'apt-get install --yes --no-install-recommends /tmp/python3-project-management_*.deb'
 as_user 'python3 -c "import project_management as pm; print(list(pm.open(\"sources\").files))"' | grep -q main.cpp ||
     fail "the Python module does not list the file"
+[ -d "$root/usr/lib/python3/dist-packages/project_management/__pycache__" ] || fail "the Python module is not compiled"
+as_user 'mkdir -p engine/src/io && touch engine/src/main.cpp engine/src/io/pump.cpp engine/src/io/pump.hpp'
+cp "$(dirname "$0")/example.py" "$root/home/newcomer/"
+[ "$(as_user 'python3 example.py' | tail -n 1)" = name_changed ] || fail "the example in Python does not run"
 
 # The library, for programs.
 as_root sh -c 'apt-get install --yes --no-install-recommends /tmp/*.deb g++ cmake make pkg-config'
@@ -76,7 +80,7 @@ grep -q 'definition of service "nowhere" not found' <<< "$answer" ||
     fail "the library for shared projects was not found"
 
 # Removing the packages leaves nothing of theirs.
-as_root sh -c 'apt-get purge --yes projectctl "libproject-*"'
+as_root sh -c 'apt-get purge --yes projectctl "libproject-*" python3-project-management'
 left=$(find "$root/usr" -name '*project_management*' -o -name 'projectctl*' -o -name 'libproject_*')
 [ -z "$left" ] || fail "left after removal: $left"
 rm -rf "$root"
