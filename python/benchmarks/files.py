@@ -4,7 +4,7 @@
     files.py PROGRAM [FILES] [ROUNDS]     PROGRAM is the target project_python_benchmark, of the build of the module
 
 Each round runs all of them in random order, each in a new process and a new project. Prints the medians as a table of
-Markdown.
+Markdown, and fails if the module takes more than twice as long as C++.
 """
 
 from __future__ import annotations
@@ -21,6 +21,7 @@ import time
 from collections.abc import Callable
 from pathlib import Path
 
+LIMIT = 2  # times the duration in C++
 OPERATIONS = {"add": "add all files", "list": "list all files", "find-glob": "find all files by a pattern",
               "find-label": "find a tenth of the files by a label"}
 
@@ -89,7 +90,7 @@ def times(command: list[str], folder: str, paths: list[str]) -> dict[str, tuple[
     return {name: (float(seconds), int(count)) for name, seconds, count in lines}
 
 
-def main() -> None:
+def main() -> int:
     files, rounds = (int(value) for value in (sys.argv[2:4] + ["100000", "5"][len(sys.argv) - 2:]))
     paths = [f"module{number % 50}/part{number // 50 % 100}/file{number}.cpp" for number in range(files)]
     commands = {"module": [sys.executable, __file__, "--module"], "C++": [sys.argv[1]],
@@ -105,10 +106,14 @@ def main() -> None:
                     counts.setdefault(operation, set()).add(count)
             assert all(len(each) == 1 for each in counts.values()), f"they do not do the same: {counts}"
     print(f"| {files:,} files | module | C++ | ratio | sqlite3 | ratio |\n|---|--:|--:|--:|--:|--:|")
+    is_within = True
     for operation, title in OPERATIONS.items():
         module, cpp, sqlite = (statistics.median(results[name, operation]) for name in ("module", "C++", "sqlite3"))
-        print(f"| {title} | {module * 1000:.0f} ms | {cpp * 1000:.0f} ms | {module / cpp:.2f} | {sqlite * 1000:.0f} ms |"
+        is_within = is_within and module <= LIMIT * cpp
+        ratio = f"{module / cpp:.2f}" if module <= LIMIT * cpp else f"**{module / cpp:.2f}**"
+        print(f"| {title} | {module * 1000:.0f} ms | {cpp * 1000:.0f} ms | {ratio} | {sqlite * 1000:.0f} ms |"
               f" {module / sqlite:.2f} |")
+    return 0 if is_within else 3
 
 
 if __name__ == "__main__":
@@ -116,4 +121,4 @@ if __name__ == "__main__":
     if sys.argv[1] in runs:
         runs[sys.argv[1]](sys.argv[2], sys.stdin.read().splitlines())
     else:
-        main()
+        sys.exit(main())

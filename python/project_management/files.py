@@ -119,7 +119,7 @@ class Files:
         return iter(self.find())
 
     def __len__(self) -> int:
-        return len(self.find())
+        return self._project._core.count_files()  # list() asks for it too, to know how long it will be
 
     def __contains__(self, path: object) -> bool:
         return isinstance(path, (str, bytes, os.PathLike)) and self._project._core.has_file(path)

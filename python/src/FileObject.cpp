@@ -121,20 +121,30 @@ py::list FileObjects::of(std::vector<session::FoundFile> const& files) const {
     WithoutCollector const withoutCollector;
     py::list result(files.size());
     for (std::size_t i = 0; i < files.size(); ++i) {
-        PyList_SET_ITEM(result.ptr(), static_cast<py::ssize_t>(i), create(files[i]).release().ptr());
+        result[i] = create(open_.relative(files[i].path), files[i].kind);
     }
     return result;
 }
 
-py::object FileObjects::create(session::FoundFile const& file) const {
+py::list FileObjects::of(FileList const& files) const {
+    WithoutCollector const withoutCollector;
+    py::list result(files.size());
+    py::ssize_t next = 0;
+    files.visit([&](std::u16string_view path, session::FileKind kind) {
+        PyList_SET_ITEM(result.ptr(), next++, create(fromPath(path), kind).release().ptr());
+    });
+    return result;
+}
+
+py::object FileObjects::create(py::str path, session::FileKind kind) const {
     auto object = py::reinterpret_steal<py::object>(type_->tp_alloc(type_, 0));
     if (!object) {
         throw py::error_already_set();
     }
     auto* const fields = fieldsOf(object.ptr());
     fields->project = Py_NewRef(project_.ptr());
-    fields->path = open_.relative(file.path).release().ptr();
-    fields->kind = static_cast<char>(file.kind);
+    fields->path = path.release().ptr();
+    fields->kind = static_cast<char>(kind);
     return object;
 }
 

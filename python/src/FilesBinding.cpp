@@ -1,3 +1,4 @@
+#include <map>
 #include <optional>
 #include <set>
 #include <string>
@@ -20,9 +21,9 @@ namespace py = pybind11;
 
 namespace {
 
-using session::FoundFile;
 using session::LabelChoice;
 using session::Query;
+using session::VisitedFile;
 
 management::FileManager& filesOf(Session& session) {
     return session.project().getFileManager();
@@ -78,23 +79,32 @@ std::vector<LabelChoice> choicesOf(LabelNames const& labels) {
     return result;
 }
 
-struct ComparePaths {
-    bool operator()(FoundFile const& left, FoundFile const& right) const { return left.path < right.path; }
-};
-
 /// The files of any of the queries, in one state of the project.
-std::vector<FoundFile> findAny(Session& session, std::vector<Query> const& queries) {
-    if (queries.size() == 1) {
-        return session.find(queries.front());
-    }
+FileList findAny(Session& session, std::vector<Query> const& queries) {
     auto const guard = session.store().acquireReadLock();
-    std::set<FoundFile, ComparePaths> found;
-    for (auto const& query : queries) {
-        found.merge([files = session.find(query)] {
-            return std::set<FoundFile, ComparePaths>(files.begin(), files.end());
-        }());
+    session::ToolAccess access(session);
+    FileList result;
+    if (queries.size() == 1) {
+        access.visit(queries.front(), [&](VisitedFile const& file) { result.add(file.path, file.kind); });
+        return result;
     }
-    return {found.begin(), found.end()};
+    std::map<Path, session::FileKind> found;
+    for (auto const& query : queries) {
+        access.visit(query, [&](VisitedFile const& file) { found.emplace(file.path, file.kind); });
+    }
+    for (auto const& [path, kind] : found) {
+        result.add(path.native(), kind);
+    }
+    return result;
+}
+
+std::size_t count(OpenProject const& project) {
+    return project.run([](Session& session) {
+        auto const guard = session.store().acquireReadLock();
+        std::size_t result = 0;
+        session::ToolAccess(session).visit({}, [&](VisitedFile const& /*file*/) { ++result; });
+        return result;
+    });
 }
 
 py::list find(OpenProject const& project, py::handle type, py::handle owner,
@@ -166,6 +176,7 @@ void bindFiles(py::module_& /*module*/, ProjectClass& project) {
     project.def("add_files", &add, py::arg("paths"), py::arg("anew"));
     project.def("remove_files", &remove, py::arg("paths"));
     project.def("has_file", &contains, py::arg("path"));
+    project.def("count_files", &count);
     project.def("find", &find, py::arg("type"), py::arg("owner"), py::arg("alternatives"), py::arg("below"),
                 py::arg("glob"), py::arg("kind"), py::arg("is_entry_point"), py::arg("is_unlabelled"),
                 py::arg("layers"));

@@ -50,6 +50,7 @@ OPERATIONS: dict[str, Callable[[pm.Project], object]] = {
     "add_files": of("add_files", ["readme.md"], True),
     "remove_files": of("remove_files", ["readme.md"]),
     "has_file": of("has_file", "readme.md"),
+    "count_files": of("count_files"),
     "find": lambda p: p.files.find(),
     "children": of("children", "src"),
     "categories": of("categories", False),
