@@ -13,6 +13,7 @@ from pathlib import Path
 
 SETUP = Path(__file__).parents[2] / "adapters/postgresql/sql/setup.sql"
 ACCOUNT = "postgres"  # of the Debian package, for tests that run as root: the server refuses to
+ENVIRONMENT = {name: value for name, value in os.environ.items() if name != "LD_PRELOAD"}  # without a sanitizer
 
 
 def programs() -> Path | None:
@@ -49,21 +50,24 @@ class Server:
         return ["setpriv", "--pdeathsig", "QUIT", *as_account, folder / program, *arguments]
 
     def _run(self, program: str, *arguments: str | Path) -> None:
-        done = subprocess.run(self._command(program, *arguments), cwd=self._folder, capture_output=True, text=True)
+        done = subprocess.run(self._command(program, *arguments), cwd=self._folder, capture_output=True, text=True,
+                              env=ENVIRONMENT)
         assert done.returncode == 0, done.stdout + done.stderr
 
     def _sql(self, user: str, database: str, *arguments: str | Path) -> None:
         subprocess.run(["psql", "--no-psqlrc", "--quiet", "--set", "ON_ERROR_STOP=1", *arguments,
-                        f"host={self._folder} user={user} dbname={database}"], check=True, stdout=subprocess.DEVNULL)
+                        f"host={self._folder} user={user} dbname={database}"], check=True, stdout=subprocess.DEVNULL,
+                       env=ENVIRONMENT)
 
     def start(self) -> None:
         """Starts the server, also after stop."""
         with open(self._folder / "log", "ab") as log:
             self._process = subprocess.Popen(
                 self._command("postgres", "-D", self._data, "-k", self._folder, "-c", "listen_addresses="),
-                cwd=self._folder, stdout=log, stderr=log)
+                cwd=self._folder, stdout=log, stderr=log, env=ENVIRONMENT)
         for _ in range(600):
-            ready = subprocess.run([programs() / "pg_isready", "--quiet", "--host", self._folder])  # type: ignore[operator]
+            ready = subprocess.run([programs() / "pg_isready", "--quiet", "--host", self._folder],  # type: ignore[operator]
+                                   env=ENVIRONMENT)
             if ready.returncode == 0:
                 return
             time.sleep(0.1)
