@@ -67,3 +67,10 @@ def test_a_folder_without_a_project_raises_not_a_project(tmp_path: Path) -> None
     assert isinstance(caught.value, pm.StoreError)
     with pytest.raises(pm.NotAProject):
         pm.open(tmp_path / "missing")
+
+
+def test_a_project_is_not_created_in_a_folder_that_does_not_exist(tmp_path: Path) -> None:
+    with pytest.raises(pm.StoreError) as caught:
+        pm.open(tmp_path / "missing", create_as="Engine")
+    assert caught.value.kind is pm.StoreError.Kind.REFUSED and not isinstance(caught.value, pm.NotAProject)
+    assert not (tmp_path / "missing").exists()

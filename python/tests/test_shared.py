@@ -151,3 +151,16 @@ def test_a_service_that_is_not_configured_is_refused(shared: pm.Project, tmp_pat
 
 def test_a_project_without_a_loss_of_history_reports_none(shared: pm.Project) -> None:
     assert shared.take_history_loss() is None
+
+
+def test_errors_of_the_library_that_is_loaded_for_servers_are_german(tmp_path: Path, monkeypatch: pytest.MonkeyPatch) -> None:
+    (tmp_path / "services").write_text("[gone]\nhost=/nonexistent\nsslmode=disable\n")
+    monkeypatch.setenv("PGSERVICEFILE", str(tmp_path / "services"))
+    before = pm.language()
+    pm.set_language("de")
+    try:
+        with pytest.raises(pm.StoreError, match="der Server ist nicht erreichbar") as caught:
+            pm.create_shared(tmp_path, "Engine", service="gone", reader="reader", writer="writer")
+    finally:
+        pm.set_language(before)
+    assert caught.value.kind is pm.StoreError.Kind.UNREACHABLE
