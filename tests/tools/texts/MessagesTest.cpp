@@ -48,6 +48,27 @@ TEST_P(Messages, showTheirArguments) {
     }
 }
 
+/// Whether a text about one thing differs from that about two in more than the number.
+template <class... Rest>
+bool hasSingular(char const* key, Rest const&... rest) {
+    auto const one = Message(key, 1, rest...).text();
+    return std::regex_replace(one, std::regex("1"), "2") != Message(key, 2, rest...).text();
+}
+
+TEST_P(Messages, haveASingularForOneThing) {
+    GlobalLocale const locale(GetParam());
+    for (auto const* const key :
+         {"AmbiguousLeft", "ConflictsLeft", "GuessesLeft", "LogEntriesDeleted", "PersonalTidied"}) {
+        EXPECT_TRUE(hasSingular(key)) << key;
+    }
+    for (auto const* const key : {"Imported", "SyncRuleSet"}) {
+        EXPECT_TRUE(hasSingular(key, 3)) << key;
+    }
+    for (auto const* const key : {"MoveCompleted", "MoveRolledBack"}) {
+        EXPECT_TRUE(hasSingular(key, "old", "new")) << key;
+    }
+}
+
 INSTANTIATE_TEST_SUITE_P(InBothLanguages, Messages, ::testing::Values("en", "de"));
 
 TEST(MessageKeys, ofTheSourcesAreInTheCatalogAndNoOthers) {
