@@ -64,7 +64,7 @@ TEST_F(FileLabelCommand, reportsTheChangesOnATerminal) {
     ASSERT_THAT(tool({"label", "put", "Status", "Open", "a"}), SucceedsSilently());
     settings_.onTerminal = true;
 
-    EXPECT_EQ(tool({"label", "put", "Status", "Done", "a", "b"}).output, "put on 2, replacing 1 others\r\n");
+    EXPECT_EQ(tool({"label", "put", "Status", "Done", "a", "b"}).output, "put on 2, replacing 1 other\r\n");
     EXPECT_EQ(tool({"label", "take", "Status", "Done", "a", "b", "c"}).output, "removed from 2\r\n");
 }
 
