@@ -2,8 +2,10 @@
 
 #include <cstdio>
 #include <memory>
+#include <stdexcept>
 
 #include "project/metadata/MetadataFunctions.hpp"
+#include "support/RunningProgram.hpp"
 
 namespace project::postgresql {
 
@@ -35,9 +37,14 @@ void prepare(test::PostgresServer& server) {
     for (auto const* user : {"anna", "ben", "swift", "rita", "eve"}) {
         server.query("CREATE ROLE " + std::string(user) + " LOGIN PASSWORD 'secret'");
     }
-    server.runProgram({test::PostgresServer::program("psql"), "--no-psqlrc", "--quiet", "--set",
-                       "ON_ERROR_STOP=1", "--single-transaction", "--file", PROJECT_SETUP_SQL,
-                       server.connection("owner")});
+    // As the user of this program: the user of the server cannot read a repository in somebody's home folder.
+    auto const setUp = test::runProgram({test::PostgresServer::program("psql"), "--no-psqlrc", "--quiet",
+                                         "--set", "ON_ERROR_STOP=1", "--single-transaction", "--file",
+                                         PROJECT_SETUP_SQL, server.connection("owner")},
+                                        {});
+    if (setUp.exitCode != 0) {
+        throw std::runtime_error("setup.sql failed: " + setUp.errors);
+    }
 }
 
 std::string newId() {
