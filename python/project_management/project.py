@@ -18,7 +18,7 @@ from .files import File, Files, PathArgument
 from .labels import Categories
 from .moves import Move, RecoveredMoves
 from .references import ProjectGraph, References, graph_of
-from .renames import RenamesFound, require_percent
+from .renames import RenamesFound
 from .scopes import Scopes
 from .sync import SyncPlan, SyncRules
 
@@ -230,9 +230,8 @@ class Project:
         """Pairs the files that are missing on disk with files that are not in the project, for adopt. Changes nothing.
 
         In a repository, the contents decide: equal ones, and similar ones from this percentage on. Without git,
-        the names do, and each pair is a guess.
+        the names do, and each pair is a guess. Raises ValueError if the similarity is not from 1 to 100.
         """
-        require_percent(similarity)
         return RenamesFound._of(self._core.find_renames(similarity, uses_git))
 
     def take_recovered_moves(self) -> RecoveredMoves | None:
@@ -258,10 +257,9 @@ class Project:
         """Adds the new files of folders with rules, and removes those that are gone. Returns what it changed.
 
         Files that git shows to be renamed keep their labels and entry points, from this similarity of their
-        contents on, in percent. Raises SyncFolderMissing if the folder of a rule is missing or empty, unless
-        removes_missing_folders allows that.
+        contents on, in percent. Raises ValueError if that is not from 1 to 100, and SyncFolderMissing if the folder
+        of a rule is missing or empty, unless removes_missing_folders allows that.
         """
-        require_percent(similarity)
         return SyncPlan._of(self._core.sync(File, self, removes_missing_folders, follows_renames, similarity))
 
     def take_history_loss(self) -> HistoryLoss | None:

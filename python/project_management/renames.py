@@ -59,9 +59,3 @@ class RenamesFound:
 
     def __bool__(self) -> bool:
         return bool(self.pairs or self.ambiguous)
-
-
-def require_percent(similarity: int) -> None:
-    """Raises ValueError for a similarity that is not from 1 to 100."""
-    if not 1 <= similarity <= 100:
-        raise ValueError(f"a similarity is from 1 to 100 percent, not {similarity}")

@@ -15,18 +15,10 @@ namespace {
 
 using session::Move;
 
-py::list pairsOf(OpenProject const& project, std::vector<Move> const& moves) {
-    py::list result;
-    for (auto const& move : moves) {
-        result.append(py::make_tuple(project.relative(move.from), project.relative(move.to)));
-    }
-    return result;
-}
-
 py::list move(OpenProject const& project, py::iterable const& sources, py::handle destination) {
     auto const files = project.absolutes(sources);
     auto const target = project.absolute(destination);
-    return pairsOf(project, project.run([&](Session& session) { return session.move(files, target); }));
+    return project.relatives(project.run([&](Session& session) { return session.move(files, target); }));
 }
 
 /// Old and new paths, as a caller gave them.
@@ -48,8 +40,8 @@ void adopt(OpenProject const& project, Pairs const& pairs) {
 
 py::list followHidden(OpenProject const& project, Pairs const& pairs) {
     auto const moves = movesOf(project, pairs);
-    return pairsOf(project,
-                   project.run([&](Session& session) { return session.personal().followHidden(moves); }));
+    return project.relatives(
+        project.run([&](Session& session) { return session.personal().followHidden(moves); }));
 }
 
 py::object takeRecovered(OpenProject const& project) {
@@ -57,8 +49,8 @@ py::object takeRecovered(OpenProject const& project) {
     if (!recovered) {
         return py::none();
     }
-    return py::make_tuple(static_cast<int>(recovered->outcome), pairsOf(project, recovered->moves),
-                          pairsOf(project, recovered->left));
+    return py::make_tuple(static_cast<int>(recovered->outcome), project.relatives(recovered->moves),
+                          project.relatives(recovered->left));
 }
 
 } // namespace

@@ -91,6 +91,14 @@ py::list OpenProject::relatives(std::vector<Path> const& paths) const {
     return result;
 }
 
+py::list OpenProject::relatives(std::vector<session::Move> const& moves) const {
+    py::list result(moves.size());
+    for (std::size_t i = 0; i < moves.size(); ++i) {
+        result[i] = py::make_tuple(relative(moves[i].from), relative(moves[i].to));
+    }
+    return result;
+}
+
 /// A path that leads to the root through a symbolic link, in the form of the root. Links within the project
 /// are files of it and stay.
 Path OpenProject::inFormOfRoot(std::u16string path) const {

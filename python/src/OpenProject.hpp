@@ -62,6 +62,9 @@ public:
 
     pybind11::list relatives(std::vector<Path> const& paths) const;
 
+    /// Pairs of an old and a new path, relative to the root.
+    pybind11::list relatives(std::vector<session::Move> const& moves) const;
+
 private:
     Path inFormOfRoot(std::u16string path) const;
 

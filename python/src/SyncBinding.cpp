@@ -35,10 +35,6 @@ Patterns patternsOf(std::set<std::u16string> const& texts) {
 py::tuple toPython(OpenProject const& project, session::SyncPlan const& plan, py::handle type,
                    py::handle owner) {
     FileObjects const files(project, type, owner);
-    py::list renamed;
-    for (auto const& move : plan.renamed) {
-        renamed.append(py::make_tuple(project.relative(move.from), project.relative(move.to)));
-    }
     py::list removed;
     for (auto const& each : plan.removed) {
         py::list labels;
@@ -51,8 +47,8 @@ py::tuple toPython(OpenProject const& project, session::SyncPlan const& plan, py
     for (auto const& each : plan.unreadable) {
         unreadable.append(py::make_tuple(project.relative(each.folder), each.problem.value()));
     }
-    return py::make_tuple(renamed, files.of(plan.added), removed, project.relatives(plan.missing),
-                          project.relatives(plan.absent), unreadable);
+    return py::make_tuple(project.relatives(plan.renamed), files.of(plan.added), removed,
+                          project.relatives(plan.missing), project.relatives(plan.absent), unreadable);
 }
 
 py::list rules(OpenProject const& project) {
