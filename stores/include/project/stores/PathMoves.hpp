@@ -27,7 +27,7 @@ public:
     /// Removes the move from a path, if there is one.
     void remove(std::u16string_view from);
 
-    /// Returns true if there are no moves.
+    /// Returns true if it contains no move.
     bool empty() const noexcept { return entries_.empty(); }
 
     /// The new path of a file or folder; nothing if it does not move.
